@@ -1,0 +1,53 @@
+# How everything of this project is compiled, and where it is put.
+include_guard()
+
+set(CMAKE_CXX_STANDARD 20)
+set(CMAKE_CXX_STANDARD_REQUIRED ON)
+set(CMAKE_CXX_EXTENSIONS OFF)
+set(CMAKE_CXX_VISIBILITY_PRESET hidden)
+set(CMAKE_VISIBILITY_INLINES_HIDDEN ON)
+set(CMAKE_POSITION_INDEPENDENT_CODE ON)
+set(CMAKE_LINK_DEPENDS_NO_SHARED ON)
+
+set(CMAKE_RUNTIME_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/bin)
+set(CMAKE_LIBRARY_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/lib)
+set(CMAKE_ARCHIVE_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/lib)
+
+include(CheckCXXCompilerFlag)
+check_cxx_compiler_flag(-fno-gnu-unique MZ_HAS_NO_GNU_UNIQUE)
+
+# What our own code is compiled with; not passed on to users of the libraries.
+add_library(mzCompile INTERFACE)
+target_compile_options(mzCompile INTERFACE -Wall -Wextra -Wpedantic -Wshadow=local -Wconversion
+  -Wnon-virtual-dtor -Wold-style-cast -Wundef)
+if(MZ_WARNINGS_AS_ERRORS)
+  target_compile_options(mzCompile INTERFACE -Werror)
+endif()
+if(MZ_HAS_NO_GNU_UNIQUE)
+  # A library that defines a unique symbol can never be unmapped.
+  target_compile_options(mzCompile INTERFACE -fno-gnu-unique)
+endif()
+if(MZ_SANITIZE)
+  target_compile_options(mzCompile INTERFACE -fsanitize=address,undefined -fno-sanitize-recover=all
+    -fno-omit-frame-pointer)
+  target_link_options(mzCompile INTERFACE -fsanitize=address,undefined)
+endif()
+
+# mz_add_library(NAME MACRO sources...): a shared library of the family, lib<NAME> on every platform.
+function(mz_add_library name macro)
+  add_library(${name} SHARED ${ARGN})
+  add_library(Mz::${name} ALIAS ${name})
+  target_compile_features(${name} PUBLIC cxx_std_20)
+  target_link_libraries(${name} PRIVATE $<BUILD_INTERFACE:mzCompile>)
+  target_compile_definitions(${name} PRIVATE ${macro})
+  target_include_directories(${name} PUBLIC
+    $<BUILD_INTERFACE:${PROJECT_SOURCE_DIR}> $<INSTALL_INTERFACE:include>)
+  set_target_properties(${name} PROPERTIES PREFIX lib)
+  if(WIN32)
+    # Programs find a library beside themselves; it is wanted in lib as well, as on every platform.
+    set_target_properties(${name} PROPERTIES RUNTIME_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/lib)
+    add_custom_command(TARGET ${name} POST_BUILD
+      COMMAND ${CMAKE_COMMAND} -E make_directory ${CMAKE_BINARY_DIR}/bin
+      COMMAND ${CMAKE_COMMAND} -E copy_if_different $<TARGET_FILE:${name}> ${CMAKE_BINARY_DIR}/bin)
+  endif()
+endfunction()

@@ -1,0 +1,10 @@
+/// The object model in one header: interface identities, castable objects, the references to them,
+/// the casts, the templates that implement all this, and the library's exceptions.
+#pragma once
+
+#include "components/componentManager/castImpl.h"
+#include "components/componentManager/castable.h"
+#include "components/componentManager/exceptions.h"
+#include "components/componentManager/reference.h"
+#include "components/componentManager/translation.h"
+#include "components/componentManager/uid.h"

@@ -1,0 +1,110 @@
+#include "components/componentManager/componentImpPrivate.h"
+
+namespace Mz {
+
+QrComponentBuilder::~QrComponentBuilder() = default;
+
+QrRefPtr<QrComponentBuilder> QrComponentBuilder::getBuilder() {
+    return this;
+}
+
+QrBuilderDescription::~QrBuilderDescription() = default;
+
+void QrBuilderDescription::forceVtblInstantiation() {}
+
+QrComponentDescription::~QrComponentDescription() = default;
+
+void QrComponentDescription::forceVtblInstantiation() {}
+
+QrComponentManager::~QrComponentManager() = default;
+
+ComponentManager::ComponentManager() = default;
+
+ComponentManager::~ComponentManager() {
+    // Libraries that call the manager while they are unloaded find it as if it had never started.
+    initialised = false;
+    builderIndex.clear();
+    while (!libraries.empty())
+        libraries.pop_back();
+}
+
+QrRefPtr<QrComponentBuilder> ComponentManager::getBuilder(const QrUid& uid) {
+    if (!initialised)
+        return nullptr;
+    Builder* const* found = builderIndex.find(uid);
+    if (!found)
+        return nullptr;
+    const Builder& builder = **found;
+    QrCRefPtr<QrComponentBuilder> result = builder.getBuilder();
+    return QrRefPtr<QrComponentBuilder>::adopt(const_cast<QrComponentBuilder*>(result.detach()));
+}
+
+QrEnum::Action
+ComponentManager::enumerateBuilders(QrEnumerator<QrCPtr<QrBuilderDescription>>& e) {
+    if (!initialised)
+        return e.finished();
+    for (ComponentLibrary& library : libraries) {
+        // By index: the callee may use a builder whose library turns out to have changed, which
+        // replaces the records under this walk.
+        for (std::size_t index = 0; index < library.builders.size(); ++index) {
+            const QrEnum::Action action = e.process(&library.builders[index]);
+            if (action != QrEnum::Continue)
+                return action;
+        }
+    }
+    return e.finished();
+}
+
+void ComponentManager::initialize(const wchar_t* searchPath) {
+    if (initialised || initialising)
+        return;
+    initialising = true;
+    LibraryList recorded;
+    recorded.swap(libraries);
+    {
+        LibraryMap byName;
+        discover(searchPath, libraries, byName);
+        merge(recorded, byName);
+    }
+    recorded.clear();
+    for (ComponentLibrary& library : libraries)
+        ensureLoaded(library, false);
+    initialising = false;
+    initialised = true;
+}
+
+QrRef<QrCastable> ComponentManager::createObject(const QrUid& uid) {
+    if (!initialised)
+        return nullptr;
+    const QrRefPtr<QrComponentBuilder> found = getBuilder(uid);
+    const QrPtr<QrComponentBuilder> builder = queryCast<QrComponentBuilder>(found.get());
+    return builder ? builder->createObject() : nullptr;
+}
+
+ComponentLibrary::ComponentLibrary(ComponentManager& manager) : manager(&manager) {}
+
+ComponentLibrary::~ComponentLibrary() {
+    if (loadedByManager)
+        platform::unloadLibrary(module);
+}
+
+platform::NativePath ComponentLibrary::openingPath() const {
+    return platform::openingPath(directory + L'\\' + fileName, foundPath);
+}
+
+void ComponentLibrary::noteFile(const platform::FileStatus& status) {
+    fileTime = status.time;
+    fileSize = status.size;
+}
+
+namespace {
+
+ComponentManager manager;
+
+} // namespace
+
+} // namespace Mz
+
+Mz::QrComponentManager* QrGetComponentManager() {
+    return &Mz::manager;
+}

@@ -1,0 +1,98 @@
+#include "components/componentManager/processControl.h"
+
+#include "components/componentManager/hashMap.h"
+#include "components/componentManager/neverDestroyed.h"
+#include "components/componentManager/platform/platform.h"
+#include "components/componentManager/systemController.h"
+#include "components/componentManager/threadHash.h"
+
+#include <atomic>
+#include <mutex>
+
+namespace Mz {
+
+namespace {
+
+/// A lock that needs no constructor to run, which a mutex does on one of the platforms. It is held
+/// for a look-up only, never while foreign code runs.
+class Lock {
+  public:
+    void lock() {
+        while (taken.test_and_set(std::memory_order_acquire))
+            taken.wait(true, std::memory_order_relaxed);
+    }
+    void unlock() {
+        taken.clear(std::memory_order_release);
+        taken.notify_one();
+    }
+
+  private:
+    std::atomic_flag taken;
+};
+
+struct ThreadControllers {
+    Lock mutex;
+    HashMap<std::uint32_t, QrProcessControl*, ThreadHash> byThread;
+};
+
+constinit NeverDestroyed<ThreadControllers> threads;
+
+/// Counts the changes to `threads`, so that a thread knows whether what it remembers still holds.
+constinit std::atomic<std::uint32_t> generation{1};
+
+/// What a thread found when it last looked. It is checked against the generation, and so a later
+/// thread with the same identifier finds what its predecessor left, as any look-up would.
+struct Remembered {
+    std::uint32_t generation = 0;
+    QrProcessControl* controller = nullptr;
+};
+
+constinit thread_local Remembered remembered;
+
+QrProcessControl* lookUp() {
+    ThreadControllers& controllers = threads.value;
+    const std::lock_guard lock(controllers.mutex);
+    QrProcessControl* const* found = controllers.byThread.find(platform::currentThreadId());
+    remembered = {generation.load(std::memory_order_relaxed), found ? *found : nullptr};
+    return remembered.controller;
+}
+
+QrProcessControl* threadController() {
+    if (remembered.generation == generation.load(std::memory_order_acquire))
+        return remembered.controller;
+    return lookUp();
+}
+
+} // namespace
+
+} // namespace Mz
+
+using namespace Mz;
+
+QrProcessControl* QrGetProcessController() {
+    QrProcessControl* controller = threadController();
+    return controller ? controller : QrGetSystemProcessController();
+}
+
+QrProcessControl* QrGetSystemProcessController() {
+    return systemController.load(std::memory_order_acquire);
+}
+
+void QrSetSystemProcessController(QrProcessControl* controller) {
+    systemController.store(controller, std::memory_order_release);
+}
+
+QrProcessControl* QrGetThreadProcessController() {
+    return threadController();
+}
+
+void QrSetThreadProcessController(QrProcessControl* controller) {
+    ThreadControllers& controllers = threads.value;
+    const std::lock_guard lock(controllers.mutex);
+    const std::uint32_t thread = platform::currentThreadId();
+    if (controller)
+        controllers.byThread[thread] = controller;
+    else
+        controllers.byThread.erase(thread);
+    generation.fetch_add(1, std::memory_order_release);
+}

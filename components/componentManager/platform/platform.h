@@ -1,0 +1,122 @@
+/// What the library needs of the operating system: one description, and one implementation for each
+/// system (`windows/`, `posix/`), chosen by the build. No other file knows which system it is on.
+///
+/// Every function may be called from any thread; those that touch one library at a time say so. No
+/// function throws anything but `std::bad_alloc`.
+#pragma once
+
+#include "components/componentManager/uid.h"
+
+#include <cstdint>
+#include <filesystem>
+#include <fstream>
+#include <optional>
+#include <string>
+#include <string_view>
+#include <vector>
+
+namespace Mz::platform {
+
+// ---- Names ----------------------------------------------------------------------------------
+
+/// A name as the system wants it, bytes or wide characters. Used as a container only: nothing here
+/// relies on how the standard library converts or compares paths.
+using NativePath = std::filesystem::path;
+
+/// `name` as the system wants it; nothing when the current locale has no form for it. On Linux
+/// characters become bytes as buffered IO writes them.
+std::optional<NativePath> toNative(std::wstring_view name);
+
+/// The name by which to open what was found as `found` and is stored as `normalised`: the latter
+/// where letter case and the kind of separator make no difference, else the former.
+NativePath openingPath(std::wstring_view normalised, const NativePath& found);
+
+/// `text` in lower case, as file names are compared: by the C runtime's rules on Windows, ASCII
+/// letters only on Linux.
+std::wstring lowerCase(std::wstring text);
+
+/// The first element of the process's command line, by which the program was started; empty when
+/// the system does not tell.
+std::wstring firstArgument();
+
+// ---- Files ----------------------------------------------------------------------------------
+
+/// Which file a name stands for, whatever the name.
+struct FileIdentity {
+    std::uint64_t device = 0;
+    std::uint64_t index = 0;
+    friend auto operator<=>(const FileIdentity&, const FileIdentity&) = default;
+};
+
+struct FileStatus {
+    std::uint32_t time = 0; ///< last modification, seconds since 1970, cut to 32 bits
+    int64 size = 0;         ///< in bytes
+    bool regular = false;   ///< a regular file, or a link to one
+};
+
+/// The status of the file, links followed, from one query; nothing when there is none to be had.
+std::optional<FileStatus> queryFile(const NativePath& path);
+
+/// One file that may be a component library.
+struct DirectoryEntry {
+    std::wstring name;                    ///< as the system spells it
+    NativePath path;                      ///< the directory as it was given, and the name
+    std::optional<FileIdentity> identity; ///< where the system allows two names for one file
+};
+
+/// The regular files of a directory that are not hidden (by attribute, or by a leading dot where
+/// that is the custom) and no system files, in a fixed order. A directory that cannot be listed
+/// has none; a name that cannot be converted is left out.
+std::vector<DirectoryEntry> listCandidates(const NativePath& directory);
+
+/// Opens `path` for reading in binary, denying nothing to other openers. False when it cannot be
+/// opened or is a directory; the stream is then not good.
+bool openForReading(std::ifstream& stream, const NativePath& path);
+
+// ---- Libraries ------------------------------------------------------------------------------
+
+/// A loaded library.
+using Module = void*;
+
+/// The library if the process has it mapped under this path already, else null. Takes no reference:
+/// it stays as long as whoever loaded it wants.
+Module findLoadedLibrary(const NativePath& path);
+
+/// Whether the file is a library for this system and processor that exports the function `symbol`
+/// itself. Runs nothing of the file, not even its initialisers; anything else than such a library,
+/// damaged ones included, gives false.
+bool exportsFunction(const NativePath& path, const char* symbol);
+
+/// Loads the library, with its own surroundings where the system knows such (the manifest in it);
+/// null when it cannot be loaded.
+Module loadLibrary(const NativePath& path);
+
+/// Gives back one load.
+void unloadLibrary(Module module);
+
+/// The address of `symbol` in that very library, not in one it depends on; null when it has none or
+/// `module` is null.
+void* findSymbol(Module module, const char* symbol);
+
+/// Keeps the system from showing dialogs to the user, for as long as it lives, on loads that fail.
+class QuietErrors {
+  public:
+    QuietErrors();
+    ~QuietErrors();
+    QuietErrors(const QuietErrors&) = delete;
+    QuietErrors& operator=(const QuietErrors&) = delete;
+
+  private:
+    unsigned int previousMode;
+};
+
+// ---- Threads and locale ---------------------------------------------------------------------
+
+/// The system's identifier of the calling thread. The system may give it to another thread when
+/// this one has ended.
+std::uint32_t currentThreadId();
+
+/// Whether LC_CTYPE of the calling thread is "C" or "POSIX".
+bool usesPlainBytes();
+
+} // namespace Mz::platform

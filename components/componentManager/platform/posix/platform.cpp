@@ -1,0 +1,180 @@
+#include "components/componentManager/platform/platform.h"
+
+#include "components/componentManager/platform/characters.h"
+#include "components/componentManager/platform/posix/elfProbe.h"
+
+#include <algorithm>
+#include <cerrno>
+#include <cstring>
+#include <dirent.h>
+#include <dlfcn.h>
+#include <fcntl.h>
+#include <langinfo.h>
+#include <link.h>
+#include <memory>
+#include <sys/stat.h>
+#include <unistd.h>
+
+namespace Mz::platform {
+
+namespace {
+
+class Descriptor {
+  public:
+    explicit Descriptor(int value) : value(value) {}
+    ~Descriptor() {
+        if (value >= 0)
+            ::close(value);
+    }
+    Descriptor(const Descriptor&) = delete;
+    Descriptor& operator=(const Descriptor&) = delete;
+
+    int get() const { return value; }
+    explicit operator bool() const { return value >= 0; }
+
+  private:
+    int value;
+};
+
+struct CloseDirectory {
+    void operator()(DIR* directory) const { ::closedir(directory); }
+};
+
+using Directory = std::unique_ptr<DIR, CloseDirectory>;
+
+/// Whether the name in `directory` is a regular file, and which. Directories, the common other
+/// case, are told from the entry alone where the file system gives the type.
+std::optional<FileIdentity> regularFile(DIR* directory, const dirent& entry) {
+    if (entry.d_type == DT_DIR)
+        return std::nullopt;
+    struct stat status;
+    if (::fstatat(::dirfd(directory), entry.d_name, &status, 0) != 0 || !S_ISREG(status.st_mode))
+        return std::nullopt;
+    return FileIdentity{status.st_dev, status.st_ino};
+}
+
+/// By normalised name, so that the order is that of a system without letter case; names that differ
+/// in case only by their bytes.
+bool comesBefore(const DirectoryEntry& a, const DirectoryEntry& b) {
+    const std::wstring lowerA = lowerCase(a.name);
+    const std::wstring lowerB = lowerCase(b.name);
+    return lowerA != lowerB ? lowerA < lowerB : a.path.native() < b.path.native();
+}
+
+} // namespace
+
+std::optional<NativePath> toNative(std::wstring_view name) {
+    std::optional<std::string> bytes = toBytes(name);
+    if (!bytes)
+        return std::nullopt;
+    return NativePath(std::move(*bytes));
+}
+
+NativePath openingPath(std::wstring_view, const NativePath& found) {
+    return found;
+}
+
+std::wstring lowerCase(std::wstring text) {
+    for (wchar_t& character : text)
+        if (character >= L'A' && character <= L'Z')
+            character += L'a' - L'A';
+    return text;
+}
+
+std::wstring firstArgument() {
+    std::ifstream commandLine("/proc/self/cmdline", std::ios::binary);
+    std::string argument;
+    std::getline(commandLine, argument, '\0');
+    return toCharacters(argument).value_or(std::wstring());
+}
+
+std::optional<FileStatus> queryFile(const NativePath& path) {
+    struct stat status;
+    if (::stat(path.c_str(), &status) != 0)
+        return std::nullopt;
+    return FileStatus{static_cast<std::uint32_t>(status.st_mtime), status.st_size,
+                      S_ISREG(status.st_mode)};
+}
+
+std::vector<DirectoryEntry> listCandidates(const NativePath& directory) {
+    std::vector<DirectoryEntry> entries;
+    const Directory listing(::opendir(directory.c_str()));
+    if (!listing)
+        return entries;
+    while (const dirent* entry = ::readdir(listing.get())) {
+        if (entry->d_name[0] == '.')
+            continue;
+        const std::optional<FileIdentity> identity = regularFile(listing.get(), *entry);
+        if (!identity)
+            continue;
+        std::optional<std::wstring> name = toCharacters(entry->d_name);
+        if (name)
+            entries.push_back({std::move(*name), directory.native() + "/" + entry->d_name, identity});
+    }
+    std::sort(entries.begin(), entries.end(), comesBefore);
+    return entries;
+}
+
+bool openForReading(std::ifstream& stream, const NativePath& path) {
+    stream.open(path, std::ios::in | std::ios::binary);
+    // A directory opens like a file here and only refuses to be read.
+    if (stream.good() && std::filesystem::is_directory(path)) {
+        stream.close();
+        stream.setstate(std::ios::failbit);
+    }
+    return stream.good();
+}
+
+Module findLoadedLibrary(const NativePath& path) {
+    const Module module = ::dlopen(path.c_str(), RTLD_NOW | RTLD_LOCAL | RTLD_NOLOAD);
+    if (module)
+        ::dlclose(module);
+    return module;
+}
+
+bool exportsFunction(const NativePath& path, const char* symbol) {
+    const Descriptor file(::open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK));
+    return file && elfExportsFunction(file.get(), symbol);
+}
+
+Module loadLibrary(const NativePath& path) {
+    const Module module = ::dlopen(path.c_str(), RTLD_NOW | RTLD_LOCAL);
+    if (!module)
+        ::dlerror(); // The message belongs to nobody.
+    return module;
+}
+
+void unloadLibrary(Module module) {
+    if (module)
+        ::dlclose(module);
+}
+
+void* findSymbol(Module module, const char* symbol) {
+    if (!module)
+        return nullptr;
+    void* address = ::dlsym(module, symbol);
+    if (!address)
+        return nullptr;
+    // The search goes through the dependencies as well, whose symbols do not count.
+    link_map* wanted = nullptr;
+    void* owner = nullptr;
+    Dl_info ignored;
+    if (::dlinfo(module, RTLD_DI_LINKMAP, &wanted) != 0 ||
+        ::dladdr1(address, &ignored, &owner, RTLD_DL_LINKMAP) == 0)
+        return nullptr;
+    return owner == wanted ? address : nullptr;
+}
+
+QuietErrors::QuietErrors() : previousMode(0) {}
+QuietErrors::~QuietErrors() = default;
+
+std::uint32_t currentThreadId() {
+    return static_cast<std::uint32_t>(::gettid());
+}
+
+bool usesPlainBytes() {
+    const char* name = ::nl_langinfo(_NL_LOCALE_NAME(LC_CTYPE));
+    return std::strcmp(name, "C") == 0 || std::strcmp(name, "POSIX") == 0;
+}
+
+} // namespace Mz::platform

@@ -1,0 +1,201 @@
+#include "components/componentManager/platform/platform.h"
+
+#include <clocale>
+#include <cstring>
+#include <cwchar>
+#include <io.h>
+#include <sys/stat.h>
+#include <windows.h>
+
+namespace Mz::platform {
+
+namespace {
+
+/// The loader takes a name without an extension to mean one with ".dll" behind it; a dot at the end
+/// says that there is none.
+std::wstring loaderName(const NativePath& path) {
+    const std::wstring& name = path.native();
+    const std::size_t separator = name.find_last_of(L"/\\");
+    const std::size_t dot = name.find_last_of(L'.');
+    const bool hasExtension =
+        dot != std::wstring::npos && (separator == std::wstring::npos || dot > separator);
+    return hasExtension ? name : name + L".";
+}
+
+/// The activation context that a library carries in its own manifest, active on this thread for as
+/// long as this lives. Libraries without a manifest load in the surroundings of the caller.
+class OwnActivationContext {
+  public:
+    explicit OwnActivationContext(const std::wstring& path) {
+        constexpr int isolationAwareManifest = 2;
+        ACTCTXW request{};
+        request.cbSize = sizeof request;
+        request.dwFlags = ACTCTX_FLAG_RESOURCE_NAME_VALID;
+        request.lpSource = path.c_str();
+        request.lpResourceName = MAKEINTRESOURCEW(isolationAwareManifest);
+        context = ::CreateActCtxW(&request);
+        if (context != INVALID_HANDLE_VALUE)
+            active = ::ActivateActCtx(context, &cookie);
+    }
+    ~OwnActivationContext() {
+        if (active)
+            ::DeactivateActCtx(0, cookie);
+        if (context != INVALID_HANDLE_VALUE)
+            ::ReleaseActCtx(context);
+    }
+    OwnActivationContext(const OwnActivationContext&) = delete;
+    OwnActivationContext& operator=(const OwnActivationContext&) = delete;
+
+  private:
+    HANDLE context;
+    ULONG_PTR cookie = 0;
+    bool active = false;
+};
+
+/// An open directory listing of the C runtime.
+class Listing {
+  public:
+    explicit Listing(const std::wstring& pattern)
+        : handle(::_wfindfirst64i32(pattern.c_str(), &entry)) {}
+    ~Listing() {
+        if (handle != -1)
+            ::_findclose(handle);
+    }
+    Listing(const Listing&) = delete;
+    Listing& operator=(const Listing&) = delete;
+
+    bool valid() const { return handle != -1; }
+    bool next() { return ::_wfindnext64i32(handle, &entry) == 0; }
+    const _wfinddata64i32_t& current() const { return entry; }
+
+  private:
+    _wfinddata64i32_t entry{};
+    std::intptr_t handle;
+};
+
+bool isDirectory(const NativePath& path) {
+    struct _stat64 status;
+    return ::_wstat64(path.c_str(), &status) == 0 && (status.st_mode & S_IFMT) == S_IFDIR;
+}
+
+} // namespace
+
+std::optional<NativePath> toNative(std::wstring_view name) {
+    return NativePath(std::wstring(name));
+}
+
+NativePath openingPath(std::wstring_view normalised, const NativePath&) {
+    return NativePath(std::wstring(normalised));
+}
+
+std::wstring lowerCase(std::wstring text) {
+    ::_wcslwr(text.data());
+    return text;
+}
+
+std::wstring firstArgument() {
+    // The C runtime's wide arguments are absent in a program with a narrow `main`. In the first
+    // argument a quote only toggles, and no escape is known.
+    std::wstring argument;
+    bool quoted = false;
+    for (const wchar_t* next = ::GetCommandLineW(); *next; ++next) {
+        if (*next == L'"')
+            quoted = !quoted;
+        else if (!quoted && (*next == L' ' || *next == L'\t'))
+            break;
+        else
+            argument += *next;
+    }
+    return argument;
+}
+
+std::optional<FileStatus> queryFile(const NativePath& path) {
+    struct _stat64 status;
+    if (::_wstat64(path.c_str(), &status) != 0)
+        return std::nullopt;
+    return FileStatus{static_cast<std::uint32_t>(status.st_mtime), status.st_size,
+                      (status.st_mode & S_IFMT) == S_IFREG};
+}
+
+std::vector<DirectoryEntry> listCandidates(const NativePath& directory) {
+    std::vector<DirectoryEntry> entries;
+    Listing listing(directory.native() + L"/*");
+    if (!listing.valid())
+        return entries;
+    constexpr unsigned int excluded = _A_HIDDEN | _A_SYSTEM | _A_SUBDIR;
+    do {
+        const _wfinddata64i32_t& entry = listing.current();
+        if (!(entry.attrib & excluded))
+            entries.push_back({entry.name, directory.native() + L"\\" + entry.name, std::nullopt});
+    } while (listing.next());
+    return entries;
+}
+
+bool openForReading(std::ifstream& stream, const NativePath& path) {
+    if (isDirectory(path))
+        stream.setstate(std::ios::failbit);
+    else
+        stream.open(path, std::ios::in | std::ios::binary);
+    return stream.good();
+}
+
+Module findLoadedLibrary(const NativePath& path) {
+    return ::GetModuleHandleW(loaderName(path).c_str());
+}
+
+bool exportsFunction(const NativePath& path, const char* symbol) {
+    const std::wstring name = loaderName(path);
+    const OwnActivationContext context(path.native());
+    const HMODULE module =
+        ::LoadLibraryExW(name.c_str(), nullptr, DONT_RESOLVE_DLL_REFERENCES);
+    const bool found = findSymbol(module, symbol) != nullptr;
+    unloadLibrary(module);
+    return found;
+}
+
+Module loadLibrary(const NativePath& path) {
+    const OwnActivationContext context(path.native());
+    const HMODULE module = ::LoadLibraryW(loaderName(path).c_str());
+    if (!module)
+        static_cast<void>(::GetLastError()); // The reason belongs to nobody.
+    return module;
+}
+
+void unloadLibrary(Module module) {
+    if (module)
+        ::FreeLibrary(static_cast<HMODULE>(module));
+}
+
+void* findSymbol(Module module, const char* symbol) {
+    if (!module)
+        return nullptr;
+    const auto address = reinterpret_cast<void*>(
+        ::GetProcAddress(static_cast<HMODULE>(module), symbol));
+    if (!address)
+        return nullptr;
+    // An export may be forwarded to another library, whose symbols do not count.
+    HMODULE owner = nullptr;
+    constexpr DWORD flags =
+        GET_MODULE_HANDLE_EX_FLAG_FROM_ADDRESS | GET_MODULE_HANDLE_EX_FLAG_UNCHANGED_REFCOUNT;
+    if (!::GetModuleHandleExW(flags, static_cast<const wchar_t*>(address), &owner))
+        return nullptr;
+    return owner == module ? address : nullptr;
+}
+
+QuietErrors::QuietErrors()
+    : previousMode(::SetErrorMode(SEM_FAILCRITICALERRORS | SEM_NOOPENFILEERRORBOX)) {}
+
+QuietErrors::~QuietErrors() {
+    ::SetErrorMode(previousMode);
+}
+
+std::uint32_t currentThreadId() {
+    return ::GetCurrentThreadId();
+}
+
+bool usesPlainBytes() {
+    const char* name = std::setlocale(LC_CTYPE, nullptr);
+    return name && (std::strcmp(name, "C") == 0 || std::strcmp(name, "POSIX") == 0);
+}
+
+} // namespace Mz::platform

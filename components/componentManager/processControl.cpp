@@ -1,0 +1,122 @@
+#include "components/componentManager/processControl.h"
+
+#include "components/base/assertions.h"
+#include "components/componentManager/neverDestroyed.h"
+#include "components/componentManager/platform/platform.h"
+#include "components/componentManager/systemController.h"
+
+#include <algorithm>
+#include <iostream>
+#include <limits>
+#include <string_view>
+
+namespace Mz {
+
+QrProcessControl::~QrProcessControl() = default;
+
+void QrProcessControl::forceVtblInstantiation() {}
+
+namespace {
+
+std::wstring_view textOf(const wchar_t* text) {
+    return text ? std::wstring_view(text) : std::wstring_view();
+}
+
+bool isRegularFile(std::wstring_view name) {
+    const std::optional<platform::NativePath> path = platform::toNative(name);
+    const auto status = path ? platform::queryFile(*path) : std::nullopt;
+    return status && status->regular;
+}
+
+bool isSlash(wchar_t c) {
+    return c == L'/' || c == L'\\';
+}
+
+/// Names that say by themselves where the file is.
+bool ignoresSearchPath(std::wstring_view name) {
+    return (!name.empty() && isSlash(name[0])) || (name.size() > 1 && name[1] == L':');
+}
+
+/// The first "directory/name" along `searchPath` that is a regular file, or an empty string.
+std::wstring findAlong(std::wstring_view searchPath, std::wstring_view name) {
+    while (true) {
+        searchPath.remove_prefix(std::min(searchPath.find_first_not_of(L';'), searchPath.size()));
+        if (searchPath.empty())
+            return {};
+        std::wstring_view directory = searchPath.substr(0, searchPath.find(L';'));
+        searchPath.remove_prefix(directory.size());
+        while (!directory.empty() && isSlash(directory.back()))
+            directory.remove_suffix(1);
+        std::wstring candidate(directory);
+        candidate.append(L"/").append(name);
+        if (isRegularFile(candidate))
+            return candidate;
+    }
+}
+
+/// `fraction` in percent, cut to a whole number; 0 where there is none.
+int percentage(float fraction) {
+    const double percent = fraction * 100.0;
+    constexpr double largest = std::numeric_limits<int>::max();
+    constexpr double smallest = std::numeric_limits<int>::min();
+    return percent > smallest - 1.0 && percent < largest + 1.0 ? static_cast<int>(percent) : 0;
+}
+
+/// The last resort: tells the error stream that something happened. Its texts appear as addresses,
+/// which shows every host that it has to install a controller of its own to be read.
+class DefaultSystemController final
+    : public QrCastImpl<DefaultSystemController, QrProcessControl,
+                        const DefaultSystemController&> {
+  public:
+    void* getContext() override { return nullptr; }
+    void message(int, const wchar_t* text) override { writeLine(text); }
+    bool isInterrupted() override { return false; }
+    bool warning(int, const wchar_t* text) override {
+        writeLine(text);
+        return true;
+    }
+    bool isProgressShown() override { return false; }
+    bool progress(float fraction, const wchar_t* text) override {
+        std::cerr << percentage(fraction) << address(L"%: ") << address(text) << address(L"\r");
+        return true;
+    }
+    bool isStatusShown() override { return false; }
+    void status(const wchar_t* text) override { std::cerr << address(text) << address(L"\r"); }
+    bool error(int, const wchar_t* text) override {
+        writeLine(text);
+        return false;
+    }
+    bool isErrorShown() override { return false; }
+    void log(int, const wchar_t* text) override { writeLine(text); }
+    [[noreturn]] void abort(int, const wchar_t* text) override {
+        writeLine(text);
+        // The position is part of what callers and logs rely on, not this file's line.
+        constexpr int reportedLine = 274;
+        Assertions::throwProgramAborted("components/componentManager/processControl", reportedLine);
+    }
+
+    std::wstring findFile(const wchar_t* fileName, const wchar_t* searchPath,
+                          const wchar_t* fallbackSearchPath) override {
+        const std::wstring_view name = textOf(fileName);
+        if (!ignoresSearchPath(name)) {
+            std::wstring found = findAlong(textOf(searchPath), name);
+            if (!found.empty())
+                return found;
+        }
+        if (fallbackSearchPath)
+            return findFile(fileName, fallbackSearchPath, nullptr);
+        return isRegularFile(name) ? std::wstring(name) : std::wstring();
+    }
+
+  private:
+    static const void* address(const wchar_t* text) { return text; }
+    static void writeLine(const wchar_t* text) { std::cerr << address(text) << std::endl; }
+};
+
+constinit NeverDestroyed<DefaultSystemController> defaultController;
+
+} // namespace
+
+constinit std::atomic<QrProcessControl*> systemController{&defaultController.value};
+
+} // namespace Mz
