@@ -8,6 +8,7 @@
 
 #include <atomic>
 #include <mutex>
+#include <thread>
 
 namespace Mz {
 
@@ -19,12 +20,9 @@ class Lock {
   public:
     void lock() {
         while (taken.test_and_set(std::memory_order_acquire))
-            taken.wait(true, std::memory_order_relaxed);
+            std::this_thread::yield();
     }
-    void unlock() {
-        taken.clear(std::memory_order_release);
-        taken.notify_one();
-    }
+    void unlock() { taken.clear(std::memory_order_release); }
 
   private:
     std::atomic_flag taken;

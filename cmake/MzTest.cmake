@@ -1,0 +1,59 @@
+# GoogleTest from the sources of Debian's package, and how test programs are made.
+include_guard()
+
+set(MZ_GOOGLETEST_SOURCES /usr/src/googletest CACHE PATH "The sources of GoogleTest")
+set(CMAKE_POLICY_DEFAULT_CMP0077 NEW)
+set(BUILD_GMOCK ON)
+set(INSTALL_GTEST OFF)
+set(gtest_force_shared_crt ON)
+add_subdirectory(${MZ_GOOGLETEST_SOURCES} ${CMAKE_BINARY_DIR}/googletest EXCLUDE_FROM_ALL SYSTEM)
+if(MZ_SANITIZE)
+  foreach(target gtest gtest_main gmock gmock_main)
+    target_compile_options(${target} PRIVATE -fsanitize=address,undefined)
+  endforeach()
+endif()
+include(GoogleTest)
+
+# The build's name stands before the name of each test: one summary counts all builds.
+get_filename_component(MZ_BUILD_NAME ${CMAKE_BINARY_DIR} NAME)
+
+# The build folder as the tested programs name it; Wine shows the whole file system as drive Z.
+set(MZ_BUILD_PATH ${CMAKE_BINARY_DIR})
+set(MZ_SOURCE_PATH ${PROJECT_SOURCE_DIR})
+if(WIN32)
+  set(MZ_BUILD_PATH Z:${CMAKE_BINARY_DIR})
+  set(MZ_SOURCE_PATH Z:${PROJECT_SOURCE_DIR})
+endif()
+
+# mz_add_test_program(NAME sources...): a program of tests, without entries for ctest.
+function(mz_add_test_program name)
+  add_executable(${name} ${ARGN})
+  target_link_libraries(${name} PRIVATE Mz::MZcomponentManager mzCompile mzTestSupport GTest::gmock)
+endfunction()
+
+# mz_add_tests(NAME sources...): a program of tests, each of which is an entry for ctest and runs in
+# a process of its own.
+function(mz_add_tests name)
+  mz_add_test_program(${name} ${ARGN})
+  target_link_libraries(${name} PRIVATE GTest::gtest_main)
+  mz_discover_tests(${name})
+endfunction()
+
+function(mz_discover_tests name)
+  gtest_discover_tests(${name} TEST_PREFIX "${MZ_BUILD_NAME}/" DISCOVERY_MODE PRE_TEST
+    DISCOVERY_TIMEOUT 120 PROPERTIES TIMEOUT 120)
+endfunction()
+
+# mz_add_test_component(NAME [FOLDER folder] sources...): a component library in
+# <build>/components/<folder>, by default a folder of its own.
+function(mz_add_test_component name)
+  cmake_parse_arguments(PARSE_ARGV 1 arg "" "FOLDER" "")
+  if(NOT arg_FOLDER)
+    set(arg_FOLDER ${name})
+  endif()
+  mz_add_component(${name} ${arg_UNPARSED_ARGUMENTS})
+  target_link_libraries(${name} PRIVATE mzCompile)
+  set_target_properties(${name} PROPERTIES
+    LIBRARY_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/components/${arg_FOLDER}
+    RUNTIME_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/components/${arg_FOLDER})
+endfunction()

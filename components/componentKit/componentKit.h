@@ -1,0 +1,152 @@
+/// What makes writing a component library short. Header-only.
+///
+/// A component library is a handful of builders and one line that names them:
+///
+///     MZ_COMPONENT(L"Greetings", L"Says hello in several languages",
+///                  Mz::Kit::builderOf<Greeter>({.uid = greeterUid, .name = L"greeter"}))
+///
+/// The rest of this file writes out, once, what `componentImp.h` asks of a component library. A
+/// library that needs something else implements those interfaces by hand; both ways mix freely.
+#pragma once
+
+#include "components/componentManager/componentImp.h"
+#include "components/componentManager/importBuilder.h"
+
+#include <initializer_list>
+#include <utility>
+#include <vector>
+
+namespace Mz::Kit {
+
+/// What a builder says of itself. The texts are kept as pointers, so they must live as long as the
+/// library; literals do.
+struct BuilderInfo {
+    QrUid uid;                   ///< the builder's identity; make a new one for each builder
+    const wchar_t* name = L"";   ///< by which importers find it
+    const wchar_t* label = L"";  ///< for people; importers show it in file dialogs
+    const wchar_t* text = L"";   ///< a longer one
+    unsigned int number = 0;     ///< whatever you agree on with your clients
+    bool flag = false;           ///< likewise
+};
+
+/// The base of a builder, `Impl`, that also answers for `Ifaces`: describes itself and stands for
+/// itself. What is left to write is `createObject` and the operations of `Ifaces`.
+///
+/// Counted, so it stands on the heap.
+template <class Impl, class... Ifaces>
+class Builder : public QrCastRef<QrCastHeap<
+                    QrCastMulti<Impl, QrBuilderDescription, QrComponentBuilder, Ifaces...>>> {
+  public:
+    explicit Builder(const BuilderInfo& builderInfo) : info(builderInfo) {}
+
+    const QrUid& getUid() const override { return info.uid; }
+    const wchar_t* getName() const override { return info.name; }
+    const wchar_t* getLabel() const override { return info.label; }
+    unsigned int getNumber() const override { return info.number; }
+    const wchar_t* getText() const override { return info.text; }
+    bool getFlag() const override { return info.flag; }
+
+    /// The manager takes these two from the library's description.
+    const wchar_t* getComponentLabel() const override { return L""; }
+    const wchar_t* getComponentText() const override { return L""; }
+
+    QrRefPtr<QrComponentBuilder> getBuilder() override { return this; }
+    QrCRefPtr<QrComponentBuilder> getBuilder() const override { return this; }
+
+  private:
+    BuilderInfo info;
+};
+
+/// A builder that makes each object with `new Object`. `Object` is counted (`QrCastRef`).
+template <class Object>
+class ObjectBuilder final : public Builder<ObjectBuilder<Object>> {
+  public:
+    using Builder<ObjectBuilder<Object>>::Builder;
+
+    QrRef<QrCastable> createObject() override {
+        const QrPtr<Object> object(new Object);
+        return object->getCastable();
+    }
+};
+
+/// A builder that makes objects of foreign files. What is left to write is the two operations on a
+/// buffer, `canImport` and `import`.
+template <class Impl>
+class ImportBuilder : public Builder<Impl, QrImportBuilder> {
+  public:
+    /// `extensions` without dot or wildcard, kept as pointers like all texts.
+    ImportBuilder(const BuilderInfo& info, std::initializer_list<const wchar_t*> fileExtensions)
+        : Builder<Impl, QrImportBuilder>(info), extensions(fileExtensions) {}
+
+    using QrImportBuilder::canImport;
+    using QrImportBuilder::import;
+
+    QrEnum::Action enumerateExtensions(QrEnumerator<const wchar_t*>& e) const override {
+        for (const wchar_t* extension : extensions)
+            if (const QrEnum::Action action = e.process(extension))
+                return action;
+        return e.finished();
+    }
+
+    /// There is no such object without a file.
+    QrRef<QrCastable> createObject() override { return nullptr; }
+
+  private:
+    std::vector<const wchar_t*> extensions;
+};
+
+/// A new reference to an object of class `T`, which answers for `QrBuilderDescription`.
+template <class T, class... Args>
+QrPtr<QrBuilderDescription> builder(Args&&... args) {
+    return QrPtr<T>(new T(std::forward<Args>(args)...));
+}
+
+/// A builder that makes objects of class `Object`.
+template <class Object>
+QrPtr<QrBuilderDescription> builderOf(const BuilderInfo& info) {
+    return builder<ObjectBuilder<Object>>(info);
+}
+
+/// What the library says of itself. Not counted: the entry point keeps one for all callers.
+class Description final : public QrCastImpl<Description, QrComponentDescription> {
+  public:
+    using Builders = std::vector<QrPtr<QrBuilderDescription>>;
+
+    Description(const wchar_t* componentLabel, const wchar_t* componentText, Builders allBuilders)
+        : label(componentLabel), text(componentText), builders(std::move(allBuilders)) {}
+
+    QrRef<QrCastable> createBuilder(const QrUid& uid) override {
+        for (const QrPtr<QrBuilderDescription>& known : builders)
+            if (known->getUid() == uid)
+                return known->getBuilder();
+        return nullptr;
+    }
+
+    int64 getComponentValue() override { return 0; }
+    const wchar_t* getComponentLabel() override { return label; }
+    const wchar_t* getComponentText() override { return text; }
+    unsigned int getBuilderCount() override { return static_cast<unsigned int>(builders.size()); }
+
+    QrEnum::Action enumerateBuilders(QrEnumerator<QrCPtr<QrBuilderDescription>>& e) override {
+        for (const QrPtr<QrBuilderDescription>& known : builders)
+            if (const QrEnum::Action action = e.process(known))
+                return action;
+        return e.finished();
+    }
+
+  private:
+    const wchar_t* label;
+    const wchar_t* text;
+    Builders builders;
+};
+
+} // namespace Mz::Kit
+
+/// Defines the entry point of this component library: `MZ_COMPONENT(label, text, builders...)`. The
+/// label and the text are shown to people; each builder is the result of `Mz::Kit::builderOf` or
+/// `Mz::Kit::builder`. Use it once in a library, outside all namespaces.
+#define MZ_COMPONENT(label, text, ...)                                                             \
+    extern "C" MZ_EXPORT Mz::QrCastable* QrGetComponentDescription() {                             \
+        static Mz::Kit::Description description(label, text, {__VA_ARGS__});                       \
+        return &description;                                                                       \
+    }

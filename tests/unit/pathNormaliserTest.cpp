@@ -1,0 +1,16 @@
+#include "components/componentManager/componentImpPrivate.h"
+
+#include <gtest/gtest.h>
+
+namespace {
+
+std::wstring normalised(const wchar_t* path) {
+    return Mz::ComponentManager::normalisePath(path, false);
+}
+
+TEST(PathNormaliser, WritesRunsOfSeparatorsAsOneBackslashAndLowersCase) {
+    EXPECT_EQ(normalised(L"C:/A//b"), L"c:\\a\\b");
+    EXPECT_EQ(normalised(L"A\\B\\"), L"a\\b");
+}
+
+} // namespace
