@@ -15,7 +15,7 @@ using namespace Mz::Test;
 namespace {
 
 /// What an operation does about a broken medium.
-enum class Notices { Badbit, Nothing, LostPosition };
+enum class Notices { Badbit, BadbitOfReads, Nothing, LostPosition };
 
 struct Operation {
     const char* name;
@@ -35,7 +35,7 @@ const std::vector<Operation>& inputOperations() {
         {"readChar(chars) to a NUL", Notices::Badbit,
          [](QrBufferedIO& io) { io.readChar(narrow, 8, 8); }},
         {"readChar(wchar_ts)", Notices::Badbit, [](QrBufferedIO& io) { io.readChar(wide, 8, 8); }},
-        {"skipWhiteSpace", Notices::Badbit, [](QrBufferedIO& io) { io.skipWhiteSpace(9); }},
+        {"skipWhiteSpace", Notices::BadbitOfReads, [](QrBufferedIO& io) { io.skipWhiteSpace(9); }},
         {"ungetc(wchar_t)", Notices::Badbit, [](QrBufferedIO& io) { io.ungetc(L'x'); }},
         {"ungetc(char)", Notices::Nothing, [](QrBufferedIO& io) { io.ungetc('x'); }},
         {"tell", Notices::Nothing, [](QrBufferedIO& io) { io.tell(); }},
@@ -90,7 +90,7 @@ void underEveryCircumstance(Check&& check) {
 /// Runs the operation and demands that exactly the stated exception comes out of it.
 template <class Ex>
 void runUnder(const Circumstances& circumstances, const Operation& operation, QrBufferedIO& io,
-              std::ios& stream) {
+              const FaultyBuffer& medium, std::ios& stream) {
     SCOPED_TRACE(std::string(operation.name) + ", mask " + std::to_string(circumstances.mask) +
                  ", fault " + std::to_string(static_cast<int>(circumstances.fault)) + " at " +
                  std::to_string(circumstances.at));
@@ -106,11 +106,19 @@ void runUnder(const Circumstances& circumstances, const Operation& operation, Qr
     case Notices::Badbit:
         EXPECT_EQ(raised, stream.bad());
         break;
+    case Notices::BadbitOfReads:
+        // A byte that cannot be put back goes unnoticed until the next read.
+        if (!raised && stream.bad()) {
+            EXPECT_THROW(io.read(), Ex);
+        } else {
+            EXPECT_EQ(raised, stream.bad());
+        }
+        break;
     case Notices::Nothing:
         EXPECT_FALSE(raised);
         break;
     case Notices::LostPosition:
-        EXPECT_EQ(raised, io.tell() == -1);
+        EXPECT_EQ(raised, medium.wentWrong() || stream.fail());
         break;
     }
     EXPECT_EQ(stream.exceptions(), circumstances.mask) << "the mask is the caller's";
@@ -126,7 +134,7 @@ TEST(FaultyInput, RaisesTheStatedExceptionAndNothingElse) {
                 std::istream stream(&medium);
                 stream.exceptions(circumstances.mask);
                 QrInBuffer in(&stream);
-                runUnder<QrStreamEx::ExReadError>(circumstances, operation, in, stream);
+                runUnder<QrStreamEx::ExReadError>(circumstances, operation, in, medium, stream);
             }
     });
 }
@@ -147,7 +155,7 @@ TEST(FaultyInput, RaisesTheStatedExceptionAlsoFromTheMiddle) {
             if (stream.bad())
                 continue;
             stream.exceptions(circumstances.mask);
-            runUnder<QrStreamEx::ExReadError>(circumstances, operation, in, stream);
+            runUnder<QrStreamEx::ExReadError>(circumstances, operation, in, medium, stream);
         }
     });
 }
@@ -159,14 +167,14 @@ TEST(FaultyOutput, RaisesTheStatedExceptionAndNothingElse) {
             std::ostream stream(&medium);
             stream.exceptions(circumstances.mask);
             QrOutBuffer out(&stream);
-            runUnder<QrStreamEx::ExWriteError>(circumstances, operation, out, stream);
+            runUnder<QrStreamEx::ExWriteError>(circumstances, operation, out, medium, stream);
         }
     });
 }
 
 TEST(FaultyInput, ThatOnlyEndsIsTheEndOfInput) {
-    for (const std::ios::iostate mask : {std::ios::goodbit, std::ios::eofbit | std::ios::failbit |
-                                                                std::ios::badbit}) {
+    for (const std::ios::iostate mask :
+         {std::ios::goodbit, std::ios::eofbit | std::ios::failbit | std::ios::badbit}) {
         FaultyBuffer medium("abcdef", Fault::Fails, 3);
         std::istream stream(&medium);
         stream.exceptions(mask);

@@ -45,7 +45,8 @@ TEST(ReadByte, GivesUnsignedBytesAndMinusOneAtTheEndAsOftenAsAsked) {
 }
 
 TEST(ReadByte, GoesOnWhenMoreInputArrives) {
-    std::stringstream stream("a");
+    std::stringstream stream;
+    stream << "a";
     QrInBuffer io(&stream);
     EXPECT_EQ(io.read(), 'a');
     EXPECT_EQ(io.read(), -1);

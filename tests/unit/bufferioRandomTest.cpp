@@ -242,7 +242,8 @@ TEST(RandomInput, IsReadAsTheModelReadsIt) {
     for (int round = 0; round < 4000; ++round) {
         const std::string text = randomText(random);
         const auto mask = static_cast<std::ios::iostate>(
-            round % 2 ? std::ios::goodbit : std::ios::badbit | std::ios::eofbit | std::ios::failbit);
+            round % 2 ? std::ios::goodbit
+                      : std::ios::badbit | std::ios::eofbit | std::ios::failbit);
         Comparison comparison(text, random, mask);
         for (int step = 0; step < 40; ++step) {
             SCOPED_TRACE("round " + std::to_string(round) + ", step " + std::to_string(step));

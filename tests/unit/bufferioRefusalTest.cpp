@@ -54,12 +54,18 @@ TEST(OutBuffer, RefusesEveryReadAndTouchesNothing) {
     char narrow = 'n';
     wchar_t wide = L'w';
     const std::function<void()> reads[] = {
-        [&] { io.read(&narrow, 1); },        [&] { io.read(nullptr, 0); },
-        [&] { io.read(); },                  [&] { io.readChar(&wide, 1, 1); },
-        [&] { io.readChar(&narrow, 1, 1); }, [&] { io.readChar(&narrow, 0, 0); },
-        [&] { io.readChar(wide); },          [&] { io.readChar(narrow); },
-        [&] { io.ungetc(L'x'); },            [&] { io.ungetc('x'); },
-        [&] { io.skipWhiteSpace(1); },       [&] { io.skipWhiteSpace(0); },
+        [&] { io.read(&narrow, 1); },
+        [&] { io.read(nullptr, 0); },
+        [&] { io.read(); },
+        [&] { io.readChar(&wide, 1, 1); },
+        [&] { io.readChar(&narrow, 1, 1); },
+        [&] { io.readChar(&narrow, 0, 0); },
+        [&] { io.readChar(wide); },
+        [&] { io.readChar(narrow); },
+        [&] { io.ungetc(L'x'); },
+        [&] { io.ungetc('x'); },
+        [&] { io.skipWhiteSpace(1); },
+        [&] { io.skipWhiteSpace(0); },
     };
     for (const auto& read : reads)
         expectRefusal<QrStreamEx::ExRead>("Read on output stream.", read);
@@ -77,17 +83,16 @@ TEST(BothBuffers, HandNoObjects) {
     QrStream stream;
     for (QrBufferedIO* io : {static_cast<QrBufferedIO*>(&in), static_cast<QrBufferedIO*>(&out)}) {
         expectRefusal<QrStreamEx::ExWriteObjectImp>(
-            "writeObject not implemented.",
-            [&] { io->writeObject(&in, stream, L"a", L"b"); });
-        expectRefusal<QrStreamEx::ExWriteObjectImp>(
-            "writeObject not implemented.",
-            [&] { io->writeObject(nullptr, stream, nullptr, nullptr); });
-        expectRefusal<QrStreamEx::ExReadObjectImp>(
-            "readObject not implemented.",
-            [&] { io->readObject(stream, &QrBufferedIO::uid, L"a", L"b"); });
-        expectRefusal<QrStreamEx::ExReadObjectImp>(
-            "readObject not implemented.",
-            [&] { io->readObject(stream, nullptr, nullptr, nullptr); });
+            "writeObject not implemented.", [&] { io->writeObject(&in, stream, L"a", L"b"); });
+        expectRefusal<QrStreamEx::ExWriteObjectImp>("writeObject not implemented.", [&] {
+            io->writeObject(nullptr, stream, nullptr, nullptr);
+        });
+        expectRefusal<QrStreamEx::ExReadObjectImp>("readObject not implemented.", [&] {
+            io->readObject(stream, &QrBufferedIO::uid, L"a", L"b");
+        });
+        expectRefusal<QrStreamEx::ExReadObjectImp>("readObject not implemented.", [&] {
+            io->readObject(stream, nullptr, nullptr, nullptr);
+        });
     }
 }
 

@@ -220,8 +220,7 @@ TEST(LkCounter, IsThirtyTwoBitsWideAndReturnsTheNewValue) {
 class Owner;
 
 /// What `Owner` shows as its `Dial`.
-class Companion
-    : public QrTempObject<Owner, QrCastRef<QrCastHeap<QrCastImpl<Companion, Dial>>>> {
+class Companion : public QrTempObject<Owner, QrCastRef<QrCastHeap<QrCastImpl<Companion, Dial>>>> {
   public:
     explicit Companion(Owner* owner);
     ~Companion() override;
@@ -325,8 +324,7 @@ TEST(QrTempObject, DestroyHoldsTheOwnerWhileItDeletesTheCompanionAndAsksTheOwner
 class CountedOwner;
 
 class CountedCompanion
-    : public QrTempObject<CountedOwner,
-                          QrCastRef<QrCastHeap<QrCastImpl<CountedCompanion, Dial>>>> {
+    : public QrTempObject<CountedOwner, QrCastRef<QrCastHeap<QrCastImpl<CountedCompanion, Dial>>>> {
   public:
     using QrTempObject::QrTempObject;
     int mark() const override { return 12; }

@@ -87,8 +87,8 @@ std::vector<Case> cases() {
         streamCase<S::ExReadOpen>("ExReadOpenNull", ": Error opening input stream.", null),
         streamCase<S::ExReadOpen>("ExReadOpenTwoNames",
                                   "data.bin: Error opening input stream\nNo such file", n, m),
-        streamCase<S::ExReadOpen>("ExReadOpenSecondNull",
-                                  "data.bin: Error opening input stream\n", n, null),
+        streamCase<S::ExReadOpen>("ExReadOpenSecondNull", "data.bin: Error opening input stream\n",
+                                  n, null),
         streamCase<S::ExReadOpen>("ExReadOpenBothNull", ": Error opening input stream\n", null,
                                   null),
         streamCase<S::ExWrite>("ExWrite", "Write on input stream."),
@@ -102,8 +102,7 @@ std::vector<Case> cases() {
         streamCase<S::ExWriteObject>("ExWriteObjectNull", ": Error storing object.", null),
         streamCase<S::ExWriteObjectImp>("ExWriteObjectImp", "writeObject not implemented."),
         streamCase<S::ExWriteOpen>("ExWriteOpen", "Error opening output stream."),
-        streamCase<S::ExWriteOpen>("ExWriteOpenNamed", "data.bin: Error opening output stream.",
-                                   n),
+        streamCase<S::ExWriteOpen>("ExWriteOpenNamed", "data.bin: Error opening output stream.", n),
         streamCase<S::ExWriteOpen>("ExWriteOpenNull", ": Error opening output stream.", null),
         streamCase<S::ExWriteOpen>("ExWriteOpenTwoNames",
                                    "data.bin: Error opening output stream\nNo such file", n, m),
@@ -111,8 +110,7 @@ std::vector<Case> cases() {
                                    ": Error opening output stream\nNo such file", null, m),
         exceptionCase<QrComponentManagerEx::ExBadCast, QrComponentManagerEx>(
             "ExBadCast", "Bad cast in QrCastable::safeCast"),
-        exceptionCase<Assertions::ExProgramAborted, ExBase>("ExProgramAborted",
-                                                            "Program aborted."),
+        exceptionCase<Assertions::ExProgramAborted, ExBase>("ExProgramAborted", "Program aborted."),
     };
 }
 
@@ -151,9 +149,9 @@ INSTANTIATE_TEST_SUITE_P(All, Exception, testing::ValuesIn(cases()),
 
 template <class Ex, bool named, bool twice>
 constexpr bool hasConstructors =
-    std::is_constructible_v<Ex, const char*, int> &&
-    std::is_constructible_v<Ex, const char*, int, const char*> == named &&
-    std::is_constructible_v<Ex, const char*, int, const char*, const char*> == twice &&
+    std::is_constructible_v<Ex, const char*, int>&&
+            std::is_constructible_v<Ex, const char*, int, const char*> ==
+        named&& std::is_constructible_v<Ex, const char*, int, const char*, const char*> == twice &&
     !std::is_default_constructible_v<Ex> && std::is_copy_constructible_v<Ex> &&
     std::is_base_of_v<std::runtime_error, Ex>;
 
@@ -295,8 +293,7 @@ class ForeignExceptions : public testing::Test {
         ASSERT_TRUE(path);
         module = platform::loadLibrary(*path);
         ASSERT_NE(module, nullptr);
-        raise = reinterpret_cast<ThrowFunction*>(
-            platform::findSymbol(module, throwFunctionName));
+        raise = reinterpret_cast<ThrowFunction*>(platform::findSymbol(module, throwFunctionName));
         ASSERT_NE(raise, nullptr);
     }
     void TearDown() override { platform::unloadLibrary(module); }

@@ -20,7 +20,7 @@ class FaultyBuffer : public std::streambuf {
         : text(std::move(text)), fault(fault), at(at) {}
 
     const std::string& content() const { return text; }
-    int calls() const { return callCount; }
+    bool wentWrong() const { return fault != Fault::None && callCount >= at; }
 
   protected:
     int_type underflow() override {

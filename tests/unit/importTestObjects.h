@@ -60,7 +60,8 @@ class TestImportBuilder final : public Kit::Builder<TestImportBuilder, QrImportB
         return e.finished();
     }
 
-    bool canImport(QrPtr<QrBufferedIO> io, const wchar_t* path, const wchar_t* hint) const override {
+    bool canImport(QrPtr<QrBufferedIO> io, const wchar_t* path,
+                   const wchar_t* hint) const override {
         note(L"can", path, hint);
         return onCanImport ? onCanImport(*io) : false;
     }
@@ -81,8 +82,8 @@ class TestImportBuilder final : public Kit::Builder<TestImportBuilder, QrImportB
 
   private:
     void note(const wchar_t* what, const wchar_t* path, const wchar_t* hint) const {
-        calls.push_back(std::wstring(getLabel()) + L" " + what + L" [" +
-                        (path ? path : L"(null)") + L"] [" + (hint ? hint : L"(null)") + L"]");
+        calls.push_back(std::wstring(getLabel()) + L" " + what + L" [" + (path ? path : L"(null)") +
+                        L"] [" + (hint ? hint : L"(null)") + L"]");
     }
 
     std::vector<const wchar_t*> extensions;

@@ -263,13 +263,18 @@ struct ExtensionCase {
 };
 
 TEST_F(Importer, TakesAllAfterTheLastDotWhereverItIs) {
-    for (const auto& [path, extension] :
-         {ExtensionCase{L"a.b.c", L"c"}, {L"folder.d/file", L"d/file"}, {L"file.", L""},
-          {L"file", L""}, {L".hidden", L"hidden"}, {L"c:\\x.y\\z", L"y\\z"}, {L"..", L""}}) {
+    for (const auto& [path, extension] : {ExtensionCase{L"a.b.c", L"c"},
+                                          {L"folder.d/file", L"d/file"},
+                                          {L"file.", L""},
+                                          {L"file", L""},
+                                          {L".hidden", L"hidden"},
+                                          {L"c:\\x.y\\z", L"y\\z"},
+                                          {L"..", L""}}) {
         TestLibrary ownLibrary;
         Calls ownCalls;
-        const QrPtr<TestImportBuilder> builder(new TestImportBuilder(
-            {.uid = uidOf(500), .name = L"extension", .label = L"A"}, {L"no", extension}, ownCalls));
+        const QrPtr<TestImportBuilder> builder(
+            new TestImportBuilder({.uid = uidOf(500), .name = L"extension", .label = L"A"},
+                                  {L"no", extension}, ownCalls));
         builder->onCanImport = [](QrBufferedIO&) { return true; };
         ownLibrary.add(uidOf(500), L"extension", builder->getCastable());
         importer.name = L"extension";
@@ -300,8 +305,8 @@ TEST_F(Importer, SkipsTheFirstRoundForANullPath) {
 TEST_F(Importer, GivesBuildersThePathTwiceWhenThereIsASearchPath) {
     addWilling(L"A", {L"a"});
     EXPECT_TRUE(importText(L"file.a", L"some;where"));
-    EXPECT_EQ(calls, (Calls{L"A extensions", L"A can [file.a] [file.a]",
-                            L"A import [file.a] [file.a]"}));
+    EXPECT_EQ(calls,
+              (Calls{L"A extensions", L"A can [file.a] [file.a]", L"A import [file.a] [file.a]"}));
     calls.clear();
     EXPECT_TRUE(importText(L"file.a", L""));
     EXPECT_EQ(calls[1], L"A can [file.a] [file.a]");
@@ -366,9 +371,8 @@ TEST_F(Importer, RestoresThePositionBetweenBuilders) {
         io.read(block, 100);
         io.ungetc('x');
     });
-    add(L"E", {}).onCanImport = reads([](QrBufferedIO& io) {
-        EXPECT_THROW(io.seek(1000, 0), QrStreamEx::ExReadError);
-    });
+    add(L"E", {}).onCanImport =
+        reads([](QrBufferedIO& io) { EXPECT_THROW(io.seek(1000, 0), QrStreamEx::ExReadError); });
     add(L"F", {}).onCanImport = reads([](QrBufferedIO& io) {
         while (io.read() != -1) {
         }
@@ -461,8 +465,8 @@ TEST_F(FileImporter, FindsTheFileAndGivesBuildersThePathAsTheCallerGaveIt) {
     EXPECT_EQ(makerOf(object), L"A");
     EXPECT_TRUE(found);
     EXPECT_FALSE(isOpen(file));
-    EXPECT_EQ(calls, (Calls{L"A extensions", L"A can [data.a] [data.a]",
-                            L"A import [data.a] [data.a]"}));
+    EXPECT_EQ(calls,
+              (Calls{L"A extensions", L"A can [data.a] [data.a]", L"A import [data.a] [data.a]"}));
 }
 
 TEST_F(FileImporter, TellsAMissingFileFromOneThatNobodyReads) {
