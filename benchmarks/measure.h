@@ -9,7 +9,7 @@ namespace Mz::Benchmarks {
 /// call through it is resolved or merged with the one before. Costs no instruction.
 template <class T>
 T* opaque(T* pointer) {
-    asm volatile("" : "+r"(pointer) : : "memory");
+    asm volatile("" : "+r"(pointer));
     return pointer;
 }
 
@@ -18,7 +18,6 @@ template <class Operation>
 void repeat(benchmark::State& state, Operation operation) {
     constexpr int batch = 64;
     while (state.KeepRunningBatch(batch)) {
-#pragma GCC unroll 16
         for (int count = 0; count < batch; ++count)
             operation();
     }
