@@ -16,6 +16,10 @@ double medianOf(std::vector<double> values) {
     return values.size() % 2 ? values[middle] : (values[middle - 1] + values[middle]) / 2;
 }
 
+double fastestOf(const std::vector<double>& values) {
+    return *std::min_element(values.begin(), values.end());
+}
+
 std::string formatted(const char* format, double value) {
     char text[64];
     std::snprintf(text, sizeof text, format, value);
@@ -29,7 +33,7 @@ std::string timeText(double nanoseconds) {
                              : formatted("%.2f ms", nanoseconds / 1e6);
 }
 
-using Cells = std::array<std::string, 6>;
+using Cells = std::array<std::string, 7>;
 
 void printCells(std::ostream& out, const std::vector<Cells>& rows) {
     std::array<std::size_t, std::tuple_size_v<Cells>> widths{};
@@ -79,17 +83,20 @@ std::vector<RatioTable::Line> RatioTable::lines() const {
         const auto work = repetitions.find(comparison.name + "/work");
         const auto limit = repetitions.find(comparison.name + "/limit");
         if (work != repetitions.end() && limit != repetitions.end())
-            result.push_back({&comparison, medianOf(work->second), medianOf(limit->second)});
+            result.push_back({&comparison, medianOf(work->second), medianOf(limit->second),
+                              fastestOf(work->second), fastestOf(limit->second)});
     }
     return result;
 }
 
 void RatioTable::print(std::ostream& out) const {
-    std::vector<Cells> rows{{"work", "limit", "median", "limit's median", "ratio", "reach"}};
+    std::vector<Cells> rows{
+        {"work", "limit", "median", "limit's median", "ratio", "of fastest", "reach"}};
     for (const Line& line : lines()) {
         const Comparison& comparison = *line.comparison;
         rows.push_back({comparison.work, comparison.limit, timeText(line.work),
                         timeText(line.limit), formatted("%.2f", line.ratio()),
+                        formatted("%.2f", line.fastestRatio()),
                         comparison.reach ? formatted("%.2f", *comparison.reach) : "-"});
     }
     printCells(out, rows);
@@ -106,7 +113,8 @@ void RatioTable::printJson(std::ostream& out) const {
             << line.comparison->work << "\", \"limit\": \"" << line.comparison->limit
             << "\", \"workNanoseconds\": " << formatted("%.3f", line.work)
             << ", \"limitNanoseconds\": " << formatted("%.3f", line.limit)
-            << ", \"ratio\": " << formatted("%.4f", line.ratio());
+            << ", \"ratio\": " << formatted("%.4f", line.ratio())
+            << ", \"ratioOfFastest\": " << formatted("%.4f", line.fastestRatio());
         if (line.comparison->reach)
             out << ", \"reach\": " << formatted("%.2f", *line.comparison->reach);
         out << '}';

@@ -46,7 +46,10 @@ class RatioTable {
         const Comparison* comparison;
         double work;
         double limit;
+        double fastestWork;
+        double fastestLimit;
         double ratio() const { return work / limit; }
+        double fastestRatio() const { return fastestWork / fastestLimit; }
     };
     std::vector<Line> lines() const;
 
