@@ -4,8 +4,8 @@
 using namespace Mz;
 using namespace Mz::Test;
 
-class Counted final
-    : public PlainDescriptionOver<QrCastRef<QrCastHeap<QrCastImpl<Counted, QrComponentDescription>>>> {
+class Counted final : public PlainDescriptionOver<
+                          QrCastRef<QrCastHeap<QrCastImpl<Counted, QrComponentDescription>>>> {
   public:
     Counted() : PlainDescriptionOver("counted", {{countedUid, L"counted"}}) {
         note("descriptionMade");

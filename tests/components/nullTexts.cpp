@@ -9,4 +9,5 @@ class Description final : public PlainDescription {
     const wchar_t* getComponentText() override { return nullptr; }
 };
 
-MZ_PLAIN_ENTRY_POINT(Description, "null texts", {{nullTextsUid, nullptr, nullptr, nullptr, 5, true}})
+MZ_PLAIN_ENTRY_POINT(Description, "null texts",
+                     {{nullTextsUid, nullptr, nullptr, nullptr, 5, true}})
