@@ -39,6 +39,7 @@ TEST(NormalisePath, KeepsRoots) {
     EXPECT_EQ(normalised(L"C:name"), L"c:name");
     EXPECT_EQ(normalised(L"\\\\Server\\Share\\Dir"), L"\\\\server\\share\\dir");
     EXPECT_EQ(normalised(L"\\\\server\\share"), L"\\\\server\\share");
+    EXPECT_EQ(normalised(L"\\\\server\\share\\"), L"\\\\server\\share\\");
     EXPECT_EQ(normalised(L"\\\\server\\share\\\\//x"), L"\\\\server\\share\\x");
     EXPECT_EQ(normalised(L"1:/a"), L"1:\\a"); // No drive, yet a name like any other.
 }
@@ -85,7 +86,7 @@ TEST(NormalisePath, InListModeTreatsEachEntryByItself) {
     EXPECT_EQ(normalisedList(L"A;;;B//C;"), L"a;b\\c");
     EXPECT_EQ(normalisedList(L"a/;..\\x;C:/B/"), L"a;..\\x;c:\\b");
     EXPECT_EQ(normalisedList(L"a/b/..;../c"), L"a\\b;..\\c");
-    EXPECT_EQ(normalisedList(L"\\\\S\\T\\;/"), L"\\\\s\\t;\\");
+    EXPECT_EQ(normalisedList(L"\\\\S\\T\\;/"), L"\\\\s\\t\\;\\");
 }
 
 /// The rules once more, slowly and step by step, on a list of names and separators.

@@ -1,6 +1,7 @@
 #include "tests/support/testSystem.h"
 
 #include <algorithm>
+#include <cstdlib>
 #include <fstream>
 #include <iterator>
 #include <windows.h>
@@ -48,7 +49,8 @@ std::filesystem::path hide(const std::filesystem::path& file) {
 }
 
 void setEnvironment(const std::string& name, const std::string& value) {
-    ::SetEnvironmentVariableW(widened(name).c_str(), widened(value).c_str());
+    // Both the system's and the C runtime's.
+    ::_wputenv((widened(name) + L"=" + widened(value)).c_str());
 }
 
 std::wstring searchPathOf(const std::filesystem::path& path) {
