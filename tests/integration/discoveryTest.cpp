@@ -40,7 +40,7 @@ class Discovery : public ManagerTest {
 TEST_F(Discovery, TakesEveryFileWhateverItsExtension) {
     folder.write("a.txt", "text");
     folder.write("b", "");
-    folder.write("c" + std::filesystem::path(MZ_LIBRARY_EXTENSION).string(), "no library");
+    folder.write(L"c" MZ_LIBRARY_EXTENSION, "no library");
     folder.write("d.x.y.z", "z");
     initialize();
     EXPECT_EQ(fileNames(),
@@ -117,9 +117,13 @@ TEST_F(Discovery, GoesThroughTheFoldersInTheirOrderAndSkipsEmptyEntries) {
     TemporaryDirectory second;
     std::filesystem::copy_file(builtComponent(L"goodByHand"), second.path() / "a");
     add(L"goodWithKit", "z");
-    const std::wstring path = L";;" + searchPathOf(folder.path()) + L";;;" +
-                              searchPathOf(folder.path() / "no such folder") + L";" +
-                              searchPathOf(second.path()) + L";";
+    std::wstring path = L";;";
+    path += searchPathOf(folder.path());
+    path += L";;;";
+    path += searchPathOf(folder.path() / "no such folder");
+    path += L";";
+    path += searchPathOf(second.path());
+    path += L";";
     manager->initialize(path.c_str());
     EXPECT_EQ(names(), (Names{L"kit", L"Name", L"name", L"third"}));
 }
@@ -132,34 +136,6 @@ TEST_F(Discovery, ScansAFolderOnceThatIsNamedTwice) {
     EXPECT_EQ(manager->libraries.size(), 1u);
     restart();
     EXPECT_FALSE(isMapped(file));
-}
-
-TEST_F(Discovery, KeepsTheFirstOfTwoRecordsOfOneNameInTheMap) {
-    folder.write("a", "1");
-    folder.write("b", "2");
-    ComponentManager::LibraryList found;
-    ComponentManager::LibraryMap byName;
-    manager->discover(searchPathOf(folder.path()).c_str(), found, byName);
-    ASSERT_EQ(found.size(), 2u);
-    EXPECT_EQ(byName.size(), 2u);
-    ComponentManager::LibraryList::iterator* a =
-        byName.find({found.front().directory, found.front().fileName});
-    ASSERT_TRUE(a);
-    EXPECT_EQ(&**a, &found.front());
-    EXPECT_EQ(found.front().fileName, L"a");
-    EXPECT_FALSE(found.front().module);
-    EXPECT_EQ(found.front().fileTime, 0u);
-    EXPECT_EQ(found.front().fileSize, 0);
-    // A second walk adds records, and leaves the map's entries as they are.
-    manager->discover(searchPathOf(folder.path()).c_str(), found, byName);
-    EXPECT_EQ(byName.size(), 2u);
-    EXPECT_EQ(&**byName.find({found.front().directory, L"a"}), &found.front());
-}
-
-TEST_F(Discovery, HashesARecordsNameByBothParts) {
-    const ComponentManager::LibraryKeyHash hash;
-    const std::hash<std::wstring> text;
-    EXPECT_EQ(hash({L"folder", L"file"}), text(L"folder") ^ text(L"file"));
 }
 
 TEST_F(Discovery, FindsNothingInAFileOrInNoFolder) {

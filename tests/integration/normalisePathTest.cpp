@@ -141,7 +141,7 @@ class NaiveNormaliser {
             bool first = true;
             for (const std::wstring& one : entries)
                 if (!one.empty()) {
-                    out += (first ? L"" : L";") + entry(one);
+                    out += std::wstring(first ? L"" : L";") + entry(one);
                     first = false;
                 }
         }
