@@ -55,22 +55,30 @@ class BuilderLister final : public QrEnumerator<QrCPtr<QrBuilderDescription>> {
     }
 };
 
-/// The shortest text that is read as that very number again, the same on every system.
-std::string numberText(float number) {
+/// With the fewest digits that are read as that very number again, the same on every system.
+void writeNumber(float number) {
     char text[32];
-    return {text, std::to_chars(text, text + sizeof text, number).ptr};
+    std::cout << std::string_view(text, std::to_chars(text, text + sizeof text, number).ptr);
 }
 
-std::string pointText(const Mesh::Point& point) {
-    return "(" + numberText(point.x) + ", " + numberText(point.y) + ", " + numberText(point.z) +
-           ")";
+void writePoint(const Mesh::Point& point) {
+    std::cout << '(';
+    writeNumber(point.x);
+    std::cout << ", ";
+    writeNumber(point.y);
+    std::cout << ", ";
+    writeNumber(point.z);
+    std::cout << ')';
 }
 
 void describe(const std::string& name, const Mesh& mesh) {
     const Mesh::Box box = mesh.bounds();
     std::cout << name << ": " << console::outputText(mesh.formatLabel()) << ", "
-              << mesh.vertexCount() << " vertices, " << mesh.faceCount() << " faces, box "
-              << pointText(box.low) << " to " << pointText(box.high) << std::endl;
+              << mesh.vertexCount() << " vertices, " << mesh.faceCount() << " faces, box ";
+    writePoint(box.low);
+    std::cout << " to ";
+    writePoint(box.high);
+    std::cout << std::endl;
 }
 
 bool importFile(const MeshImporter& importer, ConsoleController& controller,
