@@ -1,0 +1,69 @@
+#include "tests/unit/allocationFailure.h"
+
+#include "components/componentManager/exceptions.h"
+
+#include <cstdlib>
+#include <new>
+
+namespace {
+
+constexpr int unlimited = -1;
+constinit thread_local int allowedAllocations = unlimited;
+constinit thread_local bool refused = false;
+
+void* allocate(std::size_t size) {
+    if (allowedAllocations == 0) {
+        refused = true;
+        throw std::bad_alloc();
+    }
+    if (allowedAllocations > 0)
+        --allowedAllocations;
+    if (void* memory = std::malloc(size ? size : 1))
+        return memory;
+    throw std::bad_alloc();
+}
+
+} // namespace
+
+void* operator new(std::size_t size) {
+    return allocate(size);
+}
+void* operator new[](std::size_t size) {
+    return allocate(size);
+}
+void operator delete(void* memory) noexcept {
+    std::free(memory);
+}
+void operator delete[](void* memory) noexcept {
+    std::free(memory);
+}
+void operator delete(void* memory, std::size_t) noexcept {
+    std::free(memory);
+}
+void operator delete[](void* memory, std::size_t) noexcept {
+    std::free(memory);
+}
+
+namespace Mz::Test {
+
+FailingAllocations::FailingAllocations(int allowed) {
+    allowedAllocations = allowed;
+}
+
+FailingAllocations::~FailingAllocations() {
+    allowedAllocations = unlimited;
+}
+
+bool FailingAllocations::reachLibraries() {
+    refused = false;
+    try {
+        const FailingAllocations failing(0);
+        // Long enough for the library to have to allocate.
+        const QrStreamEx::ExRead exception("components/componentManager/allocationFailure", 1);
+    } catch (const std::bad_alloc&) {
+        return refused;
+    }
+    return false;
+}
+
+} // namespace Mz::Test

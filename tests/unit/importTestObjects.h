@@ -1,0 +1,130 @@
+/// Import builders that do what a test tells them, in the process's component manager.
+#pragma once
+
+#include "components/componentKit/componentKit.h"
+#include "components/componentManager/componentImpPrivate.h"
+#include "components/componentManager/importer.h"
+
+#include <functional>
+#include <memory>
+#include <string>
+#include <vector>
+
+namespace Mz::Test {
+
+/// What a test importer makes.
+class Imported : public QrCastable {
+  public:
+    using Self = Imported;
+    static constexpr QrUid uid{0x7D2E0001, 0x33B14C5A, 0x9A40C6D1, 0x20F7E8B3};
+    virtual const std::wstring& madeBy() const = 0;
+};
+
+class ImportedObject final : public QrCastRef<QrCastHeap<QrCastImpl<ImportedObject, Imported>>> {
+  public:
+    explicit ImportedObject(std::wstring maker) : maker(std::move(maker)) { ++alive; }
+    ~ImportedObject() override { --alive; }
+    const std::wstring& madeBy() const override { return maker; }
+
+    static inline int alive = 0;
+
+  private:
+    std::wstring maker;
+};
+
+/// Who made `object`, or an empty text for null.
+inline std::wstring makerOf(const QrRef<QrCastable>& object) {
+    const QrPtr<Imported> imported = queryCast<Imported>(object.get());
+    return imported ? imported->madeBy() : L"";
+}
+
+using Calls = std::vector<std::wstring>;
+
+/// Writes every question down and answers it as it was told.
+class TestImportBuilder final : public Kit::Builder<TestImportBuilder, QrImportBuilder> {
+  public:
+    TestImportBuilder(const Kit::BuilderInfo& info, std::vector<const wchar_t*> extensions,
+                      Calls& calls)
+        : Builder(info), extensions(std::move(extensions)), calls(calls) {}
+
+    using QrImportBuilder::canImport;
+    using QrImportBuilder::import;
+
+    QrEnum::Action enumerateExtensions(QrEnumerator<const wchar_t*>& e) const override {
+        calls.push_back(std::wstring(getLabel()) + L" extensions");
+        if (onExtensions)
+            return onExtensions(e);
+        for (const wchar_t* extension : extensions)
+            if (const QrEnum::Action action = e.process(extension))
+                return action;
+        return e.finished();
+    }
+
+    bool canImport(QrPtr<QrBufferedIO> io, const wchar_t* path,
+                   const wchar_t* hint) const override {
+        note(L"can", path, hint);
+        return onCanImport ? onCanImport(*io) : false;
+    }
+
+    QrRef<QrCastable> import(QrPtr<QrBufferedIO> io, const wchar_t* path,
+                             const wchar_t* hint) const override {
+        note(L"import", path, hint);
+        if (onImport && !onImport(*io))
+            return nullptr;
+        return QrPtr<ImportedObject>(new ImportedObject(getLabel()));
+    }
+
+    QrRef<QrCastable> createObject() override { return nullptr; }
+
+    std::function<QrEnum::Action(QrEnumerator<const wchar_t*>&)> onExtensions;
+    std::function<bool(QrBufferedIO&)> onCanImport;
+    std::function<bool(QrBufferedIO&)> onImport;
+
+  private:
+    void note(const wchar_t* what, const wchar_t* path, const wchar_t* hint) const {
+        calls.push_back(std::wstring(getLabel()) + L" " + what + L" [" + (path ? path : L"(null)") +
+                        L"] [" + (hint ? hint : L"(null)") + L"]");
+    }
+
+    std::vector<const wchar_t*> extensions;
+    Calls& calls;
+};
+
+/// A builder under an importer's name that imports nothing.
+class PlainBuilder final : public Kit::Builder<PlainBuilder> {
+  public:
+    using Builder::Builder;
+    QrRef<QrCastable> createObject() override { return nullptr; }
+};
+
+/// The builders of one library that was never a file, made known to the process's manager.
+class TestLibrary {
+  public:
+    TestLibrary();
+    ~TestLibrary();
+    TestLibrary(const TestLibrary&) = delete;
+    TestLibrary& operator=(const TestLibrary&) = delete;
+
+    /// The record of a builder whose object is `builder`, which may be null.
+    void add(const QrUid& uid, const wchar_t* name, const QrRef<QrCastable>& builder);
+
+    /// The manager of the process.
+    static ComponentManager& manager();
+
+  private:
+    ComponentManager::LibraryList::iterator library;
+};
+
+/// An importer for the builders named "test".
+class TestImporter : public QrCastImpl<TestImporter, QrBaseImporter> {
+  public:
+    const wchar_t* getBuilderName() const override { return name.c_str(); }
+    const wchar_t* getDefaultSearch() const override {
+        return defaultSearch.empty() ? nullptr : defaultSearch.c_str();
+    }
+
+    std::wstring name = L"test";
+    std::wstring defaultSearch;
+};
+
+} // namespace Mz::Test

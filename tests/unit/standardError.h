@@ -1,0 +1,44 @@
+/// What is written to the standard error stream.
+#pragma once
+
+#include <iostream>
+#include <streambuf>
+#include <string>
+
+namespace Mz::Test {
+
+/// While it lives, `std::cerr` writes here. The stream's habit of flushing after every insertion is
+/// switched off, so that the flushes which the tested code asks for can be counted.
+class StandardErrorCapture : private std::streambuf {
+  public:
+    StandardErrorCapture() : previous(std::cerr.rdbuf(this)), flags(std::cerr.flags()) {
+        std::cerr.unsetf(std::ios::unitbuf);
+    }
+    ~StandardErrorCapture() override {
+        std::cerr.flags(flags);
+        std::cerr.rdbuf(previous);
+    }
+    StandardErrorCapture(const StandardErrorCapture&) = delete;
+    StandardErrorCapture& operator=(const StandardErrorCapture&) = delete;
+
+    const std::string& text() const { return written; }
+    int flushes() const { return flushCount; }
+
+  private:
+    int_type overflow(int_type byte) override {
+        if (!traits_type::eq_int_type(byte, traits_type::eof()))
+            written += traits_type::to_char_type(byte);
+        return traits_type::not_eof(byte);
+    }
+    int sync() override {
+        ++flushCount;
+        return 0;
+    }
+
+    std::streambuf* previous;
+    std::ios::fmtflags flags;
+    std::string written;
+    int flushCount = 0;
+};
+
+} // namespace Mz::Test

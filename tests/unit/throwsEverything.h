@@ -1,0 +1,9 @@
+/// A library that throws each exception there is.
+#pragma once
+
+namespace Mz::Test {
+
+using ThrowFunction = void(int which);
+inline constexpr const char* throwFunctionName = "throwException";
+
+} // namespace Mz::Test
