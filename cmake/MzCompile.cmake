@@ -42,7 +42,8 @@ function(mz_add_library name macro)
   target_compile_definitions(${name} PRIVATE ${macro})
   target_include_directories(${name} PUBLIC
     $<BUILD_INTERFACE:${PROJECT_SOURCE_DIR}> $<INSTALL_INTERFACE:include>)
-  set_target_properties(${name} PROPERTIES PREFIX lib)
+  # The libraries of the family find one another wherever they are installed together.
+  set_target_properties(${name} PROPERTIES PREFIX lib INSTALL_RPATH "$ORIGIN")
   if(WIN32)
     # Programs find a library beside themselves; it is wanted in lib as well, as on every platform.
     set_target_properties(${name} PROPERTIES RUNTIME_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/lib)
@@ -50,4 +51,15 @@ function(mz_add_library name macro)
       COMMAND ${CMAKE_COMMAND} -E make_directory ${CMAKE_BINARY_DIR}/bin
       COMMAND ${CMAKE_COMMAND} -E copy_if_different $<TARGET_FILE:${name}> ${CMAKE_BINARY_DIR}/bin)
   endif()
+endfunction()
+
+# mz_public_headers(NAME headers...): what is installed with a library.
+function(mz_public_headers name)
+  get_target_property(type ${name} TYPE)
+  set(scope PUBLIC)
+  if(type STREQUAL "INTERFACE_LIBRARY")
+    set(scope INTERFACE)
+  endif()
+  list(TRANSFORM ARGN PREPEND ${CMAKE_CURRENT_SOURCE_DIR}/)
+  target_sources(${name} ${scope} FILE_SET HEADERS BASE_DIRS ${PROJECT_SOURCE_DIR} FILES ${ARGN})
 endfunction()

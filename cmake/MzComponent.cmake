@@ -1,14 +1,23 @@
-# mz_add_component(NAME sources...): a component library, found by scanning the folder it stands in.
+# mz_add_component(NAME [FOLDER folder] sources...): a component library, which hosts find by
+# scanning the folder it stands in; by default that is components/ in the build folder.
 #
 # On every platform its file is NAME plus the platform's extension, without a prefix, so that a
 # folder of components reads, and sorts, the same everywhere.
 include_guard()
 
 function(mz_add_component name)
-  add_library(${name} MODULE ${ARGN})
+  cmake_parse_arguments(PARSE_ARGV 1 arg "" "FOLDER" "")
+  if(NOT arg_FOLDER)
+    set(arg_FOLDER ${CMAKE_BINARY_DIR}/components)
+  endif()
+  add_library(${name} MODULE ${arg_UNPARSED_ARGUMENTS})
   target_link_libraries(${name} PRIVATE Mz::MZcomponentManager)
-  set_target_properties(${name} PROPERTIES PREFIX "" CXX_VISIBILITY_PRESET hidden
-    VISIBILITY_INLINES_HIDDEN ON)
+  set_target_properties(${name} PROPERTIES
+    PREFIX ""
+    CXX_VISIBILITY_PRESET hidden
+    VISIBILITY_INLINES_HIDDEN ON
+    LIBRARY_OUTPUT_DIRECTORY ${arg_FOLDER}
+    RUNTIME_OUTPUT_DIRECTORY ${arg_FOLDER})
   if(CMAKE_CXX_COMPILER_ID STREQUAL "GNU")
     # A library that defines a unique symbol can never be unmapped.
     target_compile_options(${name} PRIVATE -fno-gnu-unique)

@@ -40,7 +40,7 @@ function(mz_add_tests name)
 endfunction()
 
 function(mz_discover_tests name)
-  gtest_discover_tests(${name} TEST_PREFIX "${MZ_BUILD_NAME}/" DISCOVERY_MODE PRE_TEST
+  gtest_discover_tests(${name} TEST_PREFIX "${MZ_BUILD_NAME}/"
     DISCOVERY_TIMEOUT 120 PROPERTIES TIMEOUT 120)
 endfunction()
 

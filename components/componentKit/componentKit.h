@@ -95,6 +95,22 @@ class ImportBuilder : public Builder<Impl, QrImportBuilder> {
     std::vector<const wchar_t*> extensions;
 };
 
+/// The end of a chain of casts (`QrCastImpl2`) for an object whose interface derives from another
+/// one, `Base`, for which it answers as well:
+///
+///     class MyImporter : public QrCastRef<QrCastHeap<QrCastImpl2<
+///         MyImporter, IMyImporter, Kit::BaseInterface<MyImporter, QrImporter>>>>
+template <class Impl, class Base>
+class BaseInterface {
+  public:
+    static QrCastable* getInterface(Impl* object, const QrUid& uid) {
+        static_assert(QrInterface<Base>, "the base has its own uid and Self");
+        return uid == Base::uid ? QrPtr<Base>(object).detach() : nullptr;
+    }
+
+    static bool hasInterface(const Impl*, const QrUid& uid) { return uid == Base::uid; }
+};
+
 /// A new reference to an object of class `T`, which answers for `QrBuilderDescription`.
 template <class T, class... Args>
 QrPtr<QrBuilderDescription> builder(Args&&... args) {

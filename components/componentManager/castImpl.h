@@ -3,8 +3,8 @@
 /// Pick by two questions, which interfaces and who owns the object:
 ///
 ///     class Gauge : public QrCastImpl<Gauge, IGauge>                            // static or local
-///     class Mesh  : public QrCastRef<QrCastHeap<QrCastImpl<Mesh, IMesh>>>       // counted, on heap
-///     class Both  : public QrCastRef<QrCastHeap<QrCastMulti<Both, IMesh, IShape>>>
+///     class Mesh  : public QrCastRef<QrCastHeap<QrCastImpl<Mesh, IMesh>>>       // counted, on
+///     heap class Both  : public QrCastRef<QrCastHeap<QrCastMulti<Both, IMesh, IShape>>>
 ///
 /// The parameter `Arg` of these templates is a tag that only keeps instances of different classes
 /// apart; leave it at its default.
@@ -13,9 +13,20 @@
 #include "components/componentManager/castable.h"
 #include "components/resmgt/lkCounter.h"
 
+#include <type_traits>
 #include <utility>
 
 namespace Mz {
+
+/// Calls the object's own `newReference`. Where its class is final this is no virtual call, and
+/// where that class inherits the root's, which does nothing, it is none at all.
+template <class Impl>
+void takeReference(Impl* object) {
+    using RootOperation = decltype(&QrCastable::newReference);
+    constexpr bool isRoots = std::is_same_v<decltype(&Impl::newReference), RootOperation>;
+    if constexpr (!std::is_final_v<Impl> || !isRoots)
+        object->newReference();
+}
 
 /// An object that answers for one interface, is not counted and ignores `destroy`.
 ///
@@ -31,7 +42,7 @@ class QrCastImpl : public Iface {
 
     QrCastable* getInterface(const QrUid& uid) override {
         if (uid == Iface::uid) {
-            this->newReference();
+            takeReference(static_cast<Impl*>(this));
             return this;
         }
         if constexpr (continuesChain)
@@ -111,7 +122,7 @@ class QrCastMulti : public First, public Rest... {
         QrCastable* view = nullptr;
         static_cast<void>(viewAs<First>(uid, view) || (viewAs<Rest>(uid, view) || ...));
         if (view)
-            this->newReference();
+            takeReference(static_cast<Impl*>(this));
         return view;
     }
 

@@ -62,8 +62,16 @@ class MZ_COMPONENT_MANAGER_API QrCastable {
 /// An interface that names itself, and so is what its `uid` says.
 template <class T>
 concept QrInterface = std::is_same_v<T, typename T::Self> &&
-                      std::is_same_v<decltype(T::uid), const QrUid> &&
-                      std::is_base_of_v<QrCastable, T>;
+    std::is_same_v<decltype(T::uid), const QrUid> && std::is_base_of_v<QrCastable, T>;
+
+/// What `object`, or else the first of its translators that accepts `uid`, answers; null when none
+/// does. For the casts below.
+inline QrCastable* findInterface(QrCastable* object, const QrUid& uid) {
+    QrCastable* found = object->getInterface(uid);
+    if (translationsExist.load(std::memory_order_relaxed) && !found) [[unlikely]]
+        found = QrTranslateInterface(object, uid);
+    return found;
+}
 
 /// `object` as the interface `T`, or null: asks the object itself, then its translators. A null
 /// `object` gives null.
@@ -72,10 +80,7 @@ QrPtr<T> queryCast(QrCastable* object) {
     static_assert(QrInterface<T>, "cast to an interface that has its own uid and Self");
     if (!object)
         return nullptr;
-    QrCastable* found = object->getInterface(T::uid);
-    if (!found)
-        found = QrTranslateInterface(object, T::uid);
-    return QrPtr<T>::adopt(static_cast<T*>(found));
+    return QrPtr<T>::adopt(static_cast<T*>(findInterface(object, T::uid)));
 }
 
 /// `object` as the interface `T`: asks the object itself, then its translators.
@@ -92,9 +97,7 @@ T* safeCast(QrCastable* object) {
     static_assert(QrInterface<T>, "cast to an interface that has its own uid and Self");
     if (!object)
         QrCastable::throwBadCast();
-    QrCastable* found = object->getInterface(T::uid);
-    if (!found)
-        found = QrTranslateInterface(object, T::uid);
+    QrCastable* found = findInterface(object, T::uid);
     if (!found)
         QrCastable::throwBadCast();
     return static_cast<T*>(found);

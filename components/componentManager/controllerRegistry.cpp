@@ -56,9 +56,15 @@ QrProcessControl* lookUp() {
 }
 
 QrProcessControl* threadController() {
-    if (remembered.generation == generation.load(std::memory_order_acquire))
+    if (remembered.generation == generation.load(std::memory_order_acquire)) [[likely]]
         return remembered.controller;
     return lookUp();
+}
+
+/// Apart from its caller, which then needs no frame.
+[[gnu::noinline]] QrProcessControl* lookUpAny() {
+    QrProcessControl* controller = lookUp();
+    return controller ? controller : systemController.load(std::memory_order_acquire);
 }
 
 } // namespace
@@ -68,8 +74,10 @@ QrProcessControl* threadController() {
 using namespace Mz;
 
 QrProcessControl* QrGetProcessController() {
-    QrProcessControl* controller = threadController();
-    return controller ? controller : QrGetSystemProcessController();
+    if (remembered.generation != generation.load(std::memory_order_acquire)) [[unlikely]]
+        return lookUpAny();
+    QrProcessControl* controller = remembered.controller;
+    return controller ? controller : systemController.load(std::memory_order_acquire);
 }
 
 QrProcessControl* QrGetSystemProcessController() {

@@ -4,6 +4,7 @@
 #include "components/componentManager/hashMap.h"
 #include "components/componentManager/neverDestroyed.h"
 
+#include <atomic>
 #include <cstddef>
 #include <cstdint>
 #include <vector>
@@ -29,6 +30,8 @@ constinit NeverDestroyed<HashMap<QrCastable*, std::vector<Translation>, AddressH
 
 } // namespace
 
+constinit std::atomic<bool> translationsExist{false};
+
 } // namespace Mz
 
 using namespace Mz;
@@ -48,8 +51,10 @@ QrCastable* QrTranslateInterface(QrCastable* object, const QrUid& uid) {
 
 void QrAddTranslation(QrCastable* object, QrCastable* translator,
                       bool (*accepts)(const QrUid& uid)) {
-    if (object && translator && accepts)
-        registry.value[object].push_back({translator, accepts});
+    if (!object || !translator || !accepts)
+        return;
+    registry.value[object].push_back({translator, accepts});
+    translationsExist.store(true, std::memory_order_relaxed);
 }
 
 void QrRemoveTranslation(QrCastable* object, QrCastable* translator) {

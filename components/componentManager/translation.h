@@ -17,9 +17,17 @@
 #include "components/base/export.h"
 #include "components/componentManager/uid.h"
 
+#include <atomic>
+
 namespace Mz {
+
 class QrCastable;
-}
+
+/// Whether any translation was ever added in this process. Only the registry writes it; it spares
+/// casts the call where there is nothing to ask, which is nearly always.
+extern MZ_COMPONENT_MANAGER_API std::atomic<bool> translationsExist;
+
+} // namespace Mz
 
 extern "C" {
 

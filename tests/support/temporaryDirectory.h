@@ -35,8 +35,8 @@ class TemporaryDirectory {
     /// Writes a file and returns its path.
     std::filesystem::path write(const std::filesystem::path& name, std::string_view content) const {
         const std::filesystem::path file = root / name;
-        std::ofstream(file, std::ios::binary).write(content.data(),
-                                                    static_cast<std::streamsize>(content.size()));
+        std::ofstream(file, std::ios::binary)
+            .write(content.data(), static_cast<std::streamsize>(content.size()));
         return file;
     }
 

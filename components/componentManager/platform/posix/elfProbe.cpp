@@ -21,8 +21,9 @@ constexpr std::size_t maximumSegments = 1024;
 constexpr std::size_t maximumDynamicEntries = 4096;
 constexpr std::size_t maximumChainLength = 4096;
 
-/// Reads pieces of a file through one remembered block: the tables of a small library lie close
-/// together, so most pieces cost no system call.
+/// Reads pieces of a file through two remembered blocks: a library's symbol tables stand at its
+/// beginning as a rule, and the list of its tables near its end, so that most pieces cost no system
+/// call.
 class FileBlocks {
   public:
     explicit FileBlocks(int descriptor) : descriptor(descriptor) {}
@@ -37,40 +38,59 @@ class FileBlocks {
         return value;
     }
 
+    /// False when the file ends before it has `size` bytes more. No piece is larger than a block.
     bool read(std::uint64_t offset, void* data, std::size_t size) {
-        if (!contains(offset, size) && (!load(offset) || !contains(offset, size)))
-            return false;
-        std::memcpy(data, block.data() + (offset - blockOffset), size);
+        Block* block = blockWith(offset, size);
+        if (!block) {
+            block = &blocks[older];
+            load(*block, offset, size);
+            if (!block->contains(offset, size))
+                return false;
+        }
+        older = block == &blocks[0] ? 1 : 0;
+        std::memcpy(data, block->bytes.data() + (offset - block->offset), size);
         return true;
     }
 
   private:
-    bool contains(std::uint64_t offset, std::size_t size) const {
-        return offset >= blockOffset && offset - blockOffset <= blockSize &&
-               size <= blockSize - (offset - blockOffset);
+    struct Block {
+        std::uint64_t offset = 0;
+        std::size_t size = 0;
+        std::array<char, 4096> bytes;
+
+        bool contains(std::uint64_t wanted, std::size_t length) const {
+            return wanted >= offset && wanted - offset <= size &&
+                   length <= size - (wanted - offset);
+        }
+    };
+
+    Block* blockWith(std::uint64_t offset, std::size_t size) {
+        for (Block& block : blocks)
+            if (block.contains(offset, size))
+                return &block;
+        return nullptr;
     }
 
-    bool load(std::uint64_t offset) {
-        blockSize = 0;
-        if (offset > static_cast<std::uint64_t>(INT64_MAX) - block.size())
-            return false;
-        blockOffset = offset;
-        while (blockSize < block.size()) {
-            const ssize_t got = ::pread(descriptor, block.data() + blockSize,
-                                        block.size() - blockSize,
-                                        static_cast<off_t>(offset + blockSize));
+    /// Fills the block from `offset` on, with `needed` bytes at least unless the file ends before.
+    void load(Block& block, std::uint64_t offset, std::size_t needed) {
+        block.size = 0;
+        block.offset = offset;
+        if (offset > static_cast<std::uint64_t>(INT64_MAX) - block.bytes.size())
+            return;
+        while (block.size < needed) {
+            const ssize_t got =
+                ::pread(descriptor, block.bytes.data() + block.size,
+                        block.bytes.size() - block.size, static_cast<off_t>(offset + block.size));
             if (got > 0)
-                blockSize += static_cast<std::size_t>(got);
+                block.size += static_cast<std::size_t>(got);
             else if (got == 0 || errno != EINTR)
                 break;
         }
-        return blockSize > 0;
     }
 
     int descriptor;
-    std::uint64_t blockOffset = 0;
-    std::size_t blockSize = 0;
-    std::array<char, 8192> block;
+    std::array<Block, 2> blocks;
+    std::size_t older = 0; ///< the block to fill next
 };
 
 /// Where the tables for symbol lookup stand, as addresses in the loaded library.
@@ -101,7 +121,8 @@ class ElfLibrary {
             header->e_phentsize != sizeof(Elf64_Phdr) || header->e_phnum > maximumSegments)
             return false;
         for (std::size_t index = 0; index < header->e_phnum; ++index) {
-            const auto segment = file.read<Elf64_Phdr>(header->e_phoff + index * sizeof(Elf64_Phdr));
+            const auto segment =
+                file.read<Elf64_Phdr>(header->e_phoff + index * sizeof(Elf64_Phdr));
             if (!segment)
                 return false;
             if (segment->p_type == PT_LOAD)
@@ -113,8 +134,8 @@ class ElfLibrary {
     }
 
     bool readDynamicTables() {
-        const std::size_t count = std::min<std::uint64_t>(dynamic->p_filesz / sizeof(Elf64_Dyn),
-                                                          maximumDynamicEntries);
+        const std::size_t count =
+            std::min<std::uint64_t>(dynamic->p_filesz / sizeof(Elf64_Dyn), maximumDynamicEntries);
         for (std::size_t index = 0; index < count; ++index) {
             const auto entry = file.read<Elf64_Dyn>(dynamic->p_offset + index * sizeof(Elf64_Dyn));
             if (!entry)
@@ -128,12 +149,23 @@ class ElfLibrary {
 
     void note(const Elf64_Dyn& entry) {
         switch (entry.d_tag) {
-        case DT_SYMTAB: tables.symbols = entry.d_un.d_ptr; break;
-        case DT_STRTAB: tables.strings = entry.d_un.d_ptr; break;
-        case DT_STRSZ: tables.stringsSize = entry.d_un.d_val; break;
-        case DT_GNU_HASH: tables.gnuHash = entry.d_un.d_ptr; break;
-        case DT_HASH: tables.hash = entry.d_un.d_ptr; break;
-        default: break;
+        case DT_SYMTAB:
+            tables.symbols = entry.d_un.d_ptr;
+            break;
+        case DT_STRTAB:
+            tables.strings = entry.d_un.d_ptr;
+            break;
+        case DT_STRSZ:
+            tables.stringsSize = entry.d_un.d_val;
+            break;
+        case DT_GNU_HASH:
+            tables.gnuHash = entry.d_un.d_ptr;
+            break;
+        case DT_HASH:
+            tables.hash = entry.d_un.d_ptr;
+            break;
+        default:
+            break;
         }
     }
 
@@ -170,7 +202,8 @@ class ElfLibrary {
 
         const std::uint64_t bloom = tables.gnuHash + sizeof(Header);
         const auto word = readAt<std::uint64_t>(bloom + (hash / 64 % header->bloomCount) * 8ull);
-        if (!word || !(*word >> (hash % 64) & *word >> (hash >> (header->bloomShift % 32) & 63) & 1))
+        if (!word ||
+            !(*word >> (hash % 64) & *word >> (hash >> (header->bloomShift % 32) & 63) & 1))
             return false;
 
         const std::uint64_t buckets = bloom + header->bloomCount * 8ull;

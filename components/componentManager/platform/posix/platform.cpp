@@ -53,12 +53,42 @@ std::optional<FileIdentity> regularFile(DIR* directory, const dirent& entry) {
     return FileIdentity{status.st_dev, status.st_ino};
 }
 
-/// By normalised name, so that the order is that of a system without letter case; names that differ
-/// in case only by their bytes.
-bool comesBefore(const DirectoryEntry& a, const DirectoryEntry& b) {
-    const std::wstring lowerA = lowerCase(a.name);
-    const std::wstring lowerB = lowerCase(b.name);
-    return lowerA != lowerB ? lowerA < lowerB : a.path.native() < b.path.native();
+/// Sorts by normalised name, so that the order is that of a system without letter case; names that
+/// differ in case only by their bytes.
+void sortByName(std::vector<DirectoryEntry>& entries) {
+    struct Keyed {
+        std::wstring key;
+        DirectoryEntry* entry;
+    };
+    std::vector<Keyed> keyed;
+    keyed.reserve(entries.size());
+    for (DirectoryEntry& entry : entries)
+        keyed.push_back({lowerCase(entry.name), &entry});
+    std::sort(keyed.begin(), keyed.end(), [](const Keyed& a, const Keyed& b) {
+        const int order = a.key.compare(b.key);
+        return order ? order < 0 : a.entry->path.native() < b.entry->path.native();
+    });
+    std::vector<DirectoryEntry> sorted;
+    sorted.reserve(entries.size());
+    for (const Keyed& next : keyed)
+        sorted.push_back(std::move(*next.entry));
+    entries.swap(sorted);
+}
+
+/// Whether the address lies in that very library.
+bool isIn(Module module, void* address) {
+    link_map* wanted = nullptr;
+    if (::dlinfo(module, RTLD_DI_LINKMAP, &wanted) != 0)
+        return false;
+#if __GLIBC_PREREQ(2, 35)
+    // Finds the library at once, where the other way goes through all that are loaded.
+    dl_find_object owner;
+    return ::_dl_find_object(address, &owner) == 0 && owner.dlfo_link_map == wanted;
+#else
+    void* owner = nullptr;
+    Dl_info ignored;
+    return ::dladdr1(address, &ignored, &owner, RTLD_DL_LINKMAP) != 0 && owner == wanted;
+#endif
 }
 
 } // namespace
@@ -109,9 +139,10 @@ std::vector<DirectoryEntry> listCandidates(const NativePath& directory) {
             continue;
         std::optional<std::wstring> name = toCharacters(entry->d_name);
         if (name)
-            entries.push_back({std::move(*name), directory.native() + "/" + entry->d_name, identity});
+            entries.push_back(
+                {std::move(*name), directory.native() + "/" + entry->d_name, identity});
     }
-    std::sort(entries.begin(), entries.end(), comesBefore);
+    sortByName(entries);
     return entries;
 }
 
@@ -156,13 +187,7 @@ void* findSymbol(Module module, const char* symbol) {
     if (!address)
         return nullptr;
     // The search goes through the dependencies as well, whose symbols do not count.
-    link_map* wanted = nullptr;
-    void* owner = nullptr;
-    Dl_info ignored;
-    if (::dlinfo(module, RTLD_DI_LINKMAP, &wanted) != 0 ||
-        ::dladdr1(address, &ignored, &owner, RTLD_DL_LINKMAP) == 0)
-        return nullptr;
-    return owner == wanted ? address : nullptr;
+    return isIn(module, address) ? address : nullptr;
 }
 
 QuietErrors::QuietErrors() : previousMode(0) {}

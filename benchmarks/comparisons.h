@@ -1,0 +1,13 @@
+/// The comparisons, by subject. Each function adds its lines to the table.
+#pragma once
+
+#include "ratioTable.h"
+
+namespace Mz::Benchmarks {
+
+void addCastComparisons(RatioTable& table);
+void addCreateComparisons(RatioTable& table);
+void addStartComparisons(RatioTable& table);
+void addControllerComparisons(RatioTable& table);
+
+} // namespace Mz::Benchmarks

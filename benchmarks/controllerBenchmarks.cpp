@@ -1,0 +1,37 @@
+#include "comparisons.h"
+#include "measure.h"
+#include "peer.h"
+
+#include "components/componentManager/processControl.h"
+
+namespace Mz::Benchmarks {
+
+namespace {
+
+void getController(benchmark::State& state) {
+    repeat(state, [] { opaque(QrGetProcessController()); });
+}
+
+void getOwnController(benchmark::State& state) {
+    // Any controller will do; nothing is asked of it.
+    QrSetThreadProcessController(QrGetSystemProcessController());
+    getController(state);
+    QrSetThreadProcessController(nullptr);
+}
+
+void callLibrary(benchmark::State& state) {
+    repeat(state, [] { opaque(trivialCall()); });
+}
+
+} // namespace
+
+void addControllerComparisons(RatioTable& table) {
+    table.add(
+        {"controller/own", "QrGetProcessController, the thread's own", "one library call", 1.3},
+        getOwnController, callLibrary);
+    table.add({"controller/system", "QrGetProcessController, system-wide", "one library call",
+               std::nullopt},
+              getController, callLibrary);
+}
+
+} // namespace Mz::Benchmarks

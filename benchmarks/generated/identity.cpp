@@ -1,0 +1,7 @@
+#include "identity.h"
+
+namespace Mz::Benchmarks {
+
+const QrUid ownUid = identityMark;
+
+} // namespace Mz::Benchmarks

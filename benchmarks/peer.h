@@ -1,0 +1,72 @@
+/// The other side of a library's border: objects made elsewhere, of which the measuring program
+/// knows the interface only. Nothing here can be inlined or resolved at compile time.
+#pragma once
+
+#include "components/base/export.h"
+#include "components/componentManager/cast.h"
+
+#include <memory>
+
+namespace Mz::Benchmarks {
+
+/// The interface that the cast benchmarks ask for.
+class Gauge : public QrCastable {
+  public:
+    using Self = Gauge;
+    static constexpr QrUid uid{0x7B3C1E01, 0x53A011EF, 0x8D4E20C9, 0x6F10B277};
+
+    virtual long value() const = 0;
+};
+
+/// An interface that no object here has.
+class Absent : public QrCastable {
+  public:
+    using Self = Absent;
+    static constexpr QrUid uid{0x7B3C1E02, 0x53A011EF, 0x8D4E20C9, 0x6F10B277};
+};
+
+/// The limit of every cast: virtual calls and nothing else.
+class Calls {
+  public:
+    virtual ~Calls() = default;
+    virtual long first() = 0;
+    virtual long second() = 0;
+    virtual long third() = 0;
+};
+
+/// The standard library's way: a root, an interface under it, and shared ownership.
+class MZ_SHARED_TYPE SharedRoot {
+  public:
+    virtual ~SharedRoot();
+};
+
+class MZ_SHARED_TYPE SharedGauge : public SharedRoot {
+  public:
+    ~SharedGauge() override;
+    virtual long value() const = 0;
+};
+
+/// The limit of `createObject`.
+class Product {
+  public:
+    virtual ~Product() = default;
+    virtual long value() const = 0;
+};
+
+class Factory {
+  public:
+    virtual ~Factory() = default;
+    /// A new object, which the caller deletes.
+    virtual Product* make() = 0;
+};
+
+MZ_EXPORT QrCastable* uncountedGauge();
+/// A new object without a reference.
+MZ_EXPORT QrCastable* newCountedGauge();
+MZ_EXPORT Calls* calls();
+MZ_EXPORT std::shared_ptr<SharedRoot> newSharedGauge();
+MZ_EXPORT Factory* factory();
+/// One call into a library.
+MZ_EXPORT void* trivialCall();
+
+} // namespace Mz::Benchmarks

@@ -1,0 +1,78 @@
+#include "comparisons.h"
+#include "freshProcess.h"
+#include "libraryFolder.h"
+
+#include <exception>
+#include <memory>
+#include <string>
+#include <utility>
+
+namespace Mz::Benchmarks {
+
+namespace {
+
+/// A folder that is made when the first benchmark wants it, and shared by all that do.
+class LazyFolder {
+  public:
+    LazyFolder(std::string libraryFile, unsigned int libraryCount)
+        : library(std::move(libraryFile)), count(libraryCount) {}
+
+    const std::filesystem::path& path() {
+        if (!folder) {
+            folder = std::make_unique<LibraryFolder>(library, count);
+            // Not measured: brings every file into the page cache.
+            inFreshProcess("initialize", folder->path());
+        }
+        return folder->path();
+    }
+
+  private:
+    std::string library;
+    unsigned int count;
+    std::unique_ptr<LibraryFolder> folder;
+};
+
+/// A benchmark of `work` in fresh processes, which must find `expected` libraries each time.
+RatioTable::Body freshly(std::string work, std::shared_ptr<LazyFolder> folder, long expected) {
+    return [=](benchmark::State& state) {
+        for (auto iteration : state) {
+            static_cast<void>(iteration);
+            try {
+                const FreshResult result = inFreshProcess(work, folder->path());
+                state.SetIterationTime(result.seconds);
+                if (result.count != expected)
+                    state.SkipWithError((work + " found " + std::to_string(result.count) + " of " +
+                                         std::to_string(expected))
+                                            .c_str());
+            } catch (const std::exception& failure) {
+                state.SkipWithError(failure.what());
+            }
+        }
+    };
+}
+
+void addFirstStart(RatioTable& table, unsigned int count, const std::string& countText) {
+    const auto folder = std::make_shared<LazyFolder>(MZ_BENCHMARK_COMPONENT, count);
+    table.addSelfTimed({"start/first" + std::to_string(count),
+                        "first start, " + countText + " libraries",
+                        "dlopen, dlsym and call, libraries kept", 1.12},
+                       freshly("initialize", folder, count), freshly("load", folder, count));
+}
+
+} // namespace
+
+void addStartComparisons(RatioTable& table) {
+    addFirstStart(table, 100, "100");
+    addFirstStart(table, 1000, "1,000");
+
+    const auto bystanders = std::make_shared<LazyFolder>(MZ_BENCHMARK_BYSTANDER, 1000);
+    table.addSelfTimed({"start/bystanders", "1,000 candidates without the entry point",
+                        "list, status, one read of the symbol table", 1.1},
+                       freshly("initialize", bystanders, 0),
+                       freshly("readTables", bystanders, 1000));
+
+    // A start with a recorded list goes here: a work `initializeRecorded` of `start.cpp`, and as
+    // its limit one that lists the folder, asks for each status, reads the list and fills a map.
+}
+
+} // namespace Mz::Benchmarks

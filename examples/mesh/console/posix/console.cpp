@@ -1,0 +1,29 @@
+#include "../console.h"
+
+namespace Meshes::console {
+
+void useBinaryOutput() {}
+
+std::vector<std::filesystem::path> arguments(int argc, char** argv) {
+    return {argv + (argc > 0 ? 1 : 0), argv + argc};
+}
+
+std::filesystem::path programFolder() {
+    return std::filesystem::read_symlink("/proc/self/exe").parent_path();
+}
+
+std::wstring wideName(const std::filesystem::path& path) {
+    std::wstring result;
+    for (const char byte : path.native())
+        result.push_back(static_cast<unsigned char>(byte));
+    return result;
+}
+
+std::string outputText(std::wstring_view text) {
+    std::string result;
+    for (const wchar_t character : text)
+        result.push_back(static_cast<char>(character));
+    return result;
+}
+
+} // namespace Meshes::console

@@ -1,0 +1,6 @@
+/// The library that `missesDependency` cannot find.
+#include "components/base/export.h"
+
+extern "C" MZ_EXPORT int absentFunction() {
+    return 1;
+}

@@ -1,0 +1,20 @@
+/// One of two versions of a library, MZ_TEST_VERSION; the second has another builder besides.
+#include "tests/components/testUids.h"
+
+using namespace Mz::Test;
+
+static std::vector<PlainInfo> versionsBuilders() {
+    if (MZ_TEST_VERSION == 1)
+        return {{changingUid, L"version one"}};
+    return {{changingUid, L"version two"}, {changingSecondUid, L"new in two"}};
+}
+
+class Description final : public PlainDescription {
+  public:
+    Description() : PlainDescription("changing", versionsBuilders()) {}
+    const wchar_t* getComponentLabel() override {
+        return MZ_TEST_VERSION == 1 ? L"Label one" : L"Label two";
+    }
+};
+
+MZ_PLAIN_ENTRY_POINT(Description)

@@ -1,0 +1,7 @@
+/// Two builders with one identifier.
+#include "tests/components/testUids.h"
+
+using namespace Mz::Test;
+
+MZ_PLAIN_ENTRY_POINT(PlainDescription, "duplicate",
+                     {{duplicateUid, L"first"}, {duplicateUid, L"second"}})

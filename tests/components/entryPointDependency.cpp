@@ -1,0 +1,8 @@
+/// Exports the entry point for `entryPointInDependency`, which does not.
+#include "tests/components/testUids.h"
+
+MZ_PLAIN_ENTRY_POINT(Mz::Test::PlainDescription, "dependency", {{Mz::Test::faultyUid, L"faulty"}})
+
+extern "C" MZ_EXPORT int dependencyIsNeeded() {
+    return 1;
+}

@@ -1,0 +1,8 @@
+/// Exports no entry point, but needs a library that does.
+#include "components/base/export.h"
+
+extern "C" MZ_IMPORT int dependencyIsNeeded();
+
+extern "C" MZ_EXPORT int needsDependency() {
+    return dependencyIsNeeded();
+}

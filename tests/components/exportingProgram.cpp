@@ -1,0 +1,10 @@
+/// A program that exports the entry point. It is no library for all that.
+#include "components/base/export.h"
+
+extern "C" MZ_EXPORT void* QrGetComponentDescription() {
+    return nullptr;
+}
+
+int main() {
+    return QrGetComponentDescription() ? 1 : 0;
+}

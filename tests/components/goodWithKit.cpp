@@ -1,0 +1,12 @@
+#include "components/componentKit/componentKit.h"
+#include "tests/components/testUids.h"
+
+using namespace Mz;
+
+class KitObject final : public QrCastRef<QrCastHeap<QrCastImpl<KitObject, Test::PlainObject>>> {
+  public:
+    const char* maker() const override { return "kit"; }
+};
+
+MZ_COMPONENT(L"Kit label", L"Kit text",
+             Kit::builderOf<KitObject>({.uid = Test::kitUid, .name = L"kit", .number = 7}))

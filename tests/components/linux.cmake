@@ -1,0 +1,10 @@
+# The smallest libraries, for the probe: one for each kind of symbol table. Without the sanitizers,
+# which would make them large.
+foreach(style gnu sysv)
+  set(name tiny-${style})
+  add_library(${name} MODULE tiny.cpp)
+  target_include_directories(${name} PRIVATE ${PROJECT_SOURCE_DIR})
+  target_link_options(${name} PRIVATE -nostdlib -s -Wl,--hash-style=${style} -Wl,--build-id=none)
+  set_target_properties(${name} PROPERTIES PREFIX ""
+    LIBRARY_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/components/${name})
+endforeach()

@@ -1,0 +1,4 @@
+/// A sound library without a single builder.
+#include "tests/components/testUids.h"
+
+MZ_PLAIN_ENTRY_POINT(Mz::Test::PlainDescription, "nothing", std::vector<Mz::Test::PlainInfo>())

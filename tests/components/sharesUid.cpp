@@ -1,0 +1,8 @@
+/// One of two libraries with a builder of the same identifier; MZ_TEST_SHARER says which.
+#include "tests/components/testUids.h"
+
+using namespace Mz::Test;
+
+MZ_PLAIN_ENTRY_POINT(PlainDescription, MZ_TEST_SHARER == 1 ? "first" : "second",
+                     {{sharedUid, MZ_TEST_SHARER == 1 ? L"first" : L"second"},
+                      {MZ_TEST_SHARER == 1 ? firstSharerUid : secondSharerUid, L"own"}})

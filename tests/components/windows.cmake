@@ -1,0 +1,25 @@
+# A library whose entry point is forwarded to another library's.
+mz_add_fault(forwardsEntryPoint forwardsEntryPoint.cpp forwardsEntryPoint.def)
+
+# A library that only loads in the surroundings that its own manifest describes: what it needs
+# stands in the folder of a private assembly, which the manifest names.
+enable_language(RC)
+add_library(sideBySide SHARED sideBySide.cpp)
+target_include_directories(sideBySide PRIVATE ${PROJECT_SOURCE_DIR})
+target_link_options(sideBySide PRIVATE -static)
+set_target_properties(sideBySide PROPERTIES PREFIX ""
+  RUNTIME_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/components/ownManifest/mzTestAssembly)
+configure_file(mzTestAssembly.manifest
+  ${CMAKE_BINARY_DIR}/components/ownManifest/mzTestAssembly/mzTestAssembly.manifest COPYONLY)
+mz_add_fault(ownManifest ownManifest.cpp ownManifest.rc)
+target_link_libraries(ownManifest PRIVATE sideBySide)
+# The same without the manifest, which therefore cannot be loaded.
+mz_add_fault(noManifest FOLDER ownManifest ownManifest.cpp)
+target_link_libraries(noManifest PRIVATE sideBySide)
+
+# The smallest library, to be damaged in many ways.
+add_library(tiny MODULE tiny.cpp)
+target_include_directories(tiny PRIVATE ${PROJECT_SOURCE_DIR})
+target_link_options(tiny PRIVATE -nostdlib -s -Wl,--entry,anotherFunction)
+set_target_properties(tiny PROPERTIES PREFIX ""
+  LIBRARY_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/components/tiny)

@@ -1,0 +1,39 @@
+/// What discovery leaves in the map of the libraries' names.
+#include "tests/integration/managerFixture.h"
+
+using namespace Mz;
+using namespace Mz::Test;
+
+namespace {
+
+class DiscoveryMap : public ManagerTest {};
+
+TEST_F(DiscoveryMap, KeepsTheFirstOfTwoRecordsOfOneNameInTheMap) {
+    folder.write("a", "1");
+    folder.write("b", "2");
+    ComponentManager::LibraryList found;
+    ComponentManager::LibraryMap byName;
+    manager->discover(searchPathOf(folder.path()).c_str(), found, byName);
+    ASSERT_EQ(found.size(), 2u);
+    EXPECT_EQ(byName.size(), 2u);
+    ComponentManager::LibraryList::iterator* a =
+        byName.find({found.front().directory, found.front().fileName});
+    ASSERT_TRUE(a);
+    EXPECT_EQ(&**a, &found.front());
+    EXPECT_EQ(found.front().fileName, L"a");
+    EXPECT_FALSE(found.front().module);
+    EXPECT_EQ(found.front().fileTime, 0u);
+    EXPECT_EQ(found.front().fileSize, 0);
+    // A second walk adds records, and leaves the map's entries as they are.
+    manager->discover(searchPathOf(folder.path()).c_str(), found, byName);
+    EXPECT_EQ(byName.size(), 2u);
+    EXPECT_EQ(&**byName.find({found.front().directory, L"a"}), &found.front());
+}
+
+TEST_F(DiscoveryMap, HashesARecordsNameByBothParts) {
+    const ComponentManager::LibraryKeyHash hash;
+    const std::hash<std::wstring> text;
+    EXPECT_EQ(hash({L"folder", L"file"}), text(L"folder") ^ text(L"file"));
+}
+
+} // namespace

@@ -1,0 +1,225 @@
+/// What files are on Linux alone: pipes, links, and names that differ in letter case only.
+#include "tests/integration/managerFixture.h"
+
+#include <clocale>
+#include <fcntl.h>
+#include <fstream>
+#include <sys/ioctl.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+using namespace Mz;
+using namespace Mz::Test;
+using ::testing::IsEmpty;
+
+namespace {
+
+class PosixDiscovery : public ManagerTest {};
+
+TEST_F(PosixDiscovery, DoesNotOpenAPipe) {
+    // Whoever opened it for reading would wait for a writer, for ever.
+    ASSERT_EQ(::mkfifo((folder.path() / "pipe.so").c_str(), 0600), 0);
+    add(L"goodWithKit");
+    initialize();
+    EXPECT_EQ(names(), (Names{L"kit"}));
+    EXPECT_EQ(manager->libraries.size(), 1u);
+}
+
+TEST_F(PosixDiscovery, DoesNotOpenAPipeThatTookTheFilesPlaceLater) {
+    const auto file = add(L"goodByHand", "file");
+    ComponentLibrary& library = record(file);
+    recordBuilder(library, goodUid, L"as recorded");
+    initialize();
+    std::filesystem::remove(file);
+    ASSERT_EQ(::mkfifo(file.c_str(), 0600), 0);
+    // Open for both, so that a reader is not kept waiting, and full enough for a whole header.
+    const int pipe = ::open(file.c_str(), O_RDWR | O_NONBLOCK);
+    const std::string garbage(8192, 'x');
+    ASSERT_EQ(::write(pipe, garbage.data(), garbage.size()), 8192);
+    EXPECT_FALSE(manager->getBuilder(goodUid));
+    int left = 0;
+    ASSERT_EQ(::ioctl(pipe, FIONREAD, &left), 0);
+    EXPECT_EQ(left, 8192);
+    ::close(pipe);
+}
+
+TEST_F(PosixDiscovery, PassesOverALinkThatLeadsNowhereAndOneInACircle) {
+    std::filesystem::create_symlink(folder.path() / "nowhere", folder.path() / "dangling.so");
+    std::filesystem::create_symlink(folder.path() / "circle.so", folder.path() / "circle.so");
+    std::filesystem::create_directory_symlink(folder.path(), folder.path() / "folder.so");
+    add(L"goodWithKit");
+    initialize();
+    EXPECT_EQ(names(), (Names{L"kit"}));
+    EXPECT_EQ(manager->libraries.size(), 1u);
+}
+
+TEST_F(PosixDiscovery, MakesOneRecordOfAFileWithSeveralNames) {
+    const auto file = add(L"goodByHand", "m.so");
+    std::filesystem::create_symlink(file, folder.path() / "z.so");
+    std::filesystem::create_hard_link(file, folder.path() / "b.so");
+    initialize();
+    EXPECT_EQ(names(), (Names{L"Name", L"name", L"third"}));
+    ASSERT_EQ(manager->libraries.size(), 1u);
+    EXPECT_EQ(manager->libraries.front().fileName, L"b.so");
+    EXPECT_EQ(noted("entry"), 1);
+    restart();
+    EXPECT_FALSE(isMapped(file));
+}
+
+TEST_F(PosixDiscovery, MakesOneRecordOfAFileThatTwoFoldersLeadTo) {
+    const auto file = add(L"goodByHand");
+    TemporaryDirectory second;
+    std::filesystem::create_directory_symlink(folder.path(), second.path() / "link");
+    manager->initialize(
+        (folder.text() + L";" + (second.path() / "link").wstring() + L";" + second.text()).c_str());
+    EXPECT_EQ(names(), (Names{L"Name", L"name", L"third"}));
+    EXPECT_EQ(manager->libraries.size(), 1u);
+}
+
+TEST_F(PosixDiscovery, FollowsALinkToALibraryElsewhere) {
+    std::filesystem::create_symlink(builtComponent(L"goodByHand"), folder.path() / "link");
+    initialize();
+    EXPECT_EQ(maker(goodUid), "good");
+}
+
+TEST_F(PosixDiscovery, KeepsOneRecordEachOfNamesThatDifferInLetterCaseOnly) {
+    add(L"goodByHand", "lib.so");
+    add(L"goodWithKit", "LIB.so");
+    initialize();
+    ASSERT_EQ(manager->libraries.size(), 2u);
+    for (const ComponentLibrary& library : manager->libraries)
+        EXPECT_EQ(library.fileName, L"lib.so");
+    EXPECT_EQ(maker(goodUid), "good");
+    EXPECT_EQ(maker(kitUid), "kit");
+    EXPECT_EQ(names(), (Names{L"kit", L"Name", L"name", L"third"})); // By their bytes.
+}
+
+TEST_F(PosixDiscovery, KeepsBothRecordsOfSuchNamesFromAnEarlierStart) {
+    const auto upper = add(L"goodWithKit", "LIB.so");
+    const auto lower = add(L"goodByHand", "lib.so");
+    recordBuilder(record(upper), kitUid, L"recorded kit");
+    recordBuilder(record(lower), goodUid, L"recorded good");
+    initialize();
+    EXPECT_EQ(manager->libraries.size(), 2u);
+    EXPECT_EQ(maker(goodUid), "good");
+    EXPECT_EQ(maker(kitUid), "kit");
+}
+
+TEST_F(PosixDiscovery, LoadsAFileWhoseNameHasUpperCaseAndOthersNot) {
+    const auto file = add(L"goodByHand", "UPPER.SO");
+    initialize();
+    EXPECT_EQ(maker(goodUid), "good");
+    EXPECT_EQ(manager->libraries.front().fileName, L"upper.so");
+    EXPECT_EQ(manager->libraries.front().foundPath, file);
+}
+
+TEST_F(PosixDiscovery, TakesNamesByteByByteInThePlainLocale) {
+    ASSERT_STREQ(std::setlocale(LC_ALL, nullptr), "C");
+    const auto file = add(L"goodByHand", "caf\xC3\xA9.so");
+    const auto broken = add(L"goodWithKit", "b\xFF.so");
+    initialize();
+    ASSERT_EQ(manager->libraries.size(), 2u);
+    EXPECT_EQ(manager->libraries.front().fileName, L"b\xFF.so");
+    EXPECT_EQ(manager->libraries.back().fileName, L"caf\xC3\xA9.so");
+    EXPECT_EQ(maker(goodUid), "good");
+    EXPECT_EQ(maker(kitUid), "kit");
+}
+
+TEST_F(PosixDiscovery, TakesNamesAsTheLocaleSaysAndLeavesOutThoseThatAreNone) {
+    ASSERT_TRUE(std::setlocale(LC_ALL, "C.UTF-8"));
+    add(L"goodByHand", "caf\xC3\xA9 \xE4\xB8\xAD.so");
+    add(L"goodWithKit", "b\xFF.so");
+    initialize();
+    ASSERT_EQ(manager->libraries.size(), 1u);
+    EXPECT_EQ(manager->libraries.front().fileName, L"caf\u00E9 \u4E2D.so");
+    EXPECT_EQ(maker(goodUid), "good");
+    std::setlocale(LC_ALL, "C");
+}
+
+TEST_F(PosixDiscovery, SearchesAFolderNamedInTheLocalesLetters) {
+    ASSERT_TRUE(std::setlocale(LC_ALL, "C.UTF-8"));
+    const auto inner = folder.path() / "\xC3\x84 \xE4\xB8\xAD";
+    std::filesystem::create_directory(inner);
+    std::filesystem::copy_file(builtComponent(L"goodByHand"), inner / "file");
+    manager->initialize((folder.text() + L"/\u00C4 \u4E2D").c_str());
+    EXPECT_EQ(maker(goodUid), "good");
+    std::setlocale(LC_ALL, "C");
+}
+
+TEST_F(PosixDiscovery, PassesOverAFolderThatTheLocaleCannotName) {
+    add(L"goodWithKit");
+    manager->initialize((L"/\u4E2D;" + folder.text()).c_str());
+    EXPECT_EQ(names(), (Names{L"kit"}));
+}
+
+TEST_F(PosixDiscovery, SearchesFoldersWithDotsInTheirNamesAsTheSystemMeansThem) {
+    std::filesystem::create_directory(folder.path() / "sub");
+    add(L"goodByHand");
+    manager->initialize((folder.text() + L"/sub/../.").c_str());
+    EXPECT_EQ(maker(goodUid), "good");
+}
+
+TEST_F(PosixDiscovery, SearchesARelativeFolder) {
+    add(L"goodByHand");
+    const auto before = std::filesystem::current_path();
+    std::filesystem::current_path(folder.path().parent_path());
+    manager->initialize(folder.path().filename().wstring().c_str());
+    EXPECT_EQ(maker(goodUid), "good");
+    std::filesystem::current_path(before);
+}
+
+TEST_F(PosixDiscovery, DoesNotCallDataNamedLikeTheEntryPoint) {
+    const auto file = add(L"dataEntryPoint");
+    initialize();
+    EXPECT_THAT(names(), IsEmpty());
+    EXPECT_FALSE(isMapped(file));
+    EXPECT_EQ(find(file)->fileTime, platform::queryFile(file)->time);
+}
+
+TEST_F(PosixDiscovery, DoesNotCallDataNamedLikeTheEntryPointOfALibraryThatTheHostLoaded) {
+    const auto file = add(L"dataEntryPoint");
+    void* const host = loadAsHost(file);
+    ASSERT_TRUE(host);
+    initialize();
+    EXPECT_THAT(names(), IsEmpty());
+    manager.reset();
+    unloadAsHost(host);
+}
+
+TEST_F(PosixDiscovery, LooksIntoACandidateWithoutMappingItOrRunningAnythingOfIt) {
+    const std::filesystem::path mark = folder.path().string() + ".mark";
+    setEnvironment("MZ_TEST_MARK", mark.string());
+    const auto file = add(L"noEntryPoint");
+    EXPECT_FALSE(platform::exportsFunction(file, "QrGetComponentDescription"));
+    EXPECT_TRUE(platform::exportsFunction(file, "QrGetComponentDescriptions"));
+    EXPECT_FALSE(isMapped(file));
+    EXPECT_FALSE(std::filesystem::exists(mark));
+}
+
+TEST_F(PosixDiscovery, PassesOverATruncatedLibraryAtEveryPage) {
+    std::ifstream stream(builtComponent(L"goodByHand"), std::ios::binary);
+    const std::string whole(std::istreambuf_iterator<char>(stream), {});
+    int step = 0;
+    for (std::size_t length = 0; length < whole.size(); length += 1024)
+        folder.write(std::to_string(step++), whole.substr(0, length));
+    folder.write("cutLast", whole.substr(0, whole.size() - 1));
+    add(L"goodWithKit", "zz");
+    initialize();
+    EXPECT_EQ(names(), (Names{L"kit"}));
+}
+
+TEST_F(PosixDiscovery, PassesOverFilesThatMayNotBeRead) {
+    const auto file = add(L"goodByHand");
+    std::filesystem::permissions(file, std::filesystem::perms::none);
+    add(L"goodWithKit", "zz");
+    // The superuser may read everything, so be somebody else for the while.
+    const uid_t before = ::geteuid();
+    if (before == 0)
+        ASSERT_EQ(::seteuid(65534), 0);
+    initialize();
+    ASSERT_EQ(::seteuid(before), 0);
+    EXPECT_FALSE(find(file)->module);
+    EXPECT_EQ(names(), (Names{L"kit"}));
+}
+
+} // namespace

@@ -1,0 +1,131 @@
+/// What files and libraries are on Windows alone: attributes, manifests, forwarded exports.
+#include "tests/integration/managerFixture.h"
+
+#include <windows.h>
+
+using namespace Mz;
+using namespace Mz::Test;
+using ::testing::IsEmpty;
+
+namespace {
+
+class WindowsDiscovery : public ManagerTest {};
+
+TEST_F(WindowsDiscovery, LeavesOutHiddenAndSystemFiles) {
+    const auto hidden = add(L"goodByHand", "hidden.dll");
+    const auto system = add(L"countedDescription", "system.dll");
+    ASSERT_TRUE(::SetFileAttributesW(hidden.c_str(), FILE_ATTRIBUTE_HIDDEN));
+    ASSERT_TRUE(::SetFileAttributesW(system.c_str(), FILE_ATTRIBUTE_SYSTEM));
+    ASSERT_EQ(::GetFileAttributesW(hidden.c_str()) & FILE_ATTRIBUTE_HIDDEN,
+              static_cast<DWORD>(FILE_ATTRIBUTE_HIDDEN));
+    ASSERT_EQ(::GetFileAttributesW(system.c_str()) & FILE_ATTRIBUTE_SYSTEM,
+              static_cast<DWORD>(FILE_ATTRIBUTE_SYSTEM));
+    add(L"goodWithKit");
+    initialize();
+    EXPECT_EQ(names(), (Names{L"kit"}));
+    EXPECT_EQ(manager->libraries.size(), 1u);
+    ::SetFileAttributesW(hidden.c_str(), FILE_ATTRIBUTE_NORMAL);
+    ::SetFileAttributesW(system.c_str(), FILE_ATTRIBUTE_NORMAL);
+}
+
+TEST_F(WindowsDiscovery, TakesReadOnlyFiles) {
+    const auto file = add(L"goodByHand");
+    ASSERT_TRUE(::SetFileAttributesW(file.c_str(), FILE_ATTRIBUTE_READONLY));
+    initialize();
+    EXPECT_EQ(maker(goodUid), "good");
+    manager.reset();
+    ::SetFileAttributesW(file.c_str(), FILE_ATTRIBUTE_NORMAL);
+}
+
+TEST_F(WindowsDiscovery, LoadsALibraryInTheSurroundingsOfItsOwnManifest) {
+    // The library beside it without the manifest shows that nothing else would find what it needs.
+    manager->initialize(searchPathOf(buildFolder / "components" / "ownManifest").c_str());
+    EXPECT_EQ(names(), (Names{L"manifest"}));
+    ASSERT_TRUE(find("ownManifest.dll"));
+    EXPECT_TRUE(find("ownManifest.dll")->module);
+    ASSERT_TRUE(find("noManifest.dll"));
+    EXPECT_FALSE(find("noManifest.dll")->module);
+    ASSERT_TRUE(indexed(manifestUid));
+    EXPECT_EQ(indexed(manifestUid)->getNumber(), 1234u);
+    EXPECT_EQ(maker(manifestUid), "manifest");
+}
+
+TEST_F(WindowsDiscovery, LoadsALibraryInTheSurroundingsOfItsOwnManifestOnFirstUseToo) {
+    const auto file = buildFolder / "components" / "ownManifest" / "ownManifest.dll";
+    recordBuilder(record(file), manifestUid, L"as recorded");
+    manager->initialize(searchPathOf(file.parent_path()).c_str());
+    EXPECT_FALSE(isMapped(file));
+    EXPECT_EQ(maker(manifestUid), "manifest");
+}
+
+TEST_F(WindowsDiscovery, LeavesNoActivationContextBehind) {
+    HANDLE before = nullptr;
+    ASSERT_TRUE(::GetCurrentActCtx(&before));
+    manager->initialize(searchPathOf(buildFolder / "components" / "ownManifest").c_str());
+    HANDLE after = nullptr;
+    ASSERT_TRUE(::GetCurrentActCtx(&after));
+    EXPECT_EQ(before, after);
+}
+
+TEST_F(WindowsDiscovery, DoesNotTakeAForwardedEntryPointForTheLibrarysOwn) {
+    const auto file = add(L"forwardsEntryPoint");
+    initialize();
+    EXPECT_THAT(names(), IsEmpty());
+    EXPECT_EQ(noted("entry"), 0);
+    EXPECT_FALSE(isMapped(file));
+}
+
+TEST_F(WindowsDiscovery, DoesNotTakeAForwardedEntryPointThoughTheHostLoadedTheLibrary) {
+    void* const host = loadAsHost(add(L"forwardsEntryPoint"));
+    ASSERT_TRUE(host);
+    initialize();
+    EXPECT_THAT(names(), IsEmpty());
+    EXPECT_EQ(noted("entry"), 0);
+    manager.reset();
+    unloadAsHost(host);
+}
+
+TEST_F(WindowsDiscovery, ContainsAnInitialiserThatThrows) {
+    const auto file = add(L"throwsInInitialiser");
+    add(L"goodWithKit", "zz.dll");
+    initialize();
+    EXPECT_EQ(names(), (Names{L"kit"}));
+    EXPECT_EQ(maker(kitUid), "kit");
+    EXPECT_FALSE(isMapped(file));
+    EXPECT_EQ(find(file)->fileTime, platform::queryFile(file)->time);
+}
+
+TEST_F(WindowsDiscovery, DoesNotCallDataNamedLikeTheEntryPoint) {
+    const auto file = add(L"dataEntryPoint");
+    initialize();
+    EXPECT_THAT(names(), IsEmpty());
+    EXPECT_FALSE(isMapped(file));
+}
+
+TEST_F(WindowsDiscovery, RestoresTheErrorMode) {
+    const UINT before = ::SetErrorMode(SEM_NOGPFAULTERRORBOX);
+    folder.write("text.dll", "no library");
+    add(L"goodByHand");
+    initialize();
+    EXPECT_EQ(::SetErrorMode(before), static_cast<UINT>(SEM_NOGPFAULTERRORBOX));
+}
+
+TEST_F(WindowsDiscovery, FindsLibrariesByNonAsciiNames) {
+    add(L"goodByHand", L"caf\u00E9 \u4E2D.dll");
+    initialize();
+    EXPECT_EQ(maker(goodUid), "good");
+    ASSERT_EQ(manager->libraries.size(), 1u);
+    EXPECT_EQ(manager->libraries.front().fileName, L"caf\u00E9 \u4E2D.dll");
+}
+
+TEST_F(WindowsDiscovery, MakesOneRecordOfAFolderNamedInTwoLetterCases) {
+    add(L"goodByHand");
+    std::wstring upper = searchPathOf(folder.path());
+    for (wchar_t& c : upper)
+        c = static_cast<wchar_t>(::towupper(c));
+    manager->initialize((searchPathOf(folder.path()) + L";" + upper).c_str());
+    EXPECT_EQ(manager->libraries.size(), 1u);
+    EXPECT_EQ(names(), (Names{L"Name", L"name", L"third"}));
+}
+
+} // namespace

@@ -1,0 +1,361 @@
+/// The reader of ELF symbol tables, on sound libraries and on everything else.
+#include "components/componentManager/platform/posix/elfProbe.h"
+#include "tests/integration/managerFixture.h"
+
+#include <algorithm>
+#include <cstring>
+#include <elf.h>
+#include <fstream>
+#include <iterator>
+#include <random>
+#include <sys/mman.h>
+#include <unistd.h>
+
+using Mz::platform::elfExportsFunction;
+using Mz::Test::buildFolder;
+using Mz::Test::builtComponent;
+
+namespace {
+
+constexpr const char* entryPoint = "QrGetComponentDescription";
+
+/// A file without a name.
+class MemoryFile {
+  public:
+    explicit MemoryFile(const std::string& content) : descriptor(::memfd_create("elf", 0)) {
+        rewrite(content);
+    }
+    ~MemoryFile() { ::close(descriptor); }
+    MemoryFile(const MemoryFile&) = delete;
+    MemoryFile& operator=(const MemoryFile&) = delete;
+
+    void rewrite(const std::string& content) {
+        resize(content.size());
+        EXPECT_EQ(::pwrite(descriptor, content.data(), content.size(), 0),
+                  static_cast<ssize_t>(content.size()));
+    }
+    void resize(std::size_t size) {
+        EXPECT_EQ(::ftruncate(descriptor, static_cast<off_t>(size)), 0);
+    }
+    bool exports(const char* symbol = entryPoint) const {
+        return elfExportsFunction(descriptor, symbol);
+    }
+
+  private:
+    int descriptor;
+};
+
+bool exports(const std::string& content, const char* symbol = entryPoint) {
+    return MemoryFile(content).exports(symbol);
+}
+
+std::string contentOf(const std::filesystem::path& file) {
+    std::ifstream stream(file, std::ios::binary);
+    EXPECT_TRUE(stream.good()) << file;
+    return std::string(std::istreambuf_iterator<char>(stream), {});
+}
+
+template <class T>
+T get(const std::string& content, std::size_t offset) {
+    T value;
+    std::memcpy(&value, content.data() + offset, sizeof value);
+    return value;
+}
+
+template <class T>
+void put(std::string& content, std::size_t offset, const T& value) {
+    std::memcpy(content.data() + offset, &value, sizeof value);
+}
+
+/// One kind of symbol table after the other.
+class ElfProbe : public ::testing::TestWithParam<const wchar_t*> {
+  protected:
+    ElfProbe() : whole(contentOf(builtComponent(GetParam()))) {}
+
+    bool usesGnuHash() const { return std::wstring(GetParam()) == L"tiny-gnu"; }
+
+    Elf64_Ehdr header() const { return get<Elf64_Ehdr>(whole, 0); }
+
+    /// The content with a changed header.
+    template <class Change>
+    std::string withHeader(Change change) const {
+        std::string content = whole;
+        Elf64_Ehdr changed = header();
+        change(changed);
+        put(content, 0, changed);
+        return content;
+    }
+
+    /// The offset of the first program header of that type.
+    std::size_t segment(std::uint32_t type) const {
+        for (std::size_t index = 0; index < header().e_phnum; ++index) {
+            const std::size_t offset = header().e_phoff + index * sizeof(Elf64_Phdr);
+            if (get<Elf64_Phdr>(whole, offset).p_type == type)
+                return offset;
+        }
+        ADD_FAILURE() << "no segment of type " << type;
+        return 0;
+    }
+
+    /// The offset of the dynamic entry with that tag.
+    std::size_t dynamicEntry(std::int64_t tag) const {
+        const auto dynamic = get<Elf64_Phdr>(whole, segment(PT_DYNAMIC));
+        for (std::size_t offset = dynamic.p_offset;; offset += sizeof(Elf64_Dyn)) {
+            const auto entry = get<Elf64_Dyn>(whole, offset);
+            if (entry.d_tag == tag)
+                return offset;
+            if (entry.d_tag == DT_NULL)
+                break;
+        }
+        ADD_FAILURE() << "no dynamic entry " << tag;
+        return 0;
+    }
+
+    /// Where the hash table stands in the file; the library maps its first segment at address 0.
+    std::size_t hashTable() const {
+        return get<Elf64_Dyn>(whole, dynamicEntry(usesGnuHash() ? DT_GNU_HASH : DT_HASH))
+            .d_un.d_ptr;
+    }
+
+    std::string withDynamic(std::int64_t tag, std::uint64_t value) const {
+        std::string content = whole;
+        const std::size_t offset = dynamicEntry(tag);
+        auto entry = get<Elf64_Dyn>(content, offset);
+        entry.d_un.d_val = value;
+        put(content, offset, entry);
+        return content;
+    }
+
+    std::string whole;
+};
+
+INSTANTIATE_TEST_SUITE_P(Tiny, ElfProbe, ::testing::Values(L"tiny-gnu", L"tiny-sysv"),
+                         [](const auto& parameter) {
+                             return std::string(parameter.index ? "SysvHash" : "GnuHash");
+                         });
+
+TEST_P(ElfProbe, FindsFunctionsThatAreDefinedAndNothingElse) {
+    EXPECT_TRUE(exports(whole));
+    EXPECT_TRUE(exports(whole, "anotherFunction"));
+    EXPECT_FALSE(exports(whole, "someData"));
+    EXPECT_FALSE(exports(whole, "noSuchFunction"));
+    EXPECT_FALSE(exports(whole, ""));
+    EXPECT_FALSE(exports(whole, std::string(5000, 'x').c_str()));
+}
+
+TEST_P(ElfProbe, FindsNothingInALibraryCutAtAnyLength) {
+    MemoryFile file(whole);
+    std::vector<std::size_t> found;
+    for (std::size_t length = whole.size(); length-- > 0;) {
+        file.resize(length);
+        if (file.exports())
+            found.push_back(length);
+    }
+    EXPECT_TRUE(found.empty()) << "taken for a library at " << found.size() << " lengths from "
+                               << found.back() << " to " << found.front() << " of " << whole.size();
+}
+
+TEST_P(ElfProbe, FindsNothingInALibraryWithoutAllThatTheLoaderWouldMap) {
+    std::size_t mapped = 0;
+    for (std::size_t index = 0; index < header().e_phnum; ++index) {
+        const auto one = get<Elf64_Phdr>(whole, header().e_phoff + index * sizeof(Elf64_Phdr));
+        if (one.p_type == PT_LOAD)
+            mapped = std::max<std::size_t>(mapped, one.p_offset + one.p_filesz);
+    }
+    ASSERT_GT(mapped, 0u);
+    EXPECT_FALSE(exports(whole.substr(0, mapped - 1)));
+    EXPECT_FALSE(exports(whole.substr(0, mapped / 2)));
+}
+
+TEST_P(ElfProbe, SurvivesRandomDamage) {
+    std::mt19937 random(7);
+    MemoryFile file(whole);
+    int stillFound = 0;
+    constexpr int rounds = 20000;
+    for (int round = 0; round < rounds; ++round) {
+        std::string content = whole;
+        for (auto count = 1 + random() % 8; count > 0; --count) {
+            // Half of it where the tables are.
+            const std::size_t range = random() % 2 ? content.size() : 1024;
+            content[random() % range] = static_cast<char>(random());
+        }
+        file.rewrite(content);
+        stillFound += file.exports();
+    }
+    EXPECT_GT(stillFound, 0);
+    EXPECT_LT(stillFound, rounds);
+}
+
+TEST_P(ElfProbe, SurvivesExtremeValuesInEveryWord) {
+    MemoryFile file(whole);
+    const std::size_t end = std::min<std::size_t>(whole.size(), 0x1000);
+    for (std::size_t offset = 0; offset + 8 <= end; offset += 4)
+        for (const std::uint64_t value :
+             {std::uint64_t{0}, ~std::uint64_t{0}, std::uint64_t{1} << 63,
+              ~std::uint64_t{0} - 0xFFF, std::uint64_t{0x7FFFFFFFFFFFFFFF}}) {
+            std::string content = whole;
+            put(content, offset, value);
+            file.rewrite(content);
+            static_cast<void>(file.exports());
+        }
+    const auto dynamic = get<Elf64_Phdr>(whole, segment(PT_DYNAMIC));
+    for (std::size_t offset = dynamic.p_offset; offset < dynamic.p_offset + dynamic.p_filesz;
+         offset += 8)
+        for (const std::uint64_t value :
+             {std::uint64_t{0}, ~std::uint64_t{0}, ~std::uint64_t{0} - 7, std::uint64_t{1} << 63}) {
+            std::string content = whole;
+            put(content, offset, value);
+            file.rewrite(content);
+            static_cast<void>(file.exports());
+        }
+}
+
+TEST_P(ElfProbe, RefusesHeadersOfOtherKindsOfFile) {
+    const auto refuses = [this](auto change) { return !exports(withHeader(change)); };
+    EXPECT_TRUE(exports(withHeader([](Elf64_Ehdr&) {})));
+    EXPECT_TRUE(refuses([](Elf64_Ehdr& h) { h.e_ident[EI_MAG3] = 'G'; }));
+    EXPECT_TRUE(refuses([](Elf64_Ehdr& h) { h.e_ident[EI_CLASS] = ELFCLASS32; }));
+    EXPECT_TRUE(refuses([](Elf64_Ehdr& h) { h.e_ident[EI_DATA] = ELFDATA2MSB; }));
+    EXPECT_TRUE(refuses([](Elf64_Ehdr& h) { h.e_machine = EM_AARCH64; }));
+    EXPECT_TRUE(refuses([](Elf64_Ehdr& h) { h.e_machine = EM_386; }));
+    EXPECT_TRUE(refuses([](Elf64_Ehdr& h) { h.e_type = ET_EXEC; }));
+    EXPECT_TRUE(refuses([](Elf64_Ehdr& h) { h.e_type = ET_REL; }));
+    EXPECT_TRUE(refuses([](Elf64_Ehdr& h) { h.e_type = ET_CORE; }));
+    EXPECT_TRUE(refuses([](Elf64_Ehdr& h) { h.e_phentsize = sizeof(Elf32_Phdr); }));
+    EXPECT_TRUE(refuses([](Elf64_Ehdr& h) { h.e_phnum = 0; }));
+    EXPECT_TRUE(refuses([](Elf64_Ehdr& h) { h.e_phnum = 0xFFFF; }));
+    EXPECT_TRUE(refuses([](Elf64_Ehdr& h) { h.e_phnum = 1024; }));
+    EXPECT_TRUE(refuses([](Elf64_Ehdr& h) { h.e_phoff = ~std::uint64_t{0}; }));
+    EXPECT_TRUE(refuses([](Elf64_Ehdr& h) { h.e_phoff = ~std::uint64_t{0} - 55; }));
+    EXPECT_TRUE(refuses([](Elf64_Ehdr& h) { h.e_phoff = std::uint64_t{1} << 63; }));
+    EXPECT_TRUE(refuses([this](Elf64_Ehdr& h) { h.e_phoff = whole.size() - 56; }));
+}
+
+TEST_P(ElfProbe, RefusesDynamicEntriesThatLeadNowhere) {
+    const std::int64_t hash = usesGnuHash() ? DT_GNU_HASH : DT_HASH;
+    for (const std::int64_t tag :
+         {static_cast<std::int64_t>(DT_SYMTAB), static_cast<std::int64_t>(DT_STRTAB), hash})
+        for (const std::uint64_t value :
+             {std::uint64_t{0}, ~std::uint64_t{0}, ~std::uint64_t{0} - 23, std::uint64_t{1} << 63,
+              std::uint64_t{0x7FFFFFFFFFFFFFF0}, static_cast<std::uint64_t>(whole.size())})
+            EXPECT_FALSE(exports(withDynamic(tag, value))) << tag << " " << value;
+    EXPECT_FALSE(exports(withDynamic(DT_STRSZ, 0)));
+    EXPECT_FALSE(exports(withDynamic(DT_STRSZ, 8)));
+}
+
+TEST_P(ElfProbe, RefusesSegmentsWithOffsetsNearTheEndOfAllNumbers) {
+    std::string content = whole;
+    const std::size_t dynamic = segment(PT_DYNAMIC);
+    auto changed = get<Elf64_Phdr>(whole, dynamic);
+    for (const std::uint64_t offset : {~std::uint64_t{0}, ~std::uint64_t{0} - 15,
+                                       std::uint64_t{1} << 63, std::uint64_t{0x7FFFFFFFFFFFFFFF}}) {
+        changed.p_offset = offset;
+        put(content, dynamic, changed);
+        EXPECT_FALSE(exports(content));
+    }
+    changed = get<Elf64_Phdr>(whole, dynamic);
+    changed.p_filesz = ~std::uint64_t{0}; // Its end is marked by an entry, not by the size.
+    put(content, dynamic, changed);
+    static_cast<void>(exports(content));
+    content = whole;
+    const std::size_t load = segment(PT_LOAD);
+    auto mapped = get<Elf64_Phdr>(whole, load);
+    mapped.p_offset = ~std::uint64_t{0} - 0xFFF;
+    put(content, load, mapped);
+    EXPECT_FALSE(exports(content));
+}
+
+TEST_P(ElfProbe, RefusesATableWithoutBuckets) {
+    std::string content = whole;
+    put(content, hashTable(), std::uint32_t{0});
+    EXPECT_FALSE(exports(content));
+    put(content, hashTable(), ~std::uint32_t{0});
+    EXPECT_FALSE(exports(content));
+    if (usesGnuHash()) {
+        content = whole;
+        put(content, hashTable() + 8, std::uint32_t{0}); // No words in the filter.
+        EXPECT_FALSE(exports(content));
+    }
+}
+
+TEST_P(ElfProbe, EndsOnAChainThatNeverEnds) {
+    std::string content = whole;
+    const std::size_t table = hashTable();
+    const auto buckets = get<std::uint32_t>(content, table);
+    if (usesGnuHash()) {
+        // The filter lets everything pass, and no entry of the chains is the last one.
+        const auto filter = get<std::uint32_t>(content, table + 8);
+        for (std::size_t word = 0; word < filter; ++word)
+            put(content, table + 16 + word * 8, ~std::uint64_t{0});
+        const std::size_t chains = table + 16 + filter * 8 + buckets * 4;
+        for (std::size_t entry = 0; entry < 3; ++entry)
+            put(content, chains + entry * 4,
+                get<std::uint32_t>(content, chains + entry * 4) & ~std::uint32_t{1});
+    } else {
+        // Every entry leads to itself.
+        const auto entries = get<std::uint32_t>(content, table + 4);
+        for (std::uint32_t entry = 0; entry < entries; ++entry)
+            put(content, table + 8 + buckets * 4 + entry * 4, entry);
+    }
+    EXPECT_FALSE(exports(content, "noSuchFunction"));
+    EXPECT_FALSE(exports(content, "noOtherFunctionEither"));
+}
+
+TEST_P(ElfProbe, RefusesSymbolsThatAreNotForOthersToSee) {
+    // Each symbol is told by its type and visibility; what is changed here is all of them.
+    const std::size_t symbols = get<Elf64_Dyn>(whole, dynamicEntry(DT_SYMTAB)).d_un.d_ptr;
+    const auto changed = [&](auto change) {
+        std::string content = whole;
+        for (std::size_t index = 1; index <= 3; ++index) {
+            const std::size_t offset = symbols + index * sizeof(Elf64_Sym);
+            auto symbol = get<Elf64_Sym>(content, offset);
+            change(symbol);
+            put(content, offset, symbol);
+        }
+        return exports(content);
+    };
+    EXPECT_TRUE(changed([](Elf64_Sym&) {}));
+    EXPECT_TRUE(changed([](Elf64_Sym& s) { s.st_info = ELF64_ST_INFO(STB_WEAK, STT_FUNC); }));
+    EXPECT_TRUE(changed([](Elf64_Sym& s) { s.st_info = ELF64_ST_INFO(STB_GLOBAL, STT_NOTYPE); }));
+    EXPECT_TRUE(
+        changed([](Elf64_Sym& s) { s.st_info = ELF64_ST_INFO(STB_GLOBAL, STT_GNU_IFUNC); }));
+    EXPECT_FALSE(changed([](Elf64_Sym& s) { s.st_info = ELF64_ST_INFO(STB_LOCAL, STT_FUNC); }));
+    EXPECT_FALSE(changed([](Elf64_Sym& s) { s.st_info = ELF64_ST_INFO(STB_GLOBAL, STT_OBJECT); }));
+    EXPECT_FALSE(changed([](Elf64_Sym& s) { s.st_info = ELF64_ST_INFO(STB_GLOBAL, STT_TLS); }));
+    EXPECT_FALSE(changed([](Elf64_Sym& s) { s.st_shndx = SHN_UNDEF; }));
+    EXPECT_FALSE(changed([](Elf64_Sym& s) { s.st_other = STV_HIDDEN; }));
+    EXPECT_FALSE(changed([](Elf64_Sym& s) { s.st_other = STV_INTERNAL; }));
+    EXPECT_TRUE(changed([](Elf64_Sym& s) { s.st_other = STV_PROTECTED; }));
+    EXPECT_FALSE(changed([](Elf64_Sym& s) { s.st_name = ~std::uint32_t{0}; }));
+}
+
+TEST(ElfProbeOnFiles, AgreesWithTheLoaderOnEveryTestComponent) {
+    int with = 0;
+    for (const auto& entry :
+         std::filesystem::recursive_directory_iterator(buildFolder / "components")) {
+        if (!entry.is_regular_file() || entry.path().extension() != ".so")
+            continue;
+        const std::string name = entry.path().stem().string();
+        const bool expected =
+            name != "noEntryPoint" && name != "dataEntryPoint" && name != "entryPointInDependency";
+        EXPECT_EQ(exports(contentOf(entry.path())), expected) << entry.path();
+        with += expected;
+    }
+    EXPECT_GT(with, 20);
+}
+
+TEST(ElfProbeOnFiles, RefusesAProgramThatExportsTheFunction) {
+    EXPECT_FALSE(
+        exports(contentOf(buildFolder / "components" / "exportingProgram" / "exportingProgram")));
+}
+
+TEST(ElfProbeOnFiles, RefusesShortTextsAndZeros) {
+    for (std::size_t length : {0, 1, 4, 16, 63, 64, 65, 8191, 8192, 8193, 100000}) {
+        EXPECT_FALSE(exports(std::string(length, '\0')));
+        EXPECT_FALSE(exports(std::string("\177ELF\2\1\1") + std::string(length, '\0')));
+        EXPECT_FALSE(exports(std::string("\177ELF\2\1\1") + std::string(length, '\377')));
+    }
+    EXPECT_FALSE(elfExportsFunction(-1, entryPoint));
+}
+
+} // namespace

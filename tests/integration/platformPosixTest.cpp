@@ -1,0 +1,104 @@
+/// The platform layer on Linux, where it has something of its own.
+#include "components/componentManager/platform/characters.h"
+#include "components/componentManager/platform/platform.h"
+#include "tests/integration/managerFixture.h"
+
+#include <clocale>
+#include <locale.h>
+#include <sys/stat.h>
+
+using namespace Mz::platform;
+using Mz::Test::TemporaryDirectory;
+using ::testing::IsEmpty;
+
+namespace {
+
+class PosixPlatform : public ::testing::Test {
+  protected:
+    ~PosixPlatform() override { std::setlocale(LC_ALL, "C"); }
+    static void useUtf8() { ASSERT_TRUE(std::setlocale(LC_ALL, "C.UTF-8")); }
+};
+
+TEST_F(PosixPlatform, OpensByTheNameAsFound) {
+    EXPECT_EQ(openingPath(L"\\a\\b", "/A/b").native(), "/A/b");
+}
+
+TEST_F(PosixPlatform, LowersAsciiOnlyInEveryLocale) {
+    EXPECT_EQ(lowerCase(L"\u00C4\u0410Z"), L"\u00C4\u0410z");
+    useUtf8();
+    EXPECT_EQ(lowerCase(L"\u00C4\u0410Z"), L"\u00C4\u0410z");
+}
+
+TEST_F(PosixPlatform, TellsThePlainLocaleFromEveryOther) {
+    for (const char* plain : {"C", "POSIX"}) {
+        ASSERT_TRUE(std::setlocale(LC_ALL, plain));
+        EXPECT_TRUE(usesPlainBytes());
+    }
+    useUtf8();
+    EXPECT_FALSE(usesPlainBytes());
+    ASSERT_TRUE(std::setlocale(LC_CTYPE, "C"));
+    EXPECT_TRUE(usesPlainBytes());
+}
+
+TEST_F(PosixPlatform, AsksForTheLocaleOfTheCallingThread) {
+    const locale_t utf8 = ::newlocale(LC_ALL_MASK, "C.UTF-8", nullptr);
+    ASSERT_TRUE(utf8);
+    const locale_t before = ::uselocale(utf8);
+    EXPECT_FALSE(usesPlainBytes());
+    EXPECT_EQ(toBytes(L"\u00E4"), "\xC3\xA4");
+    ::uselocale(before);
+    EXPECT_TRUE(usesPlainBytes());
+    ::freelocale(utf8);
+}
+
+TEST_F(PosixPlatform, ConvertsTextsAsTheLocaleSays) {
+    useUtf8();
+    EXPECT_EQ(toBytes(L"a\u00E4\u4E2D\U0001F600"), "a\xC3\xA4\xE4\xB8\xAD\xF0\x9F\x98\x80");
+    EXPECT_EQ(toCharacters("a\xC3\xA4\xE4\xB8\xAD\xF0\x9F\x98\x80"), L"a\u00E4\u4E2D\U0001F600");
+    EXPECT_EQ(toCharacters(std::string_view("a\0b", 3)), std::wstring(L"a\0b", 3));
+    EXPECT_EQ(toBytes(std::wstring_view(L"a\0b", 3)), std::string("a\0b", 3));
+    EXPECT_EQ(toBytes(L"a\xD800"), std::nullopt);
+    EXPECT_EQ(toCharacters("\xC3"), std::nullopt);
+    EXPECT_EQ(toCharacters("a\xFF"), std::nullopt);
+    EXPECT_EQ(toCharacters("\xE4\xB8x"), std::nullopt);
+    EXPECT_EQ(toCharacters("\xC0\x80"), std::nullopt);
+}
+
+TEST_F(PosixPlatform, HasNoNativeNameForWhatTheLocaleCannotWrite) {
+    EXPECT_EQ(toNative(L"\u4E2D"), std::nullopt);
+    ASSERT_TRUE(toNative(L"\u00E4"));
+    EXPECT_EQ(toNative(L"\u00E4")->native(), "\xE4");
+    useUtf8();
+    ASSERT_TRUE(toNative(L"\u4E2D"));
+    EXPECT_EQ(toNative(L"\u4E2D")->native(), "\xE4\xB8\xAD");
+}
+
+TEST_F(PosixPlatform, ListsNeitherPipesNorDeadLinks) {
+    TemporaryDirectory folder;
+    ASSERT_EQ(::mkfifo((folder.path() / "pipe").c_str(), 0600), 0);
+    std::filesystem::create_symlink("nowhere", folder.path() / "dead");
+    std::filesystem::create_symlink(folder.write("file", "x"), folder.path() / "link");
+    const std::vector<DirectoryEntry> entries = listCandidates(folder.path());
+    ASSERT_EQ(entries.size(), 2u);
+    EXPECT_EQ(entries[0].name, L"file");
+    EXPECT_EQ(entries[1].name, L"link");
+    ASSERT_TRUE(entries[0].identity);
+    EXPECT_EQ(entries[0].identity, entries[1].identity);
+}
+
+TEST_F(PosixPlatform, TellsTheStatusOfWhatALinkLeadsTo) {
+    TemporaryDirectory folder;
+    std::filesystem::create_symlink(folder.write("file", "1234567"), folder.path() / "link");
+    EXPECT_EQ(queryFile(folder.path() / "link")->size, 7);
+    EXPECT_TRUE(queryFile(folder.path() / "link")->regular);
+    ASSERT_EQ(::mkfifo((folder.path() / "pipe").c_str(), 0600), 0);
+    EXPECT_FALSE(queryFile(folder.path() / "pipe")->regular);
+}
+
+TEST_F(PosixPlatform, DoesNotWaitForAPipeItIsToLookInto) {
+    TemporaryDirectory folder;
+    ASSERT_EQ(::mkfifo((folder.path() / "pipe").c_str(), 0600), 0);
+    EXPECT_FALSE(exportsFunction(folder.path() / "pipe", "QrGetComponentDescription"));
+}
+
+} // namespace

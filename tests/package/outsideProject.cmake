@@ -1,0 +1,31 @@
+# Installs `build` below `work`, builds the project `source` against that, and runs its host.
+function(run)
+  execute_process(COMMAND ${ARGN} RESULT_VARIABLE result OUTPUT_VARIABLE text ERROR_VARIABLE text)
+  if(NOT result EQUAL 0)
+    message(FATAL_ERROR "${ARGN}\n${text}")
+  endif()
+  set(output "${text}" PARENT_SCOPE)
+endfunction()
+
+file(REMOVE_RECURSE ${work})
+run(${CMAKE_COMMAND} --install ${build} --prefix ${work}/prefix)
+
+set(options -D CMAKE_PREFIX_PATH=${work}/prefix -D MZcomponentManager_DIR=${work}/prefix/lib/cmake/MZcomponentManager)
+if(toolchain)
+  list(APPEND options --toolchain ${toolchain})
+else()
+  list(APPEND options -D CMAKE_CXX_COMPILER=${compiler})
+endif()
+if(sanitize)
+  list(APPEND options -D CMAKE_CXX_FLAGS=-fsanitize=address,undefined)
+endif()
+run(${CMAKE_COMMAND} -S ${source} -B ${work}/build -G ${generator} ${options})
+run(${CMAKE_COMMAND} --build ${work}/build)
+
+# Windows programs look for libraries along this path; elsewhere it means nothing.
+set(ENV{WINEPATH} "${work}/prefix/bin;${build}/bin")
+run(${emulator} ${work}/build/helloHost${suffix} ${work}/build/components)
+string(STRIP "${output}" output)
+if(NOT output STREQUAL "Hello, world!")
+  message(FATAL_ERROR "the host said: ${output}")
+endif()

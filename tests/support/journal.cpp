@@ -1,0 +1,71 @@
+#include "tests/support/journal.h"
+
+#include <string>
+#include <vector>
+
+namespace Mz::Test {
+
+namespace {
+
+/// Never destroyed: components may write until the process ends.
+struct Journal {
+    std::vector<std::string> events;
+    std::string text;
+    void (*hook)(const char* event) = nullptr;
+    QrComponentManager* manager = nullptr;
+    std::wstring searchPath;
+};
+
+Journal& journal() {
+    static Journal& instance = *new Journal;
+    return instance;
+}
+
+} // namespace
+
+void note(const char* event) {
+    journal().events.emplace_back(event);
+    if (journal().hook)
+        journal().hook(event);
+}
+
+void setHook(void (*hook)(const char* event)) {
+    journal().hook = hook;
+}
+
+int noted(const char* event) {
+    int count = 0;
+    for (const std::string& known : journal().events)
+        count += known == event;
+    return count;
+}
+
+const char* allNotes() {
+    std::string& text = journal().text;
+    text.clear();
+    for (const std::string& event : journal().events)
+        text += event + " ";
+    return text.c_str();
+}
+
+void forgetNotes() {
+    journal().events.clear();
+}
+
+QrComponentManager* managerUnderTest() {
+    return journal().manager;
+}
+
+void setManagerUnderTest(QrComponentManager* manager) {
+    journal().manager = manager;
+}
+
+const wchar_t* searchPathUnderTest() {
+    return journal().searchPath.c_str();
+}
+
+void setSearchPathUnderTest(const wchar_t* path) {
+    journal().searchPath = path;
+}
+
+} // namespace Mz::Test

@@ -1,0 +1,38 @@
+/// What the tests need of the operating system: one description, one source for each system.
+#pragma once
+
+#include <filesystem>
+#include <string>
+#include <vector>
+
+namespace Mz::Test {
+
+/// Whether a library is mapped into this process from this very file.
+bool isMapped(const std::filesystem::path& library);
+
+/// Loads a library as a host does that wants it for itself; null when that fails.
+void* loadAsHost(const std::filesystem::path& library);
+void unloadAsHost(void* module);
+
+/// Makes the system treat the file as hidden, by its name or its attributes, and returns its path.
+std::filesystem::path hide(const std::filesystem::path& file);
+
+void setEnvironment(const std::string& name, const std::string& value);
+
+/// `path` as a search path that works on this system: absolute, and in the system's spelling.
+std::wstring searchPathOf(const std::filesystem::path& path);
+
+struct ProgramResult {
+    bool finished = false; ///< ended by itself, not by the system
+    int exitCode = -1;
+    std::string output; ///< standard output, lines ending in "\n"
+};
+
+/// Runs a program in `workingDirectory`, the environment being that of this process, and waits.
+/// The shared libraries of the build are found from wherever the program stands.
+/// `firstArgument` is what the program is told to be its own name.
+ProgramResult runProgram(const std::filesystem::path& program, const std::string& firstArgument,
+                         const std::vector<std::string>& arguments,
+                         const std::filesystem::path& workingDirectory);
+
+} // namespace Mz::Test

@@ -1,0 +1,85 @@
+#include "tests/support/testSystem.h"
+
+#include <cstdlib>
+#include <dlfcn.h>
+#include <fcntl.h>
+#include <fstream>
+#include <sys/wait.h>
+#include <unistd.h>
+
+namespace Mz::Test {
+
+bool isMapped(const std::filesystem::path& library) {
+    const std::string wanted = std::filesystem::canonical(library).string();
+    std::ifstream maps("/proc/self/maps");
+    for (std::string line; std::getline(maps, line);)
+        if (line.ends_with(" " + wanted))
+            return true;
+    return false;
+}
+
+void* loadAsHost(const std::filesystem::path& library) {
+    return ::dlopen(library.c_str(), RTLD_NOW | RTLD_LOCAL);
+}
+
+void unloadAsHost(void* module) {
+    ::dlclose(module);
+}
+
+std::filesystem::path hide(const std::filesystem::path& file) {
+    std::filesystem::path hidden = file.parent_path() / ("." + file.filename().string());
+    std::filesystem::rename(file, hidden);
+    return hidden;
+}
+
+void setEnvironment(const std::string& name, const std::string& value) {
+    ::setenv(name.c_str(), value.c_str(), 1);
+}
+
+std::wstring searchPathOf(const std::filesystem::path& path) {
+    return path.wstring();
+}
+
+namespace {
+
+[[noreturn]] void becomeProgram(const std::filesystem::path& program,
+                                const std::string& firstArgument,
+                                const std::vector<std::string>& arguments,
+                                const std::filesystem::path& workingDirectory, int output) {
+    std::vector<char*> pointers{const_cast<char*>(firstArgument.c_str())};
+    for (const std::string& argument : arguments)
+        pointers.push_back(const_cast<char*>(argument.c_str()));
+    pointers.push_back(nullptr);
+    ::dup2(output, STDOUT_FILENO);
+    ::dup2(::open("/dev/null", O_WRONLY), STDERR_FILENO);
+    if (::chdir(workingDirectory.c_str()) == 0)
+        ::execv(program.c_str(), pointers.data());
+    ::_exit(127);
+}
+
+} // namespace
+
+ProgramResult runProgram(const std::filesystem::path& program, const std::string& firstArgument,
+                         const std::vector<std::string>& arguments,
+                         const std::filesystem::path& workingDirectory) {
+    ProgramResult result;
+    int ends[2];
+    if (::pipe(ends) != 0)
+        return result;
+    const pid_t child = ::fork();
+    if (child == 0)
+        becomeProgram(program, firstArgument, arguments, workingDirectory, ends[1]);
+    ::close(ends[1]);
+    char block[4096];
+    for (ssize_t got; (got = ::read(ends[0], block, sizeof block)) > 0;)
+        result.output.append(block, static_cast<std::size_t>(got));
+    ::close(ends[0]);
+    int status = 0;
+    if (child > 0 && ::waitpid(child, &status, 0) == child) {
+        result.finished = WIFEXITED(status);
+        result.exitCode = result.finished ? WEXITSTATUS(status) : -1;
+    }
+    return result;
+}
+
+} // namespace Mz::Test

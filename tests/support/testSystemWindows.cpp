@@ -1,0 +1,107 @@
+#include "tests/support/testSystem.h"
+
+#include <algorithm>
+#include <cstdlib>
+#include <fstream>
+#include <iterator>
+#include <windows.h>
+
+namespace Mz::Test {
+
+namespace {
+
+std::wstring widened(const std::string& text) {
+    return std::filesystem::path(text).wstring();
+}
+
+std::wstring fullName(const std::filesystem::path& path) {
+    std::wstring name = std::filesystem::absolute(path).lexically_normal().wstring();
+    std::replace(name.begin(), name.end(), L'/', L'\\');
+    return name;
+}
+
+/// The dot says that a name without an extension has none.
+std::wstring loaderName(const std::filesystem::path& path) {
+    return fullName(path) + (path.has_extension() ? L"" : L".");
+}
+
+std::wstring quoted(const std::string& argument) {
+    return L"\"" + widened(argument) + L"\"";
+}
+
+} // namespace
+
+bool isMapped(const std::filesystem::path& library) {
+    return ::GetModuleHandleW(loaderName(library).c_str()) != nullptr;
+}
+
+void* loadAsHost(const std::filesystem::path& library) {
+    return ::LoadLibraryW(loaderName(library).c_str());
+}
+
+void unloadAsHost(void* module) {
+    ::FreeLibrary(static_cast<HMODULE>(module));
+}
+
+std::filesystem::path hide(const std::filesystem::path& file) {
+    ::SetFileAttributesW(file.c_str(), FILE_ATTRIBUTE_HIDDEN);
+    return file;
+}
+
+void setEnvironment(const std::string& name, const std::string& value) {
+    // Both the system's and the C runtime's.
+    ::_wputenv((widened(name) + L"=" + widened(value)).c_str());
+}
+
+std::wstring searchPathOf(const std::filesystem::path& path) {
+    return fullName(path);
+}
+
+ProgramResult runProgram(const std::filesystem::path& program, const std::string& firstArgument,
+                         const std::vector<std::string>& arguments,
+                         const std::filesystem::path& workingDirectory) {
+    ProgramResult result;
+    std::wstring commandLine = quoted(firstArgument);
+    for (const std::string& argument : arguments)
+        commandLine += L" " + quoted(argument);
+    // The shared libraries stand beside the running test.
+    wchar_t own[MAX_PATH];
+    ::GetModuleFileNameW(nullptr, own, MAX_PATH);
+    ::SetEnvironmentVariableW(L"PATH", std::filesystem::path(own).parent_path().c_str());
+
+    const std::filesystem::path outputFile =
+        std::filesystem::temp_directory_path() /
+        ("mz-output-" + std::to_string(::GetCurrentProcessId()) + ".txt");
+    SECURITY_ATTRIBUTES inherited{sizeof inherited, nullptr, TRUE};
+    const HANDLE output = ::CreateFileW(outputFile.c_str(), GENERIC_WRITE, FILE_SHARE_READ,
+                                        &inherited, CREATE_ALWAYS, 0, nullptr);
+    STARTUPINFOW startup{};
+    startup.cb = sizeof startup;
+    startup.dwFlags = STARTF_USESTDHANDLES;
+    startup.hStdOutput = output;
+    startup.hStdError = ::GetStdHandle(STD_ERROR_HANDLE);
+    startup.hStdInput = ::GetStdHandle(STD_INPUT_HANDLE);
+    PROCESS_INFORMATION process{};
+    const bool started =
+        ::CreateProcessW(fullName(program).c_str(), commandLine.data(), nullptr, nullptr, TRUE, 0,
+                         nullptr, fullName(workingDirectory).c_str(), &startup, &process);
+    ::CloseHandle(output);
+    if (started) {
+        ::WaitForSingleObject(process.hProcess, INFINITE);
+        DWORD code = 0;
+        ::GetExitCodeProcess(process.hProcess, &code);
+        // What the system or the runtime ends a process with lies above what programs return.
+        result.finished = code < 256 && code != 3;
+        result.exitCode = static_cast<int>(code);
+        ::CloseHandle(process.hThread);
+        ::CloseHandle(process.hProcess);
+    }
+    std::ifstream file(outputFile, std::ios::binary);
+    result.output.assign(std::istreambuf_iterator<char>(file), {});
+    file.close();
+    std::erase(result.output, '\r');
+    std::filesystem::remove(outputFile);
+    return result;
+}
+
+} // namespace Mz::Test
