@@ -53,16 +53,16 @@ TEST(Layout, OfUidsIsFourLittleEndianWords) {
     EXPECT_EQ(std::memcmp(bytes, expected, sizeof bytes), 0);
 }
 
-TEST(Uids, AreThoseThatComponentsWereBuiltWith) {
-    EXPECT_EQ(QrBufferedIO::uid, (QrUid{0x81C8DF23, 0xA78111D1, 0x988A4445, 0x53540000}));
-    EXPECT_EQ(QrBuilderDescription::uid, (QrUid{0xAD148680, 0x719A11D1, 0xA3BB0060, 0x9707609D}));
-    EXPECT_EQ(QrComponentBuilder::uid, (QrUid{0xAD148681, 0x719A11D1, 0xA3BB0060, 0x9707609D}));
-    EXPECT_EQ(QrImportBuilder::uid, (QrUid{0xAD148682, 0x719A11D1, 0xA3BB0060, 0x9707609D}));
-    EXPECT_EQ(QrComponentDescription::uid, (QrUid{0xAD148683, 0x719A11D1, 0xA3BB0060, 0x9707609D}));
-    EXPECT_EQ(QrComponentManager::uid, (QrUid{0xAD148684, 0x719A11D1, 0xA3BB0060, 0x9707609D}));
-    EXPECT_EQ(QrImporter::uid, (QrUid{0xAD148685, 0x719A11D1, 0xA3BB0060, 0x9707609D}));
-    EXPECT_EQ(QrProcessControl::uid, (QrUid{0xEB719621, 0xC02011D1, 0xAA7A00C0, 0x4FB1532A}));
-}
+// The identities that components were built with. `clientUids.cpp` proves that they can be linked.
+static_assert(QrBufferedIO::uid == QrUid{0x81C8DF23, 0xA78111D1, 0x988A4445, 0x53540000});
+static_assert(QrBuilderDescription::uid == QrUid{0xAD148680, 0x719A11D1, 0xA3BB0060, 0x9707609D});
+static_assert(QrComponentBuilder::uid == QrUid{0xAD148681, 0x719A11D1, 0xA3BB0060, 0x9707609D});
+static_assert(QrImportBuilder::uid == QrUid{0xAD148682, 0x719A11D1, 0xA3BB0060, 0x9707609D});
+static_assert(QrComponentDescription::uid ==
+              QrUid{0xAD148683, 0x719A11D1, 0xA3BB0060, 0x9707609D});
+static_assert(QrComponentManager::uid == QrUid{0xAD148684, 0x719A11D1, 0xA3BB0060, 0x9707609D});
+static_assert(QrImporter::uid == QrUid{0xAD148685, 0x719A11D1, 0xA3BB0060, 0x9707609D});
+static_assert(QrProcessControl::uid == QrUid{0xEB719621, 0xC02011D1, 0xAA7A00C0, 0x4FB1532A});
 
 TEST(PlainFunctions, HaveTheirSignatures) {
     static_assert(std::is_same_v<decltype(QrGetComponentManager), QrComponentManager*()>);

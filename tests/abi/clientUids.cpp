@@ -1,0 +1,14 @@
+/// A client that casts to every interface, and so needs the identity of each from the library.
+#include "components/componentManager/componentImp.h"
+#include "components/componentManager/importer.h"
+#include "components/componentManager/processControl.h"
+
+using namespace Mz;
+
+int main() {
+    QrCastable* const object = QrGetComponentManager();
+    return !queryCast<QrComponentManager>(object) || queryCast<QrBufferedIO>(object) ||
+           queryCast<QrBuilderDescription>(object) || queryCast<QrComponentBuilder>(object) ||
+           queryCast<QrComponentDescription>(object) || queryCast<QrImportBuilder>(object) ||
+           queryCast<QrImporter>(object) || queryCast<QrProcessControl>(object);
+}
