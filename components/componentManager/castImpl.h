@@ -3,8 +3,8 @@
 /// Pick by two questions, which interfaces and who owns the object:
 ///
 ///     class Gauge : public QrCastImpl<Gauge, IGauge>                            // static or local
-///     class Mesh  : public QrCastRef<QrCastHeap<QrCastImpl<Mesh, IMesh>>>       // counted, on
-///     heap class Both  : public QrCastRef<QrCastHeap<QrCastMulti<Both, IMesh, IShape>>>
+///     class Mesh  : public QrCastRef<QrCastHeap<QrCastImpl<Mesh, IMesh>>>       // counted
+///     class Both  : public QrCastRef<QrCastHeap<QrCastMulti<Both, IMesh, IShape>>>
 ///
 /// The parameter `Arg` of these templates is a tag that only keeps instances of different classes
 /// apart; leave it at its default.

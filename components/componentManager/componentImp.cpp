@@ -23,6 +23,7 @@ ComponentManager::ComponentManager() = default;
 ComponentManager::~ComponentManager() {
     // Libraries that call the manager while they are unloaded find it as if it had never started.
     initialised = false;
+    initialising = true; // For good: whoever comes now must not start it again.
     builderIndex.clear();
     while (!libraries.empty())
         libraries.pop_back();

@@ -58,7 +58,8 @@ bool ComponentManager::ensureLoaded(ComponentLibrary& library, bool forUse) {
     if (unchanged && (!forUse || library.builders.empty()))
         return !library.builders.empty();
 
-    if (!loadModule(library)) {
+    // What is no regular file any more must not even be opened: a pipe would keep us waiting.
+    if (!status->regular || !loadModule(library)) {
         // Noted all the same, so that the file is not tried again until it changes.
         library.noteFile(*status);
         dropBuilders(library);
@@ -70,12 +71,15 @@ bool ComponentManager::ensureLoaded(ComponentLibrary& library, bool forUse) {
 bool ComponentManager::loadModule(ComponentLibrary& library) {
     const platform::NativePath path = library.openingPath();
     const platform::QuietErrors quiet;
-    library.module = platform::findLoadedLibrary(path);
-    library.loadedByManager = !library.module;
-    if (!library.module && platform::exportsFunction(path, entryPointName))
-        library.module = platform::loadLibrary(path);
-    library.loadedByManager = library.loadedByManager && library.module;
-    return library.module != nullptr;
+    platform::Module module = platform::findLoadedLibrary(path);
+    const bool mapped = module != nullptr;
+    if (!mapped && platform::exportsFunction(path, entryPointName))
+        module = platform::loadLibrary(path);
+    // Only now: initialisers of the library may have asked for one of its builders meanwhile, and
+    // found it mapped.
+    library.module = module;
+    library.loadedByManager = module && !mapped;
+    return module != nullptr;
 }
 
 bool ComponentManager::registerLibrary(ComponentLibrary& library,

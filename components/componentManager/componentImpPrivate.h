@@ -31,7 +31,7 @@ class MZ_COMPONENT_MANAGER_API ComponentManager final
 
     /// Directory and file name of a library, both normalised.
     using LibraryKey = std::pair<std::wstring, std::wstring>;
-    struct LibraryKeyHash {
+    struct MZ_COMPONENT_MANAGER_API LibraryKeyHash {
         std::size_t operator()(const LibraryKey& key) const;
     };
     using LibraryList = std::list<ComponentLibrary>;

@@ -94,8 +94,8 @@ Module loadLibrary(const NativePath& path);
 /// Gives back one load.
 void unloadLibrary(Module module);
 
-/// The address of `symbol` in that very library, not in one it depends on; null when it has none or
-/// `module` is null.
+/// The address of the function `symbol` in that very library, not in one it depends on; null when
+/// it has none, when that is no code, and when `module` is null.
 void* findSymbol(Module module, const char* symbol);
 
 /// Keeps the system from showing dialogs to the user, for as long as it lives, on loads that fail.

@@ -8,6 +8,7 @@
 #include <elf.h>
 #include <optional>
 #include <string_view>
+#include <sys/stat.h>
 #include <type_traits>
 #include <unistd.h>
 #include <vector>
@@ -26,7 +27,11 @@ constexpr std::size_t maximumChainLength = 4096;
 /// call.
 class FileBlocks {
   public:
-    explicit FileBlocks(int descriptor) : descriptor(descriptor) {}
+    explicit FileBlocks(int descriptor) : descriptor(descriptor) {
+        struct stat status;
+        if (::fstat(descriptor, &status) == 0)
+            fileSize = static_cast<std::uint64_t>(status.st_size);
+    }
 
     /// The `T` at `offset`; nothing when the file ends before it is whole.
     template <class T>
@@ -50,6 +55,11 @@ class FileBlocks {
         older = block == &blocks[0] ? 1 : 0;
         std::memcpy(data, block->bytes.data() + (offset - block->offset), size);
         return true;
+    }
+
+    /// Whether the file has all of these bytes.
+    bool reaches(std::uint64_t offset, std::uint64_t size) const {
+        return size <= fileSize && offset <= fileSize - size;
     }
 
   private:
@@ -89,6 +99,7 @@ class FileBlocks {
     }
 
     int descriptor;
+    std::uint64_t fileSize = 0;
     std::array<Block, 2> blocks;
     std::size_t older = 0; ///< the block to fill next
 };
@@ -100,6 +111,7 @@ struct DynamicTables {
     std::uint64_t stringsSize = 0;
     std::uint64_t gnuHash = 0;
     std::uint64_t hash = 0;
+    bool program = false; ///< position-independent, but to be started and not to be loaded
 };
 
 class ElfLibrary {
@@ -120,10 +132,16 @@ class ElfLibrary {
             header->e_type != ET_DYN || header->e_machine != EM_X86_64 ||
             header->e_phentsize != sizeof(Elf64_Phdr) || header->e_phnum > maximumSegments)
             return false;
+        // The section headers stand at the end, as a rule: a file that was cut off lacks them.
+        if (!file.reaches(header->e_shoff, header->e_shnum * std::uint64_t{header->e_shentsize}))
+            return false;
         for (std::size_t index = 0; index < header->e_phnum; ++index) {
             const auto segment =
                 file.read<Elf64_Phdr>(header->e_phoff + index * sizeof(Elf64_Phdr));
             if (!segment)
+                return false;
+            // The system maps what is not there as well, and ends the process that touches it.
+            if (segment->p_type == PT_LOAD && !file.reaches(segment->p_offset, segment->p_filesz))
                 return false;
             if (segment->p_type == PT_LOAD)
                 loaded.push_back(*segment);
@@ -144,7 +162,8 @@ class ElfLibrary {
                 break;
             note(*entry);
         }
-        return tables.symbols && tables.strings && (tables.gnuHash || tables.hash);
+        return !tables.program && tables.symbols && tables.strings &&
+               (tables.gnuHash || tables.hash);
     }
 
     void note(const Elf64_Dyn& entry) {
@@ -160,6 +179,9 @@ class ElfLibrary {
             break;
         case DT_GNU_HASH:
             tables.gnuHash = entry.d_un.d_ptr;
+            break;
+        case DT_FLAGS_1:
+            tables.program = (entry.d_un.d_val & DF_1_PIE) != 0;
             break;
         case DT_HASH:
             tables.hash = entry.d_un.d_ptr;

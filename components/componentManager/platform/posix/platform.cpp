@@ -75,20 +75,36 @@ void sortByName(std::vector<DirectoryEntry>& entries) {
     entries.swap(sorted);
 }
 
-/// Whether the address lies in that very library.
-bool isIn(Module module, void* address) {
-    link_map* wanted = nullptr;
-    if (::dlinfo(module, RTLD_DI_LINKMAP, &wanted) != 0)
+/// What `isCodeOf` looks for among the loaded libraries.
+struct CodeSearch {
+    ElfW(Addr) base;
+    ElfW(Addr) address;
+    bool found;
+};
+
+/// Looks at one loaded library; not zero ends the walk.
+int lookForCode(dl_phdr_info* library, std::size_t, void* data) {
+    auto& search = *static_cast<CodeSearch*>(data);
+    if (library->dlpi_addr != search.base)
+        return 0;
+    for (std::size_t index = 0; index < library->dlpi_phnum; ++index) {
+        const ElfW(Phdr)& segment = library->dlpi_phdr[index];
+        if (segment.p_type == PT_LOAD && (segment.p_flags & PF_X) &&
+            search.address - search.base - segment.p_vaddr < segment.p_memsz)
+            search.found = true;
+    }
+    return 1;
+}
+
+/// Whether the address lies in the code of that very library: neither in one that it depends on,
+/// nor in its data.
+bool isCodeOf(Module module, void* address) {
+    link_map* library = nullptr;
+    if (::dlinfo(module, RTLD_DI_LINKMAP, &library) != 0)
         return false;
-#if __GLIBC_PREREQ(2, 35)
-    // Finds the library at once, where the other way goes through all that are loaded.
-    dl_find_object owner;
-    return ::_dl_find_object(address, &owner) == 0 && owner.dlfo_link_map == wanted;
-#else
-    void* owner = nullptr;
-    Dl_info ignored;
-    return ::dladdr1(address, &ignored, &owner, RTLD_DL_LINKMAP) != 0 && owner == wanted;
-#endif
+    CodeSearch search{library->l_addr, reinterpret_cast<ElfW(Addr)>(address), false};
+    ::dl_iterate_phdr(lookForCode, &search);
+    return search.found;
 }
 
 } // namespace
@@ -187,7 +203,7 @@ void* findSymbol(Module module, const char* symbol) {
     if (!address)
         return nullptr;
     // The search goes through the dependencies as well, whose symbols do not count.
-    return isIn(module, address) ? address : nullptr;
+    return isCodeOf(module, address) ? address : nullptr;
 }
 
 QuietErrors::QuietErrors() : previousMode(0) {}

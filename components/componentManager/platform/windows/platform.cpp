@@ -73,6 +73,15 @@ class Listing {
     std::intptr_t handle;
 };
 
+/// Whether what stands there can be called.
+bool isCode(const void* address) {
+    constexpr DWORD executable =
+        PAGE_EXECUTE | PAGE_EXECUTE_READ | PAGE_EXECUTE_READWRITE | PAGE_EXECUTE_WRITECOPY;
+    MEMORY_BASIC_INFORMATION memory{};
+    return ::VirtualQuery(address, &memory, sizeof memory) != 0 &&
+           (memory.Protect & executable) != 0;
+}
+
 bool isDirectory(const NativePath& path) {
     struct _stat64 status;
     return ::_wstat64(path.c_str(), &status) == 0 && (status.st_mode & S_IFMT) == S_IFDIR;
@@ -179,7 +188,7 @@ void* findSymbol(Module module, const char* symbol) {
         GET_MODULE_HANDLE_EX_FLAG_FROM_ADDRESS | GET_MODULE_HANDLE_EX_FLAG_UNCHANGED_REFCOUNT;
     if (!::GetModuleHandleExW(flags, static_cast<const wchar_t*>(address), &owner))
         return nullptr;
-    return owner == module ? address : nullptr;
+    return owner == module && isCode(address) ? address : nullptr;
 }
 
 QuietErrors::QuietErrors()
