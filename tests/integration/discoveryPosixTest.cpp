@@ -214,8 +214,9 @@ TEST_F(PosixDiscovery, PassesOverFilesThatMayNotBeRead) {
     add(L"goodWithKit", "zz");
     // The superuser may read everything, so be somebody else for the while.
     const uid_t before = ::geteuid();
-    if (before == 0)
+    if (before == 0) {
         ASSERT_EQ(::seteuid(65534), 0);
+    }
     initialize();
     ASSERT_EQ(::seteuid(before), 0);
     EXPECT_FALSE(find(file)->module);

@@ -36,6 +36,8 @@ ByteReader::ByteReader(Mz::QrBufferedIO& io, Mz::QrProcessControl* controller)
       total(remainingBytes(io)) {}
 
 bool ByteReader::fill() {
+    if (ended)
+        return false;
     checkpoint();
     blockOffset += filled;
     position = 0;
@@ -47,7 +49,8 @@ bool ByteReader::fill() {
             break;
         filled += static_cast<std::size_t>(std::min(count, wanted));
     }
-    return filled > 0;
+    ended = filled == 0;
+    return !ended;
 }
 
 void ByteReader::checkpoint() {

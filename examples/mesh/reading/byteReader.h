@@ -60,6 +60,7 @@ class ByteReader {
     std::size_t position = 0;
     std::size_t filled = 0;
     std::uint64_t blockOffset = 0;
+    bool ended = false; ///< nothing comes behind this block
     std::optional<std::uint64_t> total;
 };
 
