@@ -71,7 +71,7 @@ layers)
     included components/componentKit 'components/(objectIO|componentTools)' |
         complain "the kit needs the component manager only"
     included examples 'tests|benchmarks|fuzz' | complain "an example that needs the tests"
-    search '#[[:space:]]*include[[:space:]]*"\.\./' $(sources components examples tests) |
+    search '#[[:space:]]*include[[:space:]]*"\.\./' $(sources components tests tools) |
         complain "includes that climb"
     search '#[[:space:]]*include[[:space:]]*"components/[^"]*(Private|platform/|hashMap|ioGuard|neverDestroyed|systemController|threadHash|inputFile)' \
         $(sources components/componentKit examples) |

@@ -48,7 +48,7 @@ breaks layers components/base/a.cpp '#include "components/componentManager/cast.
 breaks layers $manager/a.h '#include "tests/support/a.h"'
 breaks layers $manager/a.h '#include <components/componentKit/componentKit.h>'
 breaks layers examples/a/b.cpp '#include "components/componentManager/componentImpPrivate.h"'
-breaks layers examples/a/b.cpp '#include "../c.h"'
+breaks layers tests/a/b.cpp '#include "../c.h"'
 keeps layers components/componentKit/a.h '#include "components/componentManager/cast.h"'
 breaks moduleOrder $manager/cast.h '#include "components/componentManager/bufferio.h"'
 breaks moduleOrder $manager/bufferioInput.cpp '#include "components/componentManager/importer.h"'

@@ -58,8 +58,7 @@ static_assert(QrBufferedIO::uid == QrUid{0x81C8DF23, 0xA78111D1, 0x988A4445, 0x5
 static_assert(QrBuilderDescription::uid == QrUid{0xAD148680, 0x719A11D1, 0xA3BB0060, 0x9707609D});
 static_assert(QrComponentBuilder::uid == QrUid{0xAD148681, 0x719A11D1, 0xA3BB0060, 0x9707609D});
 static_assert(QrImportBuilder::uid == QrUid{0xAD148682, 0x719A11D1, 0xA3BB0060, 0x9707609D});
-static_assert(QrComponentDescription::uid ==
-              QrUid{0xAD148683, 0x719A11D1, 0xA3BB0060, 0x9707609D});
+static_assert(QrComponentDescription::uid == QrUid{0xAD148683, 0x719A11D1, 0xA3BB0060, 0x9707609D});
 static_assert(QrComponentManager::uid == QrUid{0xAD148684, 0x719A11D1, 0xA3BB0060, 0x9707609D});
 static_assert(QrImporter::uid == QrUid{0xAD148685, 0x719A11D1, 0xA3BB0060, 0x9707609D});
 static_assert(QrProcessControl::uid == QrUid{0xEB719621, 0xC02011D1, 0xAA7A00C0, 0x4FB1532A});

@@ -90,6 +90,62 @@ TEST(QrCastImpl, TakesExactlyOneReferenceForAnAnswerAndNoneOtherwise) {
     EXPECT_EQ(probe.references, 1);
 }
 
+/// Nobody can count what a final class does not count, and a final class that counts is asked to.
+class FinalGauge final : public QrCastImpl<FinalGauge, Gauge> {
+  public:
+    int value() const override { return 1; }
+};
+
+class FinalCounting final : public QrCastImpl<FinalCounting, Gauge> {
+  public:
+    int value() const override { return 2; }
+    long newReference() override { return ++references; }
+    long references = 0;
+};
+
+class FinalCounted final : public QrCastRef<QrCastHeap<QrCastImpl<FinalCounted, Gauge>>> {
+  public:
+    int value() const override { return 3; }
+};
+
+class FinalMulti final : public QrCastRef<QrCastHeap<QrCastMulti<FinalMulti, Gauge, Dial>>> {
+  public:
+    int value() const override { return 4; }
+    int mark() const override { return 5; }
+};
+
+TEST(FinalClass, TakesTheReferenceOfAnAnswerLikeAnyOther) {
+    FinalGauge gauge;
+    EXPECT_EQ(gauge.getInterface(Gauge::uid), &gauge);
+    FinalCounting counting;
+    EXPECT_EQ(counting.getInterface(Gauge::uid), &counting);
+    EXPECT_EQ(counting.references, 1);
+    auto* const counted = new FinalCounted;
+    EXPECT_EQ(counted->getInterface(Gauge::uid), counted);
+    EXPECT_EQ(counted->newReference(), 1);
+    EXPECT_EQ(counted->release(), 0);
+    EXPECT_EQ(counted->release(), -1);
+    auto* const multi = new FinalMulti;
+    QrCastable* const dial = multi->getInterface(Dial::uid);
+    EXPECT_EQ(static_cast<Dial*>(dial)->mark(), 5);
+    EXPECT_EQ(dial->newReference(), 1);
+    EXPECT_EQ(dial->release(), 0);
+    EXPECT_EQ(dial->release(), -1);
+}
+
+/// A class behind the one that the template was told of may count where that one does not.
+class CountingBehind : public PlainGauge {
+  public:
+    long newReference() override { return ++references; }
+    long references = 0;
+};
+
+TEST(QrCastImpl, AsksAClassDerivedFromItsImplementationToCount) {
+    CountingBehind gauge;
+    EXPECT_EQ(gauge.getInterface(Gauge::uid), &gauge);
+    EXPECT_EQ(gauge.references, 1);
+}
+
 class HeapGauge : public QrCastHeap<QrCastImpl<HeapGauge, Gauge>> {
   public:
     explicit HeapGauge(bool& gone) : gone(gone) {}
