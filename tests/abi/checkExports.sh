@@ -12,7 +12,7 @@ exported() {
     case $list in
     *.linux.txt) "$tool" -D --defined-only "$library" | awk '$2 ~ /^[TDBRV]$/ {print $3}' ;;
     *.windows.txt) "$tool" -p "$library" |
-        awk '/\[Ordinal\/Name Pointer\] Table/ {on=1; next} on && !NF {exit}
+        awk '/\[Ordinal\/Name Pointer\] Table/ {on=1; next} !NF {on=0}
              on && match($0, /\] */) {print $NF}' ;;
     esac | "$demangler" | grep -E '^(Qr|(.* (for|to) )?Mz::)' | LC_ALL=C sort -u
 }
