@@ -9,6 +9,8 @@ using namespace Meshes;
 
 namespace {
 
+constexpr QrUid importerUid = QrImporter::uid;
+
 class NameCounter final : public QrEnumerator<QrCPtr<QrBuilderDescription>> {
   public:
     Action process(QrCPtr<QrBuilderDescription> builder) override {
@@ -25,16 +27,19 @@ TEST(MeshImporter, IsMadeByABuilder) {
     const QrRef<QrCastable> object = QrGetComponentManager()->createObject(meshImporterBuilderUid);
     ASSERT_TRUE(object);
     EXPECT_TRUE(object->hasInterface(MeshImporter::uid));
-    EXPECT_TRUE(object->hasInterface(QrImporter::uid));
+    EXPECT_TRUE(object->hasInterface(importerUid));
     EXPECT_FALSE(object->hasInterface(Mesh::uid));
     EXPECT_EQ(queryCast<Mesh>(object.get()), nullptr);
 }
 
 TEST(MeshImporter, AnswersForTheImporterItIs) {
     const QrPtr<MeshImporter> importer = meshImporter();
-    const QrPtr<QrImporter> base = queryCast<QrImporter>(importer.get());
+    const auto base =
+        QrPtr<QrImporter>::adopt(static_cast<QrImporter*>(importer->getInterface(importerUid)));
     ASSERT_TRUE(base);
     EXPECT_EQ(base.get(), importer.get());
+    EXPECT_EQ(base->newReference(), 2);
+    EXPECT_EQ(base->release(), 1);
     EXPECT_EQ(std::wstring(base->getBuilderName()), L"mesh");
 }
 
