@@ -5,11 +5,7 @@ set(CMAKE_CXX_STANDARD 20)
 set(CMAKE_CXX_STANDARD_REQUIRED ON)
 set(CMAKE_CXX_EXTENSIONS OFF)
 set(CMAKE_CXX_VISIBILITY_PRESET hidden)
-# On Windows this would also leave out what is defined in the headers of exported classes, such as
-# the identities of interfaces, unless the library happens to use it itself.
-if(NOT WIN32)
-  set(CMAKE_VISIBILITY_INLINES_HIDDEN ON)
-endif()
+set(CMAKE_VISIBILITY_INLINES_HIDDEN ON)
 set(CMAKE_POSITION_INDEPENDENT_CODE ON)
 set(CMAKE_LINK_DEPENDS_NO_SHARED ON)
 

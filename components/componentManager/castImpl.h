@@ -189,7 +189,8 @@ class QrCastRef : public Base {
 ///
 /// It answers for its own interface itself and leaves every other question to the owner; the
 /// principal object is the owner's. `destroy` disposes of the companion, then asks the owner to
-/// dispose of itself.
+/// dispose of itself, then gives the reference on the owner back: an owner whose `destroy` deletes
+/// it must not have companions that are destroyed so.
 template <class Owner, class Base>
 class QrTempObject : public Base {
   public:

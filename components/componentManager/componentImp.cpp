@@ -40,8 +40,7 @@ QrRefPtr<QrComponentBuilder> ComponentManager::getBuilder(const QrUid& uid) {
     return QrRefPtr<QrComponentBuilder>::adopt(const_cast<QrComponentBuilder*>(result.detach()));
 }
 
-QrEnum::Action
-ComponentManager::enumerateBuilders(QrEnumerator<QrCPtr<QrBuilderDescription>>& e) {
+QrEnum::Action ComponentManager::enumerateBuilders(QrEnumerator<QrCPtr<QrBuilderDescription>>& e) {
     if (!initialised)
         return e.finished();
     for (ComponentLibrary& library : libraries) {
@@ -59,7 +58,11 @@ ComponentManager::enumerateBuilders(QrEnumerator<QrCPtr<QrBuilderDescription>>& 
 void ComponentManager::initialize(const wchar_t* searchPath) {
     if (initialised || initialising)
         return;
-    initialising = true;
+    struct Initialising {
+        bool& flag;
+        explicit Initialising(bool& value) : flag(value) { flag = true; }
+        ~Initialising() { flag = false; }
+    } const guard(initialising);
     LibraryList recorded;
     recorded.swap(libraries);
     {
@@ -70,7 +73,6 @@ void ComponentManager::initialize(const wchar_t* searchPath) {
     recorded.clear();
     for (ComponentLibrary& library : libraries)
         ensureLoaded(library, false);
-    initialising = false;
     initialised = true;
 }
 

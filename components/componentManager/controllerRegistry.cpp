@@ -36,12 +36,12 @@ struct ThreadControllers {
 constinit NeverDestroyed<ThreadControllers> threads;
 
 /// Counts the changes to `threads`, so that a thread knows whether what it remembers still holds.
-constinit std::atomic<std::uint32_t> generation{1};
+constinit std::atomic<std::uint64_t> generation{1};
 
 /// What a thread found when it last looked. It is checked against the generation, and so a later
 /// thread with the same identifier finds what its predecessor left, as any look-up would.
 struct Remembered {
-    std::uint32_t generation = 0;
+    std::uint64_t generation = 0;
     QrProcessControl* controller = nullptr;
 };
 

@@ -23,22 +23,21 @@ const wchar_t* textOf(const wchar_t* text) {
 }
 
 QrPtr<QrComponentManager> componentManager() {
-    return QrPtr<QrComponentManager>::adopt(
-        safeCast<QrComponentManager>(QrGetComponentManager()));
+    return QrPtr<QrComponentManager>::adopt(safeCast<QrComponentManager>(QrGetComponentManager()));
 }
 
 /// Picks the import builders of one importer from all the builders of the manager.
 class BaseImportEnumerator : public QrEnumerator<const QrImportBuilder*>,
                              public QrEnumerator<QrCPtr<QrBuilderDescription>> {
   public:
-    explicit BaseImportEnumerator(const wchar_t* builderName) : builderName(builderName) {}
+    explicit BaseImportEnumerator(const wchar_t* name) : builderName(textOf(name)) {}
 
     using QrEnumerator<const QrImportBuilder*>::process;
 
     Action process(QrCPtr<QrBuilderDescription> item) override {
         const auto description =
             QrCPtr<QrBuilderDescription>::adopt(safeCast<QrBuilderDescription>(item.get()));
-        if (description->getName() != builderName)
+        if (textOf(description->getName()) != builderName)
             return Continue;
         const QrCRefPtr<QrComponentBuilder> builder = description->getBuilder();
         const QrCPtr<QrImportBuilder> importBuilder = queryCast<QrImportBuilder>(builder.get());
@@ -170,8 +169,7 @@ const wchar_t* QrBaseImporter::getDefaultSearch() const {
     return nullptr;
 }
 
-QrEnum::Action
-QrBaseImporter::enumerateObjects(QrEnumerator<QrCPtr<QrImportBuilder>>& e) const {
+QrEnum::Action QrBaseImporter::enumerateObjects(QrEnumerator<QrCPtr<QrImportBuilder>>& e) const {
     ObjectEnumerator objects(getBuilderName(), e);
     return componentManager()->enumerateBuilders(objects);
 }

@@ -1,6 +1,8 @@
 /// The smart references to castable objects.
 #pragma once
 
+#include "components/base/export.h"
+
 #include <cstddef>
 #include <type_traits>
 #include <utility>
@@ -22,7 +24,7 @@ namespace Mz {
 ///
 /// Five names exist for it, which say at a glance what a result is for.
 template <class T>
-class QrReference {
+class MZ_SHARED_TYPE QrReference {
   public:
     using element_type = T;
 
@@ -36,14 +38,14 @@ class QrReference {
     QrReference(QrReference&& other) noexcept : held(other.detach()) {}
 
     template <class U>
-        requires std::is_convertible_v<U*, T*>
-    QrReference(const QrReference<U>& other) : held(other.get()) {
+    requires std::is_convertible_v<U*, T*> QrReference(const QrReference<U>& other)
+        : held(other.get()) {
         take();
     }
 
     template <class U>
-        requires std::is_convertible_v<U*, T*>
-    QrReference(QrReference<U>&& other) noexcept : held(other.detach()) {}
+    requires std::is_convertible_v<U*, T*> QrReference(QrReference<U>&& other)
+    noexcept : held(other.detach()) {}
 
     ~QrReference() { reset(); }
 
@@ -58,14 +60,12 @@ class QrReference {
         return *this;
     }
     template <class U>
-        requires std::is_convertible_v<U*, T*>
-    QrReference& operator=(const QrReference<U>& other) {
+    requires std::is_convertible_v<U*, T*> QrReference& operator=(const QrReference<U>& other) {
         QrReference(other).swap(*this);
         return *this;
     }
     template <class U>
-        requires std::is_convertible_v<U*, T*>
-    QrReference& operator=(QrReference<U>&& other) noexcept {
+    requires std::is_convertible_v<U*, T*> QrReference& operator=(QrReference<U>&& other) noexcept {
         QrReference(std::move(other)).swap(*this);
         return *this;
     }

@@ -165,7 +165,8 @@ std::vector<DirectoryEntry> listCandidates(const NativePath& directory) {
 bool openForReading(std::ifstream& stream, const NativePath& path) {
     stream.open(path, std::ios::in | std::ios::binary);
     // A directory opens like a file here and only refuses to be read.
-    if (stream.good() && std::filesystem::is_directory(path)) {
+    std::error_code ignored;
+    if (stream.good() && std::filesystem::is_directory(path, ignored)) {
         stream.close();
         stream.setstate(std::ios::failbit);
     }
@@ -173,7 +174,7 @@ bool openForReading(std::ifstream& stream, const NativePath& path) {
 }
 
 Module findLoadedLibrary(const NativePath& path) {
-    const Module module = ::dlopen(path.c_str(), RTLD_NOW | RTLD_LOCAL | RTLD_NOLOAD);
+    const Module module = ::dlopen(path.c_str(), RTLD_LAZY | RTLD_LOCAL | RTLD_NOLOAD);
     if (module)
         ::dlclose(module);
     return module;
