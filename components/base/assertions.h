@@ -9,7 +9,8 @@ namespace Mz {
 
 class Assertions {
   public:
-    /// Thrown by `throwProgramAborted`. Its reason, which `what()` gives too, is "Program aborted.".
+    /// Thrown by `throwProgramAborted`. Its reason, which `what()` gives too, is "Program
+    /// aborted.".
     class MZ_BASE_API ExProgramAborted : public std::runtime_error, public ExBase {
       public:
         ExProgramAborted(const char* file, int line);

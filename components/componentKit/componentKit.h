@@ -21,12 +21,12 @@ namespace Mz::Kit {
 /// What a builder says of itself. The texts are kept as pointers, so they must live as long as the
 /// library; literals do.
 struct BuilderInfo {
-    QrUid uid;                   ///< the builder's identity; make a new one for each builder
-    const wchar_t* name = L"";   ///< by which importers find it
-    const wchar_t* label = L"";  ///< for people; importers show it in file dialogs
-    const wchar_t* text = L"";   ///< a longer one
-    unsigned int number = 0;     ///< whatever you agree on with your clients
-    bool flag = false;           ///< likewise
+    QrUid uid;                  ///< the builder's identity; make a new one for each builder
+    const wchar_t* name = L"";  ///< by which importers find it
+    const wchar_t* label = L""; ///< for people; importers show it in file dialogs
+    const wchar_t* text = L"";  ///< a longer one
+    unsigned int number = 0;    ///< whatever you agree on with your clients
+    bool flag = false;          ///< likewise
 };
 
 /// The base of a builder, `Impl`, that also answers for `Ifaces`: describes itself and stands for
@@ -34,8 +34,9 @@ struct BuilderInfo {
 ///
 /// Counted, so it stands on the heap.
 template <class Impl, class... Ifaces>
-class Builder : public QrCastRef<QrCastHeap<
-                    QrCastMulti<Impl, QrBuilderDescription, QrComponentBuilder, Ifaces...>>> {
+class Builder
+    : public QrCastRef<
+          QrCastHeap<QrCastMulti<Impl, QrBuilderDescription, QrComponentBuilder, Ifaces...>>> {
   public:
     explicit Builder(const BuilderInfo& builderInfo) : info(builderInfo) {}
 

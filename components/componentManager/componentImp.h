@@ -126,8 +126,7 @@ class MZ_COMPONENT_MANAGER_API QrComponentManager : public QrCastable {
 
     /// Offers every builder known, library by library in the order of the search path, and returns
     /// what ended the walk. Before `initialize` there is none. Loads nothing.
-    virtual QrEnum::Action
-    enumerateBuilders(QrEnumerator<QrCPtr<QrBuilderDescription>>& e) = 0;
+    virtual QrEnum::Action enumerateBuilders(QrEnumerator<QrCPtr<QrBuilderDescription>>& e) = 0;
 
     /// Looks through the directories of `searchPath` (separated by ';') for component libraries and
     /// records the builders that each describes. Null, or nothing but ';', means the directory of
@@ -139,8 +138,8 @@ class MZ_COMPONENT_MANAGER_API QrComponentManager : public QrCastable {
     /// library without the entry point is never loaded, only read.
     ///
     /// A search path is normalised before use: lower case, '\' between names, and runs of
-    /// separators as one. "." and ".." are *not* resolved (`a/b/../c` becomes `a\b\c`), so give full
-    /// paths without them: on Windows the normalised path is what is opened.
+    /// separators as one. "." and ".." are *not* resolved (`a/b/../c` becomes `a\b\c`), so give
+    /// full paths without them: on Windows the normalised path is what is opened.
     virtual void initialize(const wchar_t* searchPath) = 0;
 
     /// A new object made by the builder registered for `uid`, or null where there is no builder or

@@ -87,7 +87,8 @@ class MZ_COMPONENT_MANAGER_API ComponentManager final
   private:
     /// Finds the library in the process or loads it; false when it is no component library.
     bool loadModule(ComponentLibrary& library);
-    /// Has the loaded library describe itself. One that fails is left without builders and unloaded.
+    /// Has the loaded library describe itself. One that fails is left without builders and
+    /// unloaded.
     bool registerLibrary(ComponentLibrary& library, const platform::FileStatus& status);
     void readDescription(ComponentLibrary& library, QrComponentDescription& description);
 

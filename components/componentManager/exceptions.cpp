@@ -28,7 +28,8 @@ QrComponentManagerEx::QrComponentManagerEx(const QrComponentManagerEx& other) = 
 QrComponentManagerEx& QrComponentManagerEx::operator=(const QrComponentManagerEx& other) = default;
 QrComponentManagerEx::~QrComponentManagerEx() = default;
 
-QrStreamEx::ExBadSwapSize::ExBadSwapSize(const char* file, int line) : QrConcreteException(file, line) {
+QrStreamEx::ExBadSwapSize::ExBadSwapSize(const char* file, int line)
+    : QrConcreteException(file, line) {
     setReason("Bad swap bytes size.");
 }
 QrStreamEx::ExBadSwapSize::ExBadSwapSize(const ExBadSwapSize& other) = default;
@@ -50,7 +51,8 @@ QrStreamEx::ExReadError::ExReadError(const char* file, int line, const char* nam
 QrStreamEx::ExReadError::ExReadError(const ExReadError& other) = default;
 QrStreamEx::ExReadError::~ExReadError() = default;
 
-QrStreamEx::ExReadObject::ExReadObject(const char* file, int line) : QrConcreteException(file, line) {
+QrStreamEx::ExReadObject::ExReadObject(const char* file, int line)
+    : QrConcreteException(file, line) {
     setReason("Error loading object.");
 }
 QrStreamEx::ExReadObject::ExReadObject(const char* file, int line, const char* name)
@@ -60,7 +62,8 @@ QrStreamEx::ExReadObject::ExReadObject(const char* file, int line, const char* n
 QrStreamEx::ExReadObject::ExReadObject(const ExReadObject& other) = default;
 QrStreamEx::ExReadObject::~ExReadObject() = default;
 
-QrStreamEx::ExReadObjectImp::ExReadObjectImp(const char* file, int line) : QrConcreteException(file, line) {
+QrStreamEx::ExReadObjectImp::ExReadObjectImp(const char* file, int line)
+    : QrConcreteException(file, line) {
     setReason("readObject not implemented.");
 }
 QrStreamEx::ExReadObjectImp::ExReadObjectImp(const ExReadObjectImp& other) = default;
@@ -86,7 +89,8 @@ QrStreamEx::ExWrite::ExWrite(const char* file, int line) : QrConcreteException(f
 QrStreamEx::ExWrite::ExWrite(const ExWrite& other) = default;
 QrStreamEx::ExWrite::~ExWrite() = default;
 
-QrStreamEx::ExWriteError::ExWriteError(const char* file, int line) : QrConcreteException(file, line) {
+QrStreamEx::ExWriteError::ExWriteError(const char* file, int line)
+    : QrConcreteException(file, line) {
     setReason("Error writing stream.");
 }
 QrStreamEx::ExWriteError::ExWriteError(const char* file, int line, const char* name)
@@ -96,7 +100,8 @@ QrStreamEx::ExWriteError::ExWriteError(const char* file, int line, const char* n
 QrStreamEx::ExWriteError::ExWriteError(const ExWriteError& other) = default;
 QrStreamEx::ExWriteError::~ExWriteError() = default;
 
-QrStreamEx::ExWriteObject::ExWriteObject(const char* file, int line) : QrConcreteException(file, line) {
+QrStreamEx::ExWriteObject::ExWriteObject(const char* file, int line)
+    : QrConcreteException(file, line) {
     setReason("Error storing object.");
 }
 QrStreamEx::ExWriteObject::ExWriteObject(const char* file, int line, const char* name)
@@ -106,7 +111,8 @@ QrStreamEx::ExWriteObject::ExWriteObject(const char* file, int line, const char*
 QrStreamEx::ExWriteObject::ExWriteObject(const ExWriteObject& other) = default;
 QrStreamEx::ExWriteObject::~ExWriteObject() = default;
 
-QrStreamEx::ExWriteObjectImp::ExWriteObjectImp(const char* file, int line) : QrConcreteException(file, line) {
+QrStreamEx::ExWriteObjectImp::ExWriteObjectImp(const char* file, int line)
+    : QrConcreteException(file, line) {
     setReason("writeObject not implemented.");
 }
 QrStreamEx::ExWriteObjectImp::ExWriteObjectImp(const ExWriteObjectImp& other) = default;
@@ -119,14 +125,16 @@ QrStreamEx::ExWriteOpen::ExWriteOpen(const char* file, int line, const char* nam
     : QrConcreteException(file, line) {
     setReason(named(name, "Error opening output stream.").c_str());
 }
-QrStreamEx::ExWriteOpen::ExWriteOpen(const char* file, int line, const char* name, const char* name2)
+QrStreamEx::ExWriteOpen::ExWriteOpen(const char* file, int line, const char* name,
+                                     const char* name2)
     : QrConcreteException(file, line) {
     setReason(named(name, "Error opening output stream", name2).c_str());
 }
 QrStreamEx::ExWriteOpen::ExWriteOpen(const ExWriteOpen& other) = default;
 QrStreamEx::ExWriteOpen::~ExWriteOpen() = default;
 
-QrComponentManagerEx::ExBadCast::ExBadCast(const char* file, int line) : QrConcreteException(file, line) {
+QrComponentManagerEx::ExBadCast::ExBadCast(const char* file, int line)
+    : QrConcreteException(file, line) {
     setReason("Bad cast in QrCastable::safeCast");
 }
 QrComponentManagerEx::ExBadCast::ExBadCast(const ExBadCast& other) = default;

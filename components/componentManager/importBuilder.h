@@ -10,8 +10,8 @@ namespace Mz {
 ///
 /// It is a component builder like any other, registered under its importer's builder name, that
 /// answers this interface too. Its object therefore answers for `QrComponentBuilder`,
-/// `QrImportBuilder` and `QrBuilderDescription`; `QrCastMulti` makes such objects, and the component
-/// kit makes them short.
+/// `QrImportBuilder` and `QrBuilderDescription`; `QrCastMulti` makes such objects, and the
+/// component kit makes them short.
 ///
 /// In every operation, `path` is the file's name as the caller gave it, which need not be the name
 /// under which the file was found, and `hint` is a second text that this library passes on unread.

@@ -23,8 +23,7 @@ bool isLetter(wchar_t c) {
 template <class Predicate>
 std::wstring_view takeWhile(std::wstring_view& rest, Predicate belongs) {
     const auto end = std::find_if_not(rest.begin(), rest.end(), belongs);
-    const std::wstring_view taken =
-        rest.substr(0, static_cast<std::size_t>(end - rest.begin()));
+    const std::wstring_view taken = rest.substr(0, static_cast<std::size_t>(end - rest.begin()));
     rest.remove_prefix(taken.size());
     return taken;
 }

@@ -65,8 +65,7 @@ int percentage(float fraction) {
 /// The last resort: tells the error stream that something happened. Its texts appear as addresses,
 /// which shows every host that it has to install a controller of its own to be read.
 class DefaultSystemController final
-    : public QrCastImpl<DefaultSystemController, QrProcessControl,
-                        const DefaultSystemController&> {
+    : public QrCastImpl<DefaultSystemController, QrProcessControl, const DefaultSystemController&> {
   public:
     void* getContext() override { return nullptr; }
     void message(int, const wchar_t* text) override { writeLine(text); }

@@ -155,8 +155,7 @@ Module findLoadedLibrary(const NativePath& path) {
 bool exportsFunction(const NativePath& path, const char* symbol) {
     const std::wstring name = loaderName(path);
     const OwnActivationContext context(path.native());
-    const HMODULE module =
-        ::LoadLibraryExW(name.c_str(), nullptr, DONT_RESOLVE_DLL_REFERENCES);
+    const HMODULE module = ::LoadLibraryExW(name.c_str(), nullptr, DONT_RESOLVE_DLL_REFERENCES);
     const bool found = findSymbol(module, symbol) != nullptr;
     unloadLibrary(module);
     return found;
@@ -178,8 +177,8 @@ void unloadLibrary(Module module) {
 void* findSymbol(Module module, const char* symbol) {
     if (!module)
         return nullptr;
-    const auto address = reinterpret_cast<void*>(
-        ::GetProcAddress(static_cast<HMODULE>(module), symbol));
+    const auto address =
+        reinterpret_cast<void*>(::GetProcAddress(static_cast<HMODULE>(module), symbol));
     if (!address)
         return nullptr;
     // An export may be forwarded to another library, whose symbols do not count.
