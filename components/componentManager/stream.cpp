@@ -34,7 +34,7 @@ bool QrStream::isBinaryStream() const {
 
 int QrStream::computeLineNb() {
     const int64 position = io().tell();
-    if (position <= 0)
+    if (position < 0)
         return 1;
     io().seek(0, 0);
     int line = 1;
