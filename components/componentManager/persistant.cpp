@@ -13,15 +13,38 @@ void QrPersistant::forceVtblInstantiation() {}
 struct QrPostLoadList::Node {
     QrPtr<QrPersistant> object;
     std::shared_ptr<Node> next;
-    bool told = false;
+    bool beingTold = false;
+    /// No longer part of any list, though somebody may still look at it.
+    bool removed = false;
+
+    /// Tells the object and gives it back, which stays when it throws.
+    QrPtr<QrPersistant> tell() {
+        struct BeingTold {
+            bool& flag;
+            explicit BeingTold(bool& value) : flag(value) { flag = true; }
+            ~BeingTold() { flag = false; }
+        } const guard(beingTold);
+        if (object)
+            object->loadFinished();
+        return std::move(object);
+    }
+
+    /// Takes the node out of the list that begins with `first`, where it stands first. What follows
+    /// is not left with the node: whoever still holds that would hold, and drop, the whole chain.
+    void removeFrom(std::shared_ptr<Node>& first) {
+        removed = true;
+        first = std::move(next);
+    }
 };
 
 QrPostLoadList::QrPostLoadList() = default;
 
 QrPostLoadList::~QrPostLoadList() {
     // One by one: each node owns the next, and a long chain would be dropped by deep recursion.
-    while (first)
-        first = std::move(first->next);
+    while (first) {
+        const std::shared_ptr<Node> node = first;
+        node->removeFrom(first);
+    }
 }
 
 void QrPostLoadList::postLoad(QrPersistant* obj) {
@@ -29,7 +52,7 @@ void QrPostLoadList::postLoad(QrPersistant* obj) {
     added->object = obj;
     const std::shared_ptr<Node> behind = last.lock();
     std::shared_ptr<Node>* slot = &first;
-    if (behind && !behind->told)
+    if (behind && !behind->removed)
         slot = &behind->next;
     else
         while (*slot)
@@ -50,14 +73,13 @@ void QrPostLoadList::loadFinished() {
 
     while (first) {
         const std::shared_ptr<Node> node = first;
-        if (node->object)
-            node->object->loadFinished();
-        node->told = true;
-        // The object may have moved the whole list, itself included, to another one, which passes
-        // over the node since it holds nobody any more.
-        const QrPtr<QrPersistant> object = std::move(node->object);
+        // An object may move its list to another one while it is told. If that is told as well, the
+        // object is not told a second time; if it is not, the node left there holds nobody.
+        QrPtr<QrPersistant> told;
+        if (!node->beingTold)
+            told = node->tell();
         if (first == node)
-            first = node->next;
+            node->removeFrom(first);
     }
 }
 
