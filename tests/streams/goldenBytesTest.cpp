@@ -86,7 +86,8 @@ void expectWritesAndReads(const Golden& golden, const T (&values)[3]) {
     expectWrites(golden, values);
     SCOPED_TRACE(golden.type);
     expectReads<QrTextStream>(golden.singleText, golden.countedText, values);
-    expectReads<QrBinaryStream>(fromHex(golden.singleBinary), fromHex(golden.countedBinary), values);
+    expectReads<QrBinaryStream>(fromHex(golden.singleBinary), fromHex(golden.countedBinary),
+                                values);
     expectReads<BaseStream>(golden.singleText, fromHex(golden.countedBinary), values);
 }
 
@@ -111,7 +112,8 @@ void expectCharacters(const Golden& golden) {
 void expectStrings(const Golden& golden) {
     const std::wstring values[3] = {L"a b", L"", L"\xE9z"};
     expectWrites(golden, values);
-    expectReads<QrBinaryStream>(fromHex(golden.singleBinary), fromHex(golden.countedBinary), values);
+    expectReads<QrBinaryStream>(fromHex(golden.singleBinary), fromHex(golden.countedBinary),
+                                values);
 }
 
 void expectType(const Golden& golden) {
@@ -164,9 +166,9 @@ TEST(GoldenBytes, EveryTypeLooksAsItAlwaysDidInBothEncodings) {
 TEST(GoldenBytes, DoublesOfTheTableComeBackFromBothEncodings) {
     const double values[3] = {1.0, 0.1, -1e300};
     expectReads<QrTextStream>("1", "1 0.1 -1e+300", values);
-    expectReads<QrBinaryStream>(fromHex("3F F0 00 00 00 00 00 00"),
-                                written<QrBinaryStream>([&](QrStream& s) { s.write(values[0], 3); }),
-                                values);
+    expectReads<QrBinaryStream>(
+        fromHex("3F F0 00 00 00 00 00 00"),
+        written<QrBinaryStream>([&](QrStream& s) { s.write(values[0], 3); }), values);
 }
 
 TEST(GoldenBytes, AnIdentifierIsItsFourWords) {

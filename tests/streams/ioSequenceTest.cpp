@@ -38,9 +38,9 @@ TEST(IOSequence, TextGoesOutSeparatorFirst) {
                 }),
                 ElementsAre("writeChar wide 71", "writeChar wide 1", "writeChar wide 1", "writeEol",
                             "writeChar wide 1"));
-    EXPECT_THAT(calls<QrTextStream>([](QrStream& s) { s << std::wstring(L"abc") << 1; }),
-                ElementsAre("writeChar wide 1", "writeSpace", "writeChar wide 3",
-                            "writeChar wide 1"));
+    EXPECT_THAT(
+        calls<QrTextStream>([](QrStream& s) { s << std::wstring(L"abc") << 1; }),
+        ElementsAre("writeChar wide 1", "writeSpace", "writeChar wide 3", "writeChar wide 1"));
 }
 
 TEST(IOSequence, BinaryValuesGoOutInBlocksOf1024Bytes) {
@@ -65,14 +65,14 @@ TEST(IOSequence, BinaryValuesGoOutInBlocksOf1024Bytes) {
 
 TEST(IOSequence, ABinaryBlockAfterTextEndsTheLineFirst) {
     const int number = 5;
-    EXPECT_THAT(calls<BaseStream>([&](QrStream& s) {
-                    s << 1;
-                    s.write(number, 1);
-                    s.write(number, 1);
-                    s << 2;
-                }),
-                ElementsAre("writeChar wide 1", "writeEol", "write 4", "write 4",
-                            "writeChar wide 1"));
+    EXPECT_THAT(
+        calls<BaseStream>([&](QrStream& s) {
+            s << 1;
+            s.write(number, 1);
+            s.write(number, 1);
+            s << 2;
+        }),
+        ElementsAre("writeChar wide 1", "writeEol", "write 4", "write 4", "writeChar wide 1"));
 }
 
 TEST(IOSequence, BinaryStringsAreLengthAndCharacters) {
@@ -112,11 +112,12 @@ TEST(IOSequence, BoolsAreReadInBlocksOf1024Bytes) {
 
 TEST(IOSequence, StringsAreReadInOneCallWithoutALimitOfCharacters) {
     std::wstring value;
-    EXPECT_THAT(calls<QrBinaryStream>([&](QrStream& s) { s >> value; }, fromHex("00 00 00 02 61 62")),
-                ElementsAre("read 4", "readChar wide 2 2147483647"));
-    EXPECT_THAT(calls<QrBinaryStream>([&](QrStream& s) { s.read(value, 1); },
-                                      fromHex("00 00 00 02 61 62")),
-                ElementsAre("read 4", "readChar wide 2 2147483647"));
+    EXPECT_THAT(
+        calls<QrBinaryStream>([&](QrStream& s) { s >> value; }, fromHex("00 00 00 02 61 62")),
+        ElementsAre("read 4", "readChar wide 2 2147483647"));
+    EXPECT_THAT(
+        calls<QrBinaryStream>([&](QrStream& s) { s.read(value, 1); }, fromHex("00 00 00 02 61 62")),
+        ElementsAre("read 4", "readChar wide 2 2147483647"));
 }
 
 TEST(IOSequence, BoolsOfTextAreReadOneCharacterAtATime) {
@@ -189,15 +190,15 @@ TEST(IOSequence, EveryReadThatIsNotFormattedSkipsAPendingSeparator) {
 TEST(IOSequence, AFormattedReadLeavesThePendingSeparatorDue) {
     int number = 0;
     bool flag = false;
-    EXPECT_THAT(calls<QrTextStream>(
-                    [&](QrStream& s) {
-                        s << 1;
-                        s.formattedRead(L"%1d", &number);
-                        s >> flag;
-                    },
-                    "5 1"),
-                ElementsAre("writeChar wide 1", "readChar wide", "skipWhiteSpace 1",
-                            "readChar wide 1 1"));
+    EXPECT_THAT(
+        calls<QrTextStream>(
+            [&](QrStream& s) {
+                s << 1;
+                s.formattedRead(L"%1d", &number);
+                s >> flag;
+            },
+            "5 1"),
+        ElementsAre("writeChar wide 1", "readChar wide", "skipWhiteSpace 1", "readChar wide 1 1"));
     EXPECT_EQ(number, 5);
     EXPECT_TRUE(flag);
 }

@@ -30,7 +30,8 @@ class RecordingIO final : public QrCastImpl<RecordingIO, QrBufferedIO, const Rec
     }
     QrRef<QrCastable> readObject(QrStream& s, const QrUid* id, const wchar_t* a,
                                  const wchar_t* b) override {
-        note("readObject " + (id ? std::to_string(id->w0) : "null") + " " + name(a) + " " + name(b));
+        note("readObject " + (id ? std::to_string(id->w0) : "null") + " " + name(a) + " " +
+             name(b));
         return onReadObject ? onReadObject(s) : nullptr;
     }
     void write(const void* data, int size) override {

@@ -61,11 +61,11 @@ TEST(StreamShape, OperationsStandInTheOrderThatLibrariesWereBuiltWith) {
     EXPECT_EQ(slot(&QrStream::postLoad), 4);
     EXPECT_EQ(slot(&QrStream::transfer), 5);
     EXPECT_EQ(slot(&QrStream::computeLineNb), 6);
-    expectGroup(7, {writeSlot<UInt64>, writeSlot<int64>, writeSlot<std::wstring>, writeSlot<double>,
-                    writeSlot<float>, writeSlot<bool>, writeSlot<unsigned long>, writeSlot<long>,
-                    writeSlot<unsigned int>, writeSlot<int>, writeSlot<unsigned short>,
-                    writeSlot<short>, writeSlot<unsigned char>, writeSlot<wchar_t>,
-                    writeSlot<char>});
+    expectGroup(7,
+                {writeSlot<UInt64>, writeSlot<int64>, writeSlot<std::wstring>, writeSlot<double>,
+                 writeSlot<float>, writeSlot<bool>, writeSlot<unsigned long>, writeSlot<long>,
+                 writeSlot<unsigned int>, writeSlot<int>, writeSlot<unsigned short>,
+                 writeSlot<short>, writeSlot<unsigned char>, writeSlot<wchar_t>, writeSlot<char>});
     expectGroup(22, {insertSlot<UInt64>, insertSlot<int64>, insertSlot<const std::wstring&>,
                      insertSlot<double>, insertSlot<float>, insertSlot<bool>,
                      insertSlot<unsigned long>, insertSlot<long>, insertSlot<unsigned int>,
@@ -85,9 +85,9 @@ TEST(StreamShape, OperationsStandInTheOrderThatLibrariesWereBuiltWith) {
 }
 
 TEST(StreamShape, PersistentObjectsExtendTheRootInOrder) {
-    EXPECT_EQ(slot(static_cast<const QrCastable* (QrPersistant::*)() const>(
-                  &QrPersistant::getCastable)),
-              0);
+    EXPECT_EQ(
+        slot(static_cast<const QrCastable* (QrPersistant::*)() const>(&QrPersistant::getCastable)),
+        0);
     EXPECT_EQ(slot(static_cast<QrCastable* (QrPersistant::*)()>(&QrPersistant::getCastable)), 1);
     EXPECT_EQ(slot(&QrPersistant::release), 6);
     EXPECT_EQ(slot(&QrPersistant::getClassUid), 9);
@@ -99,23 +99,25 @@ TEST(StreamShape, PersistentObjectsExtendTheRootInOrder) {
 }
 
 template <class Stream, class T>
-concept CanWrite = requires(Stream& stream, T value) { stream << value; };
+concept CanWrite = requires(Stream& stream, T value) {
+    stream << value;
+};
 
 struct Unrelated {};
 
 template <class Stream>
 constexpr bool refusesOtherPointers =
-    !CanWrite<Stream, const wchar_t*> && !CanWrite<Stream, const char*> && !CanWrite<Stream, int*> &&
-    !CanWrite<Stream, void*> && !CanWrite<Stream, Unrelated*> && !CanWrite<Stream, std::wstring*>;
+    !CanWrite<Stream, const wchar_t*> && !CanWrite<Stream, const char*> &&
+    !CanWrite<Stream, int*> && !CanWrite<Stream, void*> && !CanWrite<Stream, Unrelated*> &&
+    !CanWrite<Stream, std::wstring*>;
 
 static_assert(refusesOtherPointers<QrStream>);
 static_assert(refusesOtherPointers<QrBinaryStream>);
 static_assert(refusesOtherPointers<QrTextStream>);
 
 template <class Stream>
-constexpr bool takesObjects =
-    CanWrite<Stream, const QrCastable*> && CanWrite<Stream, QrCastable*> &&
-    CanWrite<Stream, QrPersistant*> && CanWrite<Stream, const RecordingIO*>;
+constexpr bool takesObjects = CanWrite<Stream, const QrCastable*>&& CanWrite<Stream, QrCastable*>&&
+    CanWrite<Stream, QrPersistant*>&& CanWrite<Stream, const RecordingIO*>;
 
 static_assert(takesObjects<QrStream>);
 static_assert(takesObjects<QrBinaryStream>);

@@ -7,8 +7,8 @@ namespace {
 using namespace Mz::Test;
 using Mz::QrBinaryStream;
 using Mz::QrStream;
-using Mz::QrTextStream;
 using Mz::QrStreamEx;
+using Mz::QrTextStream;
 
 template <class Work>
 std::string text(Work&& write) {
@@ -173,8 +173,8 @@ TEST(TextLayout, AShortStringRaisesReadErrorNamedAfterTheReader) {
         FAIL();
     } catch (const QrStreamEx::ExReadError& error) {
         EXPECT_STREQ(error.getReason(), "Error reading stream.");
-        EXPECT_EQ(std::string(error.getDetailedReason()).find("components/componentManager/stream("),
-                  0U);
+        EXPECT_EQ(
+            std::string(error.getDetailedReason()).find("components/componentManager/stream("), 0U);
     }
     Reading<QrTextStream> counted("3 a");
     try {
