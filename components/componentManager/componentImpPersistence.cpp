@@ -23,15 +23,27 @@ void writeLibrary(QrStream& stream, const ComponentLibrary& library) {
         writeBuilder(stream, *builder);
 }
 
+/// A text of a record. No name or path holds a NUL, and one is never consumed when it is read as a
+/// character: it would fill every text that is claimed, of which a small file could claim many.
+void readText(QrStream& stream, std::wstring& text) {
+    stream >> text;
+    if (text.find(L'\0') != std::wstring::npos)
+        throw QrStreamEx::ExReadError(source, __LINE__);
+}
+
 void readBuilder(QrStream& stream, ComponentManager::Builder& builder) {
     stream >> builder.uid;
-    stream >> builder.name >> builder.label >> builder.text >> builder.flag >> builder.number;
+    readText(stream, builder.name);
+    readText(stream, builder.label);
+    readText(stream, builder.text);
+    stream >> builder.flag >> builder.number;
 }
 
 void readLibrary(QrStream& stream, ComponentLibrary& library) {
     unsigned int count = 0;
-    stream >> library.directory >> library.fileName >> library.fileTime >> library.fileSize >>
-        count;
+    readText(stream, library.directory);
+    readText(stream, library.fileName);
+    stream >> library.fileTime >> library.fileSize >> count;
     // The count is only a claim, so records come one by one, each before those read earlier.
     for (; count > 0; --count) {
         ComponentManager::Builder& builder = library.builders.emplace_front();
