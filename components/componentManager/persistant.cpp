@@ -4,6 +4,14 @@
 
 namespace Mz {
 
+namespace {
+
+/// Refers to the identity: on Windows the library exports it only where something here does, and
+/// whoever casts to the interface needs it.
+[[gnu::used]] const QrUid* const exportedUid = &QrPersistant::uid;
+
+} // namespace
+
 QrPersistant::~QrPersistant() = default;
 
 void QrPersistant::loadFinished() {}
