@@ -63,6 +63,11 @@ TEST(FormattedWrite, PutsRealNumbersAlikeOnEveryPlatform) {
     EXPECT_EQ(formatted(L"%f", 1e308).size(), 316U);
 }
 
+TEST(FormattedWrite, TakesLongDoublesToo) {
+    EXPECT_EQ(formatted(L"%Lf|%.3Le|%Lg|%10.2Lf", 1.5L, 1e10L, 0.1L, -2.25L),
+              "1.500000|1.000e+10|0.1|     -2.25");
+}
+
 TEST(FormattedWrite, SpellsInfinityAndNaN) {
     const double infinity = std::numeric_limits<double>::infinity();
     const double nan = std::numeric_limits<double>::quiet_NaN();

@@ -12,7 +12,8 @@ std::wstring oraclePrint(const wchar_t* format, ...);
 /// as nothing.
 int oracleScan(const std::wstring& input, const wchar_t* format, ...);
 
-/// Whether the C library writes and reads real numbers as the standard has it.
-extern const bool oracleKnowsRealNumbers;
+/// Whether the C library writes and reads as the standard has it throughout; else real numbers, and
+/// the flag 0 beside a precision, are left out.
+extern const bool oracleFollowsTheStandard;
 
 } // namespace Mz::Test

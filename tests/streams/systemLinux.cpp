@@ -13,7 +13,7 @@ bool setCommaLocale() {
     return std::setlocale(LC_ALL, "de_DE.UTF-8") != nullptr;
 }
 
-const bool oracleKnowsRealNumbers = true;
+const bool oracleFollowsTheStandard = true;
 
 namespace {
 

@@ -12,8 +12,8 @@ bool setCommaLocale() {
     return std::setlocale(LC_ALL, "German") != nullptr;
 }
 
-// Its exponents have three digits.
-const bool oracleKnowsRealNumbers = false;
+// Its exponents have three digits, and it pads with zeros in spite of a precision.
+const bool oracleFollowsTheStandard = false;
 
 std::wstring oraclePrint(const wchar_t* format, ...) {
     wchar_t buffer[4096];
