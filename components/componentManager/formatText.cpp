@@ -161,9 +161,10 @@ bool formatUnsigned(std::wstring& result, const Directive& directive, std::va_li
 }
 
 /// The digits of a finite, non-negative value.
-std::string toCharacters(double value, std::chars_format format, int precision) {
+template <class Float>
+std::string toCharacters(Float value, std::chars_format format, int precision) {
     // The longest fixed form has as many digits before its point as the largest value.
-    std::vector<char> buffer(static_cast<std::size_t>(std::numeric_limits<double>::max_exponent10) +
+    std::vector<char> buffer(static_cast<std::size_t>(std::numeric_limits<Float>::max_exponent10) +
                              static_cast<std::size_t>(precision) + 16);
     const auto end = buffer.data() + buffer.size();
     const std::to_chars_result written =
@@ -181,7 +182,8 @@ int exponentOf(const std::string& scientific) {
 }
 
 /// `%#g`: as `%g`, with the zeros at the end that it would leave out.
-std::string toGeneralWithZeros(double value, int precision) {
+template <class Float>
+std::string toGeneralWithZeros(Float value, int precision) {
     const int digits = precision == 0 ? 1 : precision;
     std::string scientific = toCharacters(value, std::chars_format::scientific, digits - 1);
     const int exponent = exponentOf(scientific);
@@ -196,7 +198,8 @@ void ensurePoint(std::string& digits) {
         digits.insert(std::min(digits.find_first_of("ep"), digits.size()), 1, '.');
 }
 
-std::string finiteDigits(const Directive& directive, wchar_t conversion, double value) {
+template <class Float>
+std::string finiteDigits(const Directive& directive, wchar_t conversion, Float value) {
     const int precision = directive.precision < 0 ? 6 : directive.precision;
     std::string digits;
     switch (conversion) {
@@ -221,7 +224,8 @@ wchar_t toUpper(wchar_t c) {
     return c >= L'a' && c <= L'z' ? static_cast<wchar_t>(c - (L'a' - L'A')) : c;
 }
 
-void appendFloat(std::wstring& result, const Directive& directive, double value) {
+template <class Float>
+void appendFloat(std::wstring& result, const Directive& directive, Float value) {
     const wchar_t conversion = toLower(directive.conversion);
     const bool upperCase = conversion != directive.conversion;
     const bool finite = std::isfinite(value);
@@ -241,12 +245,10 @@ void appendFloat(std::wstring& result, const Directive& directive, double value)
 }
 
 void formatFloat(std::wstring& result, const Directive& directive, std::va_list& arguments) {
-    // A long double is no wider than a double in the conventions followed here. Nor could it be: the
-    // standard library leaves it to the C library, which on Windows knows no such type.
-    const double value = directive.size == Size::LongDouble
-                             ? static_cast<double>(va_arg(arguments, long double))
-                             : va_arg(arguments, double);
-    appendFloat(result, directive, value);
+    if (directive.size == Size::LongDouble)
+        appendFloat(result, directive, va_arg(arguments, long double));
+    else
+        appendFloat(result, directive, va_arg(arguments, double));
 }
 
 /// Whether a text or character is wide: the small letters are, unless the size says otherwise.

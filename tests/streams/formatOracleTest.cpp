@@ -5,8 +5,6 @@
 
 #include <gtest/gtest.h>
 
-#include <cstdio>
-#include <cstdlib>
 #include <random>
 
 namespace {
@@ -50,9 +48,9 @@ constexpr int rounds = MZ_RANDOM_VALUES / 40;
 /// A random directive up to its size: flags from `flags`, width and precision.
 std::wstring directive(Random& random, std::wstring_view flags, unsigned int longestPrecision) {
     std::wstring result = L"%";
-    const bool precise = random.chance();
+    const bool precise = longestPrecision > 0 && random.chance();
     for (const wchar_t flag : flags)
-        if (random.below(4) == 0 && (flag != L'0' || !precise || oracleFollowsTheStandard))
+        if (random.below(4) == 0)
             result += flag;
     if (random.chance())
         result += std::to_wstring(random.below(30) + 1);
@@ -68,17 +66,21 @@ void expectPrintedAlike(const std::wstring& format, Arguments... arguments) {
     // The oracle is asked under "C", whatever is set here.
     const std::string previous = std::setlocale(LC_ALL, nullptr);
     std::setlocale(LC_ALL, "C");
-    if (std::getenv("MZ_TRACE")) { std::fwprintf(stderr, L"%ls\n", format.c_str()); std::fflush(stderr); }
     const std::wstring wanted = oraclePrint(format.c_str(), arguments...);
     std::setlocale(LC_ALL, previous.c_str());
     EXPECT_EQ(widened(out.bytes()), wanted) << testing::PrintToString(format);
 }
 
 void printAlike(unsigned int seed) {
+    // Zeros that fill a width or a precision make one C library write beyond its own buffer.
+    const unsigned int longest = oracleFollowsTheStandard ? 25 : 0;
+    const std::wstring_view signedFlags = oracleFollowsTheStandard ? L"-+ 0" : L"-+ ";
+    const std::wstring_view unsignedFlags = oracleFollowsTheStandard ? L"-#0" : L"-";
     Random random(seed);
     for (int round = 0; round < rounds && !testing::Test::HasFailure(); ++round) {
         const bool isSigned = random.chance();
-        const std::wstring start = directive(random, isSigned ? L"-+ 0" : L"-#0", 25);
+        const std::wstring start =
+            directive(random, isSigned ? signedFlags : unsignedFlags, longest);
         const wchar_t conversion = isSigned ? random.oneOf(L"di") : random.oneOf(L"uoxX");
         switch (random.below(4)) {
         case 0:

@@ -13,7 +13,7 @@ std::wstring oraclePrint(const wchar_t* format, ...);
 int oracleScan(const std::wstring& input, const wchar_t* format, ...);
 
 /// Whether the C library writes and reads as the standard has it throughout; else real numbers, and
-/// the flag 0 beside a precision, are left out.
+/// integers filled with zeros, are left out.
 extern const bool oracleFollowsTheStandard;
 
 } // namespace Mz::Test

@@ -12,7 +12,7 @@ bool setCommaLocale() {
     return std::setlocale(LC_ALL, "German") != nullptr;
 }
 
-// Its exponents have three digits, and it pads with zeros in spite of a precision.
+// Exponents have three digits, and some versions fill with zeros in spite of a precision.
 const bool oracleFollowsTheStandard = false;
 
 std::wstring oraclePrint(const wchar_t* format, ...) {
