@@ -2,11 +2,13 @@
 ///
 /// The sources around it, one thought each: `componentImp.cpp` (the interfaces and the manager's
 /// operations), `componentImpRegistry.cpp` (builder records), `componentImpDiscovery.cpp` (search
-/// path and merge), `componentImpLoading.cpp` (one library's loading and description).
+/// path and merge), `componentImpLoading.cpp` (one library's loading and description),
+/// `componentImpPersistence.cpp` (the recorded list).
 #pragma once
 
 #include "components/componentManager/componentImp.h"
 #include "components/componentManager/hashMap.h"
+#include "components/componentManager/persistant.h"
 #include "components/componentManager/platform/platform.h"
 
 #include <deque>
@@ -17,6 +19,7 @@
 namespace Mz {
 
 struct ComponentLibrary;
+class ComponentManagerPersistant;
 
 struct UidHash {
     std::uint32_t operator()(const QrUid& uid) const { return uid.w0; }
@@ -25,7 +28,9 @@ struct UidHash {
 /// The manager. There is one for the process, which `QrGetComponentManager` gives out; tests make
 /// others.
 class MZ_COMPONENT_MANAGER_API ComponentManager final
-    : public QrCastImpl<ComponentManager, QrComponentManager, const ComponentManager&> {
+    : public QrCastImpl2<ComponentManager, QrComponentManager,
+                         QrTempIface<ComponentManager, ComponentManagerPersistant>,
+                         const ComponentManager&> {
   public:
     class Builder;
 
@@ -72,6 +77,14 @@ class MZ_COMPONENT_MANAGER_API ComponentManager final
     /// Gives the library back to the system if the manager loaded it. No exception made by its code
     /// may be alive.
     void unload(ComponentLibrary& library);
+
+    /// Writes the recorded libraries and their builders; nothing before `initialize`.
+    void writeRecords(QrStream& stream);
+
+    /// Appends recorded libraries to those that `initialize` will compare with what it finds. Does
+    /// nothing once that has begun. After a failure the libraries read whole stay, and the one that
+    /// was being read is left such that it is read afresh from its file.
+    void readRecords(QrStream& stream);
 
     /// Enters the library's builders in the index; of two with one identifier the first one stays.
     void reindexBuilders(ComponentLibrary& library);
@@ -160,6 +173,21 @@ struct MZ_COMPONENT_MANAGER_API ComponentLibrary {
     /// The entry point's address while the library is loaded. Only the look-up is spared: the call
     /// is made each time.
     QrGetComponentDescriptionFunction* entryPoint = nullptr;
+};
+
+/// Stores the manager's records, so that the next start need not load what has not changed.
+class MZ_COMPONENT_MANAGER_API ComponentManagerPersistant final
+    : public QrTempObject<ComponentManager,
+                          QrCastRef<QrCastHeap<QrCastImpl<ComponentManagerPersistant, QrPersistant,
+                                                          const ComponentManagerPersistant&>>>> {
+  public:
+    explicit ComponentManagerPersistant(ComponentManager* manager);
+    ~ComponentManagerPersistant() override;
+
+    const QrUid* getClassUid() const override;
+    unsigned int getVersion() const override;
+    void write(QrStream& stream) override;
+    void read(QrStream& stream) override;
 };
 
 } // namespace Mz

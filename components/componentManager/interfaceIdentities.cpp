@@ -1,5 +1,6 @@
 #include "components/componentManager/componentImp.h"
 #include "components/componentManager/importer.h"
+#include "components/componentManager/persistant.h"
 #include "components/componentManager/processControl.h"
 
 namespace Mz {
@@ -9,7 +10,7 @@ namespace Mz {
 [[gnu::used]] const QrUid* const interfaceIdentities[] = {
     &QrBufferedIO::uid,    &QrBuilderDescription::uid,   &QrComponentBuilder::uid,
     &QrImportBuilder::uid, &QrComponentDescription::uid, &QrComponentManager::uid,
-    &QrImporter::uid,      &QrProcessControl::uid,
+    &QrImporter::uid,      &QrProcessControl::uid,       &QrPersistant::uid,
 };
 
 } // namespace Mz

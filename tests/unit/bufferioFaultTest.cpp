@@ -103,9 +103,7 @@ void runUnder(const Circumstances& circumstances, const Operation& operation, Qr
         FAIL() << "something else than the stated exception";
     }
     switch (operation.notices) {
-    case Notices::Badbit:
-        EXPECT_EQ(raised, stream.bad());
-        break;
+    case Notices::Badbit: EXPECT_EQ(raised, stream.bad()); break;
     case Notices::BadbitOfReads:
         // A byte that cannot be put back goes unnoticed until the next read.
         if (!raised && stream.bad()) {
@@ -114,12 +112,8 @@ void runUnder(const Circumstances& circumstances, const Operation& operation, Qr
             EXPECT_EQ(raised, stream.bad());
         }
         break;
-    case Notices::Nothing:
-        EXPECT_FALSE(raised);
-        break;
-    case Notices::LostPosition:
-        EXPECT_EQ(raised, medium.wentWrong() || stream.fail());
-        break;
+    case Notices::Nothing: EXPECT_FALSE(raised); break;
+    case Notices::LostPosition: EXPECT_EQ(raised, medium.wentWrong() || stream.fail()); break;
     }
     EXPECT_EQ(stream.exceptions(), circumstances.mask) << "the mask is the caller's";
 }

@@ -125,24 +125,15 @@ class Comparison {
 
     void step() {
         switch (below(9)) {
-        case 0:
-            return byte();
-        case 1:
-            return block();
-        case 2:
-            return narrow();
-        case 3:
-            return wide();
-        case 4:
-            return single();
-        case 5:
-            return skip();
-        case 6:
-            return putBack();
-        case 7:
-            return seek();
-        default:
-            return tell();
+        case 0: return byte();
+        case 1: return block();
+        case 2: return narrow();
+        case 3: return wide();
+        case 4: return single();
+        case 5: return skip();
+        case 6: return putBack();
+        case 7: return seek();
+        default: return tell();
         }
     }
 
@@ -295,9 +286,7 @@ TEST(RandomOutput, IsWrittenAsTheModelWritesIt) {
                 io.writeEol();
                 expected += '\n';
                 break;
-            default:
-                io.writeSpace();
-                expected += ' ';
+            default: io.writeSpace(); expected += ' ';
             }
             ASSERT_EQ(io.tell(), static_cast<int64>(expected.size()));
         }

@@ -93,9 +93,7 @@ TEST(HashMap, DoesWhatTheStandardMapDoes) {
             map[key] = step;
             expected[key] = step;
             break;
-        case 1:
-            EXPECT_EQ(map.erase(key), expected.erase(key) == 1);
-            break;
+        case 1: EXPECT_EQ(map.erase(key), expected.erase(key) == 1); break;
         default:
             const auto found = expected.find(key);
             ASSERT_EQ(map.find(key) != nullptr, found != expected.end());

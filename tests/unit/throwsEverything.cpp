@@ -12,20 +12,13 @@ constexpr int line = 17;
 
 [[noreturn]] void throwSecondHalf(int which) {
     switch (which) {
-    case 6:
-        throw QrStreamEx::ExWrite(source, line);
-    case 7:
-        throw QrStreamEx::ExWriteError(source, line);
-    case 8:
-        throw QrStreamEx::ExWriteObject(source, line);
-    case 9:
-        throw QrStreamEx::ExWriteObjectImp(source, line);
-    case 10:
-        throw QrStreamEx::ExWriteOpen(source, line);
-    case 11:
-        throw QrComponentManagerEx::ExBadCast(source, line);
-    default:
-        throw Assertions::ExProgramAborted(source, line);
+    case 6: throw QrStreamEx::ExWrite(source, line);
+    case 7: throw QrStreamEx::ExWriteError(source, line);
+    case 8: throw QrStreamEx::ExWriteObject(source, line);
+    case 9: throw QrStreamEx::ExWriteObjectImp(source, line);
+    case 10: throw QrStreamEx::ExWriteOpen(source, line);
+    case 11: throw QrComponentManagerEx::ExBadCast(source, line);
+    default: throw Assertions::ExProgramAborted(source, line);
     }
 }
 
@@ -33,19 +26,12 @@ constexpr int line = 17;
 
 extern "C" MZ_EXPORT void throwException(int which) {
     switch (which) {
-    case 0:
-        throw QrStreamEx::ExBadSwapSize(source, line);
-    case 1:
-        throw QrStreamEx::ExRead(source, line);
-    case 2:
-        throw QrStreamEx::ExReadError(source, line, "foreign");
-    case 3:
-        throw QrStreamEx::ExReadObject(source, line);
-    case 4:
-        throw QrStreamEx::ExReadObjectImp(source, line);
-    case 5:
-        throw QrStreamEx::ExReadOpen(source, line);
-    default:
-        throwSecondHalf(which);
+    case 0: throw QrStreamEx::ExBadSwapSize(source, line);
+    case 1: throw QrStreamEx::ExRead(source, line);
+    case 2: throw QrStreamEx::ExReadError(source, line, "foreign");
+    case 3: throw QrStreamEx::ExReadObject(source, line);
+    case 4: throw QrStreamEx::ExReadObjectImp(source, line);
+    case 5: throw QrStreamEx::ExReadOpen(source, line);
+    default: throwSecondHalf(which);
     }
 }

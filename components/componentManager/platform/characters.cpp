@@ -9,7 +9,21 @@ namespace Mz::platform {
 
 static_assert(maximumCharacterBytes >= MB_LEN_MAX);
 
-CharacterConverter::CharacterConverter() : plain(usesPlainBytes()) {}
+namespace {
+
+constinit thread_local int plainBytesDepth = 0;
+
+} // namespace
+
+PlainBytes::PlainBytes() {
+    ++plainBytesDepth;
+}
+
+PlainBytes::~PlainBytes() {
+    --plainBytesDepth;
+}
+
+CharacterConverter::CharacterConverter() : plain(plainBytesDepth > 0 || usesPlainBytes()) {}
 
 int CharacterConverter::decode(std::string_view bytes, wchar_t& character) const {
     if (bytes.empty())

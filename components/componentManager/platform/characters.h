@@ -14,6 +14,16 @@ namespace Mz::platform {
 /// No character has more bytes than this.
 inline constexpr std::size_t maximumCharacterBytes = 16;
 
+/// While it lives, characters convert on the calling thread as in the "C" locale, whatever the
+/// locale is. May be nested.
+class PlainBytes {
+  public:
+    PlainBytes();
+    ~PlainBytes();
+    PlainBytes(const PlainBytes&) = delete;
+    PlainBytes& operator=(const PlainBytes&) = delete;
+};
+
 /// Converts characters while the locale stays as it was when the converter was made.
 class CharacterConverter {
   public:

@@ -119,4 +119,21 @@ std::uint32_t currentThreadId();
 /// Whether LC_CTYPE of the calling thread is "C" or "POSIX".
 bool usesPlainBytes();
 
+/// While it lives, the C locale appears as "C" to the calling thread. May be nested.
+///
+/// Where the system knows locales of threads (Linux), no other thread notices. Elsewhere (Windows)
+/// the locale of the process is switched, by the first that comes, and restored by the last that
+/// goes, whichever threads they are: other threads see "C" meanwhile, and a locale that somebody
+/// else sets meanwhile is lost. Nothing is switched where it is "C" already.
+class CLocale {
+  public:
+    CLocale();
+    ~CLocale();
+    CLocale(const CLocale&) = delete;
+    CLocale& operator=(const CLocale&) = delete;
+
+  private:
+    void* previous;
+};
+
 } // namespace Mz::platform

@@ -168,26 +168,13 @@ class ElfLibrary {
 
     void note(const Elf64_Dyn& entry) {
         switch (entry.d_tag) {
-        case DT_SYMTAB:
-            tables.symbols = entry.d_un.d_ptr;
-            break;
-        case DT_STRTAB:
-            tables.strings = entry.d_un.d_ptr;
-            break;
-        case DT_STRSZ:
-            tables.stringsSize = entry.d_un.d_val;
-            break;
-        case DT_GNU_HASH:
-            tables.gnuHash = entry.d_un.d_ptr;
-            break;
-        case DT_FLAGS_1:
-            tables.program = (entry.d_un.d_val & DF_1_PIE) != 0;
-            break;
-        case DT_HASH:
-            tables.hash = entry.d_un.d_ptr;
-            break;
-        default:
-            break;
+        case DT_SYMTAB: tables.symbols = entry.d_un.d_ptr; break;
+        case DT_STRTAB: tables.strings = entry.d_un.d_ptr; break;
+        case DT_STRSZ: tables.stringsSize = entry.d_un.d_val; break;
+        case DT_GNU_HASH: tables.gnuHash = entry.d_un.d_ptr; break;
+        case DT_FLAGS_1: tables.program = (entry.d_un.d_val & DF_1_PIE) != 0; break;
+        case DT_HASH: tables.hash = entry.d_un.d_ptr; break;
+        default: break;
         }
     }
 

@@ -11,6 +11,7 @@
 #include <fcntl.h>
 #include <langinfo.h>
 #include <link.h>
+#include <locale.h>
 #include <memory>
 #include <sys/stat.h>
 #include <unistd.h>
@@ -217,6 +218,16 @@ std::uint32_t currentThreadId() {
 bool usesPlainBytes() {
     const char* name = ::nl_langinfo(_NL_LOCALE_NAME(LC_CTYPE));
     return std::strcmp(name, "C") == 0 || std::strcmp(name, "POSIX") == 0;
+}
+
+CLocale::CLocale() : previous(nullptr) {
+    // Made once and kept: streams ask for it with every value.
+    static const locale_t c = ::newlocale(LC_ALL_MASK, "C", nullptr);
+    previous = ::uselocale(c);
+}
+
+CLocale::~CLocale() {
+    ::uselocale(static_cast<locale_t>(previous));
 }
 
 } // namespace Mz::platform

@@ -4,6 +4,7 @@
 #include <cstring>
 #include <cwchar>
 #include <io.h>
+#include <mutex>
 #include <sys/stat.h>
 #include <windows.h>
 
@@ -204,6 +205,42 @@ std::uint32_t currentThreadId() {
 bool usesPlainBytes() {
     const char* name = std::setlocale(LC_CTYPE, nullptr);
     return name && (std::strcmp(name, "C") == 0 || std::strcmp(name, "POSIX") == 0);
+}
+
+namespace {
+
+/// How many want "C" at the moment, and what to go back to when the last one has gone.
+struct LocaleSwitch {
+    std::mutex mutex;
+    int wanted = 0;
+    std::wstring previous;
+};
+
+LocaleSwitch& localeSwitch() {
+    // Never destroyed: streams may still be written while static objects are.
+    static LocaleSwitch& instance = *new LocaleSwitch;
+    return instance;
+}
+
+} // namespace
+
+CLocale::CLocale() : previous(nullptr) {
+    LocaleSwitch& state = localeSwitch();
+    const std::lock_guard lock(state.mutex);
+    if (state.wanted == 0) {
+        const wchar_t* current = ::_wsetlocale(LC_ALL, nullptr);
+        state.previous = current ? current : L"C";
+        if (state.previous != L"C")
+            ::_wsetlocale(LC_ALL, L"C");
+    }
+    ++state.wanted;
+}
+
+CLocale::~CLocale() {
+    LocaleSwitch& state = localeSwitch();
+    const std::lock_guard lock(state.mutex);
+    if (--state.wanted == 0 && state.previous != L"C")
+        ::_wsetlocale(LC_ALL, state.previous.c_str());
 }
 
 } // namespace Mz::platform

@@ -1,0 +1,16 @@
+/// Text read by a format in the manner of the wide `scanf`, alike on every platform and in every
+/// locale.
+#pragma once
+
+#include <cstdarg>
+
+namespace Mz {
+
+class QrBufferedIO;
+
+/// Reads from `io`, character by character, what `format` describes, stores it through `arguments`
+/// and returns how many were assigned. What `QrStream::formattedRead` promises; the caller sees to
+/// the locale in which `io` converts. Exceptions of `io` pass through.
+int scanText(QrBufferedIO& io, const wchar_t* format, std::va_list& arguments);
+
+} // namespace Mz

@@ -1,0 +1,290 @@
+#include "components/componentManager/stream.h"
+
+#include "components/componentManager/formatText.h"
+#include "components/componentManager/numericLocale.h"
+#include "components/componentManager/scanText.h"
+
+#include <algorithm>
+#include <cstdint>
+#include <limits>
+
+namespace Mz {
+
+namespace {
+
+constexpr const char* source = "components/componentManager/stream";
+
+/// A line of text is ended by the next separator once it is longer than this.
+constexpr int longestLine = 70;
+
+} // namespace
+
+QrStream::QrStream(QrCastable* io)
+    : bufferedIO(QrPtr<QrBufferedIO>::adopt(safeCast<QrBufferedIO>(io))) {}
+
+QrStream::~QrStream() = default;
+
+bool QrStream::isTextStream() const {
+    return false;
+}
+
+bool QrStream::isBinaryStream() const {
+    return false;
+}
+
+int QrStream::computeLineNb() {
+    const int64 position = io().tell();
+    if (position < 0)
+        return 1;
+    io().seek(0, 0);
+    int line = 1;
+    wchar_t character;
+    for (int64 read = 0; read < position && io().readChar(character) == 1; ++read)
+        line += character == L'\n' ? 1 : 0;
+    return line;
+}
+
+void QrStream::writeSeparator() {
+    if (!separatorPending)
+        return;
+    if (column <= longestLine) {
+        io().writeSpace();
+        ++column;
+    } else {
+        io().writeEol();
+        column = 0;
+    }
+    separatorPending = false;
+}
+
+void QrStream::skipSeparator() {
+    if (!separatorPending)
+        return;
+    separatorPending = false;
+    io().skipWhiteSpace(1);
+}
+
+void QrStream::endText() {
+    if (!separatorPending)
+        return;
+    io().writeEol();
+    column = 0;
+    separatorPending = false;
+}
+
+int QrStream::formattedWrite(const wchar_t* format, ...) {
+    std::wstring text;
+    std::va_list arguments;
+    va_start(arguments, format);
+    const bool formatted = formatText(text, format, arguments);
+    va_end(arguments);
+    if (!formatted || text.size() > static_cast<std::size_t>(std::numeric_limits<int>::max()))
+        throw QrStreamEx::ExWriteError(source, __LINE__);
+    const int length = static_cast<int>(text.size());
+    const NumericLocale bracket(io());
+    writeSeparator();
+    column += io().writeChar(text.data(), length);
+    return length;
+}
+
+int QrStream::formattedRead(const wchar_t* format, ...) {
+    const NumericLocale bracket(io());
+    std::va_list arguments;
+    va_start(arguments, format);
+    // The argument list must be ended before an exception leaves.
+    struct End {
+        std::va_list& list;
+        ~End() { va_end(list); }
+    } const end{arguments};
+    return scanText(io(), format, arguments);
+}
+
+template <class T>
+QrStream& QrStream::writeFormatted(const wchar_t* format, T value) {
+    formattedWrite(format, value);
+    separatorPending = true;
+    return *this;
+}
+
+template <class T>
+QrStream& QrStream::readFormatted(const wchar_t* format, T& value) {
+    if (formattedRead(format, &value) != 1)
+        throw QrStreamEx::ExReadError(source, __LINE__);
+    return *this;
+}
+
+QrStream& QrStream::operator<<(unsigned long long value) {
+    return writeFormatted(L"%I64u", value);
+}
+
+QrStream& QrStream::operator<<(int64 value) {
+    return writeFormatted(L"%I64d", value);
+}
+
+QrStream& QrStream::operator<<(double value) {
+    return writeFormatted(L"%.16g", value);
+}
+
+QrStream& QrStream::operator<<(float value) {
+    return writeFormatted(L"%.9g", static_cast<double>(value));
+}
+
+QrStream& QrStream::operator<<(unsigned long value) {
+    return writeFormatted(L"%lu", value);
+}
+
+QrStream& QrStream::operator<<(long value) {
+    return writeFormatted(L"%ld", value);
+}
+
+QrStream& QrStream::operator<<(unsigned int value) {
+    return writeFormatted(L"%u", value);
+}
+
+QrStream& QrStream::operator<<(int value) {
+    return writeFormatted(L"%d", value);
+}
+
+QrStream& QrStream::operator<<(unsigned short value) {
+    return writeFormatted(L"%u", static_cast<unsigned int>(value));
+}
+
+QrStream& QrStream::operator<<(short value) {
+    return writeFormatted(L"%d", static_cast<int>(value));
+}
+
+QrStream& QrStream::operator<<(unsigned char value) {
+    return writeFormatted(L"%u", static_cast<unsigned int>(value));
+}
+
+QrStream& QrStream::operator<<(wchar_t value) {
+    const auto code = static_cast<std::uint32_t>(value);
+    if (code > 0xFFFF)
+        throw QrStreamEx::ExWriteError(source, __LINE__);
+    return writeFormatted(L"%d", static_cast<int>(code));
+}
+
+QrStream& QrStream::operator<<(char value) {
+    return writeFormatted(L"%d", static_cast<int>(static_cast<signed char>(value)));
+}
+
+QrStream& QrStream::operator<<(bool value) {
+    writeSeparator();
+    const wchar_t digit = value ? L'1' : L'0';
+    column += io().writeChar(&digit, 1);
+    return *this;
+}
+
+QrStream& QrStream::operator<<(const std::wstring& value) {
+    if (value.size() > static_cast<std::size_t>(std::numeric_limits<int>::max()))
+        throw QrStreamEx::ExWriteError(source, __LINE__);
+    const int length = static_cast<int>(value.size());
+    formattedWrite(L"%d", length);
+    separatorPending = true;
+    writeSeparator();
+    column += io().writeChar(value.data(), length);
+    return *this;
+}
+
+QrStream& QrStream::operator>>(unsigned long long& value) {
+    return readFormatted(L"%I64u", value);
+}
+
+QrStream& QrStream::operator>>(int64& value) {
+    return readFormatted(L"%I64d", value);
+}
+
+QrStream& QrStream::operator>>(double& value) {
+    return readFormatted(L"%lg", value);
+}
+
+QrStream& QrStream::operator>>(float& value) {
+    return readFormatted(L"%g", value);
+}
+
+QrStream& QrStream::operator>>(unsigned long& value) {
+    return readFormatted(L"%lu", value);
+}
+
+QrStream& QrStream::operator>>(long& value) {
+    return readFormatted(L"%ld", value);
+}
+
+QrStream& QrStream::operator>>(unsigned int& value) {
+    return readFormatted(L"%u", value);
+}
+
+QrStream& QrStream::operator>>(int& value) {
+    return readFormatted(L"%d", value);
+}
+
+QrStream& QrStream::operator>>(unsigned short& value) {
+    return readFormatted(L"%hu", value);
+}
+
+QrStream& QrStream::operator>>(short& value) {
+    return readFormatted(L"%hd", value);
+}
+
+QrStream& QrStream::operator>>(unsigned char& value) {
+    unsigned int number = 0;
+    readFormatted(L"%u", number);
+    value = static_cast<unsigned char>(number);
+    return *this;
+}
+
+QrStream& QrStream::operator>>(wchar_t& value) {
+    // A format without a conversion character assigns nothing: a character's code cannot be read
+    // back, on purpose.
+    return readFormatted(L"%w", value);
+}
+
+QrStream& QrStream::operator>>(char& value) {
+    int number = 0;
+    readFormatted(L"%d", number);
+    value = static_cast<char>(number);
+    return *this;
+}
+
+QrStream& QrStream::operator>>(bool& value) {
+    skipSeparator();
+    wchar_t digit;
+    if (io().readChar(&digit, 1, 1) == 0)
+        throw QrStreamEx::ExReadError(source, __LINE__);
+    value = digit != L'0';
+    return *this;
+}
+
+QrStream& QrStream::operator>>(std::wstring& value) {
+    int length = 0;
+    *this >> length;
+    skipSeparator();
+    readCharacters(value, length, source);
+    return *this;
+}
+
+void QrStream::readCharacters(std::wstring& value, int length, const char* reporter) {
+    // A length is only a claim: memory grows with the characters that arrive.
+    constexpr int chunk = 64 * 1024;
+    constexpr int longestFill = 1024 * 1024;
+    if (length < 0)
+        throw QrStreamEx::ExReadError(reporter, __LINE__);
+    value.clear();
+    for (int done = 0; done < length;) {
+        const int wanted = std::min(chunk, length - done);
+        value.resize(static_cast<std::size_t>(done + wanted));
+        wchar_t* arrived = value.data() + done;
+        const int got = io().readChar(arrived, wanted, 0x7fffffff);
+        if (got < wanted) {
+            value.resize(static_cast<std::size_t>(done + std::max(got, 0)));
+            throw QrStreamEx::ExReadError(reporter, __LINE__);
+        }
+        done += wanted;
+        // A NUL byte is never consumed and would fill any length.
+        if (done > longestFill &&
+            std::all_of(arrived, arrived + wanted, [](wchar_t c) { return c == L'\0'; }))
+            throw QrStreamEx::ExReadError(reporter, __LINE__);
+    }
+}
+
+} // namespace Mz

@@ -1,0 +1,75 @@
+/// What the tests of the streams share: bytes to read from and to write to, and the base stream.
+#pragma once
+
+#include "components/componentManager/binaryStream.h"
+#include "components/componentManager/stream.h"
+#include "components/componentManager/textStream.h"
+
+#include <iterator>
+#include <ostream>
+#include <sstream>
+#include <string>
+#include <string_view>
+
+namespace Mz::Test {
+
+/// The base by itself: single values are text, counted ones are binary.
+class BaseStream final : public QrStream {
+  public:
+    explicit BaseStream(QrCastable* io) : QrStream(io) {}
+};
+
+/// A stream of the kind `Stream` that reads the given bytes.
+template <class Stream>
+struct Reading {
+    explicit Reading(std::string_view bytes) : source(std::string(bytes)) {}
+
+    /// The bytes that were not read.
+    std::string rest() { return {std::istreambuf_iterator<char>(source.rdbuf()), {}}; }
+
+    std::istringstream source;
+    QrInBuffer buffer{&source};
+    Stream stream{&buffer};
+};
+
+/// A stream of the kind `Stream` whose bytes are kept.
+template <class Stream>
+struct Writing {
+    std::string bytes() const { return sink.str(); }
+
+    std::ostringstream sink;
+    QrOutBuffer buffer{&sink};
+    Stream stream{&buffer};
+};
+
+/// What `write(stream)` writes to a new stream of the kind `Stream`.
+template <class Stream, class Work>
+std::string written(Work&& write) {
+    Writing<Stream> out;
+    write(out.stream);
+    return out.bytes();
+}
+
+/// The bytes that "00 FF 41" names.
+inline std::string fromHex(std::string_view digits) {
+    const auto value = [](char c) { return c <= '9' ? c - '0' : c - 'A' + 10; };
+    std::string bytes;
+    for (std::size_t at = 0; at + 1 < digits.size(); at += 3)
+        bytes += static_cast<char>(value(digits[at]) * 16 + value(digits[at + 1]));
+    return bytes;
+}
+
+inline std::string toHex(std::string_view bytes) {
+    constexpr std::string_view symbols = "0123456789ABCDEF";
+    std::string digits;
+    for (const char byte : bytes) {
+        const auto code = static_cast<unsigned char>(byte);
+        if (!digits.empty())
+            digits += ' ';
+        digits += symbols[code / 16];
+        digits += symbols[code % 16];
+    }
+    return digits;
+}
+
+} // namespace Mz::Test
