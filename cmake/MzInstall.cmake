@@ -5,7 +5,7 @@ include(GNUInstallDirs)
 
 set(mzPackageFolder ${CMAKE_INSTALL_LIBDIR}/cmake/MZcomponentManager)
 
-install(TARGETS MZbase MZresmgt MZcomponentManager EXPORT MZcomponentManagerTargets
+install(TARGETS MZbase MZresmgt MZcomponentManager MZobjectIO EXPORT MZcomponentManagerTargets
   FILE_SET HEADERS DESTINATION ${CMAKE_INSTALL_INCLUDEDIR})
 install(EXPORT MZcomponentManagerTargets NAMESPACE Mz:: DESTINATION ${mzPackageFolder})
 

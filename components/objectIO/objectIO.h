@@ -1,0 +1,155 @@
+/// Whole objects on streams: what the library's own buffers refuse to do.
+///
+/// Put one of these between a stream and the buffer under it, and `stream << object` and
+/// `stream.readObject(…)` work:
+///
+///     std::ofstream file("scene.bin", std::ios::binary);
+///     QrOutBuffer bytes(&file);
+///     QrObjectOutBuffer objects(&bytes);
+///     QrBinaryStream stream(&objects);
+///     stream << scene.get();
+///
+///     QrInBuffer bytes(&file);
+///     QrObjectInBuffer objects(&bytes);
+///     QrBinaryStream stream(&objects);
+///     QrRef<QrCastable> scene = stream.readObject(&Scene::uid, nullptr, nullptr);
+///     QrPostLoadList list;
+///     stream.transfer(list);
+///     list.loadFinished();
+///
+/// An object is stored with the identity and version of its class (`QrPersistant`) and made again by
+/// the component manager's builder of that identity. An object that is reached twice is stored once
+/// and comes back as one; cycles and null are fine. An object that is still being read may already
+/// be handed to others, so resolve links in `loadFinished`, not while reading.
+///
+/// **Strings.** Wide strings come back exactly from a binary stream as long as every character has a
+/// form in the current locale and none is L'\0', which raises `QrStreamEx::ExWriteError` when it is
+/// written. The text form of a stream cannot carry strings exactly: reading one raises
+/// `QrStreamEx::ExReadError`, and so does writing one where it can be told from a number. Write
+/// strings with `QrWriteExactText`, which every stream carries exactly.
+#pragma once
+
+#include "components/componentManager/stream.h"
+
+#include <memory>
+#include <string>
+
+#ifdef MZ_BUILDING_OBJECT_IO
+#define MZ_OBJECT_IO_API MZ_EXPORT
+#else
+#define MZ_OBJECT_IO_API MZ_IMPORT
+#endif
+
+namespace Mz {
+
+/// Objects may be nested in one another to this depth. More is an error, where it would else be an
+/// overflow of the stack; long chains are written as a list of their elements.
+inline constexpr int QrMaximumObjectDepth = 500;
+
+/// An IO that leaves everything to another one, on which it holds a reference.
+class MZ_OBJECT_IO_API QrForwardingIO : public QrBufferedIO {
+  public:
+    bool isBufferIgnored() const override;
+    void writeObject(const QrCastable* obj, QrStream& s, const wchar_t* a,
+                     const wchar_t* b) override;
+    QrRef<QrCastable> readObject(QrStream& s, const QrUid* id, const wchar_t* a,
+                                 const wchar_t* b) override;
+    void write(const void* data, int size) override;
+    void write(char c) override;
+    int read(void* data, int size) override;
+    int read() override;
+    void writeEol() override;
+    void writeSpace() override;
+    int writeChar(const wchar_t* s, int count) override;
+    int writeChar(const char* s, int size) override;
+    void writeChar(wchar_t c) override;
+    void writeChar(char c) override;
+    void skipWhiteSpace(int count) override;
+    int readChar(wchar_t* buf, int size, int count) override;
+    int readChar(char* buf, int size, int count) override;
+    int readChar(wchar_t& c) override;
+    int readChar(char& c) override;
+    void ungetc(wchar_t c) override;
+    void ungetc(char c) override;
+    bool canSeek() const override;
+    int64 seek(int64 offset, int origin) override;
+    int64 tell() const override;
+
+  protected:
+    /// Throws `QrComponentManagerEx::ExBadCast` when `io` is null or no `QrBufferedIO`.
+    explicit QrForwardingIO(QrCastable* io);
+    ~QrForwardingIO() override;
+
+    QrBufferedIO& inner() const { return *target; }
+
+  private:
+    QrPtr<QrBufferedIO> target;
+};
+
+/// Writes whole objects. Not counted; lives as long as the stream over it needs it.
+///
+/// Holds a reference on every object that was written, until it is destroyed: what was stored is
+/// known by its address, which must not pass to another object meanwhile.
+///
+/// After a failure inside an object nothing more can be written through this IO: what came before
+/// is complete, the object is not.
+class MZ_OBJECT_IO_API QrObjectOutBuffer
+    : public QrCastImpl<QrObjectOutBuffer, QrForwardingIO, const QrObjectOutBuffer&> {
+  public:
+    explicit QrObjectOutBuffer(QrCastable* io);
+    ~QrObjectOutBuffer() override;
+
+    /// Raises `QrStreamEx::ExWriteObject`, with the position, when the object (or one in it) is no
+    /// `QrPersistant`, is nested too deeply, or an earlier object failed; and whatever the object's
+    /// own writing raises.
+    void writeObject(const QrCastable* obj, QrStream& s, const wchar_t* a,
+                     const wchar_t* b) override;
+
+    /// Raises `QrStreamEx::ExWriteError` for a character that cannot be read back.
+    int writeChar(const wchar_t* s, int count) override;
+
+  private:
+    struct State;
+    std::unique_ptr<State> state;
+};
+
+/// Reads whole objects. Not counted; lives as long as the stream over it needs it. Holds a reference
+/// on every object that was read, until it is destroyed.
+class MZ_OBJECT_IO_API QrObjectInBuffer
+    : public QrCastImpl<QrObjectInBuffer, QrForwardingIO, const QrObjectInBuffer&> {
+  public:
+    explicit QrObjectInBuffer(QrCastable* io);
+    ~QrObjectInBuffer() override;
+
+    /// The object as its principal interface; null when null was written. When `id` is given, the
+    /// object answers for it.
+    ///
+    /// Raises `QrStreamEx::ExReadObject`, whose reason names the position and what is wrong there:
+    /// no object begins here, a class that no builder makes, an object of another class or version,
+    /// data that ends or fails inside an object, an object that read less or more than was written,
+    /// objects nested too deeply, an object without the interface wanted. After that, nothing more
+    /// can be read through this IO. What is no failure of a stream passes through unchanged.
+    QrRef<QrCastable> readObject(QrStream& s, const QrUid* id, const wchar_t* a,
+                                 const wchar_t* b) override;
+
+    /// Raises `QrStreamEx::ExReadError` for a string in the text form of a stream.
+    int readChar(wchar_t* buf, int size, int count) override;
+    using QrForwardingIO::readChar;
+
+  private:
+    QrRef<QrCastable> readRecord(QrStream& s);
+    QrRef<QrCastable> readNewObject(QrStream& s, unsigned int number);
+
+    struct State;
+    std::unique_ptr<State> state;
+};
+
+/// Writes `text` in a form that every kind of stream gives back exactly, in every locale: its
+/// length, then the code of each character, all as `unsigned int`.
+MZ_OBJECT_IO_API void QrWriteExactText(QrStream& stream, const std::wstring& text);
+
+/// Reads what `QrWriteExactText` wrote. `QrStreamEx::ExReadError` when it is cut, or has a character
+/// that this platform's `wchar_t` cannot hold.
+MZ_OBJECT_IO_API std::wstring QrReadExactText(QrStream& stream);
+
+} // namespace Mz
