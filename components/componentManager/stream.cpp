@@ -259,16 +259,17 @@ QrStream& QrStream::operator>>(std::wstring& value) {
     int length = 0;
     *this >> length;
     skipSeparator();
-    readCharacters(value, length, source);
+    if (!readCharacters(value, length))
+        throw QrStreamEx::ExReadError(source, __LINE__);
     return *this;
 }
 
-void QrStream::readCharacters(std::wstring& value, int length, const char* reporter) {
+bool QrStream::readCharacters(std::wstring& value, int length) {
     // A length is only a claim: memory grows with the characters that arrive.
     constexpr int chunk = 64 * 1024;
     constexpr int longestFill = 1024 * 1024;
     if (length < 0)
-        throw QrStreamEx::ExReadError(reporter, __LINE__);
+        return false;
     value.clear();
     for (int done = 0; done < length;) {
         const int wanted = std::min(chunk, length - done);
@@ -277,14 +278,15 @@ void QrStream::readCharacters(std::wstring& value, int length, const char* repor
         const int got = io().readChar(arrived, wanted, 0x7fffffff);
         if (got < wanted) {
             value.resize(static_cast<std::size_t>(done + std::max(got, 0)));
-            throw QrStreamEx::ExReadError(reporter, __LINE__);
+            return false;
         }
         done += wanted;
         // A NUL byte is never consumed and would fill any length.
         if (done > longestFill &&
             std::all_of(arrived, arrived + wanted, [](wchar_t c) { return c == L'\0'; }))
-            throw QrStreamEx::ExReadError(reporter, __LINE__);
+            return false;
     }
+    return true;
 }
 
 } // namespace Mz

@@ -173,9 +173,9 @@ class MZ_COMPONENT_MANAGER_API QrStream {
     void skipSeparator();
     /// Ends the line of text, if a separator is due: before binary data.
     void endText();
-    /// Reads `length` characters, as they stand, into `value`; `ExReadError`, naming `source`, when
-    /// `length` is negative or fewer come.
-    void readCharacters(std::wstring& value, int length, const char* source);
+    /// Reads `length` characters, as they stand, into `value`. False when `length` is negative, fewer
+    /// come, or nothing but a NUL, which is never consumed, fills more than 1 MiB.
+    bool readCharacters(std::wstring& value, int length);
 
   private:
     template <class T>

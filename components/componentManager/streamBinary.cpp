@@ -324,7 +324,8 @@ int QrStream::read(std::wstring& values, int count) {
         int length = 0;
         if (read(length, 1) == 0)
             break;
-        readCharacters(*value, length, source);
+        if (!readCharacters(*value, length))
+            throw QrStreamEx::ExReadError(source, __LINE__);
     }
     return done;
 }
