@@ -59,6 +59,23 @@ void putBack(std::istream& in, const char* begin, const char* end) {
         putBack(in, *--end);
 }
 
+/// Reads up to `wanted` characters that are bytes. A NUL is delivered but never consumed, so it is
+/// all that the rest can be.
+int readPlainCharacters(std::istream& in, std::streambuf& buffer, wchar_t* characters, int wanted) {
+    for (int stored = 0; stored < wanted; ++stored) {
+        const int byte = peekDirectly(in, buffer);
+        if (byte < 0)
+            return stored;
+        if (byte == 0) {
+            std::fill(characters + stored, characters + wanted, L'\0');
+            break;
+        }
+        characters[stored] = static_cast<wchar_t>(byte);
+        buffer.sbumpc();
+    }
+    return wanted;
+}
+
 } // namespace
 
 void throwBrokenInput() {
@@ -139,6 +156,8 @@ int QrInBuffer::readChar(wchar_t* buf, int size, int count) {
     if (wanted < 1)
         return 0;
     const platform::CharacterConverter converter;
+    if (std::streambuf* const buffer = converter.plainBytes() ? directBuffer(*in) : nullptr)
+        return readPlainCharacters(*in, *buffer, buf, wanted);
     char pending[maximumPendingBytes];
     int pendingBytes = 0;
     int stored = 0;
