@@ -7,6 +7,7 @@
 #include <array>
 #include <charconv>
 #include <clocale>
+#include <cstdlib>
 #include <cstring>
 #include <random>
 #include <sstream>
@@ -281,6 +282,7 @@ void readTextValues(benchmark::State& state) {
 /// Runs `body` while the process's locale writes a comma before decimals.
 RatioTable::Body underDecimalComma(RatioTable::Body body) {
     return [body = std::move(body)](benchmark::State& state) {
+        setenv("LOCPATH", MZ_LOCALE_FOLDER, 1);
         if (!std::setlocale(LC_ALL, "de_DE.UTF-8") || *std::localeconv()->decimal_point != ',')
             state.SkipWithError("there is no locale with a decimal comma");
         else

@@ -9,7 +9,7 @@
 namespace Mz::Test {
 
 bool setCommaLocale() {
-    setenv("LOCPATH", MZ_TEST_LOCALES, 1);
+    setenv("LOCPATH", MZ_LOCALE_FOLDER, 1);
     return std::setlocale(LC_ALL, "de_DE.UTF-8") != nullptr;
 }
 

@@ -1,5 +1,7 @@
 #include "tests/unit/locales.h"
 
+#include <cstdlib>
+
 namespace Mz::Test {
 
 std::vector<MultibyteLocale> multibyteLocales() {
@@ -17,7 +19,12 @@ std::vector<MultibyteLocale> multibyteLocales() {
 }
 
 std::vector<SingleByteLocale> singleByteLocales() {
-    return {};
+    // Few systems have one, so it was made for the tests, where the tools for that are there.
+    setenv("LOCPATH", MZ_LOCALE_FOLDER, 1);
+    constexpr const char* name = "de_DE.ISO-8859-15";
+    if (!LocaleGuard(name))
+        return {};
+    return {{name, '\xA4', L'\u20AC'}, {name, '\xE4', L'\u00E4'}, {name, 'a', L'a'}};
 }
 
 } // namespace Mz::Test

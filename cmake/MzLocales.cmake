@@ -1,0 +1,31 @@
+# Locales for tests and measurements: a minimal system has none but "C". The C library reads them
+# from any folder that LOCPATH names, so they are made in the build folder.
+include_guard(GLOBAL)
+
+# mz_use_locales(TARGET): makes the locales before TARGET, which gets their folder as
+# MZ_LOCALE_FOLDER. The tools that make them (Debian: locales) may be absent; then the folder is too.
+find_program(MZ_LOCALEDEF localedef)
+
+function(mz_make_locale name charmap)
+  if(NOT MZ_LOCALEDEF OR NOT EXISTS /usr/share/i18n/charmaps/${charmap}.gz)
+    return()
+  endif()
+  set(output ${CMAKE_BINARY_DIR}/locales/${name}.${charmap})
+  add_custom_command(OUTPUT ${output}/LC_NUMERIC
+    COMMAND ${CMAKE_COMMAND} -E make_directory ${CMAKE_BINARY_DIR}/locales
+    COMMAND ${MZ_LOCALEDEF} -i ${name} -f ${charmap} --no-archive ${output}
+    COMMENT "Making the locale ${name}.${charmap}")
+  set_property(GLOBAL APPEND PROPERTY mzLocales ${output}/LC_NUMERIC)
+endfunction()
+
+if(NOT WIN32)
+  mz_make_locale(de_DE UTF-8)
+  mz_make_locale(de_DE ISO-8859-15)
+endif()
+get_property(mzLocales GLOBAL PROPERTY mzLocales)
+add_custom_target(mzLocales DEPENDS ${mzLocales})
+
+function(mz_use_locales target)
+  target_compile_definitions(${target} PRIVATE MZ_LOCALE_FOLDER="${CMAKE_BINARY_DIR}/locales")
+  add_dependencies(${target} mzLocales)
+endfunction()
