@@ -85,8 +85,6 @@ QrRef<QrCastable> QrObjectInBuffer::readObject(QrStream& s, const QrUid* id, con
     } catch (const QrComponentManagerEx& failure) {
         state->failInside(position, failure);
     }
-    if (state->failed)
-        state->fail(__LINE__, position, "an object inside this one failed");
     if (object && id && !answersFor(*object, *id))
         state->fail(__LINE__, position,
                     "the object has not the interface " + ObjectRecord::text(*id));
@@ -133,6 +131,8 @@ QrRef<QrCastable> QrObjectInBuffer::readNewObject(QrStream& s, std::uint32_t num
                         std::to_string(persistant->getVersion()));
     state->objects.emplace_back(object->getCastable());
     persistant->read(s);
+    if (state->failed)
+        state->fail(__LINE__, position, "an object inside this one failed");
     state->expectMark(s, number, inner().tell());
     return state->objects[number - 1];
 }
