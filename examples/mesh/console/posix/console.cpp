@@ -19,6 +19,14 @@ std::wstring wideName(const std::filesystem::path& path) {
     return result;
 }
 
+std::wstring fileText(const std::filesystem::path& path) {
+    try {
+        return path.wstring();
+    } catch (const std::exception&) {
+        return wideName(path); // The name is no text.
+    }
+}
+
 std::string outputText(std::wstring_view text) {
     std::string result;
     for (const wchar_t character : text)
