@@ -21,7 +21,8 @@ std::wstring wideName(const std::filesystem::path& path) {
 
 std::wstring fileText(const std::filesystem::path& path) {
     try {
-        return path.wstring();
+        const std::u32string text = path.u32string(); // Whatever the locale, names are UTF-8.
+        return {text.begin(), text.end()};
     } catch (const std::exception&) {
         return wideName(path); // The name is no text.
     }
