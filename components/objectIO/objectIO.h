@@ -30,8 +30,8 @@
 /// `QrStreamEx::ExWriteError` when they are written. The text form of a stream cannot carry strings
 /// exactly: inside an object, reading one that is not empty raises `QrStreamEx::ExReadError`, and
 /// so does writing one, with `ExWriteError`, unless it looks like a number. Write strings with
-/// `QrWriteExactText`, which every stream carries exactly. A `bool` inside an object comes back
-/// from text too, wherever it stands.
+/// `QrWriteExactText`, which every stream carries exactly. Infinities and NaNs are refused in text
+/// likewise. A `bool` inside an object comes back from text too, wherever it stands.
 #pragma once
 
 #include "components/componentManager/stream.h"

@@ -17,9 +17,10 @@ constexpr const char* source = "components/objectIO/objectOutBuffer";
     throw QrStreamEx::ExWriteObject(source, line, ObjectRecord::reason(io.tell(), what).c_str());
 }
 
-/// Whether a text stream writes the character as part of a number.
+/// Whether a text stream writes the character as part of a number that can be read back: those of
+/// infinities and of what is no number are not.
 bool isOfNumber(wchar_t c) {
-    return c != L'\0' && std::wcschr(L"0123456789+-.einfa", c);
+    return c != L'\0' && std::wcschr(L"0123456789+-.e", c);
 }
 
 } // namespace
@@ -104,12 +105,12 @@ void QrObjectOutBuffer::writeRecord(QrStream& s, std::uint32_t number, QrPersist
 }
 
 int QrObjectOutBuffer::writeChar(const wchar_t* s, int count) {
-    const bool readable = std::all_of(s, s + std::max(count, 0), [this](wchar_t c) {
-        return state->exactStrings ? c != L'\0' : isOfNumber(c);
-    });
-    if (!readable)
-        throw QrStreamEx::ExWriteError(source, __LINE__,
-                                       "the stream cannot carry this string exactly");
+    const wchar_t* end = s + std::max(count, 0);
+    if (state->exactStrings && std::find(s, end, L'\0') != end)
+        throw QrStreamEx::ExWriteError(source, __LINE__, "a string has a NUL in it");
+    if (!state->exactStrings && !std::all_of(s, end, isOfNumber))
+        throw QrStreamEx::ExWriteError(
+            source, __LINE__, "a text stream carries neither strings nor infinite numbers exactly");
     return inner().writeChar(s, count);
 }
 

@@ -4,7 +4,9 @@
 #include "tests/streams/support.h"
 #include "tests/unit/locales.h"
 
+#include <bit>
 #include <climits>
+#include <limits>
 #include <random>
 
 namespace {
@@ -55,7 +57,7 @@ TEST_F(Strings, AreExactInBinary) {
 }
 
 TEST_F(Strings, WithANulAreRefusedInEveryForm) {
-    EXPECT_THAT(refusal<QrBinaryStream>(std::wstring(L"a\0b", 3)), HasSubstr("exactly"));
+    EXPECT_THAT(refusal<QrBinaryStream>(std::wstring(L"a\0b", 3)), HasSubstr("a NUL in it"));
     EXPECT_THAT(refusal<QrTextStream>(std::wstring(L"1\0"
                                                    L"2",
                                                    3)),
@@ -66,6 +68,26 @@ TEST_F(Strings, AreRefusedInText) {
     EXPECT_THAT(refusal<QrTextStream>(L"word"), HasSubstr("exactly"));
     EXPECT_THAT(refusal<QrTextStream>(L"1 2"), HasSubstr("exactly"));
     EXPECT_EQ(through<QrTextStream>(L""), L"");
+}
+
+TEST_F(Strings, NumbersThatTextCannotCarryAreRefusedLikewise) {
+    constexpr double infinity = std::numeric_limits<double>::infinity();
+    for (const double value : {infinity, -infinity, std::numeric_limits<double>::quiet_NaN()}) {
+        const QrPtr<Node> object = node(1);
+        object->weight = value;
+        Saving<QrTextStream> out;
+        EXPECT_THROW(out.stream << object.get(), QrStreamEx::ExWriteError);
+        Loading<QrBinaryStream> in(saved<QrBinaryStream>(object.get()));
+        EXPECT_EQ(std::bit_cast<std::uint64_t>(in.node()->weight),
+                  std::bit_cast<std::uint64_t>(value));
+    }
+    for (const double value : {1e300, -1e-300, 5e-324, -0.0}) {
+        const QrPtr<Node> object = node(1);
+        object->weight = value;
+        Loading<QrTextStream> in(saved<QrTextStream>(object.get()));
+        EXPECT_EQ(std::bit_cast<std::uint64_t>(in.node()->weight),
+                  std::bit_cast<std::uint64_t>(value));
+    }
 }
 
 TEST_F(Strings, ThatLookLikeNumbersAreRefusedWhenTextIsRead) {
