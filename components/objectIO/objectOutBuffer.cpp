@@ -108,9 +108,10 @@ int QrObjectOutBuffer::writeChar(const wchar_t* s, int count) {
     const wchar_t* end = s + std::max(count, 0);
     if (state->exactStrings && std::find(s, end, L'\0') != end)
         throw QrStreamEx::ExWriteError(source, __LINE__, "a string has a NUL in it");
+    constexpr const char* inexact =
+        "a text stream carries neither strings nor infinite numbers exactly";
     if (!state->exactStrings && !std::all_of(s, end, isOfNumber))
-        throw QrStreamEx::ExWriteError(
-            source, __LINE__, "a text stream carries neither strings nor infinite numbers exactly");
+        throw QrStreamEx::ExWriteError(source, __LINE__, inexact);
     return inner().writeChar(s, count);
 }
 

@@ -1,4 +1,4 @@
-#include "../fullMedium.h"
+#include "tests/mesh/fullMedium.h"
 
 #include <csignal>
 #include <sys/resource.h>

@@ -1,4 +1,4 @@
-#include "../fullMedium.h"
+#include "tests/mesh/fullMedium.h"
 
 namespace Meshes {
 
