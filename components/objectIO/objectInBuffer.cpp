@@ -3,6 +3,7 @@
 #include "components/objectIO/objectRecord.h"
 
 #include <algorithm>
+#include <string_view>
 #include <vector>
 
 namespace Mz {
@@ -25,11 +26,18 @@ struct QrObjectInBuffer::State {
     int depth = 0;
     bool exactStrings = true; ///< whether the stream that reads carries strings as they are
     bool failed = false;
-    bool explained = false; ///< whether the failure on its way has said where and what
+    std::string explanation; ///< what the last failure has said, where and what
 
     [[noreturn]] void fail(int line, int64 position, const std::string& what) {
-        failed = explained = true;
-        throw QrStreamEx::ExReadObject(source, line, ObjectRecord::reason(position, what).c_str());
+        failed = true;
+        explanation = ObjectRecord::reason(position, what);
+        throw QrStreamEx::ExReadObject(source, line, explanation.c_str());
+    }
+
+    /// Whether a failure is one of these on its way out.
+    bool hasExplained(const ExBase& failure) const {
+        return !explanation.empty() &&
+               std::string_view(failure.getReason()).starts_with(explanation);
     }
 
     /// What passes through an object's own code, told with the place of the object.
@@ -77,7 +85,7 @@ QrRef<QrCastable> QrObjectInBuffer::readObject(QrStream& s, const QrUid* id, con
     try {
         object = readRecord(s, position);
     } catch (const QrStreamEx::ExReadObject& failure) {
-        if (state->explained)
+        if (state->hasExplained(failure))
             throw;
         state->failInside(position, failure);
     } catch (const QrStreamEx& failure) {

@@ -127,6 +127,14 @@ TYPED_TEST(Faulty, ObjectInsideAnotherFailsBoth) {
     EXPECT_STREQ(allNotes(), "swallowed ");
 }
 
+TYPED_TEST(Faulty, FailureOfAnObjectsOwnMakingIsToldWithTheObjectsPlace) {
+    Scripted unknown(unknownUid, 1, [](QrStream&) {});
+    EXPECT_EQ(this->failureOf(misleadingUid, 1,
+                              [&](QrStream& s) { s << static_cast<const QrCastable*>(&unknown); }),
+              "byte 0: inside the object that begins here: Error loading object.: Error loading "
+              "object.");
+}
+
 TYPED_TEST(Faulty, InnermostPlaceIsTold) {
     Scripted inner(unknownUid, 1, [](QrStream&) {});
     const std::size_t begin = saved<TypeParam>(nullptr).size();

@@ -62,6 +62,9 @@ inline constexpr QrUid notPersistentUid = classUid(8);
 inline constexpr QrUid makesNullUid = classUid(9);
 inline constexpr QrUid throwingUid = classUid(10);
 
+/// A node that answers the failure of an object inside it with one of its own, without a place.
+inline constexpr QrUid misleadingUid = classUid(11);
+
 /// No builder has this one.
 inline constexpr QrUid unknownUid = classUid(0x99);
 

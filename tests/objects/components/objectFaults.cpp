@@ -71,6 +71,20 @@ class Careless final : public Counted<Careless> {
     }
 };
 
+class Misleading final : public Counted<Misleading> {
+  public:
+    const QrUid* getClassUid() const override { return &misleadingUid; }
+    unsigned int getVersion() const override { return 1; }
+    void write(QrStream&) override {}
+    void read(QrStream& stream) override {
+        try {
+            stream.readObject(nullptr, nullptr, nullptr);
+        } catch (const QrStreamEx::ExReadObject&) {
+            throw QrStreamEx::ExReadObject("misleading", 1);
+        }
+    }
+};
+
 class NotPersistent final : public QrCastRef<QrCastHeap<QrCastImpl<NotPersistent, Node>>> {};
 
 class MakesNull final : public Kit::Builder<MakesNull> {
@@ -90,5 +104,6 @@ class Throwing final : public Kit::Builder<Throwing> {
 MZ_COMPONENT(L"Faults", L"", Kit::builder<ViewedBuilder>(),
              Kit::builderOf<Selfish>({.uid = selfishUid}),
              Kit::builderOf<Careless>({.uid = carelessUid}),
+             Kit::builderOf<Misleading>({.uid = misleadingUid}),
              Kit::builderOf<NotPersistent>({.uid = notPersistentUid}), Kit::builder<MakesNull>(),
              Kit::builder<Throwing>())
