@@ -1,8 +1,6 @@
 #include "components/objectIO/objectIO.h"
-#include "components/objectIO/objectRecord.h"
 
 #include <cstdint>
-#include <cstdio>
 #include <vector>
 
 namespace Mz {
@@ -68,12 +66,6 @@ std::wstring QrReadExactText(QrStream& stream) {
         append(text, code);
     }
     return text;
-}
-
-std::string ObjectRecord::text(const QrUid& uid) {
-    char buffer[48];
-    std::snprintf(buffer, sizeof buffer, "%08X-%08X-%08X-%08X", uid.w0, uid.w1, uid.w2, uid.w3);
-    return buffer;
 }
 
 } // namespace Mz

@@ -1,7 +1,7 @@
 /// Whole objects on streams: what the library's own buffers refuse to do.
 ///
 /// Put one of these between a stream and the buffer under it, and `stream << object` and
-/// `stream.readObject(…)` work:
+/// `stream.readObject(…)` work. Saving:
 ///
 ///     std::ofstream file("scene.bin", std::ios::binary);
 ///     QrOutBuffer bytes(&file);
@@ -9,6 +9,9 @@
 ///     QrBinaryStream stream(&objects);
 ///     stream << scene.get();
 ///
+/// Loading, with the component manager initialised:
+///
+///     std::ifstream file("scene.bin", std::ios::binary);
 ///     QrInBuffer bytes(&file);
 ///     QrObjectInBuffer objects(&bytes);
 ///     QrBinaryStream stream(&objects);
@@ -17,20 +20,23 @@
 ///     stream.transfer(list);
 ///     list.loadFinished();
 ///
-/// An object is stored with the identity and version of its class (`QrPersistant`) and made again by
-/// the component manager's builder of that identity. An object that is reached twice is stored once
-/// and comes back as one; cycles and null are fine. An object that is still being read may already
-/// be handed to others, so resolve links in `loadFinished`, not while reading.
+/// An object is stored with the identity and version of its class (`QrPersistant`) and made again
+/// by the component manager's builder of that identity. An object that is reached twice is stored
+/// once and comes back as one; cycles and null are fine. An object that is still being read may
+/// already be handed to others, so resolve links in `loadFinished`, not while reading.
 ///
-/// **Strings.** Wide strings come back exactly from a binary stream as long as every character has a
-/// form in the current locale and none is L'\0', which raises `QrStreamEx::ExWriteError` when it is
-/// written. The text form of a stream cannot carry strings exactly: reading one raises
-/// `QrStreamEx::ExReadError`, and so does writing one where it can be told from a number. Write
-/// strings with `QrWriteExactText`, which every stream carries exactly.
+/// **Strings.** Wide strings come back exactly from a binary stream that is read in the locale in
+/// which it was written; a character without a form there, and L'\0', raise
+/// `QrStreamEx::ExWriteError` when they are written. The text form of a stream cannot carry strings
+/// exactly: inside an object, reading one that is not empty raises `QrStreamEx::ExReadError`, and
+/// so does writing one, with `ExWriteError`, unless it looks like a number. Write strings with
+/// `QrWriteExactText`, which every stream carries exactly. Infinities and NaNs are refused in text
+/// likewise. A `bool` inside an object comes back from text too, wherever it stands.
 #pragma once
 
 #include "components/componentManager/stream.h"
 
+#include <cstdint>
 #include <memory>
 #include <string>
 
@@ -92,7 +98,8 @@ class MZ_OBJECT_IO_API QrForwardingIO : public QrBufferedIO {
 /// known by its address, which must not pass to another object meanwhile.
 ///
 /// After a failure inside an object nothing more can be written through this IO: what came before
-/// is complete, the object is not.
+/// is complete, the object is not. An object that is refused before anything of it was written
+/// leaves this IO as it was.
 class MZ_OBJECT_IO_API QrObjectOutBuffer
     : public QrCastImpl<QrObjectOutBuffer, QrForwardingIO, const QrObjectOutBuffer&> {
   public:
@@ -107,14 +114,17 @@ class MZ_OBJECT_IO_API QrObjectOutBuffer
 
     /// Raises `QrStreamEx::ExWriteError` for a character that cannot be read back.
     int writeChar(const wchar_t* s, int count) override;
+    using QrForwardingIO::writeChar;
 
   private:
+    void writeRecord(QrStream& s, std::uint32_t number, QrPersistant* object);
+
     struct State;
     std::unique_ptr<State> state;
 };
 
-/// Reads whole objects. Not counted; lives as long as the stream over it needs it. Holds a reference
-/// on every object that was read, until it is destroyed.
+/// Reads whole objects. Not counted; lives as long as the stream over it needs it. Holds a
+/// reference on every object that was read, until it is destroyed.
 class MZ_OBJECT_IO_API QrObjectInBuffer
     : public QrCastImpl<QrObjectInBuffer, QrForwardingIO, const QrObjectInBuffer&> {
   public:
@@ -122,23 +132,25 @@ class MZ_OBJECT_IO_API QrObjectInBuffer
     ~QrObjectInBuffer() override;
 
     /// The object as its principal interface; null when null was written. When `id` is given, the
-    /// object answers for it.
+    /// object answers for it, by itself or through a translation.
     ///
     /// Raises `QrStreamEx::ExReadObject`, whose reason names the position and what is wrong there:
     /// no object begins here, a class that no builder makes, an object of another class or version,
-    /// data that ends or fails inside an object, an object that read less or more than was written,
-    /// objects nested too deeply, an object without the interface wanted. After that, nothing more
-    /// can be read through this IO. What is no failure of a stream passes through unchanged.
+    /// data that ends or fails inside an object, a bad cast in it, an object that read less or more
+    /// than was written, objects nested too deeply, an object without the interface wanted. What
+    /// else an object's own code throws passes through unchanged. After either, nothing more can be
+    /// read through this IO, and what the stream has for `transfer` is of no use: objects of the
+    /// load that failed may be among it.
     QrRef<QrCastable> readObject(QrStream& s, const QrUid* id, const wchar_t* a,
                                  const wchar_t* b) override;
 
-    /// Raises `QrStreamEx::ExReadError` for a string in the text form of a stream.
+    /// Raises `QrStreamEx::ExReadError` for a string in the text form of a stream, or with a NUL.
     int readChar(wchar_t* buf, int size, int count) override;
     using QrForwardingIO::readChar;
 
   private:
-    QrRef<QrCastable> readRecord(QrStream& s);
-    QrRef<QrCastable> readNewObject(QrStream& s, unsigned int number);
+    QrRef<QrCastable> readRecord(QrStream& s, int64 position);
+    QrRef<QrCastable> readNewObject(QrStream& s, std::uint32_t number, int64 position);
 
     struct State;
     std::unique_ptr<State> state;
@@ -148,8 +160,8 @@ class MZ_OBJECT_IO_API QrObjectInBuffer
 /// length, then the code of each character, all as `unsigned int`.
 MZ_OBJECT_IO_API void QrWriteExactText(QrStream& stream, const std::wstring& text);
 
-/// Reads what `QrWriteExactText` wrote. `QrStreamEx::ExReadError` when it is cut, or has a character
-/// that this platform's `wchar_t` cannot hold.
+/// Reads what `QrWriteExactText` wrote. `QrStreamEx::ExReadError` when it is cut, or has a
+/// character that this platform's `wchar_t` cannot hold.
 MZ_OBJECT_IO_API std::wstring QrReadExactText(QrStream& stream);
 
 } // namespace Mz

@@ -2,6 +2,8 @@
 #include "components/objectIO/objectIO.h"
 #include "components/objectIO/objectRecord.h"
 
+#include <algorithm>
+#include <string_view>
 #include <vector>
 
 namespace Mz {
@@ -10,17 +12,46 @@ namespace {
 
 constexpr const char* source = "components/objectIO/objectInBuffer";
 
-[[noreturn]] void fail(int line, const std::string& where, const std::string& what) {
-    throw QrStreamEx::ExReadObject(source, line, (where + ": " + what).c_str());
+/// As the casts ask: the object itself, then the translations.
+bool answersFor(QrCastable& object, const QrUid& uid) {
+    return object.hasInterface(uid) ||
+           QrPtr<QrCastable>::adopt(QrTranslateInterface(&object, uid)) != nullptr;
 }
 
 } // namespace
 
 struct QrObjectInBuffer::State {
+    /// All objects by number, less one; the last ones may still be being read.
     std::vector<QrRef<QrCastable>> objects;
     int depth = 0;
-    bool inText = false;
+    bool exactStrings = true; ///< whether the stream that reads carries strings as they are
     bool failed = false;
+    std::string explanation; ///< what the last failure has said, where and what
+
+    [[noreturn]] void fail(int line, int64 position, const std::string& what) {
+        failed = true;
+        explanation = ObjectRecord::reason(position, what);
+        throw QrStreamEx::ExReadObject(source, line, explanation.c_str());
+    }
+
+    /// Whether a failure is one of these on its way out.
+    bool hasExplained(const ExBase& failure) const {
+        return !explanation.empty() &&
+               std::string_view(failure.getReason()).starts_with(explanation);
+    }
+
+    /// What passes through an object's own code, told with the place of the object.
+    [[noreturn]] void failInside(int64 position, const ExBase& failure) {
+        fail(__LINE__, position,
+             std::string("inside the object that begins here: ") + failure.getReason());
+    }
+
+    void expectMark(QrStream& s, std::uint32_t number, int64 position) {
+        std::uint32_t mark = 0;
+        s >> mark;
+        if (mark != ObjectRecord::endMark(number))
+            fail(__LINE__, position, "the object should end here and does not");
+    }
 };
 
 QrObjectInBuffer::QrObjectInBuffer(QrCastable* io)
@@ -30,94 +61,109 @@ QrObjectInBuffer::~QrObjectInBuffer() = default;
 
 QrRef<QrCastable> QrObjectInBuffer::readObject(QrStream& s, const QrUid* id, const wchar_t*,
                                                const wchar_t*) {
-    const std::string where = ObjectRecord::positionText(inner());
+    const int64 position = inner().tell();
     if (state->failed)
-        fail(__LINE__, where, "an earlier object failed");
+        state->fail(__LINE__, position, "an earlier object failed");
     // Until all is well, the object counts as failed.
     struct Reading {
         State& state;
-        bool previousText;
+        const bool previousExactStrings;
         bool complete = false;
-        Reading(State& now, bool text) : state(now), previousText(now.inText) {
-            state.inText = text;
+        Reading(State& now, bool exactStrings)
+            : state(now), previousExactStrings(now.exactStrings) {
+            state.exactStrings = exactStrings;
             ++state.depth;
         }
         ~Reading() {
             --state.depth;
-            state.inText = previousText;
+            state.exactStrings = previousExactStrings;
             state.failed = state.failed || !complete;
         }
-    } reading(*state, s.isTextStream());
+    } reading(*state, s.isBinaryStream());
 
     QrRef<QrCastable> object;
     try {
-        object = readRecord(s);
-    } catch (const QrStreamEx::ExReadObject&) {
-        throw; // It says where already.
+        object = readRecord(s, position);
+    } catch (const QrStreamEx::ExReadObject& failure) {
+        if (state->hasExplained(failure))
+            throw;
+        state->failInside(position, failure);
     } catch (const QrStreamEx& failure) {
-        fail(__LINE__, where, std::string("inside the object that begins here: ") +
-                                  failure.getReason());
+        state->failInside(position, failure);
+    } catch (const QrComponentManagerEx& failure) {
+        state->failInside(position, failure);
     }
-    if (state->failed)
-        fail(__LINE__, where, "an object inside this one failed");
-    if (object && id && !object->hasInterface(*id))
-        fail(__LINE__, where, "the object has not the interface " + ObjectRecord::text(*id));
+    if (object && id && !answersFor(*object, *id))
+        state->fail(__LINE__, position,
+                    "the object has not the interface " + ObjectRecord::text(*id));
     reading.complete = true;
     return object;
 }
 
-QrRef<QrCastable> QrObjectInBuffer::readRecord(QrStream& s) {
-    const std::string where = ObjectRecord::positionText(inner());
+QrRef<QrCastable> QrObjectInBuffer::readRecord(QrStream& s, int64 position) {
     std::uint32_t number = 0;
     s >> number;
-    if (number == ObjectRecord::null)
-        return nullptr;
-    if (number <= state->objects.size())
-        return state->objects[number - 1];
-    if (number != state->objects.size() + 1)
-        fail(__LINE__, where, "no object begins here");
-    if (state->depth > QrMaximumObjectDepth)
-        fail(__LINE__, where, "objects are nested too deeply");
-    return readNewObject(s, number);
+    if (number > state->objects.size()) {
+        if (number != state->objects.size() + 1)
+            state->fail(__LINE__, position, "no object begins here");
+        if (state->depth > QrMaximumObjectDepth)
+            state->fail(__LINE__, position, "objects are nested too deeply");
+        return readNewObject(s, number, position);
+    }
+    if (state->depth == 1)
+        state->expectMark(s, number, position);
+    return number == ObjectRecord::null ? nullptr : state->objects[number - 1];
 }
 
-QrRef<QrCastable> QrObjectInBuffer::readNewObject(QrStream& s, std::uint32_t number) {
-    const std::string where = ObjectRecord::positionText(inner());
+QrRef<QrCastable> QrObjectInBuffer::readNewObject(QrStream& s, std::uint32_t number,
+                                                  int64 position) {
     QrUid classUid{};
-    unsigned int version = 0;
+    std::uint32_t version = 0;
     s >> classUid >> version;
-    // The reference keeps the object alive while its own code runs, whatever that does with it.
+    // This reference keeps the object alive while its own code runs, whatever that does with it.
     const QrRef<QrCastable> object = QrGetComponentManager()->createObject(classUid);
     const QrPtr<QrPersistant> persistant = queryCast<QrPersistant>(object.get());
     if (!persistant)
-        fail(__LINE__, where, "no builder makes persistent objects of the class " +
-                                  ObjectRecord::text(classUid));
+        state->fail(__LINE__, position,
+                    "no builder makes persistent objects of the class " +
+                        ObjectRecord::text(classUid));
     if (!(*persistant->getClassUid() == classUid))
-        fail(__LINE__, where, "the builder of the class " + ObjectRecord::text(classUid) +
-                                  " makes objects of the class " +
-                                  ObjectRecord::text(*persistant->getClassUid()));
+        state->fail(__LINE__, position,
+                    "the builder of the class " + ObjectRecord::text(classUid) +
+                        " makes objects of the class " +
+                        ObjectRecord::text(*persistant->getClassUid()));
     if (persistant->getVersion() != version)
-        fail(__LINE__, where, "the class " + ObjectRecord::text(classUid) + " is stored in version " +
-                                  std::to_string(version) + " and known in version " +
-                                  std::to_string(persistant->getVersion()));
-    state->objects.push_back(persistant->getCastable());
+        state->fail(__LINE__, position,
+                    "the class " + ObjectRecord::text(classUid) + " is stored in version " +
+                        std::to_string(version) + " and known in version " +
+                        std::to_string(persistant->getVersion()));
+    state->objects.emplace_back(object->getCastable());
     persistant->read(s);
-    const std::string endsAt = ObjectRecord::positionText(inner());
-    std::uint32_t mark = 0;
-    s >> mark;
-    if (mark != ObjectRecord::endMark(number))
-        fail(__LINE__, endsAt, "an object of the class " + ObjectRecord::text(classUid) +
-                                   " should end here and does not");
+    if (state->failed)
+        state->fail(__LINE__, position, "an object inside this one failed");
+    state->expectMark(s, number, inner().tell());
     return state->objects[number - 1];
 }
 
 int QrObjectInBuffer::readChar(wchar_t* buf, int size, int count) {
-    // Only strings are read without a limit of characters.
+    // Only strings are read without a limit of characters, and only a bool is read as one.
     constexpr int noLimit = 0x7fffffff;
-    if (state->inText && count == noLimit)
+    if (state->exactStrings || (count != noLimit && (count != 1 || size != 1))) {
+        const int got = inner().readChar(buf, size, count);
+        // A NUL byte is never consumed: it would fill each of any number of strings.
+        if (count == noLimit && got > 0 && std::find(buf, buf + got, L'\0') != buf + got)
+            throw QrStreamEx::ExReadError(source, __LINE__, "a string has a NUL in it");
+        return got;
+    }
+    if (count == noLimit)
         throw QrStreamEx::ExReadError(source, __LINE__,
                                       "a text stream cannot carry strings exactly");
-    return inner().readChar(buf, size, count);
+    // In text, a separator may stand before a bool, which the stream does not skip.
+    inner().skipWhiteSpace(1);
+    const int got = inner().readChar(buf, size, count);
+    if (got == 1 && *buf != L'0' && *buf != L'1')
+        throw QrStreamEx::ExReadError(source, __LINE__, "a bool is neither 0 nor 1");
+    return got;
 }
 
 } // namespace Mz

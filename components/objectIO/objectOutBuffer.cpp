@@ -3,6 +3,7 @@
 
 #include <algorithm>
 #include <cwchar>
+#include <limits>
 #include <unordered_map>
 #include <vector>
 
@@ -13,13 +14,13 @@ namespace {
 constexpr const char* source = "components/objectIO/objectOutBuffer";
 
 [[noreturn]] void fail(const QrBufferedIO& io, int line, const std::string& what) {
-    throw QrStreamEx::ExWriteObject(source, line,
-                                    (ObjectRecord::positionText(io) + ": " + what).c_str());
+    throw QrStreamEx::ExWriteObject(source, line, ObjectRecord::reason(io.tell(), what).c_str());
 }
 
-/// Whether a text stream writes the character as part of a number.
+/// Whether a text stream writes the character as part of a number that can be read back: those of
+/// infinities and of what is no number are not.
 bool isOfNumber(wchar_t c) {
-    return c != L'\0' && std::wcschr(L"0123456789+-.einfa", c);
+    return c != L'\0' && std::wcschr(L"0123456789+-.e", c);
 }
 
 } // namespace
@@ -29,8 +30,21 @@ struct QrObjectOutBuffer::State {
     std::unordered_map<const QrCastable*, std::uint32_t> numbers;
     std::vector<QrCPtr<QrCastable>> kept;
     int depth = 0;
-    bool inText = false;
+    bool exactStrings = true; ///< whether the stream that writes carries strings as they are
     bool failed = false;
+
+    /// The number of an object that is about to be stored.
+    std::uint32_t add(const QrCastable* principal) {
+        const auto number = static_cast<std::uint32_t>(kept.size() + 1);
+        numbers.emplace(principal, number);
+        try {
+            kept.emplace_back(principal);
+        } catch (...) {
+            numbers.erase(principal);
+            throw;
+        }
+        return number;
+    }
 };
 
 QrObjectOutBuffer::QrObjectOutBuffer(QrCastable* io)
@@ -42,55 +56,62 @@ void QrObjectOutBuffer::writeObject(const QrCastable* obj, QrStream& s, const wc
                                     const wchar_t*) {
     if (state->failed)
         fail(inner(), __LINE__, "an earlier object failed");
-    if (!obj) {
-        s << ObjectRecord::null;
-        return;
-    }
-    const QrCastable* principal = obj->getCastable();
-    if (const auto known = state->numbers.find(principal); known != state->numbers.end()) {
-        s << known->second;
-        return;
-    }
-    const QrPtr<QrPersistant> object = queryCast<QrPersistant>(const_cast<QrCastable*>(obj));
-    if (!object)
+    const QrCastable* principal = obj ? obj->getCastable() : nullptr;
+    const auto known = state->numbers.find(principal);
+    const bool isNew = principal && known == state->numbers.end();
+    // What is new must be fit for writing, before anything of it is written.
+    const QrPtr<QrPersistant> object =
+        isNew ? queryCast<QrPersistant>(const_cast<QrCastable*>(obj)) : nullptr;
+    if (isNew && !object)
         fail(inner(), __LINE__, "the object is not persistent");
-    if (state->depth >= QrMaximumObjectDepth)
+    if (isNew && state->depth >= QrMaximumObjectDepth)
         fail(inner(), __LINE__, "objects are nested too deeply");
+    if (isNew && state->kept.size() == std::numeric_limits<std::uint32_t>::max())
+        fail(inner(), __LINE__, "there are too many objects");
 
-    state->kept.emplace_back(principal);
-    const auto number = static_cast<std::uint32_t>(state->kept.size());
-    state->numbers.emplace(principal, number);
+    const std::uint32_t number = isNew       ? state->add(principal)
+                                 : principal ? known->second
+                                             : ObjectRecord::null;
+    writeRecord(s, number, object.get());
+}
 
-    // Until the end mark stands, the object counts as failed.
+void QrObjectOutBuffer::writeRecord(QrStream& s, std::uint32_t number, QrPersistant* object) {
+    // Until the record is whole, it counts as failed.
     struct Writing {
         State& state;
-        bool previousText;
+        const bool previousExactStrings;
         bool complete = false;
-        Writing(State& now, bool text) : state(now), previousText(now.inText) {
-            state.inText = text;
+        Writing(State& now, bool exactStrings)
+            : state(now), previousExactStrings(now.exactStrings) {
+            state.exactStrings = exactStrings;
             ++state.depth;
         }
         ~Writing() {
             --state.depth;
-            state.inText = previousText;
+            state.exactStrings = previousExactStrings;
             state.failed = state.failed || !complete;
         }
-    } writing(*state, s.isTextStream());
-    s << number << *object->getClassUid() << object->getVersion();
-    object->write(s);
-    if (state->failed)
-        fail(inner(), __LINE__, "an object inside this one failed");
-    s << ObjectRecord::endMark(number);
+    } writing(*state, s.isBinaryStream());
+    s << number;
+    if (object) {
+        s << *object->getClassUid() << object->getVersion();
+        object->write(s);
+        if (state->failed)
+            fail(inner(), __LINE__, "an object inside this one failed");
+    }
+    if (object || state->depth == 1)
+        s << ObjectRecord::endMark(number);
     writing.complete = true;
 }
 
 int QrObjectOutBuffer::writeChar(const wchar_t* s, int count) {
-    const bool readable = std::all_of(s, s + std::max(count, 0), [this](wchar_t c) {
-        return state->inText ? isOfNumber(c) : c != L'\0';
-    });
-    if (!readable)
-        throw QrStreamEx::ExWriteError(source, __LINE__,
-                                       "the stream cannot carry this string exactly");
+    const wchar_t* end = s + std::max(count, 0);
+    if (state->exactStrings && std::find(s, end, L'\0') != end)
+        throw QrStreamEx::ExWriteError(source, __LINE__, "a string has a NUL in it");
+    constexpr const char* inexact =
+        "a text stream carries neither strings nor infinite numbers exactly";
+    if (!state->exactStrings && !std::all_of(s, end, isOfNumber))
+        throw QrStreamEx::ExWriteError(source, __LINE__, inexact);
     return inner().writeChar(s, count);
 }
 

@@ -5,7 +5,10 @@
 ///       class identity       four words
 ///       version
 ///       …                    what the object writes
-///       end mark             tells that the object read exactly what it had written
+///     end mark               tells that the object read exactly what it had written
+///
+/// Null and known objects have an end mark only where they stand in no other object: inside one,
+/// the mark of that object guards them too.
 ///
 /// Every word is an `unsigned int` of the stream, so the record has the stream's own form.
 #pragma once
@@ -23,11 +26,8 @@ constexpr std::uint32_t endMark(std::uint32_t number) {
     return 0x454F424Au ^ number;
 }
 
-/// "byte 123", or "unknown position" where the IO cannot tell.
-inline std::string positionText(const QrBufferedIO& io) {
-    const int64 position = io.tell();
-    return position < 0 ? "unknown position" : "byte " + std::to_string(position);
-}
+/// "byte 123: what", or "unknown position: what" where the IO could not tell.
+std::string reason(int64 position, const std::string& what);
 
 /// The identity as it is written in sources and messages.
 std::string text(const QrUid& uid);

@@ -7,12 +7,15 @@
 #include <algorithm>
 #include <cstddef>
 #include <cstdint>
+#include <cwchar>
 #include <span>
 
 namespace Meshes {
 
 /// A surface made of polygons, as it was read from a file. It never changes, so any thread may look
 /// at it, and what it hands out is valid as long as the mesh.
+///
+/// Meshes are persistent: they answer for `QrPersistant`, as objects of the class `storedMeshUid`.
 class Mesh : public Mz::QrCastable {
   public:
     using Self = Mesh;
@@ -50,7 +53,7 @@ class Mesh : public Mz::QrCastable {
     /// The label of the builder that read the mesh, for people.
     virtual const wchar_t* formatLabel() const = 0;
 
-    /// All vertices, those without a face included. Their coordinates are finite.
+    /// All vertices, those without a face included. All values in these three are finite.
     virtual std::span<const Point> vertices() const = 0;
     virtual std::span<const TexCoord> texCoords() const = 0;
     virtual std::span<const Point> normals() const = 0;
@@ -67,6 +70,19 @@ class Mesh : public Mz::QrCastable {
     std::size_t vertexCount() const { return vertices().size(); }
 };
 
+/// Whether two meshes are the same in everything that can be asked of them.
+inline bool areEqual(const Mesh& a, const Mesh& b) {
+    if (std::wcscmp(a.formatLabel(), b.formatLabel()) != 0 ||
+        !std::ranges::equal(a.vertices(), b.vertices()) ||
+        !std::ranges::equal(a.texCoords(), b.texCoords()) ||
+        !std::ranges::equal(a.normals(), b.normals()) || a.faceCount() != b.faceCount())
+        return false;
+    for (std::size_t index = 0; index < a.faceCount(); ++index)
+        if (!std::ranges::equal(a.face(index), b.face(index)))
+            return false;
+    return true;
+}
+
 /// Whether two meshes have the same vertices, and faces of the same vertices, in the same order.
 /// Texture coordinates and normals do not matter: not every format can hold them.
 inline bool haveSameGeometry(const Mesh& a, const Mesh& b) {
@@ -80,6 +96,9 @@ inline bool haveSameGeometry(const Mesh& a, const Mesh& b) {
             return false;
     return true;
 }
+
+/// The class of all stored meshes, whatever format they were imported from, and its builder.
+inline constexpr Mz::QrUid storedMeshUid{0x2D7C5A13, 0x5B0E11EF, 0x8F1D7B10, 0x5D3E8F41};
 
 /// The builder name of all import builders whose objects answer for `Mesh`. A library that adds a
 /// format registers its builder under this name, and every host can read it.

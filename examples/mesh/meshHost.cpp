@@ -1,18 +1,33 @@
 // Lists the mesh components, and imports files through them.
 //
-//   meshHost [--components FOLDER] [--progress] [FILE...]
+//   meshHost [OPTION...] [FILE...]
 //
-// Ends with 0 when every file was imported, else with 1.
+//   --components FOLDER  where the components are; beside the program's folder by default
+//   --progress           shows how far the reading is
+//   --list FILE          starts with the manager's recorded list in FILE, if it is there, and
+//   writes
+//                        it anew; tells how many component libraries are loaded
+//   --save FOLDER        saves each mesh, and a scene of all, to files in FOLDER, and reads them
+//   back
+//   --load FOLDER        reads what was saved in FOLDER
+//
+// Ends with 0 when every file was imported, saved and read, else with 1.
 
 #include "console/console.h"
 #include "console/consoleController.h"
+#include "host/description.h"
+#include "host/savedFiles.h"
 #include "mesh.h"
+#include "saving/recordedList.h"
+#include "system/system.h"
 
 #include "components/componentManager/componentImp.h"
 
-#include <charconv>
+#include <algorithm>
 #include <exception>
 #include <iostream>
+#include <optional>
+#include <utility>
 
 using namespace Mz;
 using namespace Meshes;
@@ -21,17 +36,27 @@ namespace {
 
 struct Options {
     std::filesystem::path components;
+    std::filesystem::path list;
+    std::filesystem::path saveFolder;
+    std::filesystem::path loadFolder;
     bool showProgress = false;
     std::vector<std::filesystem::path> files;
 };
 
 Options parseOptions(const std::vector<std::filesystem::path>& arguments) {
     Options options;
+    const std::pair<const char*, std::filesystem::path*> paths[] = {
+        {"--components", &options.components},
+        {"--list", &options.list},
+        {"--save", &options.saveFolder},
+        {"--load", &options.loadFolder}};
     for (std::size_t index = 0; index < arguments.size(); ++index) {
+        const auto named = std::ranges::find(
+            paths, arguments[index], &std::pair<const char*, std::filesystem::path*>::first);
         if (arguments[index] == "--progress")
             options.showProgress = true;
-        else if (arguments[index] == "--components" && index + 1 < arguments.size())
-            options.components = arguments[++index];
+        else if (named != std::end(paths) && index + 1 < arguments.size())
+            *named->second = arguments[++index];
         else
             options.files.push_back(arguments[index]);
     }
@@ -49,65 +74,90 @@ class BuilderLister final : public QrEnumerator<QrCPtr<QrBuilderDescription>> {
   public:
     Action process(QrCPtr<QrBuilderDescription> builder) override {
         std::cout << "  " << console::outputText(builder->getName()) << ": "
-                  << console::outputText(builder->getLabel()) << ", from "
-                  << console::outputText(builder->getComponentLabel()) << '\n';
+                  << console::outputText(builder->getLabel());
+        // The library's own label is not recorded: it is known once the library was loaded.
+        if (builder->getComponentLabel()[0] != L'\0')
+            std::cout << ", from " << console::outputText(builder->getComponentLabel());
+        std::cout << '\n';
         return Continue;
     }
 };
 
-/// With the fewest digits that are read as that very number again, the same on every system.
-void writeNumber(float number) {
-    char text[32];
-    std::cout << std::string_view(text, std::to_chars(text, text + sizeof text, number).ptr);
+/// Tells how many component libraries this process has in its memory.
+void tellLoaded(const Options& options, const char* when) {
+    if (options.list.empty())
+        return;
+    const std::size_t count = system::mappedLibraries(options.components);
+    std::cout << when << ": " << counted(count, "component library is", "component libraries are")
+              << " loaded" << std::endl;
 }
 
-void writePoint(const Mesh::Point& point) {
-    std::cout << '(';
-    writeNumber(point.x);
-    std::cout << ", ";
-    writeNumber(point.y);
-    std::cout << ", ";
-    writeNumber(point.z);
-    std::cout << ')';
+/// Initialises the manager, with its recorded list where there is one.
+void start(const Options& options, ConsoleController& controller) {
+    bool listed = false;
+    try {
+        listed = !options.list.empty() && readRecordedList(options.list);
+    } catch (const QrStreamEx&) {
+        const std::wstring name = console::wideName(options.list);
+        controller.warning(0, (name + L": damaged; the rest is read from the libraries").c_str());
+    }
+    QrGetComponentManager()->initialize(searchPath(options.components).c_str());
+    tellLoaded(options, listed ? "After a start with the recorded list"
+                               : "After a start without a recorded list");
+    if (!options.list.empty())
+        writeRecordedList(options.list);
 }
 
-void describe(const std::string& name, const Mesh& mesh) {
-    const Mesh::Box box = mesh.bounds();
-    std::cout << name << ": " << console::outputText(mesh.formatLabel()) << ", "
-              << mesh.vertexCount() << " vertices, " << mesh.faceCount() << " faces, box ";
-    writePoint(box.low);
-    std::cout << " to ";
-    writePoint(box.high);
-    std::cout << std::endl;
-}
-
-bool importFile(const MeshImporter& importer, ConsoleController& controller,
-                const std::filesystem::path& file) {
+QrPtr<Mesh> importMesh(const MeshImporter& importer, ConsoleController& controller,
+                       const std::filesystem::path& file) {
     const std::wstring name = console::wideName(file);
     const int errorsBefore = controller.errorCount();
-    const auto fail = [&](const std::wstring& reason) {
-        controller.error(0, (name + L": " + reason).c_str());
-        return false;
-    };
+    bool found = false;
+    const QrRef<QrCastable> object = importer.import(name.c_str(), nullptr, found);
+    const QrPtr<Mesh> mesh = queryCast<Mesh>(object.get());
+    if (mesh)
+        describe(console::outputText(name), *mesh);
+    else if (!found)
+        controller.error(0, (name + L": there is no such file").c_str());
+    else if (controller.errorCount() == errorsBefore) // Else the builder has told why.
+        controller.error(0, (name + L": no builder takes this file").c_str());
+    return mesh;
+}
+
+/// Does something with a file or folder; whatever it throws becomes an error that names it.
+template <class Work>
+void attempt(ConsoleController& controller, const std::filesystem::path& path, Work&& work) {
     try {
-        bool found = false;
-        const QrRef<QrCastable> object = importer.import(name.c_str(), nullptr, found);
-        if (const QrPtr<Mesh> mesh = queryCast<Mesh>(object.get())) {
-            describe(console::outputText(name), *mesh);
-            return true;
-        }
-        if (!found)
-            return fail(L"there is no such file");
-        // A builder that took the file and failed has told why.
-        return controller.errorCount() == errorsBefore && fail(L"no builder takes this file");
+        work();
     } catch (const std::exception& failure) {
         const std::string reason = failure.what();
-        return fail(std::wstring(reason.begin(), reason.end()));
+        const std::wstring text(reason.begin(), reason.end());
+        controller.error(0, (console::wideName(path) + L": " + text).c_str());
     }
 }
 
-bool run(const Options& options, ConsoleController& controller) {
-    QrGetComponentManager()->initialize(searchPath(options.components).c_str());
+void importAll(const Options& options, ConsoleController& controller,
+               const MeshImporter& importer) {
+    std::optional<SavedFiles> saved;
+    if (!options.saveFolder.empty())
+        attempt(controller, options.saveFolder, [&] { saved.emplace(options.saveFolder); });
+    for (const std::filesystem::path& file : options.files)
+        attempt(controller, file, [&] {
+            const QrPtr<Mesh> mesh = importMesh(importer, controller, file);
+            if (mesh && saved)
+                saved->save(file, mesh);
+        });
+    if (saved)
+        attempt(controller, options.saveFolder, [&] { saved->saveScene(); });
+    if (!options.loadFolder.empty())
+        attempt(controller, options.loadFolder, [&] {
+            for (const std::filesystem::path& file : savedFiles(options.loadFolder))
+                attempt(controller, file.filename(), [&] { loadSavedFile(file); });
+        });
+}
+
+void run(const Options& options, ConsoleController& controller) {
+    start(options, controller);
     std::cout << "Builders:\n";
     BuilderLister lister;
     QrGetComponentManager()->enumerateBuilders(lister);
@@ -117,13 +167,11 @@ bool run(const Options& options, ConsoleController& controller) {
     if (!importer) {
         const std::wstring folder = searchPath(options.components);
         controller.error(0, (folder + L": no mesh importer is there").c_str());
-        return false;
+        return;
     }
+    tellLoaded(options, "After the first object was made");
     std::cout << "File types: " << console::outputText(importer->getFileTypes()) << std::endl;
-    bool allImported = true;
-    for (const std::filesystem::path& file : options.files)
-        allImported = importFile(*importer, controller, file) && allImported;
-    return allImported;
+    importAll(options, controller, *importer);
 }
 
 } // namespace
@@ -132,5 +180,6 @@ int main(int argc, char** argv) {
     console::useBinaryOutput();
     const Options options = parseOptions(console::arguments(argc, argv));
     ConsoleController controller(options.showProgress);
-    return run(options, controller) ? 0 : 1;
+    attempt(controller, options.components, [&] { run(options, controller); });
+    return controller.errorCount() == 0 ? 0 : 1;
 }

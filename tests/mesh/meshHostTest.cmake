@@ -2,9 +2,10 @@
 # here for every platform.
 #   cmake -DHOST=command -DSAMPLES=folder -DEXPECTED=folder -DOUTPUT=folder -P meshHostTest.cmake
 file(MAKE_DIRECTORY ${OUTPUT})
+set(folder ${SAMPLES})
 
 function(run_host name status)
-  execute_process(COMMAND ${HOST} ${ARGN} WORKING_DIRECTORY ${SAMPLES}
+  execute_process(COMMAND ${HOST} ${ARGN} WORKING_DIRECTORY ${folder}
     OUTPUT_FILE ${OUTPUT}/${name}.out ERROR_FILE ${OUTPUT}/${name}.err RESULT_VARIABLE result)
   if(NOT result EQUAL status)
     message(FATAL_ERROR "${name}: ended with ${result}, not ${status}")
@@ -25,3 +26,31 @@ run_host(failures 1 missing.obj makeSamples.py icosahedron.off ../CMakeLists.txt
   ../../../tests/mesh/damaged.obj)
 run_host(progress 0 --progress ./icosahedron.off)
 run_host(nothing 0)
+
+# What it saves, and a second start with the recorded list.
+set(folder ${OUTPUT}/saved)
+file(REMOVE_RECURSE ${folder})
+file(MAKE_DIRECTORY ${folder})
+file(COPY ${SAMPLES}/icosahedronCorners.obj ${SAMPLES}/icosahedron.off DESTINATION ${folder})
+run_host(saving 0 --list "recorded list" --save meshes icosahedronCorners.obj icosahedron.off)
+run_host(loading 0 --list "recorded list" --load meshes)
+foreach(name 1-icosahedronCorners.obj 2-icosahedron.off scene)
+  foreach(form binary text)
+    execute_process(RESULT_VARIABLE differs COMMAND ${CMAKE_COMMAND} -E compare_files
+      ${folder}/meshes/${name}.${form} ${EXPECTED}/${name}.${form})
+    if(differs)
+      message(FATAL_ERROR "${name}.${form} differs from ${EXPECTED}/${name}.${form}")
+    endif()
+  endforeach()
+endforeach()
+file(WRITE "${folder}/damaged list" "no list")
+run_host(damaged 0 --list "damaged list")
+file(WRITE ${folder}/meshes/damaged.text "1 2 3")
+run_host(unloadable 1 --load meshes)
+
+# Where nothing can be saved; the system's own words differ.
+execute_process(COMMAND ${HOST} --save icosahedron.off icosahedron.off WORKING_DIRECTORY ${folder}
+  RESULT_VARIABLE result OUTPUT_QUIET ERROR_VARIABLE error)
+if(NOT result EQUAL 1 OR NOT error MATCHES "^error: icosahedron.off: ")
+  message(FATAL_ERROR "saving to a file as a folder ended with ${result}: ${error}")
+endif()

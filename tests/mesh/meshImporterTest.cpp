@@ -52,7 +52,8 @@ TEST(MeshImporter, FindsOneBuilderForEachFormat) {
     NameCounter counter;
     QrGetComponentManager()->enumerateBuilders(counter);
     EXPECT_EQ(counter.names,
-              (std::multiset<std::wstring>{L"mesh", L"mesh", L"mesh", L"mesh", L"mesh importer"}));
+              (std::multiset<std::wstring>{L"mesh", L"mesh", L"mesh", L"mesh", L"mesh importer",
+                                           L"scene", L"stored mesh"}));
 }
 
 TEST(MeshImporter, ListsTheFileTypes) {

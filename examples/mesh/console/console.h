@@ -23,7 +23,10 @@ std::filesystem::path programFolder();
 /// locale is "C", which a program has unless it changes it.
 std::wstring wideName(const std::filesystem::path& path);
 
-/// The way back: text as it is written to the standard output.
+/// The name of a file as text, the same for the same name on every system.
+std::wstring fileText(const std::filesystem::path& path);
+
+/// The way back from `wideName`: text as it is written to the standard output.
 std::string outputText(std::wstring_view text);
 
 } // namespace Meshes::console

@@ -70,7 +70,7 @@ Mz::QrRef<Mz::QrCastable> importMesh(const MeshFormat& format, Mz::QrBufferedIO&
         MeshBuilder mesh;
         ByteReader bytes(io, controller);
         format.read(bytes, mesh);
-        Mz::QrRef<Mz::QrCastable> object = makeMesh(mesh.finish(), label);
+        Mz::QrRef<Mz::QrCastable> object = MeshObject::make(mesh.finish(), label);
         reportDone(controller);
         return object;
     } catch (const ImportInterrupted&) {

@@ -2,47 +2,11 @@
 
 #include "failure.h"
 
-#include <algorithm>
 #include <utility>
 
 namespace Meshes {
 
 namespace {
-
-class MeshObject final : public Mz::QrCastRef<Mz::QrCastHeap<Mz::QrCastImpl<MeshObject, Mesh>>> {
-  public:
-    MeshObject(MeshData meshData, const wchar_t* label)
-        : data(std::move(meshData)), label(label), box(boundsOf(data.vertices)) {}
-
-    const wchar_t* formatLabel() const override { return label; }
-    std::span<const Point> vertices() const override { return data.vertices; }
-    std::span<const TexCoord> texCoords() const override { return data.texCoords; }
-    std::span<const Point> normals() const override { return data.normals; }
-    std::size_t faceCount() const override { return data.faceEnds.size(); }
-    std::span<const Corner> face(std::size_t index) const override {
-        const std::size_t begin = index == 0 ? 0 : data.faceEnds[index - 1];
-        return std::span(data.corners).subspan(begin, data.faceEnds[index] - begin);
-    }
-    Box bounds() const override { return box; }
-
-  private:
-    static Box boundsOf(std::span<const Point> points) {
-        if (points.empty())
-            return {};
-        Box result{points[0], points[0]};
-        for (const Point& point : points) {
-            result.low = {std::min(result.low.x, point.x), std::min(result.low.y, point.y),
-                          std::min(result.low.z, point.z)};
-            result.high = {std::max(result.high.x, point.x), std::max(result.high.y, point.y),
-                           std::max(result.high.z, point.z)};
-        }
-        return result;
-    }
-
-    MeshData data;
-    const wchar_t* label;
-    Box box;
-};
 
 /// Adds to one of the lists whose indices are 32 bits wide, the largest of which means none.
 template <class T>
@@ -53,10 +17,6 @@ void append(std::vector<T>& list, const T& element) {
 }
 
 } // namespace
-
-Mz::QrRef<Mz::QrCastable> makeMesh(MeshData data, const wchar_t* formatLabel) {
-    return new MeshObject(std::move(data), formatLabel);
-}
 
 void MeshBuilder::addVertex(Mesh::Point vertex) {
     append(data.vertices, vertex);

@@ -1,21 +1,11 @@
 /// Puts a mesh together as its file is read.
 #pragma once
 
-#include "examples/mesh/mesh.h"
+#include "meshObject.h"
 
 #include <string>
-#include <vector>
 
 namespace Meshes {
-
-/// What a mesh is made of. It grows as data arrives; nothing is reserved on a file's word.
-struct MeshData {
-    std::vector<Mesh::Point> vertices;
-    std::vector<Mesh::TexCoord> texCoords;
-    std::vector<Mesh::Point> normals;
-    std::vector<Mesh::Corner> corners; ///< of all faces, one face behind the other
-    std::vector<std::size_t> faceEnds; ///< for each face, where its corners end
-};
 
 /// Collects a mesh. Faces may name vertices that come later; `finish` finds those that never came.
 class MeshBuilder {
@@ -62,8 +52,5 @@ class MeshBuilder {
     Largest largestNormal;
     unsigned int firstIndex = 0;
 };
-
-/// The mesh as an object that any host can hold.
-Mz::QrRef<Mz::QrCastable> makeMesh(MeshData data, const wchar_t* formatLabel);
 
 } // namespace Meshes

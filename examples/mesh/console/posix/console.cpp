@@ -19,6 +19,15 @@ std::wstring wideName(const std::filesystem::path& path) {
     return result;
 }
 
+std::wstring fileText(const std::filesystem::path& path) {
+    try {
+        const std::u32string text = path.u32string(); // Whatever the locale, names are UTF-8.
+        return {text.begin(), text.end()};
+    } catch (const std::exception&) {
+        return wideName(path); // The name is no text.
+    }
+}
+
 std::string outputText(std::wstring_view text) {
     std::string result;
     for (const wchar_t character : text)

@@ -42,6 +42,10 @@ std::wstring wideName(const std::filesystem::path& path) {
     return path.native();
 }
 
+std::wstring fileText(const std::filesystem::path& path) {
+    return path.native();
+}
+
 std::string outputText(std::wstring_view text) {
     const auto length = static_cast<int>(text.size());
     const int size =

@@ -1,0 +1,17 @@
+#include "components/objectIO/objectRecord.h"
+
+#include <cstdio>
+
+namespace Mz {
+
+std::string ObjectRecord::reason(int64 position, const std::string& what) {
+    return (position < 0 ? "unknown position" : "byte " + std::to_string(position)) + ": " + what;
+}
+
+std::string ObjectRecord::text(const QrUid& uid) {
+    char buffer[48];
+    std::snprintf(buffer, sizeof buffer, "%08X-%08X-%08X-%08X", uid.w0, uid.w1, uid.w2, uid.w3);
+    return buffer;
+}
+
+} // namespace Mz

@@ -1,0 +1,29 @@
+/// The scene as an object.
+#pragma once
+
+#include "scene.h"
+
+#include "components/componentManager/persistant.h"
+
+#include <vector>
+
+namespace Meshes {
+
+class SceneObject final
+    : public Mz::QrCastRef<Mz::QrCastHeap<Mz::QrCastMulti<SceneObject, Scene, Mz::QrPersistant>>> {
+  public:
+    std::size_t instanceCount() const override { return instances.size(); }
+    const Instance& instance(std::size_t index) const override { return instances[index]; }
+    void add(Instance instance) override;
+
+    const Mz::QrUid* getClassUid() const override { return &sceneUid; }
+    unsigned int getVersion() const override { return 1; }
+    void write(Mz::QrStream& stream) override;
+    /// Raises `QrStreamEx::ExReadError`, and changes nothing, when the data is no scene.
+    void read(Mz::QrStream& stream) override;
+
+  private:
+    std::vector<Instance> instances;
+};
+
+} // namespace Meshes

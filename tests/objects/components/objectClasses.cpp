@@ -1,0 +1,108 @@
+// Persistent classes that do all that is asked of them.
+#include "components/componentKit/componentKit.h"
+#include "components/objectIO/objectIO.h"
+#include "tests/objects/components/classes.h"
+#include "tests/support/journal.h"
+
+namespace {
+
+using namespace Mz;
+using namespace Mz::Test;
+
+int nodesAlive = 0;
+
+/// Links are resolved when all objects are whole: until then they are held by the reader, so that
+/// a load that fails leaves no circle of references behind.
+class NodeObject final : public QrCastRef<QrCastHeap<QrCastMulti<NodeObject, Node, QrPersistant>>> {
+  public:
+    NodeObject() { ++nodesAlive; }
+    NodeObject(const NodeObject&) = delete;
+    NodeObject& operator=(const NodeObject&) = delete;
+    ~NodeObject() override { --nodesAlive; }
+
+    const QrUid* getClassUid() const override { return &nodeUid; }
+    unsigned int getVersion() const override { return 3; }
+
+    void write(QrStream& stream) override {
+        stream << number;
+        QrWriteExactText(stream, name);
+        stream << flag << weight << static_cast<unsigned int>(links.size());
+        for (const QrPtr<Node>& link : links)
+            stream << link.get();
+    }
+
+    void read(QrStream& stream) override {
+        stream >> number;
+        name = QrReadExactText(stream);
+        unsigned int count = 0;
+        stream >> flag >> weight >> count;
+        for (; count > 0; --count) {
+            const QrRef<QrCastable> link = stream.readObject(&Node::uid, nullptr, nullptr);
+            pending.push_back(link ? QrPtr<Node>::adopt(safeCast<Node>(link.get())).get()
+                                   : nullptr);
+        }
+        stream.postLoad(this);
+    }
+
+    void loadFinished() override {
+        for (Node* link : pending)
+            links.emplace_back(link);
+        pending.clear();
+        note(std::to_string(number).c_str());
+    }
+
+  private:
+    std::vector<Node*> pending;
+};
+
+class CensusObject final : public QrCastRef<QrCastHeap<QrCastImpl<CensusObject, Census>>> {
+  public:
+    int alive() const override { return nodesAlive; }
+};
+
+class StringObject final
+    : public QrCastRef<QrCastHeap<QrCastMulti<StringObject, Node, QrPersistant>>> {
+  public:
+    const QrUid* getClassUid() const override { return &stringUid; }
+    unsigned int getVersion() const override { return 1; }
+    void write(QrStream& stream) override { stream << number << name << number; }
+    void read(QrStream& stream) override { stream >> number >> name >> number; }
+};
+
+class CompanionObject;
+
+class Companion final
+    : public QrTempObject<CompanionObject,
+                          QrCastRef<QrCastHeap<QrCastImpl<Companion, QrPersistant>>>> {
+  public:
+    explicit Companion(CompanionObject* owner) : QrTempObject(owner) {}
+    const QrUid* getClassUid() const override { return &companionUid; }
+    unsigned int getVersion() const override { return 1; }
+    void write(QrStream& stream) override;
+    void read(QrStream& stream) override;
+};
+
+/// `destroy` does nothing to it: that of its companions would delete it under their reference.
+class CompanionObject final
+    : public QrCastRef<
+          QrCastImpl2<CompanionObject, Node, QrTempIface<CompanionObject, Companion>>> {};
+
+void Companion::write(QrStream& stream) {
+    stream << owner()->number << owner();
+}
+
+void Companion::read(QrStream& stream) {
+    stream >> owner()->number;
+    // The owner holds itself: it is the object of this very number.
+    const QrRef<QrCastable> same = stream.readObject(nullptr, nullptr, nullptr);
+    owner()->flag = same == owner();
+    stream.postLoad(this);
+}
+
+} // namespace
+
+MZ_COMPONENT(L"Classes", L"", Kit::builderOf<CensusObject>({.uid = censusUid}),
+             Kit::builderOf<NodeObject>({.uid = nodeUid}),
+             Kit::builderOf<NodeObject>({.uid = otherClassUid}),
+             Kit::builderOf<StringObject>({.uid = stringUid}),
+             Kit::builderOf<CompanionObject>({.uid = companionUid}))

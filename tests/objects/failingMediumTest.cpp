@@ -1,0 +1,144 @@
+// Media that fail at the n-th call, for every n, under objects.
+#include "tests/objects/support.h"
+
+#include <stdexcept>
+#include <streambuf>
+
+namespace {
+
+using namespace Mz;
+using namespace Mz::Test;
+
+/// A medium without a buffer, so that each byte or block is a call. The call that is to fail throws
+/// or refuses, and so do all after it.
+class FailingMedium final : public std::streambuf {
+  public:
+    FailingMedium(std::string input, int callsThatWork, bool throwing)
+        : source(std::move(input)), remaining(callsThatWork), throws(throwing) {}
+
+    std::string accepted;
+    bool failed() const { return remaining < 0; }
+
+  protected:
+    int_type overflow(int_type c) override {
+        if (fails())
+            return traits_type::eof();
+        accepted += traits_type::to_char_type(c);
+        return c;
+    }
+    std::streamsize xsputn(const char* data, std::streamsize size) override {
+        if (fails())
+            return 0;
+        accepted.append(data, static_cast<std::size_t>(size));
+        return size;
+    }
+    int_type underflow() override { return take(0); }
+    int_type uflow() override { return take(1); }
+    int_type pbackfail(int_type) override {
+        if (fails() || at == 0)
+            return traits_type::eof();
+        return traits_type::to_int_type(source[--at]);
+    }
+
+  private:
+    int_type take(std::size_t step) {
+        if (fails() || at >= source.size())
+            return traits_type::eof();
+        const int_type c = traits_type::to_int_type(source[at]);
+        at += step;
+        return c;
+    }
+    bool fails() {
+        if (remaining > 0) {
+            --remaining;
+            return false;
+        }
+        remaining = -1;
+        if (throws)
+            throw std::runtime_error("medium");
+        return true;
+    }
+
+    std::string source;
+    std::size_t at = 0;
+    int remaining;
+    bool throws;
+};
+
+template <class Stream>
+class FailingMediumUnder : public ObjectsOn<Stream> {
+  protected:
+    static QrPtr<Node> graph() {
+        const QrPtr<Node> shared = Objects::node(3);
+        return Objects::node(1, {shared, Objects::node(2, {shared, nullptr}), shared});
+    }
+};
+TYPED_TEST_SUITE(FailingMediumUnder, StreamKinds);
+
+TYPED_TEST(FailingMediumUnder, AWriterRaisesWriteErrorAndNothingFollows) {
+    const QrPtr<Node> root = this->graph();
+    const std::string whole = saved<TypeParam>(root.get());
+    for (const bool throwing : {false, true}) {
+        int calls = 0;
+        for (bool failed = true; failed; ++calls) {
+            SCOPED_TRACE(calls);
+            FailingMedium medium({}, calls, throwing);
+            std::ostream sink(&medium);
+            QrOutBuffer buffer(&sink);
+            QrObjectOutBuffer objects(&buffer);
+            TypeParam stream(&objects);
+            bool thrown = false;
+            try {
+                stream << root.get();
+            } catch (const QrStreamEx::ExWriteError&) {
+                thrown = true;
+            }
+            failed = medium.failed();
+            EXPECT_EQ(thrown, failed);
+            EXPECT_TRUE(whole.starts_with(medium.accepted));
+            if (failed) {
+                const std::string accepted = medium.accepted;
+                EXPECT_THROW(stream << root.get(), QrStreamEx::ExWriteObject);
+                EXPECT_EQ(medium.accepted, accepted);
+                // What did arrive is no whole object.
+                Loading<TypeParam> in(accepted);
+                readFailure([&] { in.object(); });
+            }
+        }
+        EXPECT_GT(calls, 20);
+    }
+}
+
+TYPED_TEST(FailingMediumUnder, AReaderRaisesReadObjectAndGivesNothing) {
+    const std::string whole = saved<TypeParam>(this->graph().get()) + " ";
+    const int before = this->alive();
+    for (const bool throwing : {true, false}) {
+        bool failed = true;
+        int calls = 0;
+        for (; failed; ++calls) {
+            SCOPED_TRACE(calls);
+            FailingMedium medium(whole, calls, throwing);
+            std::istream source(&medium);
+            QrInBuffer buffer(&source);
+            QrObjectInBuffer objects(&buffer);
+            TypeParam stream(&objects);
+            QrRef<QrCastable> read;
+            bool thrown = false;
+            try {
+                read = stream.readObject(&Node::uid, nullptr, nullptr);
+            } catch (const QrStreamEx::ExReadObject& failure) {
+                EXPECT_NE(std::string(failure.getReason()).find("position: "), std::string::npos);
+                thrown = true;
+            }
+            failed = medium.failed();
+            EXPECT_EQ(static_cast<bool>(read), !thrown);
+            if (throwing || !failed) {
+                EXPECT_EQ(thrown, failed);
+            }
+        }
+        EXPECT_GT(calls, 100);
+    }
+    EXPECT_EQ(this->alive(), before);
+}
+
+} // namespace
