@@ -1,5 +1,6 @@
 #include "components/componentManager/scanNumber.h"
 
+#include "components/componentManager/directBuffer.h"
 #include "components/componentManager/uid.h"
 
 #include <algorithm>
@@ -177,19 +178,24 @@ bool store(Target target, const Number& number, std::va_list& arguments) {
 
 } // namespace
 
-bool scanNumber(std::streambuf& buffer, const wchar_t* format, std::va_list& arguments) {
+bool scanNumber(std::istream& in, std::streambuf& buffer, const wchar_t* format,
+                std::va_list& arguments) {
     const Target target = targetOf(format);
     if (target == Target::None)
         return false;
     // What stands in the buffer is read and given back by moving a pointer only. A single character
     // may be one that was put back, which buffers keep elsewhere.
     constexpr std::streamsize fewest = 2;
-    const std::streamsize available = buffer.in_avail();
-    if (available < fewest)
-        return false;
     char window[32];
-    const std::streamsize wanted = std::min<std::streamsize>(available, windowOf(target));
-    const std::streamsize got = buffer.sgetn(window, wanted);
+    std::streamsize got = 0;
+    directly(in, [&] {
+        const std::streamsize available = buffer.in_avail();
+        if (available >= fewest)
+            got = buffer.sgetn(window, std::min<std::streamsize>(available, windowOf(target)));
+        return true;
+    });
+    if (in.bad()) [[unlikely]]
+        throwBrokenInput();
     Number number;
     const bool scanned =
         parse(window, window + got, isReal(target), number) && store(target, number, arguments);

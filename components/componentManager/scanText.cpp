@@ -533,7 +533,7 @@ int scanText(QrBufferedIO& io, const wchar_t* format, std::va_list& arguments) {
         return 0;
     std::istream* const in = StandardStreams::inputUnder(io);
     if (std::streambuf* const buffer = in ? directBuffer(*in) : nullptr) {
-        if (scanNumber(*buffer, format, arguments))
+        if (scanNumber(*in, *buffer, format, arguments))
             return 1;
         return Scanner(DirectInput(*in, *buffer), arguments).scan(format);
     }

@@ -1,0 +1,62 @@
+// Files of the system's that fail: reading one's own memory at no address, writing to a full
+// device.
+#include "tests/streams/support.h"
+
+#include <gtest/gtest.h>
+
+#include <fstream>
+
+namespace {
+
+using namespace Mz::Test;
+
+template <class Stream>
+void expectReadErrors() {
+    std::ifstream file("/proc/self/mem", std::ios::binary);
+    ASSERT_TRUE(file.good());
+    Mz::QrInBuffer io(&file);
+    Stream stream(&io);
+    int value = 77;
+    EXPECT_THROW(stream >> value, Mz::QrStreamEx::ExReadError);
+    EXPECT_EQ(value, 77);
+    EXPECT_TRUE(file.bad());
+    file.clear();
+    EXPECT_THROW(stream.read(value, 1), Mz::QrStreamEx::ExReadError);
+    file.clear();
+    EXPECT_THROW(io.read(), Mz::QrStreamEx::ExReadError);
+}
+
+TEST(FailingFile, RaisesReadErrorFromText) {
+    expectReadErrors<Mz::QrTextStream>();
+}
+
+TEST(FailingFile, RaisesReadErrorFromBinaryData) {
+    expectReadErrors<Mz::QrBinaryStream>();
+}
+
+template <class Stream>
+void expectWriteError() {
+    std::ofstream file("/dev/full", std::ios::binary);
+    ASSERT_TRUE(file.good());
+    Mz::QrOutBuffer io(&file);
+    Stream stream(&io);
+    // The file keeps what is written until there is a block of it.
+    constexpr int moreThanABlock = 100'000;
+    EXPECT_THROW(
+        {
+            for (int value = 0; value < moreThanABlock; ++value)
+                stream << value;
+        },
+        Mz::QrStreamEx::ExWriteError);
+    EXPECT_TRUE(file.bad());
+}
+
+TEST(FailingFile, RaisesWriteErrorForText) {
+    expectWriteError<Mz::QrTextStream>();
+}
+
+TEST(FailingFile, RaisesWriteErrorForBinaryData) {
+    expectWriteError<Mz::QrBinaryStream>();
+}
+
+} // namespace
