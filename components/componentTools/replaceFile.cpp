@@ -1,0 +1,58 @@
+#include "components/componentTools/replaceFile.h"
+
+#include "components/componentManager/exceptions.h"
+#include "components/componentTools/platform/system.h"
+
+#include <atomic>
+#include <chrono>
+#include <fstream>
+#include <system_error>
+#include <thread>
+
+namespace Mz::Tools {
+
+namespace {
+
+constexpr const char* source = "components/componentTools/replaceFile";
+
+std::filesystem::path temporaryName(const std::filesystem::path& file) {
+    static std::atomic<unsigned int> counter{0};
+    std::filesystem::path name = file;
+    name += ".new-" + std::to_string(System::processNumber()) + "-" + std::to_string(++counter);
+    return name;
+}
+
+/// Where an open file cannot be replaced, a reader makes us wait for a moment.
+bool moveOver(const std::filesystem::path& from, const std::filesystem::path& to) {
+    constexpr int attempts = 100;
+    std::error_code failure;
+    for (int attempt = 0; attempt < attempts; ++attempt) {
+        std::filesystem::rename(from, to, failure);
+        if (!failure || std::filesystem::is_directory(to))
+            break;
+        std::this_thread::sleep_for(std::chrono::milliseconds(10));
+    }
+    return !failure;
+}
+
+} // namespace
+
+void replaceFile(const std::filesystem::path& file, std::string_view content) {
+    const std::wstring shown = System::displayName(file);
+    const std::string name = System::encode(shown, 2);
+    const std::filesystem::path temporary = temporaryName(file);
+    {
+        std::ofstream output(temporary, std::ios::binary | std::ios::trunc);
+        if (!output)
+            throw QrStreamEx::ExWriteOpen(source, __LINE__, name.c_str());
+        output.write(content.data(), static_cast<std::streamsize>(content.size()));
+        output.close();
+        if (output && moveOver(temporary, file))
+            return;
+    }
+    std::error_code ignored;
+    std::filesystem::remove(temporary, ignored);
+    throw QrStreamEx::ExWriteError(source, __LINE__, name.c_str());
+}
+
+} // namespace Mz::Tools
