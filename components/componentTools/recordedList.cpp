@@ -3,7 +3,7 @@
 #include "components/componentManager/binaryStream.h"
 #include "components/componentManager/bufferio.h"
 #include "components/componentManager/platform/characters.h"
-#include "components/componentTools/platform/system.h"
+#include "components/componentManager/platform/platform.h"
 #include "components/componentTools/replaceFile.h"
 
 #include <algorithm>
@@ -113,14 +113,15 @@ void write(QrStream& stream, const RecordedLibraries& libraries) {
 
 ListReading readRecordedList(const std::filesystem::path& file) {
     ListReading reading;
-    const auto status = platform::queryFile(file);
-    if (!status)
-        return reading;
-    reading.state = ListReading::State::rejected;
-    reading.reason = L"it cannot be read";
     std::ifstream input;
-    if (!status->regular || !platform::openForReading(input, file))
+    if (!openPatiently(input, file)) {
+        if (platform::queryFile(file)) {
+            reading.state = ListReading::State::rejected;
+            reading.reason = L"it cannot be read";
+        }
         return reading;
+    }
+    reading.state = ListReading::State::rejected;
     ListReader reader(input);
     try {
         reading.libraries = reader.read();

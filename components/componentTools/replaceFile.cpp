@@ -1,6 +1,7 @@
 #include "components/componentTools/replaceFile.h"
 
 #include "components/componentManager/exceptions.h"
+#include "components/componentManager/platform/platform.h"
 #include "components/componentTools/platform/system.h"
 
 #include <atomic>
@@ -22,17 +23,29 @@ std::filesystem::path temporaryName(const std::filesystem::path& file) {
     return name;
 }
 
-/// Where an open file cannot be replaced, a reader makes us wait for a moment.
-bool moveOver(const std::filesystem::path& from, const std::filesystem::path& to) {
-    constexpr int attempts = 100;
-    std::error_code failure;
-    for (int attempt = 0; attempt < attempts; ++attempt) {
-        std::filesystem::rename(from, to, failure);
-        if (!failure || std::filesystem::is_directory(to))
-            break;
+/// Repeats `attempt` for half a second until it succeeds or `hopeless` says that it never will.
+template <class Attempt, class Hopeless>
+bool patiently(Attempt attempt, Hopeless hopeless) {
+    constexpr int attempts = 50;
+    for (int count = 0; count < attempts; ++count) {
+        if (attempt())
+            return true;
+        if (hopeless())
+            return false;
         std::this_thread::sleep_for(std::chrono::milliseconds(10));
     }
-    return !failure;
+    return false;
+}
+
+/// Where an open file cannot be replaced, a reader makes us wait for a moment.
+bool moveOver(const std::filesystem::path& from, const std::filesystem::path& to) {
+    std::error_code failure;
+    return patiently(
+        [&] {
+            std::filesystem::rename(from, to, failure);
+            return !failure;
+        },
+        [&] { return std::filesystem::is_directory(to); });
 }
 
 } // namespace
@@ -53,6 +66,17 @@ void replaceFile(const std::filesystem::path& file, std::string_view content) {
     std::error_code ignored;
     std::filesystem::remove(temporary, ignored);
     throw QrStreamEx::ExWriteError(source, __LINE__, name.c_str());
+}
+
+bool openPatiently(std::ifstream& stream, const std::filesystem::path& file) {
+    std::optional<platform::FileStatus> status;
+    return patiently(
+        [&] {
+            stream.clear();
+            status = platform::queryFile(file);
+            return status && status->regular && platform::openForReading(stream, file);
+        },
+        [&] { return !status || !status->regular; });
 }
 
 } // namespace Mz::Tools

@@ -1,13 +1,12 @@
 #include "components/componentTools/utf8.h"
 
 #include <cstdint>
-#include <limits>
 
 namespace Mz::Tools {
 
 namespace {
 
-constexpr bool pairs = std::numeric_limits<wchar_t>::max() <= 0xFFFF;
+constexpr bool pairs = sizeof(wchar_t) == 2;
 
 bool isHigh(std::uint32_t unit) {
     return unit >= 0xD800 && unit < 0xDC00;

@@ -37,9 +37,8 @@ KeptVerdicts verdictsOf(const Json& all) {
 } // namespace
 
 KeptVerdicts readVerdicts(const std::filesystem::path& file) {
-    const auto status = platform::queryFile(file);
     std::ifstream input;
-    if (!status || !status->regular || !platform::openForReading(input, file))
+    if (!openPatiently(input, file))
         return {};
     try {
         return verdictsOf(Json::parse(input));

@@ -131,7 +131,7 @@ TEST_F(RecordedListFile, WhatCannotBeWrittenLeavesTheOldFile) {
 
 TEST_F(RecordedListFile, WrittenByManyAtOnceIsAlwaysOneOfThemWhole) {
     writeRecordedList(file(), {});
-    std::vector<std::thread> writers;
+    std::vector<std::jthread> writers;
     for (unsigned int writer = 0; writer < 4; ++writer)
         writers.emplace_back([this, writer] {
             const RecordedLibraries list(500 * (writer + 1), {L"\\a", L"b", writer, 1, {}});
@@ -140,11 +140,9 @@ TEST_F(RecordedListFile, WrittenByManyAtOnceIsAlwaysOneOfThemWhole) {
         });
     for (int round = 0; round < 50; ++round) {
         const ListReading reading = readRecordedList(file());
-        EXPECT_EQ(reading.state, ListReading::State::good);
-        EXPECT_EQ(reading.libraries.size() % 500, 0u);
+        ASSERT_EQ(reading.state, ListReading::State::good) << toUtf8(reading.reason);
+        ASSERT_EQ(reading.libraries.size() % 500, 0u);
     }
-    for (std::thread& writer : writers)
-        writer.join();
 }
 
 TEST_F(RecordedListFile, TellsWhatTheLocaleCarries) {
