@@ -1,7 +1,7 @@
 # The header-only libraries of others that the tools use. Each is seen through a folder of the build
 # tree that holds its headers and nothing else: a compiler for another system must not see the rest
 # of where they are installed.
-include_guard()
+include_guard(GLOBAL)
 
 # mz_third_party(NAME HEADER LINK): the interface library NAME, with the header or folder LINK of the
 # folder in which HEADER is found.

@@ -136,11 +136,15 @@ ListReading readRecordedList(const std::filesystem::path& file) {
     return reading;
 }
 
-void writeRecordedList(const std::filesystem::path& file, const RecordedLibraries& libraries) {
-    std::ostringstream content;
-    QrOutBuffer buffer(&content);
+void writeRecordedList(std::ostream& output, const RecordedLibraries& libraries) {
+    QrOutBuffer buffer(&output);
     QrBinaryStream stream(&buffer);
     write(stream, libraries);
+}
+
+void writeRecordedList(const std::filesystem::path& file, const RecordedLibraries& libraries) {
+    std::ostringstream content;
+    writeRecordedList(content, libraries);
     replaceFile(file, content.view());
 }
 

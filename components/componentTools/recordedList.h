@@ -13,6 +13,7 @@
 
 #include <cstdint>
 #include <filesystem>
+#include <iosfwd>
 #include <string>
 #include <vector>
 
@@ -52,6 +53,11 @@ struct ListReading {
 /// Reads a list. Everything must make sense, to the last byte, or the whole is rejected; memory is
 /// bounded by the file's own size. Never throws but for lack of memory.
 MZ_COMPONENT_TOOLS_API ListReading readRecordedList(const std::filesystem::path& file);
+
+/// Writes a list to a stream, from where a manager's companion reads it. Throws
+/// `QrStreamEx::ExWriteError`.
+MZ_COMPONENT_TOOLS_API void writeRecordedList(std::ostream& stream,
+                                              const RecordedLibraries& libraries);
 
 /// Writes a list in one step: others see the old file or the new one, whole, whoever else writes
 /// it at the same time. Throws `QrStreamEx::ExWriteOpen` or `ExWriteError` with the file's name;

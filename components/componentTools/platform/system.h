@@ -67,6 +67,9 @@ std::wstring loaderWords(const NativePath& path);
 /// The folder of libMZcomponentTools itself; empty when the system does not tell.
 NativePath ownFolder();
 
+/// The program with that name, without its extension, along the PATH; empty when there is none.
+NativePath findProgram(const std::string& name);
+
 /// What the names of programs end in.
 const char* programExtension();
 

@@ -165,6 +165,18 @@ NativePath ownFolder() {
     return failure ? NativePath() : file.parent_path();
 }
 
+NativePath findProgram(const std::string& name) {
+    const char* list = std::getenv("PATH");
+    for (std::string rest = list ? list : ""; !rest.empty();) {
+        const std::size_t end = rest.find(':');
+        const NativePath program = NativePath(rest.substr(0, end)) / name;
+        if (program.is_absolute() && isFile(program) && ::access(program.c_str(), X_OK) == 0)
+            return program;
+        rest.erase(0, end == std::string::npos ? end : end + 1);
+    }
+    return {};
+}
+
 const char* programExtension() {
     return "";
 }

@@ -159,6 +159,13 @@ NativePath ownFolder() {
     return NativePath(std::wstring(path, length)).parent_path();
 }
 
+NativePath findProgram(const std::string& name) {
+    wchar_t path[32768];
+    const DWORD length =
+        ::SearchPathW(nullptr, toCharacters(name, CP_ACP).c_str(), L".exe", 32768, path, nullptr);
+    return length > 0 && length < 32768 ? NativePath(path) : NativePath();
+}
+
 const char* programExtension() {
     return ".exe";
 }
