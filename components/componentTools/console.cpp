@@ -76,7 +76,7 @@ bool ConsoleController::isProgressShown() {
 
 bool ConsoleController::progress(float fraction, const wchar_t* text) {
     const float part = std::isnan(fraction) ? 0.0f : std::clamp(fraction, 0.0f, 1.0f);
-    const int percent = static_cast<int>(static_cast<double>(part) * 100.0 + 1e-6);
+    const int percent = static_cast<int>(static_cast<double>(part) * 100.0 + 0.001);
     if (onTerminal) {
         constexpr std::size_t width = 30;
         const std::size_t filled = static_cast<std::size_t>(percent) * width / 100;

@@ -24,7 +24,9 @@ Finding judgeRecord(const RecordedLibrary* record, const std::filesystem::path& 
                            : L"time and size",
                 {}};
     if (record->builders.empty())
-        return {Verdict::recordedFailed, {}, {}};
+        return {Verdict::recordedFailed,
+                {},
+                record->kept ? L" (" + sentenceOf(*record->kept) + L")" : std::wstring()};
     return {Verdict::recordedUnchanged, std::to_wstring(record->builders.size()), {}};
 }
 

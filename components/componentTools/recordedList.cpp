@@ -5,6 +5,7 @@
 #include "components/componentManager/platform/characters.h"
 #include "components/componentManager/platform/platform.h"
 #include "components/componentTools/replaceFile.h"
+#include "components/componentTools/verdictsFile.h"
 
 #include <algorithm>
 #include <fstream>
@@ -127,6 +128,7 @@ ListReading readRecordedList(const std::filesystem::path& file) {
         reading.libraries = reader.read();
         reading.state = ListReading::State::good;
         reading.reason.clear();
+        readVerdicts(verdictsFileOf(file), reading.libraries);
     } catch (const std::exception& failure) {
         input.clear();
         const std::string what = failure.what();
@@ -146,6 +148,12 @@ void writeRecordedList(const std::filesystem::path& file, const RecordedLibrarie
     std::ostringstream content;
     writeRecordedList(content, libraries);
     replaceFile(file, content.view());
+}
+
+std::filesystem::path verdictsFileOf(const std::filesystem::path& list) {
+    std::filesystem::path file = list;
+    file += ".verdicts.json";
+    return file;
 }
 
 bool isCarried(const std::wstring& text) {

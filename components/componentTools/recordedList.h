@@ -7,13 +7,14 @@
 /// set the locale that the host has (`setlocale(LC_ALL, "")` as a rule) before using it.
 #pragma once
 
-#include "components/componentTools/export.h"
+#include "components/componentTools/verdict.h"
 
 #include "components/componentManager/uid.h"
 
 #include <cstdint>
 #include <filesystem>
 #include <iosfwd>
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -34,6 +35,8 @@ struct RecordedLibrary {
     std::int64_t size = 0;                 ///< in bytes
     std::vector<RecordedBuilder> builders; ///< none for a file that is no component or failed
     std::int64_t position = -1;
+    /// Why it has no builders, when a scan has kept that beside the list; no part of the list.
+    std::optional<Finding> kept = std::nullopt;
 };
 
 using RecordedLibraries = std::vector<RecordedLibrary>;
@@ -64,6 +67,9 @@ MZ_COMPONENT_TOOLS_API void writeRecordedList(std::ostream& stream,
 /// the old file then stays.
 MZ_COMPONENT_TOOLS_API void writeRecordedList(const std::filesystem::path& file,
                                               const RecordedLibraries& libraries);
+
+/// The file that keeps the verdicts of a list, as JSON, beside it.
+MZ_COMPONENT_TOOLS_API std::filesystem::path verdictsFileOf(const std::filesystem::path& list);
 
 /// Whether the current locale carries the text through a list unchanged.
 MZ_COMPONENT_TOOLS_API bool isCarried(const std::wstring& text);

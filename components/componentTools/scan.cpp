@@ -16,8 +16,7 @@ using Name = std::pair<std::wstring, std::wstring>;
 class Scanner {
   public:
     explicit Scanner(const ScanOptions& wanted) : options(wanted), probeOptions(wanted.probe) {
-        if (!probeOptions.interrupted)
-            probeOptions.interrupted = [this] { return isInterrupted(); };
+        probeOptions.interrupted = [this] { return isInterrupted(); };
     }
 
     ScanResult run() {
@@ -33,14 +32,17 @@ class Scanner {
         for (const Discovery::LeftOut& left : discovery.leftOut)
             leaveOut(left);
         if (!options.list.empty()) {
-            writeVerdicts(verdictsFileOf(options.list), verdicts);
+            writeVerdicts(verdictsFileOf(options.list), result.libraries);
             writeRecordedList(options.list, result.libraries);
         }
         return std::move(result);
     }
 
   private:
-    bool isInterrupted() const { return options.controller && options.controller->isInterrupted(); }
+    bool isInterrupted() const {
+        return (options.controller && options.controller->isInterrupted()) ||
+               (options.probe.interrupted && options.probe.interrupted());
+    }
 
     void report(std::size_t index, std::size_t count, const Candidate& candidate) const {
         if (options.controller && options.controller->isProgressShown())
@@ -57,7 +59,6 @@ class Scanner {
             Name name(library.directory, library.fileName);
             old.emplace(std::move(name), std::move(library));
         }
-        oldVerdicts = readVerdicts(verdictsFileOf(options.list));
     }
 
     void add(const Candidate& candidate) {
@@ -73,8 +74,8 @@ class Scanner {
             file.verdict.verdict = Verdict::interrupted;
             if (known != old.end())
                 keep(file, known->second);
-        } else if (unchanged && !isTriedAgain(known->second, name)) {
-            file.verdict = verdictOf(known->second, name);
+        } else if (unchanged && !isTriedAgain(known->second)) {
+            file.verdict = verdictOf(known->second);
             keep(file, known->second);
         } else {
             look(file, *status);
@@ -83,42 +84,29 @@ class Scanner {
     }
 
     /// Whether there is reason to believe that a library without builders does better now.
-    bool isTriedAgain(const RecordedLibrary& library, const Name& name) const {
+    bool isTriedAgain(const RecordedLibrary& library) const {
         if (!library.builders.empty())
             return false;
-        const KeptVerdict* kept = keptVerdict(library, name);
-        if (!kept) // Recorded by somebody else, who did not say why.
+        if (!library.kept) // Recorded by somebody else, who did not say why.
             return true;
-        switch (kept->finding.verdict) {
+        switch (library.kept->verdict) {
         case Verdict::dependencyMissing: // It does not change when its dependency arrives.
         case Verdict::loadFailed:        // Nor when the dependency of a dependency does.
         case Verdict::unreadable:
         case Verdict::probeFailed:
         case Verdict::interrupted: return true;
-        default: return options.retry && severityOf(kept->finding.verdict) == Severity::fault;
+        default: return options.retry && severityOf(library.kept->verdict) == Severity::fault;
         }
     }
 
-    const KeptVerdict* keptVerdict(const RecordedLibrary& library, const Name& name) const {
-        const auto kept = oldVerdicts.find(name);
-        return kept != oldVerdicts.end() && kept->second.time == library.time &&
-                       kept->second.size == library.size
-                   ? &kept->second
-                   : nullptr;
-    }
-
-    Finding verdictOf(const RecordedLibrary& library, const Name& name) const {
+    static Finding verdictOf(const RecordedLibrary& library) {
         if (!library.builders.empty())
             return {Verdict::works, std::to_wstring(library.builders.size()), {}};
-        const KeptVerdict* kept = keptVerdict(library, name);
-        return kept ? kept->finding : Finding{Verdict::recordedFailed, {}, {}};
+        return library.kept.value_or(Finding{Verdict::recordedFailed, {}, {}});
     }
 
     /// Takes a record of the old list over as it stands.
     void keep(ScannedFile& file, const RecordedLibrary& library) {
-        const Name name(library.directory, library.fileName);
-        if (const KeptVerdict* kept = keptVerdict(library, name))
-            verdicts[name] = *kept;
         file.recorded = true;
         result.libraries.push_back(library);
     }
@@ -135,7 +123,11 @@ class Scanner {
             result.interrupted = true;
             return;
         }
-        RecordedLibrary library{file.directory, file.fileName, status.time, status.size, {}};
+        RecordedLibrary library;
+        library.directory = file.directory;
+        library.fileName = file.fileName;
+        library.time = status.time;
+        library.size = status.size;
         if (file.verdict.verdict == Verdict::works)
             library.builders = std::move(explanation.builders);
         if (const std::wstring* text = uncarriedText(library)) {
@@ -144,7 +136,7 @@ class Scanner {
             return;
         }
         if (library.builders.empty())
-            verdicts[{file.directory, file.fileName}] = {status.time, status.size, file.verdict};
+            library.kept = file.verdict;
         file.recorded = true;
         result.libraries.push_back(std::move(library));
     }
@@ -166,7 +158,6 @@ class Scanner {
     const ScanOptions& options;
     ProbeOptions probeOptions;
     std::map<Name, RecordedLibrary> old;
-    KeptVerdicts oldVerdicts, verdicts;
     ScanResult result;
 };
 
@@ -174,12 +165,6 @@ class Scanner {
 
 ScanResult scan(const ScanOptions& options) {
     return Scanner(options).run();
-}
-
-std::filesystem::path verdictsFileOf(const std::filesystem::path& list) {
-    std::filesystem::path file = list;
-    file += ".verdicts.json";
-    return file;
 }
 
 } // namespace Mz::Tools

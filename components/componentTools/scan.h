@@ -55,7 +55,4 @@ struct ScanResult {
 /// `ExWriteError` when the list cannot be written.
 MZ_COMPONENT_TOOLS_API ScanResult scan(const ScanOptions& options);
 
-/// The file that keeps the verdicts of a list, as JSON.
-MZ_COMPONENT_TOOLS_API std::filesystem::path verdictsFileOf(const std::filesystem::path& list);
-
 } // namespace Mz::Tools

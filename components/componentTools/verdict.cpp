@@ -21,7 +21,7 @@ struct Entry {
 constexpr Entry entries[] = {
     {Verdict::component, "component", Severity::good,
      L"it is a component library, as far as can be seen without running it", L""},
-    {Verdict::works, "works", Severity::good, L"it loads and describes its builders: %1", L""},
+    {Verdict::works, "works", Severity::good, L"it loads and describes its builders (%1)", L""},
     {Verdict::offersNothing, "offersNothing", Severity::bystander,
      L"it loads and describes itself, but offers no builder", L""},
 
@@ -96,12 +96,13 @@ constexpr Entry entries[] = {
     {Verdict::notRecorded, "notRecorded", Severity::note,
      L"the list does not have it, so a host loads it at its next start", L""},
     {Verdict::recordedUnchanged, "recordedUnchanged", Severity::note,
-     L"the list has it with %1 builders, and it has not changed: a host whose search path leads to "
-     L"the recorded names does not load it at start",
+     L"the list has it (builders: %1), and it has not changed: a host whose search path leads to "
+     L"the "
+     L"recorded names does not load it at start",
      L""},
     {Verdict::recordedFailed, "recordedFailed", Severity::note,
-     L"the list has it without builders, and it has not changed: it is not tried again until its "
-     L"time or size changes",
+     L"the list has it without builders%2, and it has not changed: a host does not try it again "
+     L"until its time or size changes",
      L"mend the file, or scan again and have failures retried"},
     {Verdict::recordedChanged, "recordedChanged", Severity::note,
      L"it changed in %1 since it was recorded, so a host loads it at its next start",

@@ -1,10 +1,10 @@
 #include "components/componentTools/verdictsFile.h"
 
-#include "components/componentManager/platform/platform.h"
 #include "components/componentTools/replaceFile.h"
 #include "components/componentTools/utf8.h"
 
 #include <fstream>
+#include <map>
 #include <nlohmann/json.hpp>
 
 namespace Mz::Tools {
@@ -19,48 +19,60 @@ std::wstring wide(const Json& entry, const char* key) {
     return fromUtf8(entry.at(key).get<std::string>());
 }
 
-KeptVerdicts verdictsOf(const Json& all) {
-    KeptVerdicts verdicts;
-    if (all.at("version").get<int>() != version)
-        return verdicts;
-    for (const Json& entry : all.at("libraries")) {
-        const auto verdict = verdictNamed(entry.at("verdict").get<std::string>());
-        if (!verdict)
-            continue;
-        verdicts[{wide(entry, "directory"), wide(entry, "fileName")}] = {
-            entry.at("time").get<std::uint32_t>(), entry.at("size").get<std::int64_t>(),
-            Finding{*verdict, wide(entry, "subject"), wide(entry, "words")}};
-    }
+/// Verdicts by directory and file name.
+using Verdicts = std::map<std::pair<std::wstring, std::wstring>, const Json*>;
+
+Verdicts verdictsOf(const Json& all) {
+    Verdicts verdicts;
+    if (all.at("version").get<int>() == version)
+        for (const Json& entry : all.at("libraries"))
+            verdicts[{wide(entry, "directory"), wide(entry, "fileName")}] = &entry;
     return verdicts;
+}
+
+void fillIn(RecordedLibrary& library, const Verdicts& verdicts) {
+    const auto found = verdicts.find({library.directory, library.fileName});
+    if (found == verdicts.end())
+        return;
+    const Json& entry = *found->second;
+    if (entry.at("time").get<std::uint32_t>() != library.time ||
+        entry.at("size").get<std::int64_t>() != library.size)
+        return;
+    if (const auto verdict = verdictNamed(entry.at("verdict").get<std::string>()))
+        library.kept = Finding{*verdict, wide(entry, "subject"), wide(entry, "words")};
 }
 
 } // namespace
 
-KeptVerdicts readVerdicts(const std::filesystem::path& file) {
+void readVerdicts(const std::filesystem::path& file, RecordedLibraries& libraries) {
     std::ifstream input;
     if (!openPatiently(input, file))
-        return {};
+        return;
     try {
-        return verdictsOf(Json::parse(input));
+        const Json all = Json::parse(input);
+        const Verdicts verdicts = verdictsOf(all);
+        for (RecordedLibrary& library : libraries)
+            if (library.builders.empty())
+                fillIn(library, verdicts);
     } catch (const nlohmann::json::exception&) {
-        return {}; // Only a memory of ours: without it a little more is tried again.
+        return; // Only a memory of ours: without it a little more is tried again.
     }
 }
 
-void writeVerdicts(const std::filesystem::path& file, const KeptVerdicts& verdicts) {
-    Json libraries = Json::array();
-    for (const auto& [name, kept] : verdicts)
-        libraries.push_back({{"directory", toUtf8(name.first)},
-                             {"fileName", toUtf8(name.second)},
-                             {"time", kept.time},
-                             {"size", kept.size},
-                             {"verdict", nameOf(kept.finding.verdict)},
-                             {"subject", toUtf8(kept.finding.subject)},
-                             {"words", toUtf8(kept.finding.words)},
-                             {"sentence", toUtf8(sentenceOf(kept.finding))},
-                             {"cure", toUtf8(cureOf(kept.finding))}});
-    replaceFile(file,
-                Json{{"version", version}, {"libraries", libraries}}.dump(2, ' ', true) + "\n");
+void writeVerdicts(const std::filesystem::path& file, const RecordedLibraries& libraries) {
+    Json entries = Json::array();
+    for (const RecordedLibrary& library : libraries)
+        if (library.kept)
+            entries.push_back({{"directory", toUtf8(library.directory)},
+                               {"fileName", toUtf8(library.fileName)},
+                               {"time", library.time},
+                               {"size", library.size},
+                               {"verdict", nameOf(library.kept->verdict)},
+                               {"subject", toUtf8(library.kept->subject)},
+                               {"words", toUtf8(library.kept->words)},
+                               {"sentence", toUtf8(sentenceOf(*library.kept))},
+                               {"cure", toUtf8(cureOf(*library.kept))}});
+    replaceFile(file, Json{{"version", version}, {"libraries", entries}}.dump(2, ' ', true) + "\n");
 }
 
 } // namespace Mz::Tools

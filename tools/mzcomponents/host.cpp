@@ -46,9 +46,8 @@ Host::Host(const Common& common) {
     options.folders = Tools::foldersOf(Tools::pathOf(common.path));
     if (!common.cache.empty())
         options.list = Tools::pathOf(common.cache);
-    options.controller = &controller;
+    options.probe.interrupted = [this] { return controller.isInterrupted(); };
     scanned = Tools::scan(options);
-    controller.clearLine();
     if (scanned.interrupted)
         return;
     QrSetSystemProcessController(&controller);

@@ -129,6 +129,12 @@ int list(const Common& common) {
         else
             printFile(file, finding, notes);
     };
+    // A component that failed when it was scanned shows no fault from the outside.
+    const auto failedEarlier = [](const Tools::Explanation& explanation) {
+        return explanation.verdict.verdict == Tools::Verdict::component &&
+               !explanation.notes.empty() &&
+               explanation.notes.front().verdict == Tools::Verdict::recordedFailed;
+    };
     for (const Tools::Candidate& candidate : discovery.candidates) {
         // What is no component library need not be asked what it needs.
         options.followDependencies = false;
@@ -136,6 +142,7 @@ int list(const Common& common) {
         options.followDependencies = true;
         if (explanation.verdict.verdict == Tools::Verdict::component)
             explanation = Tools::explainFile(candidate.path, options);
+        faults = faults || failedEarlier(explanation);
         tell(candidate.path, explanation.verdict, explanation.notes);
     }
     for (const Tools::Discovery::LeftOut& left : discovery.leftOut)
