@@ -9,5 +9,6 @@ void addCastComparisons(RatioTable& table);
 void addCreateComparisons(RatioTable& table);
 void addStartComparisons(RatioTable& table);
 void addControllerComparisons(RatioTable& table);
+void addToolsComparisons(RatioTable& table);
 
 } // namespace Mz::Benchmarks
