@@ -9,6 +9,7 @@ void addCastComparisons(RatioTable& table);
 void addCreateComparisons(RatioTable& table);
 void addStartComparisons(RatioTable& table);
 void addControllerComparisons(RatioTable& table);
+void addStreamComparisons(RatioTable& table);
 void addToolsComparisons(RatioTable& table);
 
 } // namespace Mz::Benchmarks

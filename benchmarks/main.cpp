@@ -88,6 +88,7 @@ int run(int argc, char** argv) {
     addCreateComparisons(table);
     addStartComparisons(table);
     addControllerComparisons(table);
+    addStreamComparisons(table);
     addToolsComparisons(table);
 
     stayOnOneCore();

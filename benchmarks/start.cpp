@@ -6,6 +6,13 @@
 ///   load         the limit: opens each library, looks its entry point up and calls it
 ///   readTables   the limit for libraries without entry point: lists the folder, asks for the
 ///                status of each file and reads its symbol table
+///   record       writes the manager's records to a hidden file in the folder; counts builders
+///   initializeRecorded
+///                reads that file and starts the component manager; counts builders, and fails
+///                when a library was loaded
+///   readList     the limit for that: lists the folder, asks for the status of each file, reads the
+///                file and enters every builder in a map
+#include "components/componentManager/binaryStream.h"
 #include "components/componentManager/componentImp.h"
 
 #include <algorithm>
@@ -18,9 +25,13 @@
 #include <fcntl.h>
 #include <filesystem>
 #include <fstream>
+#include <iterator>
+#include <list>
+#include <map>
 #include <string>
 #include <sys/stat.h>
 #include <unistd.h>
+#include <unordered_map>
 #include <vector>
 
 using namespace Mz;
@@ -49,14 +60,18 @@ class Counter final : public QrEnumerator<QrCPtr<QrBuilderDescription>> {
     long count = 0;
 };
 
+long countBuilders() {
+    Counter counter;
+    QrGetComponentManager()->enumerateBuilders(counter);
+    return counter.count;
+}
+
 int initialize(const std::filesystem::path& folder) {
     const std::wstring searchPath = folder.wstring();
     const double begin = processorTime();
     QrGetComponentManager()->initialize(searchPath.c_str());
     const double end = processorTime();
-    Counter counter;
-    QrGetComponentManager()->enumerateBuilders(counter);
-    return report(begin, end, counter.count);
+    return report(begin, end, countBuilders());
 }
 
 /// The files of the folder in the order in which the manager loads them.
@@ -131,16 +146,134 @@ int readTables(const std::filesystem::path& folder) {
     return report(begin, processorTime(), count);
 }
 
+std::filesystem::path listIn(const std::filesystem::path& folder) {
+    return folder / ".recorded"; // Hidden, so no candidate.
+}
+
+QrPtr<QrPersistant> records() {
+    return QrPtr<QrPersistant>::adopt(safeCast<QrPersistant>(QrGetComponentManager()));
+}
+
+int record(const std::filesystem::path& folder) {
+    QrGetComponentManager()->initialize(folder.wstring().c_str());
+    std::ofstream file(listIn(folder), std::ios::binary);
+    QrOutBuffer buffer(&file);
+    QrBinaryStream stream(&buffer);
+    records()->write(stream);
+    return file.flush() ? report(0, 0, countBuilders()) : 1;
+}
+
+/// Whether this process has mapped anything of the folder.
+bool loadedFrom(const std::filesystem::path& folder) {
+    std::ifstream maps("/proc/self/maps");
+    const std::string content(std::istreambuf_iterator<char>(maps), {});
+    return content.find(folder.string()) != std::string::npos;
+}
+
+int initializeRecorded(const std::filesystem::path& folder) {
+    const std::wstring searchPath = folder.wstring();
+    const double begin = processorTime();
+    {
+        std::ifstream file(listIn(folder), std::ios::binary);
+        QrInBuffer buffer(&file);
+        QrBinaryStream stream(&buffer);
+        records()->read(stream);
+    }
+    QrGetComponentManager()->initialize(searchPath.c_str());
+    const double end = processorTime();
+    return loadedFrom(folder) ? 1 : report(begin, end, countBuilders());
+}
+
+/// The recorded list, read by hand.
+class ListReader {
+  public:
+    explicit ListReader(const std::filesystem::path& file) {
+        std::ifstream stream(file, std::ios::binary | std::ios::ate);
+        content.resize(static_cast<std::size_t>(stream.tellg()));
+        stream.seekg(0).read(content.data(), static_cast<std::streamsize>(content.size()));
+    }
+
+    std::uint32_t word() {
+        std::uint32_t value;
+        std::memcpy(&value, content.data() + at, sizeof value);
+        at += sizeof value;
+        return __builtin_bswap32(value);
+    }
+    std::wstring text() {
+        const std::size_t length = word();
+        std::wstring value(content.data() + at, content.data() + at + length);
+        at += length;
+        return value;
+    }
+    void skip(std::size_t size) { at += size; }
+
+  private:
+    std::string content;
+    std::size_t at = 0;
+};
+
+struct Record {
+    std::wstring directory, fileName, name, label, text;
+    std::uint32_t time = 0;
+    QrUid uid{};
+};
+
+struct UidHash {
+    std::size_t operator()(const QrUid& uid) const { return uid.w0; }
+};
+
+int readList(const std::filesystem::path& folder) {
+    const double begin = processorTime();
+    long files = 0;
+    DIR* const listing = ::opendir(folder.c_str());
+    while (const dirent* entry = listing ? ::readdir(listing) : nullptr) {
+        struct stat status;
+        if (entry->d_name[0] != '.' && ::fstatat(::dirfd(listing), entry->d_name, &status, 0) == 0)
+            ++files;
+    }
+    if (listing)
+        ::closedir(listing);
+    ListReader reader(listIn(folder));
+    std::list<Record> read;
+    std::unordered_map<QrUid, Record*, UidHash> byUid;
+    for (std::uint32_t count = reader.word(); count > 0; --count) {
+        Record& record = read.emplace_back();
+        record.directory = reader.text();
+        record.fileName = reader.text();
+        record.time = reader.word();
+        reader.skip(sizeof(int64));
+        for (std::uint32_t builders = reader.word(); builders > 0; --builders) {
+            record.uid = {reader.word(), reader.word(), reader.word(), reader.word()};
+            record.name = reader.text();
+            record.label = reader.text();
+            record.text = reader.text();
+            reader.skip(1 + sizeof(std::uint32_t));
+            byUid[record.uid] = &record;
+        }
+    }
+    const long known = static_cast<long>(byUid.size());
+    return report(begin, processorTime(), std::min(files, known));
+}
+
+using Work = int (*)(const std::filesystem::path&);
+
+const std::map<std::string, Work> works = {
+    {"initialize", initialize},
+    {"initializeRecorded", initializeRecorded},
+    {"load", load},
+    {"readList", readList},
+    {"readTables", readTables},
+    {"record", record},
+};
+
 } // namespace
 
 int main(int argc, char** argv) {
-    const std::string work = argc == 3 ? argv[1] : "";
-    if (work == "initialize")
-        return initialize(argv[2]);
-    if (work == "load")
-        return load(argv[2]);
-    if (work == "readTables")
-        return readTables(argv[2]);
-    std::fprintf(stderr, "usage: mzBenchmarkStart initialize|load|readTables FOLDER\n");
+    const auto work = argc == 3 ? works.find(argv[1]) : works.end();
+    if (work != works.end())
+        return work->second(argv[2]);
+    std::fprintf(stderr, "usage: mzBenchmarkStart WORK FOLDER\n");
+    for (const auto& [name, unused] : works)
+        std::fprintf(stderr, "  %s\n", name.c_str());
     return 2;
 }

@@ -14,14 +14,16 @@ namespace {
 /// A folder that is made when the first benchmark wants it, and shared by all that do.
 class LazyFolder {
   public:
-    LazyFolder(std::string libraryFile, unsigned int libraryCount)
-        : library(std::move(libraryFile)), count(libraryCount) {}
+    /// `preparation` is a work that is done once on the new folder.
+    LazyFolder(std::string libraryFile, unsigned int libraryCount,
+               std::string preparation = "initialize")
+        : library(std::move(libraryFile)), count(libraryCount), firstWork(std::move(preparation)) {}
 
     const std::filesystem::path& path() {
         if (!folder) {
             folder = std::make_unique<LibraryFolder>(library, count);
             // Not measured: brings every file into the page cache.
-            inFreshProcess("initialize", folder->path());
+            inFreshProcess(firstWork, folder->path());
         }
         return folder->path();
     }
@@ -29,6 +31,7 @@ class LazyFolder {
   private:
     std::string library;
     unsigned int count;
+    std::string firstWork;
     std::unique_ptr<LibraryFolder> folder;
 };
 
@@ -59,6 +62,15 @@ void addFirstStart(RatioTable& table, unsigned int count, const std::string& cou
                        freshly("initialize", folder, count), freshly("load", folder, count));
 }
 
+void addRecordedStart(RatioTable& table, unsigned int count, const std::string& countText) {
+    const auto folder = std::make_shared<LazyFolder>(MZ_BENCHMARK_COMPONENT, count, "record");
+    table.addSelfTimed({"start/recorded" + std::to_string(count),
+                        "start with a recorded list, " + countText + " libraries",
+                        "list, status, read the list, fill a map", 1.6},
+                       freshly("initializeRecorded", folder, count),
+                       freshly("readList", folder, count));
+}
+
 } // namespace
 
 void addStartComparisons(RatioTable& table) {
@@ -71,8 +83,9 @@ void addStartComparisons(RatioTable& table) {
                        freshly("initialize", bystanders, 0),
                        freshly("readTables", bystanders, 1000));
 
-    // A start with a recorded list goes here: a work `initializeRecorded` of `start.cpp`, and as
-    // its limit one that lists the folder, asks for each status, reads the list and fills a map.
+    addRecordedStart(table, 100, "100");
+    addRecordedStart(table, 1000, "1,000");
+    addRecordedStart(table, 4000, "4,000");
 }
 
 } // namespace Mz::Benchmarks

@@ -15,6 +15,7 @@ set(CMAKE_ARCHIVE_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/lib)
 
 include(CheckCXXCompilerFlag)
 check_cxx_compiler_flag(-fno-gnu-unique MZ_HAS_NO_GNU_UNIQUE)
+check_cxx_compiler_flag(-fno-semantic-interposition MZ_HAS_NO_SEMANTIC_INTERPOSITION)
 
 # What our own code is compiled with; not passed on to users of the libraries.
 add_library(mzCompile INTERFACE)
@@ -26,6 +27,11 @@ endif()
 if(MZ_HAS_NO_GNU_UNIQUE)
   # A library that defines a unique symbol can never be unmapped.
   target_compile_options(mzCompile INTERFACE -fno-gnu-unique)
+endif()
+if(MZ_HAS_NO_SEMANTIC_INTERPOSITION AND NOT WIN32)
+  # Nobody replaces single functions of a library from outside; so it may call and inline its own.
+  target_compile_options(mzCompile INTERFACE -fno-semantic-interposition)
+  target_link_options(mzCompile INTERFACE -Wl,-Bsymbolic-functions)
 endif()
 if(MZ_SANITIZE)
   # With the checks between them, GCC loses track of what the standard library initialises.

@@ -9,6 +9,7 @@
 namespace Mz {
 
 class QrStream;
+struct StandardStreams;
 
 /// The byte and character layer under streams and importers.
 ///
@@ -153,6 +154,8 @@ class MZ_COMPONENT_MANAGER_API QrInBuffer
     int64 tell() const override;
 
   private:
+    friend struct StandardStreams;
+
     std::istream* in;
 };
 
@@ -191,6 +194,8 @@ class MZ_COMPONENT_MANAGER_API QrOutBuffer
     int64 tell() const override;
 
   private:
+    friend struct StandardStreams;
+
     std::ostream* out;
 };
 

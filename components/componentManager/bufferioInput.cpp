@@ -1,11 +1,10 @@
 #include "components/componentManager/bufferio.h"
 
-#include "components/componentManager/ioGuard.h"
+#include "components/componentManager/directBuffer.h"
 #include "components/componentManager/platform/characters.h"
 
 #include <algorithm>
 #include <cwctype>
-#include <istream>
 
 namespace Mz {
 
@@ -27,10 +26,19 @@ void throwIfBad(const std::istream& in, int line) {
         throw QrStreamEx::ExReadError(source, line);
 }
 
+constexpr int endOfBuffer = std::streambuf::traits_type::eof();
+
 /// The next byte, 0 to 255, or -1 when there is none, whyever; then the stream is usable again.
 /// The caller tests for a broken medium, when it has put away what it holds.
 int fetch(std::istream& in) {
     int byte = endOfInput;
+    if (std::streambuf* const buffer = directBuffer(in)) {
+        directly(in, [&] {
+            byte = buffer->sbumpc();
+            return true;
+        });
+        return byte == endOfBuffer ? endOfInput : byte;
+    }
     ignoringExceptions([&] { byte = in.get(); });
     if (in.good())
         return byte;
@@ -39,7 +47,10 @@ int fetch(std::istream& in) {
 }
 
 void putBack(std::istream& in, char byte) {
-    ignoringExceptions([&] { in.putback(byte); });
+    if (std::streambuf* const buffer = directBuffer(in))
+        directly(in, [&] { return buffer->sputbackc(byte) != endOfBuffer; });
+    else
+        ignoringExceptions([&] { in.putback(byte); });
 }
 
 /// Puts back what stands from `begin` to `end`, so that it is read again in its order.
@@ -48,7 +59,28 @@ void putBack(std::istream& in, const char* begin, const char* end) {
         putBack(in, *--end);
 }
 
+/// Reads up to `wanted` characters that are bytes. A NUL is delivered but never consumed, so it is
+/// all that the rest can be.
+int readPlainCharacters(std::istream& in, std::streambuf& buffer, wchar_t* characters, int wanted) {
+    for (int stored = 0; stored < wanted; ++stored) {
+        const int byte = peekDirectly(in, buffer);
+        if (byte < 0)
+            return stored;
+        if (byte == 0) {
+            std::fill(characters + stored, characters + wanted, L'\0');
+            break;
+        }
+        characters[stored] = static_cast<wchar_t>(byte);
+        buffer.sbumpc();
+    }
+    return wanted;
+}
+
 } // namespace
+
+void throwBrokenInput() {
+    throw QrStreamEx::ExReadError(source, __LINE__);
+}
 
 QrInBuffer::QrInBuffer(std::istream* in) : in(in) {}
 
@@ -61,7 +93,10 @@ bool QrInBuffer::isBufferIgnored() const {
 int QrInBuffer::read(void* data, int size) {
     if (size < 1)
         return 0;
-    ignoringExceptions([&] { in->read(static_cast<char*>(data), size); });
+    auto* const bytes = static_cast<char*>(data);
+    if (std::streambuf* const buffer = directBuffer(*in))
+        return readDirectly(*in, *buffer, bytes, size);
+    ignoringExceptions([&] { in->read(bytes, size); });
     throwIfBad(*in, __LINE__);
     return static_cast<int>(in->gcount());
 }
@@ -121,6 +156,8 @@ int QrInBuffer::readChar(wchar_t* buf, int size, int count) {
     if (wanted < 1)
         return 0;
     const platform::CharacterConverter converter;
+    if (std::streambuf* const buffer = converter.plainBytes() ? directBuffer(*in) : nullptr)
+        return readPlainCharacters(*in, *buffer, buf, wanted);
     char pending[maximumPendingBytes];
     int pendingBytes = 0;
     int stored = 0;

@@ -1,9 +1,11 @@
 #include "components/componentManager/bufferio.h"
 
-#include "components/componentManager/ioGuard.h"
+#include "components/componentManager/directBuffer.h"
 #include "components/componentManager/platform/characters.h"
 
-#include <ostream>
+#include <algorithm>
+#include <cstdint>
+#include <string_view>
 
 namespace Mz {
 
@@ -21,12 +23,20 @@ void throwIfBad(const std::ostream& out, int line) {
 }
 
 void put(std::ostream& out, char byte) {
-    ignoringExceptions([&] { out.put(byte); });
+    if (std::streambuf* const buffer = directBuffer(out))
+        directly(out, [&] { return buffer->sputc(byte) != std::streambuf::traits_type::eof(); });
+    else
+        ignoringExceptions([&] { out.put(byte); });
 }
 
 void put(std::ostream& out, const void* data, int size) {
-    if (size > 0)
-        ignoringExceptions([&] { out.write(static_cast<const char*>(data), size); });
+    const auto* bytes = static_cast<const char*>(data);
+    if (size < 1)
+        return;
+    if (std::streambuf* const buffer = directBuffer(out))
+        directly(out, [&] { return buffer->sputn(bytes, size) == size; });
+    else
+        ignoringExceptions([&] { out.write(bytes, size); });
 }
 
 void putCharacter(std::ostream& out, const platform::CharacterConverter& converter, wchar_t c) {
@@ -35,6 +45,27 @@ void putCharacter(std::ostream& out, const platform::CharacterConverter& convert
     if (length < 0)
         throw QrStreamEx::ExWriteError(source, __LINE__);
     put(out, bytes, length);
+}
+
+/// Puts characters that are bytes, many at a time. Those before one that is no byte are written.
+void putPlainCharacters(std::ostream& out, const wchar_t* text, int count) {
+    constexpr int blockSize = 256;
+    constexpr std::uint32_t largestByte = 0xFF;
+    char block[blockSize];
+    for (int done = 0; done < count;) {
+        const int wanted = std::min(blockSize, count - done);
+        int ready = 0;
+        for (; ready < wanted; ++ready) {
+            const auto code = static_cast<std::uint32_t>(text[done + ready]);
+            if (code > largestByte)
+                break;
+            block[ready] = static_cast<char>(code);
+        }
+        put(out, block, ready);
+        if (ready < wanted)
+            throw QrStreamEx::ExWriteError(source, __LINE__);
+        done += ready;
+    }
 }
 
 /// The characters in `text`, a NUL being one; -1 when it is no text.
@@ -54,6 +85,10 @@ int countCharacters(std::string_view text) {
 }
 
 } // namespace
+
+void throwBrokenOutput() {
+    throw QrStreamEx::ExWriteError(source, __LINE__);
+}
 
 QrOutBuffer::QrOutBuffer(std::ostream* out) : out(out) {}
 
@@ -83,8 +118,11 @@ void QrOutBuffer::writeSpace() {
 
 int QrOutBuffer::writeChar(const wchar_t* s, int count) {
     const platform::CharacterConverter converter;
-    for (int index = 0; index < count; ++index)
-        putCharacter(*out, converter, s[index]);
+    if (converter.plainBytes() && directBuffer(*out))
+        putPlainCharacters(*out, s, count);
+    else
+        for (int index = 0; index < count; ++index)
+            putCharacter(*out, converter, s[index]);
     throwIfBad(*out, __LINE__);
     return count;
 }

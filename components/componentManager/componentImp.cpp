@@ -92,7 +92,7 @@ ComponentLibrary::~ComponentLibrary() {
 }
 
 platform::NativePath ComponentLibrary::openingPath() const {
-    return platform::openingPath(directory + L'\\' + fileName, foundPath);
+    return platform::openingPath(directory, fileName, foundPath);
 }
 
 void ComponentLibrary::noteFile(const platform::FileStatus& status) {

@@ -4,7 +4,7 @@
 
 #include <functional>
 #include <iterator>
-#include <set>
+#include <map>
 #include <string_view>
 
 namespace Mz {
@@ -47,7 +47,7 @@ std::optional<platform::NativePath> nativeDirectory(const std::wstring& director
 } // namespace
 
 std::size_t ComponentManager::LibraryKeyHash::operator()(const LibraryKey& key) const {
-    const std::hash<std::wstring> hash;
+    const std::hash<std::wstring_view> hash;
     return hash(key.first) ^ hash(key.second);
 }
 
@@ -57,24 +57,30 @@ std::wstring ComponentManager::normalisePath(const wchar_t* path, bool listMode)
 
 void ComponentManager::discover(const wchar_t* searchPath, LibraryList& newList,
                                 LibraryMap& byName) {
-    std::set<platform::FileIdentity> seen;
+    std::map<platform::FileIdentity, const platform::NativePath*> seen;
     for (const std::wstring& entry : directoriesOf(searchPath)) {
         const std::wstring directory = normalisePath(entry.c_str(), false);
         const std::optional<platform::NativePath> native = nativeDirectory(entry);
         if (!native)
             continue;
-        for (const platform::DirectoryEntry& candidate :
-             platform::listCandidates(platform::openingPath(directory, *native))) {
-            const LibraryKey key(directory, normalisePath(candidate.name.c_str(), false));
+        for (platform::DirectoryEntry& candidate :
+             platform::listCandidates(platform::openingPath(directory, {}, *native))) {
+            std::wstring fileName = normalisePath(candidate.name.c_str(), false);
             // One file, one record, however often the search path leads to it.
-            const bool known = candidate.identity ? !seen.insert(*candidate.identity).second
-                                                  : byName.find(key) != nullptr;
-            if (known)
+            if (candidate.identity) {
+                const auto other = seen.find(*candidate.identity);
+                if (other != seen.end() && platform::isSameFile(*other->second, candidate.path))
+                    continue;
+            } else if (byName.find({directory, fileName})) {
                 continue;
+            }
             ComponentLibrary& library = newList.emplace_back(*this);
-            library.directory = key.first;
-            library.fileName = key.second;
-            library.foundPath = candidate.path;
+            library.directory = directory;
+            library.fileName = std::move(fileName);
+            library.foundPath = std::move(candidate.path);
+            if (candidate.identity)
+                seen.emplace(*candidate.identity, &library.foundPath);
+            const LibraryKey key(library.directory, library.fileName);
             if (!byName.find(key))
                 byName[key] = std::prev(newList.end());
         }
@@ -82,6 +88,7 @@ void ComponentManager::discover(const wchar_t* searchPath, LibraryList& newList,
 }
 
 void ComponentManager::merge(LibraryList& recorded, LibraryMap& byName) {
+    LibraryList replaced; // The map's keys stand in them.
     for (auto next = recorded.begin(); next != recorded.end();) {
         const auto old = next++;
         LibraryList::iterator* found = byName.find({old->directory, old->fileName});
@@ -89,7 +96,7 @@ void ComponentManager::merge(LibraryList& recorded, LibraryMap& byName) {
             continue;
         old->foundPath = (*found)->foundPath;
         libraries.splice(*found, recorded, old);
-        libraries.erase(*found);
+        replaced.splice(replaced.end(), libraries, *found);
         *found = old;
     }
 }

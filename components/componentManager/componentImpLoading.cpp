@@ -37,7 +37,7 @@ class AddBuilders final : public QrEnumerator<QrCPtr<QrBuilderDescription>> {
   private:
     ComponentManager& manager;
     ComponentLibrary& library;
-    std::deque<ComponentManager::Builder>& builders;
+    ComponentManager::BuilderList& builders;
 };
 
 } // namespace

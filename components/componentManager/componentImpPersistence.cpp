@@ -19,8 +19,8 @@ void writeLibrary(QrStream& stream, const ComponentLibrary& library) {
     stream << library.directory << library.fileName << library.fileTime << library.fileSize
            << static_cast<unsigned int>(library.builders.size());
     // Last first: so lists have always been written.
-    for (auto builder = library.builders.rbegin(); builder != library.builders.rend(); ++builder)
-        writeBuilder(stream, *builder);
+    for (std::size_t index = library.builders.size(); index-- > 0;)
+        writeBuilder(stream, library.builders[index]);
 }
 
 /// A text of a record. No name or path holds a NUL, and one is never consumed when it is read as a
@@ -44,12 +44,13 @@ void readLibrary(QrStream& stream, ComponentLibrary& library) {
     readText(stream, library.directory);
     readText(stream, library.fileName);
     stream >> library.fileTime >> library.fileSize >> count;
-    // The count is only a claim, so records come one by one, each before those read earlier.
+    // The count is only a claim, so records come one by one.
     for (; count > 0; --count) {
-        ComponentManager::Builder& builder = library.builders.emplace_front();
+        ComponentManager::Builder& builder = library.builders.emplace_back();
         builder.library = &library;
         readBuilder(stream, builder);
     }
+    library.builders.reverse();
 }
 
 } // namespace

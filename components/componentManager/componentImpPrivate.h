@@ -11,8 +11,9 @@
 #include "components/componentManager/persistant.h"
 #include "components/componentManager/platform/platform.h"
 
-#include <deque>
+#include <algorithm>
 #include <list>
+#include <memory>
 #include <string>
 #include <vector>
 
@@ -33,9 +34,11 @@ class MZ_COMPONENT_MANAGER_API ComponentManager final
                          const ComponentManager&> {
   public:
     class Builder;
+    class BuilderList;
 
     /// Directory and file name of a library, both normalised.
-    using LibraryKey = std::pair<std::wstring, std::wstring>;
+    /// Directory and file name, as they stand in the record.
+    using LibraryKey = std::pair<std::wstring_view, std::wstring_view>;
     struct MZ_COMPONENT_MANAGER_API LibraryKeyHash {
         std::size_t operator()(const LibraryKey& key) const;
     };
@@ -109,7 +112,7 @@ class MZ_COMPONENT_MANAGER_API ComponentManager final
     bool initialising = false;
 
     /// Records that were dropped while somebody may still look at them.
-    std::list<std::deque<Builder>> droppedBuilders;
+    std::list<BuilderList> droppedBuilders;
 };
 
 /// What the manager knows of one builder: a copy of what the library's description said.
@@ -142,6 +145,27 @@ class MZ_COMPONENT_MANAGER_API ComponentManager::Builder final
     bool flag = false;
 };
 
+/// The builders of one library, by number. Grows without moving a record: clients and the index
+/// point at them.
+class ComponentManager::BuilderList {
+  public:
+    bool empty() const { return records.empty(); }
+    std::size_t size() const { return records.size(); }
+    Builder& operator[](std::size_t index) { return *records[index]; }
+    const Builder& operator[](std::size_t index) const { return *records[index]; }
+    Builder& front() { return *records.front(); }
+    const Builder& front() const { return *records.front(); }
+    Builder& emplace_back(const Builder& record = Builder()) {
+        return *records.emplace_back(std::make_unique<Builder>(record));
+    }
+    void reverse() { std::reverse(records.begin(), records.end()); }
+    void clear() { records.clear(); }
+    void swap(BuilderList& other) { records.swap(other.records); }
+
+  private:
+    std::vector<std::unique_ptr<Builder>> records;
+};
+
 /// What the manager knows of one candidate file.
 struct MZ_COMPONENT_MANAGER_API ComponentLibrary {
     explicit ComponentLibrary(ComponentManager& manager);
@@ -164,8 +188,7 @@ struct MZ_COMPONENT_MANAGER_API ComponentLibrary {
     int64 descriptionValue = 0;
     std::wstring componentText1; ///< the label
     std::wstring componentText2; ///< the text
-    /// Grows without moving a record: clients and the index point at them.
-    std::deque<ComponentManager::Builder> builders;
+    ComponentManager::BuilderList builders;
     bool loadedByManager = false;
 
     ComponentManager* manager;

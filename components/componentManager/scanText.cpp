@@ -1,14 +1,16 @@
 #include "components/componentManager/scanText.h"
 
 #include "components/componentManager/bufferio.h"
+#include "components/componentManager/directBuffer.h"
+#include "components/componentManager/numericLocale.h"
 #include "components/componentManager/platform/characters.h"
+#include "components/componentManager/scanNumber.h"
 
 #include <bitset>
 #include <charconv>
 #include <cstdint>
 #include <limits>
 #include <memory>
-#include <string>
 
 namespace Mz {
 
@@ -31,9 +33,9 @@ unsigned int digitValue(wchar_t c) {
 }
 
 /// The input, seen through one character of look-ahead.
-class Input {
+class IOInput {
   public:
-    explicit Input(QrBufferedIO& source) : io(source) {}
+    explicit IOInput(QrBufferedIO& source) : io(source) {}
 
     /// Whether there is a next character, which `next()` then gives.
     bool available() {
@@ -44,16 +46,10 @@ class Input {
         return held;
     }
     wchar_t next() const { return character; }
-    bool nextIs(wchar_t wanted) { return available() && character == wanted; }
 
     void consume() {
         held = false;
         ++consumed;
-    }
-
-    void skipSpace() {
-        while (available() && isSpace(character))
-            consume();
     }
 
     /// Gives the look-ahead back. A NUL was never consumed, so it must not be put in twice.
@@ -71,6 +67,39 @@ class Input {
     wchar_t character = 0;
     bool held = false;
     bool ended = false;
+    int consumed = 0;
+};
+
+/// The same straight from a standard buffer, where bytes are characters: the next one is looked at
+/// and stays where it is, so there is nothing to give back.
+class DirectInput {
+  public:
+    DirectInput(std::istream& source, std::streambuf& bytes) : in(source), buffer(bytes) {}
+
+    bool available() {
+        if (byte == unknown)
+            byte = peekDirectly(in, buffer);
+        return byte >= 0;
+    }
+    wchar_t next() const { return static_cast<wchar_t>(byte); }
+
+    /// What follows is not looked at before somebody asks: there may be nothing for a long time.
+    void consume() {
+        buffer.sbumpc();
+        byte = unknown;
+        ++consumed;
+    }
+
+    void giveBack() {}
+
+    int consumedCharacters() const { return consumed; }
+
+  private:
+    static constexpr int unknown = -2;
+
+    std::istream& in;
+    std::streambuf& buffer;
+    int byte = unknown;
     int consumed = 0;
 };
 
@@ -149,9 +178,50 @@ class CharacterSet {
     bool negated = false;
 };
 
+/// For a number outside the range of `double`: whether it is the tiny end of it.
+bool isBelowOne(const char* begin, const char* end) {
+    int64 magnitude = 0; // The decimal exponent of the first digit that is not zero.
+    bool point = false;
+    bool significant = false;
+    const char* at = begin;
+    for (; at != end && *at != 'e' && *at != 'E'; ++at) {
+        if (*at == '.') {
+            point = true;
+            continue;
+        }
+        significant = significant || *at != '0';
+        if (significant && !point)
+            ++magnitude;
+        else if (!significant && point)
+            --magnitude;
+    }
+    int64 exponent = 0;
+    bool negative = false;
+    for (; at != end; ++at) {
+        negative = negative || *at == '-';
+        if (*at >= '0' && *at <= '9' && exponent < 1'000'000'000)
+            exponent = exponent * 10 + (*at - '0');
+    }
+    return magnitude + (negative ? -exponent : exponent) <= 0;
+}
+
+/// As the C library converts in the "C" locale: the longest prefix that is a number, infinity for
+/// what is too large, zero for what is too small.
+double doubleOf(const char* begin, const char* end) {
+    const bool negative = *begin == '-';
+    if (negative || *begin == '+')
+        ++begin;
+    double value = 0;
+    if (std::from_chars(begin, end, value).ec == std::errc::result_out_of_range)
+        value = isBelowOne(begin, end) ? 0.0 : std::numeric_limits<double>::infinity();
+    return negative ? -value : value;
+}
+
+template <class Input>
 class Scanner {
   public:
-    Scanner(QrBufferedIO& io, std::va_list& argumentList) : input(io), arguments(argumentList) {}
+    Scanner(const Input& source, std::va_list& argumentList)
+        : input(source), arguments(argumentList) {}
 
     int scan(const wchar_t* format) {
         while (*format && step(format)) {
@@ -166,7 +236,7 @@ class Scanner {
         if (isSpace(*format)) {
             while (isSpace(*format))
                 ++format;
-            input.skipSpace();
+            skipSpace();
             return true;
         }
         if (*format != L'%')
@@ -179,8 +249,13 @@ class Scanner {
         return follow(directive, format);
     }
 
+    void skipSpace() {
+        while (input.available() && isSpace(input.next()))
+            input.consume();
+    }
+
     bool matches(wchar_t wanted) {
-        if (!input.nextIs(wanted))
+        if (!input.available() || input.next() != wanted)
             return false;
         input.consume();
         return true;
@@ -189,7 +264,7 @@ class Scanner {
     /// A directive without a conversion character is compared, after white space, with the format's
     /// terminator, which nothing equals.
     bool endsUnfinished() {
-        input.skipSpace();
+        skipSpace();
         return false;
     }
 
@@ -206,7 +281,7 @@ class Scanner {
         case L'n': return storeConsumed(directive);
         default: break;
         }
-        input.skipSpace();
+        skipSpace();
         switch (directive.conversion) {
         case L'd':
         case L'D':
@@ -324,25 +399,36 @@ class Scanner {
         return true;
     }
 
-    void takeDigits(Budget& budget, std::string& text, bool& any) {
+    /// The characters of a number, of which none has more, as they stand in the input.
+    struct FloatText {
+        static constexpr int longest = 349;
+        char characters[longest];
+        int length = 0;
+
+        void append(wchar_t c) { characters[length++] = static_cast<char>(c); }
+        const char* begin() const { return characters; }
+        const char* end() const { return characters + length; }
+    };
+
+    void takeDigits(Budget& budget, FloatText& text, bool& any) {
         for (; budget.any() && input.available() && digitValue(input.next()) < 10; take(budget)) {
-            text += static_cast<char>(input.next());
+            text.append(input.next());
             any = true;
         }
     }
 
-    bool takeOneOf(Budget& budget, std::string& text, wchar_t a, wchar_t b) {
+    bool takeOneOf(Budget& budget, FloatText& text, wchar_t a, wchar_t b) {
         if (!nextIs(budget, a, b))
             return false;
-        text += static_cast<char>(input.next());
+        text.append(input.next());
         take(budget);
         return true;
     }
 
     bool readFloat(const Directive& directive) {
-        constexpr int longest = 349;
+        constexpr int longest = FloatText::longest;
         Budget budget(directive.width > 0 && directive.width < longest ? directive.width : longest);
-        std::string text;
+        FloatText text;
         bool anyDigit = false;
         takeOneOf(budget, text, L'+', L'-');
         takeDigits(budget, text, anyDigit);
@@ -355,59 +441,17 @@ class Scanner {
             bool ignored = false;
             takeDigits(budget, text, ignored);
         }
-        storeFloat(directive, text);
+        if (directive.assigns)
+            storeFloat(directive, doubleOf(text.begin(), text.end()));
         return true;
     }
 
-    void storeFloat(const Directive& directive, const std::string& text) {
-        if (!directive.assigns)
-            return;
-        const double value = toDouble(text);
+    void storeFloat(const Directive& directive, double value) {
         if (directive.isLong)
             *va_arg(arguments, double*) = value;
         else
             *va_arg(arguments, float*) = static_cast<float>(value);
         ++assigned;
-    }
-
-    /// As the C library converts in the "C" locale: the longest prefix that is a number, infinity
-    /// for what is too large, zero for what is too small.
-    static double toDouble(const std::string& text) {
-        const bool negative = text[0] == '-';
-        const char* begin = text.data() + (negative || text[0] == '+' ? 1 : 0);
-        const char* end = text.data() + text.size();
-        double value = 0;
-        const std::from_chars_result result = std::from_chars(begin, end, value);
-        if (result.ec == std::errc::result_out_of_range)
-            value = isBelowOne(begin, end) ? 0.0 : std::numeric_limits<double>::infinity();
-        return negative ? -value : value;
-    }
-
-    /// For a number outside the range of `double`: whether it is the tiny end of it.
-    static bool isBelowOne(const char* begin, const char* end) {
-        int64 magnitude = 0; // The decimal exponent of the first digit that is not zero.
-        bool point = false;
-        bool significant = false;
-        const char* at = begin;
-        for (; at != end && *at != 'e' && *at != 'E'; ++at) {
-            if (*at == '.') {
-                point = true;
-                continue;
-            }
-            significant = significant || *at != '0';
-            if (significant && !point)
-                ++magnitude;
-            else if (!significant && point)
-                --magnitude;
-        }
-        int64 exponent = 0;
-        bool negative = false;
-        for (; at != end; ++at) {
-            negative = negative || *at == '-';
-            if (*at >= '0' && *at <= '9' && exponent < 1'000'000'000)
-                exponent = exponent * 10 + (*at - '0');
-        }
-        return magnitude + (negative ? -exponent : exponent) <= 0;
     }
 
     static bool storesWide(const Directive& directive) {
@@ -451,7 +495,8 @@ class Scanner {
       private:
         wchar_t* wide = nullptr;
         char* narrow = nullptr;
-        platform::CharacterConverter converter;
+        const platform::PlainBytes asInC;
+        const platform::CharacterConverter converter;
     };
 
     /// `c`, `s` and `[`: characters as long as the conversion accepts them. A NUL, which is never
@@ -486,7 +531,14 @@ class Scanner {
 int scanText(QrBufferedIO& io, const wchar_t* format, std::va_list& arguments) {
     if (!*format)
         return 0;
-    return Scanner(io, arguments).scan(format);
+    std::istream* const in = StandardStreams::inputUnder(io);
+    if (std::streambuf* const buffer = in ? directBuffer(*in) : nullptr) {
+        if (scanNumber(*buffer, format, arguments))
+            return 1;
+        return Scanner(DirectInput(*in, *buffer), arguments).scan(format);
+    }
+    const NumericLocale bracket(io);
+    return Scanner(IOInput(io), arguments).scan(format);
 }
 
 } // namespace Mz

@@ -9,8 +9,8 @@ namespace Mz {
 class QrBufferedIO;
 
 /// Reads from `io`, character by character, what `format` describes, stores it through `arguments`
-/// and returns how many were assigned. What `QrStream::formattedRead` promises; the caller sees to
-/// the locale in which `io` converts. Exceptions of `io` pass through.
+/// and returns how many were assigned. What `QrStream::formattedRead` promises, its locale
+/// included. Exceptions of `io` pass through.
 int scanText(QrBufferedIO& io, const wchar_t* format, std::va_list& arguments);
 
 } // namespace Mz

@@ -1,6 +1,8 @@
 #include "components/componentManager/stream.h"
 
+#include "components/componentManager/directBuffer.h"
 #include "components/componentManager/formatText.h"
+#include "components/componentManager/numberText.h"
 #include "components/componentManager/numericLocale.h"
 #include "components/componentManager/scanText.h"
 
@@ -16,6 +18,18 @@ constexpr const char* source = "components/componentManager/stream";
 
 /// A line of text is ended by the next separator once it is longer than this.
 constexpr int longestLine = 70;
+
+/// Ends a list of arguments, also when an exception leaves.
+class EndOfArguments {
+  public:
+    explicit EndOfArguments(std::va_list& arguments) : list(arguments) {}
+    ~EndOfArguments() { va_end(list); }
+    EndOfArguments(const EndOfArguments&) = delete;
+    EndOfArguments& operator=(const EndOfArguments&) = delete;
+
+  private:
+    std::va_list& list;
+};
 
 } // namespace
 
@@ -73,29 +87,56 @@ void QrStream::endText() {
 }
 
 int QrStream::formattedWrite(const wchar_t* format, ...) {
-    std::wstring text;
     std::va_list arguments;
     va_start(arguments, format);
-    const bool formatted = formatText(text, format, arguments);
-    va_end(arguments);
-    if (!formatted || text.size() > static_cast<std::size_t>(std::numeric_limits<int>::max()))
+    const EndOfArguments end(arguments);
+    char number[1 + longestNumberText]; // A separator goes before it.
+    char* numberEnd = number + 1;
+    const NumberText kind = formatNumber(numberEnd, format, arguments);
+    if (kind == NumberText::DoesNotFit)
         throw QrStreamEx::ExWriteError(source, __LINE__);
-    const int length = static_cast<int>(text.size());
+    if (kind == NumberText::Written)
+        return writeNumber(number, numberEnd);
+    std::wstring text;
+    if (!formatText(text, format, arguments) ||
+        text.size() > static_cast<std::size_t>(std::numeric_limits<int>::max()))
+        throw QrStreamEx::ExWriteError(source, __LINE__);
+    return writeText(text.data(), static_cast<int>(text.size()));
+}
+
+int QrStream::writeText(const wchar_t* text, int length) {
     const NumericLocale bracket(io());
     writeSeparator();
-    column += io().writeChar(text.data(), length);
+    column += io().writeChar(text, length);
+    return length;
+}
+
+int QrStream::writeNumber(char* begin, const char* end) {
+    const char* const digits = begin + 1;
+    const int length = static_cast<int>(end - digits);
+    std::ostream* const out = StandardStreams::outputUnder(io());
+    std::streambuf* const buffer = out ? directBuffer(*out) : nullptr;
+    if (!buffer) {
+        wchar_t text[longestNumberText];
+        return writeText(text, static_cast<int>(std::copy(digits, end, text) - text));
+    }
+    if (!separatorPending) {
+        ++begin;
+    } else {
+        const bool ends = column > longestLine;
+        *begin = ends ? '\n' : ' ';
+        column = ends ? 0 : column + 1;
+        separatorPending = false;
+    }
+    writeDirectly(*out, *buffer, begin, static_cast<int>(end - begin));
+    column += length;
     return length;
 }
 
 int QrStream::formattedRead(const wchar_t* format, ...) {
-    const NumericLocale bracket(io());
     std::va_list arguments;
     va_start(arguments, format);
-    // The argument list must be ended before an exception leaves.
-    struct End {
-        std::va_list& list;
-        ~End() { va_end(list); }
-    } const end{arguments};
+    const EndOfArguments end(arguments);
     return scanText(io(), format, arguments);
 }
 
@@ -259,16 +300,17 @@ QrStream& QrStream::operator>>(std::wstring& value) {
     int length = 0;
     *this >> length;
     skipSeparator();
-    readCharacters(value, length, source);
+    if (!readCharacters(value, length))
+        throw QrStreamEx::ExReadError(source, __LINE__);
     return *this;
 }
 
-void QrStream::readCharacters(std::wstring& value, int length, const char* reporter) {
+bool QrStream::readCharacters(std::wstring& value, int length) {
     // A length is only a claim: memory grows with the characters that arrive.
     constexpr int chunk = 64 * 1024;
     constexpr int longestFill = 1024 * 1024;
     if (length < 0)
-        throw QrStreamEx::ExReadError(reporter, __LINE__);
+        return false;
     value.clear();
     for (int done = 0; done < length;) {
         const int wanted = std::min(chunk, length - done);
@@ -277,14 +319,15 @@ void QrStream::readCharacters(std::wstring& value, int length, const char* repor
         const int got = io().readChar(arrived, wanted, 0x7fffffff);
         if (got < wanted) {
             value.resize(static_cast<std::size_t>(done + std::max(got, 0)));
-            throw QrStreamEx::ExReadError(reporter, __LINE__);
+            return false;
         }
         done += wanted;
         // A NUL byte is never consumed and would fill any length.
         if (done > longestFill &&
             std::all_of(arrived, arrived + wanted, [](wchar_t c) { return c == L'\0'; }))
-            throw QrStreamEx::ExReadError(reporter, __LINE__);
+            return false;
     }
+    return true;
 }
 
 } // namespace Mz

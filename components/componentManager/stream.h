@@ -173,15 +173,18 @@ class MZ_COMPONENT_MANAGER_API QrStream {
     void skipSeparator();
     /// Ends the line of text, if a separator is due: before binary data.
     void endText();
-    /// Reads `length` characters, as they stand, into `value`; `ExReadError`, naming `source`, when
-    /// `length` is negative or fewer come.
-    void readCharacters(std::wstring& value, int length, const char* source);
+    /// Reads `length` characters, as they stand, into `value`. False when `length` is negative,
+    /// fewer come, or nothing but a NUL, which is never consumed, fills more than 1 MiB.
+    bool readCharacters(std::wstring& value, int length);
 
   private:
     template <class T>
     void writeBinary(const T& values, int count);
     template <class T>
     int readBinary(T& values, int count);
+    int writeText(const wchar_t* text, int length);
+    /// Writes the digits that stand from `begin + 1` to `end`; the separator may be put at `begin`.
+    int writeNumber(char* begin, const char* end);
     template <class T>
     QrStream& writeFormatted(const wchar_t* format, T value);
     template <class T>

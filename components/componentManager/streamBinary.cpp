@@ -1,3 +1,4 @@
+#include "components/componentManager/directBuffer.h"
 #include "components/componentManager/stream.h"
 
 #include <algorithm>
@@ -78,20 +79,52 @@ using WireType = typename Wire<T>::Type;
 template <class T>
 using WireBits = typename Bits<sizeof(WireType<T>)>::Type;
 
-/// Whether binary data can hold the value as it is.
+/// Whether binary data holds every value of the type.
+template <class T>
+constexpr bool alwaysFits = sizeof(T) == sizeof(WireType<T>);
+
+/// Whether binary data can hold the value as it is. Only integers can be too wide.
 template <class T>
 bool fits(T value) {
-    return static_cast<T>(static_cast<WireType<T>>(value)) == value;
+    if constexpr (alwaysFits<T>)
+        return true;
+    else
+        return static_cast<T>(static_cast<WireType<T>>(value)) == value;
 }
 
-/// Floats go by their bits, NaNs included; only integers can be too wide.
-template <>
-bool fits(float) {
-    return true;
+template <class T>
+WireBits<T> packed(T value) {
+    return reversed(std::bit_cast<WireBits<T>>(static_cast<WireType<T>>(value)));
 }
-template <>
-bool fits(double) {
-    return true;
+
+/// One value, as most come: without a block, and straight to the medium where that is the same.
+template <class T>
+void writeValue(QrBufferedIO& io, T value) {
+    if (!fits(value))
+        throw QrStreamEx::ExWriteError(source, __LINE__);
+    constexpr int width = sizeof(WireType<T>);
+    const auto bits = packed(value);
+    char bytes[width];
+    std::memcpy(bytes, &bits, width);
+    std::ostream* const out = StandardStreams::outputUnder(io);
+    if (std::streambuf* const buffer = out ? directBuffer(*out) : nullptr)
+        writeDirectly(*out, *buffer, bytes, width);
+    else
+        io.write(bytes, width);
+}
+
+/// Packs values from `values` into `block` up to one that does not fit, at most `count`, and
+/// returns how many.
+template <class T>
+int packBlock(const T* values, int count, WireBits<T>* block) {
+    int ready = 0;
+    for (; ready < count; ++ready) {
+        if constexpr (!alwaysFits<T>)
+            if (!fits(values[ready]))
+                break;
+        block[ready] = packed(values[ready]);
+    }
+    return ready;
 }
 
 template <class T>
@@ -101,10 +134,7 @@ void writeValues(QrBufferedIO& io, const T* values, int count) {
     WireBits<T> block[perBlock];
     for (int done = 0; done < count;) {
         const int wanted = std::min(perBlock, count - done);
-        int ready = 0;
-        for (; ready < wanted && fits(values[done + ready]); ++ready)
-            block[ready] = reversed(
-                std::bit_cast<WireBits<T>>(static_cast<WireType<T>>(values[done + ready])));
+        const int ready = packBlock(values + done, wanted, block);
         if (ready > 0)
             io.write(block, ready * width);
         if (ready < wanted) // What came before it is written, as it is with text.
@@ -137,23 +167,37 @@ int readBlock(QrBufferedIO& io, void* values, int count, int width) {
     return done;
 }
 
+template <class T>
+T unpacked(const char* packed) {
+    WireBits<T> bits;
+    std::memcpy(&bits, packed, sizeof bits);
+    return static_cast<T>(std::bit_cast<WireType<T>>(reversed(bits)));
+}
+
 /// Turns `count` values, which stand packed at the front of the array as they were read, into
-/// values of the host. From the last to the first: none overwrites one that is still packed.
+/// values of the host.
 template <class T>
 void unpack(T* values, int count) {
-    constexpr std::size_t width = sizeof(WireType<T>);
-    static_assert(sizeof(T) >= width);
     const auto* packed = reinterpret_cast<const char*>(values);
-    for (auto index = static_cast<std::size_t>(count); index-- > 0;) {
-        WireBits<T> bits;
-        std::memcpy(&bits, packed + index * width, width);
-        values[index] = static_cast<T>(std::bit_cast<WireType<T>>(reversed(bits)));
-    }
+    constexpr std::size_t width = sizeof(WireType<T>);
+    const auto size = static_cast<std::size_t>(count);
+    if constexpr (sizeof(T) == width)
+        for (std::size_t index = 0; index < size; ++index)
+            values[index] = unpacked<T>(packed + index * width);
+    else // From the last to the first: none overwrites one that is still packed.
+        for (std::size_t index = size; index-- > 0;)
+            values[index] = unpacked<T>(packed + index * width);
 }
 
 template <class T>
 int readValues(QrBufferedIO& io, T* values, int count) {
-    const int got = readBlock(io, values, count, sizeof(WireType<T>));
+    constexpr int width = sizeof(WireType<T>);
+    int got = 0;
+    std::istream* const in = count == 1 ? StandardStreams::inputUnder(io) : nullptr;
+    if (std::streambuf* const buffer = in ? directBuffer(*in) : nullptr)
+        got = readDirectly(*in, *buffer, reinterpret_cast<char*>(values), width) / width;
+    else
+        got = readBlock(io, values, count, width);
     if constexpr (sizeof(T) > 1)
         unpack(values, got);
     return got;
@@ -178,8 +222,11 @@ template <class T>
 void QrStream::writeBinary(const T& values, int count) {
     if (count < 1)
         return;
-    endText();
-    if constexpr (sizeof(T) == 1 && !std::is_same_v<T, bool>)
+    if (separatorPending)
+        endText();
+    if (count == 1)
+        writeValue(io(), values);
+    else if constexpr (sizeof(T) == 1 && !std::is_same_v<T, bool>)
         writeBytes(io(), &values, count);
     else
         writeValues(io(), &values, count);
@@ -189,7 +236,8 @@ template <class T>
 int QrStream::readBinary(T& values, int count) {
     if (count < 1)
         return 0;
-    skipSeparator();
+    if (separatorPending)
+        skipSeparator();
     if constexpr (std::is_same_v<T, bool>)
         return readBools(io(), &values, count);
     else
@@ -324,7 +372,8 @@ int QrStream::read(std::wstring& values, int count) {
         int length = 0;
         if (read(length, 1) == 0)
             break;
-        readCharacters(*value, length, source);
+        if (!readCharacters(*value, length))
+            throw QrStreamEx::ExReadError(source, __LINE__);
     }
     return done;
 }

@@ -115,7 +115,8 @@ int QrTextStream::read(std::wstring& values, int count) {
         if (read(length, 1) == 0)
             break;
         skipSeparator();
-        readCharacters(*value, length, source);
+        if (!readCharacters(*value, length))
+            throw QrStreamEx::ExReadError(source, __LINE__);
     }
     return done;
 }

@@ -1,11 +1,11 @@
 #include "components/componentTools/discovery.h"
 
 #include "components/componentManager/pathNormaliser.h"
+#include "components/componentManager/platform/platform.h"
 #include "components/componentTools/platform/system.h"
 #include "components/componentTools/recordedList.h"
 
 #include <map>
-#include <set>
 #include <system_error>
 
 namespace Mz::Tools {
@@ -31,13 +31,13 @@ class Discoverer {
             return;
         }
         const std::wstring directory = normalisePath(name->c_str(), false);
-        const std::filesystem::path opened = platform::openingPath(directory, folder);
+        const std::filesystem::path opened = platform::openingPath(directory, {}, folder.native());
         std::error_code failure;
         if (!std::filesystem::is_directory(opened, failure)) {
             leaveOut(folder, {Verdict::missing, {}, {}});
             return;
         }
-        for (const platform::DirectoryEntry& entry : platform::listCandidates(opened))
+        for (const platform::DirectoryEntry& entry : platform::listCandidates(opened.native()))
             add(directory, entry);
         leaveOutUnnamed(opened);
     }
@@ -47,8 +47,11 @@ class Discoverer {
   private:
     void add(const std::wstring& directory, const platform::DirectoryEntry& entry) {
         // One file, one record, however often the search path leads to it.
-        if (entry.identity && !seen.insert(*entry.identity).second)
-            return;
+        if (entry.identity) {
+            const auto [other, isFirst] = seen.emplace(*entry.identity, entry.path);
+            if (!isFirst && platform::isSameFile(other->second, entry.path))
+                return;
+        }
         Candidate candidate{entry.path, directory, normalisePath(entry.name.c_str(), false)};
         const auto [known, isNew] =
             names.emplace(std::pair(directory, candidate.fileName), entry.path);
@@ -76,7 +79,7 @@ class Discoverer {
     }
 
     Discovery result;
-    std::set<platform::FileIdentity> seen;
+    std::map<platform::FileIdentity, platform::NativePath> seen;
     std::map<std::pair<std::wstring, std::wstring>, std::filesystem::path> names;
 };
 

@@ -14,7 +14,7 @@ namespace {
 Finding judgeRecord(const RecordedLibrary* record, const std::filesystem::path& file) {
     if (!record)
         return {Verdict::notRecorded, {}, {}};
-    const auto status = platform::queryFile(file);
+    const auto status = platform::queryFile(file.native());
     const bool sameTime = status && status->time == record->time;
     const bool sameSize = status && status->size == record->size;
     if (!sameTime || !sameSize)

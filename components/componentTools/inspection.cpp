@@ -1,5 +1,6 @@
 #include "components/componentTools/inspection.h"
 
+#include "components/componentManager/platform/platform.h"
 #include "components/componentTools/platform/system.h"
 
 #include <deque>
@@ -13,7 +14,7 @@ std::optional<Finding> judgePlace(const std::filesystem::path& file) {
     const System::FileAttributes attributes = System::fileAttributes(file);
     if (attributes.directory)
         return Finding{Verdict::directory, {}, {}};
-    const auto status = platform::queryFile(file);
+    const auto status = platform::queryFile(file.native());
     if (!status)
         return Finding{Verdict::missing, {}, {}};
     if (attributes.hidden)

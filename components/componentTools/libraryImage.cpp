@@ -1,11 +1,13 @@
 #include "components/componentTools/libraryImage.h"
 
+#include "components/componentManager/platform/platform.h"
+
 #include <algorithm>
 
 namespace Mz::Tools {
 
-FileBytes::FileBytes(const platform::NativePath& path) {
-    opened = platform::openForReading(stream, path);
+FileBytes::FileBytes(const std::filesystem::path& path) {
+    opened = platform::openForReading(stream, path.native());
     if (!opened)
         return;
     stream.seekg(0, std::ios::end);
@@ -59,7 +61,7 @@ std::optional<std::string> FileBytes::text(std::uint64_t offset) {
     return std::nullopt;
 }
 
-LibraryImage readLibraryImage(const platform::NativePath& path) {
+LibraryImage readLibraryImage(const std::filesystem::path& path) {
     LibraryImage image;
     FileBytes file(path);
     image.readable = file.isOpen();

@@ -4,11 +4,10 @@
 /// name. Nothing in the file is trusted, and nothing of it is run.
 #pragma once
 
-#include "components/componentManager/platform/platform.h"
-
 #include <array>
 #include <cstdint>
 #include <cstring>
+#include <filesystem>
 #include <fstream>
 #include <optional>
 #include <string>
@@ -20,7 +19,7 @@ namespace Mz::Tools {
 /// Reads pieces of a file through two remembered blocks.
 class FileBytes {
   public:
-    explicit FileBytes(const platform::NativePath& path);
+    explicit FileBytes(const std::filesystem::path& path);
 
     bool isOpen() const { return opened; }
     std::uint64_t size() const { return fileSize; }
@@ -80,7 +79,7 @@ struct LibraryImage {
 };
 
 /// Reads the file, which must be a regular one.
-LibraryImage readLibraryImage(const platform::NativePath& path);
+LibraryImage readLibraryImage(const std::filesystem::path& path);
 
 /// What `readLibraryImage` is made of: each fills `image` from a file that begins as its format
 /// does, up to the first thing that is wrong.

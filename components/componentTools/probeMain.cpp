@@ -141,11 +141,11 @@ void describeGuarded(QrGetComponentDescriptionFunction* entryPoint) {
     }
 }
 
-void probe(const platform::NativePath& file) {
-    if (!platform::exportsFunction(file, entryPointName))
+void probe(const System::NativePath& file) {
+    if (!platform::exportsFunction(file.native(), entryPointName))
         return sendFault(Verdict::noEntryPoint);
     send(encodeStage(Stage::loading));
-    const platform::Module module = platform::loadLibrary(file);
+    const platform::Module module = platform::loadLibrary(file.native());
     if (!module) {
         const std::wstring fault = System::passedFault();
         if (!fault.empty())

@@ -116,7 +116,7 @@ ListReading readRecordedList(const std::filesystem::path& file) {
     ListReading reading;
     std::ifstream input;
     if (!openPatiently(input, file)) {
-        if (platform::queryFile(file)) {
+        if (platform::queryFile(file.native())) {
             reading.state = ListReading::State::rejected;
             reading.reason = L"it cannot be read";
         }

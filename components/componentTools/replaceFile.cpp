@@ -73,8 +73,8 @@ bool openPatiently(std::ifstream& stream, const std::filesystem::path& file) {
     return patiently(
         [&] {
             stream.clear();
-            status = platform::queryFile(file);
-            return status && status->regular && platform::openForReading(stream, file);
+            status = platform::queryFile(file.native());
+            return status && status->regular && platform::openForReading(stream, file.native());
         },
         [&] { return !status || !status->regular; });
 }

@@ -63,7 +63,7 @@ class Scanner {
 
     void add(const Candidate& candidate) {
         ScannedFile file{candidate.path, candidate.directory, candidate.fileName, {}, {}};
-        const auto status = platform::queryFile(candidate.path);
+        const auto status = platform::queryFile(candidate.path.native());
         const Name name(candidate.directory, candidate.fileName);
         const auto known = old.find(name);
         const bool unchanged = known != old.end() && status && status->time == known->second.time &&

@@ -20,7 +20,8 @@ class PosixPlatform : public ::testing::Test {
 };
 
 TEST_F(PosixPlatform, OpensByTheNameAsFound) {
-    EXPECT_EQ(openingPath(L"\\a\\b", "/A/b").native(), "/A/b");
+    EXPECT_EQ(openingPath(L"\\a", L"b", "/A/b"), "/A/b");
+    EXPECT_EQ(openingPath(L"\\a", L"", "/A"), "/A");
 }
 
 TEST_F(PosixPlatform, LowersAsciiOnlyInEveryLocale) {
@@ -67,10 +68,29 @@ TEST_F(PosixPlatform, ConvertsTextsAsTheLocaleSays) {
 TEST_F(PosixPlatform, HasNoNativeNameForWhatTheLocaleCannotWrite) {
     EXPECT_EQ(toNative(L"\u4E2D"), std::nullopt);
     ASSERT_TRUE(toNative(L"\u00E4"));
-    EXPECT_EQ(toNative(L"\u00E4")->native(), "\xE4");
+    EXPECT_EQ(toNative(L"\u00E4"), "\xE4");
     useUtf8();
     ASSERT_TRUE(toNative(L"\u4E2D"));
-    EXPECT_EQ(toNative(L"\u4E2D")->native(), "\xE4\xB8\xAD");
+    EXPECT_EQ(toNative(L"\u4E2D"), "\xE4\xB8\xAD");
+}
+
+TEST_F(PosixPlatform, KnowsOneFileByItsNames) {
+    TemporaryDirectory folder;
+    const NativePath file = folder.write("file", "x");
+    const NativePath other = folder.write("other", "x");
+    const NativePath link = folder.path() / "link";
+    const NativePath symbolic = folder.path() / "symbolic";
+    std::filesystem::create_hard_link(file, link);
+    std::filesystem::create_symlink("file", symbolic);
+    EXPECT_TRUE(isSameFile(file, link));
+    EXPECT_TRUE(isSameFile(file, symbolic));
+    EXPECT_FALSE(isSameFile(file, other));
+    EXPECT_FALSE(isSameFile(file, folder.path() / "nothing"));
+    const std::vector<DirectoryEntry> entries = listCandidates(folder.path());
+    ASSERT_EQ(entries.size(), 4u);
+    EXPECT_EQ(entries[0].identity, entries[1].identity);
+    EXPECT_NE(entries[0].identity, entries[2].identity);
+    EXPECT_EQ(entries[0].identity, entries[3].identity);
 }
 
 TEST_F(PosixPlatform, ListsNeitherPipesNorDeadLinks) {

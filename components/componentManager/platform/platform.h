@@ -19,17 +19,18 @@ namespace Mz::platform {
 
 // ---- Names ----------------------------------------------------------------------------------
 
-/// A name as the system wants it, bytes or wide characters. Used as a container only: nothing here
-/// relies on how the standard library converts or compares paths.
-using NativePath = std::filesystem::path;
+/// A name as the system wants it, in bytes or wide characters.
+using NativePath = std::filesystem::path::string_type;
 
 /// `name` as the system wants it; nothing when the current locale has no form for it. On Linux
 /// characters become bytes as buffered IO writes them.
 std::optional<NativePath> toNative(std::wstring_view name);
 
-/// The name by which to open what was found as `found` and is stored as `normalised`: the latter
-/// where letter case and the kind of separator make no difference, else the former.
-NativePath openingPath(std::wstring_view normalised, const NativePath& found);
+/// The name by which to open what was found as `found` and is stored as `directory`, and `name` in
+/// it unless that is empty: the stored names where letter case and the kind of separator make no
+/// difference, else the found one.
+NativePath openingPath(const std::wstring& directory, const std::wstring& name,
+                       const NativePath& found);
 
 /// `text` in lower case, as file names are compared: by the C runtime's rules on Windows, ASCII
 /// letters only on Linux.
@@ -41,7 +42,8 @@ std::wstring firstArgument();
 
 // ---- Files ----------------------------------------------------------------------------------
 
-/// Which file a name stands for, whatever the name.
+/// Which file a name stands for, whatever the name. Some file systems tell the same of two files, so
+/// ask `isSameFile` before you believe it.
 struct FileIdentity {
     std::uint64_t device = 0;
     std::uint64_t index = 0;
@@ -56,6 +58,9 @@ struct FileStatus {
 
 /// The status of the file, links followed, from one query; nothing when there is none to be had.
 std::optional<FileStatus> queryFile(const NativePath& path);
+
+/// Whether two names, neither of which may be a folder's, stand for one file.
+bool isSameFile(const NativePath& a, const NativePath& b);
 
 /// One file that may be a component library.
 struct DirectoryEntry {

@@ -9,13 +9,14 @@
 
 #include <chrono>
 #include <cstdint>
+#include <filesystem>
 #include <functional>
 #include <string>
 #include <vector>
 
 namespace Mz::Tools::System {
 
-using platform::NativePath;
+using NativePath = std::filesystem::path;
 
 // ---- Names ----------------------------------------------------------------------------------
 

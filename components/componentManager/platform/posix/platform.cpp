@@ -43,11 +43,19 @@ struct CloseDirectory {
 
 using Directory = std::unique_ptr<DIR, CloseDirectory>;
 
-/// Whether the name in `directory` is a regular file, and which. Directories, the common other
-/// case, are told from the entry alone where the file system gives the type.
-std::optional<FileIdentity> regularFile(DIR* directory, const dirent& entry) {
+/// Whether an entry names the file by number; some file systems give a placeholder instead.
+bool hasFileNumber(const dirent& entry) {
+    constexpr ino_t placeholder = 0xFFFFFFFF;
+    return entry.d_ino != 0 && entry.d_ino != placeholder && entry.d_ino != static_cast<ino_t>(-1);
+}
+
+/// Whether the name in `directory`, which is on `device`, is a regular file, and which. Mostly the
+/// entry alone tells; asking for the status of every file takes as long as all the rest.
+std::optional<FileIdentity> regularFile(DIR* directory, dev_t device, const dirent& entry) {
     if (entry.d_type == DT_DIR)
         return std::nullopt;
+    if (entry.d_type == DT_REG && hasFileNumber(entry))
+        return FileIdentity{device, entry.d_ino};
     struct stat status;
     if (::fstatat(::dirfd(directory), entry.d_name, &status, 0) != 0 || !S_ISREG(status.st_mode))
         return std::nullopt;
@@ -67,7 +75,7 @@ void sortByName(std::vector<DirectoryEntry>& entries) {
         keyed.push_back({lowerCase(entry.name), &entry});
     std::sort(keyed.begin(), keyed.end(), [](const Keyed& a, const Keyed& b) {
         const int order = a.key.compare(b.key);
-        return order ? order < 0 : a.entry->path.native() < b.entry->path.native();
+        return order ? order < 0 : a.entry->path < b.entry->path;
     });
     std::vector<DirectoryEntry> sorted;
     sorted.reserve(entries.size());
@@ -111,13 +119,10 @@ bool isCodeOf(Module module, void* address) {
 } // namespace
 
 std::optional<NativePath> toNative(std::wstring_view name) {
-    std::optional<std::string> bytes = toBytes(name);
-    if (!bytes)
-        return std::nullopt;
-    return NativePath(std::move(*bytes));
+    return toBytes(name);
 }
 
-NativePath openingPath(std::wstring_view, const NativePath& found) {
+NativePath openingPath(const std::wstring&, const std::wstring&, const NativePath& found) {
     return found;
 }
 
@@ -143,21 +148,28 @@ std::optional<FileStatus> queryFile(const NativePath& path) {
                       S_ISREG(status.st_mode)};
 }
 
+bool isSameFile(const NativePath& a, const NativePath& b) {
+    struct stat first;
+    struct stat second;
+    return ::stat(a.c_str(), &first) == 0 && ::stat(b.c_str(), &second) == 0 &&
+           first.st_dev == second.st_dev && first.st_ino == second.st_ino;
+}
+
 std::vector<DirectoryEntry> listCandidates(const NativePath& directory) {
     std::vector<DirectoryEntry> entries;
     const Directory listing(::opendir(directory.c_str()));
-    if (!listing)
+    struct stat own;
+    if (!listing || ::fstat(::dirfd(listing.get()), &own) != 0)
         return entries;
     while (const dirent* entry = ::readdir(listing.get())) {
         if (entry->d_name[0] == '.')
             continue;
-        const std::optional<FileIdentity> identity = regularFile(listing.get(), *entry);
+        const std::optional<FileIdentity> identity = regularFile(listing.get(), own.st_dev, *entry);
         if (!identity)
             continue;
         std::optional<std::wstring> name = toCharacters(entry->d_name);
         if (name)
-            entries.push_back(
-                {std::move(*name), directory.native() + "/" + entry->d_name, identity});
+            entries.push_back({std::move(*name), directory + "/" + entry->d_name, identity});
     }
     sortByName(entries);
     return entries;

@@ -15,7 +15,7 @@ namespace {
 /// The loader takes a name without an extension to mean one with ".dll" behind it; a dot at the end
 /// says that there is none.
 std::wstring loaderName(const NativePath& path) {
-    const std::wstring& name = path.native();
+    const std::wstring& name = path;
     const std::size_t separator = name.find_last_of(L"/\\");
     const std::size_t dot = name.find_last_of(L'.');
     const bool hasExtension =
@@ -94,8 +94,8 @@ std::optional<NativePath> toNative(std::wstring_view name) {
     return NativePath(std::wstring(name));
 }
 
-NativePath openingPath(std::wstring_view normalised, const NativePath&) {
-    return NativePath(std::wstring(normalised));
+NativePath openingPath(const std::wstring& directory, const std::wstring& name, const NativePath&) {
+    return name.empty() ? directory : directory + L'\\' + name;
 }
 
 std::wstring lowerCase(std::wstring text) {
@@ -127,16 +127,20 @@ std::optional<FileStatus> queryFile(const NativePath& path) {
                       (status.st_mode & S_IFMT) == S_IFREG};
 }
 
+bool isSameFile(const NativePath& a, const NativePath& b) {
+    return a == b;
+}
+
 std::vector<DirectoryEntry> listCandidates(const NativePath& directory) {
     std::vector<DirectoryEntry> entries;
-    Listing listing(directory.native() + L"/*");
+    Listing listing(directory + L"/*");
     if (!listing.valid())
         return entries;
     constexpr unsigned int excluded = _A_HIDDEN | _A_SYSTEM | _A_SUBDIR;
     do {
         const _wfinddata64i32_t& entry = listing.current();
         if (!(entry.attrib & excluded))
-            entries.push_back({entry.name, directory.native() + L"\\" + entry.name, std::nullopt});
+            entries.push_back({entry.name, directory + L"\\" + entry.name, std::nullopt});
     } while (listing.next());
     return entries;
 }
@@ -145,7 +149,7 @@ bool openForReading(std::ifstream& stream, const NativePath& path) {
     if (isDirectory(path))
         stream.setstate(std::ios::failbit);
     else
-        stream.open(path, std::ios::in | std::ios::binary);
+        stream.open(std::filesystem::path(path), std::ios::in | std::ios::binary);
     return stream.good();
 }
 
@@ -155,7 +159,7 @@ Module findLoadedLibrary(const NativePath& path) {
 
 bool exportsFunction(const NativePath& path, const char* symbol) {
     const std::wstring name = loaderName(path);
-    const OwnActivationContext context(path.native());
+    const OwnActivationContext context(path);
     const HMODULE module = ::LoadLibraryExW(name.c_str(), nullptr, DONT_RESOLVE_DLL_REFERENCES);
     const bool found = findSymbol(module, symbol) != nullptr;
     unloadLibrary(module);
@@ -163,7 +167,7 @@ bool exportsFunction(const NativePath& path, const char* symbol) {
 }
 
 Module loadLibrary(const NativePath& path) {
-    const OwnActivationContext context(path.native());
+    const OwnActivationContext context(path);
     const HMODULE module = ::LoadLibraryW(loaderName(path).c_str());
     if (!module)
         static_cast<void>(::GetLastError()); // The reason belongs to nobody.

@@ -1,5 +1,7 @@
 #include "components/componentTools/platform/system.h"
 
+#include "components/componentManager/platform/platform.h"
+
 #include "components/componentTools/platform/windows/faultName.h"
 
 #include <algorithm>

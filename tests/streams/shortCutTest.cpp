@@ -1,0 +1,402 @@
+// Where the library goes past a standard stream to its buffer, everything comes out as if it did
+// not.
+#include "tests/streams/support.h"
+#include "tests/support/temporaryDirectory.h"
+
+#include <gtest/gtest.h>
+
+#include <array>
+#include <bit>
+#include <cmath>
+#include <cstring>
+#include <filesystem>
+#include <fstream>
+#include <limits>
+#include <random>
+#include <vector>
+
+namespace {
+
+using namespace Mz::Test;
+using Mz::int64;
+using Mz::QrBinaryStream;
+using Mz::QrStream;
+using Mz::QrTextStream;
+
+/// A buffer that is none of the standard library's own: every call might be watched.
+class WatchedBuffer final : public std::stringbuf {
+  public:
+    using std::stringbuf::stringbuf;
+};
+
+/// IOs of which the library cannot know what they do.
+class ForeignInput final : public Mz::QrInBuffer {
+  public:
+    using Mz::QrInBuffer::QrInBuffer;
+};
+
+class ForeignOutput final : public Mz::QrOutBuffer {
+  public:
+    using Mz::QrOutBuffer::QrOutBuffer;
+};
+
+template <class Buffer, class IO, class Stream>
+struct Output {
+    Buffer buffer{std::ios::in | std::ios::out};
+    std::ostream sink{&buffer};
+    IO io{&sink};
+    Stream stream{&io};
+
+    std::string outcome() const { return buffer.str() + "|" + std::to_string(sink.rdstate()); }
+};
+
+template <class Buffer, class IO, class Stream>
+struct Input {
+    explicit Input(const std::string& content) : buffer(content, std::ios::in | std::ios::out) {}
+
+    Buffer buffer;
+    std::istream source{&buffer};
+    IO io{&source};
+    Stream stream{&io};
+};
+
+/// Does `work` on a stream over each kind of output, and expects the same from all.
+template <class Stream, class Work>
+void expectSameOutput(const Work& work) {
+    Output<std::stringbuf, Mz::QrOutBuffer, Stream> direct;
+    Output<WatchedBuffer, Mz::QrOutBuffer, Stream> watched;
+    Output<std::stringbuf, ForeignOutput, Stream> foreign;
+    const std::string expected = work(direct.stream) + direct.outcome();
+    EXPECT_EQ(expected, work(watched.stream) + watched.outcome());
+    EXPECT_EQ(expected, work(foreign.stream) + foreign.outcome());
+}
+
+/// The same for input; besides what `work` tells, the unread bytes and the stream's state count.
+template <class Stream, class Work>
+void expectSameInput(const std::string& content, const Work& work) {
+    Input<std::stringbuf, Mz::QrInBuffer, Stream> direct(content);
+    Input<WatchedBuffer, Mz::QrInBuffer, Stream> watched(content);
+    Input<std::stringbuf, ForeignInput, Stream> foreign(content);
+    const auto outcome = [&](auto& input) {
+        const std::string told = work(input.stream);
+        const std::string state = std::to_string(input.source.rdstate());
+        return told + "|" + state + "|" +
+               std::string(std::istreambuf_iterator<char>(&input.buffer), {});
+    };
+    const std::string expected = outcome(direct);
+    EXPECT_EQ(expected, outcome(watched)) << "from " << toHex(content);
+    EXPECT_EQ(expected, outcome(foreign)) << "from " << toHex(content);
+}
+
+template <class T>
+std::vector<T> valuesOf(unsigned int seed, std::size_t count) {
+    std::mt19937_64 engine(seed);
+    std::vector<T> values(count);
+    for (T& value : values) {
+        // Of every length, not only long ones.
+        const std::uint64_t bits = engine() >> (engine() % 64);
+        std::memcpy(&value, &bits, sizeof value);
+    }
+    return values;
+}
+
+template <class Stream>
+std::string writeMixed(QrStream& stream) {
+    constexpr std::size_t count = 400;
+    std::mt19937 engine(7);
+    const auto ints = valuesOf<int>(1, count);
+    const auto longs = valuesOf<int64>(2, count);
+    const auto reals = valuesOf<double>(3, count);
+    const auto singles = valuesOf<float>(4, count);
+    const auto shorts = valuesOf<short>(5, count);
+    const auto bytes = valuesOf<unsigned char>(6, count);
+    for (std::size_t index = 0; index < count; ++index)
+        switch (engine() % 12) {
+        case 0: stream << ints[index]; break;
+        case 1: stream << longs[index]; break;
+        case 2: stream << reals[index]; break;
+        case 3: stream << singles[index]; break;
+        case 4: stream << shorts[index]; break;
+        case 5: stream << bytes[index]; break;
+        case 6: stream << static_cast<unsigned int>(ints[index]); break;
+        case 7: stream << static_cast<unsigned long long>(longs[index]); break;
+        case 8: stream << static_cast<long>(ints[index]); break;
+        case 9: stream << (bytes[index] % 2 == 0); break;
+        case 10: stream << std::wstring(bytes[index], L'x'); break;
+        default: stream.write(ints[0], 300); break;
+        }
+    return {};
+}
+
+TEST(ShortCuts, WriteTextAsTheWholeWayDoes) {
+    expectSameOutput<QrTextStream>([](QrStream& s) { return writeMixed<QrTextStream>(s); });
+}
+
+TEST(ShortCuts, WriteBinaryDataAsTheWholeWayDoes) {
+    expectSameOutput<QrBinaryStream>([](QrStream& s) { return writeMixed<QrBinaryStream>(s); });
+}
+
+TEST(ShortCuts, CountTheColumnAsTheWholeWayDoes) {
+    for (int first = 60; first < 75; ++first)
+        expectSameOutput<BaseStream>([&](QrStream& stream) {
+            stream << std::wstring(static_cast<std::size_t>(first), L'y') << 1 << 22 << 0.5 << true
+                   << 333 << -4.25f << int64(1) << 'A';
+            stream.write(7, 1);
+            stream << 8 << 9;
+            return std::string();
+        });
+}
+
+/// Reads one value by `format` and tells result and value.
+template <class T>
+std::string readBy(QrStream& stream, const wchar_t* format) {
+    T value{};
+    std::memset(&value, 0x5A, sizeof value);
+    const int assigned = stream.formattedRead(format, &value);
+    return std::to_string(assigned) + toHex({reinterpret_cast<const char*>(&value), sizeof value});
+}
+
+std::string readByFormat(QrStream& stream, std::size_t which) {
+    switch (which % 14) {
+    case 0: return readBy<int>(stream, L"%d");
+    case 1: return readBy<unsigned int>(stream, L"%u");
+    case 2: return readBy<short>(stream, L"%hd");
+    case 3: return readBy<unsigned short>(stream, L"%hu");
+    case 4: return readBy<long>(stream, L"%ld");
+    case 5: return readBy<unsigned long>(stream, L"%lu");
+    case 6: return readBy<int64>(stream, L"%I64d");
+    case 7: return readBy<unsigned long long>(stream, L"%I64u");
+    case 8: return readBy<float>(stream, L"%g");
+    case 9: return readBy<double>(stream, L"%lg");
+    case 10: return readBy<int>(stream, L"%i");
+    case 11: return readBy<int>(stream, L"%4d");
+    case 12: return readBy<std::array<wchar_t, 64>>(stream, L"%60s");
+    default: return readBy<std::array<char, 300>>(stream, L"%60[^,]");
+    }
+}
+
+/// Text that looks like numbers more often than chance would have it.
+std::string randomText(std::mt19937& engine) {
+    static const std::vector<std::string> pieces = {" ",
+                                                    "\n",
+                                                    "\t",
+                                                    "-",
+                                                    "+",
+                                                    "0",
+                                                    "7",
+                                                    "42",
+                                                    "123456789",
+                                                    "4294967296",
+                                                    "9223372036854775807",
+                                                    "99999999999999999999",
+                                                    ".",
+                                                    "0.5",
+                                                    "3.14159265358979",
+                                                    "1e5",
+                                                    "1e",
+                                                    "1e+",
+                                                    "2.5e-3",
+                                                    "1e400",
+                                                    "1e-400",
+                                                    "-0",
+                                                    "0x1F",
+                                                    "x",
+                                                    ",",
+                                                    "abc",
+                                                    "nan",
+                                                    "inf",
+                                                    std::string(1, '\0'),
+                                                    "\x80",
+                                                    "\xFF",
+                                                    "1.7976931348623157e308",
+                                                    "4.9e-324",
+                                                    "9007199254740993",
+                                                    "0.1234567890123456",
+                                                    "179769313486231570000000000000000000000",
+                                                    "\r\n",
+                                                    "\v",
+                                                    "00012"};
+    std::string text;
+    for (auto count = engine() % 12; count > 0; --count)
+        text += pieces[engine() % pieces.size()];
+    return text;
+}
+
+TEST(ShortCuts, ReadTextAsTheWholeWayDoes) {
+    std::mt19937 engine(11);
+    for (int round = 0; round < MZ_RANDOM_VALUES / 20 && !HasFailure(); ++round) {
+        const std::string content = randomText(engine);
+        const auto seed = engine();
+        expectSameInput<BaseStream>(content, [&](QrStream& stream) {
+            std::mt19937 formats(seed);
+            std::string told;
+            for (int count = 0; count < 6; ++count)
+                told += readByFormat(stream, formats()) + ";";
+            return told;
+        });
+    }
+}
+
+TEST(ShortCuts, ReadEveryEndOfTheBufferAsTheWholeWayDoes) {
+    const std::string number = "  -123.4567e-2 77 1";
+    for (std::size_t length = 0; length <= number.size(); ++length)
+        for (std::size_t format = 0; format < 14; ++format)
+            expectSameInput<BaseStream>(number.substr(0, length), [&](QrStream& stream) {
+                return readByFormat(stream, format) + readByFormat(stream, format);
+            });
+}
+
+TEST(ShortCuts, ReadAFileAcrossItsBlocks) {
+    const TemporaryDirectory folder;
+    const std::filesystem::path path = folder.path() / "numbers.txt";
+    const auto ints = valuesOf<int>(21, 20'000);
+    {
+        std::ofstream file(path, std::ios::binary);
+        Mz::QrOutBuffer io(&file);
+        QrTextStream stream(&io);
+        for (const int value : ints)
+            stream << value << static_cast<double>(value) / 8;
+    }
+    std::ifstream file(path, std::ios::binary);
+    Mz::QrInBuffer io(&file);
+    QrTextStream stream(&io);
+    int wrong = 0;
+    for (std::size_t index = 0; index < ints.size(); ++index) {
+        int value = 0;
+        double real = 0;
+        stream >> value >> real;
+        wrong += value == ints[index] && real == static_cast<double>(value) / 8 ? 0 : 1;
+        if (index % 7 == 0) // What was put back is read again, wherever the file keeps it.
+            io.ungetc('8');
+        if (index % 7 == 0)
+            wrong += io.read() == '8' ? 0 : 1;
+    }
+    EXPECT_EQ(wrong, 0);
+    EXPECT_EQ(io.read(), -1);
+}
+
+TEST(ShortCuts, ReadANumberThatBeginsWithWhatWasPutBack) {
+    const TemporaryDirectory folder;
+    const std::filesystem::path path = folder.path() / "number.txt";
+    std::ofstream(path, std::ios::binary) << "x23 45 ";
+    std::ifstream file(path, std::ios::binary);
+    Mz::QrInBuffer io(&file);
+    BaseStream stream(&io);
+    EXPECT_EQ(io.read(), 'x');
+    io.ungetc('1');
+    int first = 0;
+    int second = 0;
+    stream >> first >> second;
+    EXPECT_EQ(first, 123);
+    EXPECT_EQ(second, 45);
+}
+
+TEST(ShortCuts, ReadBinaryDataAsTheWholeWayDoes) {
+    const std::string bytes = "\x01\x02\x03\x04\x05\x06\x07\x08\x09\x0A\x0B";
+    for (std::size_t length = 0; length <= bytes.size(); ++length)
+        for (int count = 0; count < 4; ++count) {
+            expectSameInput<QrBinaryStream>(bytes.substr(0, length), [&](QrStream& stream) {
+                std::array<int, 4> values{-1, -1, -1, -1};
+                const int got = stream.read(values[0], count);
+                return std::to_string(got) +
+                       toHex({reinterpret_cast<const char*>(values.data()), sizeof values});
+            });
+            expectSameInput<QrBinaryStream>(bytes.substr(0, length), [&](QrStream& stream) {
+                std::array<wchar_t, 4> values{};
+                const int got = stream.read(values[0], count);
+                const int more = stream.read(values[3], 1);
+                return std::to_string(got) + std::to_string(more);
+            });
+        }
+}
+
+TEST(ShortCuts, AreNotTakenPastATiedStreamOrAFlush) {
+    std::stringbuf in("12 13 ", std::ios::in | std::ios::out);
+    std::istream source(&in);
+    std::ostringstream tied;
+    class Counting final : public std::stringbuf {
+      public:
+        int syncs = 0;
+
+      private:
+        int sync() override { return ++syncs, 0; }
+    } watched;
+    std::ostream flushed(&watched);
+    source.tie(&flushed);
+    Mz::QrInBuffer io(&source);
+    BaseStream stream(&io);
+    int value = 0;
+    stream >> value;
+    EXPECT_EQ(value, 12);
+    // Nothing was written, so a standard stream may leave the tied one alone; with something in it,
+    // it must be flushed.
+    flushed << "x";
+    const int before = watched.syncs;
+    stream >> value;
+    EXPECT_EQ(value, 13);
+    EXPECT_GT(watched.syncs, before);
+}
+
+TEST(ShortCuts, LeaveAStreamThatWasBrokenAlone) {
+    std::ostringstream sink;
+    Mz::QrOutBuffer io(&sink);
+    BaseStream stream(&io);
+    sink.setstate(std::ios::badbit);
+    EXPECT_THROW(stream << 1, Mz::QrStreamEx::ExWriteError);
+    EXPECT_EQ(sink.str(), "");
+}
+
+/// `%.16g` the whole way: the width changes nothing but the way.
+std::string wholeWay(double value) {
+    return written<BaseStream>([&](QrStream& s) { s.formattedWrite(L"%1.16g", value); });
+}
+
+std::string shortCut(double value) {
+    return written<BaseStream>([&](QrStream& s) { s.formattedWrite(L"%.16g", value); });
+}
+
+TEST(ShortCuts, GiveADoubleTheDigitsOfTheWholeWay) {
+    std::mt19937_64 engine(13);
+    std::uniform_real_distribution<double> ordinary(-1000, 1000);
+    int wrong = 0;
+    const auto compare = [&](double value) {
+        if (shortCut(value) == wholeWay(value))
+            return;
+        if (++wrong < 5)
+            ADD_FAILURE() << shortCut(value) << " for " << wholeWay(value);
+    };
+    for (int round = 0; round < MZ_RANDOM_VALUES / 4; ++round) {
+        compare(std::bit_cast<double>(engine()));
+        compare(ordinary(engine));
+        // A few decimals, as people write them, and their neighbours.
+        const double few = static_cast<double>(static_cast<int>(engine() % 2'000'000) - 1'000'000) /
+                           std::pow(10.0, static_cast<double>(engine() % 12));
+        compare(few);
+        compare(std::nextafter(few, 1e300));
+        compare(std::nextafter(few, -1e300));
+    }
+    EXPECT_EQ(wrong, 0);
+}
+
+TEST(ShortCuts, GiveADoubleAtAnEdgeTheDigitsOfTheWholeWay) {
+    const double smallest = std::numeric_limits<double>::denorm_min();
+    for (int exponent = -1074; exponent < 1024; ++exponent) {
+        const double power = std::ldexp(1.0, exponent);
+        for (const double value : {power, std::nextafter(power, 0.0), power + power * 1e-16,
+                                   std::nextafter(power, 1e308), 3 * power, -power})
+            EXPECT_EQ(shortCut(value), wholeWay(value));
+    }
+    for (int exponent = -323; exponent <= 308; ++exponent) {
+        const double power = std::strtod(("1e" + std::to_string(exponent)).c_str(), nullptr);
+        for (const double value : {power, std::nextafter(power, 0.0), std::nextafter(power, 1e308),
+                                   5 * power, 9.999999999999999 * power})
+            EXPECT_EQ(shortCut(value), wholeWay(value));
+    }
+    for (const double value :
+         {0.0, -0.0, smallest, -smallest, 1e15, 1e16, 1e17, 999999999999999.9, 9999999999999998.0,
+          123456789012345.6, 0.0001, 0.00001, 1e22, 1e23, std::numeric_limits<double>::infinity(),
+          -std::numeric_limits<double>::infinity(), std::numeric_limits<double>::quiet_NaN()})
+        EXPECT_EQ(shortCut(value), wholeWay(value));
+}
+
+} // namespace
