@@ -15,6 +15,14 @@
 #include <new>
 #include <typeinfo>
 
+#ifdef MZ_UNLIMITED_ADDRESSES
+/// Under the sanitizers: a crash is to end the process as it does without them.
+extern "C" MZ_EXPORT const char* __asan_default_options() {
+    return "handle_segv=0:handle_sigbus=0:handle_sigill=0:handle_sigfpe=0:handle_abort=0:"
+           "detect_leaks=0";
+}
+#endif
+
 using namespace Mz;
 using namespace Mz::Tools;
 
