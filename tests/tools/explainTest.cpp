@@ -142,6 +142,14 @@ TEST_F(Explain, TellsWhatADescriptionThrowsAndWhere) {
     EXPECT_EQ(loadedVerdict(L"throwsInLabel").subject, L"its description");
 }
 
+TEST_F(Explain, TellsOfAnExceptionThatLeavesTheInitialisers) {
+    // One system's loader ends the process, the other's catches it and says that the load failed.
+    const Finding finding = loadedVerdict(L"throwsInInitialiser");
+    EXPECT_TRUE(finding.verdict == Verdict::aborted || finding.verdict == Verdict::loadFailed);
+    EXPECT_THAT(sentenceOf(finding), HasSubstr(L"initialisers"));
+    EXPECT_THAT(finding.words, HasSubstr(L"exception"));
+}
+
 TEST_F(Explain, TellsOfACrashAndWhere) {
     const Finding entryPoint = loadedVerdict(L"crashesInEntryPoint");
     EXPECT_EQ(entryPoint.verdict, Verdict::crashed);

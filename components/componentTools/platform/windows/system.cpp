@@ -133,6 +133,10 @@ Located findDependency(const std::string& name, const NativePath&, const Library
 namespace {
 
 std::wstring textOfError(DWORD number) {
+    // The loader passes on what its own guard caught: here, the number of a C++ exception.
+    constexpr DWORD exceptionOfCpp = 0x20474343;
+    if (number == exceptionOfCpp)
+        return L"its initialisers let an exception out";
     wchar_t text[512];
     DWORD length = ::FormatMessageW(FORMAT_MESSAGE_FROM_SYSTEM | FORMAT_MESSAGE_IGNORE_INSERTS,
                                     nullptr, number, 0, text, 512, nullptr);
