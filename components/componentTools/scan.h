@@ -20,6 +20,7 @@ struct ScanOptions {
     std::filesystem::path list;
     /// Try libraries that failed earlier again, though they have not changed.
     bool retry = false;
+    /// For each library; when `interrupted` answers true, the whole scan ends.
     ProbeOptions probe;
     /// Hears of the progress and is asked whether to stop; null for nobody.
     QrProcessControl* controller = nullptr;

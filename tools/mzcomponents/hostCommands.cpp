@@ -57,22 +57,28 @@ std::vector<std::wstring> familiesFor(const Host& host, const std::filesystem::p
 
 struct Imported {
     QrRef<QrCastable> object;
-    std::wstring family;
-    bool found = false;
+    std::wstring family; ///< the name of the builders through which it came
+    std::wstring reason; ///< why there is no object
 };
 
+/// Tries one family after the other. What a builder throws is the reason of the failure.
 Imported importFile(const Host& host, const std::filesystem::path& file) {
     Imported imported;
-    const std::wstring name = Tools::displayName(file);
-    imported.found = std::filesystem::is_regular_file(file);
-    if (!imported.found)
+    imported.reason = L"there is no such file";
+    if (!std::filesystem::is_regular_file(file))
         return imported;
-    for (const std::wstring& family : familiesFor(host, file)) {
-        bool found = false;
-        imported.family = family;
-        imported.object = FamilyImporter(family).import(name.c_str(), nullptr, found);
-        if (imported.object)
-            break;
+    imported.reason = L"no builder imports this file";
+    const std::wstring name = Tools::displayName(file);
+    try {
+        for (const std::wstring& family : familiesFor(host, file)) {
+            bool found = false;
+            imported.family = family;
+            imported.object = FamilyImporter(family).import(name.c_str(), nullptr, found);
+            if (imported.object)
+                break;
+        }
+    } catch (const std::exception& failure) {
+        imported.reason = widened(failure.what());
     }
     return imported;
 }
@@ -83,6 +89,24 @@ std::wstring describe(const QrCastable* object) {
         return L"an object that cannot be stored";
     return L"class " + Tools::textOf(*persistant->getClassUid()) + L", version " +
            std::to_wstring(persistant->getVersion());
+}
+
+Json jsonOf(const std::filesystem::path& file, const Imported& imported) {
+    const bool good = static_cast<bool>(imported.object);
+    return {{"file", utf8(Tools::displayName(file))},
+            {"imported", good},
+            {"builderName", good ? utf8(imported.family) : ""},
+            {"object", utf8(good ? describe(imported.object.get()) : imported.reason)}};
+}
+
+/// Failures go to standard error, and successes to standard output unless something else does.
+void tell(Host& host, const std::filesystem::path& file, const Imported& imported, bool success) {
+    const std::wstring name = Tools::displayName(file);
+    if (!imported.object)
+        host.console().error(0, (name + L": " + imported.reason).c_str());
+    else if (success)
+        printLine(name + L": imported through \"" + imported.family + L"\": " +
+                  describe(imported.object.get()));
 }
 
 /// Writes the objects one after the other; they are complete or not written at all.
@@ -117,6 +141,23 @@ std::vector<Tools::GraphImporter> importersOf(const Host& host) {
         }
     }
     return importers;
+}
+
+Json jsonOf(const Host& host, const std::vector<Tools::GraphImporter>& importers) {
+    Json libraries = Json::array(), used = Json::array();
+    for (const Tools::RecordedLibrary& library : host.libraries()) {
+        if (library.builders.empty())
+            continue;
+        libraries.push_back(Commands::jsonOf(library));
+        // Positions are of the file that a list was read from.
+        libraries.back().erase("position");
+        for (Json& builder : libraries.back()["builders"])
+            builder.erase("position");
+    }
+    for (const Tools::GraphImporter& importer : importers)
+        used.push_back({{"uid", utf8(Tools::textOf(importer.uid))},
+                        {"importsThrough", utf8(importer.builderName)}});
+    return {{"libraries", libraries}, {"importers", used}};
 }
 
 void write(const std::string& content, const std::string& file) {
@@ -164,40 +205,23 @@ int import(const Common& common, const ImportArguments& arguments) {
         return subjectIsWrong;
     std::vector<QrRef<QrCastable>> objects;
     Json files = Json::array();
-    bool failed = false;
     for (const std::string& argument : arguments.files) {
         const std::filesystem::path file = Tools::pathOf(argument);
-        const std::wstring name = Tools::displayName(file);
-        Imported imported;
-        std::wstring reason = L"no builder imports this file";
-        try {
-            imported = importFile(host, file);
-            if (!imported.found)
-                reason = L"there is no such file";
-        } catch (const std::exception& failure) {
-            reason = widened(failure.what());
-        }
+        const Imported imported = importFile(host, file);
         host.console().clearLine();
         if (imported.object)
             objects.push_back(imported.object);
-        else
-            host.console().error(0, (name + L": " + reason).c_str());
-        failed = failed || !imported.object;
         if (common.json)
-            files.push_back({{"file", utf8(name)},
-                             {"imported", static_cast<bool>(imported.object)},
-                             {"builderName", imported.object ? utf8(imported.family) : ""},
-                             {"object", imported.object ? utf8(describe(imported.object.get()))
-                                                        : utf8(reason)}});
-        else if (imported.object)
-            printLine(name + L": imported through \"" + imported.family + L"\": " +
-                      describe(imported.object.get()));
+            files.push_back(jsonOf(file, imported));
+        tell(host, file, imported, !common.json);
     }
     if (common.json)
         printJson({{"files", files}});
-    if (!failed && !arguments.save.empty())
+    if (objects.size() < arguments.files.size())
+        return subjectIsWrong;
+    if (!arguments.save.empty())
         save(objects, Tools::pathOf(arguments.save));
-    return failed ? subjectIsWrong : good;
+    return good;
 }
 
 int graph(const Common& common, const GraphArguments& arguments) {
@@ -207,18 +231,7 @@ int graph(const Common& common, const GraphArguments& arguments) {
     const std::vector<Tools::GraphImporter> importers = importersOf(host);
     const std::string dot = Tools::dotOf(host.libraries(), importers);
     if (common.json) {
-        Json libraries = Json::array(), used = Json::array();
-        for (const Tools::RecordedLibrary& library : host.libraries())
-            if (!library.builders.empty()) {
-                libraries.push_back(jsonOf(library));
-                libraries.back().erase("position");
-                for (Json& builder : libraries.back()["builders"])
-                    builder.erase("position");
-            }
-        for (const Tools::GraphImporter& importer : importers)
-            used.push_back({{"uid", utf8(Tools::textOf(importer.uid))},
-                            {"importsThrough", utf8(importer.builderName)}});
-        printJson({{"libraries", libraries}, {"importers", used}});
+        printJson(jsonOf(host, importers));
     } else if (arguments.output.empty() && arguments.svg.empty()) {
         std::cout << dot;
     }
