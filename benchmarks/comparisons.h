@@ -10,5 +10,6 @@ void addCreateComparisons(RatioTable& table);
 void addStartComparisons(RatioTable& table);
 void addControllerComparisons(RatioTable& table);
 void addStreamComparisons(RatioTable& table);
+void addToolsComparisons(RatioTable& table);
 
 } // namespace Mz::Benchmarks

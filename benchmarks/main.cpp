@@ -89,6 +89,7 @@ int run(int argc, char** argv) {
     addStartComparisons(table);
     addControllerComparisons(table);
     addStreamComparisons(table);
+    addToolsComparisons(table);
 
     stayOnOneCore();
     {

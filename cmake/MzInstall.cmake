@@ -5,8 +5,22 @@ include(GNUInstallDirs)
 
 set(mzPackageFolder ${CMAKE_INSTALL_LIBDIR}/cmake/MZcomponentManager)
 
-install(TARGETS MZbase MZresmgt MZcomponentManager MZobjectIO EXPORT MZcomponentManagerTargets
+install(TARGETS MZbase MZresmgt MZcomponentManager MZobjectIO MZcomponentTools
+  EXPORT MZcomponentManagerTargets
   FILE_SET HEADERS DESTINATION ${CMAKE_INSTALL_INCLUDEDIR})
+# The probe stands beside the library that starts it.
+if(WIN32)
+  install(TARGETS mzcomponents-probe RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR})
+else()
+  install(TARGETS mzcomponents-probe RUNTIME DESTINATION ${CMAKE_INSTALL_LIBDIR})
+endif()
+if(MZ_BUILD_TOOLS)
+  install(TARGETS mzcomponents RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR})
+  install(FILES ${PROJECT_SOURCE_DIR}/docs/mzcomponents.1
+    DESTINATION ${CMAKE_INSTALL_MANDIR}/man1)
+  install(FILES ${PROJECT_SOURCE_DIR}/tools/mzcomponents/mzcomponents.bash
+    DESTINATION ${CMAKE_INSTALL_DATADIR}/bash-completion/completions RENAME mzcomponents)
+endif()
 install(EXPORT MZcomponentManagerTargets NAMESPACE Mz:: DESTINATION ${mzPackageFolder})
 
 configure_package_config_file(

@@ -36,12 +36,12 @@ platformConditions)
     # What differs by system stands in files of its own, chosen by the build.
     search '^[[:space:]]*#[[:space:]]*(if|ifdef|ifndef|elif|elifdef|elifndef)\b.*(WIN32|WIN64|_MSC_VER|MINGW|CYGWIN|linux|unix|APPLE|BSD|__GLIBC__)' \
         $(sources components examples tests tools benchmarks fuzz |
-            grep -vE '^components/componentManager/platform/|^components/base/export\.h$') |
+            grep -vE '^components/component(Manager|Tools)/platform/|^components/base/export\.h$') |
         complain "conditions on the platform outside the platform layer"
     ;;
 platformHeaders)
     search '#[[:space:]]*include[[:space:]]*<(windows|io|unistd|dlfcn|dirent|fcntl|link|elf|langinfo|direct|winbase|sys/[a-z]+)\.?h?>' \
-        $(sources components | grep -vE '^components/componentManager/platform/(windows|posix)/') |
+        $(sources components | grep -vE '^components/component(Manager|Tools)/platform/(windows|posix)/') |
         complain "headers of a system outside the platform layer"
     ;;
 sourcePositions)

@@ -1,0 +1,131 @@
+#include "components/componentTools/discovery.h"
+
+#include "components/componentManager/pathNormaliser.h"
+#include "components/componentManager/platform/platform.h"
+#include "components/componentTools/platform/system.h"
+#include "components/componentTools/recordedList.h"
+
+#include <map>
+#include <system_error>
+
+namespace Mz::Tools {
+
+namespace {
+
+/// A full path without ".", ".." and a separator at the end.
+std::filesystem::path fullPath(const std::filesystem::path& path) {
+    std::error_code failure;
+    std::filesystem::path full = std::filesystem::absolute(path, failure).lexically_normal();
+    if (!full.has_filename() && full.has_relative_path())
+        full = full.parent_path();
+    full.make_preferred();
+    return full;
+}
+
+class Discoverer {
+  public:
+    void add(const std::filesystem::path& folder) {
+        const std::optional<std::wstring> name = System::nameText(folder);
+        if (!name || !isCarried(*name)) {
+            leaveOut(folder, {Verdict::nameNotCarried, {}, {}});
+            return;
+        }
+        const std::wstring directory = normalisePath(name->c_str(), false);
+        const std::filesystem::path opened = platform::openingPath(directory, {}, folder.native());
+        std::error_code failure;
+        if (!std::filesystem::is_directory(opened, failure)) {
+            leaveOut(folder, {Verdict::missing, {}, {}});
+            return;
+        }
+        for (const platform::DirectoryEntry& entry : platform::listCandidates(opened.native()))
+            add(directory, entry);
+        leaveOutUnnamed(opened);
+    }
+
+    Discovery take() { return std::move(result); }
+
+  private:
+    void add(const std::wstring& directory, const platform::DirectoryEntry& entry) {
+        // One file, one record, however often the search path leads to it.
+        if (entry.identity) {
+            const auto [other, isFirst] = seen.emplace(*entry.identity, entry.path);
+            if (!isFirst && platform::isSameFile(other->second, entry.path))
+                return;
+        }
+        Candidate candidate{entry.path, directory, normalisePath(entry.name.c_str(), false)};
+        const auto [known, isNew] =
+            names.emplace(std::pair(directory, candidate.fileName), entry.path);
+        if (!isNew && !entry.identity)
+            return;
+        if (!isCarried(candidate.fileName))
+            leaveOut(entry.path, {Verdict::nameNotCarried, {}, {}});
+        else if (!isNew)
+            leaveOut(entry.path, {Verdict::sameName, System::displayName(known->second), {}});
+        else
+            result.candidates.push_back(std::move(candidate));
+    }
+
+    void leaveOut(const std::filesystem::path& path, const Finding& finding) {
+        result.leftOut.push_back({path, finding});
+    }
+
+    /// Names that are no text are passed over silently by the manager's own listing.
+    void leaveOutUnnamed(const std::filesystem::path& folder) {
+        std::error_code failure;
+        for (std::filesystem::directory_iterator entry(folder, failure), end;
+             !failure && entry != end; entry.increment(failure))
+            if (!System::nameText(entry->path()))
+                leaveOut(entry->path(), {Verdict::nameNotCarried, {}, {}});
+    }
+
+    Discovery result;
+    std::map<platform::FileIdentity, platform::NativePath> seen;
+    std::map<std::pair<std::wstring, std::wstring>, std::filesystem::path> names;
+};
+
+} // namespace
+
+std::vector<std::filesystem::path> foldersOf(const std::filesystem::path& searchPath) {
+    using Text = std::filesystem::path::string_type;
+    std::vector<std::filesystem::path> folders;
+    const Text& text = searchPath.native();
+    for (std::size_t start = 0; start <= text.size();) {
+        const std::size_t end = std::min(text.find(Text::value_type(';'), start), text.size());
+        if (end > start)
+            folders.push_back(fullPath(text.substr(start, end - start)));
+        start = end + 1;
+    }
+    return folders;
+}
+
+std::wstring searchPathOf(const std::vector<std::filesystem::path>& folders) {
+    std::wstring searchPath;
+    for (const std::filesystem::path& folder : folders) {
+        const std::optional<std::wstring> name = System::nameText(folder);
+        if (name && isCarried(*name))
+            searchPath += (searchPath.empty() ? L"" : L";") + *name;
+    }
+    return searchPath;
+}
+
+Discovery discover(const std::vector<std::filesystem::path>& folders) {
+    Discoverer discoverer;
+    for (const std::filesystem::path& folder : folders)
+        discoverer.add(folder);
+    return discoverer.take();
+}
+
+Candidate candidateOf(const std::filesystem::path& file) {
+    Candidate candidate{fullPath(file), {}, {}};
+    if (const auto directory = System::nameText(candidate.path.parent_path()))
+        candidate.directory = normalisePath(directory->c_str(), false);
+    if (const auto name = System::nameText(candidate.path.filename()))
+        candidate.fileName = normalisePath(name->c_str(), false);
+    return candidate;
+}
+
+std::wstring displayName(const std::filesystem::path& path) {
+    return System::displayName(path);
+}
+
+} // namespace Mz::Tools

@@ -1,0 +1,302 @@
+/// Libraries and programs in the format of Linux.
+#include "components/componentTools/libraryImage.h"
+
+#include <algorithm>
+#include <string_view>
+
+namespace Mz::Tools {
+
+namespace {
+
+struct Identity {
+    unsigned char magic[4], wordSize, byteOrder, version, abi, rest[8];
+};
+
+struct Header {
+    Identity identity;
+    std::uint16_t type, machine;
+    std::uint32_t version;
+    std::uint64_t entry, segments, sections;
+    std::uint32_t flags;
+    std::uint16_t headerSize, segmentSize, segmentCount, sectionSize, sectionCount, names;
+};
+
+struct Segment {
+    std::uint32_t type, flags;
+    std::uint64_t offset, address, physical, fileSize, memorySize, alignment;
+};
+
+struct Dynamic {
+    std::int64_t tag;
+    std::uint64_t value;
+};
+
+struct Symbol {
+    std::uint32_t name;
+    unsigned char info, other;
+    std::uint16_t section;
+    std::uint64_t value, size;
+};
+
+constexpr std::uint16_t executable = 2, shared = 3;
+constexpr std::uint16_t x86_64 = 62;
+constexpr std::uint32_t loadSegment = 1, dynamicSegment = 2;
+
+/// Limits that no real library comes near; they bound the work that a hostile one can cause.
+constexpr std::size_t maximumSegments = 1024;
+constexpr std::size_t maximumDynamicEntries = 4096;
+constexpr std::size_t maximumNeeded = 1024;
+constexpr std::size_t maximumChainLength = 4096;
+
+std::wstring processorName(std::uint16_t machine, bool narrow) {
+    switch (machine) {
+    case 3: return L"x86, 32 bits";
+    case 40: return L"ARM, 32 bits";
+    case 183: return L"ARM, 64 bits";
+    case 243: return L"RISC-V";
+    case x86_64: return narrow ? L"x86-64 with 32-bit addresses" : L"x86-64";
+    default: return L"number " + std::to_wstring(machine);
+    }
+}
+
+class ElfReader {
+  public:
+    ElfReader(FileBytes& bytes, LibraryImage& result) : file(bytes), image(result) {}
+
+    void read() {
+        image.format = ImageFormat::elf;
+        if (!readHeader() || !image.otherProcessor.empty() ||
+            image.kind == LibraryImage::Kind::other)
+            return;
+        if (!readSegments() || !readDynamic())
+            return;
+        if (program || image.kind == LibraryImage::Kind::program)
+            image.kind = LibraryImage::Kind::program;
+        else
+            findEntryPoint();
+    }
+
+  private:
+    bool damaged(const wchar_t* what) {
+        image.damage = what;
+        return false;
+    }
+
+    bool readHeader() {
+        const auto identity = file.read<Identity>(0);
+        const auto type = file.read<std::uint16_t>(16);
+        const auto machine = file.read<std::uint16_t>(18);
+        if (!identity || !type || !machine)
+            return damaged(L"the header is cut off");
+        const bool littleEndian = identity->byteOrder == 1;
+        const auto ordered = [&](std::uint16_t value) {
+            return littleEndian ? value : static_cast<std::uint16_t>(value << 8 | value >> 8);
+        };
+        if (ordered(*type) == shared)
+            image.kind = LibraryImage::Kind::library;
+        else if (ordered(*type) == executable)
+            image.kind = LibraryImage::Kind::program;
+        if (ordered(*machine) != x86_64 || identity->wordSize != 2 || !littleEndian) {
+            image.otherProcessor = processorName(ordered(*machine), identity->wordSize != 2);
+            return true;
+        }
+        const auto whole = file.read<Header>(0);
+        if (!whole)
+            return damaged(L"the header is cut off");
+        header = *whole;
+        return true;
+    }
+
+    bool readSegments() {
+        if (header.segmentSize != sizeof(Segment) || header.segmentCount > maximumSegments)
+            return damaged(L"the table of segments makes no sense");
+        // The section headers stand at the end, as a rule: a file that was cut off lacks them.
+        if (!file.reaches(header.sections, header.sectionCount * std::uint64_t{header.sectionSize}))
+            return damaged(L"the end is missing");
+        for (std::size_t index = 0; index < header.segmentCount; ++index) {
+            const auto segment = file.read<Segment>(header.segments + index * sizeof(Segment));
+            if (!segment)
+                return damaged(L"the table of segments is cut off");
+            if (segment->type == loadSegment) {
+                if (!file.reaches(segment->offset, segment->fileSize))
+                    return damaged(L"a part that is to be loaded is missing");
+                loaded.push_back(*segment);
+            } else if (segment->type == dynamicSegment) {
+                dynamic = *segment;
+            }
+        }
+        if (!dynamic && image.kind == LibraryImage::Kind::library)
+            return damaged(L"it has no table of symbols");
+        return dynamic.has_value();
+    }
+
+    bool readDynamic() {
+        std::vector<std::uint64_t> neededNames, rpaths, runpaths;
+        const std::size_t count =
+            std::min<std::uint64_t>(dynamic->fileSize / sizeof(Dynamic), maximumDynamicEntries);
+        for (std::size_t index = 0; index < count; ++index) {
+            const auto entry = file.read<Dynamic>(dynamic->offset + index * sizeof(Dynamic));
+            if (!entry)
+                return damaged(L"its dynamic section is cut off");
+            if (entry->tag == 0)
+                break;
+            note(*entry, neededNames, rpaths, runpaths);
+        }
+        neededNames.resize(std::min(neededNames.size(), maximumNeeded));
+        return readNames(neededNames, image.needed) && readFolders(rpaths, image.rpath) &&
+               readFolders(runpaths, image.runpath);
+    }
+
+    void note(const Dynamic& entry, std::vector<std::uint64_t>& neededNames,
+              std::vector<std::uint64_t>& rpaths, std::vector<std::uint64_t>& runpaths) {
+        switch (entry.tag) {
+        case 1: neededNames.push_back(entry.value); break;
+        case 4: hash = entry.value; break;
+        case 5: strings = entry.value; break;
+        case 6: symbols = entry.value; break;
+        case 10: stringsSize = entry.value; break;
+        case 15: rpaths.push_back(entry.value); break;
+        case 29: runpaths.push_back(entry.value); break;
+        case 0x6FFFFEF5: gnuHash = entry.value; break;
+        case 0x6FFFFFFB: program = (entry.value & 0x08000000) != 0; break;
+        default: break;
+        }
+    }
+
+    std::optional<std::string> name(std::uint64_t position) {
+        if (position >= stringsSize)
+            return std::nullopt;
+        const auto offset = offsetOf(strings + position, 1);
+        return offset ? file.text(*offset) : std::nullopt;
+    }
+
+    bool readNames(const std::vector<std::uint64_t>& positions, std::vector<std::string>& names) {
+        for (const std::uint64_t position : positions) {
+            const auto text = name(position);
+            if (!text)
+                return damaged(L"the name of a library that it needs is missing");
+            names.push_back(*text);
+        }
+        return true;
+    }
+
+    bool readFolders(const std::vector<std::uint64_t>& positions,
+                     std::vector<std::string>& folders) {
+        std::vector<std::string> lists;
+        if (!readNames(positions, lists))
+            return false;
+        for (const std::string& list : lists)
+            for (std::string_view rest = list; !rest.empty();) {
+                const std::string_view folder = rest.substr(0, rest.find(':'));
+                if (!folder.empty())
+                    folders.emplace_back(folder);
+                rest.remove_prefix(std::min(folder.size() + 1, rest.size()));
+            }
+        return true;
+    }
+
+    std::optional<std::uint64_t> offsetOf(std::uint64_t address, std::size_t size) const {
+        for (const Segment& segment : loaded) {
+            if (address < segment.address)
+                continue;
+            const std::uint64_t inside = address - segment.address;
+            if (inside <= segment.fileSize && size <= segment.fileSize - inside)
+                return segment.offset + inside;
+        }
+        return std::nullopt;
+    }
+
+    template <class T>
+    std::optional<T> readAt(std::uint64_t address) {
+        const auto offset = offsetOf(address, sizeof(T));
+        return offset ? file.read<T>(*offset) : std::nullopt;
+    }
+
+    void findEntryPoint() {
+        if (!symbols || !strings || (!gnuHash && !hash)) {
+            damaged(L"it has no table of symbols");
+            return;
+        }
+        if (gnuHash)
+            findByGnuHash(entryPointName);
+        else
+            findByHash(entryPointName);
+    }
+
+    void findByGnuHash(std::string_view wanted) {
+        struct Table {
+            std::uint32_t bucketCount, firstSymbol, bloomCount, bloomShift;
+        };
+        const auto table = readAt<Table>(gnuHash);
+        if (!table || !table->bucketCount)
+            return;
+        std::uint32_t code = 5381;
+        for (const char c : wanted)
+            code = code * 33 + static_cast<unsigned char>(c);
+        const std::uint64_t buckets = gnuHash + sizeof(Table) + table->bloomCount * 8ull;
+        const std::uint64_t chains = buckets + table->bucketCount * 4ull;
+        const auto bucket = readAt<std::uint32_t>(buckets + code % table->bucketCount * 4ull);
+        if (!bucket || *bucket < table->firstSymbol)
+            return;
+        for (std::size_t step = 0; step < maximumChainLength; ++step) {
+            const std::uint64_t index = *bucket + step;
+            const auto entry = readAt<std::uint32_t>(chains + (index - table->firstSymbol) * 4);
+            if (!entry || ((*entry | 1) == (code | 1) && isEntryPoint(index)) || (*entry & 1))
+                return;
+        }
+    }
+
+    void findByHash(std::string_view wanted) {
+        struct Table {
+            std::uint32_t bucketCount, chainCount;
+        };
+        const auto table = readAt<Table>(hash);
+        if (!table || !table->bucketCount)
+            return;
+        std::uint32_t code = 0;
+        for (const char c : wanted) {
+            code = (code << 4) + static_cast<unsigned char>(c);
+            code = (code ^ (code >> 28 << 28) >> 24) & 0x0FFFFFFF;
+        }
+        const std::uint64_t buckets = hash + sizeof(Table);
+        const std::uint64_t chains = buckets + table->bucketCount * 4ull;
+        auto index = readAt<std::uint32_t>(buckets + code % table->bucketCount * 4ull);
+        for (std::size_t step = 0; index && *index && step < maximumChainLength; ++step) {
+            if (isEntryPoint(*index))
+                return;
+            index = readAt<std::uint32_t>(chains + *index * 4ull);
+        }
+    }
+
+    /// Whether the symbol is the one sought, and defined here for others to see; notes it if so.
+    bool isEntryPoint(std::uint64_t index) {
+        const auto symbol = readAt<Symbol>(symbols + index * sizeof(Symbol));
+        if (!symbol || symbol->section == 0 || name(symbol->name) != entryPointName)
+            return false;
+        const unsigned int type = symbol->info & 15, binding = symbol->info >> 4;
+        const unsigned int visibility = symbol->other & 3;
+        if (binding == 0 || visibility == 1 || visibility == 2)
+            return false;
+        // Functions written in assembly often carry no type; one may be chosen at load time.
+        const bool function = type == 0 || type == 2 || type == 10;
+        image.entryPoint =
+            function ? LibraryImage::EntryPoint::function : LibraryImage::EntryPoint::noFunction;
+        return true;
+    }
+
+    FileBytes& file;
+    LibraryImage& image;
+    Header header{};
+    std::vector<Segment> loaded;
+    std::optional<Segment> dynamic;
+    bool program = false;
+    std::uint64_t symbols = 0, strings = 0, stringsSize = 0, hash = 0, gnuHash = 0;
+};
+
+} // namespace
+
+void readElfImage(FileBytes& file, LibraryImage& image) {
+    ElfReader(file, image).read();
+}
+
+} // namespace Mz::Tools

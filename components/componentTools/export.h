@@ -1,0 +1,10 @@
+/// How the names of libMZcomponentTools enter and leave it.
+#pragma once
+
+#include "components/base/export.h"
+
+#ifdef MZ_BUILDING_COMPONENT_TOOLS
+#define MZ_COMPONENT_TOOLS_API MZ_EXPORT
+#else
+#define MZ_COMPONENT_TOOLS_API MZ_IMPORT
+#endif

@@ -1,0 +1,208 @@
+#include "components/componentTools/platform/system.h"
+
+#include <algorithm>
+#include <cerrno>
+#include <csignal>
+#include <cstring>
+#include <fcntl.h>
+#include <fstream>
+#include <poll.h>
+#include <spawn.h>
+#include <sys/resource.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+namespace Mz::Tools::System {
+
+namespace {
+
+using Clock = std::chrono::steady_clock;
+
+/// How long the parent sleeps before it looks at the child's memory again, in milliseconds.
+constexpr int pause = 10;
+
+class Descriptor {
+  public:
+    explicit Descriptor(int number) : value(number) {}
+    ~Descriptor() { close(); }
+    Descriptor(const Descriptor&) = delete;
+    Descriptor& operator=(const Descriptor&) = delete;
+    int get() const { return value; }
+    void close() {
+        if (value >= 0)
+            ::close(value);
+        value = -1;
+    }
+
+  private:
+    int value;
+};
+
+/// Starts the program in a process group of its own; 0, or the number of what went wrong.
+int start(const NativePath& program, const std::vector<NativePath>& arguments, int output,
+          pid_t& child) {
+    std::vector<char*> pointers{const_cast<char*>(program.c_str())};
+    for (const NativePath& argument : arguments)
+        pointers.push_back(const_cast<char*>(argument.c_str()));
+    pointers.push_back(nullptr);
+
+    posix_spawn_file_actions_t actions;
+    ::posix_spawn_file_actions_init(&actions);
+    ::posix_spawn_file_actions_addopen(&actions, STDIN_FILENO, "/dev/null", O_RDONLY, 0);
+    ::posix_spawn_file_actions_adddup2(&actions, output, STDOUT_FILENO);
+    ::posix_spawn_file_actions_addopen(&actions, STDERR_FILENO, "/dev/null", O_WRONLY, 0);
+    posix_spawnattr_t attributes;
+    ::posix_spawnattr_init(&attributes);
+    sigset_t signals;
+    ::sigemptyset(&signals);
+    ::posix_spawnattr_setsigmask(&attributes, &signals);
+    ::sigfillset(&signals);
+    ::posix_spawnattr_setsigdefault(&attributes, &signals);
+    ::posix_spawnattr_setpgroup(&attributes, 0);
+    ::posix_spawnattr_setflags(&attributes, POSIX_SPAWN_SETPGROUP | POSIX_SPAWN_SETSIGMASK |
+                                                POSIX_SPAWN_SETSIGDEF);
+    const int failure =
+        ::posix_spawn(&child, program.c_str(), &actions, &attributes, pointers.data(), environ);
+    ::posix_spawnattr_destroy(&attributes);
+    ::posix_spawn_file_actions_destroy(&actions);
+    return failure;
+}
+
+/// What the process really uses, in bytes; 0 when it has gone.
+std::uint64_t memoryOf(pid_t process) {
+    std::ifstream file("/proc/" + std::to_string(process) + "/statm");
+    std::uint64_t all = 0, resident = 0;
+    file >> all >> resident;
+    return resident * static_cast<std::uint64_t>(::sysconf(_SC_PAGESIZE));
+}
+
+const wchar_t* signalName(int number) {
+    switch (number) {
+    case SIGSEGV: return L"access to memory that is not there (SIGSEGV)";
+    case SIGBUS: return L"access to memory that has no content (SIGBUS)";
+    case SIGILL: return L"an instruction that does not exist (SIGILL)";
+    case SIGFPE: return L"an arithmetic fault (SIGFPE)";
+    case SIGABRT: return L"abort (SIGABRT)";
+    case SIGTRAP: return L"a breakpoint (SIGTRAP)";
+    case SIGKILL: return L"killed from outside (SIGKILL)";
+    default: return nullptr;
+    }
+}
+
+/// One child from its start to its end.
+class Watch {
+  public:
+    Watch(pid_t process, int pipe, const ChildLimits& allowed)
+        : child(process), output(pipe), limits(allowed), end(Clock::now() + allowed.time) {}
+
+    ChildResult result() {
+        int status = 0;
+        rusage usage{};
+        while (!over(status, usage)) {
+            waitForOutput();
+            readOutput();
+            judge();
+        }
+        readOutput();
+        // What the child has started goes as well.
+        ::kill(-child, SIGKILL);
+        if (judged)
+            return std::move(judgement);
+        // In kilobytes; the end may have come between two looks.
+        if (static_cast<std::uint64_t>(usage.ru_maxrss) * 1024 >= limits.memory)
+            judgement.end = ChildResult::End::outOfMemory;
+        else if (WIFSIGNALED(status))
+            noteSignal(WTERMSIG(status));
+        else
+            noteExit(WEXITSTATUS(status));
+        return std::move(judgement);
+    }
+
+  private:
+    bool over(int& status, rusage& usage) {
+        const pid_t ended = ::wait4(child, &status, judged ? 0 : WNOHANG, &usage);
+        return ended == child || (ended < 0 && errno != EINTR);
+    }
+
+    void waitForOutput() {
+        pollfd wanted{output, POLLIN, 0};
+        // A closed pipe is always ready, so wait for nothing then.
+        ::poll(closed ? nullptr : &wanted, closed ? 0 : 1, pause);
+    }
+
+    void readOutput() {
+        char block[65536];
+        while (!closed && judgement.output.size() <= limits.output) {
+            const ssize_t got = ::read(output, block, sizeof block);
+            if (got > 0)
+                judgement.output.append(block, static_cast<std::size_t>(got));
+            else if (got == 0 || (errno != EINTR && errno != EAGAIN))
+                closed = true;
+            else if (errno == EAGAIN)
+                return;
+        }
+    }
+
+    void judge() {
+        if (judged)
+            return;
+        if (limits.interrupted && limits.interrupted())
+            stop(ChildResult::End::interrupted);
+        else if (memoryOf(child) >= limits.memory)
+            stop(ChildResult::End::outOfMemory);
+        else if (judgement.output.size() > limits.output)
+            stop(ChildResult::End::tooMuchOutput);
+        else if (Clock::now() >= end)
+            stop(ChildResult::End::timedOut);
+    }
+
+    void stop(ChildResult::End reason) {
+        judgement.end = reason;
+        judged = true;
+        ::kill(-child, SIGKILL);
+    }
+
+    void noteSignal(int number) {
+        judgement.end = ChildResult::End::crashed;
+        const wchar_t* name = signalName(number);
+        judgement.words = name ? name : L"signal " + std::to_wstring(number);
+    }
+
+    void noteExit(int status) {
+        judgement.end = ChildResult::End::exited;
+        judgement.status = status;
+    }
+
+    pid_t child;
+    int output;
+    const ChildLimits& limits;
+    Clock::time_point end;
+    ChildResult judgement;
+    bool judged = false;
+    bool closed = false;
+};
+
+} // namespace
+
+ChildResult runChild(const NativePath& program, const std::vector<NativePath>& arguments,
+                     const ChildLimits& limits) {
+    ChildResult failed;
+    int ends[2];
+    if (::pipe2(ends, O_CLOEXEC) != 0) {
+        failed.words = displayName(std::strerror(errno));
+        return failed;
+    }
+    const Descriptor output(ends[0]);
+    Descriptor input(ends[1]);
+    ::fcntl(output.get(), F_SETFL, O_NONBLOCK);
+    pid_t child = 0;
+    const int failure = start(program, arguments, input.get(), child);
+    input.close();
+    if (failure) {
+        failed.words = displayName(program) + L": " + displayName(std::strerror(failure));
+        return failed;
+    }
+    return Watch(child, output.get(), limits).result();
+}
+
+} // namespace Mz::Tools::System

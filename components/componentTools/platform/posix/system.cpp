@@ -1,0 +1,233 @@
+#include "components/componentTools/platform/system.h"
+
+#include "components/componentManager/platform/characters.h"
+#include "components/componentTools/platform/posix/loaderCache.h"
+
+#include <cerrno>
+#include <csignal>
+#include <cstdlib>
+#include <cstring>
+#include <dlfcn.h>
+#include <fcntl.h>
+#include <sys/prctl.h>
+#include <sys/resource.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+namespace Mz::Tools::System {
+
+namespace {
+
+bool isFile(const NativePath& path) {
+    struct stat status;
+    return ::stat(path.c_str(), &status) == 0 && S_ISREG(status.st_mode);
+}
+
+bool isLoaded(const std::string& name) {
+    void* const module = ::dlopen(name.c_str(), RTLD_LAZY | RTLD_LOCAL | RTLD_NOLOAD);
+    if (module)
+        ::dlclose(module);
+    else
+        ::dlerror();
+    return module != nullptr;
+}
+
+/// `folder` with the loader's own variables filled in.
+std::string expanded(std::string folder, const NativePath& library) {
+    const std::pair<const char*, std::string> variables[] = {
+        {"$ORIGIN", library.parent_path().string()},
+        {"${ORIGIN}", library.parent_path().string()},
+        {"$LIB", "lib/x86_64-linux-gnu"},
+        {"${LIB}", "lib/x86_64-linux-gnu"},
+        {"$PLATFORM", "x86_64"},
+        {"${PLATFORM}", "x86_64"}};
+    for (const auto& [variable, value] : variables)
+        for (std::size_t at = 0; (at = folder.find(variable, at)) != std::string::npos;
+             at += value.size())
+            folder.replace(at, std::strlen(variable), value);
+    return folder;
+}
+
+std::vector<std::string> foldersOfEnvironment() {
+    std::vector<std::string> folders;
+    const char* list = std::getenv("LD_LIBRARY_PATH");
+    for (std::string rest = list ? list : ""; !rest.empty();) {
+        const std::size_t end = rest.find_first_of(":;");
+        folders.push_back(end == 0 ? "." : rest.substr(0, end));
+        rest.erase(0, end == std::string::npos ? end : end + 1);
+    }
+    return folders;
+}
+
+} // namespace
+
+std::wstring displayName(const NativePath& path) {
+    const platform::CharacterConverter converter;
+    std::wstring result;
+    for (std::string_view rest = path.native(); !rest.empty();) {
+        wchar_t character;
+        const int length = converter.decode(rest, character);
+        if (length > 0) {
+            result += character;
+        } else {
+            constexpr const wchar_t* digits = L"0123456789ABCDEF";
+            const auto byte = static_cast<unsigned char>(rest.front());
+            result += L"\\x";
+            result += digits[byte >> 4];
+            result += digits[byte & 15];
+        }
+        rest.remove_prefix(length > 0 ? static_cast<std::size_t>(length) : 1);
+    }
+    return result;
+}
+
+std::optional<std::wstring> nameText(const NativePath& path) {
+    return platform::toCharacters(path.native());
+}
+
+std::string encode(const std::wstring& text, int) {
+    const platform::CharacterConverter converter;
+    std::string result;
+    for (const wchar_t character : text) {
+        char bytes[platform::maximumCharacterBytes];
+        const int length = converter.encode(character, bytes);
+        if (length > 0)
+            result.append(bytes, static_cast<std::size_t>(length));
+        else
+            result += '?';
+    }
+    return result;
+}
+
+std::vector<std::string> arguments(int count, char** values) {
+    return {values + (count > 0 ? 1 : 0), values + count};
+}
+
+NativePath pathOfArgument(const std::string& argument) {
+    return argument;
+}
+
+ImageFormat ownFormat() {
+    return ImageFormat::elf;
+}
+
+FileAttributes fileAttributes(const NativePath& path) {
+    struct stat status;
+    FileAttributes attributes;
+    attributes.hidden = path.filename().native().starts_with('.');
+    attributes.directory = ::stat(path.c_str(), &status) == 0 && S_ISDIR(status.st_mode);
+    return attributes;
+}
+
+const wchar_t* loaderPathVariable() {
+    return L"LD_LIBRARY_PATH";
+}
+
+Located findDependency(const std::string& name, const NativePath& library,
+                       const LibraryImage& image, const NativePath&) {
+    if (name.find('/') != std::string::npos)
+        return {isFile(name), name};
+    std::vector<std::string> folders;
+    if (image.runpath.empty())
+        folders = image.rpath;
+    for (const std::string& folder : foldersOfEnvironment())
+        folders.push_back(folder);
+    folders.insert(folders.end(), image.runpath.begin(), image.runpath.end());
+    for (const std::string& folder : folders) {
+        const NativePath file = NativePath(expanded(folder, library)) / name;
+        if (isFile(file))
+            return {true, file};
+    }
+    if (const std::optional<std::string> file = findInLoaderCache(name); file && isFile(*file))
+        return {true, *file};
+    for (const char* folder : {"/lib/x86_64-linux-gnu", "/usr/lib/x86_64-linux-gnu", "/lib64",
+                               "/usr/lib64", "/lib", "/usr/lib"})
+        if (isFile(NativePath(folder) / name))
+            return {true, NativePath(folder) / name};
+    // What the host has loaded already serves as well, wherever it came from.
+    return {isLoaded(name), {}};
+}
+
+std::wstring loaderWords(const NativePath& path) {
+    ::dlerror();
+    if (::dlopen(path.c_str(), RTLD_NOW | RTLD_LOCAL))
+        return L"it loads at the second attempt";
+    const char* words = ::dlerror();
+    return displayName(words ? words : "");
+}
+
+NativePath ownFolder() {
+    Dl_info info;
+    if (::dladdr(reinterpret_cast<const void*>(&ownFolder), &info) == 0 || !info.dli_fname)
+        return {};
+    std::error_code failure;
+    const NativePath file = std::filesystem::canonical(info.dli_fname, failure);
+    return failure ? NativePath() : file.parent_path();
+}
+
+NativePath findProgram(const std::string& name) {
+    const char* list = std::getenv("PATH");
+    for (std::string rest = list ? list : ""; !rest.empty();) {
+        const std::size_t end = rest.find(':');
+        const NativePath program = NativePath(rest.substr(0, end)) / name;
+        if (program.is_absolute() && isFile(program) && ::access(program.c_str(), X_OK) == 0)
+            return program;
+        rest.erase(0, end == std::string::npos ? end : end + 1);
+    }
+    return {};
+}
+
+const char* programExtension() {
+    return "";
+}
+
+AnswerPipe::AnswerPipe() {
+    // A high number, which nobody meets by counting.
+    handle = ::fcntl(STDOUT_FILENO, F_DUPFD_CLOEXEC, 500);
+    const int nowhere = ::open("/dev/null", O_RDWR);
+    if (nowhere >= 0) {
+        ::dup2(nowhere, STDOUT_FILENO);
+        ::dup2(nowhere, STDERR_FILENO);
+        ::close(nowhere);
+    }
+}
+
+void AnswerPipe::write(const char* data, std::size_t size) {
+    while (size > 0) {
+        const ssize_t written = ::write(static_cast<int>(handle), data, size);
+        if (written > 0) {
+            data += written;
+            size -= static_cast<std::size_t>(written);
+        } else if (written == 0 || errno != EINTR) {
+            return;
+        }
+    }
+}
+
+void confine(std::uint64_t memory) {
+    ::prctl(PR_SET_PDEATHSIG, SIGKILL);
+    ::prctl(PR_SET_DUMPABLE, 0);
+    const rlimit noDump{0, 0};
+    ::setrlimit(RLIMIT_CORE, &noDump);
+    // The parent watches what is really used. This is for what is asked for faster than it looks;
+    // a process has far more addresses than memory.
+    if (memory && addressSpaceMayBeLimited) {
+        const rlim_t most = static_cast<rlim_t>(memory) * 2 + (rlim_t{1} << 30);
+        const rlimit addresses{most, most};
+        ::setrlimit(RLIMIT_AS, &addresses);
+    }
+}
+
+void endProcess(int status) {
+    ::_exit(status);
+}
+
+std::wstring passedFault() {
+    return {};
+}
+
+unsigned long processNumber() {
+    return static_cast<unsigned long>(::getpid());
+}
+
+} // namespace Mz::Tools::System

@@ -1,0 +1,238 @@
+#include "components/componentTools/platform/system.h"
+
+#include "components/componentManager/platform/platform.h"
+
+#include "components/componentTools/platform/windows/faultName.h"
+
+#include <algorithm>
+#include <windows.h>
+
+#include <psapi.h>
+
+namespace Mz::Tools::System {
+
+namespace {
+
+using Clock = std::chrono::steady_clock;
+
+/// How long the parent sleeps before it looks at the child again, in milliseconds.
+constexpr DWORD pause = 10;
+
+class Handle {
+  public:
+    explicit Handle(HANDLE handle = nullptr) : value(handle) {}
+    ~Handle() { close(); }
+    Handle(const Handle&) = delete;
+    Handle& operator=(const Handle&) = delete;
+    HANDLE get() const { return value; }
+    HANDLE* out() { return &value; }
+    explicit operator bool() const { return value && value != INVALID_HANDLE_VALUE; }
+    void close() {
+        if (*this)
+            ::CloseHandle(value);
+        value = nullptr;
+    }
+
+  private:
+    HANDLE value;
+};
+
+/// `argument` as programs take it out of a command line again.
+std::wstring quoted(const std::wstring& argument) {
+    std::wstring result = L"\"";
+    std::size_t slashes = 0;
+    for (const wchar_t character : argument) {
+        if (character == L'"')
+            result.append(slashes + 1, L'\\');
+        slashes = character == L'\\' ? slashes + 1 : 0;
+        result += character;
+    }
+    result.append(slashes, L'\\');
+    return result + L'"';
+}
+
+/// The list of handles that a child is to inherit, and no others.
+class Inherited {
+  public:
+    explicit Inherited(std::vector<HANDLE> wanted) : handles(std::move(wanted)) {
+        SIZE_T size = 0;
+        ::InitializeProcThreadAttributeList(nullptr, 1, 0, &size);
+        memory.resize(size);
+        list = reinterpret_cast<LPPROC_THREAD_ATTRIBUTE_LIST>(memory.data());
+        ::InitializeProcThreadAttributeList(list, 1, 0, &size);
+        ::UpdateProcThreadAttribute(list, 0, PROC_THREAD_ATTRIBUTE_HANDLE_LIST, handles.data(),
+                                    handles.size() * sizeof(HANDLE), nullptr, nullptr);
+    }
+    ~Inherited() { ::DeleteProcThreadAttributeList(list); }
+    Inherited(const Inherited&) = delete;
+    Inherited& operator=(const Inherited&) = delete;
+    LPPROC_THREAD_ATTRIBUTE_LIST get() const { return list; }
+
+  private:
+    std::vector<HANDLE> handles;
+    std::vector<char> memory;
+    LPPROC_THREAD_ATTRIBUTE_LIST list;
+};
+
+/// A job that takes what is in it along when it ends, and lets it take twice the memory allowed:
+/// the parent watches what is really used.
+HANDLE newJob(std::uint64_t memory) {
+    const HANDLE job = ::CreateJobObjectW(nullptr, nullptr);
+    JOBOBJECT_EXTENDED_LIMIT_INFORMATION limit{};
+    limit.BasicLimitInformation.LimitFlags = JOB_OBJECT_LIMIT_KILL_ON_JOB_CLOSE |
+                                             JOB_OBJECT_LIMIT_DIE_ON_UNHANDLED_EXCEPTION |
+                                             JOB_OBJECT_LIMIT_PROCESS_MEMORY;
+    limit.ProcessMemoryLimit = static_cast<SIZE_T>(memory) * 2;
+    ::SetInformationJobObject(job, JobObjectExtendedLimitInformation, &limit, sizeof limit);
+    return job;
+}
+
+bool start(const NativePath& program, const std::vector<NativePath>& arguments, HANDLE output,
+           HANDLE job, PROCESS_INFORMATION& process) {
+    std::wstring commandLine = quoted(program.native());
+    for (const NativePath& argument : arguments)
+        commandLine += L" " + quoted(argument.native());
+    SECURITY_ATTRIBUTES inheritable{sizeof inheritable, nullptr, TRUE};
+    const Handle nowhere(::CreateFileW(L"NUL", GENERIC_READ | GENERIC_WRITE,
+                                       FILE_SHARE_READ | FILE_SHARE_WRITE, &inheritable,
+                                       OPEN_EXISTING, 0, nullptr));
+    const Inherited inherited({output, nowhere.get()});
+    STARTUPINFOEXW startup{};
+    startup.StartupInfo.cb = sizeof startup;
+    startup.StartupInfo.dwFlags = STARTF_USESTDHANDLES;
+    startup.StartupInfo.hStdInput = nowhere.get();
+    startup.StartupInfo.hStdOutput = output;
+    startup.StartupInfo.hStdError = nowhere.get();
+    startup.lpAttributeList = inherited.get();
+    constexpr DWORD flags = CREATE_SUSPENDED | CREATE_NO_WINDOW | CREATE_NEW_PROCESS_GROUP |
+                            EXTENDED_STARTUPINFO_PRESENT;
+    const platform::QuietErrors quiet; // The child has our error mode from its first moment on.
+    if (!::CreateProcessW(program.c_str(), commandLine.data(), nullptr, nullptr, TRUE, flags,
+                          nullptr, nullptr, &startup.StartupInfo, &process))
+        return false;
+    ::AssignProcessToJobObject(job, process.hProcess);
+    ::ResumeThread(process.hThread);
+    return true;
+}
+
+/// One child from its start to its end.
+class Watch {
+  public:
+    Watch(HANDLE process, HANDLE pipe, const ChildLimits& allowed)
+        : child(process), output(pipe), limits(allowed), end(Clock::now() + allowed.time) {}
+
+    ChildResult result() {
+        while (::WaitForSingleObject(child, readOutput() ? 0 : pause) == WAIT_TIMEOUT)
+            judge();
+        readOutput();
+        if (judged)
+            return std::move(judgement);
+        DWORD status = 0;
+        ::GetExitCodeProcess(child, &status);
+        // Programs end with small numbers, the system ends them with those of faults.
+        constexpr DWORD firstFault = 0x80000000;
+        if (mostMemory() >= limits.memory) {
+            judgement.end = ChildResult::End::outOfMemory;
+        } else if (status >= firstFault) {
+            judgement.end = ChildResult::End::crashed;
+            judgement.words = faultName(status);
+        } else {
+            judgement.end = ChildResult::End::exited;
+            judgement.status = static_cast<int>(status);
+        }
+        return std::move(judgement);
+    }
+
+  private:
+    /// Takes what there is; whether there was anything.
+    bool readOutput() {
+        bool any = false;
+        char block[65536];
+        DWORD waiting = 0, got = 0;
+        while (judgement.output.size() <= limits.output &&
+               ::PeekNamedPipe(output, nullptr, 0, nullptr, &waiting, nullptr) && waiting > 0 &&
+               ::ReadFile(output, block, sizeof block, &got, nullptr) && got > 0) {
+            judgement.output.append(block, got);
+            any = true;
+        }
+        return any;
+    }
+
+    std::uint64_t mostMemory() {
+        PROCESS_MEMORY_COUNTERS counters{};
+        counters.cb = sizeof counters;
+        if (::K32GetProcessMemoryInfo(child, &counters, sizeof counters))
+            most = std::max<std::uint64_t>({most, counters.PagefileUsage, counters.WorkingSetSize,
+                                            counters.PeakWorkingSetSize});
+        return most;
+    }
+
+    void judge() {
+        if (judged)
+            return;
+        if (limits.interrupted && limits.interrupted())
+            stop(ChildResult::End::interrupted);
+        else if (mostMemory() >= limits.memory)
+            stop(ChildResult::End::outOfMemory);
+        else if (judgement.output.size() > limits.output)
+            stop(ChildResult::End::tooMuchOutput);
+        else if (Clock::now() >= end)
+            stop(ChildResult::End::timedOut);
+    }
+
+    void stop(ChildResult::End reason) {
+        judgement.end = reason;
+        judged = true;
+        ::TerminateProcess(child, 1);
+    }
+
+    HANDLE child;
+    HANDLE output;
+    const ChildLimits& limits;
+    Clock::time_point end;
+    ChildResult judgement;
+    std::uint64_t most = 0;
+    bool judged = false;
+};
+
+} // namespace
+
+std::wstring faultName(unsigned long code) {
+    switch (code) {
+    case EXCEPTION_ACCESS_VIOLATION: return L"access to memory that is not there (0xC0000005)";
+    case EXCEPTION_IN_PAGE_ERROR: return L"access to memory that has no content (0xC0000006)";
+    case EXCEPTION_ILLEGAL_INSTRUCTION: return L"an instruction that does not exist (0xC000001D)";
+    case EXCEPTION_PRIV_INSTRUCTION: return L"an instruction that is forbidden (0xC0000096)";
+    case EXCEPTION_INT_DIVIDE_BY_ZERO: return L"an arithmetic fault (0xC0000094)";
+    case EXCEPTION_STACK_OVERFLOW: return L"the stack is used up (0xC00000FD)";
+    case EXCEPTION_BREAKPOINT: return L"a breakpoint (0x80000003)";
+    default: break;
+    }
+    std::wstring digits;
+    for (int shift = 28; shift >= 0; shift -= 4)
+        digits += L"0123456789ABCDEF"[code >> shift & 15];
+    return L"0x" + digits;
+}
+
+ChildResult runChild(const NativePath& program, const std::vector<NativePath>& arguments,
+                     const ChildLimits& limits) {
+    ChildResult failed;
+    SECURITY_ATTRIBUTES inheritable{sizeof inheritable, nullptr, TRUE};
+    Handle output, input;
+    if (!::CreatePipe(output.out(), input.out(), &inheritable, 65536)) {
+        failed.words = L"no pipe";
+        return failed;
+    }
+    ::SetHandleInformation(output.get(), HANDLE_FLAG_INHERIT, 0);
+    const Handle job(newJob(limits.memory));
+    PROCESS_INFORMATION process{};
+    if (!start(program, arguments, input.get(), job.get(), process)) {
+        failed.words = displayName(program) + L": error " + std::to_wstring(::GetLastError());
+        return failed;
+    }
+    const Handle child(process.hProcess), thread(process.hThread);
+    input.close();
+    return Watch(child.get(), output.get(), limits).result();
+}
+
+} // namespace Mz::Tools::System

@@ -1,0 +1,228 @@
+#include "components/componentTools/platform/system.h"
+
+#include "components/componentManager/platform/platform.h"
+
+#include "components/componentTools/platform/windows/faultName.h"
+
+#include <atomic>
+#include <fcntl.h>
+#include <io.h>
+#include <windows.h>
+
+#include <shellapi.h>
+
+namespace Mz::Tools::System {
+
+namespace {
+
+std::string toBytes(const std::wstring& text, UINT encoding) {
+    const int length = static_cast<int>(text.size());
+    const int size =
+        ::WideCharToMultiByte(encoding, 0, text.data(), length, nullptr, 0, nullptr, nullptr);
+    std::string bytes(static_cast<std::size_t>(size), '\0');
+    ::WideCharToMultiByte(encoding, 0, text.data(), length, bytes.data(), size, nullptr, nullptr);
+    return bytes;
+}
+
+std::wstring toCharacters(const std::string& bytes, UINT encoding) {
+    const int length = static_cast<int>(bytes.size());
+    const int size = ::MultiByteToWideChar(encoding, 0, bytes.data(), length, nullptr, 0);
+    std::wstring text(static_cast<std::size_t>(size), L'\0');
+    ::MultiByteToWideChar(encoding, 0, bytes.data(), length, text.data(), size);
+    return text;
+}
+
+/// Names of interfaces between the system's own libraries, which have no files.
+bool isVirtual(const std::wstring& name) {
+    const std::wstring lower = platform::lowerCase(name);
+    return lower.starts_with(L"api-ms-") || lower.starts_with(L"ext-ms-");
+}
+
+bool isFile(const NativePath& path) {
+    const DWORD attributes = ::GetFileAttributesW(path.c_str());
+    return attributes != INVALID_FILE_ATTRIBUTES && !(attributes & FILE_ATTRIBUTE_DIRECTORY);
+}
+
+/// The last fault in this process that can only be a mistake.
+std::atomic<DWORD> lastFault{0};
+
+bool isFault(DWORD code) {
+    switch (code) {
+    case EXCEPTION_ACCESS_VIOLATION:
+    case EXCEPTION_ILLEGAL_INSTRUCTION:
+    case EXCEPTION_PRIV_INSTRUCTION:
+    case EXCEPTION_IN_PAGE_ERROR:
+    case EXCEPTION_INT_DIVIDE_BY_ZERO:
+    case EXCEPTION_STACK_OVERFLOW: return true;
+    default: return false;
+    }
+}
+
+LONG WINAPI noteFault(EXCEPTION_POINTERS* fault) {
+    const DWORD code = fault->ExceptionRecord->ExceptionCode;
+    if (isFault(code))
+        lastFault = code;
+    return EXCEPTION_CONTINUE_SEARCH;
+}
+
+LONG WINAPI endWithFault(EXCEPTION_POINTERS* fault) {
+    ::TerminateProcess(::GetCurrentProcess(), fault->ExceptionRecord->ExceptionCode);
+    return EXCEPTION_EXECUTE_HANDLER;
+}
+
+} // namespace
+
+std::wstring displayName(const NativePath& path) {
+    return path.wstring();
+}
+
+std::optional<std::wstring> nameText(const NativePath& path) {
+    return path.native();
+}
+
+std::string encode(const std::wstring& text, int stream) {
+    DWORD mode = 0;
+    const HANDLE handle = ::GetStdHandle(stream == 1 ? STD_OUTPUT_HANDLE : STD_ERROR_HANDLE);
+    return toBytes(text, ::GetConsoleMode(handle, &mode) ? ::GetConsoleOutputCP() : CP_ACP);
+}
+
+std::vector<std::string> arguments(int, char**) {
+    std::vector<std::string> result;
+    int count = 0;
+    wchar_t** const values = ::CommandLineToArgvW(::GetCommandLineW(), &count);
+    for (int index = 1; index < count; ++index)
+        result.push_back(toBytes(values[index], CP_UTF8));
+    ::LocalFree(values);
+    return result;
+}
+
+NativePath pathOfArgument(const std::string& argument) {
+    return toCharacters(argument, CP_UTF8);
+}
+
+ImageFormat ownFormat() {
+    return ImageFormat::pe;
+}
+
+FileAttributes fileAttributes(const NativePath& path) {
+    const DWORD attributes = ::GetFileAttributesW(path.c_str());
+    if (attributes == INVALID_FILE_ATTRIBUTES)
+        return {};
+    return {(attributes & FILE_ATTRIBUTE_HIDDEN) != 0, (attributes & FILE_ATTRIBUTE_SYSTEM) != 0,
+            (attributes & FILE_ATTRIBUTE_DIRECTORY) != 0};
+}
+
+const wchar_t* loaderPathVariable() {
+    return L"PATH";
+}
+
+Located findDependency(const std::string& name, const NativePath&, const LibraryImage&,
+                       const NativePath& programFolder) {
+    const std::wstring wide = toCharacters(name, CP_ACP);
+    if (isVirtual(wide))
+        return {true, {}};
+    if (!programFolder.empty() && isFile(programFolder / wide))
+        return {true, programFolder / wide};
+    wchar_t path[32768];
+    const DWORD length = ::SearchPathW(nullptr, wide.c_str(), L".dll", 32768, path, nullptr);
+    if (length > 0 && length < 32768)
+        return {true, path};
+    return {::GetModuleHandleW(wide.c_str()) != nullptr, {}};
+}
+
+namespace {
+
+std::wstring textOfError(DWORD number) {
+    // The loader passes on what its own guard caught: here, the number of a C++ exception.
+    constexpr DWORD exceptionOfCpp = 0x20474343;
+    if (number == exceptionOfCpp)
+        return L"its initialisers let an exception out";
+    wchar_t text[512];
+    DWORD length = ::FormatMessageW(FORMAT_MESSAGE_FROM_SYSTEM | FORMAT_MESSAGE_IGNORE_INSERTS,
+                                    nullptr, number, 0, text, 512, nullptr);
+    while (length > 0 && (text[length - 1] <= L' ' || text[length - 1] == L'.'))
+        --length;
+    return std::wstring(text, length) + L" (" + std::to_wstring(number) + L")";
+}
+
+} // namespace
+
+std::wstring loaderWords(const NativePath& path) {
+    const std::wstring name = path.native() + (path.has_extension() ? L"" : L".");
+    if (::LoadLibraryW(name.c_str()))
+        return L"it loads at the second attempt";
+    return textOfError(::GetLastError());
+}
+
+NativePath ownFolder() {
+    HMODULE module = nullptr;
+    constexpr DWORD flags =
+        GET_MODULE_HANDLE_EX_FLAG_FROM_ADDRESS | GET_MODULE_HANDLE_EX_FLAG_UNCHANGED_REFCOUNT;
+    if (!::GetModuleHandleExW(flags, reinterpret_cast<const wchar_t*>(&ownFolder), &module))
+        return {};
+    wchar_t path[32768];
+    const DWORD length = ::GetModuleFileNameW(module, path, 32768);
+    return NativePath(std::wstring(path, length)).parent_path();
+}
+
+NativePath findProgram(const std::string& name) {
+    wchar_t path[32768];
+    const DWORD length =
+        ::SearchPathW(nullptr, toCharacters(name, CP_ACP).c_str(), L".exe", 32768, path, nullptr);
+    return length > 0 && length < 32768 ? NativePath(path) : NativePath();
+}
+
+const char* programExtension() {
+    return ".exe";
+}
+
+AnswerPipe::AnswerPipe() {
+    HANDLE pipe = INVALID_HANDLE_VALUE;
+    const HANDLE self = ::GetCurrentProcess();
+    ::DuplicateHandle(self, ::GetStdHandle(STD_OUTPUT_HANDLE), self, &pipe, 0, FALSE,
+                      DUPLICATE_SAME_ACCESS);
+    handle = reinterpret_cast<std::intptr_t>(pipe);
+    const int nowhere = ::_open("NUL", _O_WRONLY);
+    if (nowhere >= 0) {
+        ::_dup2(nowhere, 1);
+        ::_dup2(nowhere, 2);
+        ::SetStdHandle(STD_OUTPUT_HANDLE, reinterpret_cast<HANDLE>(::_get_osfhandle(1)));
+        ::SetStdHandle(STD_ERROR_HANDLE, reinterpret_cast<HANDLE>(::_get_osfhandle(2)));
+        ::_close(nowhere);
+    }
+}
+
+void AnswerPipe::write(const char* data, std::size_t size) {
+    while (size > 0) {
+        DWORD written = 0;
+        const DWORD piece = static_cast<DWORD>(size < 65536 ? size : 65536);
+        if (!::WriteFile(reinterpret_cast<HANDLE>(handle), data, piece, &written, nullptr) ||
+            written == 0)
+            return;
+        data += written;
+        size -= written;
+    }
+}
+
+void confine(std::uint64_t) {
+    ::SetErrorMode(SEM_FAILCRITICALERRORS | SEM_NOGPFAULTERRORBOX | SEM_NOOPENFILEERRORBOX);
+    ::AddVectoredExceptionHandler(1, noteFault);
+    ::SetUnhandledExceptionFilter(endWithFault);
+}
+
+void endProcess(int status) {
+    ::TerminateProcess(::GetCurrentProcess(), static_cast<UINT>(status));
+    for (;;)
+        ::Sleep(INFINITE);
+}
+
+std::wstring passedFault() {
+    const DWORD code = lastFault;
+    return code ? faultName(code) : std::wstring();
+}
+
+unsigned long processNumber() {
+    return ::GetCurrentProcessId();
+}
+
+} // namespace Mz::Tools::System

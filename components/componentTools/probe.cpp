@@ -1,0 +1,111 @@
+#include "components/componentTools/probe.h"
+
+#include "components/componentTools/platform/system.h"
+#include "components/componentTools/probeAnswer.h"
+
+#include <algorithm>
+
+namespace Mz::Tools {
+
+namespace {
+
+/// The sum of all texts of a library; no real one comes near.
+constexpr std::size_t longestAnswer = std::size_t{64} << 20;
+
+std::filesystem::path probeProgram(const ProbeOptions& options) {
+    if (!options.program.empty())
+        return options.program;
+    return System::ownFolder() / (std::string("mzcomponents-probe") + System::programExtension());
+}
+
+std::wstring seconds(std::chrono::milliseconds time) {
+    const auto tenths = time.count() / 100;
+    std::wstring text = std::to_wstring(tenths / 10);
+    return tenths % 10 ? text + L"." + std::to_wstring(tenths % 10) : text;
+}
+
+Finding memoryFinding(const ProbeAnswer& answer, const ProbeOptions& options) {
+    return {Verdict::outOfMemory, nameOf(answer.stage), std::to_wstring(options.memoryLimit >> 20)};
+}
+
+/// What the process itself said, completed by what only we know.
+Finding completed(const ProbeAnswer& answer, const ProbeOptions& options) {
+    Finding fault = *answer.fault;
+    if (fault.verdict == Verdict::outOfMemory)
+        return memoryFinding(answer, options);
+    if (fault.subject.empty())
+        fault.subject = nameOf(answer.stage);
+    return fault;
+}
+
+Finding judgeEnd(const System::ChildResult& child, const ProbeAnswer& answer,
+                 const ProbeOptions& options) {
+    using End = System::ChildResult::End;
+    const std::wstring stage = nameOf(answer.stage);
+    switch (child.end) {
+    case End::notStarted: return {Verdict::probeFailed, child.words, {}};
+    case End::interrupted: return {Verdict::interrupted, {}, {}};
+    case End::timedOut: return {Verdict::timedOut, stage, seconds(options.timeLimit)};
+    case End::outOfMemory:
+    case End::tooMuchOutput: return memoryFinding(answer, options);
+    default: break;
+    }
+    if (answer.garbled)
+        return {Verdict::garbled, L"something else came between", {}};
+    if (answer.fault)
+        return completed(answer, options);
+    if (child.end == End::crashed)
+        return {Verdict::crashed, stage, child.words};
+    if (!answer.anything)
+        return {Verdict::probeFailed,
+                L"it ended at once, with status " + std::to_wstring(child.status),
+                {}};
+    if (!answer.description)
+        return {Verdict::exited, stage, std::to_wstring(child.status)};
+    const std::size_t count = answer.description->builders.size();
+    if (count == 0)
+        return {Verdict::offersNothing, {}, {}};
+    return {Verdict::works, std::to_wstring(count), {}};
+}
+
+void noteBuilders(const Description& description, std::vector<Finding>& notes) {
+    const auto& builders = description.builders;
+    if (description.announced != builders.size())
+        notes.push_back({Verdict::miscounted, std::to_wstring(description.announced),
+                         std::to_wstring(builders.size())});
+    std::vector<QrUid> uids;
+    for (const RecordedBuilder& builder : builders)
+        uids.push_back(builder.uid);
+    const auto before = [](const QrUid& a, const QrUid& b) {
+        return std::tie(a.w0, a.w1, a.w2, a.w3) < std::tie(b.w0, b.w1, b.w2, b.w3);
+    };
+    std::sort(uids.begin(), uids.end(), before);
+    for (auto twice = std::adjacent_find(uids.begin(), uids.end()); twice != uids.end();
+         twice =
+             std::adjacent_find(std::upper_bound(twice, uids.end(), *twice, before), uids.end()))
+        notes.push_back({Verdict::uidTwice, textOf(*twice), {}});
+}
+
+} // namespace
+
+ProbeResult probeLibrary(const std::filesystem::path& file, const ProbeOptions& options) {
+    const System::ChildLimits limits{options.timeLimit, options.memoryLimit, longestAnswer,
+                                     options.interrupted};
+    const System::ChildResult child = System::runChild(
+        probeProgram(options),
+        {std::filesystem::absolute(file), std::to_string(options.memoryLimit)}, limits);
+    ProbeAnswer answer = decodeAnswer(child.output);
+    ProbeResult result;
+    result.verdict = judgeEnd(child, answer, options);
+    const bool sound = result.verdict.verdict == Verdict::works ||
+                       result.verdict.verdict == Verdict::offersNothing;
+    if (sound) {
+        noteBuilders(*answer.description, result.notes);
+        result.label = std::move(answer.description->label);
+        result.text = std::move(answer.description->text);
+        result.builders = std::move(answer.description->builders);
+    }
+    return result;
+}
+
+} // namespace Mz::Tools

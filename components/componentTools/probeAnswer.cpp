@@ -1,0 +1,201 @@
+#include "components/componentTools/probeAnswer.h"
+
+#include "components/componentManager/binaryStream.h"
+#include "components/componentManager/bufferio.h"
+
+#include <algorithm>
+#include <limits>
+#include <sstream>
+#include <stdexcept>
+
+namespace Mz::Tools {
+
+namespace {
+
+constexpr std::uint32_t mark = 0x4D5A5052;
+constexpr std::size_t frameSize = 4 + 1 + 4 + 4;
+
+enum class Kind : unsigned char { stage, fault, description };
+
+std::uint32_t sumOf(std::string_view bytes) {
+    std::uint32_t sum = 2166136261u;
+    for (const char byte : bytes)
+        sum = (sum ^ static_cast<unsigned char>(byte)) * 16777619u;
+    return sum;
+}
+
+/// Texts go as the codes of their characters, so that no locale has a say.
+void writeText(QrStream& stream, const std::wstring& text) {
+    stream << static_cast<unsigned int>(text.size());
+    for (const wchar_t character : text)
+        stream << static_cast<unsigned int>(character);
+}
+
+std::wstring readText(QrStream& stream) {
+    unsigned int size = 0;
+    stream >> size;
+    std::wstring text;
+    for (; size > 0; --size) {
+        unsigned int code = 0;
+        stream >> code;
+        if (code > static_cast<std::uint32_t>(std::numeric_limits<wchar_t>::max()))
+            throw std::runtime_error("no character");
+        text += static_cast<wchar_t>(code);
+    }
+    return text;
+}
+
+template <class Write>
+std::string message(Kind kind, Write write) {
+    std::ostringstream content;
+    QrOutBuffer buffer(&content);
+    QrBinaryStream body(&buffer);
+    write(body);
+    const std::string payload = content.str();
+
+    std::ostringstream framed;
+    QrOutBuffer frameBuffer(&framed);
+    QrBinaryStream frame(&frameBuffer);
+    frame << mark << static_cast<unsigned char>(kind) << static_cast<unsigned int>(payload.size());
+    frameBuffer.write(payload.data(), static_cast<int>(payload.size()));
+    frame << sumOf(payload);
+    return framed.str();
+}
+
+/// Reads one payload, to its last byte.
+class PayloadReader {
+  public:
+    explicit PayloadReader(std::string_view payload)
+        : content(std::string(payload)), buffer(&content), stream(&buffer) {}
+
+    /// Throws `std::exception` when the payload makes no sense.
+    void read(Kind kind, ProbeAnswer& answer) {
+        switch (kind) {
+        case Kind::stage: answer.stage = readStage(); break;
+        case Kind::fault: answer.fault = readFault(); break;
+        case Kind::description: answer.description = readDescription(); break;
+        default: throw std::runtime_error("no kind of message");
+        }
+        if (buffer.read() != -1)
+            throw std::runtime_error("more than the message");
+    }
+
+  private:
+    Stage readStage() {
+        unsigned char stage = 0;
+        stream >> stage;
+        if (stage > static_cast<unsigned char>(Stage::enumerating))
+            throw std::runtime_error("no stage");
+        return static_cast<Stage>(stage);
+    }
+
+    Finding readFault() {
+        const std::wstring name = readText(stream);
+        const auto verdict = verdictNamed(std::string(name.begin(), name.end()));
+        if (!verdict)
+            throw std::runtime_error("no verdict");
+        Finding fault{*verdict, {}, {}};
+        fault.subject = readText(stream);
+        fault.words = readText(stream);
+        return fault;
+    }
+
+    Description readDescription() {
+        Description description;
+        description.label = readText(stream);
+        description.text = readText(stream);
+        unsigned int count = 0;
+        stream >> description.announced >> count;
+        for (; count > 0; --count) {
+            RecordedBuilder& builder = description.builders.emplace_back();
+            stream >> builder.uid;
+            builder.name = readText(stream);
+            builder.label = readText(stream);
+            builder.text = readText(stream);
+            stream >> builder.number >> builder.flag;
+        }
+        return description;
+    }
+
+    std::istringstream content;
+    QrInBuffer buffer;
+    QrBinaryStream stream;
+};
+
+std::uint32_t wordAt(std::string_view bytes, std::size_t offset) {
+    std::uint32_t word = 0;
+    for (std::size_t index = 0; index < 4; ++index)
+        word = word << 8 | static_cast<unsigned char>(bytes[offset + index]);
+    return word;
+}
+
+} // namespace
+
+const wchar_t* nameOf(Stage stage) {
+    switch (stage) {
+    case Stage::loading: return L"its initialisers";
+    case Stage::entryPoint: return L"its entry point";
+    case Stage::describing: return L"its description";
+    case Stage::enumerating: return L"enumerateBuilders";
+    default: return L"nothing of its own yet";
+    }
+}
+
+std::string encodeStage(Stage stage) {
+    return message(Kind::stage,
+                   [&](QrStream& stream) { stream << static_cast<unsigned char>(stage); });
+}
+
+std::string encodeFault(Verdict verdict, const std::wstring& subject, const std::wstring& words) {
+    return message(Kind::fault, [&](QrStream& stream) {
+        const std::string name = nameOf(verdict);
+        writeText(stream, std::wstring(name.begin(), name.end()));
+        writeText(stream, subject);
+        writeText(stream, words);
+    });
+}
+
+std::string encodeDescription(const Description& description) {
+    return message(Kind::description, [&](QrStream& stream) {
+        writeText(stream, description.label);
+        writeText(stream, description.text);
+        stream << description.announced << static_cast<unsigned int>(description.builders.size());
+        for (const RecordedBuilder& builder : description.builders) {
+            stream << builder.uid;
+            writeText(stream, builder.name);
+            writeText(stream, builder.label);
+            writeText(stream, builder.text);
+            stream << builder.number << builder.flag;
+        }
+    });
+}
+
+ProbeAnswer decodeAnswer(std::string_view bytes) {
+    ProbeAnswer answer;
+    while (!bytes.empty() && !answer.garbled) {
+        const std::size_t known = std::min<std::size_t>(bytes.size(), 4);
+        const std::string expected = {0x4D, 0x5A, 0x50, 0x52};
+        if (bytes.substr(0, known) != std::string_view(expected).substr(0, known)) {
+            answer.garbled = true;
+            break;
+        }
+        if (bytes.size() < frameSize)
+            break;
+        const std::size_t size = wordAt(bytes, 5);
+        if (size > bytes.size() - frameSize)
+            break;
+        const std::string_view payload = bytes.substr(9, size);
+        try {
+            if (wordAt(bytes, 9 + size) != sumOf(payload))
+                throw std::runtime_error("another sum");
+            PayloadReader(payload).read(static_cast<Kind>(bytes[4]), answer);
+            answer.anything = true;
+        } catch (const std::runtime_error&) {
+            answer.garbled = true;
+        }
+        bytes.remove_prefix(size + frameSize);
+    }
+    return answer;
+}
+
+} // namespace Mz::Tools

@@ -1,0 +1,190 @@
+/// `mzcomponents-probe FILE MEMORY`: loads one library, asks it for its description, as the
+/// component manager does, and answers on standard output. Not meant to be started by people.
+#include "components/componentManager/componentImp.h"
+#include "components/componentManager/platform/platform.h"
+#include "components/componentTools/platform/system.h"
+#include "components/componentTools/probeAnswer.h"
+
+#include <clocale>
+#include <csignal>
+#include <cstdio>
+#include <cstdlib>
+#include <cxxabi.h>
+#include <exception>
+#include <memory>
+#include <new>
+#include <typeinfo>
+
+#ifdef MZ_UNLIMITED_ADDRESSES
+/// Under the sanitizers: a crash is to end the process as it does without them.
+extern "C" MZ_EXPORT const char* __asan_default_options() {
+    return "handle_segv=0:handle_sigbus=0:handle_sigill=0:handle_sigfpe=0:handle_abort=0:"
+           "detect_leaks=0";
+}
+#endif
+
+using namespace Mz;
+using namespace Mz::Tools;
+
+namespace {
+
+System::AnswerPipe* answers = nullptr;
+std::string abortedMessage;
+
+void send(const std::string& message) {
+    answers->write(message.data(), message.size());
+}
+
+void sendFault(Verdict verdict, const std::wstring& subject = {}, const std::wstring& words = {}) {
+    send(encodeFault(verdict, subject, words));
+}
+
+std::wstring widened(const char* text) {
+    return System::displayName(System::pathOfArgument(text ? text : ""));
+}
+
+/// The class of the exception that is being handled, for those that say nothing else.
+std::wstring exceptionClass() {
+    const std::type_info* type = abi::__cxa_current_exception_type();
+    if (!type)
+        return L"an exception of another language";
+    int failure = 0;
+    const std::unique_ptr<char, decltype(&std::free)> name(
+        abi::__cxa_demangle(type->name(), nullptr, nullptr, &failure), &std::free);
+    return L"a value of type " + widened(name ? name.get() : type->name());
+}
+
+/// What the exception that is being handled says. Lack of memory is a finding of its own.
+Finding exceptionFinding(Verdict verdict, const std::wstring& before) {
+    try {
+        throw;
+    } catch (const std::bad_alloc&) {
+        return {Verdict::outOfMemory, {}, {}};
+    } catch (const ExBase& failure) {
+        return {verdict, {}, before + widened(failure.getReason())};
+    } catch (const std::exception& failure) {
+        return {verdict, {}, before + widened(failure.what())};
+    } catch (...) {
+        return {verdict, {}, before + exceptionClass()};
+    }
+}
+
+void onAbort(int) {
+    answers->write(abortedMessage.data(), abortedMessage.size());
+    System::endProcess(3);
+}
+
+void onTerminate() {
+    Finding finding{Verdict::aborted, {}, L" (std::terminate)"};
+    if (std::current_exception())
+        finding = exceptionFinding(Verdict::aborted, L": nobody catches an exception: ");
+    sendFault(finding.verdict, finding.subject, finding.words);
+    System::endProcess(3);
+}
+
+/// Collects what the library offers as the manager does.
+class Collector final : public QrEnumerator<QrCPtr<QrBuilderDescription>> {
+  public:
+    explicit Collector(std::vector<RecordedBuilder>& target) : builders(target) {}
+
+    Action process(QrCPtr<QrBuilderDescription> item) override {
+        wrongItem = item ? L"an object that does not answer for it" : L"null";
+        const auto description =
+            QrCPtr<QrBuilderDescription>::adopt(safeCast<QrBuilderDescription>(item.get()));
+        wrongItem = nullptr;
+        RecordedBuilder& builder = builders.emplace_back();
+        builder.uid = description->getUid();
+        builder.name = textOf(description->getName());
+        builder.label = textOf(description->getLabel());
+        builder.text = textOf(description->getText());
+        builder.number = description->getNumber();
+        builder.flag = description->getFlag();
+        return Continue;
+    }
+
+    static std::wstring textOf(const wchar_t* text) { return text ? text : L""; }
+
+    const wchar_t* wrongItem = nullptr;
+
+  private:
+    std::vector<RecordedBuilder>& builders;
+};
+
+void describe(QrGetComponentDescriptionFunction* entryPoint, const wchar_t*& wrongItem) {
+    const QrPtr<QrCastable> described = entryPoint();
+    if (!described)
+        return sendFault(Verdict::nullDescription);
+    const auto description = queryCast<QrComponentDescription>(described.get());
+    if (!description)
+        return sendFault(Verdict::wrongInterface);
+    send(encodeStage(Stage::describing));
+    Description answer;
+    static_cast<void>(description->getComponentValue());
+    answer.text = Collector::textOf(description->getComponentText());
+    answer.label = Collector::textOf(description->getComponentLabel());
+    answer.announced = description->getBuilderCount();
+    send(encodeStage(Stage::enumerating));
+    Collector collector(answer.builders);
+    try {
+        description->enumerateBuilders(collector);
+    } catch (...) {
+        wrongItem = collector.wrongItem;
+        throw;
+    }
+    send(encodeDescription(answer));
+}
+
+void describeGuarded(QrGetComponentDescriptionFunction* entryPoint) {
+    const wchar_t* wrongItem = nullptr;
+    try {
+        describe(entryPoint, wrongItem);
+    } catch (const QrComponentManagerEx::ExBadCast&) {
+        if (wrongItem)
+            return sendFault(Verdict::wrongItem, wrongItem);
+        const Finding finding = exceptionFinding(Verdict::threw, {});
+        sendFault(finding.verdict, finding.subject, finding.words);
+    } catch (...) {
+        const Finding finding = exceptionFinding(Verdict::threw, {});
+        sendFault(finding.verdict, finding.subject, finding.words);
+    }
+}
+
+void probe(const System::NativePath& file) {
+    if (!platform::exportsFunction(file.native(), entryPointName))
+        return sendFault(Verdict::noEntryPoint);
+    send(encodeStage(Stage::loading));
+    const platform::Module module = platform::loadLibrary(file.native());
+    if (!module) {
+        const std::wstring fault = System::passedFault();
+        if (!fault.empty())
+            return sendFault(Verdict::crashed, {}, fault);
+        return sendFault(Verdict::loadFailed, {}, System::loaderWords(file));
+    }
+    send(encodeStage(Stage::entryPoint));
+    const auto entryPoint = reinterpret_cast<QrGetComponentDescriptionFunction*>(
+        platform::findSymbol(module, entryPointName));
+    if (!entryPoint)
+        return sendFault(Verdict::entryPointNoFunction);
+    describeGuarded(entryPoint);
+}
+
+} // namespace
+
+int main(int argc, char** argv) {
+    const std::vector<std::string> arguments = System::arguments(argc, argv);
+    if (arguments.size() != 2) {
+        std::fputs("mzcomponents-probe is started by libMZcomponentTools; see mzcomponents\n",
+                   stderr);
+        return 2;
+    }
+    System::AnswerPipe pipe;
+    answers = &pipe;
+    abortedMessage = encodeFault(Verdict::aborted, {}, {});
+    System::confine(std::strtoull(arguments[1].c_str(), nullptr, 10));
+    std::setlocale(LC_ALL, "");
+    std::signal(SIGABRT, onAbort);
+    std::set_terminate(onTerminate);
+    send(encodeStage(Stage::starting));
+    probe(System::pathOfArgument(arguments[0]));
+    System::endProcess(0);
+}

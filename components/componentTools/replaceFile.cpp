@@ -1,0 +1,82 @@
+#include "components/componentTools/replaceFile.h"
+
+#include "components/componentManager/exceptions.h"
+#include "components/componentManager/platform/platform.h"
+#include "components/componentTools/platform/system.h"
+
+#include <atomic>
+#include <chrono>
+#include <fstream>
+#include <system_error>
+#include <thread>
+
+namespace Mz::Tools {
+
+namespace {
+
+constexpr const char* source = "components/componentTools/replaceFile";
+
+std::filesystem::path temporaryName(const std::filesystem::path& file) {
+    static std::atomic<unsigned int> counter{0};
+    std::filesystem::path name = file;
+    name += ".new-" + std::to_string(System::processNumber()) + "-" + std::to_string(++counter);
+    return name;
+}
+
+/// Repeats `attempt` for half a second until it succeeds or `hopeless` says that it never will.
+template <class Attempt, class Hopeless>
+bool patiently(Attempt attempt, Hopeless hopeless) {
+    constexpr int attempts = 50;
+    for (int count = 0; count < attempts; ++count) {
+        if (attempt())
+            return true;
+        if (hopeless())
+            return false;
+        std::this_thread::sleep_for(std::chrono::milliseconds(10));
+    }
+    return false;
+}
+
+/// Where an open file cannot be replaced, a reader makes us wait for a moment.
+bool moveOver(const std::filesystem::path& from, const std::filesystem::path& to) {
+    std::error_code failure;
+    return patiently(
+        [&] {
+            std::filesystem::rename(from, to, failure);
+            return !failure;
+        },
+        [&] { return std::filesystem::is_directory(to); });
+}
+
+} // namespace
+
+void replaceFile(const std::filesystem::path& file, std::string_view content) {
+    const std::wstring shown = System::displayName(file);
+    const std::string name = System::encode(shown, 2);
+    const std::filesystem::path temporary = temporaryName(file);
+    {
+        std::ofstream output(temporary, std::ios::binary | std::ios::trunc);
+        if (!output)
+            throw QrStreamEx::ExWriteOpen(source, __LINE__, name.c_str());
+        output.write(content.data(), static_cast<std::streamsize>(content.size()));
+        output.close();
+        if (output && moveOver(temporary, file))
+            return;
+    }
+    std::error_code ignored;
+    std::filesystem::remove(temporary, ignored);
+    throw QrStreamEx::ExWriteError(source, __LINE__, name.c_str());
+}
+
+bool openPatiently(std::ifstream& stream, const std::filesystem::path& file) {
+    std::optional<platform::FileStatus> status;
+    return patiently(
+        [&] {
+            stream.clear();
+            status = platform::queryFile(file.native());
+            return status && status->regular && platform::openForReading(stream, file.native());
+        },
+        [&] { return !status || !status->regular; });
+}
+
+} // namespace Mz::Tools

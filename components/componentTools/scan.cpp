@@ -1,0 +1,170 @@
+#include "components/componentTools/scan.h"
+
+#include "components/componentManager/platform/platform.h"
+#include "components/componentTools/inspection.h"
+#include "components/componentTools/verdictsFile.h"
+
+#include <algorithm>
+#include <map>
+
+namespace Mz::Tools {
+
+namespace {
+
+using Name = std::pair<std::wstring, std::wstring>;
+
+class Scanner {
+  public:
+    explicit Scanner(const ScanOptions& wanted) : options(wanted), probeOptions(wanted.probe) {
+        probeOptions.interrupted = [this] { return isInterrupted(); };
+    }
+
+    ScanResult run() {
+        readOld();
+        const Discovery discovery = discover(options.folders);
+        const std::size_t count = discovery.candidates.size();
+        for (std::size_t index = 0; index < count; ++index) {
+            result.interrupted = result.interrupted || isInterrupted();
+            if (!result.interrupted)
+                report(index, count, discovery.candidates[index]);
+            add(discovery.candidates[index]);
+        }
+        for (const Discovery::LeftOut& left : discovery.leftOut)
+            leaveOut(left);
+        if (!options.list.empty()) {
+            writeVerdicts(verdictsFileOf(options.list), result.libraries);
+            writeRecordedList(options.list, result.libraries);
+        }
+        return std::move(result);
+    }
+
+  private:
+    bool isInterrupted() const {
+        return (options.controller && options.controller->isInterrupted()) ||
+               (options.probe.interrupted && options.probe.interrupted());
+    }
+
+    void report(std::size_t index, std::size_t count, const Candidate& candidate) const {
+        if (options.controller && options.controller->isProgressShown())
+            options.controller->progress(static_cast<float>(index) / static_cast<float>(count),
+                                         displayName(candidate.path.filename()).c_str());
+    }
+
+    void readOld() {
+        if (options.list.empty())
+            return;
+        ListReading reading = readRecordedList(options.list);
+        result.rejected = reading.reason;
+        for (RecordedLibrary& library : reading.libraries) {
+            Name name(library.directory, library.fileName);
+            old.emplace(std::move(name), std::move(library));
+        }
+    }
+
+    void add(const Candidate& candidate) {
+        ScannedFile file{candidate.path, candidate.directory, candidate.fileName, {}, {}};
+        const auto status = platform::queryFile(candidate.path.native());
+        const Name name(candidate.directory, candidate.fileName);
+        const auto known = old.find(name);
+        const bool unchanged = known != old.end() && status && status->time == known->second.time &&
+                               status->size == known->second.size;
+        if (!status) {
+            file.verdict.verdict = Verdict::missing; // Gone since the folder was listed.
+        } else if (result.interrupted) {
+            file.verdict.verdict = Verdict::interrupted;
+            if (known != old.end())
+                keep(file, known->second);
+        } else if (unchanged && !isTriedAgain(known->second)) {
+            file.verdict = verdictOf(known->second);
+            keep(file, known->second);
+        } else {
+            look(file, *status);
+        }
+        result.files.push_back(std::move(file));
+    }
+
+    /// Whether there is reason to believe that a library without builders does better now.
+    bool isTriedAgain(const RecordedLibrary& library) const {
+        if (!library.builders.empty())
+            return false;
+        if (!library.kept) // Recorded by somebody else, who did not say why.
+            return true;
+        switch (library.kept->verdict) {
+        case Verdict::dependencyMissing: // It does not change when its dependency arrives.
+        case Verdict::loadFailed:        // Nor when the dependency of a dependency does.
+        case Verdict::unreadable:
+        case Verdict::probeFailed:
+        case Verdict::interrupted: return true;
+        default: return options.retry && severityOf(library.kept->verdict) == Severity::fault;
+        }
+    }
+
+    static Finding verdictOf(const RecordedLibrary& library) {
+        if (!library.builders.empty())
+            return {Verdict::works, std::to_wstring(library.builders.size()), {}};
+        return library.kept.value_or(Finding{Verdict::recordedFailed, {}, {}});
+    }
+
+    /// Takes a record of the old list over as it stands.
+    void keep(ScannedFile& file, const RecordedLibrary& library) {
+        file.recorded = true;
+        result.libraries.push_back(library);
+    }
+
+    void look(ScannedFile& file, const platform::FileStatus& status) {
+        ExplainOptions explaining;
+        explaining.load = true;
+        explaining.probe = probeOptions;
+        Explanation explanation = explainFile(file.path, explaining);
+        file.looked = true;
+        file.verdict = std::move(explanation.verdict);
+        file.notes = std::move(explanation.notes);
+        if (file.verdict.verdict == Verdict::interrupted) {
+            result.interrupted = true;
+            return;
+        }
+        RecordedLibrary library;
+        library.directory = file.directory;
+        library.fileName = file.fileName;
+        library.time = status.time;
+        library.size = status.size;
+        if (file.verdict.verdict == Verdict::works)
+            library.builders = std::move(explanation.builders);
+        if (const std::wstring* text = uncarriedText(library)) {
+            // Recorded without builders it would be lost to a host that can load it.
+            file.verdict = {Verdict::textNotCarried, *text, {}};
+            return;
+        }
+        if (library.builders.empty())
+            library.kept = file.verdict;
+        file.recorded = true;
+        result.libraries.push_back(std::move(library));
+    }
+
+    static const std::wstring* uncarriedText(const RecordedLibrary& library) {
+        for (const RecordedBuilder& builder : library.builders)
+            for (const std::wstring* text : {&builder.name, &builder.label, &builder.text})
+                if (!isCarried(*text))
+                    return text;
+        return nullptr;
+    }
+
+    void leaveOut(const Discovery::LeftOut& left) {
+        ScannedFile file{left.path, {}, {}, left.finding, {}};
+        file.looked = true;
+        result.files.push_back(std::move(file));
+    }
+
+    const ScanOptions& options;
+    ProbeOptions probeOptions;
+    std::map<Name, RecordedLibrary> old;
+    ScanResult result;
+};
+
+} // namespace
+
+ScanResult scan(const ScanOptions& options) {
+    return Scanner(options).run();
+}
+
+} // namespace Mz::Tools

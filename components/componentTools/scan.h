@@ -1,0 +1,59 @@
+/// Filling a recorded list without putting the host at risk.
+#pragma once
+
+#include "components/componentTools/discovery.h"
+#include "components/componentTools/probe.h"
+#include "components/componentTools/recordedList.h"
+
+#include "components/componentManager/processControl.h"
+
+#include <filesystem>
+#include <string>
+#include <vector>
+
+namespace Mz::Tools {
+
+struct ScanOptions {
+    /// The folders to search, in the host's order; see `foldersOf`.
+    std::vector<std::filesystem::path> folders;
+    /// The list to bring up to date; empty to record nothing.
+    std::filesystem::path list;
+    /// Try libraries that failed earlier again, though they have not changed.
+    bool retry = false;
+    /// For each library; when `interrupted` answers true, the whole scan ends.
+    ProbeOptions probe;
+    /// Hears of the progress and is asked whether to stop; null for nobody.
+    QrProcessControl* controller = nullptr;
+};
+
+/// What became of one file.
+struct ScannedFile {
+    std::filesystem::path path;
+    std::wstring directory, fileName; ///< as recorded
+    Finding verdict;
+    std::vector<Finding> notes;
+    bool recorded = false; ///< whether the list has it now
+    bool looked = false;   ///< false when the list had it already, and it has not changed
+};
+
+struct ScanResult {
+    std::vector<ScannedFile> files; ///< in the host's order, those left out behind them
+    RecordedLibraries libraries;    ///< what was written
+    std::wstring rejected;          ///< why the old list was rejected; empty when it was not
+    bool interrupted = false;       ///< the user stopped it; the rest of the old list was kept
+};
+
+/// Scans the folders, loading each library that is new, has changed, or lacks something that may
+/// have arrived meanwhile, in a process of its own, and writes the list.
+///
+/// A library that fails is recorded with its time and size and no builders, so a host that reads
+/// the list does not load it either, until its file changes. What was wrong is kept beside the
+/// list, in the file `verdictsFileOf(list)`. What is no component library is recorded in the same
+/// way, as the manager does.
+///
+/// A damaged or foreign list is rejected whole and built anew. Two scans at once do not damage each
+/// other: each writes a whole list, and the later one stays. Throws `QrStreamEx::ExWriteOpen` or
+/// `ExWriteError` when the list cannot be written.
+MZ_COMPONENT_TOOLS_API ScanResult scan(const ScanOptions& options);
+
+} // namespace Mz::Tools

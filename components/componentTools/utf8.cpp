@@ -1,0 +1,97 @@
+#include "components/componentTools/utf8.h"
+
+#include <cstdint>
+
+namespace Mz::Tools {
+
+namespace {
+
+constexpr bool pairs = sizeof(wchar_t) == 2;
+
+bool isHigh(std::uint32_t unit) {
+    return unit >= 0xD800 && unit < 0xDC00;
+}
+
+bool isLow(std::uint32_t unit) {
+    return unit >= 0xDC00 && unit < 0xE000;
+}
+
+void append(std::string& result, std::uint32_t code) {
+    if (code > 0x10FFFF || isHigh(code) || isLow(code))
+        code = 0xFFFD;
+    const auto byte = [&](std::uint32_t value) { result += static_cast<char>(value); };
+    const auto rest = [&](int shift) { byte(0x80 | (code >> shift & 0x3F)); };
+    if (code < 0x80) {
+        byte(code);
+    } else if (code < 0x800) {
+        byte(0xC0 | code >> 6);
+        rest(0);
+    } else if (code < 0x10000) {
+        byte(0xE0 | code >> 12);
+        rest(6);
+        rest(0);
+    } else {
+        byte(0xF0 | code >> 18);
+        rest(12);
+        rest(6);
+        rest(0);
+    }
+}
+
+void append(std::wstring& result, std::uint32_t code) {
+    if (pairs && code > 0xFFFF) {
+        result += static_cast<wchar_t>(0xD800 + ((code - 0x10000) >> 10));
+        result += static_cast<wchar_t>(0xDC00 + ((code - 0x10000) & 0x3FF));
+    } else {
+        result += static_cast<wchar_t>(code);
+    }
+}
+
+/// Takes the first character from `bytes`.
+std::uint32_t take(std::string_view& bytes) {
+    const auto byteAt = [&](std::size_t index) {
+        return static_cast<std::uint32_t>(static_cast<unsigned char>(bytes[index]));
+    };
+    const std::uint32_t first = byteAt(0);
+    const std::size_t length = first < 0x80   ? 1
+                               : first < 0xC0 ? 0
+                               : first < 0xE0 ? 2
+                               : first < 0xF0 ? 3
+                                              : 4;
+    std::uint32_t code = length == 1 ? first : first & (0x7F >> length);
+    for (std::size_t index = 1; index < length; ++index) {
+        if (index >= bytes.size() || (byteAt(index) & 0xC0) != 0x80) {
+            bytes.remove_prefix(1);
+            return 0xFFFD;
+        }
+        code = code << 6 | (byteAt(index) & 0x3F);
+    }
+    bytes.remove_prefix(length ? length : 1);
+    return length && code <= 0x10FFFF ? code : 0xFFFD;
+}
+
+} // namespace
+
+std::string toUtf8(std::wstring_view text) {
+    std::string result;
+    for (std::size_t index = 0; index < text.size(); ++index) {
+        const auto unit = static_cast<std::uint32_t>(text[index]);
+        if (isHigh(unit) && index + 1 < text.size() &&
+            isLow(static_cast<std::uint32_t>(text[index + 1]))) {
+            const auto low = static_cast<std::uint32_t>(text[++index]);
+            append(result, 0x10000 + ((unit - 0xD800) << 10) + (low - 0xDC00));
+        } else {
+            append(result, unit);
+        }
+    }
+    return result;
+}
+
+std::wstring fromUtf8(std::string_view bytes) {
+    std::wstring result;
+    while (!bytes.empty())
+        append(result, take(bytes));
+    return result;
+}
+
+} // namespace Mz::Tools

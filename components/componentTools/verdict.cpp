@@ -1,0 +1,170 @@
+#include "components/componentTools/verdict.h"
+
+#include "components/componentTools/platform/system.h"
+
+#include <iterator>
+
+namespace Mz::Tools {
+
+namespace {
+
+/// In the texts, %1 stands for the finding's subject, %2 for its words, and %L for the variable
+/// that names the folders in which the system looks for libraries.
+struct Entry {
+    Verdict verdict;
+    const char* name;
+    Severity severity;
+    const wchar_t* sentence;
+    const wchar_t* cure;
+};
+
+constexpr Entry entries[] = {
+    {Verdict::component, "component", Severity::good,
+     L"it is a component library, as far as can be seen without running it", L""},
+    {Verdict::works, "works", Severity::good, L"it loads and describes its builders (%1)", L""},
+    {Verdict::offersNothing, "offersNothing", Severity::bystander,
+     L"it loads and describes itself, but offers no builder", L""},
+
+    {Verdict::directory, "directory", Severity::bystander,
+     L"it is a folder, and folders inside a search folder are not searched",
+     L"name the folder itself in the search path"},
+    {Verdict::hidden, "hidden", Severity::bystander, L"it is hidden, and hidden files are left out",
+     L"make the file visible"},
+    {Verdict::systemFile, "systemFile", Severity::bystander,
+     L"it has the attribute of a system file, and those are left out",
+     L"take the attribute from the file"},
+    {Verdict::notRegular, "notRegular", Severity::bystander,
+     L"it is no regular file, and those are left out", L""},
+    {Verdict::notALibrary, "notALibrary", Severity::bystander, L"it is no library", L""},
+    {Verdict::program, "program", Severity::bystander,
+     L"it is a program, which is started and not loaded", L""},
+    {Verdict::noEntryPoint, "noEntryPoint", Severity::bystander,
+     L"it is a library, but does not export \"QrGetComponentDescription\" itself",
+     L"if it is meant to be a component, define and export that function (MZ_COMPONENT does)"},
+
+    {Verdict::missing, "missing", Severity::fault, L"there is no such file", L"check the path"},
+    {Verdict::unreadable, "unreadable", Severity::fault, L"it cannot be read",
+     L"check the permissions of the file and of its folders"},
+    {Verdict::nameNotCarried, "nameNotCarried", Severity::fault,
+     L"its name has no form in the current locale, so it cannot be recorded",
+     L"rename it, or choose a locale that has its characters"},
+    {Verdict::sameName, "sameName", Severity::fault,
+     L"its name is that of %1 but for the case of letters, and a list holds only one of them",
+     L"rename one of the two"},
+    {Verdict::otherSystem, "otherSystem", Severity::fault,
+     L"it is a library for another system: %1", L"get the library that was built for this system"},
+    {Verdict::otherProcessor, "otherProcessor", Severity::fault,
+     L"it is a library for another processor: %1",
+     L"get the library that was built for this processor"},
+    {Verdict::damaged, "damaged", Severity::fault, L"it is damaged or was cut off: %1",
+     L"build it again, or copy it again"},
+    {Verdict::entryPointNoFunction, "entryPointNoFunction", Severity::fault,
+     L"it exports \"QrGetComponentDescription\", but not as a function of its own",
+     L"define the function in the library itself"},
+    {Verdict::dependencyMissing, "dependencyMissing", Severity::fault,
+     L"it needs %1, which cannot be found%2",
+     L"install what has %1, or add its folder to the loader's path (%L)"},
+
+    {Verdict::loadFailed, "loadFailed", Severity::fault, L"the system cannot load it: %2", L""},
+    {Verdict::nullDescription, "nullDescription", Severity::fault,
+     L"its entry point returns null instead of a description", L"return the description"},
+    {Verdict::wrongInterface, "wrongInterface", Severity::fault,
+     L"what its entry point returns does not answer for QrComponentDescription",
+     L"derive the description from QrComponentDescription through a cast template"},
+    {Verdict::wrongItem, "wrongItem", Severity::fault,
+     L"it offers %1 in the place of a builder description",
+     L"offer objects that answer for "
+     L"QrBuilderDescription"},
+    {Verdict::threw, "threw", Severity::fault, L"it throws in %1: %2", L""},
+    {Verdict::crashed, "crashed", Severity::fault, L"it crashes in %1: %2", L""},
+    {Verdict::aborted, "aborted", Severity::fault, L"it aborts the process in %1%2", L""},
+    {Verdict::exited, "exited", Severity::fault, L"it ends the process in %1, with status %2", L""},
+    {Verdict::timedOut, "timedOut", Severity::fault,
+     L"it did not come to an end in %1 within %2 seconds", L"if it only needs longer, allow more"},
+    {Verdict::outOfMemory, "outOfMemory", Severity::fault,
+     L"it takes more memory in %1 than the %2 MiB allowed", L"if it really needs more, allow more"},
+    {Verdict::textNotCarried, "textNotCarried", Severity::fault,
+     L"the text \"%1\" of a builder has no form in the current locale, so it cannot be recorded",
+     L"choose a locale that has its characters"},
+    {Verdict::garbled, "garbled", Severity::fault,
+     L"the process that loaded it did not answer as it should (%1)", L""},
+    {Verdict::probeFailed, "probeFailed", Severity::fault,
+     L"the process to load it in could not be started: %1",
+     L"check that mzcomponents-probe stands beside libMZcomponentTools"},
+    {Verdict::interrupted, "interrupted", Severity::fault, L"it was not looked at to the end", L""},
+
+    {Verdict::notRecorded, "notRecorded", Severity::note,
+     L"the list does not have it, so a host loads it at its next start", L""},
+    {Verdict::recordedUnchanged, "recordedUnchanged", Severity::note,
+     L"the list has it (builders: %1), and it has not changed: a host whose search path leads to "
+     L"the "
+     L"recorded names does not load it at start",
+     L""},
+    {Verdict::recordedFailed, "recordedFailed", Severity::note,
+     L"the list has it without builders%2, and it has not changed: a host does not try it again "
+     L"until its time or size changes",
+     L"mend the file, or scan again and have failures retried"},
+    {Verdict::recordedChanged, "recordedChanged", Severity::note,
+     L"it changed in %1 since it was recorded, so a host loads it at its next start",
+     L"scan again"},
+
+    {Verdict::miscounted, "miscounted", Severity::note, L"it announces %1 builders and gives %2",
+     L"let getBuilderCount return what enumerateBuilders gives"},
+    {Verdict::uidTaken, "uidTaken", Severity::note,
+     L"builder %1 is offered by %2 too, which comes later and wins", L"make a new identifier"},
+    {Verdict::uidWins, "uidWins", Severity::note,
+     L"builder %1 is offered by %2 too, and this one, which comes later, wins",
+     L"make a new identifier"},
+    {Verdict::uidTwice, "uidTwice", Severity::note, L"it offers builder %1 twice",
+     L"make a new identifier"},
+};
+
+const Entry& entryOf(Verdict verdict) {
+    for (const Entry& entry : entries)
+        if (entry.verdict == verdict)
+            return entry;
+    return entries[0];
+}
+
+std::wstring filledIn(const wchar_t* text, const Finding& finding) {
+    std::wstring result;
+    for (; *text; ++text) {
+        if (*text != L'%') {
+            result += *text;
+            continue;
+        }
+        switch (*++text) {
+        case L'1': result += finding.subject; break;
+        case L'2': result += finding.words; break;
+        default: result += System::loaderPathVariable(); break;
+        }
+    }
+    return result;
+}
+
+} // namespace
+
+const char* nameOf(Verdict verdict) {
+    return entryOf(verdict).name;
+}
+
+std::optional<Verdict> verdictNamed(std::string_view name) {
+    for (const Entry& entry : entries)
+        if (entry.name == name)
+            return entry.verdict;
+    return std::nullopt;
+}
+
+Severity severityOf(Verdict verdict) {
+    return entryOf(verdict).severity;
+}
+
+std::wstring sentenceOf(const Finding& finding) {
+    return filledIn(entryOf(finding.verdict).sentence, finding);
+}
+
+std::wstring cureOf(const Finding& finding) {
+    return filledIn(entryOf(finding.verdict).cure, finding);
+}
+
+} // namespace Mz::Tools

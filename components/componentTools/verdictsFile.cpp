@@ -1,0 +1,78 @@
+#include "components/componentTools/verdictsFile.h"
+
+#include "components/componentTools/replaceFile.h"
+#include "components/componentTools/utf8.h"
+
+#include <fstream>
+#include <map>
+#include <nlohmann/json.hpp>
+
+namespace Mz::Tools {
+
+namespace {
+
+using Json = nlohmann::ordered_json;
+
+constexpr int version = 1;
+
+std::wstring wide(const Json& entry, const char* key) {
+    return fromUtf8(entry.at(key).get<std::string>());
+}
+
+/// Verdicts by directory and file name.
+using Verdicts = std::map<std::pair<std::wstring, std::wstring>, const Json*>;
+
+Verdicts verdictsOf(const Json& all) {
+    Verdicts verdicts;
+    if (all.at("version").get<int>() == version)
+        for (const Json& entry : all.at("libraries"))
+            verdicts[{wide(entry, "directory"), wide(entry, "fileName")}] = &entry;
+    return verdicts;
+}
+
+void fillIn(RecordedLibrary& library, const Verdicts& verdicts) {
+    const auto found = verdicts.find({library.directory, library.fileName});
+    if (found == verdicts.end())
+        return;
+    const Json& entry = *found->second;
+    if (entry.at("time").get<std::uint32_t>() != library.time ||
+        entry.at("size").get<std::int64_t>() != library.size)
+        return;
+    if (const auto verdict = verdictNamed(entry.at("verdict").get<std::string>()))
+        library.kept = Finding{*verdict, wide(entry, "subject"), wide(entry, "words")};
+}
+
+} // namespace
+
+void readVerdicts(const std::filesystem::path& file, RecordedLibraries& libraries) {
+    std::ifstream input;
+    if (!openPatiently(input, file))
+        return;
+    try {
+        const Json all = Json::parse(input);
+        const Verdicts verdicts = verdictsOf(all);
+        for (RecordedLibrary& library : libraries)
+            if (library.builders.empty())
+                fillIn(library, verdicts);
+    } catch (const nlohmann::json::exception&) {
+        return; // Only a memory of ours: without it a little more is tried again.
+    }
+}
+
+void writeVerdicts(const std::filesystem::path& file, const RecordedLibraries& libraries) {
+    Json entries = Json::array();
+    for (const RecordedLibrary& library : libraries)
+        if (library.kept)
+            entries.push_back({{"directory", toUtf8(library.directory)},
+                               {"fileName", toUtf8(library.fileName)},
+                               {"time", library.time},
+                               {"size", library.size},
+                               {"verdict", nameOf(library.kept->verdict)},
+                               {"subject", toUtf8(library.kept->subject)},
+                               {"words", toUtf8(library.kept->words)},
+                               {"sentence", toUtf8(sentenceOf(*library.kept))},
+                               {"cure", toUtf8(cureOf(*library.kept))}});
+    replaceFile(file, Json{{"version", version}, {"libraries", entries}}.dump(2, ' ', true) + "\n");
+}
+
+} // namespace Mz::Tools

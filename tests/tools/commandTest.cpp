@@ -1,0 +1,215 @@
+/// The command line, as scripts use it.
+#include "tests/tools/toolsFixture.h"
+
+#include <nlohmann/json.hpp>
+
+using namespace Mz;
+using namespace Mz::Tools;
+using namespace Mz::Test;
+using ::testing::HasSubstr;
+using ::testing::StartsWith;
+using Json = nlohmann::json;
+
+namespace {
+
+class Command : public ToolsTest {
+  protected:
+    ProgramResult run(const std::vector<std::string>& arguments) const {
+        const auto program =
+            buildFolder / "bin" / (std::wstring(L"mzcomponents") + MZ_PROGRAM_EXTENSION);
+        ProgramResult result = runProgram(program, program.string(), arguments, work.path());
+        EXPECT_TRUE(result.finished);
+        return result;
+    }
+
+    /// The same, with the result as JSON and the test's folder as the search path.
+    Json json(int status, std::vector<std::string> arguments) const {
+        arguments.insert(arguments.end(), {"--json", "--path", path()});
+        const ProgramResult result = run(arguments);
+        EXPECT_EQ(result.exitCode, status) << result.output;
+        const Json value = Json::parse(result.output, nullptr, false);
+        EXPECT_FALSE(value.is_discarded()) << result.output;
+        return value;
+    }
+
+    std::string path() const { return folder.path().string(); }
+    std::string inWork(const char* name) const { return (work.path() / name).string(); }
+
+    TemporaryDirectory work;
+};
+
+TEST_F(Command, WrongUseEndsWithTwo) {
+    EXPECT_EQ(run({}).exitCode, 2);
+    EXPECT_EQ(run({"nonsense"}).exitCode, 2);
+    EXPECT_EQ(run({"list", "--nonsense"}).exitCode, 2);
+    EXPECT_EQ(run({"explain"}).exitCode, 2);
+    EXPECT_EQ(run({"scan"}).exitCode, 2);
+    EXPECT_EQ(run({"scan", "--cache", "x", "--time-limit", "never"}).exitCode, 2);
+    EXPECT_EQ(run({"scan", "--cache", "x", "--time-limit", "-1"}).exitCode, 2);
+}
+
+TEST_F(Command, HelpSaysWhatEachDoesWithAnExample) {
+    const ProgramResult help = run({"--help"});
+    EXPECT_EQ(help.exitCode, 0);
+    for (const char* command : {"list", "explain", "scan", "types", "import", "show", "graph"}) {
+        EXPECT_THAT(help.output, HasSubstr(command));
+        const ProgramResult own = run({command, "--help"});
+        EXPECT_EQ(own.exitCode, 0);
+        EXPECT_THAT(own.output, HasSubstr("Example:\n  mzcomponents " + std::string(command)));
+        for (const char* option : {"--path", "--cache", "--json"})
+            EXPECT_THAT(own.output, HasSubstr(option)) << command;
+    }
+}
+
+TEST_F(Command, ListGivesEachCandidateItsVerdictAndRunsNothing) {
+    add(L"goodWithKit", "a");
+    add(L"crashesInInitialiser", "b");
+    add(L"noEntryPoint", "c");
+    folder.write("d", "text");
+    const Json files = json(0, {"list"}).at("files");
+    ASSERT_EQ(files.size(), 4u);
+    EXPECT_EQ(files[0].at("verdict"), "component");
+    EXPECT_EQ(files[1].at("verdict"), "component");
+    EXPECT_EQ(files[2].at("verdict"), "noEntryPoint");
+    EXPECT_EQ(files[3].at("verdict"), "notALibrary");
+    const std::string lines = run({"list", "--path", path()}).output;
+    // Some systems show the names in the form in which they are recorded.
+    EXPECT_THAT(lines, StartsWith("component             "));
+    EXPECT_THAT(lines, HasSubstr(folder.path().filename().string()));
+    EXPECT_EQ(std::count(lines.begin(), lines.end(), '\n'), 4);
+}
+
+TEST_F(Command, ListEndsWithOneWhereSomethingIsWrong) {
+    EXPECT_EQ(run({"list", "--path", path() + "-not-there"}).exitCode, 1);
+    EXPECT_EQ(run({"list", "--path", path(), "--cache", inWork("no-list")}).exitCode, 1);
+    EXPECT_EQ(run({"list", "--path", path()}).exitCode, 0);
+    add(L"missesDependency", "a");
+    EXPECT_EQ(json(1, {"list"}).at("files").at(0).at("verdict"), "dependencyMissing");
+}
+
+TEST_F(Command, ExplainTellsTheCureAndWhatIsNeeded) {
+    const auto file = add(L"missesDependency").string();
+    const Json entry = json(1, {"explain", file}).at("files").at(0);
+    EXPECT_EQ(entry.at("verdict"), "dependencyMissing");
+    EXPECT_THAT(entry.at("cure").get<std::string>(), HasSubstr("absentDependency"));
+    EXPECT_GT(entry.at("dependencies").size(), 1u);
+    EXPECT_THAT(run({"explain", file}).output, HasSubstr("    cure: install what has absent"));
+}
+
+TEST_F(Command, ExplainLoadsTheFileWhenTold) {
+    const auto crash = add(L"crashesInEntryPoint").string(), kit = add(L"goodWithKit").string();
+    EXPECT_EQ(json(0, {"explain", crash}).at("files").at(0).at("verdict"), "component");
+    EXPECT_EQ(json(1, {"explain", "--load", crash}).at("files").at(0).at("verdict"), "crashed");
+    const Json entry = json(0, {"explain", "--load", kit}).at("files").at(0);
+    EXPECT_EQ(entry.at("verdict"), "works");
+    EXPECT_EQ(entry.at("label"), "Kit label");
+    EXPECT_EQ(entry.at("builders").at(0).at("name"), "kit");
+    EXPECT_EQ(json(1, {"explain", "missing"}).at("files").at(0).at("verdict"), "missing");
+}
+
+TEST_F(Command, ScanFromARelativePathServesAHost) {
+    add(L"goodWithKit");
+    const auto sub = work.path() / "sub";
+    std::filesystem::create_directory(sub);
+    const auto file = sub / "kit";
+    std::filesystem::copy_file(builtComponent(L"goodWithKit"), file);
+    EXPECT_EQ(run({"scan", "--path", "./sub/../sub/", "--cache", "list"}).exitCode, 0);
+    const auto host = buildFolder / "bin" / (std::wstring(L"recordedHost") + MZ_PROGRAM_EXTENSION);
+    EXPECT_EQ(runProgram(host, host.string(), {inWork("list"), sub.string()}, work.path()).output,
+              "1 builders, 0 mapped, no word\n1 made\n");
+}
+
+TEST_F(Command, ScanTellsWhatItDid) {
+    add(L"goodWithKit", "a");
+    add(L"crashesInEntryPoint", "b");
+    const std::string list = inWork("list");
+    const Json first = json(1, {"scan", "--cache", list});
+    EXPECT_EQ(first.at("files").at(0).at("verdict"), "works");
+    EXPECT_EQ(first.at("files").at(1).at("verdict"), "crashed");
+    EXPECT_TRUE(first.at("files").at(1).at("recorded").get<bool>());
+    const Json second = json(1, {"scan", "--cache", list});
+    EXPECT_FALSE(second.at("files").at(0).at("looked").get<bool>());
+    EXPECT_FALSE(second.at("files").at(1).at("looked").get<bool>());
+    EXPECT_TRUE(json(1, {"scan", "--retry", "--cache", list}).at("files").at(1).at("looked"));
+    EXPECT_THAT(run({"scan", "--path", path(), "--cache", list}).output,
+                HasSubstr("2 files: 1 with builders, 1 with faults, 0 others; 0 looked at, 2 "
+                          "recorded\n"));
+    EXPECT_EQ(json(1, {"list", "--cache", list}).at("files").size(), 2u);
+    EXPECT_EQ(run({"scan", "--path", path(), "--cache", inWork("no/list")}).exitCode, 1);
+}
+
+TEST_F(Command, TypesListsWhatComponentsImport) {
+    add(L"notes");
+    add(L"crashesInEntryPoint");
+    const Json types = json(0, {"types"}).at("types");
+    ASSERT_EQ(types.size(), 1u);
+    EXPECT_EQ(types[0].at("name"), "notes");
+    EXPECT_EQ(types[0].at("extensions"), Json::array({"note"}));
+    EXPECT_EQ(run({"types", "--path", path()}).output,
+              "notes                 *.note            Notes\n");
+}
+
+TEST_F(Command, ImportsStoresAndShowsObjects) {
+    add(L"notes");
+    std::ofstream(work.path() / "one.note", std::ios::binary) << "N1";
+    std::ofstream(work.path() / "other", std::ios::binary) << "x";
+    const Json entry = json(0, {"import", "one.note", "--save", inWork("saved")}).at("files").at(0);
+    EXPECT_EQ(entry.at("builderName"), "notes");
+    EXPECT_THAT(entry.at("object").get<std::string>(), HasSubstr("version 7"));
+
+    const Json objects = json(0, {"show", inWork("saved")}).at("objects");
+    // Number, class, version and value come first; the object inside is then stored once.
+    ASSERT_EQ(objects.size(), 5u);
+    EXPECT_EQ(objects[0].at("begin"), 0);
+    EXPECT_EQ(objects[0].at("end"), std::filesystem::file_size(work.path() / "saved"));
+    EXPECT_EQ(objects[1].at("begin"), 28);
+    EXPECT_EQ(objects[1].at("depth"), 1);
+    EXPECT_EQ(objects[2].at("object"), "null");
+    EXPECT_THAT(objects[4].at("object").get<std::string>(), StartsWith("again: "));
+
+    EXPECT_EQ(json(1, {"import", "other"}).at("files").at(0).at("object"),
+              "no builder imports this file");
+    EXPECT_EQ(json(1, {"import", "missing.note"}).at("files").at(0).at("object"),
+              "there is no such file");
+    std::filesystem::resize_file(work.path() / "saved", 60);
+    EXPECT_EQ(run({"show", inWork("saved"), "--path", path()}).exitCode, 1);
+}
+
+TEST_F(Command, ShowsAListWithPositions) {
+    add(L"goodWithKit", "a");
+    run({"scan", "--path", path(), "--cache", inWork("list")});
+    const Json shown = json(0, {"show", inWork("list")});
+    EXPECT_EQ(shown.at("kind"), "recordedList");
+    EXPECT_EQ(shown.at("libraries").at(0).at("position"), 4);
+    EXPECT_EQ(shown.at("libraries").at(0).at("fileName"), "a");
+    EXPECT_EQ(shown.at("libraries").at(0).at("builders").at(0).at("name"), "kit");
+    EXPECT_EQ(run({"show", inWork("missing")}).exitCode, 1);
+    std::ofstream(work.path() / "foreign") << "some text that is nothing of ours";
+    EXPECT_EQ(run({"show", inWork("foreign"), "--path", path()}).exitCode, 1);
+}
+
+TEST_F(Command, DrawsLibrariesAndBuilders) {
+    add(L"notes", "a");
+    add(L"goodWithKit", "b");
+    const ProgramResult dot = run({"graph", "--path", path()});
+    EXPECT_EQ(dot.exitCode, 0);
+    EXPECT_THAT(dot.output, StartsWith("digraph components {\n"));
+    EXPECT_THAT(dot.output, HasSubstr("label=\"Notes\""));
+    EXPECT_THAT(dot.output, HasSubstr("label=\"kit\""));
+    EXPECT_EQ(run({"graph", "--path", path(), "--output", inWork("dot")}).output, "");
+    EXPECT_EQ(contentOf(work.path() / "dot"), dot.output);
+    EXPECT_EQ(json(0, {"graph"}).at("libraries").size(), 2u);
+    // Graphviz is not everywhere; where it is not, that is said.
+    const ProgramResult drawn = run({"graph", "--path", path(), "--svg", inWork("svg")});
+    EXPECT_EQ(drawn.exitCode, std::filesystem::exists(work.path() / "svg") ? 0 : 1);
+}
+
+TEST_F(Command, TakesNamesWithBlanks) {
+    const auto folderWithBlank = work.path() / "with blank";
+    std::filesystem::create_directory(folderWithBlank);
+    std::filesystem::copy_file(builtComponent(L"goodWithKit"), folderWithBlank / "a b");
+    const ProgramResult result = run({"explain", "--load", (folderWithBlank / "a b").string()});
+    EXPECT_EQ(result.exitCode, 0) << result.output;
+}
+
+} // namespace

@@ -1,0 +1,32 @@
+#!/usr/bin/env bash
+# The completion offers what the program has: every command and every option in its help.
+#   completionTest.sh COMPLETION PROGRAM...
+set -euo pipefail
+source "$1"
+shift
+status=0
+
+complete_for() { # complete_for WORDS...: what is offered for the last of them
+    COMP_WORDS=("$@")
+    COMP_CWORD=$(($# - 1))
+    COMPREPLY=()
+    _mzcomponents 2>/dev/null
+    printf '%s\n' "${COMPREPLY[@]}"
+}
+
+expect() { # expect WORD among the lines of standard input
+    if ! grep -qxF -- "$1"; then
+        echo "not offered: $2 $1" >&2
+        status=1
+    fi
+}
+
+commands=$("$@" --help | tr -d '\r' | sed -n '/^Subcommands:/,$s/^  \([a-z]*\) .*/\1/p')
+[ "$(wc -w <<<"$commands")" = 7 ] || { echo "seven commands expected: $commands" >&2; exit 1; }
+for command in $commands; do
+    expect "$command" mzcomponents < <(complete_for mzcomponents '')
+    for option in $("$@" "$command" --help | tr -d '\r' | grep -oE '^  (-h,)?--[a-z-]+' | grep -oE -- '--[a-z-]+'); do
+        expect "$option" "mzcomponents $command" < <(complete_for mzcomponents "$command" --)
+    done
+done
+exit $status

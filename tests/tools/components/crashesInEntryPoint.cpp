@@ -1,0 +1,7 @@
+#include "components/componentManager/componentImp.h"
+#include "tests/tools/components/faults.h"
+
+extern "C" MZ_EXPORT Mz::QrCastable* QrGetComponentDescription() {
+    Mz::Test::crash();
+    return nullptr;
+}

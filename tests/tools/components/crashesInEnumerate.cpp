@@ -1,0 +1,4 @@
+#include "tests/tools/components/enumerates.h"
+#include "tests/tools/components/faults.h"
+
+MZ_TEST_ENUMERATES(Mz::Test::crash())

@@ -1,0 +1,5 @@
+#include "tests/tools/components/enumerates.h"
+
+#include <cstdlib>
+
+MZ_TEST_ENUMERATES(std::exit(0))

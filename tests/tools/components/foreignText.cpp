@@ -1,0 +1,5 @@
+/// A builder with a text that few locales can carry.
+#include "tests/components/testUids.h"
+
+MZ_PLAIN_ENTRY_POINT(Mz::Test::PlainDescription, "foreign",
+                     {{Mz::Test::testUid(0x30002), L"foreign", L"\u4E2D", L""}})

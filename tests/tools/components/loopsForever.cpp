@@ -1,0 +1,5 @@
+#include "tests/tools/components/enumerates.h"
+
+static volatile bool forever = true;
+
+MZ_TEST_ENUMERATES(while (forever){})

@@ -1,0 +1,17 @@
+/// One of many good libraries, each with a builder of its own.
+#include "tests/components/testUids.h"
+
+extern const unsigned int mzTestNumber;
+
+namespace {
+
+/// Writes that the library was really loaded.
+struct Presence {
+    Presence() { Mz::Test::note("numberedLoaded"); }
+} presence;
+
+} // namespace
+
+MZ_PLAIN_ENTRY_POINT(Mz::Test::PlainDescription, "numbered",
+                     {{Mz::Test::testUid(0x40000 + mzTestNumber), L"numbered", L"Label", L"Text",
+                       mzTestNumber, true}})

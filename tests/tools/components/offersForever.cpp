@@ -1,0 +1,6 @@
+/// Offers builders without an end.
+#include "tests/tools/components/enumerates.h"
+
+static volatile bool forever = true;
+
+MZ_TEST_ENUMERATES(while (forever) PlainDescription::enumerateBuilders(e))

@@ -1,0 +1,123 @@
+#include "components/componentTools/console.h"
+#include "components/base/assertions.h"
+#include "tests/support/temporaryDirectory.h"
+
+#include <gtest/gtest.h>
+
+#include <clocale>
+#include <csignal>
+#include <limits>
+#include <sstream>
+
+using namespace Mz;
+using namespace Mz::Tools;
+using namespace Mz::Test;
+
+namespace {
+
+class Console : public ::testing::Test {
+  protected:
+    std::ostringstream stream;
+};
+
+TEST_F(Console, WritesMessagesAsText) {
+    ConsoleController controller(stream, false);
+    controller.message(1, L"hello");
+    EXPECT_TRUE(controller.warning(1, L"doubtful"));
+    EXPECT_FALSE(controller.error(1, L"wrong"));
+    controller.log(1, L"noted");
+    controller.status(L"busy");
+    controller.message(1, nullptr);
+    EXPECT_EQ(stream.str(), "hello\nwarning: doubtful\nerror: wrong\nnoted\nbusy\n\n");
+    EXPECT_EQ(controller.errorCount(), 1);
+    EXPECT_TRUE(controller.isProgressShown() && controller.isStatusShown() &&
+                controller.isErrorShown());
+    EXPECT_EQ(controller.getContext(), nullptr);
+    EXPECT_EQ(queryCast<QrProcessControl>(&controller).get(), &controller);
+}
+
+TEST_F(Console, WritesWhatTheEncodingLacksAsAQuestionMark) {
+    std::setlocale(LC_ALL, "C");
+    ConsoleController controller(stream, false);
+    controller.message(0, L"a\u4E2Db");
+    EXPECT_EQ(stream.str(), "a?b\n");
+}
+
+TEST_F(Console, ShowsProgressInPlainLinesWhereThereIsNoTerminal) {
+    ConsoleController controller(stream, false);
+    for (int percent = 0; percent <= 25; ++percent)
+        EXPECT_TRUE(controller.progress(static_cast<float>(percent) / 100, L"work"));
+    EXPECT_EQ(stream.str(), "0% work\n10% work\n20% work\n");
+}
+
+TEST_F(Console, ShowsABarOnATerminalAndTakesItFromTheLine) {
+    ConsoleController controller(stream, true);
+    controller.progress(0.5f, L"long text");
+    EXPECT_EQ(stream.str(), "\r[###############               ]  50% long text");
+    stream.str("");
+    controller.progress(1.0f, L"x");
+    EXPECT_EQ(stream.str(), "\r[##############################] 100% x        ");
+    stream.str("");
+    controller.message(0, L"m");
+    EXPECT_EQ(stream.str(), "\r" + std::string(39, ' ') + "\rm\n");
+}
+
+TEST_F(Console, CutsABarThatWouldNotFitItsLine) {
+    ConsoleController controller(stream, true);
+    controller.progress(0.0f, std::wstring(500, L'x').c_str());
+    EXPECT_EQ(stream.str().size(), 80u);
+}
+
+TEST_F(Console, TakesAnyFraction) {
+    ConsoleController controller(stream, false);
+    controller.progress(-3.0f, L"a");
+    controller.progress(7.0f, L"b");
+    controller.progress(std::numeric_limits<float>::quiet_NaN(), L"c");
+    controller.progress(std::numeric_limits<float>::infinity(), L"d");
+    EXPECT_EQ(stream.str(), "0% a\n100% b\n0% c\n100% d\n");
+    stream.str("");
+    controller.progress(0.29f, L"e");
+    EXPECT_EQ(stream.str(), "29% e\n");
+}
+
+TEST_F(Console, AnswersThatTheUserWantsToStopAfterTheFirstInterrupt) {
+    ConsoleController controller(stream, false);
+    EXPECT_FALSE(controller.isInterrupted());
+    std::raise(SIGINT);
+    EXPECT_TRUE(controller.isInterrupted());
+    EXPECT_FALSE(controller.progress(0.5f, L""));
+    EXPECT_FALSE(controller.warning(0, L""));
+}
+
+void ownHandler(int) {}
+
+TEST_F(Console, GivesInterruptsBackAtTheEnd) {
+    std::signal(SIGINT, ownHandler);
+    {
+        ConsoleController outer(stream, false);
+        ConsoleController inner(stream, false);
+        std::raise(SIGINT);
+        EXPECT_TRUE(outer.isInterrupted());
+    }
+    EXPECT_EQ(std::signal(SIGINT, SIG_DFL), &ownHandler);
+    EXPECT_FALSE(ConsoleController(stream, false).isInterrupted());
+}
+
+TEST_F(Console, AbortsByException) {
+    ConsoleController controller(stream, false);
+    EXPECT_THROW(controller.abort(0, L"enough"), Assertions::ExProgramAborted);
+    EXPECT_EQ(stream.str(), "abort: enough\n");
+}
+
+TEST_F(Console, FindsFilesAsTheControllerBeforeIt) {
+    TemporaryDirectory folder;
+    folder.write("file", "x");
+    ConsoleController controller(stream, false);
+    QrSetSystemProcessController(&controller);
+    EXPECT_EQ(controller.findFile(L"file", folder.text().c_str(), nullptr),
+              folder.text() + L"/file");
+    EXPECT_EQ(controller.findFile(L"nothing", folder.text().c_str(), nullptr), L"");
+    QrSetSystemProcessController(nullptr);
+}
+
+} // namespace

@@ -1,0 +1,88 @@
+/// Both formats, on every system, whole and damaged.
+#include "tests/tools/images.h"
+
+#include "components/componentTools/libraryImage.h"
+#include "tests/support/temporaryDirectory.h"
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <random>
+
+using namespace Mz::Tools;
+using namespace Mz::Test;
+using ::testing::ElementsAre;
+using ::testing::IsEmpty;
+
+namespace {
+
+class Image : public ::testing::TestWithParam<ImageFormat> {
+  protected:
+    std::string whole(ImageTraits traits = {}) const {
+        return GetParam() == ImageFormat::elf ? elfLibrary(traits) : peLibrary(traits);
+    }
+
+    LibraryImage read(const std::string& bytes) {
+        return readLibraryImage(folder.write("image", bytes));
+    }
+
+    TemporaryDirectory folder;
+};
+
+TEST_P(Image, IsReadWhole) {
+    const LibraryImage image = read(whole());
+    EXPECT_TRUE(image.readable);
+    EXPECT_EQ(image.format, GetParam());
+    EXPECT_EQ(image.kind, LibraryImage::Kind::library);
+    EXPECT_EQ(image.damage, L"");
+    EXPECT_EQ(image.otherProcessor, L"");
+    EXPECT_EQ(image.entryPoint, LibraryImage::EntryPoint::function);
+    EXPECT_THAT(image.needed, ElementsAre("first.lib", "second.lib"));
+}
+
+TEST_P(Image, TellsThatTheEntryPointIsAbsentOrNoFunction) {
+    EXPECT_EQ(read(whole({.entryPoint = "QrGetComponentDescriptioN"})).entryPoint,
+              LibraryImage::EntryPoint::absent);
+    EXPECT_EQ(read(whole({.entryPoint = "QrGetComponentDescription2"})).entryPoint,
+              LibraryImage::EntryPoint::absent);
+    EXPECT_EQ(read(whole({.function = false})).entryPoint, LibraryImage::EntryPoint::noFunction);
+}
+
+TEST_P(Image, NamesAnotherProcessor) {
+    EXPECT_EQ(read(whole({.arm = true})).otherProcessor, L"ARM, 64 bits");
+}
+
+TEST_P(Image, TellsAProgram) {
+    EXPECT_EQ(read(whole({.program = true})).kind, LibraryImage::Kind::program);
+}
+
+TEST_P(Image, CutOffAnywhereIsDamagedOrNothing) {
+    const std::string bytes = whole();
+    for (std::size_t size = 0; size < bytes.size(); ++size) {
+        const LibraryImage image = read(bytes.substr(0, size));
+        ASSERT_NE(image.entryPoint, LibraryImage::EntryPoint::function) << size;
+        ASSERT_TRUE(image.format == ImageFormat::none || !image.damage.empty()) << size;
+    }
+}
+
+TEST_P(Image, DamagedInAnyWayIsReadInBoundedTime) {
+    const std::string bytes = whole();
+    std::mt19937 random(4711);
+    int unlike = 0;
+    for (int round = 0; round < 1000; ++round) {
+        std::string damaged = bytes;
+        for (std::size_t changes = random() % 4 + 1; changes > 0; --changes)
+            damaged[random() % damaged.size()] = static_cast<char>(random() % 3 ? random() : 0xFF);
+        const LibraryImage image = read(damaged);
+        EXPECT_LE(image.needed.size(), 1024u);
+        unlike += image.entryPoint != LibraryImage::EntryPoint::function;
+    }
+    EXPECT_GT(unlike, 0);
+}
+
+INSTANTIATE_TEST_SUITE_P(Formats, Image, ::testing::Values(ImageFormat::elf, ImageFormat::pe),
+                         [](const auto& format) {
+                             return format.param == ImageFormat::elf ? "Elf" : "Pe";
+                         });
+
+} // namespace

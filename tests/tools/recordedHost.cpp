@@ -1,0 +1,65 @@
+/// A host that starts with a recorded list, and tells what that cost it.
+///
+///     recordedHost LIST PATH
+///
+/// Prints how many builders it knows, how many of the candidate files were mapped for that, how
+/// many of the libraries said a word, and then whether each builder makes an object.
+#include "tests/components/testUids.h"
+#include "tests/support/testSystem.h"
+
+#include "components/componentManager/binaryStream.h"
+#include "components/componentManager/bufferio.h"
+#include "components/componentManager/persistant.h"
+
+#include <clocale>
+#include <cstdio>
+#include <filesystem>
+#include <fstream>
+#include <string>
+
+using namespace Mz;
+using namespace Mz::Test;
+
+namespace {
+
+class Collector final : public QrEnumerator<QrCPtr<QrBuilderDescription>> {
+  public:
+    Action process(QrCPtr<QrBuilderDescription> item) override {
+        uids.push_back(item->getUid());
+        return Continue;
+    }
+    std::vector<QrUid> uids;
+};
+
+void readList(const std::filesystem::path& list) {
+    std::ifstream file(list, std::ios::binary);
+    QrInBuffer buffer(&file);
+    QrBinaryStream stream(&buffer);
+    const auto companion =
+        QrPtr<QrPersistant>::adopt(safeCast<QrPersistant>(QrGetComponentManager()));
+    companion->read(stream);
+}
+
+int mappedFiles(const std::filesystem::path& folder) {
+    int count = 0;
+    for (const auto& entry : std::filesystem::directory_iterator(folder))
+        count += isMapped(entry.path());
+    return count;
+}
+
+} // namespace
+
+int main(int, char** argv) {
+    std::setlocale(LC_ALL, "");
+    readList(argv[1]);
+    const std::filesystem::path folder = argv[2];
+    QrGetComponentManager()->initialize(searchPathOf(folder).c_str());
+    Collector collector;
+    QrGetComponentManager()->enumerateBuilders(collector);
+    std::printf("%d builders, %d mapped, %s\n", static_cast<int>(collector.uids.size()),
+                mappedFiles(folder), *allNotes() ? allNotes() : "no word");
+    int made = 0;
+    for (const QrUid& uid : collector.uids)
+        made += QrGetComponentManager()->createObject(uid) ? 1 : 0;
+    std::printf("%d made\n", made);
+}

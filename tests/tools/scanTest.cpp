@@ -1,0 +1,281 @@
+#include "tests/tools/toolsFixture.h"
+
+#include "components/componentTools/utf8.h"
+
+#include <clocale>
+#include <fstream>
+#include <map>
+#include <thread>
+
+using namespace Mz;
+using namespace Mz::Tools;
+using namespace Mz::Test;
+using ::testing::HasSubstr;
+
+namespace {
+
+class Scan : public ToolsTest {
+  protected:
+    std::filesystem::path list() const { return lists.path() / "list"; }
+
+    ScanOptions options() const {
+        ScanOptions wanted;
+        wanted.folders = {folder.path()};
+        wanted.list = list();
+        wanted.probe = patient();
+        return wanted;
+    }
+
+    /// Verdicts by the name of the file, as the system spells it.
+    static std::map<std::string, Verdict> verdicts(const ScanResult& result) {
+        std::map<std::string, Verdict> all;
+        for (const ScannedFile& file : result.files)
+            all[file.path.filename().string()] = file.verdict.verdict;
+        return all;
+    }
+
+    static int looked(const ScanResult& result) {
+        int count = 0;
+        for (const ScannedFile& file : result.files)
+            count += file.looked;
+        return count;
+    }
+
+    std::string runHost(const std::filesystem::path& searched) {
+        const auto program =
+            buildFolder / "bin" / (std::wstring(L"recordedHost") + MZ_PROGRAM_EXTENSION);
+        const ProgramResult result = runProgram(program, program.string(),
+                                                {list().string(), searched.string()}, lists.path());
+        return (result.finished && result.exitCode == 0 ? "" : "failed: ") + result.output;
+    }
+
+    void addNumbered() {
+        for (int number = 10; number < 40; ++number) {
+            const auto file = builtComponent(L"numbered" + std::to_wstring(number), L"numbered");
+            std::filesystem::copy_file(file, folder.path() / file.filename());
+        }
+    }
+
+    TemporaryDirectory lists;
+};
+
+TEST_F(Scan, OfAHostileFolderEndsAndRecordsTheGoodLibrariesWithTheTrueVerdictOnEveryOther) {
+    addNumbered();
+    const std::map<std::wstring, Verdict> faults = {
+        {L"crashesInInitialiser", Verdict::crashed},
+        {L"crashesInEntryPoint", Verdict::crashed},
+        {L"crashesInEnumerate", Verdict::crashed},
+        {L"aborts", Verdict::aborted},
+        {L"exits", Verdict::exited},
+        {L"loopsForever", Verdict::timedOut},
+        {L"eatsMemory", Verdict::outOfMemory},
+        {L"offersForever", Verdict::outOfMemory},
+        {L"missesDependency", Verdict::dependencyMissing},
+        {L"noEntryPoint", Verdict::noEntryPoint},
+        {L"dataEntryPoint", Verdict::entryPointNoFunction},
+        {L"nullDescription", Verdict::nullDescription},
+        {L"wrongInterface", Verdict::wrongInterface},
+        {L"throwsInEntryPoint", Verdict::threw},
+        {L"throwsInEnumerate", Verdict::threw},
+        {L"offersNull", Verdict::wrongItem},
+    };
+    for (const auto& [name, verdict] : faults)
+        add(name);
+    folder.write("text.txt", "no library");
+    const std::string good = contentOf(builtComponent(L"goodByHand"));
+    folder.write("processor", forOtherProcessor(good));
+    folder.write("cut", good.substr(0, good.size() / 2));
+
+    ScanOptions wanted = options();
+    wanted.probe.timeLimit = std::chrono::seconds(15);
+    wanted.probe.memoryLimit = std::uint64_t{300} << 20;
+    const ScanResult result = scan(wanted);
+
+    std::map<std::string, Verdict> all = verdicts(result);
+    for (const auto& [name, verdict] : faults) {
+        const std::filesystem::path file = name + MZ_LIBRARY_EXTENSION;
+        EXPECT_EQ(all[file.string()], verdict) << file;
+    }
+    EXPECT_EQ(all["text.txt"], Verdict::notALibrary);
+    EXPECT_EQ(all["processor"], Verdict::otherProcessor);
+    EXPECT_EQ(all["cut"], Verdict::damaged);
+    int works = 0;
+    for (const auto& [name, verdict] : all)
+        works += verdict == Verdict::works;
+    EXPECT_EQ(works, 30);
+    EXPECT_EQ(result.libraries.size(), 30 + faults.size() + 3);
+
+    const ListReading reading = readRecordedList(list());
+    ASSERT_EQ(reading.state, ListReading::State::good);
+    EXPECT_EQ(reading.libraries.size(), result.libraries.size());
+    // A host that starts with the list runs none of them: it neither maps a file nor hears a word.
+    EXPECT_EQ(runHost(folder.path()), "30 builders, 0 mapped, no word\n30 made\n");
+
+    // Nothing but what may have been mended from outside is looked at again.
+    const ScanResult second = scan(wanted);
+    EXPECT_EQ(looked(second), 1);
+    EXPECT_EQ(verdicts(second), verdicts(result));
+}
+
+TEST_F(Scan, WritesWhatTheManagerItselfWouldWrite) {
+    // The manager of this process, which must not meet a library that takes it down.
+    add(L"goodWithKit");
+    add(L"noEntryPoint");
+    folder.write("text", "no library");
+    scan(options());
+    EXPECT_EQ(runHost(folder.path()), "1 builders, 0 mapped, no word\n1 made\n");
+}
+
+TEST_F(Scan, LooksAgainAtALibraryThatChanged) {
+    const auto file = add(L"changingOne", "changing");
+    EXPECT_EQ(looked(scan(options())), 1);
+    EXPECT_EQ(looked(scan(options())), 0);
+    std::ofstream(file, std::ios::binary | std::ios::app) << "more";
+    EXPECT_EQ(looked(scan(options())), 1);
+    EXPECT_EQ(looked(scan(options())), 0);
+}
+
+TEST_F(Scan, TriesALibraryAgainWhoseDependencyWasMissing) {
+    add(L"missesDependency");
+    EXPECT_EQ(verdicts(scan(options())).begin()->second, Verdict::dependencyMissing);
+    EXPECT_EQ(looked(scan(options())), 1);
+}
+
+TEST_F(Scan, TriesAFailureAgainOnlyWhenTold) {
+    add(L"crashesInEntryPoint");
+    EXPECT_EQ(looked(scan(options())), 1);
+    EXPECT_EQ(looked(scan(options())), 0);
+    ScanOptions retrying = options();
+    retrying.retry = true;
+    EXPECT_EQ(looked(scan(retrying)), 1);
+}
+
+TEST_F(Scan, TriesARecordWithoutBuildersThatSomebodyElseWrote) {
+    add(L"goodWithKit");
+    ScanResult first = scan(options());
+    first.libraries[0].builders.clear();
+    writeRecordedList(list(), first.libraries);
+    std::filesystem::remove(verdictsFileOf(list()));
+    EXPECT_EQ(verdicts(scan(options())).begin()->second, Verdict::works);
+}
+
+TEST_F(Scan, RejectsADamagedListWholeAndBuildsItAnew) {
+    add(L"goodWithKit");
+    std::ofstream(list(), std::ios::binary) << "something else";
+    const ScanResult result = scan(options());
+    EXPECT_THAT(result.rejected, HasSubstr(L"byte"));
+    EXPECT_EQ(looked(result), 1);
+    EXPECT_EQ(readRecordedList(list()).state, ListReading::State::good);
+    EXPECT_EQ(scan(options()).rejected, L"");
+}
+
+TEST_F(Scan, KeepsVerdictsBesideTheListInAFileThatMayBeLostOrDamaged) {
+    add(L"crashesInEntryPoint");
+    scan(options());
+    const std::string kept = contentOf(verdictsFileOf(list()));
+    EXPECT_THAT(kept, HasSubstr("\"verdict\": \"crashed\""));
+    EXPECT_THAT(kept, HasSubstr("\"sentence\": \"it crashes in its entry point"));
+    for (const char* damage : {"", "{", "[]", "{\"version\": \"x\"}", "{\"version\": 1}",
+                               "nonsense", "{\"version\": 1, \"libraries\": [{\"verdict\": 7}]}"}) {
+        std::ofstream(verdictsFileOf(list()), std::ios::binary) << damage;
+        EXPECT_EQ(verdicts(scan(options())).begin()->second, Verdict::crashed) << damage;
+        EXPECT_EQ(contentOf(verdictsFileOf(list())), kept) << damage;
+    }
+}
+
+TEST_F(Scan, ForgetsLibrariesThatHaveGone) {
+    const auto file = add(L"goodWithKit");
+    add(L"countedDescription");
+    EXPECT_EQ(scan(options()).libraries.size(), 2u);
+    std::filesystem::remove(file);
+    EXPECT_EQ(scan(options()).libraries.size(), 1u);
+}
+
+TEST_F(Scan, WithoutAListRecordsNothing) {
+    add(L"goodWithKit");
+    ScanOptions wanted = options();
+    wanted.list.clear();
+    EXPECT_EQ(scan(wanted).libraries.size(), 1u);
+    EXPECT_TRUE(std::filesystem::is_empty(lists.path()));
+}
+
+TEST_F(Scan, LeavesOutATextThatTheLocaleDoesNotCarry) {
+    std::setlocale(LC_ALL, "C");
+    add(L"foreignText");
+    add(L"goodWithKit");
+    const ScanResult result = scan(options());
+    EXPECT_EQ(result.libraries.size(), 1u);
+    EXPECT_EQ(verdicts(result)[add(L"foreignText").filename().string()], Verdict::textNotCarried);
+}
+
+TEST_F(Scan, LeavesOutAFileAndAFolderWhoseNameTheLocaleDoesNotCarry) {
+    // Where names are bytes, some are no text; elsewhere some have no form in "C".
+    const bool bytes = std::setlocale(LC_ALL, "C.UTF-8") != nullptr;
+    if (!bytes)
+        std::setlocale(LC_ALL, "C");
+    const std::filesystem::path name =
+        bytes ? std::filesystem::path(std::string("\xFF")) : std::filesystem::path(L"\u4E2D");
+    add(L"goodWithKit");
+    add(L"countedDescription", name);
+    std::filesystem::create_directory(lists.path() / name);
+    ScanOptions wanted = options();
+    wanted.folders.push_back(lists.path() / name);
+    const ScanResult result = scan(wanted);
+    ASSERT_EQ(result.files.size(), 3u);
+    EXPECT_EQ(result.files[0].verdict.verdict, Verdict::works);
+    EXPECT_EQ(result.files[1].verdict.verdict, Verdict::nameNotCarried);
+    EXPECT_EQ(result.files[2].verdict.verdict, Verdict::nameNotCarried);
+    EXPECT_EQ(readRecordedList(list()).libraries.size(), 1u);
+}
+
+TEST_F(Scan, StopsWhenTheUserWantsAndKeepsTheRestOfTheOldList) {
+    class Impatient final : public QrCastImpl<Impatient, QrProcessControl> {
+      public:
+        void* getContext() override { return nullptr; }
+        void message(int, const wchar_t*) override {}
+        bool isInterrupted() override { return true; }
+        bool warning(int, const wchar_t*) override { return true; }
+        bool isProgressShown() override { return true; }
+        bool progress(float, const wchar_t*) override { return true; }
+        bool isStatusShown() override { return false; }
+        void status(const wchar_t*) override {}
+        bool error(int, const wchar_t*) override { return false; }
+        bool isErrorShown() override { return false; }
+        void log(int, const wchar_t*) override {}
+        [[noreturn]] void abort(int, const wchar_t*) override { throw 1; }
+        std::wstring findFile(const wchar_t*, const wchar_t*, const wchar_t*) override {
+            return {};
+        }
+    } impatient;
+    add(L"goodWithKit");
+    scan(options());
+    add(L"loopsForever");
+    ScanOptions wanted = options();
+    wanted.controller = &impatient;
+    const ScanResult result = scan(wanted);
+    EXPECT_TRUE(result.interrupted);
+    EXPECT_EQ(result.libraries.size(), 1u);
+    EXPECT_EQ(readRecordedList(list()).libraries.size(), 1u);
+}
+
+TEST_F(Scan, TwoAtOnceLeaveAWholeList) {
+    add(L"goodWithKit");
+    add(L"countedDescription");
+    std::thread other([this] { scan(options()); });
+    scan(options());
+    other.join();
+    const ListReading reading = readRecordedList(list());
+    EXPECT_EQ(reading.state, ListReading::State::good);
+    EXPECT_EQ(reading.libraries.size(), 2u);
+}
+
+TEST_F(Scan, MakesSearchPathsAbsoluteAndPlain) {
+    const auto here = std::filesystem::current_path();
+    const auto folders = foldersOf("a/./b/../c/;;" + (here / "x").string() + ";");
+    ASSERT_EQ(folders.size(), 2u);
+    EXPECT_EQ(folders[0], here / "a" / "c");
+    EXPECT_EQ(folders[1], here / "x");
+    EXPECT_TRUE(foldersOf(";;").empty());
+}
+
+} // namespace

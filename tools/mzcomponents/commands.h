@@ -1,0 +1,54 @@
+/// The commands of mzcomponents. Each writes its result to standard output, says what went wrong on
+/// standard error, and returns the exit status.
+#pragma once
+
+#include "components/componentTools/console.h"
+#include "components/componentTools/scan.h"
+
+#include <filesystem>
+#include <string>
+#include <vector>
+
+namespace Mz::Commands {
+
+/// Exit statuses.
+inline constexpr int good = 0;
+inline constexpr int subjectIsWrong = 1; ///< a library, a file or a folder
+inline constexpr int wrongUse = 2;
+
+/// What every command takes.
+struct Common {
+    std::string path = "."; ///< as given: folders, separated by ';'
+    std::string cache;      ///< the recorded list; empty for none
+    bool json = false;
+};
+
+struct ExplainArguments {
+    std::vector<std::string> files;
+    bool load = false;
+};
+
+struct ProbeArguments {
+    double seconds = 10;
+    unsigned int mebibytes = 1024;
+    bool retry = false;
+};
+
+struct ImportArguments {
+    std::vector<std::string> files;
+    std::string save;
+};
+
+struct GraphArguments {
+    std::string output, svg;
+};
+
+int list(const Common& common);
+int explain(const Common& common, const ExplainArguments& arguments, const ProbeArguments& probe);
+int scan(const Common& common, const ProbeArguments& probe);
+int types(const Common& common);
+int import(const Common& common, const ImportArguments& arguments);
+int show(const Common& common, const std::string& file);
+int graph(const Common& common, const GraphArguments& arguments);
+
+} // namespace Mz::Commands

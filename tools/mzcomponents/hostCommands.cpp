@@ -1,0 +1,248 @@
+/// The commands that use components: types, import, graph.
+#include "tools/mzcomponents/host.h"
+#include "tools/mzcomponents/output.h"
+
+#include "components/componentManager/binaryStream.h"
+#include "components/componentManager/bufferio.h"
+#include "components/componentTools/discovery.h"
+#include "components/componentTools/graph.h"
+#include "components/objectIO/objectIO.h"
+
+#include <algorithm>
+#include <fstream>
+#include <iostream>
+#include <set>
+#include <sstream>
+
+namespace Mz::Commands {
+
+namespace {
+
+std::wstring widened(const char* text) {
+    const std::string bytes = text ? text : "";
+    return std::wstring(bytes.begin(), bytes.end());
+}
+
+/// An importer for whatever builders carry a name.
+class FamilyImporter final : public QrCastImpl<FamilyImporter, QrBaseImporter> {
+  public:
+    explicit FamilyImporter(std::wstring builderName) : name(std::move(builderName)) {}
+    const wchar_t* getBuilderName() const override { return name.c_str(); }
+
+  private:
+    std::wstring name;
+};
+
+/// The names of all builders that import files, those first that read the file's extension.
+std::vector<std::wstring> familiesFor(const Host& host, const std::filesystem::path& file) {
+    std::vector<std::wstring> reading, others;
+    const std::wstring name = Tools::displayName(file);
+    const std::wstring extension = name.substr(name.rfind(L'.') + 1);
+    for (const QrCPtr<QrBuilderDescription>& builder : host.builders()) {
+        const QrCPtr<QrImportBuilder> importer = importBuilder(*builder);
+        if (!importer)
+            continue;
+        const auto extensions = extensionsOf(*importer);
+        const bool reads =
+            std::find(extensions.begin(), extensions.end(), extension) != extensions.end();
+        (reads ? reading : others).emplace_back(builder->getName());
+    }
+    reading.insert(reading.end(), others.begin(), others.end());
+    std::vector<std::wstring> families;
+    for (const std::wstring& family : reading)
+        if (std::find(families.begin(), families.end(), family) == families.end())
+            families.push_back(family);
+    return families;
+}
+
+struct Imported {
+    QrRef<QrCastable> object;
+    std::wstring family; ///< the name of the builders through which it came
+    std::wstring reason; ///< why there is no object
+};
+
+/// Tries one family after the other. What a builder throws is the reason of the failure.
+Imported importFile(const Host& host, const std::filesystem::path& file) {
+    Imported imported;
+    imported.reason = L"there is no such file";
+    if (!std::filesystem::is_regular_file(file))
+        return imported;
+    imported.reason = L"no builder imports this file";
+    const std::wstring name = Tools::displayName(file);
+    try {
+        for (const std::wstring& family : familiesFor(host, file)) {
+            bool found = false;
+            imported.family = family;
+            imported.object = FamilyImporter(family).import(name.c_str(), nullptr, found);
+            if (imported.object)
+                break;
+        }
+    } catch (const std::exception& failure) {
+        imported.reason = widened(failure.what());
+    }
+    return imported;
+}
+
+std::wstring describe(const QrCastable* object) {
+    const auto persistant = queryCast<QrPersistant>(const_cast<QrCastable*>(object));
+    if (!persistant)
+        return L"an object that cannot be stored";
+    return L"class " + Tools::textOf(*persistant->getClassUid()) + L", version " +
+           std::to_wstring(persistant->getVersion());
+}
+
+Json jsonOf(const std::filesystem::path& file, const Imported& imported) {
+    const bool good = static_cast<bool>(imported.object);
+    return {{"file", utf8(Tools::displayName(file))},
+            {"imported", good},
+            {"builderName", good ? utf8(imported.family) : ""},
+            {"object", utf8(good ? describe(imported.object.get()) : imported.reason)}};
+}
+
+/// Failures go to standard error, and successes to standard output unless something else does.
+void tell(Host& host, const std::filesystem::path& file, const Imported& imported, bool success) {
+    const std::wstring name = Tools::displayName(file);
+    if (!imported.object)
+        host.console().error(0, (name + L": " + imported.reason).c_str());
+    else if (success)
+        printLine(name + L": imported through \"" + imported.family + L"\": " +
+                  describe(imported.object.get()));
+}
+
+/// Writes the objects one after the other; they are complete or not written at all.
+void save(const std::vector<QrRef<QrCastable>>& objects, const std::filesystem::path& file) {
+    std::ostringstream content;
+    QrOutBuffer bytes(&content);
+    {
+        QrObjectOutBuffer whole(&bytes);
+        QrBinaryStream stream(&whole);
+        for (const QrRef<QrCastable>& object : objects)
+            stream << object.get();
+    }
+    std::ofstream output(file, std::ios::binary);
+    output << content.str();
+    output.close();
+    if (!output)
+        throw QrStreamEx::ExWriteOpen("tools/mzcomponents/hostCommands", __LINE__,
+                                      Tools::forOutput(Tools::displayName(file)).c_str());
+}
+
+/// Which builders make importers, and of what.
+std::vector<Tools::GraphImporter> importersOf(const Host& host) {
+    std::vector<Tools::GraphImporter> importers;
+    for (const QrCPtr<QrBuilderDescription>& builder : host.builders()) {
+        try {
+            const QrRef<QrCastable> object =
+                QrGetComponentManager()->createObject(builder->getUid());
+            if (const auto importer = queryCast<QrImporter>(object.get()))
+                importers.push_back({builder->getUid(), importer->getBuilderName()});
+        } catch (...) {
+            continue; // What another library throws when it should make an object.
+        }
+    }
+    return importers;
+}
+
+Json jsonOf(const Host& host, const std::vector<Tools::GraphImporter>& importers) {
+    Json libraries = Json::array(), used = Json::array();
+    for (const Tools::RecordedLibrary& library : host.libraries()) {
+        if (library.builders.empty())
+            continue;
+        libraries.push_back(Commands::jsonOf(library));
+        // Positions are of the file that a list was read from.
+        libraries.back().erase("position");
+        for (Json& builder : libraries.back()["builders"])
+            builder.erase("position");
+    }
+    for (const Tools::GraphImporter& importer : importers)
+        used.push_back({{"uid", utf8(Tools::textOf(importer.uid))},
+                        {"importsThrough", utf8(importer.builderName)}});
+    return {{"libraries", libraries}, {"importers", used}};
+}
+
+void write(const std::string& content, const std::string& file) {
+    std::ofstream output(Tools::pathOf(file), std::ios::binary);
+    output << content;
+    output.close();
+    if (!output)
+        throw QrStreamEx::ExWriteOpen("tools/mzcomponents/hostCommands", __LINE__, file.c_str());
+}
+
+} // namespace
+
+int types(const Common& common) {
+    Host host(common);
+    if (host.interrupted())
+        return subjectIsWrong;
+    Json all = Json::array();
+    for (const QrCPtr<QrBuilderDescription>& builder : host.builders()) {
+        const QrCPtr<QrImportBuilder> importer = importBuilder(*builder);
+        if (!importer)
+            continue;
+        std::wstring patterns;
+        Json extensions = Json::array();
+        for (const std::wstring& extension : extensionsOf(*importer)) {
+            patterns += (patterns.empty() ? L"*." : L";*.") + extension;
+            extensions.push_back(utf8(extension));
+        }
+        if (common.json)
+            all.push_back({{"name", utf8(builder->getName())},
+                           {"label", utf8(builder->getLabel())},
+                           {"extensions", extensions},
+                           {"uid", utf8(Tools::textOf(builder->getUid()))}});
+        else
+            printLine(padded(builder->getName(), 20) + L"  " + padded(patterns, 16) + L"  " +
+                      builder->getLabel());
+    }
+    if (common.json)
+        printJson({{"types", all}});
+    return good;
+}
+
+int import(const Common& common, const ImportArguments& arguments) {
+    Host host(common);
+    if (host.interrupted())
+        return subjectIsWrong;
+    std::vector<QrRef<QrCastable>> objects;
+    Json files = Json::array();
+    for (const std::string& argument : arguments.files) {
+        const std::filesystem::path file = Tools::pathOf(argument);
+        const Imported imported = importFile(host, file);
+        host.console().clearLine();
+        if (imported.object)
+            objects.push_back(imported.object);
+        if (common.json)
+            files.push_back(jsonOf(file, imported));
+        tell(host, file, imported, !common.json);
+    }
+    if (common.json)
+        printJson({{"files", files}});
+    if (objects.size() < arguments.files.size())
+        return subjectIsWrong;
+    if (!arguments.save.empty())
+        save(objects, Tools::pathOf(arguments.save));
+    return good;
+}
+
+int graph(const Common& common, const GraphArguments& arguments) {
+    Host host(common);
+    if (host.interrupted())
+        return subjectIsWrong;
+    const std::vector<Tools::GraphImporter> importers = importersOf(host);
+    const std::string dot = Tools::dotOf(host.libraries(), importers);
+    if (common.json) {
+        printJson(jsonOf(host, importers));
+    } else if (arguments.output.empty() && arguments.svg.empty()) {
+        std::cout << dot;
+    }
+    if (!arguments.output.empty())
+        write(dot, arguments.output);
+    std::wstring why;
+    if (!arguments.svg.empty() && !Tools::drawSvg(dot, Tools::pathOf(arguments.svg), why)) {
+        host.console().error(0, why.c_str());
+        return subjectIsWrong;
+    }
+    return good;
+}
+
+} // namespace Mz::Commands

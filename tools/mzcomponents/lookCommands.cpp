@@ -1,0 +1,216 @@
+/// The commands that look at files: list, explain, scan.
+#include "tools/mzcomponents/commands.h"
+#include "tools/mzcomponents/output.h"
+
+#include "components/componentTools/discovery.h"
+
+#include <algorithm>
+#include <iostream>
+
+namespace Mz::Commands {
+
+namespace {
+
+constexpr std::size_t nameWidth = 20;
+
+/// The list that was asked for; a rejected one is told of and counts as empty.
+struct Recorded {
+    explicit Recorded(const Common& common) {
+        if (common.cache.empty())
+            return;
+        Tools::ListReading reading = Tools::readRecordedList(Tools::pathOf(common.cache));
+        wanted = true;
+        sound = reading.state == Tools::ListReading::State::good;
+        if (!sound)
+            std::cerr << "mzcomponents: " << common.cache << ": "
+                      << (reading.state == Tools::ListReading::State::missing
+                              ? "there is no such list"
+                              : "no recorded list: " + utf8(reading.reason))
+                      << '\n';
+        libraries = std::move(reading.libraries);
+    }
+
+    const Tools::RecordedLibraries* get() const { return wanted ? &libraries : nullptr; }
+
+    bool wanted = false, sound = true;
+    Tools::RecordedLibraries libraries;
+};
+
+void printFile(const std::filesystem::path& file, const Tools::Finding& finding,
+               const std::vector<Tools::Finding>& notes) {
+    std::wstring line = padded(nameOf(finding), nameWidth) + L"  " + Tools::displayName(file);
+    for (const Tools::Finding& note : notes)
+        line += L"  " + nameOf(note);
+    printLine(line);
+}
+
+Json jsonOfFile(const std::filesystem::path& file, const Tools::Finding& finding,
+                const std::vector<Tools::Finding>& notes) {
+    Json entry{{"file", utf8(Tools::displayName(file))}};
+    entry.update(jsonOf(finding));
+    entry["notes"] = Json::array();
+    for (const Tools::Finding& note : notes)
+        entry["notes"].push_back(jsonOf(note));
+    return entry;
+}
+
+void printExplanation(const Tools::Explanation& explanation) {
+    printLine(Tools::displayName(explanation.file) + L": " + nameOf(explanation.verdict));
+    const auto tell = [](const Tools::Finding& finding) {
+        printLine(L"  " + Tools::sentenceOf(finding));
+        if (const std::wstring cure = Tools::cureOf(finding); !cure.empty())
+            printLine(L"    cure: " + cure);
+    };
+    tell(explanation.verdict);
+    for (const Tools::Finding& note : explanation.notes)
+        tell(note);
+    if (!explanation.label.empty() || !explanation.text.empty())
+        printLine(L"  says of itself: " + explanation.label + L"; " + explanation.text);
+    for (const Tools::RecordedBuilder& builder : explanation.builders)
+        printLine(L"  builder " + Tools::textOf(builder.uid) + L"  " + builder.name + L"  " +
+                  builder.label);
+    for (const Tools::Dependency& dependency : explanation.dependencies)
+        printLine(L"  needs " + dependency.name + L": " +
+                  (!dependency.found         ? L"not found"
+                   : dependency.path.empty() ? L"known to the system"
+                                             : dependency.path));
+}
+
+Json jsonOfExplanation(const Tools::Explanation& explanation) {
+    Json entry = jsonOfFile(explanation.file, explanation.verdict, explanation.notes);
+    entry["label"] = utf8(explanation.label);
+    entry["text"] = utf8(explanation.text);
+    entry["builders"] = Json::array();
+    for (const Tools::RecordedBuilder& builder : explanation.builders)
+        entry["builders"].push_back(jsonOf(builder));
+    entry["dependencies"] = Json::array();
+    for (const Tools::Dependency& dependency : explanation.dependencies)
+        entry["dependencies"].push_back({{"name", utf8(dependency.name)},
+                                         {"found", dependency.found},
+                                         {"path", utf8(dependency.path)},
+                                         {"neededBy", utf8(dependency.neededBy)}});
+    return entry;
+}
+
+Tools::ProbeOptions probeOptions(const ProbeArguments& arguments) {
+    Tools::ProbeOptions options;
+    options.timeLimit = std::chrono::milliseconds(static_cast<long long>(arguments.seconds * 1000));
+    options.memoryLimit = std::uint64_t{arguments.mebibytes} << 20;
+    return options;
+}
+
+void printSummary(const Tools::ScanResult& result) {
+    std::size_t works = 0, faults = 0, looked = 0;
+    for (const Tools::ScannedFile& file : result.files) {
+        works += file.verdict.verdict == Tools::Verdict::works;
+        faults += isFault(file.verdict);
+        looked += file.looked;
+    }
+    std::cout << result.files.size() << " files: " << works << " with builders, " << faults
+              << " with faults, " << result.files.size() - works - faults << " others; " << looked
+              << " looked at, " << result.libraries.size() << " recorded\n";
+}
+
+} // namespace
+
+int list(const Common& common) {
+    const Recorded recorded(common);
+    const Tools::Discovery discovery =
+        Tools::discover(Tools::foldersOf(Tools::pathOf(common.path)));
+    Tools::ExplainOptions options;
+    options.recorded = recorded.get();
+    Json files = Json::array();
+    bool faults = !recorded.sound;
+    const auto tell = [&](const std::filesystem::path& file, const Tools::Finding& finding,
+                          const std::vector<Tools::Finding>& notes) {
+        faults = faults || isFault(finding);
+        if (common.json)
+            files.push_back(jsonOfFile(file, finding, notes));
+        else
+            printFile(file, finding, notes);
+    };
+    // A component that failed when it was scanned shows no fault from the outside.
+    const auto failedEarlier = [](const Tools::Explanation& explanation) {
+        return explanation.verdict.verdict == Tools::Verdict::component &&
+               !explanation.notes.empty() &&
+               explanation.notes.front().verdict == Tools::Verdict::recordedFailed;
+    };
+    for (const Tools::Candidate& candidate : discovery.candidates) {
+        // What is no component library need not be asked what it needs.
+        options.followDependencies = false;
+        Tools::Explanation explanation = Tools::explainFile(candidate.path, options);
+        options.followDependencies = true;
+        if (explanation.verdict.verdict == Tools::Verdict::component)
+            explanation = Tools::explainFile(candidate.path, options);
+        faults = faults || failedEarlier(explanation);
+        tell(candidate.path, explanation.verdict, explanation.notes);
+    }
+    for (const Tools::Discovery::LeftOut& left : discovery.leftOut)
+        tell(left.path, left.finding, {});
+    if (common.json)
+        printJson({{"files", files}});
+    return faults ? subjectIsWrong : good;
+}
+
+int explain(const Common& common, const ExplainArguments& arguments, const ProbeArguments& probe) {
+    const Recorded recorded(common);
+    Tools::ConsoleController controller;
+    Tools::ExplainOptions options;
+    options.recorded = recorded.get();
+    options.load = arguments.load;
+    options.probe = probeOptions(probe);
+    options.probe.interrupted = [&] { return controller.isInterrupted(); };
+    Json files = Json::array();
+    bool faults = !recorded.sound;
+    for (const std::string& file : arguments.files) {
+        const Tools::Explanation explanation = Tools::explainFile(Tools::pathOf(file), options);
+        // Asked why a file is no component, anything but a component is an answer of that kind.
+        faults = faults || Tools::severityOf(explanation.verdict.verdict) != Tools::Severity::good;
+        if (common.json)
+            files.push_back(jsonOfExplanation(explanation));
+        else
+            printExplanation(explanation);
+    }
+    if (common.json)
+        printJson({{"files", files}});
+    return faults ? subjectIsWrong : good;
+}
+
+int scan(const Common& common, const ProbeArguments& probe) {
+    Tools::ConsoleController controller;
+    Tools::ScanOptions options;
+    options.folders = Tools::foldersOf(Tools::pathOf(common.path));
+    options.list = Tools::pathOf(common.cache);
+    options.retry = probe.retry;
+    options.probe = probeOptions(probe);
+    options.controller = &controller;
+    const Tools::ScanResult result = Tools::scan(options);
+    controller.clearLine();
+    if (!result.rejected.empty())
+        controller.warning(0, (Tools::displayName(options.list) +
+                               L": the old list was rejected and built anew: " + result.rejected)
+                                  .c_str());
+    bool faults = result.interrupted;
+    Json files = Json::array();
+    for (const Tools::ScannedFile& file : result.files) {
+        faults = faults || isFault(file.verdict);
+        if (common.json) {
+            files.push_back(jsonOfFile(file.path, file.verdict, file.notes));
+            files.back()["recorded"] = file.recorded;
+            files.back()["looked"] = file.looked;
+        } else {
+            printFile(file.path, file.verdict, file.notes);
+            if (isFault(file.verdict))
+                printLine(std::wstring(nameWidth + 2, L' ') + Tools::sentenceOf(file.verdict));
+        }
+    }
+    if (common.json)
+        printJson({{"files", files},
+                   {"rejected", utf8(result.rejected)},
+                   {"interrupted", result.interrupted}});
+    else
+        printSummary(result);
+    return faults ? subjectIsWrong : good;
+}
+
+} // namespace Mz::Commands

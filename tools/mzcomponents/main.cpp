@@ -1,0 +1,173 @@
+/// mzcomponents: looks at component libraries, and uses them, from the command line.
+#include "tools/mzcomponents/commands.h"
+
+#include <CLI/CLI.hpp>
+#include <algorithm>
+#include <clocale>
+#include <exception>
+#include <functional>
+#include <iostream>
+#include <utility>
+
+using namespace Mz::Commands;
+
+namespace {
+
+constexpr const char* about =
+    "Tells which component libraries there are, why a file is none, and what they can do.\n\n"
+    "Exit status: 0 all is well; 1 something is wrong with a library, a file or a folder; 2 wrong "
+    "use.";
+
+/// Everything that the command line can say.
+struct Arguments {
+    Common common;
+    ExplainArguments explain;
+    ProbeArguments probe;
+    ImportArguments import;
+    GraphArguments graph;
+    std::string shown;
+    std::function<int()> command;
+};
+
+CLI::App* addCommand(CLI::App& app, Arguments& arguments, const char* name, const char* text,
+                     const char* example) {
+    CLI::App* command = app.add_subcommand(name, text);
+    command->add_option("--path", arguments.common.path,
+                        "The folders to search, separated by ';'; the current one if not given");
+    command->add_flag("--json", arguments.common.json, "Write the result as JSON");
+    command->footer(std::string("Example:\n  ") + example);
+    return command;
+}
+
+void addCache(CLI::App* command, Arguments& arguments, const char* text) {
+    command->add_option("--cache", arguments.common.cache, text);
+}
+
+void addLimits(CLI::App* command, Arguments& arguments) {
+    command
+        ->add_option("--time-limit", arguments.probe.seconds,
+                     "Seconds that a library may take to load and describe itself")
+        ->check(CLI::Range(0.1, 86400.0))
+        ->capture_default_str();
+    command
+        ->add_option("--memory-limit", arguments.probe.mebibytes,
+                     "MiB that its process may use meanwhile")
+        ->check(CLI::Range(16u, 1u << 20))
+        ->capture_default_str();
+}
+
+constexpr const char* readCache = "A recorded list to look files up in";
+constexpr const char* updatedCache = "A recorded list to bring up to date and use";
+
+void addLookCommands(CLI::App& app, Arguments& arguments) {
+    CLI::App* list =
+        addCommand(app, arguments, "list",
+                   "Lists the candidate files of the search path, each with its verdict. Runs "
+                   "nothing of them.",
+                   "mzcomponents list --path /opt/app/components");
+    addCache(list, arguments, readCache);
+    list->callback(
+        [&] { arguments.command = [&] { return Mz::Commands::list(arguments.common); }; });
+
+    CLI::App* explain = addCommand(
+        app, arguments, "explain",
+        "Explains why each file is, or is not, a component library, and what to do about it.",
+        "mzcomponents explain --load /opt/app/components/mesh.so");
+    explain->add_option("FILE", arguments.explain.files, "The files")->required();
+    explain->add_flag("--load", arguments.explain.load,
+                      "Load each file, in a process of its own, and say how that went");
+    addCache(explain, arguments, readCache);
+    addLimits(explain, arguments);
+    explain->callback([&] {
+        arguments.command = [&] {
+            return Mz::Commands::explain(arguments.common, arguments.explain, arguments.probe);
+        };
+    });
+
+    CLI::App* scan = addCommand(
+        app, arguments, "scan",
+        "Loads what is new in processes of their own and brings the recorded list up to date: a "
+        "host that reads it loads none of these libraries at start.",
+        "mzcomponents scan --cache ~/.cache/app/components.list --path /opt/app/components");
+    scan->add_option("--cache", arguments.common.cache, "The recorded list to bring up to date")
+        ->required();
+    scan->add_flag("--retry", arguments.probe.retry, "Try libraries that failed earlier again");
+    addLimits(scan, arguments);
+    scan->callback([&] {
+        arguments.command = [&] { return Mz::Commands::scan(arguments.common, arguments.probe); };
+    });
+}
+
+void addUseCommands(CLI::App& app, Arguments& arguments) {
+    CLI::App* types =
+        addCommand(app, arguments, "types", "Lists the file types that the components import.",
+                   "mzcomponents types --path /opt/app/components");
+    addCache(types, arguments, updatedCache);
+    types->callback(
+        [&] { arguments.command = [&] { return Mz::Commands::types(arguments.common); }; });
+
+    CLI::App* import = addCommand(app, arguments, "import",
+                                  "Imports files through whichever component can read them.",
+                                  "mzcomponents import part.obj --path /opt/app/components");
+    import->add_option("FILE", arguments.import.files, "The files")->required();
+    import->add_option("--save", arguments.import.save,
+                       "Store the imported objects in this file, if all of them can be stored");
+    addCache(import, arguments, updatedCache);
+    import->callback([&] {
+        arguments.command = [&] {
+            return Mz::Commands::import(arguments.common, arguments.import);
+};
+} // namespace
+);
+
+CLI::App* show = addCommand(
+    app, arguments, "show",
+    "Shows a recorded list, or the objects stored in a file, with their positions in bytes.",
+    "mzcomponents show ~/.cache/app/components.list");
+show->add_option("FILE", arguments.shown, "The file")->required();
+addCache(show, arguments, updatedCache);
+show->callback([&] {
+    arguments.command = [&] { return Mz::Commands::show(arguments.common, arguments.shown); };
+});
+
+CLI::App* graph =
+    addCommand(app, arguments, "graph",
+               "Draws the libraries, their builders, and the importers that use them, as DOT.",
+               "mzcomponents graph --path /opt/app/components --svg components.svg");
+graph->add_option("--output", arguments.graph.output,
+                  "Write the DOT text to this file and not to standard output");
+graph->add_option("--svg", arguments.graph.svg,
+                  "Have Graphviz, which must be installed, draw it to this file");
+addCache(graph, arguments, updatedCache);
+graph->callback([&] {
+    arguments.command = [&] { return Mz::Commands::graph(arguments.common, arguments.graph); };
+});
+}
+
+int run(std::vector<std::string> words) {
+    Arguments arguments;
+    CLI::App app(about, "mzcomponents");
+    app.require_subcommand(1);
+    app.set_version_flag("--version", MZ_VERSION);
+    addLookCommands(app, arguments);
+    addUseCommands(app, arguments);
+    try {
+        std::reverse(words.begin(), words.end()); // So the parser wants them.
+        app.parse(words);
+    } catch (const CLI::ParseError& failure) {
+        return app.exit(failure) == 0 ? good : wrongUse;
+    }
+    return arguments.command();
+}
+
+} // namespace
+
+int main(int argc, char** argv) {
+    std::setlocale(LC_ALL, "");
+    try {
+        return run(Mz::Tools::argumentsOfProcess(argc, argv));
+    } catch (const std::exception& failure) {
+        std::cerr << "mzcomponents: " << failure.what() << '\n';
+        return subjectIsWrong;
+    }
+}

@@ -1,0 +1,44 @@
+# Completion of mzcomponents for bash.
+_mzcomponents() {
+  local current=${COMP_WORDS[COMP_CWORD]} previous=${COMP_WORDS[COMP_CWORD - 1]}
+  local common="--path --cache --json --help" options word command=
+  for word in "${COMP_WORDS[@]:1:COMP_CWORD-1}"; do
+    case $word in
+    list | explain | scan | types | import | show | graph)
+      command=$word
+      break
+      ;;
+    esac
+  done
+  case $previous in
+  --path)
+    compopt -o filenames 2>/dev/null
+    mapfile -t COMPREPLY < <(compgen -d -- "$current")
+    return
+    ;;
+  --cache | --save | --output | --svg)
+    compopt -o filenames 2>/dev/null
+    mapfile -t COMPREPLY < <(compgen -f -- "$current")
+    return
+    ;;
+  --time-limit | --memory-limit) return ;;
+  esac
+  case $command in
+  '') options="list explain scan types import show graph --help --version" ;;
+  explain) options="$common --load --time-limit --memory-limit" ;;
+  scan) options="$common --retry --time-limit --memory-limit" ;;
+  import) options="$common --save" ;;
+  graph) options="$common --output --svg" ;;
+  *) options=$common ;;
+  esac
+  mapfile -t COMPREPLY < <(compgen -W "$options" -- "$current")
+  case $command in
+  explain | import | show)
+    if [[ $current != -* ]]; then
+      compopt -o filenames 2>/dev/null
+      mapfile -t COMPREPLY < <(compgen -f -- "$current")
+    fi
+    ;;
+  esac
+}
+complete -F _mzcomponents mzcomponents
