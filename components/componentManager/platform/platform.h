@@ -42,8 +42,8 @@ std::wstring firstArgument();
 
 // ---- Files ----------------------------------------------------------------------------------
 
-/// Which file a name stands for, whatever the name. Some file systems tell the same of two files, so
-/// ask `isSameFile` before you believe it.
+/// Which file a name stands for, whatever the name. Some file systems tell the same of two files,
+/// so ask `isSameFile` before you believe it.
 struct FileIdentity {
     std::uint64_t device = 0;
     std::uint64_t index = 0;
