@@ -188,6 +188,17 @@ TEST_F(Explain, TellsOfALibraryThatEatsMemory) {
     EXPECT_EQ(explainFile(add(L"offersForever"), options).verdict.verdict, Verdict::outOfMemory);
 }
 
+TEST_F(Explain, DoesNotCountTheMemoryOfTheHost) {
+    ExplainOptions options;
+    options.load = true;
+    options.probe = patient();
+    options.probe.memoryLimit = std::uint64_t{300} << 20;
+    const std::string much(std::size_t{400} << 20, 'x');
+    EXPECT_EQ(explainFile(add(L"goodByHand"), options).verdict.verdict, Verdict::works);
+    EXPECT_EQ(explainFile(add(L"exits"), options).verdict.verdict, Verdict::exited);
+    EXPECT_EQ(much.back(), 'x');
+}
+
 TEST_F(Explain, EndsTheProcessWhenTheUserWants) {
     ExplainOptions options;
     options.load = true;

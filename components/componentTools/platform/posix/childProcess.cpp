@@ -108,8 +108,7 @@ class Watch {
         ::kill(-child, SIGKILL);
         if (judged)
             return std::move(judgement);
-        // In kilobytes; the end may have come between two looks.
-        if (static_cast<std::uint64_t>(usage.ru_maxrss) * 1024 >= limits.memory)
+        if (usedTooMuch(usage))
             judgement.end = ChildResult::End::outOfMemory;
         else if (WIFSIGNALED(status))
             noteSignal(WTERMSIG(status));
@@ -119,6 +118,17 @@ class Watch {
     }
 
   private:
+    /// The end may have come between two looks. What the system tells then counts the memory of
+    /// this process as well, as it was when the child was started: only what is more is the
+    /// child's.
+    bool usedTooMuch(const rusage& usage) const {
+        rusage own{};
+        ::getrusage(RUSAGE_SELF, &own);
+        constexpr std::uint64_t unit = 1024;
+        return static_cast<std::uint64_t>(usage.ru_maxrss) * unit >= limits.memory &&
+               usage.ru_maxrss > own.ru_maxrss;
+    }
+
     bool over(int& status, rusage& usage) {
         const pid_t ended = ::wait4(child, &status, judged ? 0 : WNOHANG, &usage);
         return ended == child || (ended < 0 && errno != EINTR);
