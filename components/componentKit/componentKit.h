@@ -13,7 +13,6 @@
 #include "components/componentManager/importBuilder.h"
 
 #include <initializer_list>
-#include <memory>
 #include <utility>
 #include <vector>
 
@@ -33,9 +32,11 @@ struct BuilderInfo {
 /// The base of a builder, `Impl`, that also answers for `Ifaces`: describes itself and stands for
 /// itself. What is left to write is `createObject` and the operations of `Ifaces`.
 ///
-/// Not counted: the library's description owns it, and both live as long as the library is loaded.
+/// Counted, so it stands on the heap.
 template <class Impl, class... Ifaces>
-class Builder : public QrCastMulti<Impl, QrBuilderDescription, QrComponentBuilder, Ifaces...> {
+class Builder
+    : public QrCastRef<
+          QrCastHeap<QrCastMulti<Impl, QrBuilderDescription, QrComponentBuilder, Ifaces...>>> {
   public:
     explicit Builder(const BuilderInfo& builderInfo) : info(builderInfo) {}
 
@@ -110,29 +111,28 @@ class BaseInterface {
     static bool hasInterface(const Impl*, const QrUid& uid) { return uid == Base::uid; }
 };
 
-/// A new builder of class `T`, which answers for `QrBuilderDescription`, for the description to
-/// own.
+/// A new reference to an object of class `T`, which answers for `QrBuilderDescription`.
 template <class T, class... Args>
-std::shared_ptr<QrBuilderDescription> builder(Args&&... args) {
-    return std::make_shared<T>(std::forward<Args>(args)...);
+QrPtr<QrBuilderDescription> builder(Args&&... args) {
+    return QrPtr<T>(new T(std::forward<Args>(args)...));
 }
 
 /// A builder that makes objects of class `Object`.
 template <class Object>
-std::shared_ptr<QrBuilderDescription> builderOf(const BuilderInfo& info) {
+QrPtr<QrBuilderDescription> builderOf(const BuilderInfo& info) {
     return builder<ObjectBuilder<Object>>(info);
 }
 
 /// What the library says of itself. Not counted: the entry point keeps one for all callers.
 class Description final : public QrCastImpl<Description, QrComponentDescription> {
   public:
-    using Builders = std::vector<std::shared_ptr<QrBuilderDescription>>;
+    using Builders = std::vector<QrPtr<QrBuilderDescription>>;
 
     Description(const wchar_t* componentLabel, const wchar_t* componentText, Builders allBuilders)
         : label(componentLabel), text(componentText), builders(std::move(allBuilders)) {}
 
     QrRef<QrCastable> createBuilder(const QrUid& uid) override {
-        for (const auto& known : builders)
+        for (const QrPtr<QrBuilderDescription>& known : builders)
             if (known->getUid() == uid)
                 return known->getBuilder();
         return nullptr;
@@ -144,8 +144,8 @@ class Description final : public QrCastImpl<Description, QrComponentDescription>
     unsigned int getBuilderCount() override { return static_cast<unsigned int>(builders.size()); }
 
     QrEnum::Action enumerateBuilders(QrEnumerator<QrCPtr<QrBuilderDescription>>& e) override {
-        for (const auto& known : builders)
-            if (const QrEnum::Action action = e.process(known.get()))
+        for (const QrPtr<QrBuilderDescription>& known : builders)
+            if (const QrEnum::Action action = e.process(known))
                 return action;
         return e.finished();
     }
