@@ -107,6 +107,11 @@ TEST_F(Command, ExplainLoadsTheFileWhenTold) {
     EXPECT_EQ(json(1, {"explain", "missing"}).at("files").at(0).at("verdict"), "missing");
 }
 
+TEST_F(Command, AFileThatBeginsWithASlashIsNoOption) {
+    EXPECT_EQ(json(1, {"explain", "/missing/file"}).at("files").at(0).at("verdict"), "missing");
+    EXPECT_EQ(json(1, {"explain", "/missing"}).at("files").at(0).at("verdict"), "missing");
+}
+
 TEST_F(Command, ScanFromARelativePathServesAHost) {
     add(L"goodWithKit");
     const auto sub = work.path() / "sub";

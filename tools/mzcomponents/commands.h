@@ -47,7 +47,7 @@ int list(const Common& common);
 int explain(const Common& common, const ExplainArguments& arguments, const ProbeArguments& probe);
 int scan(const Common& common, const ProbeArguments& probe);
 int types(const Common& common);
-int import(const Common& common, const ImportArguments& arguments);
+int importFiles(const Common& common, const ImportArguments& arguments);
 int show(const Common& common, const std::string& file);
 int graph(const Common& common, const GraphArguments& arguments);
 

@@ -199,7 +199,7 @@ int types(const Common& common) {
     return good;
 }
 
-int import(const Common& common, const ImportArguments& arguments) {
+int importFiles(const Common& common, const ImportArguments& arguments) {
     Host host(common);
     if (host.interrupted())
         return subjectIsWrong;

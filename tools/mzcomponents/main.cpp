@@ -106,48 +106,48 @@ void addUseCommands(CLI::App& app, Arguments& arguments) {
     types->callback(
         [&] { arguments.command = [&] { return Mz::Commands::types(arguments.common); }; });
 
-    CLI::App* import = addCommand(app, arguments, "import",
-                                  "Imports files through whichever component can read them.",
-                                  "mzcomponents import part.obj --path /opt/app/components");
-    import->add_option("FILE", arguments.import.files, "The files")->required();
-    import->add_option("--save", arguments.import.save,
-                       "Store the imported objects in this file, if all of them can be stored");
-    addCache(import, arguments, updatedCache);
-    import->callback([&] {
+    CLI::App* importer = addCommand(app, arguments, "import",
+                                    "Imports files through whichever component can read them.",
+                                    "mzcomponents import part.obj --path /opt/app/components");
+    importer->add_option("FILE", arguments.import.files, "The files")->required();
+    importer->add_option("--save", arguments.import.save,
+                         "Store the imported objects in this file, if all of them can be stored");
+    addCache(importer, arguments, updatedCache);
+    importer->callback([&] {
         arguments.command = [&] {
-            return Mz::Commands::import(arguments.common, arguments.import);
-};
-} // namespace
-);
+            return Mz::Commands::importFiles(arguments.common, arguments.import);
+        };
+    });
 
-CLI::App* show = addCommand(
-    app, arguments, "show",
-    "Shows a recorded list, or the objects stored in a file, with their positions in bytes.",
-    "mzcomponents show ~/.cache/app/components.list");
-show->add_option("FILE", arguments.shown, "The file")->required();
-addCache(show, arguments, updatedCache);
-show->callback([&] {
-    arguments.command = [&] { return Mz::Commands::show(arguments.common, arguments.shown); };
-});
+    CLI::App* show = addCommand(
+        app, arguments, "show",
+        "Shows a recorded list, or the objects stored in a file, with their positions in bytes.",
+        "mzcomponents show ~/.cache/app/components.list");
+    show->add_option("FILE", arguments.shown, "The file")->required();
+    addCache(show, arguments, updatedCache);
+    show->callback([&] {
+        arguments.command = [&] { return Mz::Commands::show(arguments.common, arguments.shown); };
+    });
 
-CLI::App* graph =
-    addCommand(app, arguments, "graph",
-               "Draws the libraries, their builders, and the importers that use them, as DOT.",
-               "mzcomponents graph --path /opt/app/components --svg components.svg");
-graph->add_option("--output", arguments.graph.output,
-                  "Write the DOT text to this file and not to standard output");
-graph->add_option("--svg", arguments.graph.svg,
-                  "Have Graphviz, which must be installed, draw it to this file");
-addCache(graph, arguments, updatedCache);
-graph->callback([&] {
-    arguments.command = [&] { return Mz::Commands::graph(arguments.common, arguments.graph); };
-});
+    CLI::App* graph =
+        addCommand(app, arguments, "graph",
+                   "Draws the libraries, their builders, and the importers that use them, as DOT.",
+                   "mzcomponents graph --path /opt/app/components --svg components.svg");
+    graph->add_option("--output", arguments.graph.output,
+                      "Write the DOT text to this file and not to standard output");
+    graph->add_option("--svg", arguments.graph.svg,
+                      "Have Graphviz, which must be installed, draw it to this file");
+    addCache(graph, arguments, updatedCache);
+    graph->callback([&] {
+        arguments.command = [&] { return Mz::Commands::graph(arguments.common, arguments.graph); };
+    });
 }
 
 int run(std::vector<std::string> words) {
     Arguments arguments;
     CLI::App app(about, "mzcomponents");
     app.require_subcommand(1);
+    app.allow_windows_style_options(false); // "/folder/file" is a file on every platform.
     app.set_version_flag("--version", MZ_VERSION);
     addLookCommands(app, arguments);
     addUseCommands(app, arguments);
