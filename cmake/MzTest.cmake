@@ -7,12 +7,25 @@ set(BUILD_GMOCK ON)
 set(INSTALL_GTEST OFF)
 set(gtest_force_shared_crt ON)
 add_subdirectory(${MZ_GOOGLETEST_SOURCES} ${CMAKE_BINARY_DIR}/googletest EXCLUDE_FROM_ALL SYSTEM)
-if(MZ_SANITIZE)
-  foreach(target gtest gtest_main gmock gmock_main)
-    target_compile_options(${target} PRIVATE -fsanitize=address,undefined)
-  endforeach()
-endif()
 include(GoogleTest)
+
+# The code of the tests runs once and is compiled for each build: most of the time of a build went
+# into optimising it and describing it to a debugger. What is tested keeps the build's own options;
+# the templates of its headers are still optimised here, except under the sanitizers.
+add_library(mzTestCode INTERFACE)
+if(MZ_SANITIZE)
+  target_compile_options(mzTestCode INTERFACE -O0 -g1)
+else()
+  target_compile_options(mzTestCode INTERFACE
+    $<$<CONFIG:Release,RelWithDebInfo>:-O1> $<$<CONFIG:RelWithDebInfo>:-g1>)
+endif()
+
+foreach(target gtest gtest_main gmock gmock_main)
+  target_link_libraries(${target} PRIVATE mzTestCode)
+  if(MZ_SANITIZE)
+    target_compile_options(${target} PRIVATE -fsanitize=address,undefined)
+  endif()
+endforeach()
 
 # The build's name stands before the name of each test: one summary counts all builds.
 get_filename_component(MZ_BUILD_NAME ${CMAKE_BINARY_DIR} NAME)
@@ -28,7 +41,8 @@ endif()
 # mz_add_test_program(NAME sources...): a program of tests, without entries for ctest.
 function(mz_add_test_program name)
   add_executable(${name} ${ARGN})
-  target_link_libraries(${name} PRIVATE Mz::MZcomponentManager mzCompile mzTestSupport GTest::gmock)
+  target_link_libraries(${name} PRIVATE Mz::MZcomponentManager mzCompile mzTestCode mzTestSupport
+    GTest::gmock)
 endfunction()
 
 # mz_add_tests(NAME sources...): a program of tests, each of which is an entry for ctest and runs in
