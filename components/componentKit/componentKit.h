@@ -13,6 +13,7 @@
 #include "components/componentManager/importBuilder.h"
 
 #include <initializer_list>
+#include <memory>
 #include <utility>
 #include <vector>
 
@@ -29,16 +30,12 @@ struct BuilderInfo {
     bool flag = false;          ///< likewise
 };
 
-/// The base of a builder, `Impl`, that also answers for `Ifaces`: describes itself and stands for
-/// itself. What is left to write is `createObject` and the operations of `Ifaces`.
-///
-/// Counted, so it stands on the heap.
-template <class Impl, class... Ifaces>
-class Builder
-    : public QrCastRef<
-          QrCastHeap<QrCastMulti<Impl, QrBuilderDescription, QrComponentBuilder, Ifaces...>>> {
+/// Adds to `Casts`, which gives a builder its casting and its lifetime, that it describes itself
+/// and stands for itself. What is left to write is `createObject`.
+template <class Casts>
+class SelfDescribing : public Casts {
   public:
-    explicit Builder(const BuilderInfo& builderInfo) : info(builderInfo) {}
+    explicit SelfDescribing(const BuilderInfo& builderInfo) : info(builderInfo) {}
 
     const QrUid& getUid() const override { return info.uid; }
     const wchar_t* getName() const override { return info.name; }
@@ -58,11 +55,30 @@ class Builder
     BuilderInfo info;
 };
 
-/// A builder that makes each object with `new Object`. `Object` is counted (`QrCastRef`).
-template <class Object>
-class ObjectBuilder final : public Builder<ObjectBuilder<Object>> {
+/// The base of a builder, `Impl`, that also answers for `Ifaces`. What is left to write is
+/// `createObject` and the operations of `Ifaces`.
+///
+/// Counted, so it stands on the heap.
+template <class Impl, class... Ifaces>
+class Builder
+    : public SelfDescribing<QrCastRef<
+          QrCastHeap<QrCastMulti<Impl, QrBuilderDescription, QrComponentBuilder, Ifaces...>>>> {
   public:
-    using Builder<ObjectBuilder<Object>>::Builder;
+    using SelfDescribing<QrCastRef<QrCastHeap<
+        QrCastMulti<Impl, QrBuilderDescription, QrComponentBuilder, Ifaces...>>>>::SelfDescribing;
+};
+
+/// A builder that makes each object with `new Object`. `Object` is counted (`QrCastRef`).
+///
+/// The builder is not: each object would pay for six references to it. It lives as long as its
+/// owner, the library's description.
+template <class Object>
+class ObjectBuilder final
+    : public SelfDescribing<
+          QrCastMulti<ObjectBuilder<Object>, QrBuilderDescription, QrComponentBuilder>> {
+  public:
+    using SelfDescribing<QrCastMulti<ObjectBuilder<Object>, QrBuilderDescription,
+                                     QrComponentBuilder>>::SelfDescribing;
 
     QrRef<QrCastable> createObject() override {
         return (new Object)->getCastable(); // The result takes the first reference.
@@ -111,28 +127,32 @@ class BaseInterface {
     static bool hasInterface(const Impl*, const QrUid& uid) { return uid == Base::uid; }
 };
 
-/// A new reference to an object of class `T`, which answers for `QrBuilderDescription`.
+/// How a library's description owns a builder: by a reference if the builder counts, else alone.
+using OwnedBuilder = std::shared_ptr<QrBuilderDescription>;
+
+/// A new object of class `T`, which is counted and answers for `QrBuilderDescription`.
 template <class T, class... Args>
-QrPtr<QrBuilderDescription> builder(Args&&... args) {
-    return QrPtr<T>(new T(std::forward<Args>(args)...));
+OwnedBuilder builder(Args&&... args) {
+    return OwnedBuilder(QrPtr<T>(new T(std::forward<Args>(args)...)).detach(),
+                        [](T* counted) { counted->release(); });
 }
 
 /// A builder that makes objects of class `Object`.
 template <class Object>
-QrPtr<QrBuilderDescription> builderOf(const BuilderInfo& info) {
-    return builder<ObjectBuilder<Object>>(info);
+OwnedBuilder builderOf(const BuilderInfo& info) {
+    return std::make_shared<ObjectBuilder<Object>>(info);
 }
 
 /// What the library says of itself. Not counted: the entry point keeps one for all callers.
 class Description final : public QrCastImpl<Description, QrComponentDescription> {
   public:
-    using Builders = std::vector<QrPtr<QrBuilderDescription>>;
+    using Builders = std::vector<OwnedBuilder>;
 
     Description(const wchar_t* componentLabel, const wchar_t* componentText, Builders allBuilders)
         : label(componentLabel), text(componentText), builders(std::move(allBuilders)) {}
 
     QrRef<QrCastable> createBuilder(const QrUid& uid) override {
-        for (const QrPtr<QrBuilderDescription>& known : builders)
+        for (const OwnedBuilder& known : builders)
             if (known->getUid() == uid)
                 return known->getBuilder();
         return nullptr;
@@ -144,8 +164,8 @@ class Description final : public QrCastImpl<Description, QrComponentDescription>
     unsigned int getBuilderCount() override { return static_cast<unsigned int>(builders.size()); }
 
     QrEnum::Action enumerateBuilders(QrEnumerator<QrCPtr<QrBuilderDescription>>& e) override {
-        for (const QrPtr<QrBuilderDescription>& known : builders)
-            if (const QrEnum::Action action = e.process(known))
+        for (const OwnedBuilder& known : builders)
+            if (const QrEnum::Action action = e.process(known.get()))
                 return action;
         return e.finished();
     }

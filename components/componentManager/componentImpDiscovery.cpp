@@ -4,7 +4,6 @@
 
 #include <functional>
 #include <iterator>
-#include <map>
 #include <string_view>
 
 namespace Mz {
@@ -39,6 +38,12 @@ std::vector<std::wstring> directoriesOf(const wchar_t* searchPath) {
     return directories;
 }
 
+struct IdentityHash {
+    std::size_t operator()(const platform::FileIdentity& identity) const {
+        return static_cast<std::size_t>(identity.index ^ identity.device << 40);
+    }
+};
+
 /// `directory` as the system wants it, where an empty name is the current one.
 std::optional<platform::NativePath> nativeDirectory(const std::wstring& directory) {
     return platform::toNative(directory.empty() ? std::wstring_view(L".") : directory);
@@ -57,7 +62,7 @@ std::wstring ComponentManager::normalisePath(const wchar_t* path, bool listMode)
 
 void ComponentManager::discover(const wchar_t* searchPath, LibraryList& newList,
                                 LibraryMap& byName) {
-    std::map<platform::FileIdentity, const platform::NativePath*> seen;
+    HashMap<platform::FileIdentity, const platform::NativePath*, IdentityHash> seen;
     for (const std::wstring& entry : directoriesOf(searchPath)) {
         const std::wstring directory = normalisePath(entry.c_str(), false);
         const std::optional<platform::NativePath> native = nativeDirectory(entry);
@@ -68,8 +73,8 @@ void ComponentManager::discover(const wchar_t* searchPath, LibraryList& newList,
             std::wstring fileName = normalisePath(candidate.name.c_str(), false);
             // One file, one record, however often the search path leads to it.
             if (candidate.identity) {
-                const auto other = seen.find(*candidate.identity);
-                if (other != seen.end() && platform::isSameFile(*other->second, candidate.path))
+                const platform::NativePath* const* const other = seen.find(*candidate.identity);
+                if (other && platform::isSameFile(**other, candidate.path))
                     continue;
             } else if (byName.find({directory, fileName})) {
                 continue;
@@ -78,8 +83,8 @@ void ComponentManager::discover(const wchar_t* searchPath, LibraryList& newList,
             library.directory = directory;
             library.fileName = std::move(fileName);
             library.foundPath = std::move(candidate.path);
-            if (candidate.identity)
-                seen.emplace(*candidate.identity, &library.foundPath);
+            if (candidate.identity && !seen.find(*candidate.identity))
+                seen[*candidate.identity] = &library.foundPath;
             const LibraryKey key(library.directory, library.fileName);
             if (!byName.find(key))
                 byName[key] = std::prev(newList.end());

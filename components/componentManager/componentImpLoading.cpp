@@ -71,15 +71,12 @@ bool ComponentManager::ensureLoaded(ComponentLibrary& library, bool forUse) {
 bool ComponentManager::loadModule(ComponentLibrary& library) {
     const platform::NativePath path = library.openingPath();
     const platform::QuietErrors quiet;
-    platform::Module module = platform::findLoadedLibrary(path);
-    const bool mapped = module != nullptr;
-    if (!mapped && platform::exportsFunction(path, entryPointName))
-        module = platform::loadLibrary(path);
+    const platform::UsedLibrary used = platform::useLibrary(path, entryPointName);
     // Only now: initialisers of the library may have asked for one of its builders meanwhile, and
     // found it mapped.
-    library.module = module;
-    library.loadedByManager = module && !mapped;
-    return module != nullptr;
+    library.module = used.module;
+    library.loadedByManager = used.loaded;
+    return used.module != nullptr;
 }
 
 bool ComponentManager::registerLibrary(ComponentLibrary& library,

@@ -8,6 +8,7 @@
 #include <sys/stat.h>
 
 using namespace Mz::platform;
+using Mz::Test::builtComponent;
 using Mz::Test::TemporaryDirectory;
 using ::testing::IsEmpty;
 
@@ -113,6 +114,33 @@ TEST_F(PosixPlatform, TellsTheStatusOfWhatALinkLeadsTo) {
     EXPECT_TRUE(queryFile(folder.path() / "link")->regular);
     ASSERT_EQ(::mkfifo((folder.path() / "pipe").c_str(), 0600), 0);
     EXPECT_FALSE(queryFile(folder.path() / "pipe")->regular);
+}
+
+TEST_F(PosixPlatform, UsesWhatIsMappedByAnotherName) {
+    TemporaryDirectory folder;
+    const std::filesystem::path link = folder.path() / "link";
+    std::filesystem::create_symlink(builtComponent(L"goodByHand"), link);
+    const Module module = loadLibrary(builtComponent(L"goodByHand").native());
+    ASSERT_TRUE(module);
+    const UsedLibrary used = useLibrary(link, "QrGetComponentDescription");
+    EXPECT_EQ(used.module, module);
+    EXPECT_FALSE(used.loaded);
+    unloadLibrary(module);
+    EXPECT_FALSE(Mz::Test::isMapped(builtComponent(L"goodByHand")));
+}
+
+TEST_F(PosixPlatform, UsesWhatIsMappedThoughItsFileIsReplaced) {
+    TemporaryDirectory folder;
+    const std::filesystem::path file = folder.path() / "library.so";
+    std::filesystem::copy_file(builtComponent(L"goodByHand"), file);
+    const Module module = loadLibrary(file);
+    ASSERT_TRUE(module);
+    std::filesystem::rename(folder.write("text", "no library"), file);
+    const UsedLibrary used = useLibrary(file, "QrGetComponentDescription");
+    EXPECT_EQ(used.module, module);
+    EXPECT_FALSE(used.loaded);
+    unloadLibrary(module);
+    EXPECT_FALSE(findLoadedLibrary(file));
 }
 
 TEST_F(PosixPlatform, DoesNotWaitForAPipeItIsToLookInto) {

@@ -225,6 +225,41 @@ TEST_F(Platform, LoadsNothingThatIsNoLibrary) {
     unloadLibrary(nullptr);
 }
 
+TEST_F(Platform, UsesALibraryByLoadingIt) {
+    const auto file = copyOf(L"goodByHand");
+    const UsedLibrary used = useLibrary(file, entryPoint);
+    EXPECT_TRUE(used.module);
+    EXPECT_TRUE(used.loaded);
+    EXPECT_TRUE(isMapped(file));
+    unloadLibrary(used.module);
+    EXPECT_FALSE(isMapped(file));
+}
+
+TEST_F(Platform, UsesAMappedLibraryWithoutTakingAReference) {
+    const auto file = copyOf(L"goodByHand");
+    const Module module = loadLibrary(file);
+    const UsedLibrary used = useLibrary(file, entryPoint);
+    EXPECT_EQ(used.module, module);
+    EXPECT_FALSE(used.loaded);
+    // Whatever it exports: it is mapped.
+    EXPECT_EQ(useLibrary(file, "noSuchFunction").module, module);
+    EXPECT_FALSE(useLibrary(file, "noSuchFunction").loaded);
+    unloadLibrary(module);
+    EXPECT_FALSE(isMapped(file));
+}
+
+TEST_F(Platform, UsesNothingThatDoesNotExportTheSymbol) {
+    const auto file = copyOf(L"goodByHand");
+    for (const auto& unusable : {file, copyOf(L"missesDependency"), folder.path(),
+                                 folder.write("text", "no library"), folder.path() / "nothing"}) {
+        const char* symbol = unusable == file ? "noSuchFunction" : entryPoint;
+        const UsedLibrary used = useLibrary(unusable, symbol);
+        EXPECT_FALSE(used.module);
+        EXPECT_FALSE(used.loaded);
+    }
+    EXPECT_FALSE(isMapped(file));
+}
+
 TEST_F(Platform, FindsSymbolsInThatVeryLibraryOnly) {
     EXPECT_FALSE(findSymbol(nullptr, entryPoint));
     EXPECT_FALSE(findSymbol(nullptr, "malloc"));

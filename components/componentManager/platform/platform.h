@@ -96,6 +96,17 @@ bool exportsFunction(const NativePath& path, const char* symbol);
 /// null when it cannot be loaded.
 Module loadLibrary(const NativePath& path);
 
+/// A library in use, and who loaded it.
+struct UsedLibrary {
+    Module module = nullptr;
+    bool loaded = false; ///< by this call, which the user has to give back
+};
+
+/// The library that the process has mapped under this path already, with whatever symbols; else the
+/// one in the file, loaded, if it exports the function `symbol`. Nothing when there is neither. Runs
+/// nothing of a file that does not export the symbol.
+UsedLibrary useLibrary(const NativePath& path, const char* symbol);
+
 /// Gives back one load.
 void unloadLibrary(Module module);
 

@@ -116,6 +116,25 @@ bool isCodeOf(Module module, void* address) {
     return search.found;
 }
 
+/// How many libraries the process has ever mapped.
+unsigned long long mappingCount() {
+    unsigned long long count = 0;
+    const auto takeCount = [](dl_phdr_info* library, std::size_t, void* data) {
+        *static_cast<unsigned long long*>(data) = library->dlpi_adds;
+        return 1;
+    };
+    ::dl_iterate_phdr(takeCount, &count);
+    return count;
+}
+
+/// Whether a library was mapped by this very path, whatever stands there now.
+bool isMappedAs(const NativePath& path) {
+    const auto compareName = [](dl_phdr_info* library, std::size_t, void* data) {
+        return *static_cast<const NativePath*>(data) == library->dlpi_name ? 1 : 0;
+    };
+    return ::dl_iterate_phdr(compareName, const_cast<NativePath*>(&path)) != 0;
+}
+
 } // namespace
 
 std::optional<NativePath> toNative(std::wstring_view name) {
@@ -203,6 +222,18 @@ Module loadLibrary(const NativePath& path) {
     if (!module)
         ::dlerror(); // The message belongs to nobody.
     return module;
+}
+
+UsedLibrary useLibrary(const NativePath& path, const char* symbol) {
+    // Asking first whether the library is mapped would open every file a second time.
+    if (!exportsFunction(path, symbol))
+        return {isMappedAs(path) ? findLoadedLibrary(path) : nullptr, false};
+    const unsigned long long before = mappingCount();
+    const Module module = loadLibrary(path);
+    if (!module || mappingCount() != before)
+        return {module, module != nullptr};
+    unloadLibrary(module); // It stays as long as whoever loaded it wants.
+    return {module, false};
 }
 
 void unloadLibrary(Module module) {

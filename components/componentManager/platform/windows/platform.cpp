@@ -174,6 +174,13 @@ Module loadLibrary(const NativePath& path) {
     return module;
 }
 
+UsedLibrary useLibrary(const NativePath& path, const char* symbol) {
+    if (const Module mapped = findLoadedLibrary(path))
+        return {mapped, false};
+    const Module module = exportsFunction(path, symbol) ? loadLibrary(path) : nullptr;
+    return {module, module != nullptr};
+}
+
 void unloadLibrary(Module module) {
     if (module)
         ::FreeLibrary(static_cast<HMODULE>(module));
