@@ -2,7 +2,6 @@
 #include "tests/support/failingMedium.h"
 #include "tests/objects/support.h"
 
-
 namespace {
 
 using namespace Mz;

@@ -103,8 +103,8 @@ struct UsedLibrary {
 };
 
 /// The library that the process has mapped under this path already, with whatever symbols; else the
-/// one in the file, loaded, if it exports the function `symbol`. Nothing when there is neither. Runs
-/// nothing of a file that does not export the symbol.
+/// one in the file, loaded, if it exports the function `symbol`. Nothing when there is neither.
+/// Runs nothing of a file that does not export the symbol.
 UsedLibrary useLibrary(const NativePath& path, const char* symbol);
 
 /// Gives back one load.
