@@ -16,11 +16,12 @@ set(CMAKE_ARCHIVE_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/lib)
 include(CheckCXXCompilerFlag)
 check_cxx_compiler_flag(-fno-gnu-unique MZ_HAS_NO_GNU_UNIQUE)
 check_cxx_compiler_flag(-fno-semantic-interposition MZ_HAS_NO_SEMANTIC_INTERPOSITION)
+check_cxx_compiler_flag(-Wshadow=local MZ_HAS_SHADOW_LOCAL)
 
 # What our own code is compiled with; not passed on to users of the libraries.
 add_library(mzCompile INTERFACE)
-target_compile_options(mzCompile INTERFACE -Wall -Wextra -Wpedantic -Wshadow=local -Wconversion
-  -Wnon-virtual-dtor -Wold-style-cast -Wundef)
+target_compile_options(mzCompile INTERFACE -Wall -Wextra -Wpedantic -Wconversion
+  -Wnon-virtual-dtor -Wold-style-cast -Wundef $<$<BOOL:${MZ_HAS_SHADOW_LOCAL}>:-Wshadow=local>)
 if(MZ_WARNINGS_AS_ERRORS)
   target_compile_options(mzCompile INTERFACE -Werror)
 endif()

@@ -14,6 +14,7 @@
 
 #include <initializer_list>
 #include <memory>
+#include <type_traits>
 #include <utility>
 #include <vector>
 
@@ -81,6 +82,8 @@ class ObjectBuilder final
                                      QrComponentBuilder>>::SelfDescribing;
 
     QrRef<QrCastable> createObject() override {
+        static_assert(!std::is_same_v<decltype(&Object::newReference), long (QrCastable::*)()>,
+                      "the object is counted (QrCastRef), or nobody would ever delete it");
         return (new Object)->getCastable(); // The result takes the first reference.
     }
 };

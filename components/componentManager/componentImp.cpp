@@ -63,16 +63,24 @@ void ComponentManager::initialize(const wchar_t* searchPath) {
         explicit Initialising(bool& value) : flag(value) { flag = true; }
         ~Initialising() { flag = false; }
     } const guard(initialising);
+    // An exception may end this anywhere, and another attempt follow: until all is found, what was
+    // recorded stays where it is, and the index never outlives a record.
     LibraryList recorded;
-    recorded.swap(libraries);
     {
+        LibraryList found;
         LibraryMap byName;
-        discover(searchPath, libraries, byName);
+        discover(searchPath, found, byName);
+        recorded.swap(libraries);
+        libraries.swap(found);
         merge(recorded, byName);
     }
+    builderIndex.clear();
     recorded.clear();
     for (ComponentLibrary& library : libraries)
-        ensureLoaded(library, false);
+        if (library.module)
+            reindexBuilders(library); // The work of an earlier attempt.
+        else
+            ensureLoaded(library, false);
     initialised = true;
 }
 

@@ -34,8 +34,10 @@ class MZ_COMPONENT_MANAGER_API QrComponentBuilder : public QrCastable {
 /// builders without their libraries being loaded. What label, number, text and flag mean is agreed
 /// between the libraries and their clients; the manager keeps them unread.
 ///
-/// No text is ever null in a record, and each is valid until the manager is destroyed. A library's
-/// own descriptions may give null for an empty text.
+/// No text is ever null in a record, and each is valid until the manager is destroyed; only the two
+/// texts of the component, which belong to all builders of a library, are replaced when the library
+/// is read anew, at the first use of one whose file has changed since the start. A library's own
+/// descriptions may give null for an empty text.
 class MZ_COMPONENT_MANAGER_API QrBuilderDescription : public QrCastable {
   public:
     using Self = QrBuilderDescription;

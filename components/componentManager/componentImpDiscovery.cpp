@@ -11,14 +11,16 @@ namespace Mz {
 namespace {
 
 /// The directory in which the program that was started stands, as its command line tells it.
-std::wstring programDirectory() {
-    const std::wstring program = platform::firstArgument();
-    const std::size_t separator = program.find_last_of(L"/\\");
+/// Nothing when that cannot be told: the current one instead would run whatever lies there.
+std::optional<std::wstring> programDirectory() {
+    const std::optional<std::wstring> program = platform::firstArgument();
+    if (!program)
+        return std::nullopt;
+    const std::size_t separator = program->find_last_of(L"/\\");
     if (separator == std::wstring::npos)
-        return {};
+        return std::wstring();
     // A root is nothing without its separator.
-    const bool isRoot = separator == 0 || (separator == 2 && program[1] == L':');
-    return program.substr(0, separator + (isRoot ? 1 : 0));
+    return program->substr(0, std::max<std::size_t>(separator, 1));
 }
 
 /// The directories to search, as the caller spells them.
@@ -34,7 +36,8 @@ std::vector<std::wstring> directoriesOf(const wchar_t* searchPath) {
         rest.remove_prefix(directory.size());
     }
     if (directories.empty())
-        directories.push_back(programDirectory());
+        if (std::optional<std::wstring> directory = programDirectory())
+            directories.push_back(std::move(*directory));
     return directories;
 }
 
@@ -48,6 +51,50 @@ struct IdentityHash {
 std::optional<platform::NativePath> nativeDirectory(const std::wstring& directory) {
     return platform::toNative(directory.empty() ? std::wstring_view(L".") : directory);
 }
+
+using LibraryList = ComponentManager::LibraryList;
+using LibraryKey = ComponentManager::LibraryKey;
+
+/// Several files whose records have the same names, as where letter case tells files apart. Of what
+/// was recorded of them the first record belongs to the first file, and so on, if there are as
+/// many.
+class Namesakes {
+  public:
+    Namesakes(LibraryList& found, const LibraryList& recorded,
+              ComponentManager::LibraryMap& byName) {
+        if (found.size() == byName.size())
+            return;
+        for (auto file = found.begin(); file != found.end(); ++file) {
+            const LibraryKey key(file->directory, file->fileName);
+            if (*byName.find(key) != file)
+                groups[key].others.push_back(file);
+        }
+        for (const ComponentLibrary& library : recorded)
+            if (Group* const group = groups.find({library.directory, library.fileName}))
+                ++group->recordCount;
+    }
+
+    /// Whether nobody can say which record belongs to which file.
+    bool areConfused(const LibraryKey& key) const {
+        const Group* const group = groups.find(key);
+        return group && group->recordCount != group->others.size() + 1;
+    }
+
+    /// Makes `file`, the one of this name whose turn it was last, the one whose turn it is.
+    void moveOn(const LibraryKey& key, LibraryList::iterator& file) {
+        Group* const group = groups.find(key);
+        if (group && group->turn++ > 0)
+            file = group->others[group->turn - 2];
+    }
+
+  private:
+    struct Group {
+        std::vector<LibraryList::iterator> others; ///< all but the first
+        std::size_t recordCount = 0;
+        std::size_t turn = 0;
+    };
+    HashMap<LibraryKey, Group, ComponentManager::LibraryKeyHash> groups;
+};
 
 } // namespace
 
@@ -93,13 +140,16 @@ void ComponentManager::discover(const wchar_t* searchPath, LibraryList& newList,
 }
 
 void ComponentManager::merge(LibraryList& recorded, LibraryMap& byName) {
-    LibraryList replaced; // The map's keys stand in them.
+    Namesakes namesakes(libraries, recorded, byName);
+    LibraryList replaced; // The maps' keys stand in them.
     for (auto next = recorded.begin(); next != recorded.end();) {
         const auto old = next++;
-        LibraryList::iterator* found = byName.find({old->directory, old->fileName});
-        if (!found)
+        const LibraryKey key(old->directory, old->fileName);
+        LibraryList::iterator* found = byName.find(key);
+        if (!found || namesakes.areConfused(key))
             continue;
-        old->foundPath = (*found)->foundPath;
+        namesakes.moveOn(key, *found);
+        old->foundPath = std::move((*found)->foundPath);
         libraries.splice(*found, recorded, old);
         replaced.splice(replaced.end(), libraries, *found);
         *found = old;

@@ -89,7 +89,11 @@ bool ComponentManager::registerLibrary(ComponentLibrary& library,
             readDescription(library, *description);
         described = static_cast<bool>(description);
     } catch (abi::__forced_unwind&) {
-        throw; // The thread is being cancelled.
+        // The thread is being cancelled, and this is not the exception of anybody's code. Half a
+        // description must not pass for a whole one.
+        dropBuilders(library);
+        unload(library);
+        throw;
     } catch (...) {
         // Nothing more in here: the exception's own code may live in the library, which must not
         // be unloaded before the exception is gone.

@@ -36,8 +36,7 @@ class MZ_COMPONENT_MANAGER_API ComponentManager final
     class Builder;
     class BuilderList;
 
-    /// Directory and file name of a library, both normalised.
-    /// Directory and file name, as they stand in the record.
+    /// Directory and file name of a library, as they stand in its record.
     using LibraryKey = std::pair<std::wstring_view, std::wstring_view>;
     struct MZ_COMPONENT_MANAGER_API LibraryKeyHash {
         std::size_t operator()(const LibraryKey& key) const;

@@ -47,6 +47,19 @@ struct Remembered {
 
 constinit thread_local Remembered remembered;
 
+/// In the copy of a process nobody may find the lock taken by a thread that is not there, nor what
+/// was remembered for the identifier that the thread had before.
+struct ForkWatch {
+    ForkWatch() {
+        platform::aroundForks([] { threads.value.mutex.lock(); },
+                              [] { threads.value.mutex.unlock(); },
+                              [] {
+                                  generation.fetch_add(1, std::memory_order_release);
+                                  threads.value.mutex.unlock();
+                              });
+    }
+} const forkWatch;
+
 QrProcessControl* lookUp() {
     ThreadControllers& controllers = threads.value;
     const std::lock_guard lock(controllers.mutex);

@@ -9,8 +9,6 @@ namespace Mz {
 
 namespace {
 
-constexpr std::wstring_view separators = L"/\\";
-
 bool isSeparator(wchar_t c) {
     return c == L'/' || c == L'\\';
 }

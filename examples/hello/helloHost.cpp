@@ -1,14 +1,13 @@
 #include "greeter.h"
 
+#include "components/componentKit/hostKit.h"
 #include "components/componentManager/componentImp.h"
 
-#include <filesystem>
 #include <iostream>
 
 int main(int argc, char** argv) {
     const std::filesystem::path components = argc > 1 ? argv[1] : "components";
-    const std::wstring path = std::filesystem::absolute(components).lexically_normal().wstring();
-    QrGetComponentManager()->initialize(path.c_str());
+    QrGetComponentManager()->initialize(Mz::Kit::searchPath(components).c_str());
 
     const Mz::QrRef<Mz::QrCastable> object = QrGetComponentManager()->createObject(worldGreeterUid);
     const auto greeter = Mz::queryCast<Greeter>(object.get());

@@ -1,3 +1,7 @@
+# One that wants to stand at an address of its own choice, and gets it in a program that does too.
+mz_add_fault(ownAddress goodWithKit.cpp)
+target_link_options(ownAddress PRIVATE -Wl,-Ttext-segment=0x70000000)
+
 # The smallest libraries, for the probe: one for each kind of symbol table. Without the sanitizers,
 # which would make them large.
 foreach(style gnu sysv)

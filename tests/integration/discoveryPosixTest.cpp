@@ -4,8 +4,11 @@
 #include <clocale>
 #include <fcntl.h>
 #include <fstream>
+#include <pthread.h>
+#include <string_view>
 #include <sys/ioctl.h>
 #include <sys/stat.h>
+#include <thread>
 #include <unistd.h>
 
 using namespace Mz;
@@ -101,8 +104,74 @@ TEST_F(PosixDiscovery, KeepsBothRecordsOfSuchNamesFromAnEarlierStart) {
     recordBuilder(record(lower), goodUid, L"recorded good");
     initialize();
     EXPECT_EQ(manager->libraries.size(), 2u);
+    EXPECT_EQ(names(), (Names{L"recorded kit", L"recorded good"}));
+    EXPECT_FALSE(isMapped(upper));
+    EXPECT_FALSE(isMapped(lower));
     EXPECT_EQ(maker(goodUid), "good");
     EXPECT_EQ(maker(kitUid), "kit");
+}
+
+TEST_F(PosixDiscovery, KeepsTheRecordsOfSuchFoldersToo) {
+    std::filesystem::create_directory(folder.path() / "Plug");
+    std::filesystem::create_directory(folder.path() / "plug");
+    const auto upper = add(L"goodWithKit", "Plug/c.so");
+    const auto lower = add(L"goodByHand", "plug/c.so");
+    recordBuilder(record(upper), kitUid, L"recorded kit");
+    recordBuilder(record(lower), goodUid, L"recorded good");
+    manager->initialize((folder.text() + L"/Plug;" + folder.text() + L"/plug").c_str());
+    EXPECT_EQ(names(), (Names{L"recorded kit", L"recorded good"}));
+    EXPECT_EQ(maker(goodUid), "good");
+    EXPECT_EQ(maker(kitUid), "kit");
+}
+
+TEST_F(PosixDiscovery, ReadsSuchFilesAfreshWhenNobodyCanSayWhoseTheRecordsAre) {
+    const auto lower = add(L"goodByHand", "lib.so");
+    recordBuilder(record(lower), goodUid, L"recorded good");
+    add(L"goodWithKit", "LIB.so"); // Comes before it.
+    initialize();
+    EXPECT_EQ(names(), (Names{L"kit", L"Name", L"name", L"third"}));
+    EXPECT_EQ(maker(goodUid), "good");
+    EXPECT_EQ(maker(kitUid), "kit");
+}
+
+TEST_F(PosixDiscovery, BeginsAnewAfterAThreadEndedInTheMiddle) {
+    const auto first = add(L"goodWithKit", "a.so");
+    const auto second = add(L"goodByHand", "b.so");
+    add(L"manyBuilders", "c.so");
+    setHook([](const char* event) {
+        if (std::string_view(event) == "enumerate")
+            ::pthread_exit(nullptr);
+    });
+    std::thread([this] { initialize(); }).join();
+    setHook(nullptr);
+    EXPECT_FALSE(manager->initialised);
+    EXPECT_EQ(noted("enumerate"), 1);
+    EXPECT_FALSE(isMapped(second));
+    std::filesystem::remove(first);
+    TemporaryDirectory other;
+    std::filesystem::copy_file(second, other.path() / "b.so");
+    manager->initialize(other.text().c_str());
+    EXPECT_EQ(names(), (Names{L"Name", L"name", L"third"}));
+    EXPECT_FALSE(manager->getBuilder(kitUid));
+    EXPECT_EQ(maker(goodUid), "good");
+    EXPECT_FALSE(platform::findLoadedLibrary(first));
+    EXPECT_EQ(manager->builderIndex.size(), 3u);
+}
+
+TEST_F(PosixDiscovery, KeepsWhatIsKnownForTheNextAttempt) {
+    add(L"goodWithKit", "a.so");
+    const auto second = add(L"goodByHand", "b.so");
+    setHook([](const char* event) {
+        if (std::string_view(event) == "enumerate")
+            ::pthread_exit(nullptr);
+    });
+    std::thread([this] { initialize(); }).join();
+    setHook(nullptr);
+    initialize();
+    EXPECT_TRUE(manager->initialised);
+    EXPECT_EQ(names(), (Names{L"kit", L"Name", L"name", L"third"}));
+    EXPECT_EQ(maker(kitUid), "kit");
+    EXPECT_EQ(maker(goodUid), "good");
 }
 
 TEST_F(PosixDiscovery, LoadsAFileWhoseNameHasUpperCaseAndOthersNot) {

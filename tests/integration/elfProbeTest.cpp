@@ -350,7 +350,8 @@ TEST(ElfProbeOnFiles, RefusesAProgramThatExportsTheFunction) {
 }
 
 TEST(ElfProbeOnFiles, RefusesShortTextsAndZeros) {
-    for (std::size_t length : {0, 1, 4, 16, 63, 64, 65, 8191, 8192, 8193, 100000}) {
+    for (const std::size_t length :
+         {0u, 1u, 4u, 16u, 63u, 64u, 65u, 8191u, 8192u, 8193u, 100000u}) {
         EXPECT_FALSE(exports(std::string(length, '\0')));
         EXPECT_FALSE(exports(std::string("\177ELF\2\1\1") + std::string(length, '\0')));
         EXPECT_FALSE(exports(std::string("\177ELF\2\1\1") + std::string(length, '\377')));

@@ -27,4 +27,35 @@ TEST_F(EndingHost, IsNotEndedByAnEntryPointThatThrows) {
     EXPECT_EQ(result.output, "made kit\ndone\n");
 }
 
+class Host : public ManagerTest {
+  protected:
+    /// Runs `program`, called `name`, on the search path `arguments`.
+    std::string outputOf(const std::filesystem::path& program, const std::string& name,
+                         const std::vector<std::string>& arguments) {
+        const ProgramResult result = runProgram(program, name, arguments, folder.path());
+        EXPECT_TRUE(result.finished);
+        return result.output;
+    }
+};
+
+TEST_F(Host, UsesALibraryThatStandsAtTheAddressItWants) {
+    add(L"ownAddress");
+    for (const char* program : {"testHost", "testHostAtAddress"})
+        EXPECT_EQ(outputOf(buildFolder / "bin" / program, program, {folder.path().string()}),
+                  "made kit\ndone\n")
+            << program;
+}
+
+TEST_F(Host, SearchesNothingWhenTheLocaleHasNoFormForItsOwnFolder) {
+    add(L"goodWithKit"); // In the current folder.
+    const std::filesystem::path own = folder.path() / "lat\xE9";
+    std::filesystem::create_directory(own);
+    std::filesystem::copy_file(builtComponent(L"offersNothing"), own / "nothing.so");
+    std::filesystem::copy_file(builtComponent(L"ownAddress"), own / "own.so");
+    const std::filesystem::path program = buildFolder / "bin" / "testHost";
+    const std::string name = own.string() + "/testHost";
+    EXPECT_EQ(outputOf(program, name, {}), "made kit\ndone\n");
+    EXPECT_EQ(outputOf(program, name, {"--locale", "C.UTF-8"}), "done\n");
+}
+
 } // namespace

@@ -64,9 +64,10 @@ TEST_F(Platform, LowersAsciiLettersAndLeavesTheRestOfAscii) {
 }
 
 TEST_F(Platform, KnowsByWhichNameTheProgramWasStarted) {
-    const std::wstring name = firstArgument();
-    EXPECT_NE(name.find(L"platformTests"), std::wstring::npos);
-    EXPECT_EQ(name.find(L'"'), std::wstring::npos);
+    const std::optional<std::wstring> name = firstArgument();
+    ASSERT_TRUE(name);
+    EXPECT_NE(name->find(L"platformTests"), std::wstring::npos);
+    EXPECT_EQ(name->find(L'"'), std::wstring::npos);
 }
 
 TEST_F(Platform, TellsTimeAndSizeOfAFile) {

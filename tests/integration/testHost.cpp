@@ -2,14 +2,17 @@
 ///
 ///     testHost PATH      initialises with that search path
 ///     testHost           initialises with null
+///     testHost --locale NAME [PATH]   the same in that locale
 ///
 /// One line for each builder, then "done"; a line "made NAME" instead where an object could be
 /// made.
 #include "tests/components/testUids.h"
 
+#include <clocale>
 #include <cstdio>
 #include <filesystem>
 #include <string>
+#include <string_view>
 
 using namespace Mz;
 using namespace Mz::Test;
@@ -32,10 +35,15 @@ class Printer final : public QrEnumerator<QrCPtr<QrBuilderDescription>> {
 } // namespace
 
 int main(int argc, char** argv) {
+    int first = 1;
+    if (argc > 2 && std::string_view(argv[1]) == "--locale") {
+        std::setlocale(LC_ALL, argv[2]);
+        first = 3;
+    }
     std::wstring path;
-    for (int index = 1; index < argc; ++index)
+    for (int index = first; index < argc; ++index)
         path += std::filesystem::path(argv[index]).wstring();
-    QrGetComponentManager()->initialize(argc > 1 ? path.c_str() : nullptr);
+    QrGetComponentManager()->initialize(argc > first ? path.c_str() : nullptr);
     Printer printer;
     QrGetComponentManager()->enumerateBuilders(printer);
     std::puts("done");

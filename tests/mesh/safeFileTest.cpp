@@ -1,42 +1,17 @@
 // Saving that never loses the file that was there.
-#include "examples/mesh/saving/safeFile.h"
 #include "examples/mesh/saving/objectFile.h"
 #include "examples/mesh/saving/recordedList.h"
 #include "examples/mesh/system/system.h"
-#include "tests/mesh/fullMedium.h"
-#include "tests/support/temporaryDirectory.h"
+#include "tests/mesh/safeFileFixture.h"
+#include "tests/mesh/unwritableFolder.h"
 
 #include "components/componentManager/componentImp.h"
 #include "components/objectIO/objectIO.h"
 
-#include <gmock/gmock.h>
-
 using namespace Mz;
 using namespace Meshes;
-using Mz::Test::TemporaryDirectory;
 
 namespace {
-
-class SafeFile : public testing::Test {
-  protected:
-    static void put(const std::filesystem::path& path, std::string_view content) {
-        saveSafely(path, [&](std::ostream& out) { out << content; });
-    }
-
-    std::string content() const { return contentOf(file); }
-    static std::string contentOf(const std::filesystem::path& path) {
-        std::ifstream stream(path, std::ios::binary);
-        return {std::istreambuf_iterator<char>(stream), {}};
-    }
-
-    std::size_t filesInFolder() const {
-        const std::filesystem::directory_iterator entries(folder.path());
-        return static_cast<std::size_t>(std::distance(begin(entries), end(entries)));
-    }
-
-    TemporaryDirectory folder;
-    const std::filesystem::path file = folder.path() / "file with spaces.bin";
-};
 
 TEST_F(SafeFile, IsWritten) {
     put(file, std::string_view("a\n\0b\r", 5));
@@ -92,26 +67,6 @@ TEST_F(SafeFile, KeepsTheOldOneWhenTheStreamFails) {
     EXPECT_EQ(filesInFolder(), 1U);
 }
 
-TEST_F(SafeFile, KeepsTheOldOneWhenTheMediumIsFull) {
-    put(file, "old");
-    const auto fill = [](std::size_t size) {
-        return [size](std::ostream& out) {
-            out.write(std::string(size, 'x').data(), static_cast<std::streamsize>(size));
-        };
-    };
-    const FullMedium full(1000);
-    if (!FullMedium::isSupported())
-        GTEST_SKIP() << "this system cannot be made to run full";
-    saveSafely(file, fill(1000));
-    EXPECT_EQ(content().size(), 1000U);
-    // Whether it shows when the data is written or only at the end, when the rest of it is.
-    for (const std::size_t size : {1001U, 5000U, 100000U}) {
-        EXPECT_THROW(saveSafely(file, fill(size)), QrStreamEx::ExWriteError) << size;
-        EXPECT_EQ(content(), std::string(1000, 'x'));
-        EXPECT_EQ(filesInFolder(), 1U);
-    }
-}
-
 TEST_F(SafeFile, IsRefusedWithTheReasonWhereNoFileCanBe) {
     const std::filesystem::path impossible[] = {folder.path() / "no folder" / "file",
                                                 unwritableFolder() / "file"};
@@ -142,19 +97,6 @@ TEST_F(SafeFile, MayStandInTheCurrentFolder) {
     put("relative", "yy");
     std::filesystem::current_path(before);
     EXPECT_EQ(contentOf(folder.path() / "relative"), "yy");
-}
-
-TEST_F(SafeFile, KeepsSymbolicLinksAndPermissions) {
-    if (!hasLinksAndPermissions())
-        GTEST_SKIP() << "not on this system";
-    const std::filesystem::path link = folder.path() / "link";
-    put(file, "old");
-    std::filesystem::permissions(file, std::filesystem::perms(0640));
-    std::filesystem::create_symlink(file.filename(), link);
-    put(link, "new");
-    EXPECT_TRUE(std::filesystem::is_symlink(link));
-    EXPECT_EQ(content(), "new");
-    EXPECT_EQ(std::filesystem::status(file).permissions(), std::filesystem::perms(0640));
 }
 
 TEST_F(SafeFile, OfAnObjectThatCannotBeWrittenKeepsTheOldOne) {

@@ -1,7 +1,5 @@
 #include "tests/unit/allocationFailure.h"
 
-#include "components/componentManager/exceptions.h"
-
 #include <cstdlib>
 #include <new>
 
@@ -9,13 +7,10 @@ namespace {
 
 constexpr int unlimited = -1;
 constinit thread_local int allowedAllocations = unlimited;
-constinit thread_local bool refused = false;
 
 void* allocate(std::size_t size) {
-    if (allowedAllocations == 0) {
-        refused = true;
+    if (allowedAllocations == 0)
         throw std::bad_alloc();
-    }
     if (allowedAllocations > 0)
         --allowedAllocations;
     if (void* memory = std::malloc(size ? size : 1))
@@ -52,18 +47,6 @@ FailingAllocations::FailingAllocations(int allowed) {
 
 FailingAllocations::~FailingAllocations() {
     allowedAllocations = unlimited;
-}
-
-bool FailingAllocations::reachLibraries() {
-    refused = false;
-    try {
-        const FailingAllocations failing(0);
-        // Long enough for the library to have to allocate.
-        const QrStreamEx::ExRead exception("components/componentManager/allocationFailure", 1);
-    } catch (const std::bad_alloc&) {
-        return refused;
-    }
-    return false;
 }
 
 } // namespace Mz::Test

@@ -122,7 +122,8 @@ TEST_P(Exception, SaysItsReasonByEveryName) {
     EXPECT_EQ(exception->getDetailedReason(), position + GetParam().reason);
     const auto& standard = dynamic_cast<const std::exception&>(*exception);
     EXPECT_EQ(standard.what(), GetParam().reason);
-    EXPECT_EQ(typeid(*exception), *GetParam().type);
+    const ExBase& made = *exception;
+    EXPECT_EQ(typeid(made), *GetParam().type);
 }
 
 TEST_P(Exception, IsCaughtByEveryBase) {
@@ -133,7 +134,8 @@ TEST_P(Exception, ClonesItsDynamicTypeAndReasonDeeply) {
     auto exception = GetParam().make();
     const std::unique_ptr<ExBase> clone(exception->clone());
     ASSERT_TRUE(clone);
-    EXPECT_EQ(typeid(*clone), *GetParam().type);
+    const ExBase& copy = *clone;
+    EXPECT_EQ(typeid(copy), *GetParam().type);
     exception.reset();
     EXPECT_EQ(clone->getReason(), GetParam().reason);
     EXPECT_EQ(clone->getDetailedReason(), position + GetParam().reason);
@@ -264,24 +266,6 @@ TEST(ExceptionClone, IsNullWithoutMemory) {
         ASSERT_LT(allowed, 100);
     }
     EXPECT_GE(nulls, 1);
-}
-
-TEST(ExceptionConstruction, LetsAFailedAllocationThrough) {
-    if (!FailingAllocations::reachLibraries())
-        GTEST_SKIP() << "the libraries allocate by themselves on this platform";
-    const std::string name(1000, 'n');
-    int failures = 0;
-    for (int allowed = 0;; ++allowed) {
-        ASSERT_LT(allowed, 100);
-        try {
-            const FailingAllocations failing(allowed);
-            const QrStreamEx::ExReadError exception(file, line, name.c_str());
-            break;
-        } catch (const std::bad_alloc&) {
-            ++failures;
-        }
-    }
-    EXPECT_GE(failures, 2);
 }
 
 // ---- Across libraries -----------------------------------------------------------------------

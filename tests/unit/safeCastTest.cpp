@@ -182,7 +182,7 @@ TEST(SafeCast, FailureLeavesACountedObjectToItsOwner) {
 class InheritsItsUid : public Gauge {};
 class InheritsItsSelf : public Gauge {
   public:
-    static constexpr QrUid uid{0x3C5A0021, 0x51C24E0B, 0x8F3D6A70, 0x1B9E0C55};
+    [[maybe_unused]] static constexpr QrUid uid{0x3C5A0021, 0x51C24E0B, 0x8F3D6A70, 0x1B9E0C55};
 };
 class IsNoCastable {
   public:

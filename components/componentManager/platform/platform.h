@@ -36,9 +36,9 @@ NativePath openingPath(const std::wstring& directory, const std::wstring& name,
 /// letters only on Linux.
 std::wstring lowerCase(std::wstring text);
 
-/// The first element of the process's command line, by which the program was started; empty when
-/// the system does not tell.
-std::wstring firstArgument();
+/// The first element of the process's command line, by which the program was started; nothing when
+/// the system does not tell, or the current locale has no form for it.
+std::optional<std::wstring> firstArgument();
 
 // ---- Files ----------------------------------------------------------------------------------
 
@@ -123,7 +123,7 @@ class QuietErrors {
     QuietErrors& operator=(const QuietErrors&) = delete;
 
   private:
-    unsigned int previousMode;
+    [[maybe_unused]] unsigned int previousMode; ///< where the system has such a mode
 };
 
 // ---- Threads and locale ---------------------------------------------------------------------
@@ -131,6 +131,11 @@ class QuietErrors {
 /// The system's identifier of the calling thread. The system may give it to another thread when
 /// this one has ended.
 std::uint32_t currentThreadId();
+
+/// Has `before` called before the process makes a copy of itself, and afterwards `inParent` in the
+/// process and `inChild` in the copy, where only the calling thread lives on, by another identifier.
+/// Does nothing where processes make no copies of themselves.
+void aroundForks(void (*before)(), void (*inParent)(), void (*inChild)());
 
 /// Whether LC_CTYPE of the calling thread is "C" or "POSIX".
 bool usesPlainBytes();

@@ -133,7 +133,8 @@ class ElfLibrary {
             header->e_phentsize != sizeof(Elf64_Phdr) || header->e_phnum > maximumSegments)
             return false;
         // The section headers stand at the end, as a rule: a file that was cut off lacks them.
-        if (!file.reaches(header->e_shoff, header->e_shnum * std::uint64_t{header->e_shentsize}))
+        if (header->e_shnum != 0 &&
+            !file.reaches(header->e_shoff, header->e_shnum * std::uint64_t{header->e_shentsize}))
             return false;
         for (std::size_t index = 0; index < header->e_phnum; ++index) {
             const auto segment =

@@ -13,6 +13,7 @@
 #include <link.h>
 #include <locale.h>
 #include <memory>
+#include <pthread.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
@@ -87,6 +88,7 @@ void sortByName(std::vector<DirectoryEntry>& entries) {
 /// What `isCodeOf` looks for among the loaded libraries.
 struct CodeSearch {
     ElfW(Addr) base;
+    ElfW(Addr) dynamic; ///< its dynamic section, which tells it from others with the same base
     ElfW(Addr) address;
     bool found;
 };
@@ -96,13 +98,18 @@ int lookForCode(dl_phdr_info* library, std::size_t, void* data) {
     auto& search = *static_cast<CodeSearch*>(data);
     if (library->dlpi_addr != search.base)
         return 0;
+    bool sought = false;
+    bool found = false;
     for (std::size_t index = 0; index < library->dlpi_phnum; ++index) {
         const ElfW(Phdr)& segment = library->dlpi_phdr[index];
-        if (segment.p_type == PT_LOAD && (segment.p_flags & PF_X) &&
-            search.address - search.base - segment.p_vaddr < segment.p_memsz)
-            search.found = true;
+        if (segment.p_type == PT_DYNAMIC)
+            sought = search.base + segment.p_vaddr == search.dynamic;
+        else if (segment.p_type == PT_LOAD && (segment.p_flags & PF_X) &&
+                 search.address - search.base - segment.p_vaddr < segment.p_memsz)
+            found = true;
     }
-    return 1;
+    search.found = sought && found;
+    return sought ? 1 : 0;
 }
 
 /// Whether the address lies in the code of that very library: neither in one that it depends on,
@@ -111,7 +118,8 @@ bool isCodeOf(Module module, void* address) {
     link_map* library = nullptr;
     if (::dlinfo(module, RTLD_DI_LINKMAP, &library) != 0)
         return false;
-    CodeSearch search{library->l_addr, reinterpret_cast<ElfW(Addr)>(address), false};
+    CodeSearch search{library->l_addr, reinterpret_cast<ElfW(Addr)>(library->l_ld),
+                      reinterpret_cast<ElfW(Addr)>(address), false};
     ::dl_iterate_phdr(lookForCode, &search);
     return search.found;
 }
@@ -152,11 +160,12 @@ std::wstring lowerCase(std::wstring text) {
     return text;
 }
 
-std::wstring firstArgument() {
+std::optional<std::wstring> firstArgument() {
     std::ifstream commandLine("/proc/self/cmdline", std::ios::binary);
     std::string argument;
-    std::getline(commandLine, argument, '\0');
-    return toCharacters(argument).value_or(std::wstring());
+    if (!std::getline(commandLine, argument, '\0'))
+        return std::nullopt;
+    return toCharacters(argument);
 }
 
 std::optional<FileStatus> queryFile(const NativePath& path) {
@@ -180,6 +189,7 @@ std::vector<DirectoryEntry> listCandidates(const NativePath& directory) {
     struct stat own;
     if (!listing || ::fstat(::dirfd(listing.get()), &own) != 0)
         return entries;
+    const NativePath inDirectory = directory + "/";
     while (const dirent* entry = ::readdir(listing.get())) {
         if (entry->d_name[0] == '.')
             continue;
@@ -188,7 +198,7 @@ std::vector<DirectoryEntry> listCandidates(const NativePath& directory) {
             continue;
         std::optional<std::wstring> name = toCharacters(entry->d_name);
         if (name)
-            entries.push_back({std::move(*name), directory + "/" + entry->d_name, identity});
+            entries.push_back({std::move(*name), inDirectory + entry->d_name, identity});
     }
     sortByName(entries);
     return entries;
@@ -256,6 +266,10 @@ QuietErrors::~QuietErrors() = default;
 
 std::uint32_t currentThreadId() {
     return static_cast<std::uint32_t>(::gettid());
+}
+
+void aroundForks(void (*before)(), void (*inParent)(), void (*inChild)()) {
+    ::pthread_atfork(before, inParent, inChild);
 }
 
 bool usesPlainBytes() {

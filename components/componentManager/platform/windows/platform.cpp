@@ -12,10 +12,26 @@ namespace Mz::platform {
 
 namespace {
 
+/// The loader looks for a name that is not a full one in the program's folder first, and elsewhere;
+/// what was found is in the current one.
+std::wstring fullName(const NativePath& path) {
+    std::wstring full(MAX_PATH, L'\0');
+    while (true) {
+        const DWORD length =
+            ::GetFullPathNameW(path.c_str(), static_cast<DWORD>(full.size()), full.data(), nullptr);
+        if (length == 0)
+            return path;
+        const bool fits = length < full.size();
+        full.resize(length);
+        if (fits)
+            return full;
+    }
+}
+
 /// The loader takes a name without an extension to mean one with ".dll" behind it; a dot at the end
 /// says that there is none.
 std::wstring loaderName(const NativePath& path) {
-    const std::wstring& name = path;
+    const std::wstring name = fullName(path);
     const std::size_t separator = name.find_last_of(L"/\\");
     const std::size_t dot = name.find_last_of(L'.');
     const bool hasExtension =
@@ -27,12 +43,13 @@ std::wstring loaderName(const NativePath& path) {
 /// long as this lives. Libraries without a manifest load in the surroundings of the caller.
 class OwnActivationContext {
   public:
-    explicit OwnActivationContext(const std::wstring& path) {
+    explicit OwnActivationContext(const NativePath& path) {
+        const std::wstring source = fullName(path);
         constexpr int isolationAwareManifest = 2;
         ACTCTXW request{};
         request.cbSize = sizeof request;
         request.dwFlags = ACTCTX_FLAG_RESOURCE_NAME_VALID;
-        request.lpSource = path.c_str();
+        request.lpSource = source.c_str();
         request.lpResourceName = MAKEINTRESOURCEW(isolationAwareManifest);
         context = ::CreateActCtxW(&request);
         if (context != INVALID_HANDLE_VALUE)
@@ -103,7 +120,7 @@ std::wstring lowerCase(std::wstring text) {
     return text;
 }
 
-std::wstring firstArgument() {
+std::optional<std::wstring> firstArgument() {
     // The C runtime's wide arguments are absent in a program with a narrow `main`. In the first
     // argument a quote only toggles, and no escape is known.
     std::wstring argument;
@@ -212,6 +229,8 @@ QuietErrors::~QuietErrors() {
 std::uint32_t currentThreadId() {
     return ::GetCurrentThreadId();
 }
+
+void aroundForks(void (*)(), void (*)(), void (*)()) {}
 
 bool usesPlainBytes() {
     const char* name = std::setlocale(LC_CTYPE, nullptr);
