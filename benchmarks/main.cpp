@@ -71,6 +71,7 @@ std::vector<std::string> optionsOf(int argc, char** argv, std::string& ratiosFil
 
 bool initializeLibrary(std::vector<std::string>& options) {
     std::vector<char*> arguments;
+    arguments.reserve(options.size());
     for (std::string& option : options)
         arguments.push_back(option.data());
     int count = static_cast<int>(arguments.size());

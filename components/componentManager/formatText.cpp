@@ -65,7 +65,10 @@ Size parseSize(const wchar_t*& format) {
         return Size::Byte;
     if (take(format, L"h"))
         return Size::Short;
-    if (take(format, L"ll") || take(format, L"I64"))
+    if (take(format, L"I32"))
+        return Size::None;
+    if (take(format, L"ll") || take(format, L"I64") || take(format, L"I") || take(format, L"z") ||
+        take(format, L"t") || take(format, L"j"))
         return Size::Int64;
     if (take(format, L"l"))
         return Size::Long;
@@ -73,7 +76,6 @@ Size parseSize(const wchar_t*& format) {
         return Size::Wide;
     if (take(format, L"L"))
         return Size::LongDouble;
-    take(format, L"I32");
     return Size::None;
 }
 
@@ -297,6 +299,7 @@ void storeCount(const Directive& directive, std::size_t count, std::va_list& arg
     case Size::Int64: *va_arg(arguments, int64*) = static_cast<int64>(count); break;
     case Size::Long: *va_arg(arguments, long*) = static_cast<long>(count); break;
     case Size::Short: *va_arg(arguments, short*) = static_cast<short>(count); break;
+    case Size::Byte: *va_arg(arguments, signed char*) = static_cast<signed char>(count); break;
     default: *va_arg(arguments, int*) = static_cast<int>(count); break;
     }
 }

@@ -7,8 +7,8 @@
 namespace Mz {
 
 /// Appends to `result` what `format` makes of `arguments`: flags, width, precision and the sizes
-/// `hh h l ll L w I32 I64` before `d i u o x X c C s S e E f F g G a A p n %`. Conventions are
-/// those of Windows (wide `%s` and `%c`, a `long` of 32 bits, `%p` of 16 upper-case digits),
+/// `hh h l ll j z t L w I I32 I64` before `d i u o x X c C s S e E f F g G a A p n %`. Conventions
+/// are those of Windows (wide `%s` and `%c`, a `long` of 32 bits, `%p` of 16 upper-case digits),
 /// numbers those of the "C" locale with exponents of at least two digits. A null text is "(null)".
 ///
 /// False when there is no such text: a `long` that does not fit 32 bits, or a '%' with nothing

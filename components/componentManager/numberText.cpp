@@ -104,11 +104,21 @@ constexpr auto powersOfTen = [] {
     return powers;
 }();
 
+/// Whether this thread computes with all the bits of the type. On Windows it depends on who started
+/// the thread.
+bool hasFullPrecision() {
+    if (std::numeric_limits<Wide>::digits < 64)
+        return false;
+    const volatile Wide one = 1;
+    const volatile Wide finest = std::numeric_limits<Wide>::epsilon();
+    return (one + finest) - one == finest;
+}
+
 /// Whether no other number of 16 digits is nearer to `value` than this one of fewer digits. False
 /// where that is not certain.
 bool isNearest(const Decimal& decimal, double value) {
     // The distance then comes out a thousand times finer than it is needed.
-    if (std::numeric_limits<Wide>::digits < 64)
+    if (!hasFullPrecision())
         return false;
     const int scale = decimal.count - 1 - decimal.exponent;
     if (scale < 0 || static_cast<std::size_t>(scale) >= powersOfTen.size())

@@ -51,7 +51,7 @@ class MZ_SHARED_TYPE QrReference {
 
     /// The new reference is taken before the old one is given back, so that assigning what the old
     /// object alone keeps alive is safe.
-    QrReference& operator=(const QrReference& other) {
+    QrReference& operator=(const QrReference& other) { // NOLINT(bugprone-unhandled-self-assignment)
         QrReference(other).swap(*this);
         return *this;
     }

@@ -189,6 +189,9 @@ bool scanNumber(std::istream& in, std::streambuf& buffer, const wchar_t* format,
     char window[32];
     std::streamsize got = 0;
     directly(in, [&] {
+        // With nothing in the buffer, what is available would be a guess at the rest of the medium.
+        if (buffer.sgetc() == std::streambuf::traits_type::eof())
+            return true;
         const std::streamsize available = buffer.in_avail();
         if (available >= fewest)
             got = buffer.sgetn(window, std::min<std::streamsize>(available, windowOf(target)));

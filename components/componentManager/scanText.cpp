@@ -290,7 +290,7 @@ class Scanner {
         case L'o':
         case L'O': return readInteger(directive, 8);
         case L'x':
-        case L'X': return readInteger(directive, 16);
+        case L'X':
         case L'p':
         case L'P': return readInteger(directive, 16);
         case L'i':

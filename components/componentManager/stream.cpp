@@ -314,11 +314,12 @@ bool QrStream::readCharacters(std::wstring& value, int length) {
     value.clear();
     for (int done = 0; done < length;) {
         const int wanted = std::min(chunk, length - done);
-        value.resize(static_cast<std::size_t>(done + wanted));
+        value.resize(static_cast<std::size_t>(done) + static_cast<std::size_t>(wanted));
         wchar_t* arrived = value.data() + done;
         const int got = io().readChar(arrived, wanted, 0x7fffffff);
         if (got < wanted) {
-            value.resize(static_cast<std::size_t>(done + std::max(got, 0)));
+            value.resize(static_cast<std::size_t>(done) +
+                         static_cast<std::size_t>(std::max(got, 0)));
             return false;
         }
         done += wanted;

@@ -146,8 +146,11 @@ void writeValues(QrBufferedIO& io, const T* values, int count) {
 /// Single bytes are written from where they stand.
 void writeBytes(QrBufferedIO& io, const void* values, int count) {
     const auto* bytes = static_cast<const char*>(values);
-    for (int done = 0; done < count; done += blockSize)
-        io.write(bytes + done, std::min(blockSize, count - done));
+    for (int done = 0; done < count;) {
+        const int size = std::min(blockSize, count - done);
+        io.write(bytes + done, size);
+        done += size;
+    }
 }
 
 /// Reads bytes in one call of the IO, or in as few as an `int` can count them, and returns how many

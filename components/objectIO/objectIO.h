@@ -148,6 +148,11 @@ class MZ_OBJECT_IO_API QrObjectInBuffer
     int readChar(wchar_t* buf, int size, int count) override;
     using QrForwardingIO::readChar;
 
+    /// Raises `QrStreamEx::ExReadError` for an array of `wchar_t` in the text form of a stream: it
+    /// is written as numbers there and read as bytes.
+    int read(void* data, int size) override;
+    using QrForwardingIO::read;
+
   private:
     QrRef<QrCastable> readRecord(QrStream& s, int64 position);
     QrRef<QrCastable> readNewObject(QrStream& s, std::uint32_t number, int64 position);

@@ -166,4 +166,11 @@ int QrObjectInBuffer::readChar(wchar_t* buf, int size, int count) {
     return got;
 }
 
+int QrObjectInBuffer::read(void* data, int size) {
+    if (!state->exactStrings)
+        throw QrStreamEx::ExReadError(source, __LINE__,
+                                      "a text stream cannot carry arrays of characters");
+    return inner().read(data, size);
+}
+
 } // namespace Mz

@@ -2,6 +2,7 @@
 #include "components/objectIO/objectRecord.h"
 
 #include <algorithm>
+#include <climits>
 #include <cwchar>
 #include <limits>
 #include <unordered_map>
@@ -21,6 +22,20 @@ constexpr const char* source = "components/objectIO/objectOutBuffer";
 /// infinities and of what is no number are not.
 bool isOfNumber(wchar_t c) {
     return c != L'\0' && std::wcschr(L"0123456789+-.e", c);
+}
+
+/// Whether the character, if the locale writes it at all, comes back. Some locales write one that
+/// looks similar instead.
+bool readsBack(wchar_t character) {
+    char bytes[MB_LEN_MAX];
+    std::mbstate_t writing{};
+    const std::size_t length = std::wcrtomb(bytes, character, &writing);
+    if (length == static_cast<std::size_t>(-1))
+        return true; // It is refused where it is written.
+    wchar_t again = L'\0';
+    std::mbstate_t reading{};
+    const std::size_t read = std::mbrtowc(&again, bytes, length, &reading);
+    return read == (character == L'\0' ? 0 : length) && again == character;
 }
 
 } // namespace
@@ -108,6 +123,9 @@ int QrObjectOutBuffer::writeChar(const wchar_t* s, int count) {
     const wchar_t* end = s + std::max(count, 0);
     if (state->exactStrings && std::find(s, end, L'\0') != end)
         throw QrStreamEx::ExWriteError(source, __LINE__, "a string has a NUL in it");
+    if (state->exactStrings && !std::all_of(s, end, readsBack))
+        throw QrStreamEx::ExWriteError(source, __LINE__,
+                                       "a string has a character that the locale does not know");
     constexpr const char* inexact =
         "a text stream carries neither strings nor infinite numbers exactly";
     if (!state->exactStrings && !std::all_of(s, end, isOfNumber))

@@ -6,7 +6,6 @@
 
 using namespace Mz;
 using namespace Mz::Test;
-using ::testing::ElementsAre;
 using ::testing::IsEmpty;
 
 namespace {

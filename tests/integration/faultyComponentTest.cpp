@@ -4,7 +4,6 @@
 
 using namespace Mz;
 using namespace Mz::Test;
-using ::testing::IsEmpty;
 
 namespace {
 

@@ -10,7 +10,6 @@
 using namespace Mz::platform;
 using Mz::Test::builtComponent;
 using Mz::Test::TemporaryDirectory;
-using ::testing::IsEmpty;
 
 namespace {
 

@@ -2,7 +2,6 @@
 
 using namespace Mz;
 using namespace Mz::Test;
-using ::testing::ElementsAre;
 using ::testing::IsEmpty;
 
 namespace {

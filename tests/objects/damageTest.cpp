@@ -9,7 +9,6 @@ namespace {
 
 using namespace Mz;
 using namespace Mz::Test;
-using testing::StartsWith;
 
 /// What reading `size` bytes may allocate in all. (On Windows, what this program itself allocates.)
 std::size_t allowance(std::size_t size) {

@@ -7,7 +7,6 @@ namespace {
 
 using namespace Mz;
 using namespace Mz::Test;
-using testing::ElementsAre;
 
 template <class Stream>
 using Graph = ObjectsOn<Stream>;

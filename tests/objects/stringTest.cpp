@@ -114,6 +114,40 @@ TEST_F(Strings, OfOtherLocalesAreExactInThem) {
     }
 }
 
+/// Some locales write a character that looks similar.
+TEST_F(Strings, WithCharactersThatTheLocaleChangesAreRefused) {
+    std::vector<std::string> names{"C"};
+    for (const MultibyteLocale& locale : multibyteLocales())
+        names.emplace_back(locale.name);
+    for (const SingleByteLocale& locale : singleByteLocales())
+        names.emplace_back(locale.name);
+    for (const std::string& name : names) {
+        const LocaleGuard guard(name.c_str());
+        ASSERT_TRUE(guard);
+        for (const wchar_t character : std::wstring(L"\x100\x221E\x2212\xE9\xFF01\x2018\xA0"))
+            try {
+                const std::wstring text(1, character);
+                EXPECT_EQ(through<QrBinaryStream>(text), text)
+                    << name << ' ' << static_cast<unsigned int>(character);
+            } catch (const QrStreamEx::ExWriteError&) {
+                continue; // Refused.
+            }
+    }
+}
+
+TEST_F(Strings, ArraysOfCharactersAreExactInBinaryAndRefusedInText) {
+    for (const wchar_t character : {L'\7', L'\t', L'a', L'z'}) {
+        const QrPtr<Node> object = make(wideUid);
+        object->name = {character, L'b'};
+        Loading<QrBinaryStream> binary(saved<QrBinaryStream>(object.get()));
+        EXPECT_EQ(binary.node()->name, object->name);
+        object->name = {character, L'\x8'};
+        Loading<QrTextStream> text(saved<QrTextStream>(object.get()));
+        EXPECT_THAT(readFailure([&] { text.object(); }),
+                    HasSubstr("a text stream cannot carry arrays of characters"));
+    }
+}
+
 TEST_F(Strings, ClaimedByAHostileFileAreNotFilledWithNuls) {
     Saving<QrBinaryStream> out;
     out.stream << 1U << stringUid << 1U << 6 << 1000 << 0;

@@ -1,6 +1,6 @@
 #include "tests/streams/support.h"
 
-#include <gtest/gtest.h>
+#include <gmock/gmock.h>
 
 #include <cmath>
 #include <limits>
@@ -39,6 +39,11 @@ TEST(FormattedWrite, KnowsTheSizesOfIntegers) {
     constexpr int64 smallest = std::numeric_limits<int64>::min();
     EXPECT_EQ(formatted(L"%I64d|%lld|%I64u|%I64x", smallest, smallest, ~0ULL, ~0ULL),
               "-9223372036854775808|-9223372036854775808|18446744073709551615|ffffffffffffffff");
+    EXPECT_EQ(formatted(L"%zu|%zx|%jd|%ju|%td|%Iu|%Id|%d", ~std::size_t(0), std::size_t(255),
+                        smallest, ~0ULL, std::ptrdiff_t(-1), ~std::size_t(0), std::ptrdiff_t(-2),
+                        7),
+              "18446744073709551615|ff|-9223372036854775808|18446744073709551615|-1|"
+              "18446744073709551615|-2|7");
     EXPECT_EQ(formatted(L"%hd|%hu|%hhd|%hhu", 65537, 65537, 257, -1), "1|1|1|255");
     EXPECT_EQ(formatted(L"%I32d|%I32u", -1, 0xFFFFFFFFU), "-1|4294967295");
     EXPECT_EQ(formatted(L"%ld|%lu|%lx", -2147483647L - 1, 4294967295UL, 255UL),
@@ -145,6 +150,16 @@ TEST(FormattedWrite, CountsWhatItHasFormatted) {
     int count = -1;
     EXPECT_EQ(formatted(L"abc%n%d", &count, 5), "abc5");
     EXPECT_EQ(count, 3);
+}
+
+TEST(FormattedWrite, StoresItsCountInTheWidthThatIsSaid) {
+    signed char bytes[] = {0x55, -1, 0x55};
+    short half[] = {0x5555, -1, 0x5555};
+    int64 whole = -1;
+    EXPECT_EQ(formatted(L"abc%hhnde%hnf%I64n", &bytes[1], &half[1], &whole), "abcdef");
+    EXPECT_THAT(bytes, testing::ElementsAre(0x55, 3, 0x55));
+    EXPECT_THAT(half, testing::ElementsAre(0x5555, 5, 0x5555));
+    EXPECT_EQ(whole, 6);
 }
 
 } // namespace

@@ -9,7 +9,6 @@ namespace {
 
 using namespace Mz::Test;
 using Mz::QrBinaryStream;
-using Mz::QrStream;
 using Mz::QrStreamEx;
 using Mz::QrTextStream;
 

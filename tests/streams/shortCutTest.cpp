@@ -275,6 +275,38 @@ TEST(ShortCuts, ReadAFileAcrossItsBlocks) {
     EXPECT_EQ(io.read(), -1);
 }
 
+/// What is read alternately by format and by character from a file with a buffer of `size` bytes.
+template <class IO>
+std::string readThroughBuffer(const std::filesystem::path& path, int size) {
+    char memory[64];
+    std::ifstream file;
+    file.rdbuf()->pubsetbuf(size ? memory : nullptr, size);
+    file.open(path, std::ios::binary);
+    IO io(&file);
+    BaseStream stream(&io);
+    std::string told;
+    for (std::size_t round = 0; round < 40; ++round) {
+        told += readByFormat(stream, round) + ";";
+        char character = '!';
+        if (io.readChar(character) == 1)
+            told += character;
+    }
+    return told;
+}
+
+TEST(ShortCuts, ReadAFileWhateverTheSizeOfItsBuffer) {
+    const TemporaryDirectory folder;
+    const std::filesystem::path path = folder.path() / "numbers.txt";
+    std::mt19937 engine(31);
+    for (int round = 0; round < 100 && !HasFailure(); ++round) {
+        std::ofstream(path, std::ios::binary) << "x41-" << randomText(engine) << " 22 333 4444 5";
+        for (const int size : {0, 1, 2, 3, 4, 8, 16, 64})
+            EXPECT_EQ(readThroughBuffer<Mz::QrInBuffer>(path, size),
+                      readThroughBuffer<ForeignInput>(path, size))
+                << size;
+    }
+}
+
 TEST(ShortCuts, ReadANumberThatBeginsWithWhatWasPutBack) {
     const TemporaryDirectory folder;
     const std::filesystem::path path = folder.path() / "number.txt";

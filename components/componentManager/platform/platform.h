@@ -47,6 +47,8 @@ std::optional<std::wstring> firstArgument();
 struct FileIdentity {
     std::uint64_t device = 0;
     std::uint64_t index = 0;
+    // The check takes the comparison with zero inside it for a null pointer.
+    // NOLINTNEXTLINE(modernize-use-nullptr)
     friend auto operator<=>(const FileIdentity&, const FileIdentity&) = default;
 };
 
@@ -133,8 +135,8 @@ class QuietErrors {
 std::uint32_t currentThreadId();
 
 /// Has `before` called before the process makes a copy of itself, and afterwards `inParent` in the
-/// process and `inChild` in the copy, where only the calling thread lives on, by another identifier.
-/// Does nothing where processes make no copies of themselves.
+/// process and `inChild` in the copy, where only the calling thread lives on, by another
+/// identifier. Does nothing where processes make no copies of themselves.
 void aroundForks(void (*before)(), void (*inParent)(), void (*inChild)());
 
 /// Whether LC_CTYPE of the calling thread is "C" or "POSIX".

@@ -47,6 +47,7 @@ inline constexpr QrUid censusUid = classUid(0);
 inline constexpr QrUid nodeUid = classUid(1);
 /// A node that stores its name as a plain string, and nothing else.
 inline constexpr QrUid stringUid = classUid(2);
+inline constexpr QrUid wideUid = classUid(20);
 /// A node whose storing is the work of a companion.
 inline constexpr QrUid companionUid = classUid(3);
 /// A node of the second library. Its builder gives it out as another interface than its first.

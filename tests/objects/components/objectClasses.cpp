@@ -69,6 +69,19 @@ class StringObject final
     void read(QrStream& stream) override { stream >> number >> name >> number; }
 };
 
+/// Holds an array of characters, two of them, which only binary streams carry.
+class WideObject final : public QrCastRef<QrCastHeap<QrCastMulti<WideObject, Node, QrPersistant>>> {
+  public:
+    const QrUid* getClassUid() const override { return &wideUid; }
+    unsigned int getVersion() const override { return 1; }
+    void write(QrStream& stream) override { stream.write(name[0], 2); }
+    void read(QrStream& stream) override {
+        name.resize(2);
+        if (stream.read(name[0], 2) != 2)
+            throw QrStreamEx::ExReadError("tests/objects/wideObject", __LINE__);
+    }
+};
+
 class CompanionObject;
 
 class Companion final
@@ -105,4 +118,5 @@ MZ_COMPONENT(L"Classes", L"", Kit::builderOf<CensusObject>({.uid = censusUid}),
              Kit::builderOf<NodeObject>({.uid = nodeUid}),
              Kit::builderOf<NodeObject>({.uid = otherClassUid}),
              Kit::builderOf<StringObject>({.uid = stringUid}),
+             Kit::builderOf<WideObject>({.uid = wideUid}),
              Kit::builderOf<CompanionObject>({.uid = companionUid}))
