@@ -16,8 +16,8 @@ namespace {
 
 constexpr const char* about =
     "Tells which component libraries there are, why a file is none, and what they can do.\n\n"
-    "Exit status: 0 all is well; 1 something is wrong with a library, a file or a folder; 2 wrong "
-    "use.";
+    "Exit status: 0 all is well; 1 something is wrong with a library, a file or a folder, or the "
+    "output could not be written; 2 wrong use.";
 
 /// Everything that the command line can say.
 struct Arguments {
