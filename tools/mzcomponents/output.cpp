@@ -28,7 +28,8 @@ void reserveResults() {
 
 bool flushResults() {
     // The parser of the command line writes its help to the stream that everybody knows.
-    return static_cast<bool>(results().flush()) & static_cast<bool>(std::cout.flush());
+    const bool helped = static_cast<bool>(std::cout.flush());
+    return static_cast<bool>(results().flush()) && helped;
 }
 
 void complain(const std::wstring& text) {
