@@ -78,6 +78,8 @@ void replaceFile(const std::filesystem::path& file, std::string_view content) {
         if (output && moveOver(temporary, target))
             return;
     }
+    // Some systems keep what must not be written.
+    std::filesystem::permissions(temporary, std::filesystem::perms::owner_all, ignored);
     std::filesystem::remove(temporary, ignored);
     throw QrStreamEx::ExWriteError(source, __LINE__, name.c_str());
 }

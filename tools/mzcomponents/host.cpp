@@ -132,18 +132,20 @@ void Host::tellFaults(const std::string& cache) {
 std::vector<std::filesystem::path> Host::safeOnes(std::vector<std::filesystem::path> folders) {
     const Judged judged(scanned);
     // Without one folder the manager may meet a file in another one, under another name.
-    for (bool changed = true; changed;) {
+    for (;;) {
         const Doubts doubts = doubtsAbout(folders, judged);
-        changed = std::erase_if(folders, [&](const std::filesystem::path& folder) {
-                      const auto doubt = doubts.find(directoryOf(folder));
-                      if (doubt == doubts.end())
-                          return false;
-                      tellOfDoubt(controller, folder, doubt->second);
-                      return true;
-                  }) > 0;
-        complete = complete && !changed;
+        if (doubts.empty())
+            return folders;
+        complete = false;
+        const auto count = std::erase_if(folders, [&](const std::filesystem::path& folder) {
+            const auto doubt = doubts.find(directoryOf(folder));
+            if (doubt != doubts.end())
+                tellOfDoubt(controller, folder, doubt->second);
+            return doubt != doubts.end();
+        });
+        if (count == 0)
+            return {}; // Of none of them, as far as names tell; then none is sure.
     }
-    return folders;
 }
 
 void Host::start(const std::vector<std::filesystem::path>& folders) {

@@ -91,11 +91,15 @@ Imported importFile(const Host& host, const std::filesystem::path& file) {
 }
 
 std::wstring describe(const QrCastable* object) {
-    const auto persistant = queryCast<QrPersistant>(const_cast<QrCastable*>(object));
-    if (!persistant)
-        return L"an object that cannot be stored";
-    return L"class " + Tools::textOf(*persistant->getClassUid()) + L", version " +
-           std::to_wstring(persistant->getVersion());
+    try {
+        const auto persistant = queryCast<QrPersistant>(const_cast<QrCastable*>(object));
+        if (!persistant)
+            return L"an object that cannot be stored";
+        return L"class " + Tools::textOf(*persistant->getClassUid()) + L", version " +
+               std::to_wstring(persistant->getVersion());
+    } catch (...) {
+        return L"an object that throws when it is asked for its class";
+    }
 }
 
 Json jsonOf(const std::filesystem::path& file, const Imported& imported) {

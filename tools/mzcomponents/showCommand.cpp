@@ -157,6 +157,22 @@ int showObjects(const Common& common, const std::filesystem::path& file, std::is
     return subjectIsWrong;
 }
 
+/// What keeps the file from being read as objects, or nothing; `input` is open then.
+std::wstring obstacle(const std::filesystem::path& file, std::ifstream& input,
+                      const std::wstring& whyNoList) {
+    std::error_code failure;
+    if (!std::filesystem::is_regular_file(file, failure))
+        return L"there is no such file";
+    if (std::filesystem::file_size(file, failure) == 0 && !failure)
+        return L"the file is empty";
+    input.open(file, std::ios::binary);
+    if (!input || input.peek() == std::ifstream::traits_type::eof())
+        return L"the file cannot be read";
+    if (!beginsWithAnObject(input))
+        return L"neither a recorded list (" + whyNoList + L") nor stored objects";
+    return {};
+}
+
 } // namespace
 
 int show(const Common& common, const std::string& argument) {
@@ -166,17 +182,8 @@ int show(const Common& common, const std::string& argument) {
         showList(common, reading.libraries);
         return good;
     }
-    std::error_code failure;
-    std::wstring wrong;
-    std::ifstream input(file, std::ios::binary);
-    if (!std::filesystem::is_regular_file(file, failure))
-        wrong = L"there is no such file";
-    else if (!input || input.peek() == std::ifstream::traits_type::eof())
-        wrong = std::filesystem::file_size(file, failure) == 0 && !failure
-                    ? L"the file is empty"
-                    : L"the file cannot be read";
-    else if (!beginsWithAnObject(input))
-        wrong = L"neither a recorded list (" + reading.reason + L") nor stored objects";
+    std::ifstream input;
+    const std::wstring wrong = obstacle(file, input, reading.reason);
     if (wrong.empty())
         return showObjects(common, file, input, reading.reason);
     complain(widened(argument) + L": " + wrong);
