@@ -32,7 +32,7 @@ struct ScannedFile {
     std::wstring directory, fileName; ///< as recorded
     Finding verdict;
     std::vector<Finding> notes;
-    bool recorded = false; ///< whether the list has it now
+    bool recorded = false; ///< whether `libraries` has it
     bool looked = false;   ///< false when the list had it already, and it has not changed
     bool folder = false;   ///< one of the folders, which could not be searched
 };
