@@ -163,12 +163,14 @@ TEST_F(Command, ShowsControlCharactersInsteadOfSendingThem) {
 
 TEST_F(Command, LeavesStandardOutputToItsResults) {
     add(L"notes");
-    add(L"chatters");
-    EXPECT_EQ(json(0, {"types"}).at("types").size(), 1u);
+    add(L"talkativeImporter");
+    EXPECT_EQ(json(0, {"types"}).at("types").size(), 2u);
     EXPECT_EQ(json(0, {"graph"}).at("libraries").size(), 2u);
-    const ProgramResult dot = run({"graph", "--path", path()});
-    EXPECT_THAT(dot.output, StartsWith("digraph"));
-    EXPECT_EQ(dot.output.find("MZPR"), std::string::npos);
+    std::ofstream(work.path() / "other", std::ios::binary) << "x";
+    EXPECT_EQ(json(1, {"import", "other"}).at("files").size(), 1u);
+    EXPECT_EQ(run({"types", "--path", path()}).output,
+              "notes                 *.note            Notes\n"
+              "talks                 *.talk            Talks\n");
 }
 
 TEST_F(Command, GoesOnWhateverAComponentThrows) {

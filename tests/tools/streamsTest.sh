@@ -37,7 +37,7 @@ lost() { # lost ARGUMENTS...: it says so when its output cannot be written
 }
 
 copy notes good
-copy chatters good
+copy talkativeImporter good
 copy crashesInEntryPoint bad
 lost --version
 lost --help
@@ -49,7 +49,7 @@ lost scan --path good --cache list
 expect 1 'missing: there is no such file' types --path missing
 expect 1 'missing: there is no such file' graph --path 'good;missing'
 expect 0 'crashesInEntryPoint.*: it crashes in its entry point' types --path bad
-expect 0 'MZPR this is no answer' types --path good
+expect 0 'this is no result' types --path good
 expect 2 'names no folder' types --path ''
 
 touch empty
