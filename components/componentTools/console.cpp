@@ -12,8 +12,8 @@
 #include <cstring>
 #include <iostream>
 #include <rang.hpp>
+#include <string>
 #include <string_view>
-#include <type_traits>
 #include <utility>
 
 namespace Mz::Tools {
@@ -65,7 +65,7 @@ std::size_t columnsOf(wchar_t character) {
         {0x1100, 0x115F},   {0x2600, 0x27BF},  {0x2E80, 0xA4CF}, {0xAC00, 0xD7A3},
         {0xF900, 0xFAFF},   {0xFE30, 0xFE6F},  {0xFF00, 0xFF60}, {0xFFE0, 0xFFE6},
         {0x1F000, 0x1FAFF}, {0x20000, 0x3FFFD}};
-    const std::uint32_t code = static_cast<std::make_unsigned_t<wchar_t>>(character);
+    const std::uint32_t code = std::char_traits<wchar_t>::to_int_type(character);
     const bool isWide = std::any_of(std::begin(wide), std::end(wide), [&](const auto& range) {
         return code >= range.first && code <= range.second;
     });
