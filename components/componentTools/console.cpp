@@ -7,9 +7,14 @@
 #include <atomic>
 #include <cmath>
 #include <csignal>
+#include <cstdint>
 #include <cstdio>
+#include <cstring>
 #include <iostream>
 #include <rang.hpp>
+#include <string>
+#include <string_view>
+#include <utility>
 
 namespace Mz::Tools {
 
@@ -30,8 +35,56 @@ void onInterrupt(int) {
     std::signal(SIGINT, SIG_DFL);
 }
 
+bool isControl(wchar_t character) {
+    return character < L' ' || (character >= 0x7F && character < 0xA0);
+}
+
+/// `text` with those of its control characters escaped that are not among `left`.
+std::wstring escaped(const std::wstring& text, std::wstring_view left) {
+    constexpr const wchar_t* digits = L"0123456789ABCDEF";
+    std::wstring result;
+    for (const wchar_t character : text) {
+        if (!isControl(character) || left.find(character) != std::wstring_view::npos) {
+            result += character;
+        } else {
+            result += L"\\x";
+            result += digits[character >> 4];
+            result += digits[character & 15];
+        }
+    }
+    return result;
+}
+
 std::string errorText(const wchar_t* text) {
-    return System::encode(text ? text : L"", 2);
+    return System::encode(escaped(text ? text : L"", L"\n\t"), 2);
+}
+
+/// How many columns of a terminal a character takes at most.
+std::size_t columnsOf(wchar_t character) {
+    constexpr std::pair<std::uint32_t, std::uint32_t> wide[] = {
+        {0x1100, 0x115F},   {0x2600, 0x27BF},  {0x2E80, 0xA4CF}, {0xAC00, 0xD7A3},
+        {0xF900, 0xFAFF},   {0xFE30, 0xFE6F},  {0xFF00, 0xFF60}, {0xFFE0, 0xFFE6},
+        {0x1F000, 0x1FAFF}, {0x20000, 0x3FFFD}};
+    const std::uint32_t code = std::char_traits<wchar_t>::to_int_type(character);
+    const bool isWide = std::any_of(std::begin(wide), std::end(wide), [&](const auto& range) {
+        return code >= range.first && code <= range.second;
+    });
+    return isWide ? 2 : 1;
+}
+
+/// The beginning of `text` that fits so many columns, and how many of them it takes.
+std::pair<std::wstring, std::size_t> fitted(const std::wstring& text, std::size_t widest) {
+    std::size_t taken = 0, length = 0;
+    for (; length < text.size(); ++length) {
+        const std::size_t columns = columnsOf(text[length]);
+        if (taken + columns > widest)
+            break;
+        taken += columns;
+    }
+    // Half of a character, where one takes two units, is none.
+    if (length > 0 && length < text.size() && (text[length - 1] & ~wchar_t{0x3FF}) == 0xD800)
+        --length, --taken;
+    return {text.substr(0, length), taken};
 }
 
 } // namespace
@@ -83,9 +136,9 @@ bool ConsoleController::progress(float fraction, const wchar_t* text) {
         char bar[64];
         std::snprintf(bar, sizeof bar, "[%-*s] %3d%% ", static_cast<int>(width),
                       std::string(filled, '#').c_str(), percent);
-        showOnLine(bar + errorText(text));
+        showOnLine(std::wstring(bar, bar + std::strlen(bar)) + (text ? text : L""));
     } else if (percent / 10 != lastTenth) {
-        out << percent << "% " << errorText(text) << std::endl;
+        out << percent << "% " << System::encode(escaped(text ? text : L"", {}), 2) << std::endl;
     }
     lastTenth = percent / 10;
     return !interrupted;
@@ -97,7 +150,7 @@ bool ConsoleController::isStatusShown() {
 
 void ConsoleController::status(const wchar_t* text) {
     if (onTerminal)
-        showOnLine(errorText(text));
+        showOnLine(text ? text : L"");
     else
         line(nullptr, text);
 }
@@ -138,18 +191,22 @@ void ConsoleController::line(const char* kind, const wchar_t* text) {
 }
 
 /// What does not fit a narrow terminal is cut, or it could not be taken back.
-void ConsoleController::showOnLine(const std::string& text) {
+void ConsoleController::showOnLine(const std::wstring& text) {
     constexpr std::size_t widest = 79;
-    const std::string shown = text.substr(0, widest);
-    out << '\r' << shown << std::string(shownWidth - std::min(shownWidth, shown.size()), ' ')
-        << std::flush;
-    shownWidth = shown.size();
+    const auto [fitting, width] = fitted(escaped(text, {}), widest);
+    out << '\r' << System::encode(fitting, 2)
+        << std::string(shownWidth - std::min(shownWidth, width), ' ') << std::flush;
+    shownWidth = width;
 }
 
 void ConsoleController::clearLine() {
     if (shownWidth > 0)
         out << '\r' << std::string(shownWidth, ' ') << '\r' << std::flush;
     shownWidth = 0;
+}
+
+std::wstring withoutControls(const std::wstring& text) {
+    return escaped(text, {});
 }
 
 std::string forOutput(const std::wstring& text) {

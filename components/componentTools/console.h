@@ -14,7 +14,8 @@
 
 namespace Mz::Tools {
 
-/// Writes messages as text, in the terminal's encoding, to the standard error stream.
+/// Writes messages as text, in the terminal's encoding, to the standard error stream. They may have
+/// lines and tabulators; other control characters show as `\xNN`.
 ///
 /// Progress is a bar that stays on its line where standard error is a terminal; elsewhere it is a
 /// line of its own for each tenth of the work. Warnings and errors say so, in colour on a terminal.
@@ -61,7 +62,7 @@ class MZ_COMPONENT_TOOLS_API ConsoleController final
 
   private:
     void line(const char* kind, const wchar_t* text);
-    void showOnLine(const std::string& text);
+    void showOnLine(const std::wstring& text);
 
     std::ostream& out;
     bool onTerminal;
@@ -70,6 +71,10 @@ class MZ_COMPONENT_TOOLS_API ConsoleController final
     int lastTenth = -1;
     int errors = 0;
 };
+
+/// `text` with each control character, line ends too, in the form `\xNN`: a terminal may do more
+/// than show them, and a name need not stay on its line.
+MZ_COMPONENT_TOOLS_API std::wstring withoutControls(const std::wstring& text);
 
 /// `text` as bytes for standard output: in the terminal's encoding where it is one, else in the
 /// locale's; '?' for what has no form there.

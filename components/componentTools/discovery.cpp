@@ -15,31 +15,39 @@ namespace {
 /// A full path without ".", ".." and a separator at the end.
 std::filesystem::path fullPath(const std::filesystem::path& path) {
     std::error_code failure;
-    std::filesystem::path full = std::filesystem::absolute(path, failure).lexically_normal();
+    std::filesystem::path full = System::withoutDots(std::filesystem::absolute(path, failure));
     if (!full.has_filename() && full.has_relative_path())
         full = full.parent_path();
     full.make_preferred();
     return full;
 }
 
+/// Whether a search path can lead there.
+bool isSearchable(const std::wstring& folder) {
+    return folder.find(L';') == std::wstring::npos;
+}
+
 class Discoverer {
   public:
     void add(const std::filesystem::path& folder) {
         const std::optional<std::wstring> name = System::nameText(folder);
-        if (!name || !isCarried(*name)) {
-            leaveOut(folder, {Verdict::nameNotCarried, {}, {}});
-            return;
-        }
+        if (!name || !isCarried(*name))
+            return leaveOutFolder(folder, Verdict::nameNotCarried);
+        if (!isSearchable(*name))
+            return leaveOutFolder(folder, Verdict::notSearchable);
         const std::wstring directory = normalisePath(name->c_str(), false);
         const std::filesystem::path opened = platform::openingPath(directory, {}, folder.native());
         std::error_code failure;
-        if (!std::filesystem::is_directory(opened, failure)) {
-            leaveOut(folder, {Verdict::missing, {}, {}});
-            return;
-        }
+        if (!std::filesystem::is_directory(opened, failure))
+            return leaveOutFolder(folder, failure == std::errc::permission_denied
+                                              ? Verdict::unreadable
+                                              : Verdict::missing);
+        std::filesystem::directory_iterator entries(opened, failure);
+        if (failure)
+            return leaveOutFolder(folder, Verdict::unreadable);
         for (const platform::DirectoryEntry& entry : platform::listCandidates(opened.native()))
             add(directory, entry);
-        leaveOutUnnamed(opened);
+        leaveOutUnnamed(std::move(entries));
     }
 
     Discovery take() { return std::move(result); }
@@ -69,11 +77,15 @@ class Discoverer {
         result.leftOut.push_back({path, finding});
     }
 
+    void leaveOutFolder(const std::filesystem::path& folder, Verdict verdict) {
+        result.leftOut.push_back({folder, {verdict, {}, {}}, true});
+    }
+
     /// Names that are no text are passed over silently by the manager's own listing.
-    void leaveOutUnnamed(const std::filesystem::path& folder) {
+    void leaveOutUnnamed(std::filesystem::directory_iterator entry) {
         std::error_code failure;
-        for (std::filesystem::directory_iterator entry(folder, failure), end;
-             !failure && entry != end; entry.increment(failure))
+        for (const std::filesystem::directory_iterator end; !failure && entry != end;
+             entry.increment(failure))
             if (!System::nameText(entry->path()))
                 leaveOut(entry->path(), {Verdict::nameNotCarried, {}, {}});
     }
@@ -102,7 +114,7 @@ std::wstring searchPathOf(const std::vector<std::filesystem::path>& folders) {
     std::wstring searchPath;
     for (const std::filesystem::path& folder : folders) {
         const std::optional<std::wstring> name = System::nameText(folder);
-        if (name && isCarried(*name))
+        if (name && isCarried(*name) && isSearchable(*name))
             searchPath += (searchPath.empty() ? L"" : L";") + *name;
     }
     return searchPath;

@@ -20,10 +20,11 @@ struct Candidate {
 struct Discovery {
     std::vector<Candidate> candidates;
 
-    /// What cannot be recorded, for its name: folders, and files.
+    /// What cannot be searched, or cannot be recorded, for its name.
     struct LeftOut {
         std::filesystem::path path;
         Finding finding;
+        bool folder = false; ///< one of those that were to be searched; else a file in one
     };
     std::vector<LeftOut> leftOut;
 };
@@ -34,11 +35,11 @@ MZ_COMPONENT_TOOLS_API std::vector<std::filesystem::path>
 foldersOf(const std::filesystem::path& searchPath);
 
 /// The search path that leads a manager to these folders; those whose names the locale does not
-/// carry are left out.
+/// carry, or have the separator in them, are left out.
 MZ_COMPONENT_TOOLS_API std::wstring searchPathOf(const std::vector<std::filesystem::path>& folders);
 
-/// Lists the candidate files of the folders. Nothing of them is read. A folder that does not exist
-/// is left out.
+/// Lists the candidate files of the folders. Nothing of them is read. A folder that does not exist,
+/// or cannot be listed, or that no search path can lead to, is left out.
 MZ_COMPONENT_TOOLS_API Discovery discover(const std::vector<std::filesystem::path>& folders);
 
 /// The names under which a file is recorded.

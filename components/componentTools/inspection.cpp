@@ -23,10 +23,12 @@ std::optional<Finding> judgePlace(const std::filesystem::path& file) {
         return Finding{Verdict::systemFile, {}, {}};
     if (!status->regular)
         return Finding{Verdict::notRegular, {}, {}};
-    const auto name = System::nameText(file);
-    if (!name || !isCarried(*name))
-        return Finding{Verdict::nameNotCarried, {}, {}};
     return std::nullopt;
+}
+
+bool isNameCarried(const std::filesystem::path& file) {
+    const auto name = System::nameText(file);
+    return name && isCarried(*name);
 }
 
 Finding judgeImage(const LibraryImage& image) {
@@ -59,7 +61,11 @@ Finding inspectFile(const std::filesystem::path& file, LibraryImage& image) {
     if (const std::optional<Finding> finding = judgePlace(file))
         return *finding;
     image = readLibraryImage(file);
-    return judgeImage(image);
+    Finding finding = judgeImage(image);
+    // The name of what is passed over anyway does not matter.
+    if (severityOf(finding.verdict) != Severity::bystander && !isNameCarried(file))
+        finding = {Verdict::nameNotCarried, {}, {}};
+    return finding;
 }
 
 std::vector<Dependency> dependenciesOf(const std::filesystem::path& file, const LibraryImage& image,

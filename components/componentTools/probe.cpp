@@ -29,10 +29,15 @@ Finding memoryFinding(const ProbeAnswer& answer, const ProbeOptions& options) {
 }
 
 /// What the process itself said, completed by what only we know.
-Finding completed(const ProbeAnswer& answer, const ProbeOptions& options) {
+Finding completed(const ProbeAnswer& answer, const System::ChildResult& child,
+                  const ProbeOptions& options) {
     Finding fault = *answer.fault;
-    if (fault.verdict == Verdict::outOfMemory)
-        return memoryFinding(answer, options);
+    if (fault.verdict == Verdict::outOfMemory) {
+        if (child.memory >= options.memoryLimit / 2)
+            return memoryFinding(answer, options);
+        // It asked for too much at once, or throws it without need.
+        fault = {Verdict::threw, {}, L"std::bad_alloc"};
+    }
     if (fault.subject.empty())
         fault.subject = nameOf(answer.stage);
     return fault;
@@ -53,7 +58,10 @@ Finding judgeEnd(const System::ChildResult& child, const ProbeAnswer& answer,
     if (answer.garbled)
         return {Verdict::garbled, L"something else came between", {}};
     if (answer.fault)
-        return completed(answer, options);
+        return completed(answer, child, options);
+    // With its whole answer, its end does not matter.
+    if (child.end == End::unknown && !answer.description)
+        return {Verdict::endUnknown, stage, {}};
     if (child.end == End::crashed)
         return {Verdict::crashed, stage, child.words};
     if (!answer.anything)

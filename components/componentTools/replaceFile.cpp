@@ -23,6 +23,15 @@ std::filesystem::path temporaryName(const std::filesystem::path& file) {
     return name;
 }
 
+/// Where a link leads, whether there is anything yet or not; else the file itself.
+std::filesystem::path targetOf(const std::filesystem::path& file) {
+    std::error_code failure;
+    if (!std::filesystem::is_symlink(std::filesystem::symlink_status(file, failure)))
+        return file;
+    const std::filesystem::path target = std::filesystem::weakly_canonical(file, failure);
+    return failure || target.empty() ? file : target;
+}
+
 /// Repeats `attempt` for half a second until it succeeds or `hopeless` says that it never will.
 template <class Attempt, class Hopeless>
 bool patiently(Attempt attempt, Hopeless hopeless) {
@@ -51,19 +60,26 @@ bool moveOver(const std::filesystem::path& from, const std::filesystem::path& to
 } // namespace
 
 void replaceFile(const std::filesystem::path& file, std::string_view content) {
-    const std::wstring shown = System::displayName(file);
-    const std::string name = System::encode(shown, 2);
-    const std::filesystem::path temporary = temporaryName(file);
+    const std::string name = System::encode(System::displayName(file), 2);
+    std::error_code ignored;
+    const std::filesystem::file_status old = std::filesystem::status(file, ignored);
+    if (std::filesystem::exists(old) && !std::filesystem::is_regular_file(old))
+        throw QrStreamEx::ExWriteOpen(source, __LINE__, name.c_str());
+    const std::filesystem::path target = targetOf(file);
+    const std::filesystem::path temporary = temporaryName(target);
     {
         std::ofstream output(temporary, std::ios::binary | std::ios::trunc);
         if (!output)
             throw QrStreamEx::ExWriteOpen(source, __LINE__, name.c_str());
+        if (std::filesystem::exists(old))
+            std::filesystem::permissions(temporary, old.permissions(), ignored);
         output.write(content.data(), static_cast<std::streamsize>(content.size()));
         output.close();
-        if (output && moveOver(temporary, file))
+        if (output && moveOver(temporary, target))
             return;
     }
-    std::error_code ignored;
+    // Some systems keep what must not be written.
+    std::filesystem::permissions(temporary, std::filesystem::perms::owner_all, ignored);
     std::filesystem::remove(temporary, ignored);
     throw QrStreamEx::ExWriteError(source, __LINE__, name.c_str());
 }

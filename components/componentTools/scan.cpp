@@ -1,7 +1,9 @@
 #include "components/componentTools/scan.h"
 
+#include "components/componentManager/exceptions.h"
 #include "components/componentManager/platform/platform.h"
-#include "components/componentTools/inspection.h"
+#include "components/componentTools/explain.h"
+#include "components/componentTools/platform/system.h"
 #include "components/componentTools/verdictsFile.h"
 
 #include <algorithm>
@@ -31,10 +33,8 @@ class Scanner {
         }
         for (const Discovery::LeftOut& left : discovery.leftOut)
             leaveOut(left);
-        if (!options.list.empty()) {
-            writeVerdicts(verdictsFileOf(options.list), result.libraries);
-            writeRecordedList(options.list, result.libraries);
-        }
+        if (!options.list.empty())
+            write();
         return std::move(result);
     }
 
@@ -61,6 +61,41 @@ class Scanner {
         }
     }
 
+    void write() {
+        if (unprobed > 0 && probed == 0)
+            result.notWritten = L"nothing was written, for no library could be tried";
+        else if (!result.rejected.empty() && !keepRejected())
+            result.notWritten = L"nothing was written, for what is there could not be kept";
+        if (!result.notWritten.empty())
+            return;
+        // Without the verdicts a little more is tried again, so the list is written anyway.
+        writeGuarded([&] { writeVerdicts(verdictsFileOf(options.list), result.libraries); });
+        writeGuarded([&] { writeRecordedList(options.list, result.libraries); });
+    }
+
+    template <class Write>
+    void writeGuarded(Write write) {
+        try {
+            write();
+        } catch (const QrStreamEx& failure) {
+            result.notWritten = System::displayName(System::pathOfArgument(failure.getReason()));
+        }
+    }
+
+    /// What is no list may be somebody's work, named by mistake.
+    bool keepRejected() {
+        std::error_code failure;
+        if (std::filesystem::is_empty(options.list, failure) && !failure)
+            return true;
+        std::filesystem::path copy = options.list;
+        copy += ".rejected";
+        std::filesystem::copy_file(options.list, copy,
+                                   std::filesystem::copy_options::overwrite_existing, failure);
+        if (!failure)
+            result.keptAs = copy;
+        return !failure;
+    }
+
     void add(const Candidate& candidate) {
         ScannedFile file{candidate.path, candidate.directory, candidate.fileName, {}, {}};
         const auto status = platform::queryFile(candidate.path.native());
@@ -70,16 +105,18 @@ class Scanner {
                                status->size == known->second.size;
         if (!status) {
             file.verdict.verdict = Verdict::missing; // Gone since the folder was listed.
-        } else if (result.interrupted) {
-            file.verdict.verdict = Verdict::interrupted;
-            if (known != old.end())
-                keep(file, known->second);
         } else if (unchanged && !isTriedAgain(known->second)) {
             file.verdict = verdictOf(known->second);
             keep(file, known->second);
+        } else if (result.interrupted) {
+            file.verdict.verdict = Verdict::interrupted;
         } else {
             look(file, *status);
         }
+        // What could not be tried keeps the record that it had.
+        if (known != old.end() && (file.verdict.verdict == Verdict::interrupted ||
+                                   (unchanged && file.verdict.verdict == Verdict::probeFailed)))
+            keep(file, known->second);
         result.files.push_back(std::move(file));
     }
 
@@ -94,6 +131,7 @@ class Scanner {
         case Verdict::loadFailed:        // Nor when the dependency of a dependency does.
         case Verdict::unreadable:
         case Verdict::probeFailed:
+        case Verdict::endUnknown:
         case Verdict::interrupted: return true;
         default: return options.retry && severityOf(library.kept->verdict) == Severity::fault;
         }
@@ -123,6 +161,11 @@ class Scanner {
             result.interrupted = true;
             return;
         }
+        if (file.verdict.verdict == Verdict::probeFailed) {
+            ++unprobed; // No fault of the library's.
+            return;
+        }
+        ++probed;
         RecordedLibrary library;
         library.directory = file.directory;
         library.fileName = file.fileName;
@@ -152,6 +195,7 @@ class Scanner {
     void leaveOut(const Discovery::LeftOut& left) {
         ScannedFile file{left.path, {}, {}, left.finding, {}};
         file.looked = true;
+        file.folder = left.folder;
         result.files.push_back(std::move(file));
     }
 
@@ -159,6 +203,7 @@ class Scanner {
     ProbeOptions probeOptions;
     std::map<Name, RecordedLibrary> old;
     ScanResult result;
+    int probed = 0, unprobed = 0; ///< how often a library was tried, and could not be
 };
 
 } // namespace

@@ -32,14 +32,17 @@ struct ScannedFile {
     std::wstring directory, fileName; ///< as recorded
     Finding verdict;
     std::vector<Finding> notes;
-    bool recorded = false; ///< whether the list has it now
+    bool recorded = false; ///< whether `libraries` has it
     bool looked = false;   ///< false when the list had it already, and it has not changed
+    bool folder = false;   ///< one of the folders, which could not be searched
 };
 
 struct ScanResult {
     std::vector<ScannedFile> files; ///< in the host's order, those left out behind them
-    RecordedLibraries libraries;    ///< what was written
+    RecordedLibraries libraries;    ///< what was, or should have been, written
     std::wstring rejected;          ///< why the old list was rejected; empty when it was not
+    std::filesystem::path keptAs;   ///< where a copy of what was rejected is; empty for nowhere
+    std::wstring notWritten;        ///< why the list, or what is beside it, was not written
     bool interrupted = false;       ///< the user stopped it; the rest of the old list was kept
 };
 
@@ -51,9 +54,14 @@ struct ScanResult {
 /// list, in the file `verdictsFileOf(list)`. What is no component library is recorded in the same
 /// way, as the manager does.
 ///
-/// A damaged or foreign list is rejected whole and built anew. Two scans at once do not damage each
-/// other: each writes a whole list, and the later one stays. Throws `QrStreamEx::ExWriteOpen` or
-/// `ExWriteError` when the list cannot be written.
+/// A damaged or foreign list is rejected whole and built anew; a copy of it stays beside the new
+/// one, with ".rejected" behind its name. Two scans at once do not damage each other: each writes a
+/// whole list, and the later one stays.
+///
+/// When the process to load libraries in cannot be started, that says nothing of the libraries:
+/// they are not recorded, but for what the old list has of those that have not changed, and where
+/// none could be loaded nothing is written. A list that cannot be written takes none of the
+/// findings away.
 MZ_COMPONENT_TOOLS_API ScanResult scan(const ScanOptions& options);
 
 } // namespace Mz::Tools

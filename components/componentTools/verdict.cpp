@@ -48,6 +48,10 @@ constexpr Entry entries[] = {
     {Verdict::nameNotCarried, "nameNotCarried", Severity::fault,
      L"its name has no form in the current locale, so it cannot be recorded",
      L"rename it, or choose a locale that has its characters"},
+    {Verdict::notSearchable, "notSearchable", Severity::fault,
+     L"its name has a ';' in it, which separates the folders of a search path, so no host can "
+     L"search it",
+     L"rename it, or the folder above it that has the ';'"},
     {Verdict::sameName, "sameName", Severity::fault,
      L"its name is that of %1 but for the case of letters, and a list holds only one of them",
      L"rename one of the two"},
@@ -91,6 +95,9 @@ constexpr Entry entries[] = {
     {Verdict::probeFailed, "probeFailed", Severity::fault,
      L"the process to load it in could not be started: %1",
      L"check that mzcomponents-probe stands beside libMZcomponentTools"},
+    {Verdict::endUnknown, "endUnknown", Severity::fault,
+     L"it came as far as %1, and the system does not tell how the process that loaded it ended",
+     L"do not ignore the ends of children (SIGCHLD) in the program that asks"},
     {Verdict::interrupted, "interrupted", Severity::fault, L"it was not looked at to the end", L""},
 
     {Verdict::notRecorded, "notRecorded", Severity::note,

@@ -30,6 +30,7 @@ enum class Verdict {
     missing,
     unreadable,
     nameNotCarried, ///< the locale has no form for the name
+    notSearchable,  ///< a folder whose name has the separator of search paths in it
     sameName,       ///< another file has the same name but for the case of letters
     otherSystem,
     otherProcessor,
@@ -51,6 +52,7 @@ enum class Verdict {
     textNotCarried, ///< the locale has no form for a text of a builder
     garbled,        ///< the process answered with something else than an answer
     probeFailed,    ///< the process could not be started
+    endUnknown,     ///< the system does not tell this program how the process ended
     interrupted,    ///< the user wanted it to end
 
     // What a recorded list says of the file.

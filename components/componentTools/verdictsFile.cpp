@@ -30,6 +30,26 @@ Verdicts verdictsOf(const Json& all) {
     return verdicts;
 }
 
+/// Whether a scan may have kept this of a library that it recorded without builders.
+bool isKept(Verdict verdict) {
+    switch (verdict) {
+    case Verdict::component: // Loading it told more.
+    case Verdict::works:
+    case Verdict::directory: // Those are no candidates,
+    case Verdict::hidden:
+    case Verdict::systemFile:
+    case Verdict::notRegular:
+    case Verdict::missing: // and these are not recorded.
+    case Verdict::nameNotCarried:
+    case Verdict::notSearchable:
+    case Verdict::sameName:
+    case Verdict::textNotCarried:
+    case Verdict::probeFailed:
+    case Verdict::interrupted: return false;
+    default: return severityOf(verdict) != Severity::note;
+    }
+}
+
 void fillIn(RecordedLibrary& library, const Verdicts& verdicts) {
     const auto found = verdicts.find({library.directory, library.fileName});
     if (found == verdicts.end())
@@ -38,7 +58,8 @@ void fillIn(RecordedLibrary& library, const Verdicts& verdicts) {
     if (entry.at("time").get<std::uint32_t>() != library.time ||
         entry.at("size").get<std::int64_t>() != library.size)
         return;
-    if (const auto verdict = verdictNamed(entry.at("verdict").get<std::string>()))
+    const auto verdict = verdictNamed(entry.at("verdict").get<std::string>());
+    if (verdict && isKept(*verdict))
         library.kept = Finding{*verdict, wide(entry, "subject"), wide(entry, "words")};
 }
 

@@ -46,6 +46,9 @@ TEST_F(Command, WrongUseEndsWithTwo) {
     EXPECT_EQ(run({"scan"}).exitCode, 2);
     EXPECT_EQ(run({"scan", "--cache", "x", "--time-limit", "never"}).exitCode, 2);
     EXPECT_EQ(run({"scan", "--cache", "x", "--time-limit", "-1"}).exitCode, 2);
+    EXPECT_EQ(run({"scan", "--cache", "x", "--time-limit", "nan"}).exitCode, 2);
+    EXPECT_EQ(run({"types", "--path", ""}).exitCode, 2);
+    EXPECT_EQ(run({"types", "--path", ";;"}).exitCode, 2);
 }
 
 TEST_F(Command, HelpSaysWhatEachDoesWithAnExample) {
@@ -127,7 +130,7 @@ TEST_F(Command, ScanFromARelativePathServesAHost) {
 TEST_F(Command, ScanTellsWhatItDid) {
     add(L"goodWithKit", "a");
     add(L"crashesInEntryPoint", "b");
-    const std::string list = inWork("list");
+    const std::string list = inWork("list"), file = (folder.path() / "b").string();
     const Json first = json(1, {"scan", "--cache", list});
     EXPECT_EQ(first.at("files").at(0).at("verdict"), "works");
     EXPECT_EQ(first.at("files").at(1).at("verdict"), "crashed");
@@ -140,7 +143,98 @@ TEST_F(Command, ScanTellsWhatItDid) {
                 HasSubstr("2 files: 1 with builders, 1 with faults, 0 others; 0 looked at, 2 "
                           "recorded\n"));
     EXPECT_EQ(json(1, {"list", "--cache", list}).at("files").size(), 2u);
-    EXPECT_EQ(run({"scan", "--path", path(), "--cache", inWork("no/list")}).exitCode, 1);
+    EXPECT_EQ(json(1, {"explain", file, "--cache", list}).at("files").at(0).at("verdict"),
+              "component");
+}
+
+TEST_F(Command, ScanTellsWhatItFoundThoughItCannotWrite) {
+    add(L"goodWithKit");
+    const Json result = json(1, {"scan", "--cache", inWork("no/list")});
+    EXPECT_EQ(result.at("files").at(0).at("verdict"), "works");
+    EXPECT_NE(result.at("notWritten"), "");
+}
+
+TEST_F(Command, ShowsControlCharactersInsteadOfSendingThem) {
+    add(L"throwsInExtensions");
+    const ProgramResult result = run({"types", "--path", path()});
+    EXPECT_THAT(result.output, HasSubstr("\\x1B[31mred\\x0Asecond line\n"));
+    EXPECT_EQ(std::count(result.output.begin(), result.output.end(), '\n'), 1);
+}
+
+TEST_F(Command, LeavesStandardOutputToItsResults) {
+    add(L"notes");
+    add(L"talkativeImporter");
+    EXPECT_EQ(json(0, {"types"}).at("types").size(), 2u);
+    EXPECT_EQ(json(0, {"graph"}).at("libraries").size(), 2u);
+    std::ofstream(work.path() / "other", std::ios::binary) << "x";
+    EXPECT_EQ(json(1, {"import", "other"}).at("files").size(), 1u);
+    EXPECT_EQ(run({"types", "--path", path()}).output,
+              "notes                 *.note            Notes\n"
+              "talks                 *.talk            Talks\n");
+}
+
+TEST_F(Command, GoesOnWhateverAComponentThrows) {
+    add(L"notes");
+    add(L"throwsInCanImport");
+    add(L"throwsInExtensions");
+    for (const char* name : {"a.note", "[1].note", "b"})
+        std::ofstream(work.path() / name, std::ios::binary) << "N1";
+    EXPECT_EQ(json(0, {"types"}).at("types").size(), 3u);
+    const std::string tooLong(5000, 'x');
+    const Json files = json(1, {"import", "a.note", tooLong, "[1].note", "b"}).at("files");
+    ASSERT_EQ(files.size(), 4u);
+    EXPECT_EQ(files[0].at("builderName"), "notes");
+    EXPECT_EQ(files[1].at("object"), "there is no such file");
+    EXPECT_EQ(files[2].at("builderName"), "notes");
+    EXPECT_EQ(files[3].at("builderName"), "notes");
+    std::filesystem::remove(folder.path() / builtComponent(L"notes").filename());
+    EXPECT_THAT(json(1, {"import", "a.note"}).at("files").at(0).at("object").get<std::string>(),
+                HasSubstr("no exception of any known kind"));
+}
+
+TEST_F(Command, TakesNamesInBracketsAsTheyAre) {
+    EXPECT_EQ(json(1, {"explain", "[a,b]"}).at("files").size(), 1u);
+    const auto file = json(1, {"explain", "[x]"}).at("files").at(0).at("file").get<std::string>();
+    EXPECT_TRUE(file.ends_with("[x]")) << file;
+}
+
+TEST_F(Command, OverwritesNothingThatItReadsOrThatIsNoFile) {
+    add(L"notes");
+    std::ofstream(work.path() / "one.note", std::ios::binary) << "N1";
+    EXPECT_EQ(run({"import", "one.note", "--path", path(), "--save", "./one.note"}).exitCode, 2);
+    EXPECT_EQ(contentOf(work.path() / "one.note"), "N1");
+    EXPECT_EQ(run({"import", "one.note", "--path", path(), "--save", path()}).exitCode, 1);
+    EXPECT_EQ(run({"graph", "--path", path(), "--output", path()}).exitCode, 1);
+}
+
+TEST_F(Command, LoadsNothingThatWasNotTried) {
+    // Where letter case counts, only one of two such names can be recorded.
+    add(L"notes", "B");
+    add(L"crashesInInitialiser", "b");
+    EXPECT_TRUE(run({"types", "--path", path()}).finished);
+    // Where it does not, some names have no form in the locale.
+    std::filesystem::remove(folder.path() / "b");
+    add(L"crashesInInitialiser", u8"\u4E2D");
+    EXPECT_TRUE(run({"types", "--path", path()}).finished);
+    // Nor has a search path a form for some folders: this one would lead to another.
+    const auto strange = work.path() / "a;b";
+    for (const auto& inside : {strange, work.path() / "a"}) {
+        std::filesystem::create_directory(inside);
+        std::filesystem::copy_file(builtComponent(L"crashesInInitialiser"), inside / "x");
+    }
+    const auto program =
+        buildFolder / "bin" / (std::wstring(L"mzcomponents") + MZ_PROGRAM_EXTENSION);
+    const ProgramResult result = runProgram(program, program.string(), {"types"}, strange);
+    EXPECT_TRUE(result.finished);
+    EXPECT_EQ(result.exitCode, 1);
+}
+
+TEST_F(Command, EndsWithOneWhereAFolderCannotBeSearched) {
+    add(L"notes");
+    for (const char* command : {"types", "graph"}) {
+        EXPECT_EQ(run({command, "--path", path() + "-not-there"}).exitCode, 1) << command;
+        EXPECT_EQ(run({command, "--path", path() + ";" + path() + "-not-there"}).exitCode, 1);
+    }
 }
 
 TEST_F(Command, TypesListsWhatComponentsImport) {
@@ -189,6 +283,10 @@ TEST_F(Command, ShowsAListWithPositions) {
     EXPECT_EQ(shown.at("libraries").at(0).at("fileName"), "a");
     EXPECT_EQ(shown.at("libraries").at(0).at("builders").at(0).at("name"), "kit");
     EXPECT_EQ(run({"show", inWork("missing")}).exitCode, 1);
+    std::filesystem::resize_file(work.path() / "list", 60);
+    const ProgramResult cut = run({"show", inWork("list"), "--path", path()});
+    EXPECT_EQ(cut.exitCode, 1);
+    EXPECT_EQ(cut.output, "");
     std::ofstream(work.path() / "foreign") << "some text that is nothing of ours";
     EXPECT_EQ(run({"show", inWork("foreign"), "--path", path()}).exitCode, 1);
 }

@@ -68,6 +68,28 @@ TEST_F(Console, CutsABarThatWouldNotFitItsLine) {
     EXPECT_EQ(stream.str().size(), 80u);
 }
 
+TEST_F(Console, CountsColumnsAndKeepsToOneLine) {
+    ConsoleController controller(stream, true);
+    controller.status(std::wstring(60, L'\u4E2D').c_str()); // Each takes two.
+    stream.str("");
+    controller.clearLine();
+    EXPECT_EQ(stream.str(), "\r" + std::string(78, ' ') + "\r");
+    controller.status(std::wstring(60, L'\u00E4').c_str());
+    stream.str("");
+    controller.clearLine();
+    EXPECT_EQ(stream.str(), "\r" + std::string(60, ' ') + "\r");
+    stream.str("");
+    controller.status(L"a\nb");
+    EXPECT_EQ(stream.str(), "\ra\\x0Ab");
+}
+
+TEST_F(Console, LeavesNoControlCharacterToTheTerminal) {
+    ConsoleController controller(stream, false);
+    controller.message(0, L"\x1B[2J\ttab\nline\x9B");
+    EXPECT_EQ(stream.str(), "\\x1B[2J\ttab\nline\\x9B\n");
+    EXPECT_EQ(withoutControls(L"a\n\x7F"), L"a\\x0A\\x7F");
+}
+
 TEST_F(Console, TakesAnyFraction) {
     ConsoleController controller(stream, false);
     controller.progress(-3.0f, L"a");

@@ -188,6 +188,11 @@ TEST_F(Explain, TellsOfALibraryThatEatsMemory) {
     EXPECT_EQ(explainFile(add(L"offersForever"), options).verdict.verdict, Verdict::outOfMemory);
 }
 
+TEST_F(Explain, TellsOfALibraryThatOnlyClaimsToLackMemory) {
+    EXPECT_EQ(loadedVerdict(L"throwsBadAlloc"),
+              (Finding{Verdict::threw, L"enumerateBuilders", L"std::bad_alloc"}));
+}
+
 TEST_F(Explain, DoesNotCountTheMemoryOfTheHost) {
     ExplainOptions options;
     options.load = true;

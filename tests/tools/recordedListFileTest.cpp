@@ -129,6 +129,22 @@ TEST_F(RecordedListFile, WhatCannotBeWrittenLeavesTheOldFile) {
     EXPECT_EQ(files, 1);
 }
 
+TEST_F(RecordedListFile, StaysBehindItsLinkWithItsPermissions) {
+    namespace fs = std::filesystem;
+    const fs::path link = folder.path() / "link";
+    writeRecordedList(file(), {});
+    fs::permissions(file(), fs::perms::owner_read | fs::perms::owner_write);
+    const fs::perms before = fs::status(file()).permissions();
+    std::error_code failure;
+    fs::create_symlink("list", link, failure);
+    writeRecordedList(failure ? file() : link, sample());
+    EXPECT_TRUE(same(readRecordedList(file()).libraries, sample()));
+    EXPECT_EQ(fs::status(file()).permissions(), before);
+    EXPECT_EQ(fs::is_symlink(fs::symlink_status(link)), !failure);
+    // Nor does anything but a file give way.
+    EXPECT_THROW(writeRecordedList(folder.path(), {}), QrStreamEx::ExWriteOpen);
+}
+
 TEST_F(RecordedListFile, WrittenByManyAtOnceIsAlwaysOneOfThemWhole) {
     writeRecordedList(file(), {});
     std::vector<std::jthread> writers;

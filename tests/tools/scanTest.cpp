@@ -166,7 +166,67 @@ TEST_F(Scan, RejectsADamagedListWholeAndBuildsItAnew) {
     EXPECT_THAT(result.rejected, HasSubstr(L"byte"));
     EXPECT_EQ(looked(result), 1);
     EXPECT_EQ(readRecordedList(list()).state, ListReading::State::good);
+    EXPECT_EQ(contentOf(result.keptAs), "something else");
     EXPECT_EQ(scan(options()).rejected, L"");
+}
+
+TEST_F(Scan, RecordsNothingWhereThereIsNoProbe) {
+    add(L"goodWithKit");
+    scan(options());
+    const std::string before = contentOf(list());
+    add(L"countedDescription");
+    ScanOptions wanted = options();
+    wanted.probe.program = folder.path() / "no-probe";
+    const ScanResult result = scan(wanted);
+    EXPECT_EQ(verdicts(result)[add(L"goodWithKit").filename().string()], Verdict::works);
+    EXPECT_EQ(verdicts(result)[add(L"countedDescription").filename().string()],
+              Verdict::probeFailed);
+    EXPECT_EQ(result.libraries.size(), 1u);
+    EXPECT_NE(result.notWritten, L"");
+    EXPECT_EQ(contentOf(list()), before);
+}
+
+TEST_F(Scan, WritesTheListWhereItsVerdictsCannotBeWritten) {
+    add(L"goodWithKit");
+    std::filesystem::create_directory(verdictsFileOf(list()));
+    EXPECT_NE(scan(options()).notWritten, L"");
+    EXPECT_EQ(readRecordedList(list()).libraries.size(), 1u);
+}
+
+TEST_F(Scan, BelievesNoVerdictThatNoScanCanHaveKept) {
+    add(L"crashesInEntryPoint");
+    scan(options());
+    std::string kept = contentOf(verdictsFileOf(list()));
+    const std::string word = "\"crashed\"";
+    for (const char* lie : {"\"works\"", "\"component\"", "\"notRecorded\"", "\"missing\""}) {
+        std::string changed = kept;
+        changed.replace(changed.find(word), word.size(), lie);
+        std::ofstream(verdictsFileOf(list()), std::ios::binary) << changed;
+        const ScanResult result = scan(options());
+        EXPECT_EQ(verdicts(result).begin()->second, Verdict::crashed) << lie;
+        EXPECT_EQ(looked(result), 1) << lie;
+    }
+}
+
+TEST_F(Scan, LeavesOutFoldersThatCannotBeSearched) {
+    const auto strange = folder.path() / "a;b", closed = folder.path() / "closed";
+    std::filesystem::create_directory(strange);
+    std::filesystem::create_directory(closed);
+    std::filesystem::permissions(closed, std::filesystem::perms::none);
+    ScanOptions wanted = options();
+    wanted.folders = {strange, closed};
+    const ScanResult result = scan(wanted);
+    ASSERT_FALSE(result.files.empty());
+    EXPECT_EQ(result.files[0].verdict.verdict, Verdict::notSearchable);
+    EXPECT_TRUE(result.files[0].folder);
+    EXPECT_EQ(Tools::searchPathOf(std::vector{strange}), L"");
+    // Some users, and some systems, may read everything.
+    std::error_code failure;
+    if (std::filesystem::directory_iterator(closed, failure); failure) {
+        ASSERT_EQ(result.files.size(), 2u);
+        EXPECT_EQ(result.files[1].verdict.verdict, Verdict::unreadable);
+    }
+    std::filesystem::permissions(closed, std::filesystem::perms::owner_all);
 }
 
 TEST_F(Scan, KeepsVerdictsBesideTheListInAFileThatMayBeLostOrDamaged) {
@@ -254,6 +314,8 @@ TEST_F(Scan, StopsWhenTheUserWantsAndKeepsTheRestOfTheOldList) {
     wanted.controller = &impatient;
     const ScanResult result = scan(wanted);
     EXPECT_TRUE(result.interrupted);
+    EXPECT_EQ(verdicts(result)[add(L"goodWithKit").filename().string()], Verdict::works);
+    EXPECT_EQ(verdicts(result)[add(L"loopsForever").filename().string()], Verdict::interrupted);
     EXPECT_EQ(result.libraries.size(), 1u);
     EXPECT_EQ(readRecordedList(list()).libraries.size(), 1u);
 }
@@ -276,6 +338,20 @@ TEST_F(Scan, MakesSearchPathsAbsoluteAndPlain) {
     EXPECT_EQ(folders[0], here / "a" / "c");
     EXPECT_EQ(folders[1], here / "x");
     EXPECT_TRUE(foldersOf(";;").empty());
+}
+
+TEST_F(Scan, GoesUpFromAFolderAsTheSystemDoes) {
+    std::filesystem::create_directories(folder.path() / "a" / "b");
+    folder.write("a/file", "from the target");
+    std::error_code failure;
+    std::filesystem::create_directory_symlink(folder.path() / "a" / "b", folder.path() / "link",
+                                              failure);
+    if (failure)
+        GTEST_SKIP() << "no links here";
+    const auto up = folder.path() / "link" / ".." / "file";
+    const auto plain = candidateOf(up).path;
+    EXPECT_EQ(std::filesystem::exists(up), std::filesystem::exists(plain)) << plain;
+    EXPECT_EQ(plain.lexically_normal(), plain);
 }
 
 } // namespace

@@ -13,9 +13,11 @@
 namespace Mz::Commands {
 
 /// Scans the search path in processes of their own, brings the list up to date where there is one,
-/// and initialises the manager with the result: libraries that failed are not loaded.
+/// and initialises the manager with the result: libraries that failed are not loaded, and neither
+/// is what could not be looked at in such a process. Faults are said on standard error.
 ///
-/// Lasts as long as the command; there can be only one.
+/// From then on standard output belongs to the results. Lasts as long as the command; there can be
+/// only one.
 class Host {
   public:
     explicit Host(const Common& common);
@@ -25,6 +27,8 @@ class Host {
 
     /// Whether the user stopped it.
     bool interrupted() const { return scanned.interrupted; }
+    /// The exit status where nothing else is wrong: whether all that should be here is.
+    int status() const { return complete ? good : subjectIsWrong; }
     const Tools::RecordedLibraries& libraries() const { return scanned.libraries; }
     Tools::ConsoleController& console() { return controller; }
 
@@ -32,14 +36,19 @@ class Host {
     std::vector<QrCPtr<QrBuilderDescription>> builders() const;
 
   private:
+    void tellFaults(const std::string& cache);
+    std::vector<std::filesystem::path> safeOnes(std::vector<std::filesystem::path> folders);
+    void start(const std::vector<std::filesystem::path>& folders);
+
     Tools::ConsoleController controller;
     Tools::ScanResult scanned;
+    bool complete = true;
 };
 
 /// The builder as an import builder; null when it is none or cannot be had.
 QrCPtr<QrImportBuilder> importBuilder(const QrBuilderDescription& builder);
 
-/// The extensions that it reads.
+/// The extensions that it reads; none when it throws.
 std::vector<std::wstring> extensionsOf(const QrImportBuilder& builder);
 
 } // namespace Mz::Commands

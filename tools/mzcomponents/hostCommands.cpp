@@ -6,22 +6,17 @@
 #include "components/componentManager/bufferio.h"
 #include "components/componentTools/discovery.h"
 #include "components/componentTools/graph.h"
+#include "components/componentTools/replaceFile.h"
 #include "components/objectIO/objectIO.h"
 
 #include <algorithm>
 #include <fstream>
-#include <iostream>
-#include <set>
 #include <sstream>
+#include <system_error>
 
 namespace Mz::Commands {
 
 namespace {
-
-std::wstring widened(const char* text) {
-    const std::string bytes = text ? text : "";
-    return std::wstring(bytes.begin(), bytes.end());
-}
 
 /// An importer for whatever builders carry a name.
 class FamilyImporter final : public QrCastImpl<FamilyImporter, QrBaseImporter> {
@@ -61,34 +56,50 @@ struct Imported {
     std::wstring reason; ///< why there is no object
 };
 
-/// Tries one family after the other. What a builder throws is the reason of the failure.
+/// Tries one family after the other, whatever the one before has thrown; the first that throws is
+/// the reason when none succeeds.
+Imported importThrough(const std::vector<std::wstring>& families, const std::wstring& name) {
+    Imported imported;
+    for (const std::wstring& family : families) {
+        try {
+            bool found = false;
+            imported.object = FamilyImporter(family).import(name.c_str(), nullptr, found);
+        } catch (...) {
+            if (imported.reason.empty())
+                imported.reason = wordsOfException();
+        }
+        if (imported.object) {
+            imported.family = family;
+            return imported;
+        }
+    }
+    if (imported.reason.empty())
+        imported.reason = L"no builder imports this file";
+    return imported;
+}
+
 Imported importFile(const Host& host, const std::filesystem::path& file) {
     Imported imported;
-    imported.reason = L"there is no such file";
-    if (!std::filesystem::is_regular_file(file))
-        return imported;
-    imported.reason = L"no builder imports this file";
-    const std::wstring name = Tools::displayName(file);
-    try {
-        for (const std::wstring& family : familiesFor(host, file)) {
-            bool found = false;
-            imported.family = family;
-            imported.object = FamilyImporter(family).import(name.c_str(), nullptr, found);
-            if (imported.object)
-                break;
-        }
-    } catch (const std::exception& failure) {
-        imported.reason = widened(failure.what());
-    }
+    std::error_code failure;
+    if (!std::filesystem::is_regular_file(file, failure))
+        imported.reason = L"there is no such file";
+    else if (!std::ifstream(file, std::ios::binary))
+        imported.reason = L"the file cannot be read";
+    else
+        imported = importThrough(familiesFor(host, file), Tools::displayName(file));
     return imported;
 }
 
 std::wstring describe(const QrCastable* object) {
-    const auto persistant = queryCast<QrPersistant>(const_cast<QrCastable*>(object));
-    if (!persistant)
-        return L"an object that cannot be stored";
-    return L"class " + Tools::textOf(*persistant->getClassUid()) + L", version " +
-           std::to_wstring(persistant->getVersion());
+    try {
+        const auto persistant = queryCast<QrPersistant>(const_cast<QrCastable*>(object));
+        if (!persistant)
+            return L"an object that cannot be stored";
+        return L"class " + Tools::textOf(*persistant->getClassUid()) + L", version " +
+               std::to_wstring(persistant->getVersion());
+    } catch (...) {
+        return L"an object that throws when it is asked for its class";
+    }
 }
 
 Json jsonOf(const std::filesystem::path& file, const Imported& imported) {
@@ -101,7 +112,7 @@ Json jsonOf(const std::filesystem::path& file, const Imported& imported) {
 
 /// Failures go to standard error, and successes to standard output unless something else does.
 void tell(Host& host, const std::filesystem::path& file, const Imported& imported, bool success) {
-    const std::wstring name = Tools::displayName(file);
+    const std::wstring name = shown(file);
     if (!imported.object)
         host.console().error(0, (name + L": " + imported.reason).c_str());
     else if (success)
@@ -119,12 +130,15 @@ void save(const std::vector<QrRef<QrCastable>>& objects, const std::filesystem::
         for (const QrRef<QrCastable>& object : objects)
             stream << object.get();
     }
-    std::ofstream output(file, std::ios::binary);
-    output << content.str();
-    output.close();
-    if (!output)
-        throw QrStreamEx::ExWriteOpen("tools/mzcomponents/hostCommands", __LINE__,
-                                      Tools::forOutput(Tools::displayName(file)).c_str());
+    Tools::replaceFile(file, content.view());
+}
+
+/// Whether the result would take the place of what it comes from.
+bool isOneOf(const std::filesystem::path& file, const std::vector<std::string>& others) {
+    std::error_code ignored;
+    return std::any_of(others.begin(), others.end(), [&](const std::string& other) {
+        return std::filesystem::equivalent(file, Tools::pathOf(other), ignored);
+    });
 }
 
 /// Which builders make importers, and of what.
@@ -160,14 +174,6 @@ Json jsonOf(const Host& host, const std::vector<Tools::GraphImporter>& importers
     return {{"libraries", libraries}, {"importers", used}};
 }
 
-void write(const std::string& content, const std::string& file) {
-    std::ofstream output(Tools::pathOf(file), std::ios::binary);
-    output << content;
-    output.close();
-    if (!output)
-        throw QrStreamEx::ExWriteOpen("tools/mzcomponents/hostCommands", __LINE__, file.c_str());
-}
-
 } // namespace
 
 int types(const Common& common) {
@@ -196,10 +202,14 @@ int types(const Common& common) {
     }
     if (common.json)
         printJson({{"types", all}});
-    return good;
+    return host.status();
 }
 
 int importFiles(const Common& common, const ImportArguments& arguments) {
+    if (!arguments.save.empty() && isOneOf(Tools::pathOf(arguments.save), arguments.files)) {
+        complain(widened(arguments.save) + L": this file is to be imported, not overwritten");
+        return wrongUse;
+    }
     Host host(common);
     if (host.interrupted())
         return subjectIsWrong;
@@ -221,7 +231,7 @@ int importFiles(const Common& common, const ImportArguments& arguments) {
         return subjectIsWrong;
     if (!arguments.save.empty())
         save(objects, Tools::pathOf(arguments.save));
-    return good;
+    return host.status();
 }
 
 int graph(const Common& common, const GraphArguments& arguments) {
@@ -233,16 +243,16 @@ int graph(const Common& common, const GraphArguments& arguments) {
     if (common.json) {
         printJson(jsonOf(host, importers));
     } else if (arguments.output.empty() && arguments.svg.empty()) {
-        std::cout << dot;
+        results() << dot;
     }
     if (!arguments.output.empty())
-        write(dot, arguments.output);
+        Tools::replaceFile(Tools::pathOf(arguments.output), dot);
     std::wstring why;
     if (!arguments.svg.empty() && !Tools::drawSvg(dot, Tools::pathOf(arguments.svg), why)) {
         host.console().error(0, why.c_str());
         return subjectIsWrong;
     }
-    return good;
+    return host.status();
 }
 
 } // namespace Mz::Commands

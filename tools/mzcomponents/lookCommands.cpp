@@ -5,7 +5,7 @@
 #include "components/componentTools/discovery.h"
 
 #include <algorithm>
-#include <iostream>
+#include <ostream>
 
 namespace Mz::Commands {
 
@@ -22,11 +22,9 @@ struct Recorded {
         wanted = true;
         sound = reading.state == Tools::ListReading::State::good;
         if (!sound)
-            std::cerr << "mzcomponents: " << common.cache << ": "
-                      << (reading.state == Tools::ListReading::State::missing
-                              ? "there is no such list"
-                              : "no recorded list: " + utf8(reading.reason))
-                      << '\n';
+            complain(widened(common.cache) + (reading.state == Tools::ListReading::State::missing
+                                                  ? L": there is no such list"
+                                                  : L": no recorded list: " + reading.reason));
         libraries = std::move(reading.libraries);
     }
 
@@ -99,6 +97,12 @@ Tools::ProbeOptions probeOptions(const ProbeArguments& arguments) {
     return options;
 }
 
+/// A component that failed when it was scanned shows no fault from the outside.
+bool failedEarlier(const Tools::Explanation& explanation) {
+    return explanation.verdict.verdict == Tools::Verdict::component && !explanation.notes.empty() &&
+           explanation.notes.front().verdict == Tools::Verdict::recordedFailed;
+}
+
 void printSummary(const Tools::ScanResult& result) {
     std::size_t works = 0, faults = 0, looked = 0;
     for (const Tools::ScannedFile& file : result.files) {
@@ -106,7 +110,7 @@ void printSummary(const Tools::ScanResult& result) {
         faults += isFault(file.verdict);
         looked += file.looked;
     }
-    std::cout << result.files.size() << " files: " << works << " with builders, " << faults
+    results() << result.files.size() << " files: " << works << " with builders, " << faults
               << " with faults, " << result.files.size() - works - faults << " others; " << looked
               << " looked at, " << result.libraries.size() << " recorded\n";
 }
@@ -128,12 +132,6 @@ int list(const Common& common) {
             files.push_back(jsonOfFile(file, finding, notes));
         else
             printFile(file, finding, notes);
-    };
-    // A component that failed when it was scanned shows no fault from the outside.
-    const auto failedEarlier = [](const Tools::Explanation& explanation) {
-        return explanation.verdict.verdict == Tools::Verdict::component &&
-               !explanation.notes.empty() &&
-               explanation.notes.front().verdict == Tools::Verdict::recordedFailed;
     };
     for (const Tools::Candidate& candidate : discovery.candidates) {
         // What is no component library need not be asked what it needs.
@@ -165,7 +163,8 @@ int explain(const Common& common, const ExplainArguments& arguments, const Probe
     for (const std::string& file : arguments.files) {
         const Tools::Explanation explanation = Tools::explainFile(Tools::pathOf(file), options);
         // Asked why a file is no component, anything but a component is an answer of that kind.
-        faults = faults || Tools::severityOf(explanation.verdict.verdict) != Tools::Severity::good;
+        faults = faults || failedEarlier(explanation) ||
+                 Tools::severityOf(explanation.verdict.verdict) != Tools::Severity::good;
         if (common.json)
             files.push_back(jsonOfExplanation(explanation));
         else
@@ -186,11 +185,8 @@ int scan(const Common& common, const ProbeArguments& probe) {
     options.controller = &controller;
     const Tools::ScanResult result = Tools::scan(options);
     controller.clearLine();
-    if (!result.rejected.empty())
-        controller.warning(0, (Tools::displayName(options.list) +
-                               L": the old list was rejected and built anew: " + result.rejected)
-                                  .c_str());
-    bool faults = result.interrupted;
+    tellOfList(controller, Tools::displayName(options.list), result);
+    bool faults = result.interrupted || !result.notWritten.empty();
     Json files = Json::array();
     for (const Tools::ScannedFile& file : result.files) {
         faults = faults || isFault(file.verdict);
@@ -207,6 +203,8 @@ int scan(const Common& common, const ProbeArguments& probe) {
     if (common.json)
         printJson({{"files", files},
                    {"rejected", utf8(result.rejected)},
+                   {"keptAs", utf8(Tools::displayName(result.keptAs))},
+                   {"notWritten", utf8(result.notWritten)},
                    {"interrupted", result.interrupted}});
     else
         printSummary(result);

@@ -1,12 +1,13 @@
 /// mzcomponents: looks at component libraries, and uses them, from the command line.
 #include "tools/mzcomponents/commands.h"
+#include "tools/mzcomponents/output.h"
+
+#include "components/componentTools/standardOutput.h"
 
 #include <CLI/CLI.hpp>
 #include <algorithm>
-#include <clocale>
-#include <exception>
+#include <cmath>
 #include <functional>
-#include <iostream>
 #include <utility>
 
 using namespace Mz::Commands;
@@ -15,8 +16,8 @@ namespace {
 
 constexpr const char* about =
     "Tells which component libraries there are, why a file is none, and what they can do.\n\n"
-    "Exit status: 0 all is well; 1 something is wrong with a library, a file or a folder; 2 wrong "
-    "use.";
+    "Exit status: 0 all is well; 1 something is wrong with a library, a file or a folder, or the "
+    "output could not be written; 2 wrong use.";
 
 /// Everything that the command line can say.
 struct Arguments {
@@ -29,11 +30,28 @@ struct Arguments {
     std::function<int()> command;
 };
 
+/// Checks of values: what is wrong, or nothing.
+std::string namesAFolder(const std::string& path) {
+    return path.find_first_not_of(';') == std::string::npos ? "it names no folder" : "";
+}
+
+std::string isFinite(const std::string& number) {
+    double value = 0;
+    return CLI::detail::lexical_cast(number, value) && std::isfinite(value) ? "" : "no number";
+}
+
+/// The parser would take `[a,b]` for two names.
+std::string asOneName(const std::string& word) {
+    return word.starts_with('[') && word.ends_with(']') ? "./" + word : word;
+}
+
 CLI::App* addCommand(CLI::App& app, Arguments& arguments, const char* name, const char* text,
                      const char* example) {
     CLI::App* command = app.add_subcommand(name, text);
-    command->add_option("--path", arguments.common.path,
-                        "The folders to search, separated by ';'; the current one if not given");
+    command
+        ->add_option("--path", arguments.common.path,
+                     "The folders to search, separated by ';'; the current one if not given")
+        ->check(namesAFolder);
     command->add_flag("--json", arguments.common.json, "Write the result as JSON");
     command->footer(std::string("Example:\n  ") + example);
     return command;
@@ -48,6 +66,7 @@ void addLimits(CLI::App* command, Arguments& arguments) {
         ->add_option("--time-limit", arguments.probe.seconds,
                      "Seconds that a library may take to load and describe itself")
         ->check(CLI::Range(0.1, 86400.0))
+        ->check(isFinite)
         ->capture_default_str();
     command
         ->add_option("--memory-limit", arguments.probe.mebibytes,
@@ -152,6 +171,7 @@ int run(std::vector<std::string> words) {
     addLookCommands(app, arguments);
     addUseCommands(app, arguments);
     try {
+        std::transform(words.begin(), words.end(), words.begin(), asOneName);
         std::reverse(words.begin(), words.end()); // So the parser wants them.
         app.parse(words);
     } catch (const CLI::ParseError& failure) {
@@ -160,14 +180,23 @@ int run(std::vector<std::string> words) {
     return arguments.command();
 }
 
+/// Whatever comes out of a command, or out of a component in it, is said.
+int runGuarded(const std::vector<std::string>& words) {
+    try {
+        return run(words);
+    } catch (...) {
+        complain(wordsOfException());
+        return subjectIsWrong;
+    }
+}
+
 } // namespace
 
 int main(int argc, char** argv) {
-    std::setlocale(LC_ALL, "");
-    try {
-        return run(Mz::Tools::argumentsOfProcess(argc, argv));
-    } catch (const std::exception& failure) {
-        std::cerr << "mzcomponents: " << failure.what() << '\n';
-        return subjectIsWrong;
-    }
+    Mz::Tools::prepareProgram();
+    const int status = runGuarded(Mz::Tools::argumentsOfProcess(argc, argv));
+    if (flushResults())
+        return status;
+    complain(L"the output could not be written");
+    return status == good ? subjectIsWrong : status;
 }

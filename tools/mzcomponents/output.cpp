@@ -1,8 +1,13 @@
 #include "tools/mzcomponents/output.h"
 
+#include "components/base/exBase.h"
 #include "components/componentTools/console.h"
+#include "components/componentTools/discovery.h"
+#include "components/componentTools/standardOutput.h"
 #include "components/componentTools/utf8.h"
 
+#include <algorithm>
+#include <exception>
 #include <iostream>
 
 namespace Mz::Commands {
@@ -11,12 +16,64 @@ std::string utf8(const std::wstring& text) {
     return Tools::toUtf8(text);
 }
 
+std::ostream& results() {
+    static std::ostream stream(std::cout.rdbuf());
+    return stream;
+}
+
+void reserveResults() {
+    static Tools::ReservedOutput reserved;
+    results().rdbuf(&reserved);
+}
+
+bool flushResults() {
+    // The parser of the command line writes its help to the stream that everybody knows.
+    const bool helped = static_cast<bool>(std::cout.flush());
+    return static_cast<bool>(results().flush()) && helped;
+}
+
+void complain(const std::wstring& text) {
+    std::cerr << "mzcomponents: " << Tools::forOutput(Tools::withoutControls(text)) << std::endl;
+}
+
+std::wstring widened(const std::string& bytes) {
+    return Tools::displayName(Tools::pathOf(bytes));
+}
+
+std::wstring wordsOfException() {
+    try {
+        throw;
+    } catch (const std::exception& failure) {
+        return widened(failure.what());
+    } catch (const ExBase& failure) {
+        return widened(failure.getReason());
+    } catch (...) {
+        return L"a component threw what is no exception of any known kind";
+    }
+}
+
+std::wstring shown(const std::filesystem::path& path) {
+    return Tools::withoutControls(Tools::displayName(path));
+}
+
+void tellOfList(Tools::ConsoleController& controller, const std::wstring& list,
+                const Tools::ScanResult& result) {
+    const std::wstring name = Tools::withoutControls(list);
+    if (!result.rejected.empty())
+        controller.warning(0, (name + L": this is no recorded list: " + result.rejected).c_str());
+    if (!result.keptAs.empty())
+        controller.warning(0,
+                           (name + L": what was in it is kept as " + shown(result.keptAs)).c_str());
+    if (!result.notWritten.empty())
+        controller.error(0, (name + L": " + result.notWritten).c_str());
+}
+
 void printLine(const std::wstring& text) {
-    std::cout << Tools::forOutput(text) << '\n';
+    results() << Tools::forOutput(Tools::withoutControls(text)) << '\n';
 }
 
 void printJson(const Json& value) {
-    std::cout << value.dump(2, ' ', true) << '\n';
+    results() << value.dump(2, ' ', true) << '\n';
 }
 
 Json jsonOf(const Tools::Finding& finding) {

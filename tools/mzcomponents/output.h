@@ -1,8 +1,12 @@
 /// How results look: lines of text, or JSON.
 #pragma once
 
+#include "components/componentTools/console.h"
 #include "components/componentTools/explain.h"
+#include "components/componentTools/scan.h"
 
+#include <filesystem>
+#include <iosfwd>
 #include <nlohmann/json.hpp>
 #include <string>
 
@@ -12,6 +16,31 @@ using Json = nlohmann::ordered_json;
 
 /// Texts in JSON are UTF-8, whatever the locale.
 std::string utf8(const std::wstring& text);
+
+/// Where results go, and nothing else does: standard output.
+std::ostream& results();
+
+/// From now on components may print what they like: it goes to standard error.
+void reserveResults();
+
+/// Brings everything out; false when any of it was lost.
+bool flushResults();
+
+/// Says on standard error what is wrong.
+void complain(const std::wstring& text);
+
+/// What an exception or an argument says, in characters.
+std::wstring widened(const std::string& bytes);
+
+/// What the exception that is being handled says.
+std::wstring wordsOfException();
+
+/// A name as it may be printed: control characters are not left to the terminal.
+std::wstring shown(const std::filesystem::path& path);
+
+/// Says what became of the old list, and why the new one could not be written.
+void tellOfList(Tools::ConsoleController& controller, const std::wstring& list,
+                const Tools::ScanResult& result);
 
 /// Prints one line.
 void printLine(const std::wstring& text);

@@ -4,12 +4,13 @@
 
 #include "components/componentManager/binaryStream.h"
 #include "components/componentManager/bufferio.h"
+#include "components/componentManager/exceptions.h"
 #include "components/componentManager/persistant.h"
 #include "components/componentTools/discovery.h"
 #include "components/objectIO/objectIO.h"
 
 #include <fstream>
-#include <iostream>
+#include <system_error>
 
 namespace Mz::Commands {
 
@@ -95,32 +96,81 @@ void showFrames(const Common& common, const std::vector<Frame>& frames) {
         printJson({{"kind", "objectStream"}, {"objects", all}});
 }
 
-/// Only components know what their objects hold, so the stream is read through them.
-int showObjects(const Common& common, const std::filesystem::path& file) {
-    Host host(common);
-    if (host.interrupted())
-        return subjectIsWrong;
-    std::ifstream input(file, std::ios::binary);
+struct Objects {
+    std::vector<Frame> frames;
+    std::wstring failure; ///< why the rest could not be read; empty when all was
+};
+
+Objects readObjects(std::istream& input) {
     QrInBuffer bytes(&input);
     QrObjectInBuffer objects(&bytes);
     FrameNotes notes(&objects);
-    std::wstring failure;
+    Objects result;
     {
         QrBinaryStream stream(&notes);
         try {
-            while (input.peek() != std::ifstream::traits_type::eof())
+            while (input.peek() != std::istream::traits_type::eof())
                 stream.readObject(nullptr, nullptr, nullptr);
-        } catch (const std::exception& error) {
-            const std::string what = error.what();
-            failure.assign(what.begin(), what.end());
+        } catch (...) {
+            result.failure = wordsOfException();
         }
     }
-    if (!failure.empty() && notes.frames.size() <= 1)
-        failure = L"neither a recorded list nor objects that these components know: " + failure;
-    showFrames(common, notes.frames);
-    if (!failure.empty())
-        host.console().error(0, (Tools::displayName(file) + L": " + failure).c_str());
-    return failure.empty() ? good : subjectIsWrong;
+    if (result.failure.empty() && input.bad())
+        result.failure = L"the file cannot be read";
+    result.frames = std::move(notes.frames);
+    return result;
+}
+
+/// Whether the file may hold objects: they are numbered from 1, and null is 0.
+bool beginsWithAnObject(std::istream& input) {
+    QrInBuffer bytes(&input);
+    QrBinaryStream stream(&bytes);
+    std::uint32_t number = 0;
+    try {
+        stream >> number;
+    } catch (const QrStreamEx&) {
+        return false;
+    }
+    input.clear();
+    input.seekg(0);
+    return number <= 1;
+}
+
+/// Only components know what their objects hold, so the stream is read through them.
+int showObjects(const Common& common, const std::filesystem::path& file, std::istream& input,
+                const std::wstring& whyNoList) {
+    Host host(common);
+    if (host.interrupted())
+        return subjectIsWrong;
+    Objects objects = readObjects(input);
+    const bool nothing = !objects.failure.empty() && objects.frames.size() <= 1;
+    if (nothing)
+        objects.frames.clear();
+    showFrames(common, objects.frames);
+    if (objects.failure.empty())
+        return host.status();
+    std::wstring failure = objects.failure;
+    if (nothing)
+        failure = L"neither a recorded list (" + whyNoList +
+                  L") nor objects that these components know (" + failure + L")";
+    host.console().error(0, (shown(file) + L": " + failure).c_str());
+    return subjectIsWrong;
+}
+
+/// What keeps the file from being read as objects, or nothing; `input` is open then.
+std::wstring obstacle(const std::filesystem::path& file, std::ifstream& input,
+                      const std::wstring& whyNoList) {
+    std::error_code failure;
+    if (!std::filesystem::is_regular_file(file, failure))
+        return L"there is no such file";
+    if (std::filesystem::file_size(file, failure) == 0 && !failure)
+        return L"the file is empty";
+    input.open(file, std::ios::binary);
+    if (!input || input.peek() == std::ifstream::traits_type::eof())
+        return L"the file cannot be read";
+    if (!beginsWithAnObject(input))
+        return L"neither a recorded list (" + whyNoList + L") nor stored objects";
+    return {};
 }
 
 } // namespace
@@ -132,11 +182,12 @@ int show(const Common& common, const std::string& argument) {
         showList(common, reading.libraries);
         return good;
     }
-    if (!std::filesystem::is_regular_file(file)) {
-        std::cerr << "mzcomponents: " << argument << ": there is no such file\n";
-        return subjectIsWrong;
-    }
-    return showObjects(common, file);
+    std::ifstream input;
+    const std::wstring wrong = obstacle(file, input, reading.reason);
+    if (wrong.empty())
+        return showObjects(common, file, input, reading.reason);
+    complain(widened(argument) + L": " + wrong);
+    return subjectIsWrong;
 }
 
 } // namespace Mz::Commands

@@ -37,6 +37,10 @@ std::vector<std::string> arguments(int count, char** values);
 /// The path that such an argument names.
 NativePath pathOfArgument(const std::string& argument);
 
+/// The same place as `path`, which is absolute, without "." and "..", as the system goes there:
+/// some follow a link before they go up from it. A part that does not exist goes up by its name.
+NativePath withoutDots(const NativePath& path);
+
 // ---- Files and libraries --------------------------------------------------------------------
 
 /// The format of this system's own libraries.
@@ -92,11 +96,13 @@ struct ChildResult {
         outOfMemory,
         tooMuchOutput,
         interrupted,
+        unknown, ///< the system does not tell, for this program does not want to know
     };
     End end = End::notStarted;
-    int status = 0;     ///< of one that exited
-    std::wstring words; ///< what the system calls the crash; why it was not started
-    std::string output; ///< what it wrote to its standard output
+    int status = 0;           ///< of one that exited
+    std::wstring words;       ///< what the system calls the crash; why it was not started
+    std::string output;       ///< what it wrote to its standard output
+    std::uint64_t memory = 0; ///< the most that it was seen to use, in bytes
 };
 
 /// Runs a program without standard input and standard error, and waits for its end. Kills it, and
@@ -117,6 +123,17 @@ class AnswerPipe {
   private:
     std::intptr_t handle;
 };
+
+/// Takes standard output away from everybody else: what is written there from now on goes to
+/// standard error. Gives where it led before, for `writeReserved`; -1 when it led nowhere.
+int reserveOutput();
+
+/// Writes all of it, with line ends as standard output has them; false when that fails.
+bool writeReserved(int descriptor, const char* data, std::size_t size);
+
+/// Undoes what the program that started this one may have wanted, so that the system tells how
+/// children end.
+void wantEndsOfChildren();
 
 /// Sees to it that this process, which is to load libraries that may do anything, goes with the one
 /// that started it, opens no dialogs, leaves no dump, and cannot take far more than `memory` bytes.

@@ -108,7 +108,10 @@ class Watch {
         ::kill(-child, SIGKILL);
         if (judged)
             return std::move(judgement);
-        if (usedTooMuch(usage))
+        judgement.memory = std::max(judgement.memory, mostMemory(usage));
+        if (unknown)
+            judgement.end = ChildResult::End::unknown;
+        else if (judgement.memory >= limits.memory) // The end may have come between two looks.
             judgement.end = ChildResult::End::outOfMemory;
         else if (WIFSIGNALED(status))
             noteSignal(WTERMSIG(status));
@@ -118,19 +121,26 @@ class Watch {
     }
 
   private:
-    /// The end may have come between two looks. What the system tells then counts the memory of
-    /// this process as well, as it was when the child was started: only what is more is the
-    /// child's.
-    bool usedTooMuch(const rusage& usage) const {
+    /// What the system tells of a child that has ended counts the memory of this process as well,
+    /// as it was when the child was started: only what is more is the child's.
+    static std::uint64_t mostMemory(const rusage& usage) {
         rusage own{};
         ::getrusage(RUSAGE_SELF, &own);
         constexpr std::uint64_t unit = 1024;
-        return static_cast<std::uint64_t>(usage.ru_maxrss) * unit >= limits.memory &&
-               usage.ru_maxrss > own.ru_maxrss;
+        return usage.ru_maxrss > own.ru_maxrss ? static_cast<std::uint64_t>(usage.ru_maxrss) * unit
+                                               : 0;
+    }
+
+    /// Looks at what it uses now.
+    bool usesTooMuch() {
+        judgement.memory = std::max(judgement.memory, memoryOf(child));
+        return judgement.memory >= limits.memory;
     }
 
     bool over(int& status, rusage& usage) {
         const pid_t ended = ::wait4(child, &status, judged ? 0 : WNOHANG, &usage);
+        // In a process that ignores the ends of its children, the system keeps none for it.
+        unknown = ended < 0 && errno == ECHILD;
         return ended == child || (ended < 0 && errno != EINTR);
     }
 
@@ -158,7 +168,7 @@ class Watch {
             return;
         if (limits.interrupted && limits.interrupted())
             stop(ChildResult::End::interrupted);
-        else if (memoryOf(child) >= limits.memory)
+        else if (usesTooMuch())
             stop(ChildResult::End::outOfMemory);
         else if (judgement.output.size() > limits.output)
             stop(ChildResult::End::tooMuchOutput);
@@ -190,6 +200,7 @@ class Watch {
     ChildResult judgement;
     bool judged = false;
     bool closed = false;
+    bool unknown = false;
 };
 
 } // namespace

@@ -107,6 +107,24 @@ NativePath pathOfArgument(const std::string& argument) {
     return argument;
 }
 
+NativePath withoutDots(const NativePath& path) {
+    NativePath plain;
+    for (const NativePath& part : path) {
+        if (part == "..") {
+            std::error_code failure;
+            if (std::filesystem::is_symlink(std::filesystem::symlink_status(plain, failure))) {
+                const NativePath followed = std::filesystem::weakly_canonical(plain, failure);
+                if (!failure)
+                    plain = followed;
+            }
+            plain = plain.parent_path();
+        } else if (part != ".") {
+            plain /= part;
+        }
+    }
+    return plain.lexically_normal(); // Separators that stand twice.
+}
+
 ImageFormat ownFormat() {
     return ImageFormat::elf;
 }
@@ -181,6 +199,23 @@ const char* programExtension() {
     return "";
 }
 
+namespace {
+
+bool writeAll(int descriptor, const char* data, std::size_t size) {
+    while (size > 0) {
+        const ssize_t written = ::write(descriptor, data, size);
+        if (written > 0) {
+            data += written;
+            size -= static_cast<std::size_t>(written);
+        } else if (written == 0 || errno != EINTR) {
+            return false;
+        }
+    }
+    return true;
+}
+
+} // namespace
+
 AnswerPipe::AnswerPipe() {
     // A high number, which nobody meets by counting.
     handle = ::fcntl(STDOUT_FILENO, F_DUPFD_CLOEXEC, 500);
@@ -193,15 +228,27 @@ AnswerPipe::AnswerPipe() {
 }
 
 void AnswerPipe::write(const char* data, std::size_t size) {
-    while (size > 0) {
-        const ssize_t written = ::write(static_cast<int>(handle), data, size);
-        if (written > 0) {
-            data += written;
-            size -= static_cast<std::size_t>(written);
-        } else if (written == 0 || errno != EINTR) {
-            return;
+    writeAll(static_cast<int>(handle), data, size);
+}
+
+int reserveOutput() {
+    const int reserved = ::fcntl(STDOUT_FILENO, F_DUPFD_CLOEXEC, 3);
+    if (::dup2(STDERR_FILENO, STDOUT_FILENO) < 0) {
+        const int nowhere = ::open("/dev/null", O_WRONLY);
+        if (nowhere >= 0 && nowhere != STDOUT_FILENO) {
+            ::dup2(nowhere, STDOUT_FILENO);
+            ::close(nowhere);
         }
     }
+    return reserved;
+}
+
+bool writeReserved(int descriptor, const char* data, std::size_t size) {
+    return writeAll(descriptor, data, size);
+}
+
+void wantEndsOfChildren() {
+    std::signal(SIGCHLD, SIG_DFL);
 }
 
 void confine(std::uint64_t memory) {

@@ -162,9 +162,10 @@ class Watch {
         PROCESS_MEMORY_COUNTERS counters{};
         counters.cb = sizeof counters;
         if (::K32GetProcessMemoryInfo(child, &counters, sizeof counters))
-            most = std::max<std::uint64_t>({most, counters.PagefileUsage, counters.WorkingSetSize,
-                                            counters.PeakWorkingSetSize});
-        return most;
+            judgement.memory =
+                std::max<std::uint64_t>({judgement.memory, counters.PagefileUsage,
+                                         counters.WorkingSetSize, counters.PeakWorkingSetSize});
+        return judgement.memory;
     }
 
     void judge() {
@@ -191,7 +192,6 @@ class Watch {
     const ChildLimits& limits;
     Clock::time_point end;
     ChildResult judgement;
-    std::uint64_t most = 0;
     bool judged = false;
 };
 

@@ -58,6 +58,9 @@ bool isFault(DWORD code) {
     }
 }
 
+/// Where standard output led before it was reserved.
+HANDLE reservedOutput = nullptr;
+
 LONG WINAPI noteFault(EXCEPTION_POINTERS* fault) {
     const DWORD code = fault->ExceptionRecord->ExceptionCode;
     if (isFault(code))
@@ -82,7 +85,9 @@ std::optional<std::wstring> nameText(const NativePath& path) {
 
 std::string encode(const std::wstring& text, int stream) {
     DWORD mode = 0;
-    const HANDLE handle = ::GetStdHandle(stream == 1 ? STD_OUTPUT_HANDLE : STD_ERROR_HANDLE);
+    const HANDLE handle = stream == 1 && reservedOutput
+                              ? reservedOutput
+                              : ::GetStdHandle(stream == 1 ? STD_OUTPUT_HANDLE : STD_ERROR_HANDLE);
     return toBytes(text, ::GetConsoleMode(handle, &mode) ? ::GetConsoleOutputCP() : CP_ACP);
 }
 
@@ -98,6 +103,10 @@ std::vector<std::string> arguments(int, char**) {
 
 NativePath pathOfArgument(const std::string& argument) {
     return toCharacters(argument, CP_UTF8);
+}
+
+NativePath withoutDots(const NativePath& path) {
+    return path.lexically_normal();
 }
 
 ImageFormat ownFormat() {
@@ -203,6 +212,32 @@ void AnswerPipe::write(const char* data, std::size_t size) {
         size -= written;
     }
 }
+
+int reserveOutput() {
+    const int reserved = ::_dup(1);
+    if (reserved >= 0)
+        reservedOutput = reinterpret_cast<HANDLE>(::_get_osfhandle(reserved));
+    int elsewhere = 2;
+    if (::_get_osfhandle(elsewhere) < 0)
+        elsewhere = ::_open("NUL", _O_WRONLY);
+    if (elsewhere >= 0 && ::_dup2(elsewhere, 1) == 0)
+        ::SetStdHandle(STD_OUTPUT_HANDLE, reinterpret_cast<HANDLE>(::_get_osfhandle(1)));
+    return reserved;
+}
+
+bool writeReserved(int descriptor, const char* data, std::size_t size) {
+    while (size > 0) {
+        const unsigned int piece = static_cast<unsigned int>(size < 16384 ? size : 16384);
+        const int written = ::_write(descriptor, data, piece);
+        if (written <= 0)
+            return false;
+        data += written;
+        size -= static_cast<std::size_t>(written);
+    }
+    return true;
+}
+
+void wantEndsOfChildren() {}
 
 void confine(std::uint64_t) {
     ::SetErrorMode(SEM_FAILCRITICALERRORS | SEM_NOGPFAULTERRORBOX | SEM_NOOPENFILEERRORBOX);

@@ -1,0 +1,45 @@
+#include "components/componentTools/standardOutput.h"
+
+#include "components/componentTools/platform/system.h"
+
+#include <clocale>
+#include <cstdio>
+#include <iostream>
+
+namespace Mz::Tools {
+
+void prepareProgram() {
+    std::setlocale(LC_ALL, "");
+    System::wantEndsOfChildren();
+}
+
+ReservedOutput::ReservedOutput() : descriptor(-1) {
+    // What was written before belongs there.
+    std::cout.flush();
+    std::fflush(stdout);
+    descriptor = System::reserveOutput();
+}
+
+ReservedOutput::~ReservedOutput() {
+    sync();
+}
+
+ReservedOutput::int_type ReservedOutput::overflow(int_type character) {
+    if (!traits_type::eq_int_type(character, traits_type::eof()))
+        waiting += traits_type::to_char_type(character);
+    return traits_type::not_eof(character);
+}
+
+std::streamsize ReservedOutput::xsputn(const char* data, std::streamsize count) {
+    constexpr std::size_t enough = 65536;
+    waiting.append(data, static_cast<std::size_t>(count));
+    return waiting.size() < enough || sync() == 0 ? count : 0;
+}
+
+int ReservedOutput::sync() {
+    const std::string all = std::move(waiting);
+    waiting.clear();
+    return System::writeReserved(descriptor, all.data(), all.size()) ? 0 : -1;
+}
+
+} // namespace Mz::Tools
