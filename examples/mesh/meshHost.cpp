@@ -181,5 +181,7 @@ int main(int argc, char** argv) {
     const Options options = parseOptions(console::arguments(argc, argv));
     ConsoleController controller(options.showProgress);
     attempt(controller, options.components, [&] { run(options, controller); });
+    if (!std::cout.flush())
+        controller.error(0, L"the output could not be written");
     return controller.errorCount() == 0 ? 0 : 1;
 }

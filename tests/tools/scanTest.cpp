@@ -346,10 +346,12 @@ TEST_F(Scan, GoesUpFromAFolderAsTheSystemDoes) {
     std::error_code failure;
     std::filesystem::create_directory_symlink(folder.path() / "a" / "b", folder.path() / "link",
                                               failure);
-    if (failure)
-        GTEST_SKIP() << "no links here";
     const auto up = folder.path() / "link" / ".." / "file";
     const auto plain = candidateOf(up).path;
+    if (failure) { // No links here, so names alone tell.
+        EXPECT_EQ(plain.lexically_normal(), (folder.path() / "file").lexically_normal());
+        return;
+    }
     EXPECT_EQ(std::filesystem::exists(up), std::filesystem::exists(plain)) << plain;
     EXPECT_EQ(plain.lexically_normal(), plain);
 }
