@@ -79,8 +79,9 @@ bool ComponentManager::loadModule(ComponentLibrary& library) {
     return used.module != nullptr;
 }
 
-bool ComponentManager::registerLibrary(ComponentLibrary& library,
-                                       const platform::FileStatus& status) {
+/// The exception of a thread's cancellation has no object, which a sanitizer would complain about.
+[[gnu::no_sanitize("null")]] bool
+ComponentManager::registerLibrary(ComponentLibrary& library, const platform::FileStatus& status) {
     bool described = false;
     bool failed = false;
     try {

@@ -312,7 +312,8 @@ bool QrStream::readCharacters(std::wstring& value, int length) {
     if (length < 0)
         return false;
     value.clear();
-    for (int done = 0; done < length;) {
+    int done = 0;
+    do { // Once at least: an IO of somebody else's is asked for an empty text as well.
         const int wanted = std::min(chunk, length - done);
         value.resize(static_cast<std::size_t>(done) + static_cast<std::size_t>(wanted));
         wchar_t* arrived = value.data() + done;
@@ -327,7 +328,7 @@ bool QrStream::readCharacters(std::wstring& value, int length) {
         if (done > longestFill &&
             std::all_of(arrived, arrived + wanted, [](wchar_t c) { return c == L'\0'; }))
             return false;
-    }
+    } while (done < length);
     return true;
 }
 

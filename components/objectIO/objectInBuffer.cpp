@@ -148,7 +148,7 @@ QrRef<QrCastable> QrObjectInBuffer::readNewObject(QrStream& s, std::uint32_t num
 int QrObjectInBuffer::readChar(wchar_t* buf, int size, int count) {
     // Only strings are read without a limit of characters, and only a bool is read as one.
     constexpr int noLimit = 0x7fffffff;
-    if (state->exactStrings || (count != noLimit && (count != 1 || size != 1))) {
+    if (state->exactStrings || size < 1 || (count != noLimit && (count != 1 || size != 1))) {
         const int got = inner().readChar(buf, size, count);
         // A NUL byte is never consumed: it would fill each of any number of strings.
         if (count == noLimit && got > 0 && std::find(buf, buf + got, L'\0') != buf + got)

@@ -118,6 +118,8 @@ TEST(IOSequence, StringsAreReadInOneCallWithoutALimitOfCharacters) {
     EXPECT_THAT(
         calls<QrBinaryStream>([&](QrStream& s) { s.read(value, 1); }, fromHex("00 00 00 02 61 62")),
         ElementsAre("read 4", "readChar wide 2 2147483647"));
+    EXPECT_THAT(calls<QrBinaryStream>([&](QrStream& s) { s >> value; }, fromHex("00 00 00 00")),
+                ElementsAre("read 4", "readChar wide 0 2147483647"));
 }
 
 TEST(IOSequence, BoolsOfTextAreReadOneCharacterAtATime) {
