@@ -80,7 +80,7 @@ bool ComponentManager::loadModule(ComponentLibrary& library) {
 }
 
 /// The exception of a thread's cancellation has no object, which a sanitizer would complain about.
-[[gnu::no_sanitize("null")]] bool
+__attribute__((no_sanitize("null"))) bool
 ComponentManager::registerLibrary(ComponentLibrary& library, const platform::FileStatus& status) {
     bool described = false;
     bool failed = false;
