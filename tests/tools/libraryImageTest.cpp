@@ -12,7 +12,6 @@
 using namespace Mz::Tools;
 using namespace Mz::Test;
 using ::testing::ElementsAre;
-using ::testing::IsEmpty;
 
 namespace {
 
