@@ -37,7 +37,7 @@ endif()
 if(MZ_SANITIZE)
   # With the checks between them, GCC loses track of what the standard library initialises.
   target_compile_options(mzCompile INTERFACE -fsanitize=address,undefined -fno-sanitize-recover=all
-    -fno-omit-frame-pointer -Wno-maybe-uninitialized)
+    -fno-omit-frame-pointer $<$<CXX_COMPILER_ID:GNU>:-Wno-maybe-uninitialized>)
   target_link_options(mzCompile INTERFACE -fsanitize=address,undefined)
 endif()
 

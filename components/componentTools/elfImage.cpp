@@ -142,6 +142,8 @@ class ElfReader {
                 break;
             note(*entry, neededNames, rpaths, runpaths);
         }
+        if (strings && !namesEnd())
+            return damaged(L"its table of names has no end");
         neededNames.resize(std::min(neededNames.size(), maximumNeeded));
         return readNames(neededNames, image.needed) && readFolders(rpaths, image.rpath) &&
                readFolders(runpaths, image.runpath);
@@ -155,12 +157,21 @@ class ElfReader {
         case 5: strings = entry.value; break;
         case 6: symbols = entry.value; break;
         case 10: stringsSize = entry.value; break;
+        case 14: ownName = entry.value; break;
         case 15: rpaths.push_back(entry.value); break;
         case 29: runpaths.push_back(entry.value); break;
         case 0x6FFFFEF5: gnuHash = entry.value; break;
         case 0x6FFFFFFB: program = (entry.value & 0x08000000) != 0; break;
         default: break;
         }
+    }
+
+    /// The loader follows names wherever they lead.
+    bool namesEnd() {
+        if (ownName >= stringsSize)
+            return false;
+        const auto offset = offsetOf(strings, stringsSize);
+        return offset && file.read<char>(*offset + stringsSize - 1) == '\0';
     }
 
     std::optional<std::string> name(std::uint64_t position) {
@@ -291,6 +302,7 @@ class ElfReader {
     std::optional<Segment> dynamic;
     bool program = false;
     std::uint64_t symbols = 0, strings = 0, stringsSize = 0, hash = 0, gnuHash = 0;
+    std::uint64_t ownName = 0;
 };
 
 } // namespace

@@ -243,6 +243,35 @@ TEST_P(ElfProbe, RefusesDynamicEntriesThatLeadNowhere) {
     EXPECT_FALSE(exports(withDynamic(DT_STRSZ, 8)));
 }
 
+TEST_P(ElfProbe, RefusesNamesThatLeadOutOfTheTableOfStrings) {
+    const auto stringsSize = get<Elf64_Dyn>(whole, dynamicEntry(DT_STRSZ)).d_un.d_val;
+    for (const std::int64_t tag : {DT_NEEDED, DT_SONAME, DT_RPATH, DT_RUNPATH}) {
+        const auto withName = [&](std::uint64_t position) {
+            std::string content = whole;
+            // The loader takes no notice of the size of symbols: its entry has room.
+            Elf64_Dyn entry{};
+            entry.d_tag = tag;
+            entry.d_un.d_val = position;
+            put(content, dynamicEntry(DT_SYMENT), entry);
+            return content;
+        };
+        EXPECT_TRUE(exports(withName(stringsSize - 1))) << tag;
+        EXPECT_FALSE(exports(withName(stringsSize))) << tag;
+        EXPECT_FALSE(exports(withName(~std::uint64_t{0}))) << tag;
+    }
+}
+
+TEST_P(ElfProbe, RefusesATableOfStringsThatHasNoEnd) {
+    const auto strings = get<Elf64_Dyn>(whole, dynamicEntry(DT_STRTAB)).d_un.d_ptr;
+    const auto size = get<Elf64_Dyn>(whole, dynamicEntry(DT_STRSZ)).d_un.d_val;
+    std::string content = whole;
+    EXPECT_EQ(content[strings + size - 1], '\0');
+    content[strings + size - 1] = 'x';
+    EXPECT_FALSE(exports(content));
+    EXPECT_FALSE(exports(withDynamic(DT_STRSZ, whole.size())));
+    EXPECT_FALSE(exports(withDynamic(DT_STRSZ, ~std::uint64_t{0}))); // "Ends" before it begins.
+}
+
 TEST_P(ElfProbe, RefusesSegmentsWithOffsetsNearTheEndOfAllNumbers) {
     std::string content = whole;
     const std::size_t dynamic = segment(PT_DYNAMIC);

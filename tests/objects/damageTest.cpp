@@ -30,7 +30,7 @@ class Damaged : public ObjectsOn<Stream> {
         Saving<Stream> out;
         out.stream << root.get() << static_cast<const QrCastable*>(nullptr);
         out.stream << Objects::node(200, {shared}).get() << root->links.back().get();
-        Objects::unlink(root);
+        unlink(root);
         return out.bytes();
     }
 
@@ -51,7 +51,7 @@ class Damaged : public ObjectsOn<Stream> {
             reason = failure.getReason();
         }
         for (const QrPtr<Node>& node : read)
-            Objects::unlink(node);
+            unlink(node);
         return count;
     }
 };

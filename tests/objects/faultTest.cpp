@@ -281,11 +281,11 @@ TYPED_TEST(Faulty, KnownAndNullObjectsMayStandAtTheLastLevel) {
         last = last->links[0];
     last->links = {root, nullptr, last};
     Loading<TypeParam> in(saved<TypeParam>(root.get()));
-    this->unlink(root);
+    unlink(root);
     const QrPtr<Node> read = in.node();
     in.finish();
     ASSERT_TRUE(read);
-    this->unlink(read);
+    unlink(read);
 }
 
 TEST_F(Objects, AreRefusedByTheBuffersThemselves) {

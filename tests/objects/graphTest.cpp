@@ -60,7 +60,7 @@ TYPED_TEST(Graph, MayHaveCircles) {
         root->links.push_back(root);
         root->links[0]->links = {root, root->links[0]};
         Loading<TypeParam> in(saved<TypeParam>(root.get()));
-        this->unlink(root);
+        unlink(root);
         const QrPtr<Node> read = in.node();
         in.finish();
         ASSERT_EQ(read->links.size(), 2U);
@@ -69,7 +69,7 @@ TYPED_TEST(Graph, MayHaveCircles) {
         EXPECT_EQ(read->links[0]->links[0], read);
         EXPECT_EQ(read->links[0]->links[1], read->links[0]);
         EXPECT_EQ(read->links[0]->number, 2);
-        this->unlink(read);
+        unlink(read);
     }
     EXPECT_EQ(this->alive(), before);
 }

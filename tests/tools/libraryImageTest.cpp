@@ -79,6 +79,18 @@ TEST_P(Image, DamagedInAnyWayIsReadInBoundedTime) {
     EXPECT_GT(unlike, 0);
 }
 
+TEST(ElfImage, WhoseNamesHaveNoEndIsDamaged) {
+    const std::string name = "QrGetComponentDescription";
+    std::string bytes = elfLibrary({});
+    const std::size_t end = bytes.find(name) + name.size(); // The last in the table of names.
+    EXPECT_EQ(bytes[end], '\0');
+    bytes[end] = 'x';
+    const TemporaryDirectory folder;
+    const LibraryImage image = readLibraryImage(folder.write("image", bytes));
+    EXPECT_EQ(image.damage, L"its table of names has no end");
+    EXPECT_NE(image.entryPoint, LibraryImage::EntryPoint::function);
+}
+
 INSTANTIATE_TEST_SUITE_P(Formats, Image, ::testing::Values(ImageFormat::elf, ImageFormat::pe),
                          [](const auto& format) {
                              return format.param == ImageFormat::elf ? "Elf" : "Pe";

@@ -111,6 +111,8 @@ struct DynamicTables {
     std::uint64_t stringsSize = 0;
     std::uint64_t gnuHash = 0;
     std::uint64_t hash = 0;
+    std::uint64_t lastName =
+        0;                ///< of the names in the string table that the loader takes, the last
     bool program = false; ///< position-independent, but to be started and not to be loaded
 };
 
@@ -121,7 +123,7 @@ class ElfLibrary {
     bool exports(const char* symbol) {
         if (!readHeaders() || !readDynamicTables())
             return false;
-        return tables.gnuHash ? foundByGnuHash(symbol) : foundByHash(symbol);
+        return (tables.gnuHash ? foundByGnuHash(symbol) : foundByHash(symbol)) && namesEnd();
     }
 
   private:
@@ -175,8 +177,21 @@ class ElfLibrary {
         case DT_GNU_HASH: tables.gnuHash = entry.d_un.d_ptr; break;
         case DT_FLAGS_1: tables.program = (entry.d_un.d_val & DF_1_PIE) != 0; break;
         case DT_HASH: tables.hash = entry.d_un.d_ptr; break;
+        case DT_NEEDED:
+        case DT_SONAME:
+        case DT_RPATH:
+        case DT_RUNPATH: tables.lastName = std::max(tables.lastName, entry.d_un.d_val); break;
         default: break;
         }
+    }
+
+    /// Whether all names that the loader takes from the string table end in it: the loader follows
+    /// them wherever they lead.
+    bool namesEnd() {
+        if (tables.lastName >= tables.stringsSize)
+            return false;
+        const std::optional<std::uint64_t> offset = offsetOf(tables.strings, tables.stringsSize);
+        return offset && file.read<char>(*offset + tables.stringsSize - 1) == '\0';
     }
 
     /// The `T` that the loaded library would have at `address`.

@@ -1,0 +1,19 @@
+#include "fuzz/fuzz.h"
+#include "tests/support/temporaryDirectory.h"
+
+#include <fstream>
+
+namespace Mz::Fuzz {
+
+InputFile::InputFile(std::string_view content) {
+    // One for the process: making a folder for each input would take most of the time.
+    static const Test::TemporaryDirectory folder;
+    name = folder.write("input", content);
+}
+
+InputFile::~InputFile() {
+    std::error_code ignored;
+    std::filesystem::remove(name, ignored);
+}
+
+} // namespace Mz::Fuzz

@@ -1,0 +1,97 @@
+// Mesh files of every format, by content alone; and every mesh through a store and back.
+//
+// Input: which format, the file.
+#include "components/componentManager/binaryStream.h"
+#include "components/componentManager/processControl.h"
+#include "components/componentManager/textStream.h"
+#include "examples/mesh/formats/objFormat.h"
+#include "examples/mesh/formats/offFormat.h"
+#include "examples/mesh/formats/plyFormat.h"
+#include "examples/mesh/formats/stlFormat.h"
+#include "examples/mesh/reading/meshObject.h"
+#include "fuzz/fuzz.h"
+
+#include <cmath>
+#include <sstream>
+
+namespace {
+
+using namespace Mz;
+using namespace Meshes;
+
+QrRef<QrCastable> importBy(const MeshFormat& format, std::string_view content) {
+    std::istringstream source{std::string(content)};
+    QrInBuffer io(&source);
+    recognisesMesh(format, io, L"", L"");
+    io.read(); // Clears the end, where it was reached.
+    io.seek(0, 0);
+    return importMesh(format, io, L"", L"format");
+}
+
+void expectPromises(const Mesh& mesh) {
+    for (const Mesh::Point& p : mesh.vertices())
+        Fuzz::expect(std::isfinite(p.x) && std::isfinite(p.y) && std::isfinite(p.z), "finite");
+    for (std::size_t index = 0; index < mesh.faceCount(); ++index) {
+        Fuzz::expect(mesh.face(index).size() >= 3, "a face has three corners at least");
+        for (const Mesh::Corner& corner : mesh.face(index)) {
+            Fuzz::expect(corner.vertex < mesh.vertexCount(), "a valid vertex");
+            Fuzz::expect(corner.texCoord == Mesh::absent ||
+                             corner.texCoord < mesh.texCoords().size(),
+                         "a valid texture coordinate");
+            Fuzz::expect(corner.normal == Mesh::absent || corner.normal < mesh.normals().size(),
+                         "a valid normal");
+        }
+    }
+}
+
+template <class Stream>
+void expectStored(MeshObject& mesh) {
+    std::stringstream store;
+    QrOutBuffer out(&store);
+    Stream writer(&out);
+    mesh.write(writer);
+    QrInBuffer in(&store);
+    Stream reader(&in);
+    MeshObject again;
+    again.read(reader);
+    Fuzz::expect(areEqual(mesh, again), "what was stored comes back");
+}
+
+/// Any bytes as a stored mesh.
+void readStored(std::string_view content) {
+    std::istringstream source{std::string(content)};
+    QrInBuffer io(&source);
+    QrBinaryStream stream(&io);
+    MeshObject mesh;
+    Fuzz::outcomeOf([&] {
+        mesh.read(stream);
+        return std::string();
+    });
+    expectPromises(mesh);
+}
+
+} // namespace
+
+int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
+    static const ObjFormat obj;
+    static const OffFormat off;
+    static const PlyFormat ply;
+    static const StlFormat stl;
+    static const MeshFormat* const formats[] = {&obj, &off, &ply, &stl};
+    QrSetSystemProcessController(nullptr); // Nobody wants to hear of what is damaged here.
+
+    Fuzz::Input input(data, size);
+    const unsigned int which = input.byte() % 5;
+    if (which == 4) {
+        readStored(input.rest());
+        return 0;
+    }
+    const QrRef<QrCastable> object = importBy(*formats[which], input.rest());
+    if (!object)
+        return 0;
+    auto& mesh = static_cast<MeshObject&>(*queryCast<Mesh>(object.get()));
+    expectPromises(mesh);
+    expectStored<QrBinaryStream>(mesh);
+    expectStored<QrTextStream>(mesh);
+    return 0;
+}

@@ -1,0 +1,29 @@
+// What a process that loads a component library answers: the library may have written it.
+#include "components/componentTools/probeAnswer.h"
+#include "fuzz/fuzz.h"
+
+namespace {
+
+using namespace Mz::Tools;
+
+/// The answer in the words of an honest process.
+std::string encoded(const ProbeAnswer& answer) {
+    std::string bytes = encodeStage(answer.stage);
+    if (answer.fault)
+        bytes += encodeFault(answer.fault->verdict, answer.fault->subject, answer.fault->words);
+    if (answer.description)
+        bytes += encodeDescription(*answer.description);
+    return bytes;
+}
+
+} // namespace
+
+int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
+    using namespace Mz;
+    const ProbeAnswer answer = decodeAnswer(Fuzz::Input(data, size).rest());
+    const std::string bytes = encoded(answer);
+    const ProbeAnswer again = decodeAnswer(bytes);
+    Fuzz::expect(!again.garbled, "what was understood can be said");
+    Fuzz::expectSame(encoded(again), bytes, "what is said is understood");
+    return 0;
+}

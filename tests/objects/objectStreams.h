@@ -1,0 +1,71 @@
+/// Whole objects on streams over bytes in memory.
+#pragma once
+
+#include "components/componentManager/binaryStream.h"
+#include "components/componentManager/componentImp.h"
+#include "components/componentManager/textStream.h"
+#include "components/objectIO/objectIO.h"
+#include "tests/objects/components/classes.h"
+
+#include <sstream>
+#include <string>
+#include <string_view>
+#include <utility>
+#include <vector>
+
+namespace Mz::Test {
+
+/// Writes objects to memory.
+template <class Stream>
+struct Saving {
+    std::string bytes() const { return sink.str(); }
+
+    std::ostringstream sink;
+    QrOutBuffer buffer{&sink};
+    QrObjectOutBuffer objects{&buffer};
+    Stream stream{&objects};
+};
+
+/// Reads objects from memory.
+template <class Stream>
+struct Loading {
+    explicit Loading(std::string_view bytes) : source(std::string(bytes)) {}
+
+    QrRef<QrCastable> object(const QrUid* id = nullptr) {
+        return stream.readObject(id, nullptr, nullptr);
+    }
+    QrPtr<Node> node() { return queryCast<Node>(object(&Node::uid).get()); }
+    void finish() {
+        QrPostLoadList list;
+        stream.transfer(list);
+        list.loadFinished();
+    }
+
+    std::istringstream source;
+    QrInBuffer buffer{&source};
+    QrObjectInBuffer objects{&buffer};
+    Stream stream{&objects};
+};
+
+/// What one object is as bytes.
+template <class Stream>
+std::string saved(const QrCastable* object) {
+    Saving<Stream> out;
+    out.stream << object;
+    return out.bytes();
+}
+
+/// Undoes the links among all nodes that can be reached: circles never end by themselves.
+inline void unlink(const QrPtr<Node>& start) {
+    std::vector<QrPtr<Node>> found{start};
+    while (!found.empty()) {
+        const QrPtr<Node> next = found.back();
+        found.pop_back();
+        if (!next)
+            continue;
+        const std::vector<QrPtr<Node>> links = std::exchange(next->links, {});
+        found.insert(found.end(), links.begin(), links.end());
+    }
+}
+
+} // namespace Mz::Test
