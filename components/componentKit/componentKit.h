@@ -12,6 +12,7 @@
 #include "components/componentManager/componentImp.h"
 #include "components/componentManager/importBuilder.h"
 
+#include <algorithm>
 #include <initializer_list>
 #include <memory>
 #include <type_traits>
@@ -81,6 +82,14 @@ class ObjectBuilder final
     using SelfDescribing<QrCastMulti<ObjectBuilder<Object>, QrBuilderDescription,
                                      QrComponentBuilder>>::SelfDescribing;
 
+    /// Nobody counts this reference, so nobody is asked for it.
+    QrRefPtr<QrComponentBuilder> getBuilder() override {
+        return QrRefPtr<QrComponentBuilder>::adopt(this);
+    }
+    QrCRefPtr<QrComponentBuilder> getBuilder() const override {
+        return QrCRefPtr<QrComponentBuilder>::adopt(this);
+    }
+
     QrRef<QrCastable> createObject() override {
         static_assert(!std::is_same_v<decltype(&Object::newReference), long (QrCastable::*)()>,
                       "the object is counted (QrCastRef), or nobody would ever delete it");
@@ -94,8 +103,9 @@ template <class Impl>
 class ImportBuilder : public Builder<Impl, QrImportBuilder> {
   public:
     /// `extensions` without dot or wildcard, kept as pointers like all texts.
-    ImportBuilder(const BuilderInfo& info, std::initializer_list<const wchar_t*> fileExtensions)
-        : Builder<Impl, QrImportBuilder>(info), extensions(fileExtensions) {}
+    ImportBuilder(const BuilderInfo& builderInfo,
+                  std::initializer_list<const wchar_t*> fileExtensions)
+        : Builder<Impl, QrImportBuilder>(builderInfo), extensions(fileExtensions) {}
 
     using QrImportBuilder::canImport;
     using QrImportBuilder::import;
@@ -122,12 +132,12 @@ class ImportBuilder : public Builder<Impl, QrImportBuilder> {
 template <class Impl, class Base>
 class BaseInterface {
   public:
-    static QrCastable* getInterface(Impl* object, const QrUid& uid) {
+    static QrCastable* getInterface(Impl* object, const QrUid& wanted) {
         static_assert(QrInterface<Base>, "the base has its own uid and Self");
-        return uid == Base::uid ? QrPtr<Base>(object).detach() : nullptr;
+        return wanted == Base::uid ? QrPtr<Base>(object).detach() : nullptr;
     }
 
-    static bool hasInterface(const Impl*, const QrUid& uid) { return uid == Base::uid; }
+    static bool hasInterface(const Impl*, const QrUid& wanted) { return wanted == Base::uid; }
 };
 
 /// How a library's description owns a builder: by a reference if the builder counts, else alone.
@@ -152,13 +162,16 @@ class Description final : public QrCastImpl<Description, QrComponentDescription>
     using Builders = std::vector<OwnedBuilder>;
 
     Description(const wchar_t* componentLabel, const wchar_t* componentText, Builders allBuilders)
-        : label(componentLabel), text(componentText), builders(std::move(allBuilders)) {}
-
-    QrRef<QrCastable> createBuilder(const QrUid& uid) override {
+        : label(componentLabel), text(componentText), builders(std::move(allBuilders)) {
         for (const OwnedBuilder& known : builders)
-            if (known->getUid() == uid)
-                return known->getBuilder();
-        return nullptr;
+            uids.push_back(known->getUid());
+    }
+
+    QrRef<QrCastable> createBuilder(const QrUid& wanted) override {
+        const auto known = std::find(uids.begin(), uids.end(), wanted);
+        if (known == uids.end())
+            return nullptr;
+        return builders[static_cast<std::size_t>(known - uids.begin())]->getBuilder();
     }
 
     int64 getComponentValue() override { return 0; }
@@ -177,6 +190,7 @@ class Description final : public QrCastImpl<Description, QrComponentDescription>
     const wchar_t* label;
     const wchar_t* text;
     Builders builders;
+    std::vector<QrUid> uids; ///< of the builders, each in its place
 };
 
 } // namespace Mz::Kit

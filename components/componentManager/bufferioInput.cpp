@@ -91,8 +91,10 @@ bool QrInBuffer::isBufferIgnored() const {
 }
 
 int QrInBuffer::read(void* data, int size) {
-    if (size < 1)
+    if (size < 1) {
+        throwIfBad(*in, __LINE__);
         return 0;
+    }
     auto* const bytes = static_cast<char*>(data);
     if (std::streambuf* const buffer = directBuffer(*in))
         return readDirectly(*in, *buffer, bytes, size);

@@ -18,13 +18,18 @@
 
 namespace Mz {
 
-/// Calls the object's own `newReference`. Where its class is final this is no virtual call, and
-/// where that class inherits the root's, which does nothing, it is none at all.
+/// Calls the object's own `newReference`; `view` is the object, too. Where its class is final this
+/// is no virtual call, and where that class inherits the root's, which does nothing, it is none at
+/// all.
 template <class Impl>
-void takeReference(Impl* object) {
-    using RootOperation = decltype(&QrCastable::newReference);
-    constexpr bool isRoots = std::is_same_v<decltype(&Impl::newReference), RootOperation>;
-    if constexpr (!std::is_final_v<Impl> || !isRoots)
+void takeReference(Impl* object, QrCastable* view) {
+    using RootOperation = long (QrCastable::*)();
+    constexpr bool isRoots = std::is_final_v<Impl> && requires {
+        requires std::is_same_v<decltype(&Impl::newReference), RootOperation>;
+    };
+    if constexpr (!requires { object->newReference(); })
+        view->newReference(); // The class keeps its own private, or has others of that name.
+    else if constexpr (!isRoots)
         object->newReference();
 }
 
@@ -40,22 +45,22 @@ class QrCastImpl : public Iface {
     const QrCastable* getCastable() const override { return this; }
     QrCastable* getCastable() override { return this; }
 
-    QrCastable* getInterface(const QrUid& uid) override {
-        if (uid == Iface::uid) {
-            takeReference(static_cast<Impl*>(this));
+    QrCastable* getInterface(const QrUid& wanted) override {
+        if (wanted == Iface::uid) {
+            takeReference(static_cast<Impl*>(this), this);
             return this;
         }
         if constexpr (continuesChain)
-            return Iface::getInterface(uid);
+            return Iface::getInterface(wanted);
         else
             return nullptr;
     }
 
-    bool hasInterface(const QrUid& uid) const override {
+    bool hasInterface(const QrUid& wanted) const override {
         if constexpr (continuesChain)
-            return Iface::hasInterface(uid);
+            return Iface::hasInterface(wanted);
         else
-            return uid == Iface::uid;
+            return wanted == Iface::uid;
     }
 
     void destroy() override {}
@@ -73,16 +78,16 @@ class QrCastHierarchy : public Iface {
     using Iface::Iface;
     using CastChainLink = Next;
 
-    QrCastable* getInterface(const QrUid& uid) override {
-        if (uid == Iface::uid) {
+    QrCastable* getInterface(const QrUid& wanted) override {
+        if (wanted == Iface::uid) {
             this->newReference();
             return this;
         }
-        return Next::getInterface(static_cast<Impl*>(this), uid);
+        return Next::getInterface(static_cast<Impl*>(this), wanted);
     }
 
-    bool hasInterface(const QrUid& uid) const override {
-        return uid == Iface::uid || Next::hasInterface(static_cast<const Impl*>(this), uid);
+    bool hasInterface(const QrUid& wanted) const override {
+        return wanted == Iface::uid || Next::hasInterface(static_cast<const Impl*>(this), wanted);
     }
 };
 
@@ -99,13 +104,13 @@ class QrCastImpl2 : public QrCastImpl<Impl, QrCastHierarchy<Impl, Iface, Next, A
 template <class Owner, class Temp>
 class QrTempIface {
   public:
-    static QrCastable* getInterface(Owner* owner, const QrUid& uid) {
-        if (!(uid == Temp::uid))
+    static QrCastable* getInterface(Owner* owner, const QrUid& wanted) {
+        if (!(wanted == Temp::uid))
             return nullptr;
         return QrPtr<Temp>(new Temp(owner)).detach();
     }
 
-    static bool hasInterface(const Owner*, const QrUid& uid) { return uid == Temp::uid; }
+    static bool hasInterface(const Owner*, const QrUid& wanted) { return wanted == Temp::uid; }
 };
 
 /// An object that answers for several interfaces at once. Each interface has an address of its own;
@@ -118,16 +123,16 @@ class QrCastMulti : public First, public Rest... {
     const QrCastable* getCastable() const override { return static_cast<const First*>(this); }
     QrCastable* getCastable() override { return static_cast<First*>(this); }
 
-    QrCastable* getInterface(const QrUid& uid) override {
+    QrCastable* getInterface(const QrUid& wanted) override {
         QrCastable* view = nullptr;
-        static_cast<void>(viewAs<First>(uid, view) || (viewAs<Rest>(uid, view) || ...));
+        static_cast<void>(viewAs<First>(wanted, view) || (viewAs<Rest>(wanted, view) || ...));
         if (view)
-            takeReference(static_cast<Impl*>(this));
+            takeReference(static_cast<Impl*>(this), view);
         return view;
     }
 
-    bool hasInterface(const QrUid& uid) const override {
-        return uid == First::uid || ((uid == Rest::uid) || ...);
+    bool hasInterface(const QrUid& wanted) const override {
+        return wanted == First::uid || ((wanted == Rest::uid) || ...);
     }
 
     void destroy() override {}
@@ -138,8 +143,8 @@ class QrCastMulti : public First, public Rest... {
 
   private:
     template <class Iface>
-    bool viewAs(const QrUid& uid, QrCastable*& view) {
-        if (uid == Iface::uid)
+    bool viewAs(const QrUid& wanted, QrCastable*& view) {
+        if (wanted == Iface::uid)
             view = static_cast<Iface*>(this);
         return view != nullptr;
     }
@@ -175,11 +180,15 @@ class QrCastRef : public Base {
         // The object, and the counter in it, may be gone when this function returns.
         const long left = --references;
         if (left < 0)
-            delete this;
+            dispose(this);
         return left;
     }
 
   private:
+    /// Apart, because compilers that look through it warn of uses behind a deletion that the count
+    /// rules out.
+    [[gnu::noinline]] static void dispose(QrCastRef* object) { delete object; }
+
     /// The number of references minus one.
     LkCounterWindows<long> references{-1};
 };
@@ -206,15 +215,17 @@ class QrTempObject : public Base {
     }
     QrCastable* getCastable() override { return ownerReference->getCastable(); }
 
-    QrCastable* getInterface(const QrUid& uid) override {
-        if (uid == Base::uid) {
+    QrCastable* getInterface(const QrUid& wanted) override {
+        if (wanted == Base::uid) {
             this->newReference();
             return this;
         }
-        return ownerReference->getInterface(uid);
+        return ownerReference->getInterface(wanted);
     }
 
-    bool hasInterface(const QrUid& uid) const override { return ownerReference->hasInterface(uid); }
+    bool hasInterface(const QrUid& wanted) const override {
+        return ownerReference->hasInterface(wanted);
+    }
 
     void destroy() override {
         const QrPtr<Owner> kept = ownerReference;

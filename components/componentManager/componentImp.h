@@ -185,3 +185,7 @@ MZ_COMPONENT_MANAGER_API Mz::QrComponentManager* QrGetComponentManager();
 /// another process may record yours alone.
 using QrGetComponentDescriptionFunction = Mz::QrCastable*();
 }
+
+namespace Mz {
+using ::QrGetComponentManager;
+} // namespace Mz

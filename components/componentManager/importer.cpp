@@ -145,11 +145,20 @@ class ImportEnumerator final : public BaseImportEnumerator {
     }
 
     void returnTo(int64 position) {
+        if (seeks(position))
+            return;
         // A block read that met the end of input leaves a state in which nothing can be sought;
         // reading a single byte ends that state.
-        if (io.tell() == -1)
-            io.read();
+        io.read();
         io.seek(position, 0);
+    }
+
+    bool seeks(int64 position) {
+        try {
+            return io.seek(position, 0) != -1;
+        } catch (const QrStreamEx::ExReadError&) {
+            return false;
+        }
     }
 
     QrBufferedIO& io;

@@ -107,3 +107,11 @@ MZ_COMPONENT_MANAGER_API Mz::QrProcessControl* QrGetThreadProcessController();
 /// Sets or replaces the calling thread's own controller; null takes it out.
 MZ_COMPONENT_MANAGER_API void QrSetThreadProcessController(Mz::QrProcessControl* controller);
 }
+
+namespace Mz {
+using ::QrGetProcessController;
+using ::QrGetSystemProcessController;
+using ::QrGetThreadProcessController;
+using ::QrSetSystemProcessController;
+using ::QrSetThreadProcessController;
+} // namespace Mz

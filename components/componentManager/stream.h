@@ -159,6 +159,8 @@ class MZ_COMPONENT_MANAGER_API QrStream {
     /// Any other pointer would be written as a `bool`.
     template <class P>
     requires(!std::is_convertible_v<P*, const QrCastable*>) QrStream& operator<<(P*) = delete;
+    template <class C, class M>
+    QrStream& operator<<(M C::*) = delete;
 
   protected:
     /// Takes a reference on the `QrBufferedIO` of `io`. Throws `QrComponentManagerEx::ExBadCast`

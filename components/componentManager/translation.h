@@ -53,3 +53,9 @@ MZ_COMPONENT_MANAGER_API void QrAddTranslation(Mz::QrCastable* object, Mz::QrCas
 MZ_COMPONENT_MANAGER_API void QrRemoveTranslation(Mz::QrCastable* object,
                                                   Mz::QrCastable* translator);
 }
+
+namespace Mz {
+using ::QrAddTranslation;
+using ::QrRemoveTranslation;
+using ::QrTranslateInterface;
+} // namespace Mz

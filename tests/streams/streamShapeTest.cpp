@@ -109,7 +109,8 @@ template <class Stream>
 constexpr bool refusesOtherPointers =
     !CanWrite<Stream, const wchar_t*> && !CanWrite<Stream, const char*> &&
     !CanWrite<Stream, int*> && !CanWrite<Stream, void*> && !CanWrite<Stream, Unrelated*> &&
-    !CanWrite<Stream, std::wstring*>;
+    !CanWrite<Stream, std::wstring*> && !CanWrite<Stream, void (*)()> &&
+    !CanWrite<Stream, int Unrelated::*> && !CanWrite<Stream, int (Unrelated::*)()>;
 
 static_assert(refusesOtherPointers<QrStream>);
 static_assert(refusesOtherPointers<QrBinaryStream>);

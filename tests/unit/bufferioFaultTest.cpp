@@ -133,6 +133,19 @@ TEST(FaultyInput, RaisesTheStatedExceptionAndNothingElse) {
     });
 }
 
+TEST(FaultyInput, IsNoticedByAReadOfNothing) {
+    for (const int size : {0, -1}) {
+        std::istringstream stream("abc");
+        QrInBuffer in(&stream);
+        char byte = 'x';
+        EXPECT_EQ(in.read(&byte, size), 0);
+        stream.setstate(std::ios::badbit);
+        EXPECT_THROW(in.read(&byte, size), QrStreamEx::ExReadError);
+        EXPECT_EQ(byte, 'x');
+        EXPECT_EQ(stream.rdstate(), std::ios::badbit);
+    }
+}
+
 TEST(FaultyInput, RaisesTheStatedExceptionAlsoFromTheMiddle) {
     underEveryCircumstance([](const Circumstances& circumstances) {
         for (const Operation& operation : inputOperations()) {

@@ -389,6 +389,56 @@ TEST_F(Importer, RestoresThePositionBetweenBuilders) {
     EXPECT_EQ(io.tell(), 3) << "not restored after the import";
 }
 
+/// Tells of what moves it, and refuses the first seeks to a position.
+class Positioned final : public QrInBuffer {
+  public:
+    Positioned(std::istream* stream, Calls& log, int refusals)
+        : QrInBuffer(stream), log(log), refusals(refusals) {}
+
+    int64 seek(int64 offset, int origin) override {
+        log.push_back(L"seek " + std::to_wstring(offset) + L" " + std::to_wstring(origin));
+        if (origin == 0 && refusals-- > 0)
+            throw QrStreamEx::ExReadError("tests/unit/importerTest", __LINE__);
+        return QrInBuffer::seek(offset, origin);
+    }
+    int64 tell() const override {
+        log.emplace_back(L"tell");
+        return QrInBuffer::tell();
+    }
+    int read() override {
+        log.emplace_back(L"read");
+        return QrInBuffer::read();
+    }
+
+  private:
+    Calls& log;
+    int refusals;
+};
+
+TEST_F(Importer, AsksAnIOForNothingButItsPositions) {
+    add(L"A", {});
+    for (const int refusals : {0, 1}) {
+        std::istringstream stream("content");
+        stream.seekg(3);
+        Calls log;
+        Positioned io(&stream, log, refusals);
+        EXPECT_FALSE(importer.import(QrPtr<QrBufferedIO>(&io), nullptr, nullptr));
+        Calls expected{L"seek 0 1", L"tell", L"seek 3 0", L"tell"};
+        if (refusals)
+            expected = {L"seek 0 1", L"tell", L"seek 3 0", L"read", L"seek 3 0", L"tell"};
+        EXPECT_EQ(log, expected);
+    }
+}
+
+TEST_F(Importer, PassesOnThatAPositionIsLost) {
+    add(L"A", {});
+    std::istringstream stream("content");
+    Calls log;
+    Positioned io(&stream, log, 2);
+    EXPECT_THROW(importer.import(QrPtr<QrBufferedIO>(&io), nullptr, nullptr),
+                 QrStreamEx::ExReadError);
+}
+
 TEST_F(Importer, RestoresThePositionBeforeTheSameBuildersImport) {
     char block[100];
     TestImportBuilder& builder = add(L"A", {});
