@@ -176,19 +176,17 @@ class QrCastRef : public Base {
 
     long newReference() override { return ++references; }
 
-    long release() override {
+    /// Not inlined: compilers that look through it warn of uses behind a deletion that the count
+    /// rules out.
+    [[gnu::noinline]] long release() override {
         // The object, and the counter in it, may be gone when this function returns.
         const long left = --references;
         if (left < 0)
-            dispose(this);
+            delete this;
         return left;
     }
 
   private:
-    /// Apart, because compilers that look through it warn of uses behind a deletion that the count
-    /// rules out.
-    [[gnu::noinline]] static void dispose(QrCastRef* object) { delete object; }
-
     /// The number of references minus one.
     LkCounterWindows<long> references{-1};
 };
