@@ -2,31 +2,17 @@
 /// it cannot know who watches: both must come to the same.
 #pragma once
 
-#include "components/componentManager/stream.h"
 #include "fuzz/fuzz.h"
+#include "tests/streams/streamKinds.h"
 
 #include <iterator>
 #include <sstream>
 
 namespace Mz::Fuzz {
 
-/// The base by itself: single values are text, counted ones are binary.
-class BaseStream final : public QrStream {
-  public:
-    explicit BaseStream(QrCastable* io) : QrStream(io) {}
-};
-
-/// A buffer that is none of the standard library's own.
-class WatchedBuffer final : public std::stringbuf {
-  public:
-    using std::stringbuf::stringbuf;
-};
-
-/// An IO of which the library cannot know what it does.
-class ForeignInput final : public QrInBuffer {
-  public:
-    using QrInBuffer::QrInBuffer;
-};
+using Test::BaseStream;
+using Test::ForeignInput;
+using Test::WatchedBuffer;
 
 /// All that can be seen of `work` on a stream: what it tells, what is left unread, and the state.
 template <class Stream, class Buffer, class IO, class Work>

@@ -23,18 +23,7 @@ using Mz::QrBinaryStream;
 using Mz::QrStream;
 using Mz::QrTextStream;
 
-/// A buffer that is none of the standard library's own: every call might be watched.
-class WatchedBuffer final : public std::stringbuf {
-  public:
-    using std::stringbuf::stringbuf;
-};
-
-/// IOs of which the library cannot know what they do.
-class ForeignInput final : public Mz::QrInBuffer {
-  public:
-    using Mz::QrInBuffer::QrInBuffer;
-};
-
+/// An output of which the library cannot know what it does.
 class ForeignOutput final : public Mz::QrOutBuffer {
   public:
     using Mz::QrOutBuffer::QrOutBuffer;

@@ -1,9 +1,10 @@
-/// What the tests of the streams share: bytes to read from and to write to, and the base stream.
+/// What the tests of the streams share: bytes to read from and to write to.
 #pragma once
 
 #include "components/componentManager/binaryStream.h"
 #include "components/componentManager/stream.h"
 #include "components/componentManager/textStream.h"
+#include "tests/streams/streamKinds.h"
 
 #include <iterator>
 #include <ostream>
@@ -12,12 +13,6 @@
 #include <string_view>
 
 namespace Mz::Test {
-
-/// The base by itself: single values are text, counted ones are binary.
-class BaseStream final : public QrStream {
-  public:
-    explicit BaseStream(QrCastable* io) : QrStream(io) {}
-};
 
 /// A stream of the kind `Stream` that reads the given bytes.
 template <class Stream>
