@@ -14,6 +14,7 @@
 #include <locale.h>
 #include <memory>
 #include <pthread.h>
+#include <span>
 #include <sys/stat.h>
 #include <unistd.h>
 
@@ -85,31 +86,45 @@ void sortByName(std::vector<DirectoryEntry>& entries) {
     entries.swap(sorted);
 }
 
-/// What `isCodeOf` looks for among the loaded libraries.
-struct CodeSearch {
+/// The segments of a loaded library, as its file describes them.
+using Segments = std::span<const ElfW(Phdr)>;
+
+/// What `walkToSegments` looks for among the loaded libraries.
+struct SegmentSearch {
     ElfW(Addr) base;
     ElfW(Addr) dynamic; ///< its dynamic section, which tells it from others with the same base
-    ElfW(Addr) address;
-    bool found;
+    Segments found;
 };
 
 /// Looks at one loaded library; not zero ends the walk.
-int lookForCode(dl_phdr_info* library, std::size_t, void* data) {
-    auto& search = *static_cast<CodeSearch*>(data);
+int lookForSegments(dl_phdr_info* library, std::size_t, void* data) {
+    auto& search = *static_cast<SegmentSearch*>(data);
     if (library->dlpi_addr != search.base)
         return 0;
-    bool sought = false;
-    bool found = false;
-    for (std::size_t index = 0; index < library->dlpi_phnum; ++index) {
-        const ElfW(Phdr)& segment = library->dlpi_phdr[index];
-        if (segment.p_type == PT_DYNAMIC)
-            sought = search.base + segment.p_vaddr == search.dynamic;
-        else if (segment.p_type == PT_LOAD && (segment.p_flags & PF_X) &&
-                 search.address - search.base - segment.p_vaddr < segment.p_memsz)
-            found = true;
-    }
-    search.found = sought && found;
-    return sought ? 1 : 0;
+    const Segments segments(library->dlpi_phdr, library->dlpi_phnum);
+    for (const ElfW(Phdr) & segment : segments)
+        if (segment.p_type == PT_DYNAMIC && search.base + segment.p_vaddr == search.dynamic)
+            search.found = segments;
+    return search.found.empty() ? 0 : 1;
+}
+
+/// The segments of `library`, found among those of all loaded libraries.
+Segments walkToSegments(const link_map& library) {
+    SegmentSearch search{library.l_addr, reinterpret_cast<ElfW(Addr)>(library.l_ld), {}};
+    ::dl_iterate_phdr(lookForSegments, &search);
+    return search.found;
+}
+
+Segments segmentsOf(Module module, const link_map& library) {
+    // RTLD_DI_PHDR, which younger C libraries know: with a walk over all libraries for each of them
+    // the time of a start would grow with the square of their number.
+    constexpr int programHeaders = 11;
+    const ElfW(Phdr)* first = nullptr;
+    const int count = ::dlinfo(module, programHeaders, &first);
+    if (count > 0 && first)
+        return {first, static_cast<std::size_t>(count)};
+    ::dlerror(); // The message belongs to nobody.
+    return walkToSegments(library);
 }
 
 /// Whether the address lies in the code of that very library: neither in one that it depends on,
@@ -118,10 +133,12 @@ bool isCodeOf(Module module, void* address) {
     link_map* library = nullptr;
     if (::dlinfo(module, RTLD_DI_LINKMAP, &library) != 0)
         return false;
-    CodeSearch search{library->l_addr, reinterpret_cast<ElfW(Addr)>(library->l_ld),
-                      reinterpret_cast<ElfW(Addr)>(address), false};
-    ::dl_iterate_phdr(lookForCode, &search);
-    return search.found;
+    const ElfW(Addr) inside = reinterpret_cast<ElfW(Addr)>(address) - library->l_addr;
+    for (const ElfW(Phdr) & segment : segmentsOf(module, *library))
+        if (segment.p_type == PT_LOAD && (segment.p_flags & PF_X) &&
+            inside - segment.p_vaddr < segment.p_memsz)
+            return true;
+    return false;
 }
 
 /// How many libraries the process has ever mapped.
