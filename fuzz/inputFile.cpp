@@ -8,7 +8,8 @@ namespace Mz::Fuzz {
 InputFile::InputFile(std::string_view content) {
     // One for the process: making a folder for each input would take most of the time.
     static const Test::TemporaryDirectory folder;
-    name = folder.write("input", content);
+    static int count = 0;
+    name = folder.write("input" + std::to_string(++count), content);
 }
 
 InputFile::~InputFile() {

@@ -29,10 +29,17 @@ std::string written(const Tools::RecordedLibraries& libraries) {
     return sink.str();
 }
 
+void expectSameBuilder(const Tools::RecordedBuilder& a, const ComponentManager::Builder& b) {
+    Fuzz::expect(a.uid == b.uid && a.number == b.number && a.flag == b.flag, "the same values");
+    Fuzz::expect(a.name == b.name && a.label == b.label && a.text == b.text, "the same texts");
+}
+
 void expectSameRecord(const Tools::RecordedLibrary& a, const ComponentLibrary& b) {
     Fuzz::expect(a.directory == b.directory && a.fileName == b.fileName, "the same names");
     Fuzz::expect(a.time == b.fileTime && a.size == b.fileSize, "the same time and size");
     Fuzz::expect(a.builders.size() == b.builders.size(), "as many builders");
+    for (std::size_t index = 0; index < a.builders.size(); ++index)
+        expectSameBuilder(a.builders[index], b.builders[index]);
 }
 
 } // namespace

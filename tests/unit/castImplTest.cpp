@@ -134,6 +134,55 @@ TEST(FinalClass, TakesTheReferenceOfAnAnswerLikeAnyOther) {
 }
 
 /// A class behind the one that the template was told of may count where that one does not.
+/// Counts, and lets nobody do so but through an interface.
+class PrivateGauge : public QrCastImpl<PrivateGauge, Gauge> {
+  public:
+    int value() const override { return taken; }
+
+  private:
+    long newReference() override { return ++taken; }
+
+    int taken = 0;
+};
+
+class PrivateMulti final : public QrCastMulti<PrivateMulti, Gauge, Dial> {
+  public:
+    int value() const override { return taken; }
+    int mark() const override { return taken; }
+
+  private:
+    long newReference() override { return ++taken; }
+
+    int taken = 0;
+};
+
+/// Has another operation of the name, which hides the one that counts.
+class AmbiguousGauge final : public QrCastImpl<AmbiguousGauge, Gauge> {
+  public:
+    int value() const override { return taken; }
+    long newReference() override { return ++taken; }
+    long newReference(int count) { return taken += count; }
+
+  private:
+    int taken = 0;
+};
+
+TEST(PrivateCounting, IsAskedForEachAnswerAndNoOther) {
+    const auto takenOf = [](auto& object, const QrUid& uid) {
+        QrCastable* const principal = object.getCastable();
+        EXPECT_NE(principal->getInterface(uid), nullptr);
+        EXPECT_EQ(principal->getInterface(rootUid), nullptr);
+        return object.value();
+    };
+    PrivateGauge gauge;
+    EXPECT_EQ(takenOf(gauge, Gauge::uid), 1);
+    PrivateMulti multi;
+    EXPECT_EQ(takenOf(multi, Gauge::uid), 1);
+    EXPECT_EQ(takenOf(multi, Dial::uid), 2);
+    AmbiguousGauge ambiguous;
+    EXPECT_EQ(takenOf(ambiguous, Gauge::uid), 1);
+}
+
 class CountingBehind : public PlainGauge {
   public:
     long newReference() override { return ++references; }

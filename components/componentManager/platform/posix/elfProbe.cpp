@@ -111,8 +111,8 @@ struct DynamicTables {
     std::uint64_t stringsSize = 0;
     std::uint64_t gnuHash = 0;
     std::uint64_t hash = 0;
-    std::uint64_t lastName =
-        0;                ///< of the names in the string table that the loader takes, the last
+    /// The highest of the positions in the string table at which the loader takes names.
+    std::uint64_t lastName = 0;
     bool program = false; ///< position-independent, but to be started and not to be loaded
 };
 
