@@ -13,6 +13,9 @@ set(CMAKE_RUNTIME_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/bin)
 set(CMAKE_LIBRARY_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/lib)
 set(CMAKE_ARCHIVE_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/lib)
 
+# Tests of what libMZcomponentManager hides, and the form of the library that they link.
+set(MZ_INTERNALS_FOLDER ${CMAKE_BINARY_DIR}/internals)
+
 include(CheckCXXCompilerFlag)
 check_cxx_compiler_flag(-fno-gnu-unique MZ_HAS_NO_GNU_UNIQUE)
 check_cxx_compiler_flag(-fno-semantic-interposition MZ_HAS_NO_SEMANTIC_INTERPOSITION)
@@ -41,23 +44,37 @@ if(MZ_SANITIZE)
   target_link_options(mzCompile INTERFACE -fsanitize=address,undefined)
 endif()
 
-# mz_add_library(NAME MACRO sources...): a shared library of the family, lib<NAME> on every platform.
-function(mz_add_library name macro)
+# mz_copy_file(TARGET FILE FOLDER): copies FILE whenever TARGET has been built.
+function(mz_copy_file target file folder)
+  add_custom_command(TARGET ${target} POST_BUILD
+    COMMAND ${CMAKE_COMMAND} -E make_directory ${folder}
+    COMMAND ${CMAKE_COMMAND} -E copy_if_different ${file} ${folder})
+endfunction()
+
+# mz_make_library(NAME MACRO FOLDER sources...): a shared library in FOLDER, lib<NAME> on every
+# platform.
+function(mz_make_library name macro folder)
   add_library(${name} SHARED ${ARGN})
-  add_library(Mz::${name} ALIAS ${name})
   target_compile_features(${name} PUBLIC cxx_std_20)
   target_link_libraries(${name} PRIVATE $<BUILD_INTERFACE:mzCompile>)
   target_compile_definitions(${name} PRIVATE ${macro})
   target_include_directories(${name} PUBLIC
     $<BUILD_INTERFACE:${PROJECT_SOURCE_DIR}> $<INSTALL_INTERFACE:include>)
+  set_target_properties(${name} PROPERTIES PREFIX lib
+    LIBRARY_OUTPUT_DIRECTORY ${folder}
+    RUNTIME_OUTPUT_DIRECTORY ${folder}
+    ARCHIVE_OUTPUT_DIRECTORY ${folder})
+endfunction()
+
+# mz_add_library(NAME MACRO sources...): a shared library of the family.
+function(mz_add_library name macro)
+  mz_make_library(${name} ${macro} ${CMAKE_BINARY_DIR}/lib ${ARGN})
+  add_library(Mz::${name} ALIAS ${name})
   # The libraries of the family find one another wherever they are installed together.
-  set_target_properties(${name} PROPERTIES PREFIX lib INSTALL_RPATH "$ORIGIN")
+  set_target_properties(${name} PROPERTIES INSTALL_RPATH "$ORIGIN")
   if(WIN32)
-    # Programs find a library beside themselves; it is wanted in lib as well, as on every platform.
-    set_target_properties(${name} PROPERTIES RUNTIME_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/lib)
-    add_custom_command(TARGET ${name} POST_BUILD
-      COMMAND ${CMAKE_COMMAND} -E make_directory ${CMAKE_BINARY_DIR}/bin
-      COMMAND ${CMAKE_COMMAND} -E copy_if_different $<TARGET_FILE:${name}> ${CMAKE_BINARY_DIR}/bin)
+    # Programs find a library beside themselves.
+    mz_copy_file(${name} $<TARGET_FILE:${name}> ${CMAKE_BINARY_DIR}/bin)
   endif()
 endfunction()
 

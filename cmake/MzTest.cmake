@@ -38,15 +38,33 @@ if(WIN32)
   set(MZ_SOURCE_PATH Z:${PROJECT_SOURCE_DIR})
 endif()
 
-# mz_add_test_program(NAME sources...): a program of tests, without entries for ctest.
+# mz_add_test_program(NAME [INTERNALS] sources...): a program of tests, without entries for ctest.
+# With INTERNALS it reaches the classes that libMZcomponentManager hides.
 function(mz_add_test_program name)
-  add_executable(${name} ${ARGN})
+  cmake_parse_arguments(PARSE_ARGV 1 arg "INTERNALS" "" "")
+  add_executable(${name} ${arg_UNPARSED_ARGUMENTS})
+  if(arg_INTERNALS)
+    mz_use_internals(${name})
+  endif()
   target_link_libraries(${name} PRIVATE Mz::MZcomponentManager mzCompile mzTestCode mzTestSupport
     GTest::gmock)
 endfunction()
 
-# mz_add_tests(NAME sources...): a program of tests, each of which is an entry for ctest and runs in
-# a process of its own.
+# mz_use_internals(PROGRAM): links the form of libMZcomponentManager that hides nothing. To be
+# called before anything else is linked: the first library with a name is the one that is used.
+function(mz_use_internals program)
+  target_link_libraries(${program} PRIVATE mzManagerForTests)
+  set_target_properties(${program} PROPERTIES RUNTIME_OUTPUT_DIRECTORY ${MZ_INTERNALS_FOLDER})
+  if(WIN32)
+    # The program finds the libraries beside itself.
+    add_custom_command(TARGET ${program} PRE_LINK
+      COMMAND ${CMAKE_COMMAND} -D from=${CMAKE_BINARY_DIR}/bin -D to=${MZ_INTERNALS_FOLDER}
+        -P ${PROJECT_SOURCE_DIR}/cmake/copyLibraries.cmake)
+  endif()
+endfunction()
+
+# mz_add_tests(NAME [INTERNALS] sources...): a program of tests, each of which is an entry for ctest
+# and runs in a process of its own.
 function(mz_add_tests name)
   mz_add_test_program(${name} ${ARGN})
   target_link_libraries(${name} PRIVATE GTest::gtest_main)

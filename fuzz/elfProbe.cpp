@@ -1,7 +1,7 @@
 // Files as the component manager looks at them before it loads one. Two readers of the same format,
 // written apart, see to each other.
-#include "components/componentManager/platform/platform.h"
 #include "components/componentTools/libraryImage.h"
+#include "components/platform/platform.h"
 #include "fuzz/fuzz.h"
 
 int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {

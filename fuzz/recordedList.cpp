@@ -1,7 +1,7 @@
 // The recorded list, as the tools read it from a file and as a manager reads it from a stream.
 #include "components/componentTools/recordedList.h"
 #include "components/componentManager/binaryStream.h"
-#include "components/componentManager/componentImpPrivate.h"
+#include "components/componentManager/manager/componentImpPrivate.h"
 #include "components/componentManager/textStream.h"
 #include "fuzz/fuzz.h"
 

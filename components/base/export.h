@@ -1,10 +1,10 @@
-/// How symbols enter and leave the shared libraries: the one header outside the platform layer
-/// that has to know the object format.
+/// Export and import markers of the shared libraries. This header and the platform layer are the
+/// only places that know the object format.
 ///
-/// Everything is compiled with hidden visibility; what a library offers is marked with its own
-/// macro (`MZ_BASE_API`, `MZ_COMPONENT_MANAGER_API`), which exports while that library itself is
-/// built and imports for everybody else. `MZ_EXPORT` marks what a library always exports: the entry
-/// point of a component library.
+/// Everything is compiled with hidden visibility. Each library has an `export.h` with a macro for
+/// its public names (`MZ_BASE_API`, `MZ_COMPONENT_MANAGER_API`, ...), which exports while that
+/// library is compiled and imports elsewhere. `MZ_EXPORT` always exports: the entry point of a
+/// component library needs it.
 #pragma once
 
 #ifdef _WIN32
@@ -23,10 +23,4 @@
 #define MZ_BASE_API MZ_EXPORT
 #else
 #define MZ_BASE_API MZ_IMPORT
-#endif
-
-#ifdef MZ_BUILDING_COMPONENT_MANAGER
-#define MZ_COMPONENT_MANAGER_API MZ_EXPORT
-#else
-#define MZ_COMPONENT_MANAGER_API MZ_IMPORT
 #endif

@@ -3,6 +3,7 @@
 #pragma once
 
 #include "components/componentManager/cast.h"
+#include "components/componentManager/export.h"
 
 #include <iosfwd>
 

@@ -1,7 +1,7 @@
 /// The root of every object that crosses a library's border, and the casts between interfaces.
 #pragma once
 
-#include "components/base/export.h"
+#include "components/componentManager/export.h"
 #include "components/componentManager/reference.h"
 #include "components/componentManager/translation.h"
 #include "components/componentManager/uid.h"

@@ -1,4 +1,4 @@
-#include "components/componentManager/componentImpPrivate.h"
+#include "components/componentManager/manager/componentImpPrivate.h"
 
 namespace Mz {
 

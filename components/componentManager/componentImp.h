@@ -8,6 +8,7 @@
 
 #include "components/componentManager/cast.h"
 #include "components/componentManager/enumerator.h"
+#include "components/componentManager/export.h"
 
 namespace Mz {
 

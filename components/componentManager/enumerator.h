@@ -10,7 +10,7 @@
 /// Everything runs on the caller's thread, and exceptions of `process` pass through.
 #pragma once
 
-#include "components/base/export.h"
+#include "components/componentManager/export.h"
 
 namespace Mz {
 

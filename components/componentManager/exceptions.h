@@ -11,6 +11,7 @@
 #pragma once
 
 #include "components/base/exBase.h"
+#include "components/componentManager/export.h"
 
 #include <new>
 #include <stdexcept>

@@ -1,6 +1,6 @@
 #include "components/componentManager/importBuilder.h"
 
-#include "components/componentManager/inputFile.h"
+#include "components/componentManager/importing/inputFile.h"
 
 namespace Mz {
 

@@ -3,6 +3,7 @@
 
 #include "components/componentManager/bufferio.h"
 #include "components/componentManager/enumerator.h"
+#include "components/componentManager/export.h"
 
 namespace Mz {
 

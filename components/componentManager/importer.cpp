@@ -1,7 +1,7 @@
 #include "components/componentManager/importer.h"
 
 #include "components/componentManager/componentImp.h"
-#include "components/componentManager/inputFile.h"
+#include "components/componentManager/importing/inputFile.h"
 #include "components/componentManager/processControl.h"
 
 namespace Mz {

@@ -1,6 +1,7 @@
 /// Importing a file through whichever builder can read it.
 #pragma once
 
+#include "components/componentManager/export.h"
 #include "components/componentManager/importBuilder.h"
 
 #include <string>

@@ -2,6 +2,7 @@
 #pragma once
 
 #include "components/componentManager/cast.h"
+#include "components/componentManager/export.h"
 
 #include <memory>
 

@@ -1,9 +1,9 @@
 #include "components/componentManager/processControl.h"
 
 #include "components/base/assertions.h"
-#include "components/componentManager/neverDestroyed.h"
-#include "components/componentManager/platform/platform.h"
-#include "components/componentManager/systemController.h"
+#include "components/componentManager/control/systemController.h"
+#include "components/componentManager/support/noDestructor.h"
+#include "components/platform/platform.h"
 
 #include <algorithm>
 #include <iostream>
@@ -112,7 +112,7 @@ class DefaultSystemController final
     static void writeLine(const wchar_t* text) { std::cerr << address(text) << std::endl; }
 };
 
-constinit NeverDestroyed<DefaultSystemController> defaultController;
+constinit NoDestructor<DefaultSystemController> defaultController;
 
 } // namespace
 

@@ -7,6 +7,7 @@
 #pragma once
 
 #include "components/componentManager/cast.h"
+#include "components/componentManager/export.h"
 
 #include <string>
 

@@ -1,7 +1,7 @@
 /// The smart references to castable objects.
 #pragma once
 
-#include "components/base/export.h"
+#include "components/componentManager/export.h"
 
 #include <cstddef>
 #include <type_traits>

@@ -1,10 +1,10 @@
 #include "components/componentManager/stream.h"
 
-#include "components/componentManager/directBuffer.h"
-#include "components/componentManager/formatText.h"
-#include "components/componentManager/numberText.h"
-#include "components/componentManager/numericLocale.h"
-#include "components/componentManager/scanText.h"
+#include "components/componentManager/buffers/directBuffer.h"
+#include "components/componentManager/text/formatText.h"
+#include "components/componentManager/text/numberText.h"
+#include "components/componentManager/text/numericLocale.h"
+#include "components/componentManager/text/scanText.h"
 
 #include <algorithm>
 #include <cstdint>

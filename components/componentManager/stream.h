@@ -2,6 +2,7 @@
 #pragma once
 
 #include "components/componentManager/bufferio.h"
+#include "components/componentManager/export.h"
 #include "components/componentManager/persistant.h"
 
 #include <string>

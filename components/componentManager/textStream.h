@@ -1,6 +1,7 @@
 /// The stream whose data is text throughout.
 #pragma once
 
+#include "components/componentManager/export.h"
 #include "components/componentManager/stream.h"
 
 namespace Mz {

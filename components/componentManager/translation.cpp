@@ -1,8 +1,8 @@
 #include "components/componentManager/translation.h"
 
 #include "components/componentManager/cast.h"
-#include "components/componentManager/hashMap.h"
-#include "components/componentManager/neverDestroyed.h"
+#include "components/componentManager/support/hashMap.h"
+#include "components/componentManager/support/noDestructor.h"
 
 #include <atomic>
 #include <cstddef>
@@ -26,7 +26,7 @@ struct AddressHash {
 
 /// By translated object, which is only an address here. An object that once had translations keeps
 /// its place, empty.
-constinit NeverDestroyed<HashMap<QrCastable*, std::vector<Translation>, AddressHash>> registry;
+constinit NoDestructor<HashMap<QrCastable*, std::vector<Translation>, AddressHash>> registry;
 
 } // namespace
 

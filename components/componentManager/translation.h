@@ -14,7 +14,7 @@
 /// adding, `std::bad_alloc` (then nothing was added).
 #pragma once
 
-#include "components/base/export.h"
+#include "components/componentManager/export.h"
 #include "components/componentManager/uid.h"
 
 #include <atomic>

@@ -1,9 +1,9 @@
 #include "components/componentTools/discovery.h"
 
-#include "components/componentManager/pathNormaliser.h"
-#include "components/componentManager/platform/platform.h"
 #include "components/componentTools/platform/system.h"
 #include "components/componentTools/recordedList.h"
+#include "components/platform/pathNormaliser.h"
+#include "components/platform/platform.h"
 
 #include <map>
 #include <system_error>

@@ -1,8 +1,8 @@
 #include "components/componentTools/explain.h"
 
-#include "components/componentManager/platform/platform.h"
 #include "components/componentTools/discovery.h"
 #include "components/componentTools/inspection.h"
+#include "components/platform/platform.h"
 
 #include <algorithm>
 

@@ -1,7 +1,7 @@
 #include "components/componentTools/inspection.h"
 
-#include "components/componentManager/platform/platform.h"
 #include "components/componentTools/platform/system.h"
+#include "components/platform/platform.h"
 
 #include <deque>
 #include <set>

@@ -1,6 +1,6 @@
 #include "components/componentTools/libraryImage.h"
 
-#include "components/componentManager/platform/platform.h"
+#include "components/platform/platform.h"
 
 #include <algorithm>
 

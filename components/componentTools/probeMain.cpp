@@ -1,9 +1,9 @@
 /// `mzcomponents-probe FILE MEMORY`: loads one library, asks it for its description, as the
 /// component manager does, and answers on standard output. Not meant to be started by people.
 #include "components/componentManager/componentImp.h"
-#include "components/componentManager/platform/platform.h"
 #include "components/componentTools/platform/system.h"
 #include "components/componentTools/probeAnswer.h"
+#include "components/platform/platform.h"
 
 #include <clocale>
 #include <csignal>

@@ -2,10 +2,10 @@
 
 #include "components/componentManager/binaryStream.h"
 #include "components/componentManager/bufferio.h"
-#include "components/componentManager/platform/characters.h"
-#include "components/componentManager/platform/platform.h"
 #include "components/componentTools/replaceFile.h"
 #include "components/componentTools/verdictsFile.h"
+#include "components/platform/characters.h"
+#include "components/platform/platform.h"
 
 #include <algorithm>
 #include <fstream>

@@ -1,8 +1,8 @@
 #include "components/componentTools/replaceFile.h"
 
 #include "components/componentManager/exceptions.h"
-#include "components/componentManager/platform/platform.h"
 #include "components/componentTools/platform/system.h"
+#include "components/platform/platform.h"
 
 #include <atomic>
 #include <chrono>

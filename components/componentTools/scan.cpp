@@ -1,10 +1,10 @@
 #include "components/componentTools/scan.h"
 
 #include "components/componentManager/exceptions.h"
-#include "components/componentManager/platform/platform.h"
 #include "components/componentTools/explain.h"
 #include "components/componentTools/platform/system.h"
 #include "components/componentTools/verdictsFile.h"
+#include "components/platform/platform.h"
 
 #include <algorithm>
 #include <map>

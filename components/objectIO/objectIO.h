@@ -35,16 +35,11 @@
 #pragma once
 
 #include "components/componentManager/stream.h"
+#include "components/objectIO/export.h"
 
 #include <cstdint>
 #include <memory>
 #include <string>
-
-#ifdef MZ_BUILDING_OBJECT_IO
-#define MZ_OBJECT_IO_API MZ_EXPORT
-#else
-#define MZ_OBJECT_IO_API MZ_IMPORT
-#endif
 
 namespace Mz {
 

@@ -36,53 +36,70 @@ platformConditions)
     # What differs by system stands in files of its own, chosen by the build.
     search '^[[:space:]]*#[[:space:]]*(if|ifdef|ifndef|elif|elifdef|elifndef)\b.*(WIN32|WIN64|_MSC_VER|MINGW|CYGWIN|linux|unix|APPLE|BSD|__GLIBC__)' \
         $(sources components examples tests tools benchmarks fuzz |
-            grep -vE '^components/component(Manager|Tools)/platform/|^components/base/export\.h$') |
+            grep -vE '^components/(platform|componentTools/platform)/|^components/base/export\.h$') |
         complain "conditions on the platform outside the platform layer"
     ;;
 platformHeaders)
     search '#[[:space:]]*include[[:space:]]*<(windows|io|unistd|dlfcn|dirent|fcntl|link|elf|langinfo|direct|winbase|sys/[a-z]+)\.?h?>' \
-        $(sources components | grep -vE '^components/component(Manager|Tools)/platform/(windows|posix)/') |
+        $(sources components | grep -vE '^components/(platform|componentTools/platform)/(windows|posix)/') |
         complain "headers of a system outside the platform layer"
     ;;
 sourcePositions)
     # The first argument of every exception that the library makes names one of its own sources,
-    # without extension.
+    # without extension. The name stays when the source moves into a room of its library.
     grep -rnoE '"components/[^"]*"' --include='*.cpp' components |
         grep -vE '\.cpp:[0-9]+:"components/.*\.h"$' |
         while IFS=: read -r file _ name; do
             name=${name//\"/}
-            directory=$(dirname "$file")
-            [ "$(dirname "$name")" = "$directory" ] && [ -f "$name.cpp" ] ||
-                echo "$file: $name"
+            library=$(dirname "$name")
+            [[ $file == "$library"/* ]] && [ -f "$name.cpp" ] || echo "$file: $name"
         done | complain "source positions that name no source of the library"
     search '\bthrow Qr[A-Za-z]+Ex::|throw Ex[A-Z]' $(sources components) |
         grep -vE 'throw [A-Za-z:]+\((source|file|"components/[a-zA-Z]+/[a-zA-Z]+"), *(line|__LINE__|reportedLine)' |
         complain "exceptions without a source position"
     ;;
 layers)
+    # Each library, and the libraries that it must not include.
     up='examples|tests|tools|benchmarks|fuzz'
-    included components "$up" | complain "a library that needs what stands above it"
-    included components/base 'components/(resmgt|componentManager|componentKit|objectIO|componentTools)' |
-        complain "base needs nothing"
-    included components/resmgt 'components/(base|componentManager|componentKit|objectIO|componentTools)' |
-        complain "resmgt needs nothing"
-    included components/componentManager 'components/(componentKit|objectIO|componentTools)' |
-        complain "the component manager stands below the kit and the tools"
-    included components/componentKit 'components/(objectIO|componentTools)' |
-        complain "the kit needs the component manager only"
+    included components "$up" | complain "a library that needs what is above it"
+    above() { # above LIBRARY "LIBRARIES"
+        included "components/$1" "components/($2)" | complain "$1 needs what is above or beside it"
+    }
+    above base 'resmgt|platform|componentManager|componentKit|objectIO|componentTools'
+    above resmgt 'base|platform|componentManager|componentKit|objectIO|componentTools'
+    above platform 'componentManager|componentKit|objectIO|componentTools'
+    above componentManager 'componentKit|objectIO|componentTools'
+    above componentKit 'platform|objectIO|componentTools'
+    above objectIO 'platform|componentKit|componentTools'
+    above componentTools 'componentKit|objectIO'
     included examples 'tests|benchmarks|fuzz' | complain "an example that needs the tests"
     search '#[[:space:]]*include[[:space:]]*"\.\./' $(sources components tests tools) |
         complain "includes that climb"
-    search '#[[:space:]]*include[[:space:]]*"components/[^"]*(Private|platform/|hashMap|ioGuard|neverDestroyed|systemController|threadHash|inputFile)' \
-        $(sources components/componentKit examples) |
-        complain "a client that needs what is private"
+    ;;
+privateHeaders)
+    # What is public is at the top of its library; the rooms below are the library's own. Only tests
+    # and fuzz targets look into them.
+    for file in $(sources components examples tools benchmarks); do
+        search '#[[:space:]]*include[[:space:]]*"components/[a-zA-Z]+/[a-zA-Z]+/' "$file" |
+            while IFS= read -r line; do
+                library=$(grep -oE 'components/[a-zA-Z]+/' <<<"${line#*include}" | head -n 1)
+                [[ $file == "$library"* ]] || echo "$line"
+            done
+    done | complain "private headers of another library"
+    included examples 'components/platform' | complain "the platform layer is not for clients"
+    included tools 'components/platform' | complain "the platform layer is not for clients"
+    ;;
+sourcesOnce)
+    # A source that two libraries compile has its state twice.
+    search '\.\./' $(find components tools -name CMakeLists.txt 2>/dev/null) | grep -E '\.\./[a-zA-Z/]+\.cpp' |
+        complain "a source of another library"
     ;;
 moduleOrder)
     # Inside the component manager: the object model, the buffers, and the importers on top.
     directory=components/componentManager
     lower() { # lower "FILES" "HEADERS that they must not include"
-        search "#[[:space:]]*include[[:space:]]*\"$directory/($2)\.h\"" \
-            $(for file in $1; do find $directory -maxdepth 1 -name "$file.*"; done)
+        search "#[[:space:]]*include[[:space:]]*\"$directory/([a-z]+/)?($2)\.h\"" \
+            $(for file in $1; do find $directory -name "$file.*"; done)
     }
     lower 'uid reference castable castImpl cast exceptions translation enumerator' \
         'bufferio|stream|binaryStream|textStream|componentImp.*|import.*|processControl' |

@@ -1,5 +1,5 @@
 /// The reader of ELF symbol tables, on sound libraries and on everything else.
-#include "components/componentManager/platform/posix/elfProbe.h"
+#include "components/platform/posix/elfProbe.h"
 #include "tests/integration/managerFixture.h"
 
 #include <algorithm>

@@ -1,7 +1,7 @@
 /// A component manager of the test's own, and a folder for the libraries that it is to find.
 #pragma once
 
-#include "components/componentManager/componentImpPrivate.h"
+#include "components/componentManager/manager/componentImpPrivate.h"
 #include "tests/components/testUids.h"
 #include "tests/support/temporaryDirectory.h"
 #include "tests/support/testSystem.h"

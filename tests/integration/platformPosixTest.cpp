@@ -1,6 +1,6 @@
 /// The platform layer on Linux, where it has something of its own.
-#include "components/componentManager/platform/characters.h"
-#include "components/componentManager/platform/platform.h"
+#include "components/platform/characters.h"
+#include "components/platform/platform.h"
 #include "tests/integration/managerFixture.h"
 
 #include <clocale>

@@ -1,7 +1,7 @@
 /// What every system's platform layer must do. The same tests everywhere.
-#include "components/componentManager/platform/platform.h"
+#include "components/platform/platform.h"
 
-#include "components/componentManager/platform/characters.h"
+#include "components/platform/characters.h"
 #include "tests/integration/managerFixture.h"
 
 #include <chrono>

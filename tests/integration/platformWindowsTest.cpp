@@ -1,5 +1,5 @@
 /// The platform layer on Windows, where it has something of its own.
-#include "components/componentManager/platform/platform.h"
+#include "components/platform/platform.h"
 #include "tests/integration/managerFixture.h"
 
 #include <fstream>

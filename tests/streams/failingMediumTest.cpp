@@ -2,7 +2,7 @@
 #include "tests/support/failingMedium.h"
 #include "tests/streams/support.h"
 
-#include "components/componentManager/componentImpPrivate.h"
+#include "components/componentManager/manager/componentImpPrivate.h"
 
 #include <gtest/gtest.h>
 

@@ -3,8 +3,9 @@
 #include "tests/streams/recordingIO.h"
 #include "tests/streams/support.h"
 
-#include "components/componentManager/platform/characters.h"
-#include "components/componentManager/platform/platform.h"
+#include "components/componentManager/text/plainBytes.h"
+#include "components/platform/characters.h"
+#include "components/platform/platform.h"
 
 #include <gtest/gtest.h>
 
@@ -163,11 +164,12 @@ TEST_F(UnderCommaLocale, ThreadsWithForeignIOsDoNotDisturbOneAnother) {
 
 TEST_F(UnderCommaLocale, TheBracketNests) {
     {
-        const Mz::platform::CLocale outer;
+        Mz::platform::LocaleSwitch shared;
+        const Mz::platform::CLocale outer(shared);
         EXPECT_STREQ(std::localeconv()->decimal_point, ".");
         EXPECT_TRUE(Mz::platform::usesPlainBytes());
         {
-            const Mz::platform::CLocale inner;
+            const Mz::platform::CLocale inner(shared);
             EXPECT_STREQ(std::localeconv()->decimal_point, ".");
         }
         EXPECT_STREQ(std::localeconv()->decimal_point, ".");
@@ -176,16 +178,15 @@ TEST_F(UnderCommaLocale, TheBracketNests) {
 }
 
 TEST_F(UnderCommaLocale, PlainBytesHoldForTheConverterAndOneThread) {
-    using Mz::platform::CharacterConverter;
-    const bool plainBefore = CharacterConverter().plainBytes();
+    const bool plainBefore = Mz::bufferedConverter().plainBytes();
     EXPECT_FALSE(plainBefore);
-    const Mz::platform::PlainBytes outer;
+    const Mz::PlainBytes outer;
     {
-        const Mz::platform::PlainBytes inner;
-        EXPECT_TRUE(CharacterConverter().plainBytes());
+        const Mz::PlainBytes inner;
+        EXPECT_TRUE(Mz::bufferedConverter().plainBytes());
     }
-    EXPECT_TRUE(CharacterConverter().plainBytes());
-    std::thread([] { EXPECT_FALSE(CharacterConverter().plainBytes()); }).join();
+    EXPECT_TRUE(Mz::bufferedConverter().plainBytes());
+    std::thread([] { EXPECT_FALSE(Mz::bufferedConverter().plainBytes()); }).join();
     EXPECT_STREQ(std::localeconv()->decimal_point, ",");
 }
 

@@ -1,6 +1,6 @@
 #include "tests/streams/support.h"
 
-#include "components/componentManager/componentImpPrivate.h"
+#include "components/componentManager/manager/componentImpPrivate.h"
 
 #include <gtest/gtest.h>
 

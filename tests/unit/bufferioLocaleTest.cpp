@@ -1,5 +1,5 @@
 #include "components/componentManager/bufferio.h"
-#include "components/componentManager/platform/characters.h"
+#include "components/platform/characters.h"
 #include "tests/unit/locales.h"
 
 #include <gtest/gtest.h>

@@ -1,5 +1,5 @@
-#include "components/componentManager/platform/platform.h"
 #include "components/componentManager/processControl.h"
+#include "components/platform/platform.h"
 
 #include <gtest/gtest.h>
 

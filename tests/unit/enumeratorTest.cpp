@@ -1,5 +1,5 @@
 #include "components/componentManager/enumerator.h"
-#include "components/componentManager/componentImpPrivate.h"
+#include "components/componentManager/manager/componentImpPrivate.h"
 
 #include <gtest/gtest.h>
 

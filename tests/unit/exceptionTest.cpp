@@ -1,6 +1,6 @@
 #include "components/base/assertions.h"
 #include "components/componentManager/cast.h"
-#include "components/componentManager/platform/platform.h"
+#include "components/platform/platform.h"
 #include "tests/unit/allocationFailure.h"
 #include "tests/unit/throwsEverything.h"
 

@@ -1,5 +1,5 @@
-#include "components/componentManager/hashMap.h"
-#include "components/componentManager/threadHash.h"
+#include "components/componentManager/support/hashMap.h"
+#include "components/componentManager/control/threadHash.h"
 
 #include <gtest/gtest.h>
 

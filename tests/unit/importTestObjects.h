@@ -2,8 +2,8 @@
 #pragma once
 
 #include "components/componentKit/componentKit.h"
-#include "components/componentManager/componentImpPrivate.h"
 #include "components/componentManager/importer.h"
+#include "components/componentManager/manager/componentImpPrivate.h"
 
 #include <functional>
 #include <memory>

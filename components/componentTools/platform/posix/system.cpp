@@ -1,7 +1,7 @@
 #include "components/componentTools/platform/system.h"
 
-#include "components/componentManager/platform/characters.h"
 #include "components/componentTools/platform/posix/loaderCache.h"
+#include "components/platform/characters.h"
 
 #include <cerrno>
 #include <csignal>

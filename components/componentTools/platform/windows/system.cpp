@@ -1,6 +1,6 @@
 #include "components/componentTools/platform/system.h"
 
-#include "components/componentManager/platform/platform.h"
+#include "components/platform/platform.h"
 
 #include "components/componentTools/platform/windows/faultName.h"
 

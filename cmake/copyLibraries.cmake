@@ -1,0 +1,7 @@
+# Copies the DLLs of the folder `from` to the folder `to`, apart from the one that `to` has in a form
+# of its own.
+file(GLOB libraries RELATIVE ${from} ${from}/*.dll)
+list(REMOVE_ITEM libraries libMZcomponentManager.dll)
+foreach(library IN LISTS libraries)
+  file(COPY_FILE ${from}/${library} ${to}/${library} ONLY_IF_DIFFERENT)
+endforeach()

@@ -1,0 +1,291 @@
+#include "components/componentManager/bufferio.h"
+
+#include "components/componentManager/buffers/directBuffer.h"
+#include "components/componentManager/text/plainBytes.h"
+
+#include <algorithm>
+#include <cwctype>
+
+namespace Mz {
+
+namespace {
+
+constexpr const char* source = "components/componentManager/bufferio";
+
+/// A sequence of this many bytes that is still no character will never become one.
+constexpr int maximumPendingBytes = 4;
+
+constexpr int endOfInput = -1;
+
+[[noreturn]] void throwWrite(int line) {
+    throw QrStreamEx::ExWrite(source, line);
+}
+
+void throwIfBad(const std::istream& in, int line) {
+    if (in.bad())
+        throw QrStreamEx::ExReadError(source, line);
+}
+
+constexpr int endOfBuffer = std::streambuf::traits_type::eof();
+
+/// The next byte, 0 to 255, or -1 when there is none, whyever; then the stream is usable again.
+/// The caller tests for a broken medium, when it has put away what it holds.
+int fetch(std::istream& in) {
+    int byte = endOfInput;
+    if (std::streambuf* const buffer = directBuffer(in)) {
+        directly(in, [&] {
+            byte = buffer->sbumpc();
+            return true;
+        });
+        return byte == endOfBuffer ? endOfInput : byte;
+    }
+    ignoringExceptions([&] { byte = in.get(); });
+    if (in.good())
+        return byte;
+    clearEndOfInput(in);
+    return endOfInput;
+}
+
+void putBack(std::istream& in, char byte) {
+    if (std::streambuf* const buffer = directBuffer(in))
+        directly(in, [&] { return buffer->sputbackc(byte) != endOfBuffer; });
+    else
+        ignoringExceptions([&] { in.putback(byte); });
+}
+
+/// Puts back what stands from `begin` to `end`, so that it is read again in its order.
+void putBack(std::istream& in, const char* begin, const char* end) {
+    while (end != begin)
+        putBack(in, *--end);
+}
+
+/// Reads up to `wanted` characters that are bytes. A NUL is delivered but never consumed, so it is
+/// all that the rest can be.
+int readPlainCharacters(std::istream& in, std::streambuf& buffer, wchar_t* characters, int wanted) {
+    for (int stored = 0; stored < wanted; ++stored) {
+        const int byte = peekDirectly(in, buffer);
+        if (byte < 0)
+            return stored;
+        if (byte == 0) {
+            std::fill(characters + stored, characters + wanted, L'\0');
+            break;
+        }
+        characters[stored] = static_cast<wchar_t>(byte);
+        buffer.sbumpc();
+    }
+    return wanted;
+}
+
+} // namespace
+
+void throwBrokenInput() {
+    throw QrStreamEx::ExReadError(source, __LINE__);
+}
+
+QrInBuffer::QrInBuffer(std::istream* in) : in(in) {}
+
+QrInBuffer::~QrInBuffer() = default;
+
+bool QrInBuffer::isBufferIgnored() const {
+    return false;
+}
+
+int QrInBuffer::read(void* data, int size) {
+    if (size < 1) {
+        throwIfBad(*in, __LINE__);
+        return 0;
+    }
+    auto* const bytes = static_cast<char*>(data);
+    if (std::streambuf* const buffer = directBuffer(*in))
+        return readDirectly(*in, *buffer, bytes, size);
+    ignoringExceptions([&] { in->read(bytes, size); });
+    throwIfBad(*in, __LINE__);
+    return static_cast<int>(in->gcount());
+}
+
+int QrInBuffer::read() {
+    const int byte = fetch(*in);
+    throwIfBad(*in, __LINE__);
+    return byte;
+}
+
+int QrInBuffer::readChar(char& c) {
+    const int byte = fetch(*in);
+    throwIfBad(*in, __LINE__);
+    if (byte == endOfInput)
+        return 0;
+    c = static_cast<char>(byte);
+    return 1;
+}
+
+int QrInBuffer::readChar(wchar_t& c) {
+    return readChar(&c, 1, 1);
+}
+
+int QrInBuffer::readChar(char* buf, int size, int count) {
+    if (count == 0)
+        return 0;
+    const platform::CharacterConverter converter = bufferedConverter();
+    int used = 0;
+    int fetched = 0;
+    int characters = 0;
+    while (fetched < size && characters != count) {
+        const int byte = fetch(*in);
+        buf[fetched] = static_cast<char>(byte);
+        throwIfBad(*in, __LINE__);
+        if (byte == endOfInput)
+            break;
+        ++fetched;
+        wchar_t ignored;
+        const auto pending = static_cast<std::size_t>(fetched - used);
+        const int length = converter.decode({buf + used, pending}, ignored);
+        if (length == 0)
+            break; // A NUL counts for all characters that are still wanted, and stays unread.
+        if (length > 0) {
+            used += length;
+            ++characters;
+        } else if (fetched - used >= maximumPendingBytes) {
+            throw QrStreamEx::ExReadError(source, __LINE__);
+        }
+    }
+    putBack(*in, buf + used, buf + fetched);
+    throwIfBad(*in, __LINE__);
+    return used;
+}
+
+int QrInBuffer::readChar(wchar_t* buf, int size, int count) {
+    const int wanted = std::min(size, count);
+    if (wanted < 1)
+        return 0;
+    const platform::CharacterConverter converter = bufferedConverter();
+    if (std::streambuf* const buffer = converter.plainBytes() ? directBuffer(*in) : nullptr)
+        return readPlainCharacters(*in, *buffer, buf, wanted);
+    char pending[maximumPendingBytes];
+    int pendingBytes = 0;
+    int stored = 0;
+    while (stored < wanted) {
+        const int byte = fetch(*in);
+        throwIfBad(*in, __LINE__);
+        if (byte == endOfInput)
+            break;
+        pending[pendingBytes++] = static_cast<char>(byte);
+        const int length =
+            converter.decode({pending, static_cast<std::size_t>(pendingBytes)}, buf[stored]);
+        if (length > 0) {
+            ++stored;
+            pendingBytes = 0;
+        } else if (length == 0) {
+            // A NUL is delivered but never consumed, so it is all that the rest can be.
+            std::fill(buf + stored, buf + wanted, L'\0');
+            stored = wanted;
+        } else if (pendingBytes == maximumPendingBytes) {
+            throw QrStreamEx::ExReadError(source, __LINE__);
+        }
+    }
+    putBack(*in, pending, pending + pendingBytes);
+    throwIfBad(*in, __LINE__);
+    return stored;
+}
+
+void QrInBuffer::skipWhiteSpace(int count) {
+    for (; count > 0; --count) {
+        const int byte = fetch(*in);
+        throwIfBad(*in, __LINE__);
+        if (byte == endOfInput)
+            return;
+        // Bytes from 0x80 keep their sign here, and so are white space in no locale.
+        const auto character = static_cast<std::wint_t>(static_cast<signed char>(byte));
+        if (!std::iswspace(character)) {
+            putBack(*in, static_cast<char>(byte));
+            return;
+        }
+        if (byte != '\r')
+            continue;
+        const int next = fetch(*in);
+        throwIfBad(*in, __LINE__);
+        if (next == endOfInput)
+            return;
+        if (next != '\n') {
+            putBack(*in, static_cast<char>(next));
+            return;
+        }
+    }
+}
+
+void QrInBuffer::ungetc(wchar_t c) {
+    char bytes[platform::maximumCharacterBytes];
+    const int length = bufferedConverter().encode(c, bytes);
+    if (length < 0)
+        throw QrStreamEx::ExReadError(source, __LINE__);
+    putBack(*in, bytes, bytes + length);
+    throwIfBad(*in, __LINE__);
+}
+
+void QrInBuffer::ungetc(char c) {
+    putBack(*in, c);
+}
+
+bool QrInBuffer::canSeek() const {
+    return tell() != -1;
+}
+
+int64 QrInBuffer::seek(int64 offset, int origin) {
+    if (offset == 0 && origin == 1)
+        return tell();
+    if (origin < 0 || origin > 2)
+        throw QrStreamEx::ExReadError(source, __LINE__);
+    constexpr std::ios::seekdir directions[] = {std::ios::beg, std::ios::cur, std::ios::end};
+    ignoringExceptions([&] { in->seekg(offset, directions[origin]); });
+    const int64 position = tell();
+    if (position == -1)
+        throw QrStreamEx::ExReadError(source, __LINE__);
+    return position;
+}
+
+int64 QrInBuffer::tell() const {
+    int64 position = -1;
+    ignoringExceptions([&] { position = in->tellg(); });
+    return position;
+}
+
+void QrInBuffer::writeObject(const QrCastable*, QrStream&, const wchar_t*, const wchar_t*) {
+    throw QrStreamEx::ExWriteObjectImp(source, __LINE__);
+}
+
+QrRef<QrCastable> QrInBuffer::readObject(QrStream&, const QrUid*, const wchar_t*, const wchar_t*) {
+    throw QrStreamEx::ExReadObjectImp(source, __LINE__);
+}
+
+void QrInBuffer::write(const void*, int) {
+    throwWrite(__LINE__);
+}
+
+void QrInBuffer::write(char) {
+    throwWrite(__LINE__);
+}
+
+void QrInBuffer::writeEol() {
+    throwWrite(__LINE__);
+}
+
+void QrInBuffer::writeSpace() {
+    throwWrite(__LINE__);
+}
+
+int QrInBuffer::writeChar(const wchar_t*, int) {
+    throwWrite(__LINE__);
+}
+
+int QrInBuffer::writeChar(const char*, int) {
+    throwWrite(__LINE__);
+}
+
+void QrInBuffer::writeChar(wchar_t) {
+    throwWrite(__LINE__);
+}
+
+void QrInBuffer::writeChar(char) {
+    throwWrite(__LINE__);
+}
+
+} // namespace Mz

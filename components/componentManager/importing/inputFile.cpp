@@ -1,0 +1,14 @@
+#include "components/componentManager/importing/inputFile.h"
+
+#include "components/platform/platform.h"
+
+namespace Mz {
+
+bool openInputFile(std::ifstream& stream, const wchar_t* path) {
+    if (!path || !*path)
+        return false;
+    const std::optional<platform::NativePath> native = platform::toNative(path);
+    return native && platform::openForReading(stream, *native);
+}
+
+} // namespace Mz

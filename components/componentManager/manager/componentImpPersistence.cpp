@@ -1,0 +1,112 @@
+#include "components/componentManager/manager/componentImpPrivate.h"
+
+#include "components/componentManager/stream.h"
+
+namespace Mz {
+
+namespace {
+
+constexpr const char* source = "components/componentManager/componentImp";
+
+constexpr QrUid classUid{0x0C3F6A00, 0xADC511D1, 0x988AFC24, 0x07C10E27};
+
+void writeBuilder(QrStream& stream, const ComponentManager::Builder& builder) {
+    stream << builder.uid;
+    stream << builder.name << builder.label << builder.text << builder.flag << builder.number;
+}
+
+void writeLibrary(QrStream& stream, const ComponentLibrary& library) {
+    stream << library.directory << library.fileName << library.fileTime << library.fileSize
+           << static_cast<unsigned int>(library.builders.size());
+    // Last first: so lists have always been written.
+    for (std::size_t index = library.builders.size(); index-- > 0;)
+        writeBuilder(stream, library.builders[index]);
+}
+
+/// A text of a record. No name or path holds a NUL, and one is never consumed when it is read as a
+/// character: it would fill every text that is claimed, of which a small file could claim many.
+void readText(QrStream& stream, std::wstring& text) {
+    stream >> text;
+    if (text.find(L'\0') != std::wstring::npos)
+        throw QrStreamEx::ExReadError(source, __LINE__);
+}
+
+void readBuilder(QrStream& stream, ComponentManager::Builder& builder) {
+    stream >> builder.uid;
+    readText(stream, builder.name);
+    readText(stream, builder.label);
+    readText(stream, builder.text);
+    stream >> builder.flag >> builder.number;
+}
+
+void readLibrary(QrStream& stream, ComponentLibrary& library) {
+    unsigned int count = 0;
+    readText(stream, library.directory);
+    readText(stream, library.fileName);
+    stream >> library.fileTime >> library.fileSize >> count;
+    // The count is only a claim, so records come one by one.
+    for (; count > 0; --count) {
+        ComponentManager::Builder& builder = library.builders.emplace_back();
+        builder.library = &library;
+        readBuilder(stream, builder);
+    }
+    library.builders.reverse();
+}
+
+} // namespace
+
+void ComponentManager::writeRecords(QrStream& stream) {
+    if (!initialised)
+        return;
+    stream.write(static_cast<int>(libraries.size()), 1);
+    for (const ComponentLibrary& library : libraries)
+        writeLibrary(stream, library);
+}
+
+void ComponentManager::readRecords(QrStream& stream) {
+    if (initialised || initialising)
+        return;
+    int count = 0;
+    if (stream.read(count, 1) == 0) {
+        // The position is part of what callers and logs rely on, not this file's line.
+        constexpr int reportedLine = 1260;
+        throw QrStreamEx::ExReadObject(source, reportedLine);
+    }
+    if (count < 0)
+        throw QrStreamEx::ExReadError(source, __LINE__);
+    for (; count > 0; --count) {
+        ComponentLibrary& library = libraries.emplace_back(*this);
+        try {
+            readLibrary(stream, library);
+        } catch (...) {
+            // Half a record must not pass for what is known of the file.
+            library.fileTime = 0;
+            library.fileSize = 0;
+            library.builders.clear();
+            throw;
+        }
+    }
+}
+
+ComponentManagerPersistant::ComponentManagerPersistant(ComponentManager* manager)
+    : QrTempObject(manager) {}
+
+ComponentManagerPersistant::~ComponentManagerPersistant() = default;
+
+const QrUid* ComponentManagerPersistant::getClassUid() const {
+    return &classUid;
+}
+
+unsigned int ComponentManagerPersistant::getVersion() const {
+    return 1;
+}
+
+void ComponentManagerPersistant::write(QrStream& stream) {
+    owner()->writeRecords(stream);
+}
+
+void ComponentManagerPersistant::read(QrStream& stream) {
+    owner()->readRecords(stream);
+}
+
+} // namespace Mz

@@ -1,0 +1,65 @@
+#include "components/componentManager/manager/componentImpPrivate.h"
+
+namespace Mz {
+
+using Builder = ComponentManager::Builder;
+
+Builder::Builder() = default;
+Builder::Builder(const Builder& other) = default;
+Builder& Builder::operator=(const Builder& other) = default;
+Builder::~Builder() = default;
+
+const QrUid& Builder::getUid() const {
+    return uid;
+}
+
+const wchar_t* Builder::getName() const {
+    return name.c_str();
+}
+
+const wchar_t* Builder::getLabel() const {
+    return label.c_str();
+}
+
+unsigned int Builder::getNumber() const {
+    return number;
+}
+
+const wchar_t* Builder::getText() const {
+    return text.c_str();
+}
+
+const wchar_t* Builder::getComponentLabel() const {
+    return library->componentText1.c_str();
+}
+
+const wchar_t* Builder::getComponentText() const {
+    return library->componentText2.c_str();
+}
+
+bool Builder::getFlag() const {
+    return flag;
+}
+
+QrRefPtr<QrComponentBuilder> Builder::getBuilder() {
+    return library->manager->getComponentBuilder(*library, uid);
+}
+
+QrCRefPtr<QrComponentBuilder> Builder::getBuilder() const {
+    return library->manager->getComponentBuilder(*library, uid);
+}
+
+void ComponentManager::reindexBuilders(ComponentLibrary& library) {
+    for (std::size_t index = library.builders.size(); index-- > 0;)
+        builderIndex[library.builders[index].uid] = &library.builders[index];
+}
+
+void ComponentManager::dropBuilders(ComponentLibrary& library) {
+    if (library.builders.empty())
+        return;
+    for (std::size_t index = library.builders.size(); index-- > 0;)
+        builderIndex.erase(library.builders[index].uid);
+    droppedBuilders.emplace_back().swap(library.builders);
+}
+
+} // namespace Mz

@@ -1,0 +1,19 @@
+/// Process-wide objects that outlive every other.
+#pragma once
+
+namespace Mz {
+
+/// Holds a constant-initialised object that is never destroyed: static objects of other libraries
+/// may still use it in their destructors, whose order nobody controls. What such an object owns at
+/// the end goes back to the system with the process.
+template <class T>
+union NoDestructor {
+    constexpr NoDestructor() : value() {}
+    ~NoDestructor() {}
+    NoDestructor(const NoDestructor&) = delete;
+    NoDestructor& operator=(const NoDestructor&) = delete;
+
+    T value;
+};
+
+} // namespace Mz

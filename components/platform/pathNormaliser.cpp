@@ -1,0 +1,91 @@
+#include "components/platform/pathNormaliser.h"
+
+#include "components/platform/platform.h"
+
+#include <algorithm>
+#include <string_view>
+
+namespace Mz {
+
+namespace {
+
+bool isSeparator(wchar_t c) {
+    return c == L'/' || c == L'\\';
+}
+
+bool isLetter(wchar_t c) {
+    return (c >= L'a' && c <= L'z') || (c >= L'A' && c <= L'Z');
+}
+
+/// Takes the run of characters for which `belongs` holds from the front of `rest`.
+template <class Predicate>
+std::wstring_view takeWhile(std::wstring_view& rest, Predicate belongs) {
+    const auto end = std::find_if_not(rest.begin(), rest.end(), belongs);
+    const std::wstring_view taken = rest.substr(0, static_cast<std::size_t>(end - rest.begin()));
+    rest.remove_prefix(taken.size());
+    return taken;
+}
+
+std::wstring_view takeName(std::wstring_view& rest) {
+    return takeWhile(rest, [](wchar_t c) { return !isSeparator(c); });
+}
+
+std::wstring_view takeSeparators(std::wstring_view& rest) {
+    return takeWhile(rest, isSeparator);
+}
+
+/// Moves the root of `rest`, which may be empty, to `result`.
+void copyRoot(std::wstring_view& rest, std::wstring& result) {
+    if (rest.starts_with(L"\\\\")) {
+        result += rest.substr(0, 2);
+        rest.remove_prefix(2);
+        result += takeName(rest); // The server,
+        result += takeSeparators(rest);
+        result += takeName(rest); // and the share.
+    } else if (rest.size() > 1 && isLetter(rest[0]) && rest[1] == L':') {
+        result += rest.substr(0, 2);
+        rest.remove_prefix(2);
+    }
+    if (!takeSeparators(rest).empty())
+        result += L'\\';
+}
+
+/// Appends the normal form of one name to `result`.
+void appendEntry(std::wstring_view rest, std::wstring& result) {
+    copyRoot(rest, result);
+    const std::size_t rootEnd = result.size();
+    while (!rest.empty()) {
+        const std::wstring_view name = takeName(rest);
+        if (name == L".." && result.size() > rootEnd)
+            result.pop_back(); // The separator before it; the one behind it follows below.
+        else if (name != L".")
+            result += name;
+        if (!takeSeparators(rest).empty() && !rest.empty())
+            result += L'\\';
+    }
+}
+
+} // namespace
+
+std::wstring normalisePath(const wchar_t* path, bool listMode) {
+    if (!path)
+        return {};
+    std::wstring_view rest(path);
+    std::wstring result;
+    if (!listMode) {
+        appendEntry(rest, result);
+    } else {
+        const auto isSemicolon = [](wchar_t c) { return c == L';'; };
+        const auto isOther = [](wchar_t c) { return c != L';'; };
+        takeWhile(rest, isSemicolon);
+        while (!rest.empty()) {
+            appendEntry(takeWhile(rest, isOther), result);
+            takeWhile(rest, isSemicolon);
+            if (!rest.empty())
+                result += L';';
+        }
+    }
+    return platform::lowerCase(result.empty() ? std::wstring(L".") : std::move(result));
+}
+
+} // namespace Mz

@@ -1,0 +1,311 @@
+#include "components/platform/posix/elfProbe.h"
+
+#include <algorithm>
+#include <array>
+#include <cerrno>
+#include <cstdint>
+#include <cstring>
+#include <elf.h>
+#include <optional>
+#include <string_view>
+#include <sys/stat.h>
+#include <type_traits>
+#include <unistd.h>
+#include <vector>
+
+namespace Mz::platform {
+
+namespace {
+
+/// Limits that no real library comes near; they bound the work that a hostile one can cause.
+constexpr std::size_t maximumSegments = 1024;
+constexpr std::size_t maximumDynamicEntries = 4096;
+constexpr std::size_t maximumChainLength = 4096;
+
+/// Reads pieces of a file through two remembered blocks: a library's symbol tables stand at its
+/// beginning as a rule, and the list of its tables near its end, so that most pieces cost no system
+/// call.
+class FileBlocks {
+  public:
+    explicit FileBlocks(int descriptor) : descriptor(descriptor) {
+        struct stat status;
+        if (::fstat(descriptor, &status) == 0)
+            fileSize = static_cast<std::uint64_t>(status.st_size);
+    }
+
+    /// The `T` at `offset`; nothing when the file ends before it is whole.
+    template <class T>
+    std::optional<T> read(std::uint64_t offset) {
+        static_assert(std::is_trivially_copyable_v<T>);
+        T value;
+        if (!read(offset, &value, sizeof value))
+            return std::nullopt;
+        return value;
+    }
+
+    /// False when the file ends before it has `size` bytes more. No piece is larger than a block.
+    bool read(std::uint64_t offset, void* data, std::size_t size) {
+        Block* block = blockWith(offset, size);
+        if (!block) {
+            block = &blocks[older];
+            load(*block, offset, size);
+            if (!block->contains(offset, size))
+                return false;
+        }
+        older = block == &blocks[0] ? 1 : 0;
+        std::memcpy(data, block->bytes.data() + (offset - block->offset), size);
+        return true;
+    }
+
+    /// Whether the file has all of these bytes.
+    bool reaches(std::uint64_t offset, std::uint64_t size) const {
+        return size <= fileSize && offset <= fileSize - size;
+    }
+
+  private:
+    struct Block {
+        std::uint64_t offset = 0;
+        std::size_t size = 0;
+        std::array<char, 4096> bytes;
+
+        bool contains(std::uint64_t wanted, std::size_t length) const {
+            return wanted >= offset && wanted - offset <= size &&
+                   length <= size - (wanted - offset);
+        }
+    };
+
+    Block* blockWith(std::uint64_t offset, std::size_t size) {
+        for (Block& block : blocks)
+            if (block.contains(offset, size))
+                return &block;
+        return nullptr;
+    }
+
+    /// Fills the block from `offset` on, with `needed` bytes at least unless the file ends before.
+    void load(Block& block, std::uint64_t offset, std::size_t needed) {
+        block.size = 0;
+        block.offset = offset;
+        if (offset > static_cast<std::uint64_t>(INT64_MAX) - block.bytes.size())
+            return;
+        while (block.size < needed) {
+            const ssize_t got =
+                ::pread(descriptor, block.bytes.data() + block.size,
+                        block.bytes.size() - block.size, static_cast<off_t>(offset + block.size));
+            if (got > 0)
+                block.size += static_cast<std::size_t>(got);
+            else if (got == 0 || errno != EINTR)
+                break;
+        }
+    }
+
+    int descriptor;
+    std::uint64_t fileSize = 0;
+    std::array<Block, 2> blocks;
+    std::size_t older = 0; ///< the block to fill next
+};
+
+/// Where the tables for symbol lookup stand, as addresses in the loaded library.
+struct DynamicTables {
+    std::uint64_t symbols = 0;
+    std::uint64_t strings = 0;
+    std::uint64_t stringsSize = 0;
+    std::uint64_t gnuHash = 0;
+    std::uint64_t hash = 0;
+    /// The highest of the positions in the string table at which the loader takes names.
+    std::uint64_t lastName = 0;
+    bool program = false; ///< position-independent, but to be started and not to be loaded
+};
+
+class ElfLibrary {
+  public:
+    explicit ElfLibrary(int descriptor) : file(descriptor) {}
+
+    bool exports(const char* symbol) {
+        if (!readHeaders() || !readDynamicTables())
+            return false;
+        return (tables.gnuHash ? foundByGnuHash(symbol) : foundByHash(symbol)) && namesEnd();
+    }
+
+  private:
+    bool readHeaders() {
+        const auto header = file.read<Elf64_Ehdr>(0);
+        if (!header || std::memcmp(header->e_ident, ELFMAG, SELFMAG) != 0 ||
+            header->e_ident[EI_CLASS] != ELFCLASS64 || header->e_ident[EI_DATA] != ELFDATA2LSB ||
+            header->e_type != ET_DYN || header->e_machine != EM_X86_64 ||
+            header->e_phentsize != sizeof(Elf64_Phdr) || header->e_phnum > maximumSegments)
+            return false;
+        // The section headers stand at the end, as a rule: a file that was cut off lacks them.
+        if (header->e_shnum != 0 &&
+            !file.reaches(header->e_shoff, header->e_shnum * std::uint64_t{header->e_shentsize}))
+            return false;
+        for (std::size_t index = 0; index < header->e_phnum; ++index) {
+            const auto segment =
+                file.read<Elf64_Phdr>(header->e_phoff + index * sizeof(Elf64_Phdr));
+            if (!segment)
+                return false;
+            // The system maps what is not there as well, and ends the process that touches it.
+            if (segment->p_type == PT_LOAD && !file.reaches(segment->p_offset, segment->p_filesz))
+                return false;
+            if (segment->p_type == PT_LOAD)
+                loaded.push_back(*segment);
+            else if (segment->p_type == PT_DYNAMIC)
+                dynamic = *segment;
+        }
+        return dynamic.has_value();
+    }
+
+    bool readDynamicTables() {
+        const std::size_t count =
+            std::min<std::uint64_t>(dynamic->p_filesz / sizeof(Elf64_Dyn), maximumDynamicEntries);
+        for (std::size_t index = 0; index < count; ++index) {
+            const auto entry = file.read<Elf64_Dyn>(dynamic->p_offset + index * sizeof(Elf64_Dyn));
+            if (!entry)
+                return false;
+            if (entry->d_tag == DT_NULL)
+                break;
+            note(*entry);
+        }
+        return !tables.program && tables.symbols && tables.strings &&
+               (tables.gnuHash || tables.hash);
+    }
+
+    void note(const Elf64_Dyn& entry) {
+        switch (entry.d_tag) {
+        case DT_SYMTAB: tables.symbols = entry.d_un.d_ptr; break;
+        case DT_STRTAB: tables.strings = entry.d_un.d_ptr; break;
+        case DT_STRSZ: tables.stringsSize = entry.d_un.d_val; break;
+        case DT_GNU_HASH: tables.gnuHash = entry.d_un.d_ptr; break;
+        case DT_FLAGS_1: tables.program = (entry.d_un.d_val & DF_1_PIE) != 0; break;
+        case DT_HASH: tables.hash = entry.d_un.d_ptr; break;
+        case DT_NEEDED:
+        case DT_SONAME:
+        case DT_RPATH:
+        case DT_RUNPATH: tables.lastName = std::max(tables.lastName, entry.d_un.d_val); break;
+        default: break;
+        }
+    }
+
+    /// Whether all names that the loader takes from the string table end in it: the loader follows
+    /// them wherever they lead.
+    bool namesEnd() {
+        if (tables.lastName >= tables.stringsSize)
+            return false;
+        const std::optional<std::uint64_t> offset = offsetOf(tables.strings, tables.stringsSize);
+        return offset && file.read<char>(*offset + tables.stringsSize - 1) == '\0';
+    }
+
+    /// The `T` that the loaded library would have at `address`.
+    template <class T>
+    std::optional<T> readAt(std::uint64_t address) {
+        const std::optional<std::uint64_t> offset = offsetOf(address, sizeof(T));
+        if (!offset)
+            return std::nullopt;
+        return file.read<T>(*offset);
+    }
+
+    std::optional<std::uint64_t> offsetOf(std::uint64_t address, std::size_t size) const {
+        for (const Elf64_Phdr& segment : loaded) {
+            if (address < segment.p_vaddr)
+                continue;
+            const std::uint64_t inside = address - segment.p_vaddr;
+            if (inside <= segment.p_filesz && size <= segment.p_filesz - inside)
+                return segment.p_offset + inside;
+        }
+        return std::nullopt;
+    }
+
+    bool foundByGnuHash(std::string_view name) {
+        struct Header {
+            std::uint32_t bucketCount, firstSymbol, bloomCount, bloomShift;
+        };
+        const auto header = readAt<Header>(tables.gnuHash);
+        if (!header || !header->bucketCount || !header->bloomCount)
+            return false;
+        std::uint32_t hash = 5381;
+        for (const char c : name)
+            hash = hash * 33 + static_cast<unsigned char>(c);
+
+        const std::uint64_t bloom = tables.gnuHash + sizeof(Header);
+        const auto word = readAt<std::uint64_t>(bloom + (hash / 64 % header->bloomCount) * 8ull);
+        if (!word ||
+            !(*word >> (hash % 64) & *word >> (hash >> (header->bloomShift % 32) & 63) & 1))
+            return false;
+
+        const std::uint64_t buckets = bloom + header->bloomCount * 8ull;
+        const std::uint64_t chains = buckets + header->bucketCount * 4ull;
+        const auto bucket = readAt<std::uint32_t>(buckets + hash % header->bucketCount * 4ull);
+        if (!bucket || *bucket < header->firstSymbol)
+            return false;
+        for (std::size_t step = 0; step < maximumChainLength; ++step) {
+            const std::uint64_t index = *bucket + step;
+            const auto entry = readAt<std::uint32_t>(chains + (index - header->firstSymbol) * 4);
+            if (!entry)
+                return false;
+            if ((*entry | 1) == (hash | 1) && isExportedFunction(index, name))
+                return true;
+            if (*entry & 1)
+                return false;
+        }
+        return false;
+    }
+
+    bool foundByHash(std::string_view name) {
+        struct Header {
+            std::uint32_t bucketCount, chainCount;
+        };
+        const auto header = readAt<Header>(tables.hash);
+        if (!header || !header->bucketCount)
+            return false;
+        std::uint32_t hash = 0;
+        for (const char c : name) {
+            hash = (hash << 4) + static_cast<unsigned char>(c);
+            hash = (hash ^ (hash >> 28 << 28) >> 24) & 0x0FFFFFFF;
+        }
+        const std::uint64_t buckets = tables.hash + sizeof(Header);
+        const std::uint64_t chains = buckets + header->bucketCount * 4ull;
+        auto index = readAt<std::uint32_t>(buckets + hash % header->bucketCount * 4ull);
+        for (std::size_t step = 0; index && *index && step < maximumChainLength; ++step) {
+            if (isExportedFunction(*index, name))
+                return true;
+            index = readAt<std::uint32_t>(chains + *index * 4ull);
+        }
+        return false;
+    }
+
+    bool isExportedFunction(std::uint64_t index, std::string_view name) {
+        const auto symbol = readAt<Elf64_Sym>(tables.symbols + index * sizeof(Elf64_Sym));
+        if (!symbol || symbol->st_shndx == SHN_UNDEF)
+            return false;
+        const unsigned int type = ELF64_ST_TYPE(symbol->st_info);
+        const unsigned int binding = ELF64_ST_BIND(symbol->st_info);
+        const unsigned int visibility = ELF64_ST_VISIBILITY(symbol->st_other);
+        // Functions written in assembly often carry no type.
+        return (type == STT_FUNC || type == STT_GNU_IFUNC || type == STT_NOTYPE) &&
+               binding != STB_LOCAL && visibility != STV_HIDDEN && visibility != STV_INTERNAL &&
+               isName(symbol->st_name, name);
+    }
+
+    /// Whether the string table holds `name`, and its terminator, at `position`.
+    bool isName(std::uint64_t position, std::string_view name) {
+        if (position >= tables.stringsSize || name.size() >= tables.stringsSize - position)
+            return false;
+        std::array<char, 64> text;
+        const std::size_t size = name.size() + 1;
+        const auto offset = offsetOf(tables.strings + position, size);
+        return size <= text.size() && offset && file.read(*offset, text.data(), size) &&
+               std::memcmp(text.data(), name.data(), name.size()) == 0 && !text[name.size()];
+    }
+
+    FileBlocks file;
+    std::vector<Elf64_Phdr> loaded;
+    std::optional<Elf64_Phdr> dynamic;
+    DynamicTables tables;
+};
+
+} // namespace
+
+bool elfExportsFunction(int descriptor, const char* symbol) {
+    return ElfLibrary(descriptor).exports(symbol);
+}
+
+} // namespace Mz::platform

@@ -1,0 +1,259 @@
+#include "components/platform/platform.h"
+
+#include <clocale>
+#include <cstring>
+#include <cwchar>
+#include <io.h>
+#include <mutex>
+#include <sys/stat.h>
+#include <windows.h>
+
+namespace Mz::platform {
+
+namespace {
+
+/// The loader looks for a name that is not a full one in the program's folder first, and elsewhere;
+/// what was found is in the current one.
+std::wstring fullName(const NativePath& path) {
+    std::wstring full(MAX_PATH, L'\0');
+    while (true) {
+        const DWORD length =
+            ::GetFullPathNameW(path.c_str(), static_cast<DWORD>(full.size()), full.data(), nullptr);
+        if (length == 0)
+            return path;
+        const bool fits = length < full.size();
+        full.resize(length);
+        if (fits)
+            return full;
+    }
+}
+
+/// The loader takes a name without an extension to mean one with ".dll" behind it; a dot at the end
+/// says that there is none.
+std::wstring loaderName(const NativePath& path) {
+    const std::wstring name = fullName(path);
+    const std::size_t separator = name.find_last_of(L"/\\");
+    const std::size_t dot = name.find_last_of(L'.');
+    const bool hasExtension =
+        dot != std::wstring::npos && (separator == std::wstring::npos || dot > separator);
+    return hasExtension ? name : name + L".";
+}
+
+/// The activation context that a library carries in its own manifest, active on this thread for as
+/// long as this lives. Libraries without a manifest load in the surroundings of the caller.
+class OwnActivationContext {
+  public:
+    explicit OwnActivationContext(const NativePath& path) {
+        const std::wstring source = fullName(path);
+        constexpr int isolationAwareManifest = 2;
+        ACTCTXW request{};
+        request.cbSize = sizeof request;
+        request.dwFlags = ACTCTX_FLAG_RESOURCE_NAME_VALID;
+        request.lpSource = source.c_str();
+        request.lpResourceName = MAKEINTRESOURCEW(isolationAwareManifest);
+        context = ::CreateActCtxW(&request);
+        if (context != INVALID_HANDLE_VALUE)
+            active = ::ActivateActCtx(context, &cookie);
+    }
+    ~OwnActivationContext() {
+        if (active)
+            ::DeactivateActCtx(0, cookie);
+        if (context != INVALID_HANDLE_VALUE)
+            ::ReleaseActCtx(context);
+    }
+    OwnActivationContext(const OwnActivationContext&) = delete;
+    OwnActivationContext& operator=(const OwnActivationContext&) = delete;
+
+  private:
+    HANDLE context;
+    ULONG_PTR cookie = 0;
+    bool active = false;
+};
+
+/// An open directory listing of the C runtime.
+class Listing {
+  public:
+    explicit Listing(const std::wstring& pattern)
+        : handle(::_wfindfirst64i32(pattern.c_str(), &entry)) {}
+    ~Listing() {
+        if (handle != -1)
+            ::_findclose(handle);
+    }
+    Listing(const Listing&) = delete;
+    Listing& operator=(const Listing&) = delete;
+
+    bool valid() const { return handle != -1; }
+    bool next() { return ::_wfindnext64i32(handle, &entry) == 0; }
+    const _wfinddata64i32_t& current() const { return entry; }
+
+  private:
+    _wfinddata64i32_t entry{};
+    std::intptr_t handle;
+};
+
+/// Whether what stands there can be called.
+bool isCode(const void* address) {
+    constexpr DWORD executable =
+        PAGE_EXECUTE | PAGE_EXECUTE_READ | PAGE_EXECUTE_READWRITE | PAGE_EXECUTE_WRITECOPY;
+    MEMORY_BASIC_INFORMATION memory{};
+    return ::VirtualQuery(address, &memory, sizeof memory) != 0 &&
+           (memory.Protect & executable) != 0;
+}
+
+bool isDirectory(const NativePath& path) {
+    struct _stat64 status;
+    return ::_wstat64(path.c_str(), &status) == 0 && (status.st_mode & S_IFMT) == S_IFDIR;
+}
+
+} // namespace
+
+std::optional<NativePath> toNative(std::wstring_view name) {
+    return NativePath(std::wstring(name));
+}
+
+NativePath openingPath(const std::wstring& directory, const std::wstring& name, const NativePath&) {
+    return name.empty() ? directory : directory + L'\\' + name;
+}
+
+std::wstring lowerCase(std::wstring text) {
+    ::_wcslwr(text.data());
+    return text;
+}
+
+std::optional<std::wstring> firstArgument() {
+    // The C runtime's wide arguments are absent in a program with a narrow `main`. In the first
+    // argument a quote only toggles, and no escape is known.
+    std::wstring argument;
+    bool quoted = false;
+    for (const wchar_t* next = ::GetCommandLineW(); *next; ++next) {
+        if (*next == L'"')
+            quoted = !quoted;
+        else if (!quoted && (*next == L' ' || *next == L'\t'))
+            break;
+        else
+            argument += *next;
+    }
+    return argument;
+}
+
+std::optional<FileStatus> queryFile(const NativePath& path) {
+    struct _stat64 status;
+    if (::_wstat64(path.c_str(), &status) != 0)
+        return std::nullopt;
+    return FileStatus{static_cast<std::uint32_t>(status.st_mtime), status.st_size,
+                      (status.st_mode & S_IFMT) == S_IFREG};
+}
+
+bool isSameFile(const NativePath& a, const NativePath& b) {
+    return a == b;
+}
+
+std::vector<DirectoryEntry> listCandidates(const NativePath& directory) {
+    std::vector<DirectoryEntry> entries;
+    Listing listing(directory + L"/*");
+    if (!listing.valid())
+        return entries;
+    constexpr unsigned int excluded = _A_HIDDEN | _A_SYSTEM | _A_SUBDIR;
+    do {
+        const _wfinddata64i32_t& entry = listing.current();
+        if (!(entry.attrib & excluded))
+            entries.push_back({entry.name, directory + L"\\" + entry.name, std::nullopt});
+    } while (listing.next());
+    return entries;
+}
+
+bool openForReading(std::ifstream& stream, const NativePath& path) {
+    if (isDirectory(path))
+        stream.setstate(std::ios::failbit);
+    else
+        stream.open(std::filesystem::path(path), std::ios::in | std::ios::binary);
+    return stream.good();
+}
+
+Module findLoadedLibrary(const NativePath& path) {
+    return ::GetModuleHandleW(loaderName(path).c_str());
+}
+
+bool exportsFunction(const NativePath& path, const char* symbol) {
+    const std::wstring name = loaderName(path);
+    const OwnActivationContext context(path);
+    const HMODULE module = ::LoadLibraryExW(name.c_str(), nullptr, DONT_RESOLVE_DLL_REFERENCES);
+    const bool found = findSymbol(module, symbol) != nullptr;
+    unloadLibrary(module);
+    return found;
+}
+
+Module loadLibrary(const NativePath& path) {
+    const OwnActivationContext context(path);
+    const HMODULE module = ::LoadLibraryW(loaderName(path).c_str());
+    if (!module)
+        static_cast<void>(::GetLastError()); // The reason belongs to nobody.
+    return module;
+}
+
+UsedLibrary useLibrary(const NativePath& path, const char* symbol) {
+    if (const Module mapped = findLoadedLibrary(path))
+        return {mapped, false};
+    const Module module = exportsFunction(path, symbol) ? loadLibrary(path) : nullptr;
+    return {module, module != nullptr};
+}
+
+void unloadLibrary(Module module) {
+    if (module)
+        ::FreeLibrary(static_cast<HMODULE>(module));
+}
+
+void* findSymbol(Module module, const char* symbol) {
+    if (!module)
+        return nullptr;
+    const auto address =
+        reinterpret_cast<void*>(::GetProcAddress(static_cast<HMODULE>(module), symbol));
+    if (!address)
+        return nullptr;
+    // An export may be forwarded to another library, whose symbols do not count.
+    HMODULE owner = nullptr;
+    constexpr DWORD flags =
+        GET_MODULE_HANDLE_EX_FLAG_FROM_ADDRESS | GET_MODULE_HANDLE_EX_FLAG_UNCHANGED_REFCOUNT;
+    if (!::GetModuleHandleExW(flags, static_cast<const wchar_t*>(address), &owner))
+        return nullptr;
+    return owner == module && isCode(address) ? address : nullptr;
+}
+
+QuietErrors::QuietErrors()
+    : previousMode(::SetErrorMode(SEM_FAILCRITICALERRORS | SEM_NOOPENFILEERRORBOX)) {}
+
+QuietErrors::~QuietErrors() {
+    ::SetErrorMode(previousMode);
+}
+
+std::uint32_t currentThreadId() {
+    return ::GetCurrentThreadId();
+}
+
+void aroundForks(void (*)(), void (*)(), void (*)()) {}
+
+bool usesPlainBytes() {
+    const char* name = std::setlocale(LC_CTYPE, nullptr);
+    return name && (std::strcmp(name, "C") == 0 || std::strcmp(name, "POSIX") == 0);
+}
+
+LocaleSwitch::LocaleSwitch() = default;
+
+CLocale::CLocale(LocaleSwitch& shared) : shared(shared) {
+    const std::lock_guard lock(shared.mutex);
+    if (shared.wanted == 0) {
+        const wchar_t* current = ::_wsetlocale(LC_ALL, nullptr);
+        shared.previous = current ? current : L"C";
+        if (shared.previous != L"C")
+            ::_wsetlocale(LC_ALL, L"C");
+    }
+    ++shared.wanted;
+}
+
+CLocale::~CLocale() {
+    const std::lock_guard lock(shared.mutex);
+    if (--shared.wanted == 0 && shared.previous != L"C")
+        ::_wsetlocale(LC_ALL, shared.previous.c_str());
+}
+
+} // namespace Mz::platform
