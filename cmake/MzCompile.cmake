@@ -9,12 +9,20 @@ set(CMAKE_VISIBILITY_INLINES_HIDDEN ON)
 set(CMAKE_POSITION_INDEPENDENT_CODE ON)
 set(CMAKE_LINK_DEPENDS_NO_SHARED ON)
 
-set(CMAKE_RUNTIME_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/bin)
-set(CMAKE_LIBRARY_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/lib)
-set(CMAKE_ARCHIVE_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/lib)
+set(CMAKE_RUNTIME_OUTPUT_DIRECTORY ${PROJECT_BINARY_DIR}/bin)
+set(CMAKE_LIBRARY_OUTPUT_DIRECTORY ${PROJECT_BINARY_DIR}/lib)
+set(CMAKE_ARCHIVE_OUTPUT_DIRECTORY ${PROJECT_BINARY_DIR}/lib)
 
 # Tests of what libMZcomponentManager hides, and the form of the library that they link.
-set(MZ_INTERNALS_FOLDER ${CMAKE_BINARY_DIR}/internals)
+set(MZ_INTERNALS_FOLDER ${PROJECT_BINARY_DIR}/internals)
+
+if(WIN32)
+  enable_language(RC)
+  include(MzRuntime)
+  # Beside the programs, or they do not start.
+  mz_find_runtime(MZ_RUNTIME_FILES)
+  file(COPY ${MZ_RUNTIME_FILES} DESTINATION ${PROJECT_BINARY_DIR}/bin)
+endif()
 
 include(CheckCXXCompilerFlag)
 check_cxx_compiler_flag(-fno-gnu-unique MZ_HAS_NO_GNU_UNIQUE)
@@ -51,6 +59,19 @@ function(mz_copy_file target file folder)
     COMMAND ${CMAKE_COMMAND} -E copy_if_different ${file} ${folder})
 endfunction()
 
+# mz_describe_file(TARGET): gives the file a version resource on Windows, where its name has no
+# version.
+function(mz_describe_file target)
+  if(NOT WIN32)
+    return()
+  endif()
+  set(mzTarget ${target})
+  string(REPLACE . , mzVersionNumbers ${PROJECT_VERSION})
+  set(resource ${PROJECT_BINARY_DIR}/resources/${target}.rc)
+  configure_file(${PROJECT_SOURCE_DIR}/cmake/version.rc.in ${resource} @ONLY)
+  target_sources(${target} PRIVATE ${resource})
+endfunction()
+
 # mz_make_library(NAME MACRO FOLDER sources...): a shared library in FOLDER, lib<NAME> on every
 # platform.
 function(mz_make_library name macro folder)
@@ -61,20 +82,22 @@ function(mz_make_library name macro folder)
   target_include_directories(${name} PUBLIC
     $<BUILD_INTERFACE:${PROJECT_SOURCE_DIR}> $<INSTALL_INTERFACE:include>)
   set_target_properties(${name} PROPERTIES PREFIX lib
+    VERSION ${PROJECT_VERSION} SOVERSION ${MZ_SOVERSION}
     LIBRARY_OUTPUT_DIRECTORY ${folder}
     RUNTIME_OUTPUT_DIRECTORY ${folder}
     ARCHIVE_OUTPUT_DIRECTORY ${folder})
+  mz_describe_file(${name})
 endfunction()
 
 # mz_add_library(NAME MACRO sources...): a shared library of the family.
 function(mz_add_library name macro)
-  mz_make_library(${name} ${macro} ${CMAKE_BINARY_DIR}/lib ${ARGN})
+  mz_make_library(${name} ${macro} ${PROJECT_BINARY_DIR}/lib ${ARGN})
   add_library(Mz::${name} ALIAS ${name})
   # The libraries of the family find one another wherever they are installed together.
   set_target_properties(${name} PROPERTIES INSTALL_RPATH "$ORIGIN")
   if(WIN32)
     # Programs find a library beside themselves.
-    mz_copy_file(${name} $<TARGET_FILE:${name}> ${CMAKE_BINARY_DIR}/bin)
+    mz_copy_file(${name} $<TARGET_FILE:${name}> ${PROJECT_BINARY_DIR}/bin)
   endif()
 endfunction()
 

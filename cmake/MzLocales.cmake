@@ -10,9 +10,9 @@ function(mz_make_locale name charmap)
   if(NOT MZ_LOCALEDEF OR NOT EXISTS /usr/share/i18n/charmaps/${charmap}.gz)
     return()
   endif()
-  set(output ${CMAKE_BINARY_DIR}/locales/${name}.${charmap})
+  set(output ${PROJECT_BINARY_DIR}/locales/${name}.${charmap})
   add_custom_command(OUTPUT ${output}/LC_NUMERIC
-    COMMAND ${CMAKE_COMMAND} -E make_directory ${CMAKE_BINARY_DIR}/locales
+    COMMAND ${CMAKE_COMMAND} -E make_directory ${PROJECT_BINARY_DIR}/locales
     COMMAND ${MZ_LOCALEDEF} -i ${name} -f ${charmap} --no-archive ${output}
     COMMENT "Making the locale ${name}.${charmap}")
   set_property(GLOBAL APPEND PROPERTY mzLocales ${output}/LC_NUMERIC)
@@ -26,6 +26,6 @@ get_property(mzLocales GLOBAL PROPERTY mzLocales)
 add_custom_target(mzLocales DEPENDS ${mzLocales})
 
 function(mz_use_locales target)
-  target_compile_definitions(${target} PRIVATE MZ_LOCALE_FOLDER="${CMAKE_BINARY_DIR}/locales")
+  target_compile_definitions(${target} PRIVATE MZ_LOCALE_FOLDER="${PROJECT_BINARY_DIR}/locales")
   add_dependencies(${target} mzLocales)
 endfunction()

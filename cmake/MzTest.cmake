@@ -6,7 +6,7 @@ set(CMAKE_POLICY_DEFAULT_CMP0077 NEW)
 set(BUILD_GMOCK ON)
 set(INSTALL_GTEST OFF)
 set(gtest_force_shared_crt ON)
-add_subdirectory(${MZ_GOOGLETEST_SOURCES} ${CMAKE_BINARY_DIR}/googletest EXCLUDE_FROM_ALL SYSTEM)
+add_subdirectory(${MZ_GOOGLETEST_SOURCES} ${PROJECT_BINARY_DIR}/googletest EXCLUDE_FROM_ALL SYSTEM)
 include(GoogleTest)
 
 # The code of the tests runs once and is compiled for each build: most of the time of a build went
@@ -28,13 +28,13 @@ foreach(target gtest gtest_main gmock gmock_main)
 endforeach()
 
 # The build's name stands before the name of each test: one summary counts all builds.
-get_filename_component(MZ_BUILD_NAME ${CMAKE_BINARY_DIR} NAME)
+get_filename_component(MZ_BUILD_NAME ${PROJECT_BINARY_DIR} NAME)
 
 # The build folder as the tested programs name it; Wine shows the whole file system as drive Z.
-set(MZ_BUILD_PATH ${CMAKE_BINARY_DIR})
+set(MZ_BUILD_PATH ${PROJECT_BINARY_DIR})
 set(MZ_SOURCE_PATH ${PROJECT_SOURCE_DIR})
 if(WIN32)
-  set(MZ_BUILD_PATH Z:${CMAKE_BINARY_DIR})
+  set(MZ_BUILD_PATH Z:${PROJECT_BINARY_DIR})
   set(MZ_SOURCE_PATH Z:${PROJECT_SOURCE_DIR})
 endif()
 
@@ -43,22 +43,23 @@ endif()
 function(mz_add_test_program name)
   cmake_parse_arguments(PARSE_ARGV 1 arg "INTERNALS" "" "")
   add_executable(${name} ${arg_UNPARSED_ARGUMENTS})
-  if(arg_INTERNALS)
-    mz_use_internals(${name})
-  endif()
-  target_link_libraries(${name} PRIVATE Mz::MZcomponentManager mzCompile mzTestCode mzTestSupport
-    GTest::gmock)
+  mz_link_manager(${name} ${arg_INTERNALS})
+  target_link_libraries(${name} PRIVATE mzCompile mzTestCode mzTestSupport GTest::gmock)
 endfunction()
 
-# mz_use_internals(PROGRAM): links the form of libMZcomponentManager that hides nothing. To be
-# called before anything else is linked: the first library with a name is the one that is used.
-function(mz_use_internals program)
+# mz_link_manager(PROGRAM INTERNALS): links libMZcomponentManager as it is shipped, or, if INTERNALS,
+# the form that hides nothing. A program must not link both: they have one file name.
+function(mz_link_manager program internals)
+  if(NOT internals)
+    target_link_libraries(${program} PRIVATE Mz::MZcomponentManager)
+    return()
+  endif()
   target_link_libraries(${program} PRIVATE mzManagerForTests)
   set_target_properties(${program} PROPERTIES RUNTIME_OUTPUT_DIRECTORY ${MZ_INTERNALS_FOLDER})
   if(WIN32)
     # The program finds the libraries beside itself.
     add_custom_command(TARGET ${program} PRE_LINK
-      COMMAND ${CMAKE_COMMAND} -D from=${CMAKE_BINARY_DIR}/bin -D to=${MZ_INTERNALS_FOLDER}
+      COMMAND ${CMAKE_COMMAND} -D from=${PROJECT_BINARY_DIR}/bin -D to=${MZ_INTERNALS_FOLDER}
         -P ${PROJECT_SOURCE_DIR}/cmake/copyLibraries.cmake)
   endif()
 endfunction()
@@ -86,6 +87,6 @@ function(mz_add_test_component name)
   mz_add_component(${name} ${arg_UNPARSED_ARGUMENTS})
   target_link_libraries(${name} PRIVATE mzCompile)
   set_target_properties(${name} PROPERTIES
-    LIBRARY_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/components/${arg_FOLDER}
-    RUNTIME_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/components/${arg_FOLDER})
+    LIBRARY_OUTPUT_DIRECTORY ${PROJECT_BINARY_DIR}/components/${arg_FOLDER}
+    RUNTIME_OUTPUT_DIRECTORY ${PROJECT_BINARY_DIR}/components/${arg_FOLDER})
 endfunction()

@@ -8,7 +8,7 @@ include_guard(GLOBAL)
 function(mz_third_party name header link)
   find_path(MZ_${name}_FOLDER ${header} PATHS /usr/include /usr/local/include
     NO_CMAKE_FIND_ROOT_PATH REQUIRED)
-  set(folder ${CMAKE_BINARY_DIR}/thirdParty/${name})
+  set(folder ${PROJECT_BINARY_DIR}/thirdParty/${name})
   file(MAKE_DIRECTORY ${folder})
   file(CREATE_LINK ${MZ_${name}_FOLDER}/${link} ${folder}/${link} SYMBOLIC)
   add_library(${name} INTERFACE)

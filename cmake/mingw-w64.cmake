@@ -13,13 +13,3 @@ set(CMAKE_FIND_ROOT_PATH_MODE_INCLUDE ONLY)
 set(CMAKE_FIND_ROOT_PATH_MODE_PACKAGE ONLY)
 
 set(CMAKE_CROSSCOMPILING_EMULATOR ${CMAKE_CURRENT_LIST_DIR}/wine-run)
-
-# The compiler's runtime libraries, which stand beside the programs.
-foreach(mzRuntime libstdc++-6.dll libgcc_s_seh-1.dll libwinpthread-1.dll)
-  execute_process(COMMAND ${CMAKE_CXX_COMPILER} -print-file-name=${mzRuntime}
-    OUTPUT_VARIABLE mzRuntimePath OUTPUT_STRIP_TRAILING_WHITESPACE)
-  if(NOT IS_ABSOLUTE "${mzRuntimePath}")
-    set(mzRuntimePath /usr/x86_64-w64-mingw32/lib/${mzRuntime})
-  endif()
-  file(COPY ${mzRuntimePath} DESTINATION ${CMAKE_BINARY_DIR}/bin)
-endforeach()

@@ -10,5 +10,5 @@ foreach(style gnu sysv)
   target_include_directories(${name} PRIVATE ${PROJECT_SOURCE_DIR})
   target_link_options(${name} PRIVATE -nostdlib -s -Wl,--hash-style=${style} -Wl,--build-id=none)
   set_target_properties(${name} PROPERTIES PREFIX ""
-    LIBRARY_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/components/${name})
+    LIBRARY_OUTPUT_DIRECTORY ${PROJECT_BINARY_DIR}/components/${name})
 endforeach()

@@ -8,9 +8,9 @@ add_library(sideBySide SHARED sideBySide.cpp)
 target_include_directories(sideBySide PRIVATE ${PROJECT_SOURCE_DIR})
 target_link_options(sideBySide PRIVATE -static)
 set_target_properties(sideBySide PROPERTIES PREFIX ""
-  RUNTIME_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/components/ownManifest/mzTestAssembly)
+  RUNTIME_OUTPUT_DIRECTORY ${PROJECT_BINARY_DIR}/components/ownManifest/mzTestAssembly)
 configure_file(mzTestAssembly.manifest
-  ${CMAKE_BINARY_DIR}/components/ownManifest/mzTestAssembly/mzTestAssembly.manifest COPYONLY)
+  ${PROJECT_BINARY_DIR}/components/ownManifest/mzTestAssembly/mzTestAssembly.manifest COPYONLY)
 mz_add_fault(ownManifest ownManifest.cpp ownManifest.rc)
 target_link_libraries(ownManifest PRIVATE sideBySide)
 # The same without the manifest, which therefore cannot be loaded.
@@ -22,4 +22,4 @@ add_library(tiny MODULE tiny.cpp)
 target_include_directories(tiny PRIVATE ${PROJECT_SOURCE_DIR})
 target_link_options(tiny PRIVATE -nostdlib -s -Wl,--entry,anotherFunction)
 set_target_properties(tiny PROPERTIES PREFIX ""
-  LIBRARY_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/components/tiny)
+  LIBRARY_OUTPUT_DIRECTORY ${PROJECT_BINARY_DIR}/components/tiny)

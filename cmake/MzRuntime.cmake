@@ -1,0 +1,33 @@
+# The DLLs that programs need beside themselves on Windows. Installed, for users of the package.
+include_guard()
+
+# mz_find_runtime(VARIABLE): the compiler's runtime libraries that MinGW programs of C++ need.
+function(mz_find_runtime variable)
+  set(files)
+  if(WIN32 AND MINGW)
+    foreach(name libstdc++-6.dll libgcc_s_seh-1.dll libwinpthread-1.dll)
+      execute_process(COMMAND ${CMAKE_CXX_COMPILER} -print-file-name=${name}
+        OUTPUT_VARIABLE file OUTPUT_STRIP_TRAILING_WHITESPACE)
+      if(NOT IS_ABSOLUTE "${file}")
+        # The compiler knows its own folders; threads come from the system's libraries.
+        find_file(mzFile ${name} PATH_SUFFIXES lib bin NO_CACHE REQUIRED)
+        set(file ${mzFile})
+      endif()
+      list(APPEND files ${file})
+    endforeach()
+  endif()
+  set(${variable} ${files} PARENT_SCOPE)
+endfunction()
+
+# mz_copy_runtime(PROGRAM): copies the DLLs that PROGRAM needs, the compiler's included, beside it
+# whenever it has been built. Does nothing on other systems, where the run path names the folders.
+function(mz_copy_runtime program)
+  if(NOT WIN32)
+    return()
+  endif()
+  mz_find_runtime(runtime)
+  add_custom_command(TARGET ${program} POST_BUILD
+    COMMAND ${CMAKE_COMMAND} -E copy_if_different
+      $<TARGET_RUNTIME_DLLS:${program}> ${runtime} $<TARGET_FILE_DIR:${program}>
+    COMMAND_EXPAND_LISTS)
+endfunction()
