@@ -173,8 +173,10 @@ MZ_COMPONENT_MANAGER_API Mz::QrComponentManager* QrGetComponentManager();
 ///
 /// **What runs before it.** The initialisers of the library and of those that it needs, and nothing
 /// else. Before that, the file has only been read: a library that does not export this very name
-/// itself (not merely through one it depends on) is never loaded at all. Initialisers should not
-/// throw; on Linux that ends the process.
+/// itself (not merely through one it depends on) is never loaded at all. Initialisers must neither
+/// throw nor end their thread. On Linux both call `std::terminate`, whatever the host catches: an
+/// exception that passed the loader would leave it locked. The same holds while the library is
+/// unloaded.
 ///
 /// **How long the library stays.** One that describes no builders because it failed is unloaded at
 /// once. Otherwise it stays loaded until the manager is destroyed, so builders and objects may use
