@@ -74,8 +74,9 @@ class MZ_COMPONENT_MANAGER_API QrBuilderDescription : public QrCastable {
 ///
 /// The manager calls it on whatever thread asked for a builder, in this order when it records the
 /// library: `getComponentValue`, `getComponentText`, `getComponentLabel`, `getBuilderCount`,
-/// `enumerateBuilders`. Whatever it throws there is caught: the library is then recorded without
-/// builders and unloaded. What `createBuilder` throws reaches the client who asked.
+/// `enumerateBuilders`, `release`. Whatever it throws there is caught: the library is then recorded
+/// without builders and unloaded. When a client asks for a builder, what `createBuilder` or the
+/// `release` of the description throws reaches that client.
 class MZ_COMPONENT_MANAGER_API QrComponentDescription : public QrCastable {
   public:
     using Self = QrComponentDescription;
