@@ -111,6 +111,8 @@ bool ComponentManager::loadModule(ComponentLibrary& library) {
     const platform::NativePath path = library.openingPath();
     const platform::QuietErrors quiet;
     const platform::UsedLibrary used = platform::useLibrary(path, entryPointName);
+    if (used.loaded)
+        platform::keepOwnLibrary();
     // Only now: initialisers of the library may have asked for one of its builders meanwhile, and
     // found it mapped.
     library.module = used.module;

@@ -60,6 +60,13 @@ struct ForkWatch {
     }
 } const forkWatch;
 
+void clearRegistry() {
+    const std::lock_guard lock(threads.value.mutex);
+    threads.value.byThread.clear();
+    generation.fetch_add(1, std::memory_order_release);
+}
+MZ_AT_UNLOAD(clearRegistry);
+
 QrProcessControl* lookUp() {
     ThreadControllers& controllers = threads.value;
     const std::lock_guard lock(controllers.mutex);

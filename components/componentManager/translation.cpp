@@ -28,6 +28,11 @@ struct AddressHash {
 /// its place, empty.
 constinit NeverDestroyed<HashMap<QrCastable*, std::vector<Translation>, AddressHash>> registry;
 
+void clearRegistry() {
+    registry.value.clear();
+}
+MZ_AT_UNLOAD(clearRegistry);
+
 } // namespace
 
 constinit std::atomic<bool> translationsExist{false};

@@ -281,6 +281,21 @@ void unloadLibrary(Module module) {
         callLoader(::dlclose, module);
 }
 
+void keepOwnLibrary() {
+    static const Module own = [] {
+        Dl_info ignored;
+        void* entry = nullptr;
+        const auto* here = reinterpret_cast<const void*>(&keepOwnLibrary);
+        if (::dladdr1(here, &ignored, &entry, RTLD_DL_LINKMAP) == 0)
+            return Module();
+        // Never given back. The loader knows the library by this name, whatever is in the file now;
+        // a program has none.
+        const char* const name = static_cast<const link_map*>(entry)->l_name;
+        return *name ? ::dlopen(name, RTLD_LAZY | RTLD_NOLOAD) : nullptr;
+    }();
+    static_cast<void>(own);
+}
+
 void* findSymbol(Module module, const char* symbol) {
     if (!module)
         return nullptr;
