@@ -15,6 +15,7 @@
 #include <algorithm>
 #include <initializer_list>
 #include <memory>
+#include <new>
 #include <type_traits>
 #include <utility>
 #include <vector>
@@ -160,7 +161,8 @@ OwnedBuilder builderOf(const BuilderInfo& info) {
     return std::make_shared<ObjectBuilder<Object>>(info);
 }
 
-/// What the library says of itself. Not counted: the entry point keeps one for all callers.
+/// What the library says of itself. Not counted: the entry point keeps one for all callers, from
+/// the first call until the library is unloaded.
 class Description final : public QrCastImpl<Description, QrComponentDescription> {
   public:
     using Builders = std::vector<OwnedBuilder>;
@@ -190,11 +192,41 @@ class Description final : public QrCastImpl<Description, QrComponentDescription>
         return e.finished();
     }
 
+    /// Releases all builders and the memory that they were kept in. The description stays usable
+    /// and has none from now on.
+    void dropBuilders() {
+        uids = std::vector<QrUid>();
+        const Builders dropped = std::exchange(builders, Builders());
+    }
+
   private:
     const wchar_t* label;
     const wchar_t* text;
     Builders builders;
     std::vector<QrUid> uids; ///< of the builders, each in its place
+};
+
+/// The place of a library's description, which is never destroyed: hosts may ask for it in the
+/// destructors of their static objects, and the library itself in its own. Static storage goes with
+/// the library; what the description owns elsewhere, its builders, `dropBuilders` frees.
+class StaticDescription {
+  public:
+    constexpr StaticDescription() = default;
+
+    /// Makes the description. To be called once.
+    Description* make(const wchar_t* label, const wchar_t* text, Description::Builders builders) {
+        description = new (storage) Description(label, text, std::move(builders));
+        return description;
+    }
+
+    void dropBuilders() {
+        if (description)
+            description->dropBuilders();
+    }
+
+  private:
+    alignas(Description) unsigned char storage[sizeof(Description)]{};
+    Description* description = nullptr;
 };
 
 } // namespace Mz::Kit
@@ -203,7 +235,13 @@ class Description final : public QrCastImpl<Description, QrComponentDescription>
 /// label and the text are shown to people; each builder is the result of `Mz::Kit::builderOf` or
 /// `Mz::Kit::builder`. Use it once in a library, outside all namespaces.
 #define MZ_COMPONENT(label, text, ...)                                                             \
+    static constinit Mz::Kit::StaticDescription mzDescription;                                     \
+    static void mzDropBuilders() {                                                                 \
+        mzDescription.dropBuilders();                                                              \
+    }                                                                                              \
+    MZ_AT_UNLOAD(mzDropBuilders);                                                                  \
     extern "C" MZ_EXPORT Mz::QrCastable* QrGetComponentDescription() {                             \
-        static Mz::Kit::Description description(label, text, {__VA_ARGS__});                       \
-        return &description;                                                                       \
+        static Mz::Kit::Description* const description =                                           \
+            mzDescription.make(label, text, {__VA_ARGS__});                                        \
+        return description;                                                                        \
     }

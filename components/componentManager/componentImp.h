@@ -75,8 +75,9 @@ class MZ_COMPONENT_MANAGER_API QrBuilderDescription : public QrCastable {
 ///
 /// The manager calls it on whatever thread asked for a builder, in this order when it records the
 /// library: `getComponentValue`, `getComponentText`, `getComponentLabel`, `getBuilderCount`,
-/// `enumerateBuilders`. Whatever it throws there is caught: the library is then recorded without
-/// builders and unloaded. What `createBuilder` throws reaches the client who asked.
+/// `enumerateBuilders`, `release`. Whatever it throws there is caught: the library is then recorded
+/// without builders and unloaded. When a client asks for a builder, what `createBuilder` or the
+/// `release` of the description throws reaches that client.
 class MZ_COMPONENT_MANAGER_API QrComponentDescription : public QrCastable {
   public:
     using Self = QrComponentDescription;
@@ -174,8 +175,10 @@ MZ_COMPONENT_MANAGER_API Mz::QrComponentManager* QrGetComponentManager();
 ///
 /// **What runs before it.** The initialisers of the library and of those that it needs, and nothing
 /// else. Before that, the file has only been read: a library that does not export this very name
-/// itself (not merely through one it depends on) is never loaded at all. Initialisers should not
-/// throw; on Linux that ends the process.
+/// itself (not merely through one it depends on) is never loaded at all. Initialisers must neither
+/// throw nor end their thread. On Linux both call `std::terminate`, whatever the host catches: an
+/// exception that passed the loader would leave it locked. The same holds while the library is
+/// unloaded.
 ///
 /// **How long the library stays.** One that describes no builders because it failed is unloaded at
 /// once. Otherwise it stays loaded until the manager is destroyed, so builders and objects may use

@@ -18,6 +18,8 @@ namespace Mz {
 ///
 /// Two ways lead out: `get()` only looks, `detach()` gives the reference to the caller.
 ///
+/// `release` must not throw: it is called where an exception ends the process.
+///
 /// Whether the object is deleted with its last reference is the object's own affair: objects that
 /// do not count stay as they are. One reference belongs to one thread at a time; different
 /// references to one counted object may be used by different threads.

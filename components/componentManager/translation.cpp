@@ -28,6 +28,11 @@ struct AddressHash {
 /// its place, empty.
 constinit NoDestructor<HashMap<QrCastable*, std::vector<Translation>, AddressHash>> registry;
 
+void clearRegistry() {
+    registry.value.clear();
+}
+MZ_AT_UNLOAD(clearRegistry);
+
 } // namespace
 
 constinit std::atomic<bool> translationsExist{false};

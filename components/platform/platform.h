@@ -111,6 +111,12 @@ UsedLibrary useLibrary(const NativePath& path, const char* symbol);
 /// Gives back one load.
 void unloadLibrary(Module module);
 
+/// Keeps the library that contains this code, the component manager's, in the process until it
+/// ends, where it could be unloaded under its own feet: components need it and so keep it mapped,
+/// and its static objects unload the components. Does nothing in a program, and where the loader
+/// defers that.
+void keepOwnLibrary();
+
 /// The address of the function `symbol` in that very library, not in one it depends on; null when
 /// it has none, when that is no code, and when `module` is null.
 void* findSymbol(Module module, const char* symbol);

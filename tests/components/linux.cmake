@@ -1,3 +1,7 @@
+# What ends a process here.
+mz_add_fault(endsThreadInInitialiser endsThreadInInitialiser.cpp)
+mz_add_fault(throwsInFinaliser throwsInFinaliser.cpp)
+
 # One that wants to stand at an address of its own choice, and gets it in a program that does too.
 mz_add_fault(ownAddress goodWithKit.cpp)
 target_link_options(ownAddress PRIVATE -Wl,-Ttext-segment=0x70000000)

@@ -146,6 +146,43 @@ TEST_F(FaultyComponent, ThrowingInTheTextOfAnItemIsUnloaded) {
     expectTriedAgain(expectDropped(L"throwsInText"));
 }
 
+TEST_F(FaultyComponent, ThrowingInTheReleaseOfTheEntryPointsReferenceIsUnloaded) {
+    ComponentLibrary& library = expectDropped(L"throwsInFirstRelease");
+    // Both references were given back, and no exception outlived the library.
+    EXPECT_EQ(noted("taken"), 2);
+    EXPECT_EQ(noted("released"), 2);
+    EXPECT_EQ(noted("enumerate"), 1); // By the sound library before it.
+    EXPECT_EQ(noted("exceptionMade"), noted("exceptionGone"));
+    const std::string events = allNotes();
+    EXPECT_LT(events.rfind("exceptionGone"), events.rfind("throwerUnloaded"));
+    expectTriedAgain(library);
+}
+
+TEST_F(FaultyComponent, ThrowingInTheReleaseAfterItsBuildersAreRecordedLosesThem) {
+    ComponentLibrary& library = expectDropped(L"throwsInSecondRelease");
+    EXPECT_EQ(noted("released"), 2);
+    EXPECT_EQ(noted("exceptionMade"), 1);
+    EXPECT_EQ(noted("exceptionGone"), 1);
+    const std::string events = allNotes();
+    EXPECT_LT(events.rfind("exceptionGone"), events.rfind("throwerUnloaded"));
+    expectTriedAgain(library);
+}
+
+TEST_F(FaultyComponent, ThrowingInReleaseKeepsTheTimeAndSizeOfItsRecord) {
+    file = add(L"throwsInSecondRelease");
+    ComponentLibrary& recorded = record(file, false);
+    recorded.fileTime = 12345;
+    recorded.fileSize = 678;
+    initialize();
+    EXPECT_EQ(find(file), &recorded);
+    EXPECT_EQ(recorded.fileTime, 12345u);
+    EXPECT_EQ(recorded.fileSize, 678);
+}
+
+TEST_F(FaultyComponent, ThrowingInTheReleaseOfAnItemIsUnloadedWithAllItsBuilders) {
+    expectTriedAgain(expectDropped(L"throwsInItemRelease"));
+}
+
 TEST_F(FaultyComponent, OfferingNullIsUnloadedWithAllItsBuilders) {
     expectTriedAgain(expectDropped(L"offersNull"));
 }
@@ -264,6 +301,31 @@ TEST_F(FaultyComponent, ThatThrowsWhenItCreatesABuilderPassesThatToTheClientAndS
     EXPECT_TRUE(isMapped(file));
     EXPECT_TRUE(find(file)->loadedByManager);
     EXPECT_EQ(names(), (Names{L"counted", L"create throws", L"kit"}));
+}
+
+TEST_F(FaultyComponent, ThatThrowsInReleaseForABuilderPassesThatToTheClientAndStaysUsable) {
+    file = add(L"throwsInThirdRelease");
+    initialize();
+    EXPECT_EQ(names(), (Names{L"counted", L"release throws", L"kit"}));
+    forgetNotes();
+    EXPECT_THROW(manager->getBuilder(faultyUid), std::runtime_error);
+    EXPECT_EQ(noted("builderMade"), 0); // Thrown before the builder was asked for.
+    EXPECT_EQ(noted("taken"), 2);
+    EXPECT_EQ(noted("released"), 2);
+    EXPECT_THROW(manager->createObject(faultyUid), std::runtime_error);
+    EXPECT_TRUE(isMapped(file));
+    EXPECT_TRUE(find(file)->loadedByManager);
+    EXPECT_EQ(names(), (Names{L"counted", L"release throws", L"kit"}));
+}
+
+TEST_F(FaultyComponent, ThatThrowsInReleaseAfterItMadeABuilderLeaksNone) {
+    file = add(L"throwsInFourthRelease");
+    initialize();
+    forgetNotes();
+    EXPECT_THROW(manager->getBuilder(faultyUid), std::runtime_error);
+    EXPECT_EQ(noted("builderMade"), 1);
+    EXPECT_EQ(noted("builderGone"), 1);
+    EXPECT_TRUE(isMapped(file));
 }
 
 TEST_F(FaultyComponent, ThatUsesTheManagerWhileItIsRecordedFindsItNotYetInitialised) {

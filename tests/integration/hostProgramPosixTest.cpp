@@ -7,11 +7,19 @@ namespace {
 
 class EndingHost : public ManagerTest {
   protected:
-    ProgramResult runOn(const std::wstring& component) {
+    ProgramResult runOn(const std::wstring& component, std::vector<std::string> options = {}) {
         add(component);
         add(L"goodWithKit", "zz");
-        return runProgram(buildFolder / "bin" / "testHost", "testHost", {folder.path().string()},
-                          folder.path());
+        options.push_back(folder.path().string());
+        return runProgram(buildFolder / "bin" / "testHost", "testHost", options, folder.path());
+    }
+
+    /// The initialiser of `component` must reach std::terminate, whatever handlers the host has.
+    void expectTerminated(const std::wstring& component, const std::vector<std::string>& options) {
+        const ProgramResult result = runOn(component, options);
+        EXPECT_TRUE(result.finished);
+        EXPECT_EQ(result.output, "terminated\n");
+        EXPECT_EQ(result.exitCode, 99);
     }
 };
 
@@ -19,6 +27,22 @@ TEST_F(EndingHost, IsEndedByTheSystemWhenAnInitialiserThrows) {
     const ProgramResult result = runOn(L"throwsInInitialiser");
     EXPECT_FALSE(result.finished);
     EXPECT_EQ(result.output, "");
+}
+
+TEST_F(EndingHost, IsTerminatedByAnInitialiserThatThrowsThoughItCatchesExceptions) {
+    expectTerminated(L"throwsInInitialiser", {"--catching"});
+}
+
+TEST_F(EndingHost, IsTerminatedByAnInitialiserThatThrowsOnAThread) {
+    expectTerminated(L"throwsInInitialiser", {"--catching", "--in-thread"});
+}
+
+TEST_F(EndingHost, IsTerminatedByAnInitialiserThatEndsItsThread) {
+    expectTerminated(L"endsThreadInInitialiser", {"--catching", "--in-thread"});
+}
+
+TEST_F(EndingHost, IsTerminatedByAFinaliserThatThrows) {
+    expectTerminated(L"throwsInFinaliser", {"--catching"});
 }
 
 TEST_F(EndingHost, IsNotEndedByAnEntryPointThatThrows) {

@@ -150,6 +150,16 @@ TEST_F(HostProgram, StartedFromAFolderWithBlanksSearchesIt) {
               "made Name\nmade name\nmade third\ndone\n");
 }
 
+TEST_F(HostProgram, GetsTheSameAnswersInTheDestructorOfAStaticObject) {
+    add(L"goodWithKit", L"zz" MZ_LIBRARY_EXTENSION);
+    add(L"asksInDestructor");
+    const ProgramResult result = run({"--again-at-end"});
+    EXPECT_TRUE(result.finished);
+    EXPECT_EQ(result.exitCode, 0);
+    const std::string builders = "made asks\nmade counted\nmade kit\n";
+    EXPECT_EQ(result.output, builders + "done\n" + builders);
+}
+
 TEST_F(HostProgram, EndsWellThoughALibraryInitialisesTheManagerAtTheEnd) {
     // The child's library calls nothing by itself; the point is the order of the process's end.
     add(L"initializesAtEnd");

@@ -427,6 +427,37 @@ TEST_F(RecordedLibrary, ThatAsksForItselfWhileItIsLoadedIsLoadedOnce) {
     EXPECT_FALSE(isMapped(file));
 }
 
+ComponentManager::Builder* heldRecord = nullptr;
+
+/// Uses the held record while the library is being loaded.
+void useHeldRecord(const char* event) {
+    if (std::string(event) == "asked" && heldRecord->getBuilder())
+        note("answeredThroughRecord");
+}
+
+TEST_F(RecordedLibrary, ChangedThatUsesAHeldRecordWhileItIsLoadedIsRegisteredOnce) {
+    const auto file = add(L"reentrantInitialiser");
+    ComponentLibrary& library = record(file);
+    heldRecord = &recordBuilder(library, reentrantInitialiserUid, L"as recorded");
+    initialize();
+    touch(file);
+    setManagerUnderTest(manager.get());
+    setHook(useHeldRecord);
+    EXPECT_TRUE(heldRecord->getBuilder());
+    setHook(nullptr);
+    setManagerUnderTest(nullptr);
+    EXPECT_EQ(noted("answeredThroughRecord"), 1);
+    EXPECT_EQ(noted("enumerate"), 1);
+    EXPECT_EQ(names(), (Names{L"initialiser"}));
+    ASSERT_EQ(library.builders.size(), 1u);
+    EXPECT_EQ(indexed(reentrantInitialiserUid), &library.builders.front());
+    EXPECT_EQ(library.fileTime, platform::queryFile(file)->time);
+    EXPECT_TRUE(library.loadedByManager);
+    EXPECT_EQ(maker(reentrantInitialiserUid), "initialiser");
+    restart();
+    EXPECT_FALSE(isMapped(file));
+}
+
 std::vector<const ComponentManager::Builder*>* seenWhileGrowing = nullptr;
 ComponentManager* growing = nullptr;
 

@@ -90,6 +90,38 @@ TEST_F(SoundComponent, StaysLoadedUntilTheManagerIsGoneAndIsUnmappedThen) {
     EXPECT_EQ(noted("goodUnloaded"), 1);
 }
 
+TEST_F(SoundComponent, WrittenWithTheKitAnswersItsOwnStaticDestructorsAndFreesItsBuilders) {
+    const auto file = add(L"asksInDestructor");
+    initialize();
+    EXPECT_EQ(names(), (Names{L"asks", L"counted"}));
+    EXPECT_EQ(maker(asksCountedUid), "asks");
+    EXPECT_EQ(noted("builderGone"), 0);
+    restart();
+    EXPECT_FALSE(isMapped(file));
+    EXPECT_EQ(noted("answeredInDestructor"), 1);
+    EXPECT_EQ(noted("builderGone"), 1);
+}
+
+TEST_F(SoundComponent, WrittenWithTheKitLeavesNoMemoryBehindWhenItIsUnloaded) {
+    add(L"goodWithKit");
+    add(L"asksInDestructor");
+    const auto cycle = [&] {
+        initialize();
+        EXPECT_EQ(maker(kitUid), "kit");
+        EXPECT_EQ(maker(asksCountedUid), "asks");
+        restart();
+        forgetNotes();
+    };
+    for (int warmUp = 0; warmUp < 20; ++warmUp)
+        cycle();
+    constexpr std::size_t cycles = 1000;
+    const std::size_t before = allocatedBytes();
+    for (std::size_t count = 0; count < cycles; ++count)
+        cycle();
+    // Less than a byte for each cycle: what the loader and the heap keep varies a little.
+    EXPECT_LT(allocatedBytes(), before + cycles);
+}
+
 TEST_F(SoundComponent, IsGivenBackEveryCountedDescription) {
     add(L"countedDescription");
     initialize();

@@ -1,8 +1,11 @@
 /// A host to be run by tests: initialises the manager and prints what it found.
 ///
-///     testHost PATH      initialises with that search path
-///     testHost           initialises with null
-///     testHost --locale NAME [PATH]   the same in that locale
+///     testHost [OPTION...] [PATH]   initialises with that search path, by default with null
+///
+///     --locale NAME    sets the process's locale first
+///     --catching       catches what `initialize` throws, and reports a call of std::terminate
+///     --in-thread      initialises on a thread that ends before the rest
+///     --again-at-end   prints the builders again in the destructor of a static object
 ///
 /// One line for each builder, then "done"; a line "made NAME" instead where an object could be
 /// made.
@@ -10,9 +13,12 @@
 
 #include <clocale>
 #include <cstdio>
+#include <cstdlib>
+#include <exception>
 #include <filesystem>
 #include <string>
 #include <string_view>
+#include <thread>
 
 using namespace Mz;
 using namespace Mz::Test;
@@ -32,19 +38,61 @@ class Printer final : public QrEnumerator<QrCPtr<QrBuilderDescription>> {
     }
 };
 
+void printBuilders() {
+    Printer printer;
+    QrGetComponentManager()->enumerateBuilders(printer);
+}
+
+/// Made before the first component is loaded.
+struct AtEnd {
+    ~AtEnd() {
+        if (wanted)
+            printBuilders();
+    }
+    bool wanted = false;
+} atEnd;
+
+[[noreturn]] void reportTermination() {
+    std::puts("terminated");
+    std::fflush(stdout);
+    std::_Exit(99);
+}
+
+void initialize(const wchar_t* path, bool catching) {
+    if (!catching) {
+        QrGetComponentManager()->initialize(path);
+        return;
+    }
+    std::set_terminate(reportTermination);
+    try {
+        QrGetComponentManager()->initialize(path);
+    } catch (const std::exception&) {
+        std::puts("caught");
+    }
+}
+
 } // namespace
 
 int main(int argc, char** argv) {
-    int first = 1;
-    if (argc > 2 && std::string_view(argv[1]) == "--locale") {
-        std::setlocale(LC_ALL, argv[2]);
-        first = 3;
+    bool catching = false;
+    bool inThread = false;
+    int next = 1;
+    for (; next < argc && std::string_view(argv[next]).starts_with("--"); ++next) {
+        const std::string_view option(argv[next]);
+        if (option == "--locale")
+            std::setlocale(LC_ALL, argv[++next]);
+        catching |= option == "--catching";
+        inThread |= option == "--in-thread";
+        atEnd.wanted |= option == "--again-at-end";
     }
-    std::wstring path;
-    for (int index = first; index < argc; ++index)
-        path += std::filesystem::path(argv[index]).wstring();
-    QrGetComponentManager()->initialize(argc > first ? path.c_str() : nullptr);
-    Printer printer;
-    QrGetComponentManager()->enumerateBuilders(printer);
+    std::wstring text;
+    for (int index = next; index < argc; ++index)
+        text += std::filesystem::path(argv[index]).wstring();
+    const wchar_t* const path = argc > next ? text.c_str() : nullptr;
+    if (inThread)
+        std::thread(initialize, path, catching).join();
+    else
+        initialize(path, catching);
+    printBuilders();
     std::puts("done");
 }

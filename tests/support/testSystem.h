@@ -1,6 +1,7 @@
 /// What the tests need of the operating system: one description, one source for each system.
 #pragma once
 
+#include <cstddef>
 #include <filesystem>
 #include <string>
 #include <vector>
@@ -13,6 +14,16 @@ bool isMapped(const std::filesystem::path& library);
 /// Loads a library as a host does that wants it for itself; null when that fails.
 void* loadAsHost(const std::filesystem::path& library);
 void unloadAsHost(void* module);
+
+/// The address of a function that the library exports; null when there is none.
+void* functionOf(void* module, const char* name);
+
+/// How much memory of the C library's heap is in use, in bytes.
+std::size_t allocatedBytes();
+
+/// Ends a copy of this process by `std::exit(0)` and returns its exit code, -1 when the system ended
+/// it. Returns 0 where processes make no copies of themselves.
+int exitCodeOfCopy();
 
 /// Makes the system treat the file as hidden, by its name or its attributes, and returns its path.
 std::filesystem::path hide(const std::filesystem::path& file);

@@ -4,8 +4,12 @@
 #include <dlfcn.h>
 #include <fcntl.h>
 #include <fstream>
+#include <malloc.h>
 #include <sys/wait.h>
 #include <unistd.h>
+
+/// Of the address sanitizer, which has a heap of its own.
+extern "C" __attribute__((weak)) std::size_t __sanitizer_get_current_allocated_bytes();
 
 namespace Mz::Test {
 
@@ -24,6 +28,26 @@ void* loadAsHost(const std::filesystem::path& library) {
 
 void unloadAsHost(void* module) {
     ::dlclose(module);
+}
+
+void* functionOf(void* module, const char* name) {
+    return ::dlsym(module, name);
+}
+
+std::size_t allocatedBytes() {
+    if (__sanitizer_get_current_allocated_bytes)
+        return __sanitizer_get_current_allocated_bytes();
+    const struct mallinfo2 heap = ::mallinfo2();
+    return heap.uordblks + heap.hblkhd;
+}
+
+int exitCodeOfCopy() {
+    const pid_t copy = ::fork();
+    if (copy == 0)
+        std::exit(0);
+    int status = 0;
+    const bool ended = copy > 0 && ::waitpid(copy, &status, 0) == copy && WIFEXITED(status);
+    return ended ? WEXITSTATUS(status) : -1;
 }
 
 std::filesystem::path hide(const std::filesystem::path& file) {

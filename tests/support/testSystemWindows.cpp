@@ -4,6 +4,7 @@
 #include <cstdlib>
 #include <fstream>
 #include <iterator>
+#include <malloc.h>
 #include <windows.h>
 
 namespace Mz::Test {
@@ -41,6 +42,23 @@ void* loadAsHost(const std::filesystem::path& library) {
 
 void unloadAsHost(void* module) {
     ::FreeLibrary(static_cast<HMODULE>(module));
+}
+
+void* functionOf(void* module, const char* name) {
+    return reinterpret_cast<void*>(::GetProcAddress(static_cast<HMODULE>(module), name));
+}
+
+std::size_t allocatedBytes() {
+    std::size_t bytes = 0;
+    _HEAPINFO entry{};
+    while (::_heapwalk(&entry) == _HEAPOK)
+        if (entry._useflag == _USEDENTRY)
+            bytes += entry._size;
+    return bytes;
+}
+
+int exitCodeOfCopy() {
+    return 0;
 }
 
 std::filesystem::path hide(const std::filesystem::path& file) {

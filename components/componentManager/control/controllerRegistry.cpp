@@ -6,7 +6,11 @@
 #include "components/componentManager/support/noDestructor.h"
 #include "components/platform/platform.h"
 
+// Of the system that the build is for.
+#include "threadWord.h"
+
 #include <atomic>
+#include <cstdint>
 #include <mutex>
 #include <thread>
 
@@ -36,16 +40,20 @@ struct ThreadControllers {
 constinit NoDestructor<ThreadControllers> threads;
 
 /// Counts the changes to `threads`, so that a thread knows whether what it remembers still holds.
-constinit std::atomic<std::uint64_t> generation{1};
+constinit std::atomic<std::uintptr_t> generation{1};
 
-/// What a thread found when it last looked. It is checked against the generation, and so a later
-/// thread with the same identifier finds what its predecessor left, as any look-up would.
-struct Remembered {
-    std::uint64_t generation = 0;
-    QrProcessControl* controller = nullptr;
-};
+/// What a thread found when it last looked, and the generation of that. A later thread with the
+/// same identifier finds what its predecessor left, as any look-up would.
+using RememberedGeneration = platform::ThreadWord<struct GenerationName>;
+using RememberedController = platform::ThreadWord<struct ControllerName>;
 
-constinit thread_local Remembered remembered;
+QrProcessControl* rememberedController() {
+    return reinterpret_cast<QrProcessControl*>(RememberedController::get());
+}
+
+bool isRememberedCurrent() {
+    return RememberedGeneration::get() == generation.load(std::memory_order_acquire);
+}
 
 /// In the copy of a process nobody may find the lock taken by a thread that is not there, nor what
 /// was remembered for the identifier that the thread had before.
@@ -60,17 +68,28 @@ struct ForkWatch {
     }
 } const forkWatch;
 
+void clearRegistry() {
+    const std::lock_guard lock(threads.value.mutex);
+    threads.value.byThread.clear();
+    generation.fetch_add(1, std::memory_order_release);
+    RememberedController::release();
+    RememberedGeneration::release();
+}
+MZ_AT_UNLOAD(clearRegistry);
+
 QrProcessControl* lookUp() {
     ThreadControllers& controllers = threads.value;
     const std::lock_guard lock(controllers.mutex);
     QrProcessControl* const* found = controllers.byThread.find(platform::currentThreadId());
-    remembered = {generation.load(std::memory_order_relaxed), found ? *found : nullptr};
-    return remembered.controller;
+    QrProcessControl* const controller = found ? *found : nullptr;
+    if (RememberedController::set(reinterpret_cast<std::uintptr_t>(controller)))
+        RememberedGeneration::set(generation.load(std::memory_order_relaxed));
+    return controller;
 }
 
 QrProcessControl* threadController() {
-    if (remembered.generation == generation.load(std::memory_order_acquire)) [[likely]]
-        return remembered.controller;
+    if (isRememberedCurrent()) [[likely]]
+        return rememberedController();
     return lookUp();
 }
 
@@ -87,9 +106,9 @@ QrProcessControl* threadController() {
 using namespace Mz;
 
 QrProcessControl* QrGetProcessController() {
-    if (remembered.generation != generation.load(std::memory_order_acquire)) [[unlikely]]
+    if (!isRememberedCurrent()) [[unlikely]]
         return lookUpAny();
-    QrProcessControl* controller = remembered.controller;
+    QrProcessControl* controller = rememberedController();
     return controller ? controller : systemController.load(std::memory_order_acquire);
 }
 

@@ -1,6 +1,8 @@
 #include "components/componentManager/manager/componentImpPrivate.h"
 
 #include <cxxabi.h>
+#include <type_traits>
+#include <utility>
 
 namespace Mz {
 
@@ -12,6 +14,36 @@ const wchar_t* textOf(const wchar_t* text) {
     return text ? text : L"";
 }
 
+/// A reference on an object of a component library, given back by hand: its `release` may throw,
+/// which the destructor of a smart reference answers with `std::terminate`.
+template <class T>
+class LibraryReference {
+  public:
+    /// Takes over the reference that `carried` carries.
+    explicit LibraryReference(T* carried) : held(carried) {}
+    /// Gives back what is left when another exception is on its way, which is the one to report.
+    ~LibraryReference() {
+        try {
+            giveBack();
+        } catch (...) { // NOLINT(bugprone-empty-catch)
+        }
+    }
+    LibraryReference(const LibraryReference&) = delete;
+    LibraryReference& operator=(const LibraryReference&) = delete;
+
+    T* get() const { return held; }
+    [[nodiscard]] T* detach() { return std::exchange(held, nullptr); }
+
+    /// Throws what `release` throws; the reference counts as given back all the same.
+    void giveBack() {
+        if (T* const object = detach())
+            const_cast<std::remove_const_t<T>*>(object)->release();
+    }
+
+  private:
+    T* held;
+};
+
 /// Copies each description that a library offers into a record of the library's.
 class AddBuilders final : public QrEnumerator<QrCPtr<QrBuilderDescription>> {
   public:
@@ -19,22 +51,27 @@ class AddBuilders final : public QrEnumerator<QrCPtr<QrBuilderDescription>> {
         : manager(manager), library(library), builders(library.builders) {}
 
     Action process(QrCPtr<QrBuilderDescription> item) override {
-        const auto description =
-            QrCPtr<QrBuilderDescription>::adopt(safeCast<QrBuilderDescription>(item.get()));
-        ComponentManager::Builder record;
-        record.library = &library;
-        record.uid = description->getUid();
-        record.name = textOf(description->getName());
-        record.label = textOf(description->getLabel());
-        record.text = textOf(description->getText());
-        record.number = description->getNumber();
-        record.flag = description->getFlag();
-        ComponentManager::Builder& added = builders.emplace_back(record);
+        LibraryReference<const QrBuilderDescription> description(
+            safeCast<QrBuilderDescription>(item.get()));
+        ComponentManager::Builder& added = builders.emplace_back(recordOf(*description.get()));
         manager.builderIndex[added.uid] = &added;
+        description.giveBack();
         return Continue;
     }
 
   private:
+    ComponentManager::Builder recordOf(const QrBuilderDescription& description) const {
+        ComponentManager::Builder record;
+        record.library = &library;
+        record.uid = description.getUid();
+        record.name = textOf(description.getName());
+        record.label = textOf(description.getLabel());
+        record.text = textOf(description.getText());
+        record.number = description.getNumber();
+        record.flag = description.getFlag();
+        return record;
+    }
+
     ComponentManager& manager;
     ComponentLibrary& library;
     ComponentManager::BuilderList& builders;
@@ -65,17 +102,22 @@ bool ComponentManager::ensureLoaded(ComponentLibrary& library, bool forUse) {
         dropBuilders(library);
         return false;
     }
-    return unchanged || registerLibrary(library, *status);
+    // A client may hold a record whose library has changed, and an initialiser of that library may
+    // use the client: then the library was registered while it was loaded.
+    return unchanged || !library.builders.empty() || registerLibrary(library, *status);
 }
 
 bool ComponentManager::loadModule(ComponentLibrary& library) {
     const platform::NativePath path = library.openingPath();
     const platform::QuietErrors quiet;
     const platform::UsedLibrary used = platform::useLibrary(path, entryPointName);
+    if (used.loaded)
+        platform::keepOwnLibrary();
     // Only now: initialisers of the library may have asked for one of its builders meanwhile, and
     // found it mapped.
     library.module = used.module;
     library.loadedByManager = used.loaded;
+    library.entryPoint = nullptr; // A load that failed may have left an address found meanwhile.
     return used.module != nullptr;
 }
 
@@ -85,10 +127,12 @@ ComponentManager::registerLibrary(ComponentLibrary& library, const platform::Fil
     bool described = false;
     bool failed = false;
     try {
-        const QrPtr<QrComponentDescription> description = getDescription(library);
-        if (description)
-            readDescription(library, *description);
-        described = static_cast<bool>(description);
+        LibraryReference<QrComponentDescription> description(getDescription(library).detach());
+        const bool found = description.get() != nullptr;
+        if (found)
+            readDescription(library, *description.get());
+        description.giveBack();
+        described = found;
     } catch (abi::__forced_unwind&) {
         // The thread is being cancelled, and this is not the exception of anybody's code. Half a
         // description must not pass for a whole one.
@@ -131,19 +175,26 @@ QrPtr<QrComponentDescription> ComponentManager::getDescription(ComponentLibrary&
         unload(library);
         return nullptr;
     }
-    const QrPtr<QrCastable> described = library.entryPoint();
-    return queryCast<QrComponentDescription>(described.get());
+    LibraryReference<QrCastable> described(QrPtr<QrCastable>(library.entryPoint()).detach());
+    LibraryReference<QrComponentDescription> description(
+        queryCast<QrComponentDescription>(described.get()).detach());
+    described.giveBack();
+    return QrPtr<QrComponentDescription>::adopt(description.detach());
 }
 
 QrRefPtr<QrComponentBuilder> ComponentManager::getComponentBuilder(ComponentLibrary& library,
                                                                    const QrUid& uid) {
     if (!ensureLoaded(library, true))
         return nullptr;
-    const QrPtr<QrComponentDescription> description = getDescription(library);
-    if (!description)
+    LibraryReference<QrComponentDescription> description(getDescription(library).detach());
+    if (!description.get())
         return nullptr;
-    const QrRef<QrCastable> builder = description->createBuilder(uid);
-    return queryCast<QrComponentBuilder>(builder.get());
+    LibraryReference<QrCastable> created(description.get()->createBuilder(uid).detach());
+    LibraryReference<QrComponentBuilder> builder(
+        queryCast<QrComponentBuilder>(created.get()).detach());
+    created.giveBack();
+    description.giveBack();
+    return QrRefPtr<QrComponentBuilder>::adopt(builder.detach());
 }
 
 void ComponentManager::unload(ComponentLibrary& library) {

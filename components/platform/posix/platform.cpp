@@ -16,6 +16,7 @@
 #include <pthread.h>
 #include <span>
 #include <sys/stat.h>
+#include <type_traits>
 #include <unistd.h>
 
 namespace Mz::platform {
@@ -141,6 +142,18 @@ bool isCodeOf(Module module, void* address) {
     return false;
 }
 
+/// Calls a function of the loader that runs initialisers or finalisers of libraries.
+///
+/// What they throw ends the process here: once it has passed the loader, the loader's lock is never
+/// released. So does the end of the thread, which unwinds the stack, too. The pointer is volatile
+/// because the C library declares these functions as not throwing: a compiler that knew which one
+/// it calls would drop the guard.
+template <class Result, class... Args>
+Result callLoader(Result (*function)(Args...), std::type_identity_t<Args>... args) noexcept {
+    Result (*const volatile unknown)(Args...) = function;
+    return unknown(args...);
+}
+
 /// How many libraries the process has ever mapped.
 unsigned long long mappingCount() {
     unsigned long long count = 0;
@@ -245,7 +258,7 @@ bool exportsFunction(const NativePath& path, const char* symbol) {
 }
 
 Module loadLibrary(const NativePath& path) {
-    const Module module = ::dlopen(path.c_str(), RTLD_NOW | RTLD_LOCAL);
+    const Module module = callLoader(::dlopen, path.c_str(), RTLD_NOW | RTLD_LOCAL);
     if (!module)
         ::dlerror(); // The message belongs to nobody.
     return module;
@@ -265,7 +278,22 @@ UsedLibrary useLibrary(const NativePath& path, const char* symbol) {
 
 void unloadLibrary(Module module) {
     if (module)
-        ::dlclose(module);
+        callLoader(::dlclose, module);
+}
+
+void keepOwnLibrary() {
+    static const Module own = [] {
+        Dl_info ignored;
+        void* entry = nullptr;
+        const auto* here = reinterpret_cast<const void*>(&keepOwnLibrary);
+        if (::dladdr1(here, &ignored, &entry, RTLD_DL_LINKMAP) == 0)
+            return Module();
+        // Never given back. The loader knows the library by this name, whatever is in the file now;
+        // a program has none.
+        const char* const name = static_cast<const link_map*>(entry)->l_name;
+        return *name ? ::dlopen(name, RTLD_LAZY | RTLD_NOLOAD) : nullptr;
+    }();
+    static_cast<void>(own);
 }
 
 void* findSymbol(Module module, const char* symbol) {

@@ -203,6 +203,9 @@ void unloadLibrary(Module module) {
         ::FreeLibrary(static_cast<HMODULE>(module));
 }
 
+// While a process ends, the system unloads nothing; until then the components keep it loaded.
+void keepOwnLibrary() {}
+
 void* findSymbol(Module module, const char* symbol) {
     if (!module)
         return nullptr;

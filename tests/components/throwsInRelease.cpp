@@ -1,0 +1,44 @@
+/// Its description throws from `release`, from the MZ_TEST_RELEASE-th call on.
+///
+/// A registration releases twice: the pointer of the entry point, and the interface cast from it.
+/// So does each request for a builder.
+#include "tests/components/testUids.h"
+
+#include <stdexcept>
+#include <string>
+
+using namespace Mz;
+using namespace Mz::Test;
+
+namespace {
+
+/// Its code lives in this library, which must stay loaded while it exists.
+class OwnException final : public std::runtime_error {
+  public:
+    OwnException() : std::runtime_error("in release") { note("exceptionMade"); }
+    OwnException(const OwnException& other) : std::runtime_error(other) { note("exceptionMade"); }
+    ~OwnException() override { note("exceptionGone"); }
+};
+
+struct Presence {
+    ~Presence() { note("throwerUnloaded"); }
+} presence;
+
+class Description final : public PlainDescription {
+  public:
+    using PlainDescription::PlainDescription;
+    long newReference() override { return note("taken"), 1; }
+    long release() override {
+        note("released");
+        if (++releases >= MZ_TEST_RELEASE)
+            throw OwnException();
+        return 1;
+    }
+
+  private:
+    int releases = 0;
+};
+
+} // namespace
+
+MZ_PLAIN_ENTRY_POINT(Description, "release", {{faultyUid, L"release throws"}})
