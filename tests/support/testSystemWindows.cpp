@@ -6,6 +6,8 @@
 #include <iterator>
 #include <windows.h>
 
+#include <tlhelp32.h>
+
 namespace Mz::Test {
 
 namespace {
@@ -46,6 +48,18 @@ void unloadAsHost(void* module) {
 std::filesystem::path hide(const std::filesystem::path& file) {
     ::SetFileAttributesW(file.c_str(), FILE_ATTRIBUTE_HIDDEN);
     return file;
+}
+
+bool hasChildProcess() {
+    const HANDLE processes = ::CreateToolhelp32Snapshot(TH32CS_SNAPPROCESS, 0);
+    PROCESSENTRY32W entry{};
+    entry.dwSize = sizeof entry;
+    bool found = false;
+    for (BOOL more = ::Process32FirstW(processes, &entry); more && !found;
+         more = ::Process32NextW(processes, &entry))
+        found = entry.th32ParentProcessID == ::GetCurrentProcessId();
+    ::CloseHandle(processes);
+    return found;
 }
 
 void setEnvironment(const std::string& name, const std::string& value) {
