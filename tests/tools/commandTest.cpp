@@ -49,6 +49,33 @@ TEST_F(Command, WrongUseEndsWithTwo) {
     EXPECT_EQ(run({"scan", "--cache", "x", "--time-limit", "nan"}).exitCode, 2);
     EXPECT_EQ(run({"types", "--path", ""}).exitCode, 2);
     EXPECT_EQ(run({"types", "--path", ";;"}).exitCode, 2);
+    EXPECT_EQ(run({"explain", "x", "--cache", ""}).exitCode, 2);
+    EXPECT_EQ(run({"import", "x", "--save", ""}).exitCode, 2);
+    EXPECT_EQ(run({"graph", "--output", ""}).exitCode, 2);
+    EXPECT_EQ(run({"graph", "--svg", ""}).exitCode, 2);
+}
+
+TEST_F(Command, AnEmptyNameOfTheListIsWrongUse) {
+    add(L"goodWithKit");
+    const ProgramResult result = run({"scan", "--path", path(), "--cache", ""});
+    EXPECT_EQ(result.exitCode, 2);
+    EXPECT_EQ(result.output, "");
+}
+
+TEST_F(Command, LeavesNoVerdictsBesideAFolderThatIsNamedAsTheList) {
+    add(L"crashesInEntryPoint");
+    for (const char* name : {"empty", "full"})
+        std::filesystem::create_directory(work.path() / name);
+    std::ofstream(work.path() / "full" / "file") << "content";
+    for (const char* name : {"empty", "full"}) {
+        const Json result = json(1, {"scan", "--cache", inWork(name)});
+        EXPECT_EQ(result.at("notWritten"), "nothing was written, for this is a folder") << name;
+        EXPECT_EQ(result.at("files").at(0).at("verdict"), "crashed");
+    }
+    int entries = 0;
+    for (const auto& entry : std::filesystem::directory_iterator(work.path()))
+        entries += entry.is_directory() ? 1 : 100;
+    EXPECT_EQ(entries, 2);
 }
 
 TEST_F(Command, HelpSaysWhatEachDoesWithAnExample) {
