@@ -219,6 +219,35 @@ TEST_F(Command, GoesOnWhateverAComponentThrows) {
                 HasSubstr("no exception of any known kind"));
 }
 
+TEST_F(Command, EndsWithOneWhenAComponentExits) {
+    add(L"notes");
+    add(L"exitsInImport");
+    std::ofstream(work.path() / "one.note", std::ios::binary) << "N1";
+    std::ofstream(work.path() / "two.exit", std::ios::binary) << "E";
+    const ProgramResult lines = run({"import", "one.note", "two.exit", "--path", path()});
+    EXPECT_EQ(lines.exitCode, 1);
+    EXPECT_THAT(lines.output, StartsWith("one.note: imported through \"notes\""));
+    EXPECT_EQ(run({"import", "one.note", "two.exit", "--path", path(), "--json"}).exitCode, 1);
+    EXPECT_EQ(run({"import", "one.note", "two.exit", "--path", path(), "--save", "saved"}).exitCode,
+              1);
+    EXPECT_FALSE(std::filesystem::exists(work.path() / "saved"));
+    EXPECT_EQ(run({"graph", "--path", path()}).exitCode, 1);
+    EXPECT_EQ(run({"types", "--path", path()}).exitCode, 0);
+}
+
+TEST_F(Command, EndsWithOneWhereALibraryIsFaulty) {
+    add(L"notes");
+    add(L"crashesInEntryPoint");
+    std::ofstream(work.path() / "one.note", std::ios::binary) << "N1";
+    EXPECT_EQ(json(1, {"types"}).at("types").size(), 1u);
+    EXPECT_EQ(json(1, {"graph"}).at("libraries").size(), 1u);
+    // What was asked for is done all the same.
+    const Json files = json(1, {"import", "one.note", "--save", inWork("saved")}).at("files");
+    EXPECT_TRUE(files.at(0).at("imported"));
+    EXPECT_TRUE(std::filesystem::exists(work.path() / "saved"));
+    EXPECT_EQ(json(1, {"show", inWork("saved")}).at("objects").size(), 5u);
+}
+
 TEST_F(Command, TakesNamesInBracketsAsTheyAre) {
     EXPECT_EQ(json(1, {"explain", "[a,b]"}).at("files").size(), 1u);
     const auto file = json(1, {"explain", "[x]"}).at("files").at(0).at("file").get<std::string>();
@@ -266,7 +295,6 @@ TEST_F(Command, EndsWithOneWhereAFolderCannotBeSearched) {
 
 TEST_F(Command, TypesListsWhatComponentsImport) {
     add(L"notes");
-    add(L"crashesInEntryPoint");
     const Json types = json(0, {"types"}).at("types");
     ASSERT_EQ(types.size(), 1u);
     EXPECT_EQ(types[0].at("name"), "notes");

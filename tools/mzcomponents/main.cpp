@@ -1,5 +1,6 @@
 /// mzcomponents: looks at component libraries, and uses them, from the command line.
 #include "tools/mzcomponents/commands.h"
+#include "tools/mzcomponents/exitGuard.h"
 #include "tools/mzcomponents/output.h"
 
 #include "components/componentTools/standardOutput.h"
@@ -206,6 +207,7 @@ int runGuarded(const std::vector<std::string>& words) {
 int main(int argc, char** argv) {
     Mz::Tools::prepareProgram();
     const int status = runGuarded(Mz::Tools::argumentsOfProcess(argc, argv));
+    commandIsDone();
     if (flushResults())
         return status;
     complain(L"the output could not be written");
