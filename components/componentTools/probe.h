@@ -25,7 +25,8 @@ struct ProbeOptions {
     std::uint64_t memoryLimit = std::uint64_t{1} << 30;
     /// The program to run; empty for the one beside libMZcomponentTools.
     std::filesystem::path program;
-    /// Asked now and then; true ends the process. Empty for never.
+    /// Asked now and then; true ends the process, and so does an exception, which is passed on.
+    /// Empty for never.
     std::function<bool()> interrupted;
 };
 

@@ -43,8 +43,6 @@ class ListReader {
         library.position = position();
         library.directory = readName();
         library.fileName = readName();
-        if (library.fileName.find(L'\\') != std::wstring::npos)
-            throw std::runtime_error("a file name with a separator");
         int64 size = 0;
         unsigned int count = 0;
         stream >> library.time >> size >> count;
@@ -81,7 +79,8 @@ class ListReader {
         return text;
     }
 
-    /// Names are recorded in their normal form.
+    /// Names are recorded in their normal form. A file name may hold a back-slash: some systems take
+    /// it for a character like any other.
     std::wstring readName() {
         std::wstring name = readText();
         if (name.empty() || name.find(L'/') != std::wstring::npos ||

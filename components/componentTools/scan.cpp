@@ -62,15 +62,20 @@ class Scanner {
     }
 
     void write() {
-        if (unprobed > 0 && probed == 0)
+        std::error_code failure;
+        if (std::filesystem::is_directory(options.list, failure))
+            result.notWritten = L"nothing was written, for this is a folder";
+        else if (unprobed > 0 && probed == 0)
             result.notWritten = L"nothing was written, for no library could be tried";
         else if (!result.rejected.empty() && !keepRejected())
             result.notWritten = L"nothing was written, for what is there could not be kept";
         if (!result.notWritten.empty())
             return;
-        // Without the verdicts a little more is tried again, so the list is written anyway.
-        writeGuarded([&] { writeVerdicts(verdictsFileOf(options.list), result.libraries); });
         writeGuarded([&] { writeRecordedList(options.list, result.libraries); });
+        // Verdicts are of no use beside a list that was not written. A list without them is: a
+        // little more is tried again.
+        if (result.notWritten.empty())
+            writeGuarded([&] { writeVerdicts(verdictsFileOf(options.list), result.libraries); });
     }
 
     template <class Write>

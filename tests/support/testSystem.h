@@ -28,6 +28,10 @@ int exitCodeOfCopy();
 /// Makes the system treat the file as hidden, by its name or its attributes, and returns its path.
 std::filesystem::path hide(const std::filesystem::path& file);
 
+/// Whether a process that this one started still runs. Where ended processes wait to be asked for
+/// their status, one that was not asked counts as well.
+bool hasChildProcess();
+
 void setEnvironment(const std::string& name, const std::string& value);
 
 /// `path` as a search path that works on this system: absolute, and in the system's spelling.

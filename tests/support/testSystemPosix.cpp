@@ -56,6 +56,11 @@ std::filesystem::path hide(const std::filesystem::path& file) {
     return hidden;
 }
 
+bool hasChildProcess() {
+    siginfo_t ended{};
+    return ::waitid(P_ALL, 0, &ended, WEXITED | WNOHANG | WNOWAIT) == 0;
+}
+
 void setEnvironment(const std::string& name, const std::string& value) {
     ::setenv(name.c_str(), value.c_str(), 1);
 }

@@ -7,6 +7,8 @@
 #include <malloc.h>
 #include <windows.h>
 
+#include <tlhelp32.h>
+
 namespace Mz::Test {
 
 namespace {
@@ -64,6 +66,18 @@ int exitCodeOfCopy() {
 std::filesystem::path hide(const std::filesystem::path& file) {
     ::SetFileAttributesW(file.c_str(), FILE_ATTRIBUTE_HIDDEN);
     return file;
+}
+
+bool hasChildProcess() {
+    const HANDLE processes = ::CreateToolhelp32Snapshot(TH32CS_SNAPPROCESS, 0);
+    PROCESSENTRY32W entry{};
+    entry.dwSize = sizeof entry;
+    bool found = false;
+    for (BOOL more = ::Process32FirstW(processes, &entry); more && !found;
+         more = ::Process32NextW(processes, &entry))
+        found = entry.th32ParentProcessID == ::GetCurrentProcessId();
+    ::CloseHandle(processes);
+    return found;
 }
 
 void setEnvironment(const std::string& name, const std::string& value) {

@@ -49,6 +49,33 @@ TEST_F(Command, WrongUseEndsWithTwo) {
     EXPECT_EQ(run({"scan", "--cache", "x", "--time-limit", "nan"}).exitCode, 2);
     EXPECT_EQ(run({"types", "--path", ""}).exitCode, 2);
     EXPECT_EQ(run({"types", "--path", ";;"}).exitCode, 2);
+    EXPECT_EQ(run({"explain", "x", "--cache", ""}).exitCode, 2);
+    EXPECT_EQ(run({"import", "x", "--save", ""}).exitCode, 2);
+    EXPECT_EQ(run({"graph", "--output", ""}).exitCode, 2);
+    EXPECT_EQ(run({"graph", "--svg", ""}).exitCode, 2);
+}
+
+TEST_F(Command, AnEmptyNameOfTheListIsWrongUse) {
+    add(L"goodWithKit");
+    const ProgramResult result = run({"scan", "--path", path(), "--cache", ""});
+    EXPECT_EQ(result.exitCode, 2);
+    EXPECT_EQ(result.output, "");
+}
+
+TEST_F(Command, LeavesNoVerdictsBesideAFolderThatIsNamedAsTheList) {
+    add(L"crashesInEntryPoint");
+    for (const char* name : {"empty", "full"})
+        std::filesystem::create_directory(work.path() / name);
+    std::ofstream(work.path() / "full" / "file") << "content";
+    for (const char* name : {"empty", "full"}) {
+        const Json result = json(1, {"scan", "--cache", inWork(name)});
+        EXPECT_EQ(result.at("notWritten"), "nothing was written, for this is a folder") << name;
+        EXPECT_EQ(result.at("files").at(0).at("verdict"), "crashed");
+    }
+    int entries = 0;
+    for (const auto& entry : std::filesystem::directory_iterator(work.path()))
+        entries += entry.is_directory() ? 1 : 100;
+    EXPECT_EQ(entries, 2);
 }
 
 TEST_F(Command, HelpSaysWhatEachDoesWithAnExample) {
@@ -192,6 +219,35 @@ TEST_F(Command, GoesOnWhateverAComponentThrows) {
                 HasSubstr("no exception of any known kind"));
 }
 
+TEST_F(Command, EndsWithOneWhenAComponentExits) {
+    add(L"notes");
+    add(L"exitsInImport");
+    std::ofstream(work.path() / "one.note", std::ios::binary) << "N1";
+    std::ofstream(work.path() / "two.exit", std::ios::binary) << "E";
+    const ProgramResult lines = run({"import", "one.note", "two.exit", "--path", path()});
+    EXPECT_EQ(lines.exitCode, 1);
+    EXPECT_THAT(lines.output, StartsWith("one.note: imported through \"notes\""));
+    EXPECT_EQ(run({"import", "one.note", "two.exit", "--path", path(), "--json"}).exitCode, 1);
+    EXPECT_EQ(run({"import", "one.note", "two.exit", "--path", path(), "--save", "saved"}).exitCode,
+              1);
+    EXPECT_FALSE(std::filesystem::exists(work.path() / "saved"));
+    EXPECT_EQ(run({"graph", "--path", path()}).exitCode, 1);
+    EXPECT_EQ(run({"types", "--path", path()}).exitCode, 0);
+}
+
+TEST_F(Command, EndsWithOneWhereALibraryIsFaulty) {
+    add(L"notes");
+    add(L"crashesInEntryPoint");
+    std::ofstream(work.path() / "one.note", std::ios::binary) << "N1";
+    EXPECT_EQ(json(1, {"types"}).at("types").size(), 1u);
+    EXPECT_EQ(json(1, {"graph"}).at("libraries").size(), 1u);
+    // What was asked for is done all the same.
+    const Json files = json(1, {"import", "one.note", "--save", inWork("saved")}).at("files");
+    EXPECT_TRUE(files.at(0).at("imported"));
+    EXPECT_TRUE(std::filesystem::exists(work.path() / "saved"));
+    EXPECT_EQ(json(1, {"show", inWork("saved")}).at("objects").size(), 5u);
+}
+
 TEST_F(Command, TakesNamesInBracketsAsTheyAre) {
     EXPECT_EQ(json(1, {"explain", "[a,b]"}).at("files").size(), 1u);
     const auto file = json(1, {"explain", "[x]"}).at("files").at(0).at("file").get<std::string>();
@@ -239,7 +295,6 @@ TEST_F(Command, EndsWithOneWhereAFolderCannotBeSearched) {
 
 TEST_F(Command, TypesListsWhatComponentsImport) {
     add(L"notes");
-    add(L"crashesInEntryPoint");
     const Json types = json(0, {"types"}).at("types");
     ASSERT_EQ(types.size(), 1u);
     EXPECT_EQ(types[0].at("name"), "notes");

@@ -109,10 +109,17 @@ TEST_F(RecordedListFile, RejectsWhatIsForeign) {
 }
 
 TEST_F(RecordedListFile, RejectsNamesThatAreNotNormalised) {
-    for (const wchar_t* name : {L"A", L"a/b", L"", L"a\\b"}) {
+    for (const wchar_t* name : {L"A", L"a/b", L""}) {
         writeRecordedList(file(), {{L"\\a", name, 1, 1, {}}});
         EXPECT_EQ(readRecordedList(file()).state, ListReading::State::rejected);
     }
+}
+
+TEST_F(RecordedListFile, AcceptsABackSlashInAFileName) {
+    writeRecordedList(file(), {{L"\\a", L"a\\b.so", 1, 1, {}}});
+    const ListReading reading = readRecordedList(file());
+    ASSERT_EQ(reading.state, ListReading::State::good) << toUtf8(reading.reason);
+    EXPECT_EQ(reading.libraries[0].fileName, L"a\\b.so");
 }
 
 TEST_F(RecordedListFile, WhatCannotBeWrittenLeavesTheOldFile) {

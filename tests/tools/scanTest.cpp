@@ -193,6 +193,13 @@ TEST_F(Scan, WritesTheListWhereItsVerdictsCannotBeWritten) {
     EXPECT_EQ(readRecordedList(list()).libraries.size(), 1u);
 }
 
+TEST_F(Scan, LeavesNoVerdictsBesideAListThatCannotBeWritten) {
+    add(L"crashesInEntryPoint");
+    std::filesystem::create_directory(list());
+    EXPECT_NE(scan(options()).notWritten, L"");
+    EXPECT_FALSE(std::filesystem::exists(verdictsFileOf(list())));
+}
+
 TEST_F(Scan, BelievesNoVerdictThatNoScanCanHaveKept) {
     add(L"crashesInEntryPoint");
     scan(options());

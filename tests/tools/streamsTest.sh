@@ -38,6 +38,7 @@ lost() { # lost ARGUMENTS...: it says so when its output cannot be written
 
 copy notes good
 copy talkativeImporter good
+copy exitsInImport exits
 copy crashesInEntryPoint bad
 lost --version
 lost --help
@@ -48,9 +49,15 @@ lost scan --path good --cache list
 
 expect 1 'missing: there is no such file' types --path missing
 expect 1 'missing: there is no such file' graph --path 'good;missing'
-expect 0 'crashesInEntryPoint.*: it crashes in its entry point' types --path bad
+expect 1 'crashesInEntryPoint.*: it crashes in its entry point' types --path bad
 expect 0 'this is no result' types --path good
 expect 2 'names no folder' types --path ''
+
+# A component that ends the program shows by what it was asked for.
+printf E >file.exit
+ended='a component ended the program while "exits"'
+expect 1 "$ended imported file.exit" import --path exits file.exit
+expect 1 "$ended made an object" graph --path exits
 
 touch empty
 expect 1 'empty: the file is empty' show empty

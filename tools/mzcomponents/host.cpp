@@ -1,4 +1,5 @@
 #include "tools/mzcomponents/host.h"
+#include "tools/mzcomponents/exitGuard.h"
 #include "tools/mzcomponents/output.h"
 
 #include "components/componentManager/binaryStream.h"
@@ -105,6 +106,7 @@ void tellOfDoubt(Tools::ConsoleController& controller, const std::filesystem::pa
 
 Host::Host(const Common& common) {
     reserveResults();
+    guardExit();
     Tools::ScanOptions options;
     options.folders = Tools::foldersOf(Tools::pathOf(common.path));
     if (!common.cache.empty())
@@ -123,8 +125,8 @@ void Host::tellFaults(const std::string& cache) {
         if (!isFault(file.verdict))
             continue;
         controller.error(0, (shown(file.path) + L": " + Tools::sentenceOf(file.verdict)).c_str());
-        // A faulty library is passed over, as in any host. A folder is what was asked for.
-        complete = complete && !file.folder && file.verdict.verdict != Tools::Verdict::probeFailed;
+        // It is passed over, as in any host, but an error is never a success.
+        complete = false;
     }
 }
 
@@ -154,6 +156,7 @@ void Host::start(const std::vector<std::filesystem::path>& folders) {
     if (searchPath.empty())
         return; // The manager would take the folder of this program instead.
     giveToManager(scanned.libraries);
+    const Activity activity(L"the component manager started");
     QrGetComponentManager()->initialize(searchPath.c_str());
 }
 

@@ -1,4 +1,5 @@
 /// The commands that use components: types, import, graph.
+#include "tools/mzcomponents/exitGuard.h"
 #include "tools/mzcomponents/host.h"
 #include "tools/mzcomponents/output.h"
 
@@ -28,12 +29,18 @@ class FamilyImporter final : public QrCastImpl<FamilyImporter, QrBaseImporter> {
     std::wstring name;
 };
 
+/// For messages.
+std::wstring quoted(const wchar_t* name) {
+    return L"\"" + std::wstring(name) + L"\"";
+}
+
 /// The names of all builders that import files, those first that read the file's extension.
 std::vector<std::wstring> familiesFor(const Host& host, const std::filesystem::path& file) {
     std::vector<std::wstring> reading, others;
     const std::wstring name = Tools::displayName(file);
     const std::wstring extension = name.substr(name.rfind(L'.') + 1);
     for (const QrCPtr<QrBuilderDescription>& builder : host.builders()) {
+        const Activity activity(quoted(builder->getName()) + L" was asked what it imports");
         const QrCPtr<QrImportBuilder> importer = importBuilder(*builder);
         if (!importer)
             continue;
@@ -61,6 +68,7 @@ struct Imported {
 Imported importThrough(const std::vector<std::wstring>& families, const std::wstring& name) {
     Imported imported;
     for (const std::wstring& family : families) {
+        const Activity activity(quoted(family.c_str()) + L" imported " + name);
         try {
             bool found = false;
             imported.object = FamilyImporter(family).import(name.c_str(), nullptr, found);
@@ -122,6 +130,7 @@ void tell(Host& host, const std::filesystem::path& file, const Imported& importe
 
 /// Writes the objects one after the other; they are complete or not written at all.
 void save(const std::vector<QrRef<QrCastable>>& objects, const std::filesystem::path& file) {
+    const Activity activity(L"its objects were stored");
     std::ostringstream content;
     QrOutBuffer bytes(&content);
     {
@@ -145,6 +154,7 @@ bool isOneOf(const std::filesystem::path& file, const std::vector<std::string>& 
 std::vector<Tools::GraphImporter> importersOf(const Host& host) {
     std::vector<Tools::GraphImporter> importers;
     for (const QrCPtr<QrBuilderDescription>& builder : host.builders()) {
+        const Activity activity(quoted(builder->getName()) + L" made an object");
         try {
             const QrRef<QrCastable> object =
                 QrGetComponentManager()->createObject(builder->getUid());
@@ -182,6 +192,7 @@ int types(const Common& common) {
         return subjectIsWrong;
     Json all = Json::array();
     for (const QrCPtr<QrBuilderDescription>& builder : host.builders()) {
+        const Activity activity(quoted(builder->getName()) + L" was asked what it imports");
         const QrCPtr<QrImportBuilder> importer = importBuilder(*builder);
         if (!importer)
             continue;

@@ -1,5 +1,6 @@
 /// mzcomponents: looks at component libraries, and uses them, from the command line.
 #include "tools/mzcomponents/commands.h"
+#include "tools/mzcomponents/exitGuard.h"
 #include "tools/mzcomponents/output.h"
 
 #include "components/componentTools/standardOutput.h"
@@ -35,6 +36,10 @@ std::string namesAFolder(const std::string& path) {
     return path.find_first_not_of(';') == std::string::npos ? "it names no folder" : "";
 }
 
+std::string namesAFile(const std::string& path) {
+    return path.empty() ? "it names no file" : "";
+}
+
 std::string isFinite(const std::string& number) {
     double value = 0;
     return CLI::detail::lexical_cast(number, value) && std::isfinite(value) ? "" : "no number";
@@ -58,7 +63,7 @@ CLI::App* addCommand(CLI::App& app, Arguments& arguments, const char* name, cons
 }
 
 void addCache(CLI::App* command, Arguments& arguments, const char* text) {
-    command->add_option("--cache", arguments.common.cache, text);
+    command->add_option("--cache", arguments.common.cache, text)->check(namesAFile);
 }
 
 void addLimits(CLI::App* command, Arguments& arguments) {
@@ -109,7 +114,8 @@ void addLookCommands(CLI::App& app, Arguments& arguments) {
         "host that reads it loads none of these libraries at start.",
         "mzcomponents scan --cache ~/.cache/app/components.list --path /opt/app/components");
     scan->add_option("--cache", arguments.common.cache, "The recorded list to bring up to date")
-        ->required();
+        ->required()
+        ->check(namesAFile);
     scan->add_flag("--retry", arguments.probe.retry, "Try libraries that failed earlier again");
     addLimits(scan, arguments);
     scan->callback([&] {
@@ -129,8 +135,10 @@ void addUseCommands(CLI::App& app, Arguments& arguments) {
                                     "Imports files through whichever component can read them.",
                                     "mzcomponents import part.obj --path /opt/app/components");
     importer->add_option("FILE", arguments.import.files, "The files")->required();
-    importer->add_option("--save", arguments.import.save,
-                         "Store the imported objects in this file, if all of them can be stored");
+    importer
+        ->add_option("--save", arguments.import.save,
+                     "Store the imported objects in this file, if all of them can be stored")
+        ->check(namesAFile);
     addCache(importer, arguments, updatedCache);
     importer->callback([&] {
         arguments.command = [&] {
@@ -152,10 +160,14 @@ void addUseCommands(CLI::App& app, Arguments& arguments) {
         addCommand(app, arguments, "graph",
                    "Draws the libraries, their builders, and the importers that use them, as DOT.",
                    "mzcomponents graph --path /opt/app/components --svg components.svg");
-    graph->add_option("--output", arguments.graph.output,
-                      "Write the DOT text to this file and not to standard output");
-    graph->add_option("--svg", arguments.graph.svg,
-                      "Have Graphviz, which must be installed, draw it to this file");
+    graph
+        ->add_option("--output", arguments.graph.output,
+                     "Write the DOT text to this file and not to standard output")
+        ->check(namesAFile);
+    graph
+        ->add_option("--svg", arguments.graph.svg,
+                     "Have Graphviz, which must be installed, draw it to this file")
+        ->check(namesAFile);
     addCache(graph, arguments, updatedCache);
     graph->callback([&] {
         arguments.command = [&] { return Mz::Commands::graph(arguments.common, arguments.graph); };
@@ -195,6 +207,7 @@ int runGuarded(const std::vector<std::string>& words) {
 int main(int argc, char** argv) {
     Mz::Tools::prepareProgram();
     const int status = runGuarded(Mz::Tools::argumentsOfProcess(argc, argv));
+    commandIsDone();
     if (flushResults())
         return status;
     complain(L"the output could not be written");

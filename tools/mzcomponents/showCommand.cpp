@@ -1,4 +1,5 @@
 /// The command that shows what is in a file: show.
+#include "tools/mzcomponents/exitGuard.h"
 #include "tools/mzcomponents/host.h"
 #include "tools/mzcomponents/output.h"
 
@@ -142,6 +143,7 @@ int showObjects(const Common& common, const std::filesystem::path& file, std::is
     Host host(common);
     if (host.interrupted())
         return subjectIsWrong;
+    const Activity activity(L"the objects of " + Tools::displayName(file) + L" were read");
     Objects objects = readObjects(input);
     const bool nothing = !objects.failure.empty() && objects.frames.size() <= 1;
     if (nothing)

@@ -107,6 +107,7 @@ struct ChildResult {
 
 /// Runs a program without standard input and standard error, and waits for its end. Kills it, and
 /// what it has started, at a limit.
+/// \throws what `limits.interrupted` throws, after the program was killed.
 ChildResult runChild(const NativePath& program, const std::vector<NativePath>& arguments,
                      const ChildLimits& limits);
 

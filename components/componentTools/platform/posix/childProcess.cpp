@@ -89,11 +89,21 @@ const wchar_t* signalName(int number) {
     }
 }
 
-/// One child from its start to its end.
+/// One child from its start to its end. The destructor kills and reaps a child that still runs: the
+/// caller's question may throw, and so may the growth of the collected output.
 class Watch {
   public:
     Watch(pid_t process, int pipe, const ChildLimits& allowed)
         : child(process), output(pipe), limits(allowed), end(Clock::now() + allowed.time) {}
+    ~Watch() {
+        if (reaped)
+            return;
+        ::kill(-child, SIGKILL);
+        while (::waitpid(child, nullptr, 0) < 0 && errno == EINTR)
+            continue;
+    }
+    Watch(const Watch&) = delete;
+    Watch& operator=(const Watch&) = delete;
 
     ChildResult result() {
         int status = 0;
@@ -141,7 +151,8 @@ class Watch {
         const pid_t ended = ::wait4(child, &status, judged ? 0 : WNOHANG, &usage);
         // In a process that ignores the ends of its children, the system keeps none for it.
         unknown = ended < 0 && errno == ECHILD;
-        return ended == child || (ended < 0 && errno != EINTR);
+        reaped = ended == child || (ended < 0 && errno != EINTR);
+        return reaped;
     }
 
     void waitForOutput() {
@@ -199,6 +210,7 @@ class Watch {
     Clock::time_point end;
     ChildResult judgement;
     bool judged = false;
+    bool reaped = false;
     bool closed = false;
     bool unknown = false;
 };

@@ -115,11 +115,20 @@ bool start(const NativePath& program, const std::vector<NativePath>& arguments, 
     return true;
 }
 
-/// One child from its start to its end.
+/// One child from its start to its end. The destructor ends a child that still runs and waits for
+/// that: the caller's question may throw, and so may the growth of the collected output.
 class Watch {
   public:
     Watch(HANDLE process, HANDLE pipe, const ChildLimits& allowed)
         : child(process), output(pipe), limits(allowed), end(Clock::now() + allowed.time) {}
+    ~Watch() {
+        if (::WaitForSingleObject(child, 0) != WAIT_TIMEOUT)
+            return;
+        ::TerminateProcess(child, 1);
+        ::WaitForSingleObject(child, INFINITE);
+    }
+    Watch(const Watch&) = delete;
+    Watch& operator=(const Watch&) = delete;
 
     ChildResult result() {
         while (::WaitForSingleObject(child, readOutput() ? 0 : pause) == WAIT_TIMEOUT)

@@ -1,0 +1,65 @@
+/// The guard is an exit handler, so it needs no cooperation of the component. It runs after the
+/// destructors of the components' static objects, which were made later, and ends the process
+/// itself because a handler cannot change the status that `exit` was given.
+#include "tools/mzcomponents/exitGuard.h"
+#include "tools/mzcomponents/commands.h"
+#include "tools/mzcomponents/output.h"
+
+#include <cstdlib>
+#include <mutex>
+#include <utility>
+
+namespace Mz::Commands {
+
+namespace {
+
+/// A component's own thread may call `exit` as well. Never destroyed: exit handlers use it.
+struct State {
+    std::mutex mutex;
+    std::wstring activity;
+    bool guarded = false, done = false;
+};
+
+State& state() {
+    static State& only = *new State;
+    return only;
+}
+
+std::wstring exchangeActivity(std::wstring activity) {
+    const std::lock_guard lock(state().mutex);
+    return std::exchange(state().activity, std::move(activity));
+}
+
+void onExit() {
+    std::wstring text = L"a component ended the program";
+    {
+        const std::lock_guard lock(state().mutex);
+        if (state().done)
+            return;
+        if (!state().activity.empty())
+            text += L" while " + state().activity;
+    }
+    flushResults();
+    complain(text);
+    std::_Exit(subjectIsWrong);
+}
+
+} // namespace
+
+void guardExit() {
+    if (!std::exchange(state().guarded, true))
+        std::atexit(onExit);
+}
+
+void commandIsDone() {
+    const std::lock_guard lock(state().mutex);
+    state().done = true;
+}
+
+Activity::Activity(std::wstring what) : outer(exchangeActivity(std::move(what))) {}
+
+Activity::~Activity() {
+    exchangeActivity(std::move(outer));
+}
+
+} // namespace Mz::Commands
