@@ -119,8 +119,14 @@ class MZ_COMPONENT_MANAGER_API QrBufferedIO : public QrCastable {
 /// Reads from a `std::istream` that the caller keeps alive; the buffer neither opens nor closes it.
 ///
 /// Uncounted, and usually a local variable around one piece of work: references to it keep nothing
-/// alive. All state is the stream's. Streams with an exception mask may be used: what the mask
-/// throws does not come through, the stream's flags decide as for any other.
+/// alive. All state is the stream's.
+///
+/// The stream may have an exception mask: what the mask throws does not come through, and the flags
+/// decide as for any other stream. This holds under `unitbuf` too, and where the stream's buffer
+/// throws while it is flushed. A stream that is tied to another one flushes that one before each
+/// operation, as ever; if the flush fails, the tied stream gets the flag, and the operation is done
+/// all the same. During an operation the stream has neither mask, tie nor `unitbuf`; each is back
+/// when the operation returns or throws.
 class MZ_COMPONENT_MANAGER_API QrInBuffer
     : public QrCastImpl<QrInBuffer, QrBufferedIO, const QrInBuffer&> {
   public:

@@ -1,6 +1,7 @@
 #include "components/componentManager/stream.h"
 
 #include "components/componentManager/buffers/directBuffer.h"
+#include "components/componentManager/text/characterCount.h"
 #include "components/componentManager/text/formatText.h"
 #include "components/componentManager/text/numberText.h"
 #include "components/componentManager/text/numericLocale.h"
@@ -54,7 +55,7 @@ int QrStream::computeLineNb() {
     int line = 1;
     wchar_t character;
     for (int64 read = 0; read < position && io().readChar(character) == 1; ++read)
-        line += character == L'\n' ? 1 : 0;
+        line = addCharacters(line, character == L'\n' ? 1 : 0);
     return line;
 }
 
@@ -107,7 +108,7 @@ int QrStream::formattedWrite(const wchar_t* format, ...) {
 int QrStream::writeText(const wchar_t* text, int length) {
     const NumericLocale bracket(io());
     writeSeparator();
-    column += io().writeChar(text, length);
+    column = addCharacters(column, io().writeChar(text, length));
     return length;
 }
 
@@ -129,7 +130,7 @@ int QrStream::writeNumber(char* begin, const char* end) {
         separatorPending = false;
     }
     writeDirectly(*out, *buffer, begin, static_cast<int>(end - begin));
-    column += length;
+    column = addCharacters(column, length);
     return length;
 }
 
@@ -212,7 +213,7 @@ QrStream& QrStream::operator<<(char value) {
 QrStream& QrStream::operator<<(bool value) {
     writeSeparator();
     const wchar_t digit = value ? L'1' : L'0';
-    column += io().writeChar(&digit, 1);
+    column = addCharacters(column, io().writeChar(&digit, 1));
     return *this;
 }
 
@@ -223,7 +224,7 @@ QrStream& QrStream::operator<<(const std::wstring& value) {
     formattedWrite(L"%d", length);
     separatorPending = true;
     writeSeparator();
-    column += io().writeChar(value.data(), length);
+    column = addCharacters(column, io().writeChar(value.data(), length));
     return *this;
 }
 

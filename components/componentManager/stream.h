@@ -145,7 +145,7 @@ class MZ_COMPONENT_MANAGER_API QrStream {
     /// `d u o x p i` store an `int`, with `h` a `short`, with `l` a `long` (of 32 bits in the
     /// text), with `I64` an `int64`; `e f g` a `float`, with `l` a `double`; `c s [` wide
     /// characters, with `h`, and as `C` and `S`, narrow ones. `n` stores the number of characters
-    /// read so far.
+    /// read so far, at most the largest `int`.
     virtual int formattedRead(const wchar_t* format, ...);
 
     /// Reads one whole object through the IO, which knows what `uid`, `a` and `b` mean to it (the
@@ -197,7 +197,7 @@ class MZ_COMPONENT_MANAGER_API QrStream {
     QrPostLoadList postLoadList;
     /// Where the object that is being read is remembered, if it asks for it.
     QrPtr<QrPersistant>* postLoadHolder = nullptr;
-    /// How many characters the current line of text has.
+    /// How many characters the current line of text has; at most the largest `int`.
     int column = 0;
     bool separatorPending = false;
 };

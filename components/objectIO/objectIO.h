@@ -45,6 +45,12 @@ namespace Mz {
 
 /// Objects may be nested in one another to this depth. More is an error, where it would else be an
 /// overflow of the stack; long chains are written as a list of their elements.
+///
+/// The depth bounds reading and writing. It does not bound how objects hold one another: siblings
+/// may form a chain of any length, each holding the one before. A chain that is dropped at its
+/// unheld end is freed by recursion, one destructor inside the other, and a long one overflows the
+/// stack. The IO objects here free what they hold one by one, also after a failure; a host that
+/// drops the graph after them must unlink long chains in a loop.
 inline constexpr int QrMaximumObjectDepth = 500;
 
 /// An IO that leaves everything to another one, on which it holds a reference.
@@ -90,7 +96,8 @@ class MZ_OBJECT_IO_API QrForwardingIO : public QrBufferedIO {
 /// Writes whole objects. Not counted; lives as long as the stream over it needs it.
 ///
 /// Holds a reference on every object that was written, until it is destroyed: what was stored is
-/// known by its address, which must not pass to another object meanwhile.
+/// known by its address, which must not pass to another object meanwhile. References are dropped in
+/// the reverse of the order in which the objects were complete.
 ///
 /// After a failure inside an object nothing more can be written through this IO: what came before
 /// is complete, the object is not. An object that is refused before anything of it was written
@@ -119,7 +126,8 @@ class MZ_OBJECT_IO_API QrObjectOutBuffer
 };
 
 /// Reads whole objects. Not counted; lives as long as the stream over it needs it. Holds a
-/// reference on every object that was read, until it is destroyed.
+/// reference on every object that was read, until it is destroyed; references are dropped in the
+/// reverse of the order in which the objects were complete.
 class MZ_OBJECT_IO_API QrObjectInBuffer
     : public QrCastImpl<QrObjectInBuffer, QrForwardingIO, const QrObjectInBuffer&> {
   public:

@@ -1,10 +1,10 @@
 #include "components/componentManager/componentImp.h"
 #include "components/objectIO/objectIO.h"
 #include "components/objectIO/objectRecord.h"
+#include "components/objectIO/objectTable.h"
 
 #include <algorithm>
 #include <string_view>
-#include <vector>
 
 namespace Mz {
 
@@ -21,8 +21,9 @@ bool answersFor(QrCastable& object, const QrUid& uid) {
 } // namespace
 
 struct QrObjectInBuffer::State {
-    /// All objects by number, less one; the last ones may still be being read.
-    std::vector<QrRef<QrCastable>> objects;
+    /// All objects; some may still be being read.
+    using Objects = ObjectTable<QrRef<QrCastable>>;
+    Objects objects;
     int depth = 0;
     bool exactStrings = true; ///< whether the stream that reads carries strings as they are
     bool failed = false;
@@ -112,7 +113,7 @@ QrRef<QrCastable> QrObjectInBuffer::readRecord(QrStream& s, int64 position) {
     }
     if (state->depth == 1)
         state->expectMark(s, number, position);
-    return number == ObjectRecord::null ? nullptr : state->objects[number - 1];
+    return number == ObjectRecord::null ? nullptr : state->objects.at(number);
 }
 
 QrRef<QrCastable> QrObjectInBuffer::readNewObject(QrStream& s, std::uint32_t number,
@@ -137,12 +138,12 @@ QrRef<QrCastable> QrObjectInBuffer::readNewObject(QrStream& s, std::uint32_t num
                     "the class " + ObjectRecord::text(classUid) + " is stored in version " +
                         std::to_string(version) + " and known in version " +
                         std::to_string(persistant->getVersion()));
-    state->objects.emplace_back(object->getCastable());
+    const State::Objects::Entry entry(state->objects, QrRef<QrCastable>(object->getCastable()));
     persistant->read(s);
     if (state->failed)
         state->fail(__LINE__, position, "an object inside this one failed");
     state->expectMark(s, number, inner().tell());
-    return state->objects[number - 1];
+    return state->objects.at(number);
 }
 
 int QrObjectInBuffer::readChar(wchar_t* buf, int size, int count) {

@@ -1,12 +1,12 @@
 #include "components/objectIO/objectIO.h"
 #include "components/objectIO/objectRecord.h"
+#include "components/objectIO/objectTable.h"
 
 #include <algorithm>
 #include <climits>
 #include <cwchar>
 #include <limits>
 #include <unordered_map>
-#include <vector>
 
 namespace Mz {
 
@@ -43,22 +43,22 @@ bool readsBack(wchar_t character) {
 struct QrObjectOutBuffer::State {
     /// The numbers of the objects, by principal object.
     std::unordered_map<const QrCastable*, std::uint32_t> numbers;
-    std::vector<QrCPtr<QrCastable>> kept;
+    using Objects = ObjectTable<QrCPtr<QrCastable>>;
+    Objects kept;
     int depth = 0;
     bool exactStrings = true; ///< whether the stream that writes carries strings as they are
     bool failed = false;
 
-    /// The number of an object that is about to be stored.
-    std::uint32_t add(const QrCastable* principal) {
+    /// Gives the next number to an object, which is written while the result exists.
+    Objects::Entry add(const QrCastable* principal) {
         const auto number = static_cast<std::uint32_t>(kept.size() + 1);
-        numbers.emplace(principal, number);
+        const auto place = numbers.emplace(principal, number).first;
         try {
-            kept.emplace_back(principal);
+            return Objects::Entry(kept, QrCPtr<QrCastable>(principal));
         } catch (...) {
-            numbers.erase(principal);
+            numbers.erase(place);
             throw;
         }
-        return number;
     }
 };
 
@@ -84,10 +84,10 @@ void QrObjectOutBuffer::writeObject(const QrCastable* obj, QrStream& s, const wc
     if (isNew && state->kept.size() == std::numeric_limits<std::uint32_t>::max())
         fail(inner(), __LINE__, "there are too many objects");
 
-    const std::uint32_t number = isNew       ? state->add(principal)
-                                 : principal ? known->second
-                                             : ObjectRecord::null;
-    writeRecord(s, number, object.get());
+    if (!isNew)
+        return writeRecord(s, principal ? known->second : ObjectRecord::null, nullptr);
+    const State::Objects::Entry entry = state->add(principal);
+    writeRecord(s, static_cast<std::uint32_t>(state->kept.size()), object.get());
 }
 
 void QrObjectOutBuffer::writeRecord(QrStream& s, std::uint32_t number, QrPersistant* object) {

@@ -59,4 +59,25 @@ TEST(FailingFile, RaisesWriteErrorForBinaryData) {
     expectWriteError<Mz::QrBinaryStream>();
 }
 
+TEST(FailingFile, RaisesWriteErrorWhereEachWriteIsFlushedUnderAMask) {
+    for (const std::ios::iostate mask : {std::ios::goodbit, std::ios::badbit | std::ios::failbit}) {
+        std::ofstream file("/dev/full", std::ios::binary);
+        file << std::unitbuf;
+        file.exceptions(mask);
+        Mz::QrOutBuffer io(&file);
+        EXPECT_NO_THROW(io.writeEol());
+        EXPECT_TRUE(file.bad());
+        file.clear();
+        EXPECT_NO_THROW(io.writeSpace());
+        EXPECT_TRUE(file.bad());
+        file.clear();
+        EXPECT_THROW(io.write('x'), Mz::QrStreamEx::ExWriteError);
+        file.clear();
+        Mz::QrTextStream text(&io);
+        EXPECT_THROW(text << 1, Mz::QrStreamEx::ExWriteError);
+        EXPECT_EQ(file.exceptions(), mask);
+        file.clear();
+    }
+}
+
 } // namespace

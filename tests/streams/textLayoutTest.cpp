@@ -1,6 +1,10 @@
 #include "tests/streams/support.h"
 
+#include "components/componentManager/text/characterCount.h"
+
 #include <gtest/gtest.h>
+
+#include <limits>
 
 namespace {
 
@@ -345,6 +349,66 @@ TEST(TextLayout, FormattedTextMakesNoSeparatorDue) {
                   s << 5;
               }),
               "a1b2 345");
+}
+
+/// An IO that reports any number of characters as written.
+class ClaimingOutput final : public Mz::QrOutBuffer {
+  public:
+    using Mz::QrOutBuffer::QrOutBuffer;
+    using Mz::QrOutBuffer::writeChar;
+    int writeChar(const wchar_t* text, int count) override {
+        Mz::QrOutBuffer::writeChar(text, count);
+        return claim == 0 ? count : claim;
+    }
+
+    int claim = 0;
+};
+
+/// Expects `wanted` after one to six values that each seem to have `claim` characters.
+template <class Work>
+void expectAfterClaiming(int claim, const std::string& wanted, const Work& work) {
+    for (int values = 1; values <= 6; ++values) {
+        SCOPED_TRACE(testing::Message() << values << " times " << claim);
+        std::ostringstream sink;
+        ClaimingOutput io(&sink);
+        QrTextStream stream(&io);
+        io.claim = claim;
+        for (int index = 0; index < values; ++index)
+            work(stream);
+        io.claim = 0;
+        sink.str({});
+        stream << true << 5 << 6;
+        EXPECT_EQ(sink.str(), wanted);
+    }
+}
+
+TEST(TextLayout, ALineThatIsLongerThanAnIntCountsIsALongLine) {
+    constexpr int half = 1 << 30;
+    const auto formatted = [](QrStream& s) { s.formattedWrite(L"%s", L"x"); };
+    const auto number = [](QrStream& s) { s.formattedWrite(L"%d", 1); };
+    const auto flag = [](QrStream& s) { s << true; };
+    // Its length goes out as a number, and seems to be as long.
+    const auto string = [](QrStream& s) { s << std::wstring(L"x"); };
+    for (const int claim : {half, 0x7fffffff}) {
+        expectAfterClaiming(claim, "15\n6", formatted);
+        expectAfterClaiming(claim, "15\n6", number);
+        expectAfterClaiming(claim, "15\n6", flag);
+        expectAfterClaiming(claim, "15\n6", string);
+    }
+    // An IO that reports nonsense does no harm.
+    expectAfterClaiming(-half, "15 6", formatted);
+}
+
+TEST(CharacterCount, StaysAtItsLimits) {
+    constexpr int largest = std::numeric_limits<int>::max();
+    constexpr int smallest = std::numeric_limits<int>::min();
+    EXPECT_EQ(Mz::addCharacters(2, 3), 5);
+    EXPECT_EQ(Mz::addCharacters(largest - 1, 1), largest);
+    EXPECT_EQ(Mz::addCharacters(largest, 1), largest);
+    EXPECT_EQ(Mz::addCharacters(largest, largest), largest);
+    EXPECT_EQ(Mz::addCharacters(largest, -1), largest - 1);
+    EXPECT_EQ(Mz::addCharacters(smallest, -1), smallest);
+    EXPECT_EQ(Mz::addCharacters(-5, smallest), smallest);
 }
 
 TEST(TextLayout, LinesAreCountedFromTheBeginning) {

@@ -39,18 +39,25 @@ int fetch(std::istream& in) {
         });
         return byte == endOfBuffer ? endOfInput : byte;
     }
-    ignoringExceptions([&] { byte = in.get(); });
+    operate(in, [&] { byte = in.get(); });
     if (in.good())
         return byte;
     clearEndOfInput(in);
     return endOfInput;
 }
 
+/// An operation that clears the end of input before it begins.
+template <class Work>
+void operateFromEnd(std::istream& in, Work&& work) {
+    ignoringExceptions([&] { in.clear(in.rdstate() & ~std::ios::eofbit); });
+    operate(in, work);
+}
+
 void putBack(std::istream& in, char byte) {
     if (std::streambuf* const buffer = directBuffer(in))
         directly(in, [&] { return buffer->sputbackc(byte) != endOfBuffer; });
     else
-        ignoringExceptions([&] { in.putback(byte); });
+        operateFromEnd(in, [&] { in.putback(byte); });
 }
 
 /// Puts back what stands from `begin` to `end`, so that it is read again in its order.
@@ -98,7 +105,7 @@ int QrInBuffer::read(void* data, int size) {
     auto* const bytes = static_cast<char*>(data);
     if (std::streambuf* const buffer = directBuffer(*in))
         return readDirectly(*in, *buffer, bytes, size);
-    ignoringExceptions([&] { in->read(bytes, size); });
+    operate(*in, [&] { in->read(bytes, size); });
     throwIfBad(*in, __LINE__);
     return static_cast<int>(in->gcount());
 }
@@ -235,7 +242,7 @@ int64 QrInBuffer::seek(int64 offset, int origin) {
     if (origin < 0 || origin > 2)
         throw QrStreamEx::ExReadError(source, __LINE__);
     constexpr std::ios::seekdir directions[] = {std::ios::beg, std::ios::cur, std::ios::end};
-    ignoringExceptions([&] { in->seekg(offset, directions[origin]); });
+    operateFromEnd(*in, [&] { in->seekg(offset, directions[origin]); });
     const int64 position = tell();
     if (position == -1)
         throw QrStreamEx::ExReadError(source, __LINE__);
@@ -244,7 +251,7 @@ int64 QrInBuffer::seek(int64 offset, int origin) {
 
 int64 QrInBuffer::tell() const {
     int64 position = -1;
-    ignoringExceptions([&] { position = in->tellg(); });
+    operate(*in, [&] { position = in->tellg(); });
     return position;
 }
 

@@ -26,7 +26,7 @@ void put(std::ostream& out, char byte) {
     if (std::streambuf* const buffer = directBuffer(out))
         directly(out, [&] { return buffer->sputc(byte) != std::streambuf::traits_type::eof(); });
     else
-        ignoringExceptions([&] { out.put(byte); });
+        operate(out, [&] { out.put(byte); });
 }
 
 void put(std::ostream& out, const void* data, int size) {
@@ -36,7 +36,7 @@ void put(std::ostream& out, const void* data, int size) {
     if (std::streambuf* const buffer = directBuffer(out))
         directly(out, [&] { return buffer->sputn(bytes, size) == size; });
     else
-        ignoringExceptions([&] { out.write(bytes, size); });
+        operate(out, [&] { out.write(bytes, size); });
 }
 
 void putCharacter(std::ostream& out, const platform::CharacterConverter& converter, wchar_t c) {
@@ -159,7 +159,7 @@ int64 QrOutBuffer::seek(int64 offset, int origin) {
     if (origin < 0 || origin > 2)
         throw QrStreamEx::ExWriteError(source, __LINE__);
     constexpr std::ios::seekdir directions[] = {std::ios::beg, std::ios::cur, std::ios::end};
-    ignoringExceptions([&] { out->seekp(offset, directions[origin]); });
+    operate(*out, [&] { out->seekp(offset, directions[origin]); });
     const int64 position = tell();
     if (position == -1)
         throw QrStreamEx::ExWriteError(source, __LINE__);
@@ -168,7 +168,7 @@ int64 QrOutBuffer::seek(int64 offset, int origin) {
 
 int64 QrOutBuffer::tell() const {
     int64 position = -1;
-    ignoringExceptions([&] { position = out->tellp(); });
+    operate(*out, [&] { position = out->tellp(); });
     return position;
 }
 

@@ -2,6 +2,7 @@
 
 #include "components/componentManager/bufferio.h"
 #include "components/componentManager/buffers/directBuffer.h"
+#include "components/componentManager/text/characterCount.h"
 #include "components/componentManager/text/numericLocale.h"
 #include "components/componentManager/text/plainBytes.h"
 #include "components/componentManager/text/scanNumber.h"
@@ -49,7 +50,7 @@ class IOInput {
 
     void consume() {
         held = false;
-        ++consumed;
+        consumed = addCharacters(consumed, 1);
     }
 
     /// Gives the look-ahead back. A NUL was never consumed, so it must not be put in twice.
@@ -59,7 +60,7 @@ class IOInput {
         held = false;
     }
 
-    /// The characters that were used up; the look-ahead is none of them.
+    /// The characters that were used up, without the lookahead; at most the largest `int`.
     int consumedCharacters() const { return consumed; }
 
   private:
@@ -87,7 +88,7 @@ class DirectInput {
     void consume() {
         buffer.sbumpc();
         byte = unknown;
-        ++consumed;
+        consumed = addCharacters(consumed, 1);
     }
 
     void giveBack() {}

@@ -66,6 +66,9 @@ inline constexpr QrUid throwingUid = classUid(10);
 /// A node that answers the failure of an object inside it with one of its own, without a place.
 inline constexpr QrUid misleadingUid = classUid(11);
 
+/// A node that stores its number and its links, and holds those as soon as it has read them.
+inline constexpr QrUid holderUid = classUid(12);
+
 /// No builder has this one.
 inline constexpr QrUid unknownUid = classUid(0x99);
 

@@ -55,6 +55,29 @@ class NodeObject final : public QrCastRef<QrCastHeap<QrCastMulti<NodeObject, Nod
     std::vector<Node*> pending;
 };
 
+class HolderObject final
+    : public QrCastRef<QrCastHeap<QrCastMulti<HolderObject, Node, QrPersistant>>> {
+  public:
+    HolderObject() { ++nodesAlive; }
+    HolderObject(const HolderObject&) = delete;
+    HolderObject& operator=(const HolderObject&) = delete;
+    ~HolderObject() override { --nodesAlive; }
+
+    const QrUid* getClassUid() const override { return &holderUid; }
+    unsigned int getVersion() const override { return 1; }
+    void write(QrStream& stream) override {
+        stream << number << static_cast<unsigned int>(links.size());
+        for (const QrPtr<Node>& link : links)
+            stream << link.get();
+    }
+    void read(QrStream& stream) override {
+        unsigned int count = 0;
+        stream >> number >> count;
+        for (; count > 0; --count)
+            links.push_back(queryCast<Node>(stream.readObject(&Node::uid, nullptr, nullptr).get()));
+    }
+};
+
 class CensusObject final : public QrCastRef<QrCastHeap<QrCastImpl<CensusObject, Census>>> {
   public:
     int alive() const override { return nodesAlive; }
@@ -117,6 +140,7 @@ void Companion::read(QrStream& stream) {
 MZ_COMPONENT(L"Classes", L"", Kit::builderOf<CensusObject>({.uid = censusUid}),
              Kit::builderOf<NodeObject>({.uid = nodeUid}),
              Kit::builderOf<NodeObject>({.uid = otherClassUid}),
+             Kit::builderOf<HolderObject>({.uid = holderUid}),
              Kit::builderOf<StringObject>({.uid = stringUid}),
              Kit::builderOf<WideObject>({.uid = wideUid}),
              Kit::builderOf<CompanionObject>({.uid = companionUid}))
