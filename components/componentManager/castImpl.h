@@ -18,9 +18,10 @@
 
 namespace Mz {
 
-/// Calls the object's own `newReference`; `view` is the object, too. Where its class is final this
-/// is no virtual call, and where that class inherits the root's, which does nothing, it is none at
-/// all.
+namespace detail {
+
+/// Takes one reference on `object`; `view` is an interface of the same object. The call is
+/// devirtualised if `Impl` is final, and omitted if `Impl` inherits the root's no-op.
 template <class Impl>
 void takeReference(Impl* object, QrCastable* view) {
     using RootOperation = long (QrCastable::*)();
@@ -32,6 +33,8 @@ void takeReference(Impl* object, QrCastable* view) {
     else if constexpr (!isRoots)
         object->newReference();
 }
+
+} // namespace detail
 
 /// An object that answers for one interface, is not counted and ignores `destroy`.
 ///
@@ -47,7 +50,7 @@ class QrCastImpl : public Iface {
 
     QrCastable* getInterface(const QrUid& wanted) override {
         if (wanted == Iface::uid) {
-            takeReference(static_cast<Impl*>(this), this);
+            detail::takeReference(static_cast<Impl*>(this), this);
             return this;
         }
         if constexpr (continuesChain)
@@ -127,7 +130,7 @@ class QrCastMulti : public First, public Rest... {
         QrCastable* view = nullptr;
         static_cast<void>(viewAs<First>(wanted, view) || (viewAs<Rest>(wanted, view) || ...));
         if (view)
-            takeReference(static_cast<Impl*>(this), view);
+            detail::takeReference(static_cast<Impl*>(this), view);
         return view;
     }
 

@@ -64,14 +64,18 @@ template <class T>
 concept QrInterface = std::is_same_v<T, typename T::Self> &&
     std::is_same_v<decltype(T::uid), const QrUid> && std::is_base_of_v<QrCastable, T>;
 
-/// What `object`, or else the first of its translators that accepts `uid`, answers; null when none
-/// does. For the casts below.
+namespace detail {
+
+/// Returns the object's own answer, else that of the first translator that accepts `uid`, else
+/// null.
 inline QrCastable* findInterface(QrCastable* object, const QrUid& uid) {
     QrCastable* found = object->getInterface(uid);
     if (translationsExist.load(std::memory_order_relaxed) && !found) [[unlikely]]
         found = QrTranslateInterface(object, uid);
     return found;
 }
+
+} // namespace detail
 
 /// `object` as the interface `T`, or null: asks the object itself, then its translators. A null
 /// `object` gives null.
@@ -80,7 +84,7 @@ QrPtr<T> queryCast(QrCastable* object) {
     static_assert(QrInterface<T>, "cast to an interface that has its own uid and Self");
     if (!object)
         return nullptr;
-    return QrPtr<T>::adopt(static_cast<T*>(findInterface(object, T::uid)));
+    return QrPtr<T>::adopt(static_cast<T*>(detail::findInterface(object, T::uid)));
 }
 
 /// `object` as the interface `T`: asks the object itself, then its translators.
@@ -97,7 +101,7 @@ T* safeCast(QrCastable* object) {
     static_assert(QrInterface<T>, "cast to an interface that has its own uid and Self");
     if (!object)
         QrCastable::throwBadCast();
-    QrCastable* found = findInterface(object, T::uid);
+    QrCastable* found = detail::findInterface(object, T::uid);
     if (!found)
         QrCastable::throwBadCast();
     return static_cast<T*>(found);

@@ -35,7 +35,7 @@ MZ_AT_UNLOAD(clearRegistry);
 
 } // namespace
 
-constinit std::atomic<bool> translationsExist{false};
+constinit std::atomic<bool> detail::translationsExist{false};
 
 } // namespace Mz
 
@@ -59,7 +59,7 @@ void QrAddTranslation(QrCastable* object, QrCastable* translator,
     if (!object || !translator || !accepts)
         return;
     registry.value[object].push_back({translator, accepts});
-    translationsExist.store(true, std::memory_order_relaxed);
+    detail::translationsExist.store(true, std::memory_order_relaxed);
 }
 
 void QrRemoveTranslation(QrCastable* object, QrCastable* translator) {

@@ -23,9 +23,13 @@ namespace Mz {
 
 class QrCastable;
 
-/// Whether any translation was ever added in this process. Only the registry writes it; it spares
-/// casts the call where there is nothing to ask, which is nearly always.
+namespace detail {
+
+/// True once a translation was added in this process. Casts read it to avoid a call into the
+/// registry; only the registry writes it.
 extern MZ_COMPONENT_MANAGER_API std::atomic<bool> translationsExist;
+
+} // namespace detail
 
 } // namespace Mz
 
