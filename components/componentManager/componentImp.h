@@ -116,7 +116,8 @@ class MZ_COMPONENT_MANAGER_API QrComponentDescription : public QrCastable {
 ///
 /// The manager is destroyed when this library is unloaded, at the end of the process as a rule, and
 /// takes the libraries that it loaded with it: objects, builders and descriptions must be given
-/// back before.
+/// back before. Once it has loaded a component library, this library stays until the process ends,
+/// even if the host unloads it.
 class MZ_COMPONENT_MANAGER_API QrComponentManager : public QrCastable {
   public:
     using Self = QrComponentManager;
