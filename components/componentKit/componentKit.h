@@ -235,13 +235,13 @@ class StaticDescription {
 /// label and the text are shown to people; each builder is the result of `Mz::Kit::builderOf` or
 /// `Mz::Kit::builder`. Use it once in a library, outside all namespaces.
 #define MZ_COMPONENT(label, text, ...)                                                             \
-    static constinit Mz::Kit::StaticDescription mzDescription;                                     \
-    static void mzDropBuilders() {                                                                 \
-        mzDescription.dropBuilders();                                                              \
+    static constinit Mz::Kit::StaticDescription mzComponentDescription;                            \
+    static void mzDropComponentBuilders() {                                                        \
+        mzComponentDescription.dropBuilders();                                                     \
     }                                                                                              \
-    MZ_AT_UNLOAD(mzDropBuilders);                                                                  \
+    MZ_AT_UNLOAD(mzDropComponentBuilders);                                                         \
     extern "C" MZ_EXPORT Mz::QrCastable* QrGetComponentDescription() {                             \
         static Mz::Kit::Description* const description =                                           \
-            mzDescription.make(label, text, {__VA_ARGS__});                                        \
+            mzComponentDescription.make(label, text, {__VA_ARGS__});                               \
         return description;                                                                        \
     }
