@@ -2,9 +2,10 @@
 
 #include "components/componentManager/binaryStream.h"
 #include "components/componentManager/bufferio.h"
-#include "components/componentManager/platform/characters.h"
+#include "components/componentManager/files.h"
+#include "components/componentManager/nativeText.h"
 #include "components/componentManager/platform/platform.h"
-#include "components/componentTools/replaceFile.h"
+#include "components/componentTools/openPatiently.h"
 #include "components/componentTools/verdictsFile.h"
 
 #include <algorithm>
@@ -157,10 +158,9 @@ std::filesystem::path verdictsFileOf(const std::filesystem::path& list) {
 }
 
 bool isCarried(const std::wstring& text) {
-    const std::optional<std::string> bytes = platform::toBytes(text);
+    const std::optional<std::string> bytes = toNarrow(text);
     // Some locales take a similar character instead.
-    return bytes && text.find(L'\0') == std::wstring::npos &&
-           platform::toCharacters(*bytes) == text;
+    return bytes && text.find(L'\0') == std::wstring::npos && toWide(*bytes) == text;
 }
 
 const RecordedLibrary* findRecord(const RecordedLibraries& libraries, const std::wstring& directory,

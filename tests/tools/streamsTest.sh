@@ -52,6 +52,11 @@ expect 0 'crashesInEntryPoint.*: it crashes in its entry point' types --path bad
 expect 0 'this is no result' types --path good
 expect 2 'names no folder' types --path ''
 
+# A file that cannot be written is named once.
+expect 1 '^error: no/list: Error opening output stream: ' scan --path good --cache no/list
+said=$("${program[@]}" scan --path good --cache no/list 2>&1 >/dev/null)
+[ "$(grep -o 'no/list' <<<"$said" | wc -l)" = 1 ] || { echo "named twice: $said" >&2; status=1; }
+
 touch empty
 expect 1 'empty: the file is empty' show empty
 head -c 60 list >cut
