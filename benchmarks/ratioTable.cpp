@@ -1,5 +1,7 @@
 #include "ratioTable.h"
 
+#include "ratioJson.h"
+
 #include <algorithm>
 #include <array>
 #include <cstdio>
@@ -105,22 +107,12 @@ void RatioTable::print(std::ostream& out) const {
 }
 
 void RatioTable::printJson(std::ostream& out) const {
-    const char* separator = "\n";
-    out << '[';
-    for (const Line& line : lines()) {
-        // No text in the table has a character that would need an escape.
-        out << separator << "  {\"name\": \"" << line.comparison->name << "\", \"work\": \""
-            << line.comparison->work << "\", \"limit\": \"" << line.comparison->limit
-            << "\", \"workNanoseconds\": " << formatted("%.3f", line.work)
-            << ", \"limitNanoseconds\": " << formatted("%.3f", line.limit)
-            << ", \"ratio\": " << formatted("%.4f", line.ratio())
-            << ", \"ratioOfFastest\": " << formatted("%.4f", line.fastestRatio());
-        if (line.comparison->reach)
-            out << ", \"reach\": " << formatted("%.2f", *line.comparison->reach);
-        out << '}';
-        separator = ",\n";
-    }
-    out << "\n]\n";
+    std::vector<RatioLine> all;
+    for (const Line& line : lines())
+        all.push_back({line.comparison->name, line.comparison->work, line.comparison->limit,
+                       line.work, line.limit, line.ratio(), line.fastestRatio(),
+                       line.comparison->reach});
+    writeJson(out, all);
 }
 
 bool RatioReporter::ReportContext(const Context& context) {

@@ -22,10 +22,34 @@
 
 namespace Mz::Kit {
 
+/// The identity of a builder, which is not nil: a builder with a constant identity whose four words
+/// are 0, or with none, does not compile.
+class BuilderUid {
+  public:
+    BuilderUid() = delete; // Each builder has an identity: set `.uid`.
+
+    /// Takes a constant.
+    consteval BuilderUid(const QrUid& uid) : value(uid) {
+        if (uid == QrUid{})
+            throw "the uid of a builder is nil: make a new one, four random words";
+    }
+
+    /// Takes an identity that is known at run time only, and must not be nil.
+    static BuilderUid atRunTime(const QrUid& uid) { return {uid, RunTime()}; }
+
+    constexpr operator const QrUid&() const { return value; }
+
+  private:
+    struct RunTime {};
+    BuilderUid(const QrUid& uid, RunTime) : value(uid) {}
+
+    QrUid value;
+};
+
 /// What a builder says of itself. The texts are kept as pointers, so they must live as long as the
 /// library; literals do.
 struct BuilderInfo {
-    QrUid uid;                  ///< the builder's identity; make a new one for each builder
+    BuilderUid uid;             ///< the builder's identity; make a new one for each builder
     const wchar_t* name = L"";  ///< by which importers find it
     const wchar_t* label = L""; ///< for people; importers show it in file dialogs
     const wchar_t* text = L"";  ///< a longer one

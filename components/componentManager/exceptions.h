@@ -6,7 +6,9 @@
 /// or `std::exception`. All can be caught in another library than the one that threw.
 ///
 /// The reasons are fixed texts. A constructor with a `name` (a file or object name, usually) puts
-/// the name in front of it, exactly as given; a null name counts as empty. Constructors may throw
+/// the name in front of it, exactly as given; a null name counts as empty. Names and second texts
+/// are UTF-8 on every platform, whatever the locale: `utf8Name` (`nativeText.h`) gives the name of
+/// a file in that form, and `displayText` makes a reason readable. Constructors may throw
 /// `std::bad_alloc`; `clone()` answers a lack of memory with null.
 #pragma once
 

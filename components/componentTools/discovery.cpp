@@ -1,5 +1,8 @@
 #include "components/componentTools/discovery.h"
 
+#include "components/componentManager/files.h"
+#include "components/componentManager/nativeText.h"
+#include "components/componentTools/inspection.h"
 #include "components/componentTools/platform/system.h"
 #include "components/componentTools/recordedList.h"
 #include "components/platform/pathNormaliser.h"
@@ -12,14 +15,11 @@ namespace Mz::Tools {
 
 namespace {
 
-/// A full path without ".", ".." and a separator at the end.
-std::filesystem::path fullPath(const std::filesystem::path& path) {
+/// The full path; the path as it is where the current folder is gone.
+std::filesystem::path fullPathOf(const std::filesystem::path& path) {
     std::error_code failure;
-    std::filesystem::path full = System::withoutDots(std::filesystem::absolute(path, failure));
-    if (!full.has_filename() && full.has_relative_path())
-        full = full.parent_path();
-    full.make_preferred();
-    return full;
+    const std::filesystem::path absolute = std::filesystem::absolute(path, failure);
+    return failure ? path : fullPath(absolute);
 }
 
 /// Whether a search path can lead there.
@@ -30,7 +30,7 @@ bool isSearchable(const std::wstring& folder) {
 class Discoverer {
   public:
     void add(const std::filesystem::path& folder) {
-        const std::optional<std::wstring> name = System::nameText(folder);
+        const std::optional<std::wstring> name = toWideName(folder);
         if (!name || !isCarried(*name))
             return leaveOutFolder(folder, Verdict::nameNotCarried);
         if (!isSearchable(*name))
@@ -38,10 +38,11 @@ class Discoverer {
         const std::wstring directory = normalisePath(name->c_str(), false);
         const std::filesystem::path opened = platform::openingPath(directory, {}, folder.native());
         std::error_code failure;
-        if (!std::filesystem::is_directory(opened, failure))
-            return leaveOutFolder(folder, failure == std::errc::permission_denied
-                                              ? Verdict::unreadable
-                                              : Verdict::missing);
+        const std::filesystem::file_status status = std::filesystem::status(opened, failure);
+        if (failure || !std::filesystem::exists(status))
+            return leaveOutFolder(folder, verdictOnAbsence(opened));
+        if (!std::filesystem::is_directory(status))
+            return leaveOutFolder(folder, Verdict::notAFolder);
         std::filesystem::directory_iterator entries(opened, failure);
         if (failure)
             return leaveOutFolder(folder, Verdict::unreadable);
@@ -68,7 +69,7 @@ class Discoverer {
         if (!isCarried(candidate.fileName))
             leaveOut(entry.path, {Verdict::nameNotCarried, {}, {}});
         else if (!isNew)
-            leaveOut(entry.path, {Verdict::sameName, System::displayName(known->second), {}});
+            leaveOut(entry.path, {Verdict::sameName, displayName(known->second), {}});
         else
             result.candidates.push_back(std::move(candidate));
     }
@@ -86,7 +87,7 @@ class Discoverer {
         std::error_code failure;
         for (const std::filesystem::directory_iterator end; !failure && entry != end;
              entry.increment(failure))
-            if (!System::nameText(entry->path()))
+            if (!toWideName(entry->path()))
                 leaveOut(entry->path(), {Verdict::nameNotCarried, {}, {}});
     }
 
@@ -104,7 +105,7 @@ std::vector<std::filesystem::path> foldersOf(const std::filesystem::path& search
     for (std::size_t start = 0; start <= text.size();) {
         const std::size_t end = std::min(text.find(Text::value_type(';'), start), text.size());
         if (end > start)
-            folders.push_back(fullPath(text.substr(start, end - start)));
+            folders.push_back(fullPathOf(text.substr(start, end - start)));
         start = end + 1;
     }
     return folders;
@@ -113,7 +114,7 @@ std::vector<std::filesystem::path> foldersOf(const std::filesystem::path& search
 std::wstring searchPathOf(const std::vector<std::filesystem::path>& folders) {
     std::wstring searchPath;
     for (const std::filesystem::path& folder : folders) {
-        const std::optional<std::wstring> name = System::nameText(folder);
+        const std::optional<std::wstring> name = toWideName(folder);
         if (name && isCarried(*name) && isSearchable(*name))
             searchPath += (searchPath.empty() ? L"" : L";") + *name;
     }
@@ -128,16 +129,16 @@ Discovery discover(const std::vector<std::filesystem::path>& folders) {
 }
 
 Candidate candidateOf(const std::filesystem::path& file) {
-    Candidate candidate{fullPath(file), {}, {}};
-    if (const auto directory = System::nameText(candidate.path.parent_path()))
+    Candidate candidate{fullPathOf(file), {}, {}};
+    if (const auto directory = toWideName(candidate.path.parent_path()))
         candidate.directory = normalisePath(directory->c_str(), false);
-    if (const auto name = System::nameText(candidate.path.filename()))
+    if (const auto name = toWideName(candidate.path.filename()))
         candidate.fileName = normalisePath(name->c_str(), false);
     return candidate;
 }
 
 std::wstring displayName(const std::filesystem::path& path) {
-    return System::displayName(path);
+    return Mz::displayName(path);
 }
 
 } // namespace Mz::Tools

@@ -145,6 +145,8 @@ class ElfReader {
         if (strings && !namesEnd())
             return damaged(L"its table of names has no end");
         neededNames.resize(std::min(neededNames.size(), maximumNeeded));
+        if (ownName)
+            image.ownName = name(ownName).value_or("");
         return readNames(neededNames, image.needed) && readFolders(rpaths, image.rpath) &&
                readFolders(runpaths, image.runpath);
     }

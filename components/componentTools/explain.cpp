@@ -2,9 +2,12 @@
 
 #include "components/componentTools/discovery.h"
 #include "components/componentTools/inspection.h"
+#include "components/componentTools/uidNotes.h"
 #include "components/platform/platform.h"
 
 #include <algorithm>
+#include <system_error>
+#include <utility>
 
 namespace Mz::Tools {
 
@@ -30,22 +33,24 @@ Finding judgeRecord(const RecordedLibrary* record, const std::filesystem::path& 
     return {Verdict::recordedUnchanged, std::to_wstring(record->builders.size()), {}};
 }
 
-bool offers(const RecordedLibrary& library, const QrUid& uid) {
-    return std::any_of(library.builders.begin(), library.builders.end(),
-                       [&](const RecordedBuilder& builder) { return builder.uid == uid; });
-}
-
-/// Who else in the list offers builders of the same identity, and who wins: the one that comes
-/// later. A file that is not in the list is taken to come last, as one that is new to a host's last
-/// folder does.
+/// What a list says of the file's builders.
 void compareUids(Explanation& explanation, const RecordedLibraries& recorded,
                  const RecordedLibrary* own) {
-    for (const RecordedBuilder& builder : explanation.builders)
-        for (const RecordedLibrary& other : recorded)
-            if (&other != own && offers(other, builder.uid))
-                explanation.notes.push_back(
-                    {own && own < &other ? Verdict::uidTaken : Verdict::uidWins,
-                     textOf(builder.uid), other.directory + L"\\" + other.fileName});
+    const std::size_t position =
+        own ? static_cast<std::size_t>(own - recorded.data()) : UidNotes::behindAll;
+    for (Finding& note : UidNotes(recorded).notesOn(explanation.builders, position))
+        explanation.notes.push_back(std::move(note));
+}
+
+/// Whether one of the folders is the one that the file is in.
+Finding judgePath(const std::vector<std::filesystem::path>& folders,
+                  const std::filesystem::path& file) {
+    const bool leads =
+        std::any_of(folders.begin(), folders.end(), [&](const std::filesystem::path& folder) {
+            std::error_code ignored;
+            return std::filesystem::equivalent(folder, file.parent_path(), ignored);
+        });
+    return {leads ? Verdict::onPath : Verdict::notOnPath, {}, {}};
 }
 
 void load(Explanation& explanation, const ProbeOptions& options) {
@@ -84,8 +89,10 @@ Explanation explainFile(const std::filesystem::path& file, const ExplainOptions&
         load(explanation, options.probe);
     else if (record)
         explanation.builders = record->builders;
-    if (options.recorded)
-        compareUids(explanation, *options.recorded, record);
+    const RecordedLibraries nothing;
+    compareUids(explanation, options.recorded ? *options.recorded : nothing, record);
+    if (options.folders)
+        explanation.notes.push_back(judgePath(*options.folders, candidate.path));
     return explanation;
 }
 

@@ -37,6 +37,8 @@ struct Explanation {
 struct ExplainOptions {
     /// A recorded list to look the file up in; null for none.
     const RecordedLibraries* recorded = nullptr;
+    /// The folders of a host's search path, to say whether it leads to the file; null for none.
+    const std::vector<std::filesystem::path>* folders = nullptr;
     /// Load the file in a process of its own, where it looks sound from the outside.
     bool load = false;
     ProbeOptions probe;

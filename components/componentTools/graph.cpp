@@ -1,8 +1,8 @@
 #include "components/componentTools/graph.h"
 
+#include "components/componentManager/files.h"
+#include "components/componentManager/utf8.h"
 #include "components/componentTools/platform/system.h"
-#include "components/componentTools/replaceFile.h"
-#include "components/componentTools/utf8.h"
 
 #include <system_error>
 

@@ -1,10 +1,15 @@
 #include "components/componentTools/inspection.h"
 
+#include "components/componentManager/nativeText.h"
+#include "components/componentTools/discovery.h"
 #include "components/componentTools/platform/system.h"
 #include "components/platform/platform.h"
 
 #include <deque>
+#include <map>
 #include <set>
+#include <system_error>
+#include <utility>
 
 namespace Mz::Tools {
 
@@ -16,7 +21,7 @@ std::optional<Finding> judgePlace(const std::filesystem::path& file) {
         return Finding{Verdict::directory, {}, {}};
     const auto status = platform::queryFile(file.native());
     if (!status)
-        return Finding{Verdict::missing, {}, {}};
+        return Finding{verdictOnAbsence(file), {}, {}};
     if (attributes.hidden)
         return Finding{Verdict::hidden, {}, {}};
     if (attributes.system)
@@ -27,7 +32,7 @@ std::optional<Finding> judgePlace(const std::filesystem::path& file) {
 }
 
 bool isNameCarried(const std::filesystem::path& file) {
-    const auto name = System::nameText(file);
+    const auto name = toWideName(file);
     return name && isCarried(*name);
 }
 
@@ -52,7 +57,7 @@ Finding judgeImage(const LibraryImage& image) {
 }
 
 std::wstring widened(const std::string& name) {
-    return System::displayName(System::pathOfArgument(name));
+    return displayName(System::pathOfArgument(name));
 }
 
 } // namespace
@@ -68,33 +73,72 @@ Finding inspectFile(const std::filesystem::path& file, LibraryImage& image) {
     return finding;
 }
 
+Verdict verdictOnAbsence(const std::filesystem::path& file) {
+    std::error_code failure;
+    static_cast<void>(std::filesystem::status(file, failure));
+    return failure == std::errc::permission_denied ? Verdict::unreachable : Verdict::missing;
+}
+
+namespace {
+
+/// Follows what is needed in the loader's order: breadth first, each name once.
+class DependencyWalk {
+  public:
+    explicit DependencyWalk(const std::filesystem::path& folder) : programFolder(folder) {}
+
+    std::vector<Dependency> from(const std::filesystem::path& file, const LibraryImage& image) {
+        add({file, image, nullptr});
+        for (std::size_t next = 0; next < loaded.size(); ++next)
+            for (const std::string& name : loaded[next].image.needed)
+                if (dependencies.size() < most && isNew(name, loaded[next]))
+                    find(name, loaded[next]);
+        return std::move(dependencies);
+    }
+
+  private:
+    static constexpr std::size_t most = 2000;
+
+    void add(System::Needer needer) {
+        if (!needer.image.ownName.empty())
+            byOwnName.emplace(needer.image.ownName, loaded.size());
+        loaded.push_back(std::move(needer));
+    }
+
+    /// A name with a variable of the loader means another file for each library that has it.
+    bool isNew(const std::string& name, const System::Needer& needer) {
+        const bool variable = name.find('$') != std::string::npos;
+        return seen.emplace(variable ? needer.library : std::filesystem::path(), name).second;
+    }
+
+    void find(const std::string& name, const System::Needer& needer) {
+        const auto present = byOwnName.find(name);
+        const System::Located located = present != byOwnName.end()
+                                            ? System::Located{true, loaded[present->second].library}
+                                            : System::findDependency(name, needer, programFolder);
+        dependencies.push_back({widened(name), displayName(needer.library),
+                                displayName(located.file),
+                                located.found || needer.image.hasManifest});
+        if (!located.file.empty() && present == byOwnName.end())
+            add({located.file, readLibraryImage(located.file), &needer});
+    }
+
+    const std::filesystem::path& programFolder;
+    std::vector<Dependency> dependencies;
+    std::deque<System::Needer> loaded; ///< in the loader's order; addresses stay
+    std::map<std::string, std::size_t> byOwnName;
+    std::set<std::pair<std::filesystem::path, std::string>> seen;
+};
+
+} // namespace
+
 std::vector<Dependency> dependenciesOf(const std::filesystem::path& file, const LibraryImage& image,
                                        const std::filesystem::path& programFolder) {
-    constexpr std::size_t most = 2000;
-    std::vector<Dependency> dependencies;
-    std::set<std::string> seen;
-    std::deque<std::pair<std::filesystem::path, LibraryImage>> waiting{{file, image}};
-    while (!waiting.empty() && dependencies.size() < most) {
-        const auto [library, libraryImage] = std::move(waiting.front());
-        waiting.pop_front();
-        for (const std::string& name : libraryImage.needed) {
-            if (!seen.insert(name).second)
-                continue;
-            const System::Located located =
-                System::findDependency(name, library, libraryImage, programFolder);
-            dependencies.push_back({widened(name), System::displayName(library),
-                                    System::displayName(located.file),
-                                    located.found || libraryImage.hasManifest});
-            if (!located.file.empty())
-                waiting.emplace_back(located.file, readLibraryImage(located.file));
-        }
-    }
-    return dependencies;
+    return DependencyWalk(programFolder).from(file, image);
 }
 
 std::optional<Finding> missingDependency(const std::filesystem::path& file,
                                          const std::vector<Dependency>& dependencies) {
-    const std::wstring self = System::displayName(file);
+    const std::wstring self = displayName(file);
     for (const Dependency& dependency : dependencies)
         if (!dependency.found)
             return Finding{Verdict::dependencyMissing, dependency.name,

@@ -10,6 +10,9 @@ namespace Mz::Tools {
 /// it could be read. Dependencies are not looked at.
 Finding inspectFile(const std::filesystem::path& file, LibraryImage& image);
 
+/// Why the status of a file cannot be queried: `unreachable`, else `missing`.
+Verdict verdictOnAbsence(const std::filesystem::path& file);
+
 /// Every library that is needed by the file whose image this is, each once.
 std::vector<Dependency> dependenciesOf(const std::filesystem::path& file, const LibraryImage& image,
                                        const std::filesystem::path& programFolder);

@@ -72,8 +72,9 @@ struct LibraryImage {
     std::wstring otherProcessor; ///< its name, when it is not x86-64
     std::wstring damage;         ///< what is wrong, when something is
     EntryPoint entryPoint = EntryPoint::absent;
+    std::string ownName;              ///< by which others need it, where it carries one (SONAME)
     std::vector<std::string> needed;  ///< the libraries that the system loads with it
-    std::vector<std::string> rpath;   ///< folders for all that is loaded, as they stand there
+    std::vector<std::string> rpath;   ///< folders for all that is loaded through it, as written
     std::vector<std::string> runpath; ///< folders for what it needs itself
     bool hasManifest = false;         ///< describes surroundings of its own to load in
 };

@@ -1,6 +1,7 @@
 /// `mzcomponents-probe FILE MEMORY`: loads one library, asks it for its description, as the
 /// component manager does, and answers on standard output. Not meant to be started by people.
 #include "components/componentManager/componentImp.h"
+#include "components/componentManager/nativeText.h"
 #include "components/componentTools/platform/system.h"
 #include "components/componentTools/probeAnswer.h"
 #include "components/platform/platform.h"
@@ -61,7 +62,7 @@ Finding exceptionFinding(Verdict verdict, const std::wstring& before) {
     } catch (const std::bad_alloc&) {
         return {Verdict::outOfMemory, {}, {}};
     } catch (const ExBase& failure) {
-        return {verdict, {}, before + widened(failure.getReason())};
+        return {verdict, {}, before + displayText(failure.getReason())};
     } catch (const std::exception& failure) {
         return {verdict, {}, before + widened(failure.what())};
     } catch (...) {

@@ -2,7 +2,9 @@
 
 #include "components/componentManager/binaryStream.h"
 #include "components/componentManager/bufferio.h"
-#include "components/componentTools/replaceFile.h"
+#include "components/componentManager/files.h"
+#include "components/componentManager/nativeText.h"
+#include "components/componentTools/openPatiently.h"
 #include "components/componentTools/verdictsFile.h"
 #include "components/platform/characters.h"
 #include "components/platform/platform.h"
@@ -79,8 +81,8 @@ class ListReader {
         return text;
     }
 
-    /// Names are recorded in their normal form. A file name may hold a back-slash: some systems take
-    /// it for a character like any other.
+    /// Names are recorded in their normal form. A file name may hold a back-slash: some systems
+    /// take it for a character like any other.
     std::wstring readName() {
         std::wstring name = readText();
         if (name.empty() || name.find(L'/') != std::wstring::npos ||
@@ -156,10 +158,9 @@ std::filesystem::path verdictsFileOf(const std::filesystem::path& list) {
 }
 
 bool isCarried(const std::wstring& text) {
-    const std::optional<std::string> bytes = platform::toBytes(text);
+    const std::optional<std::string> bytes = toNarrow(text);
     // Some locales take a similar character instead.
-    return bytes && text.find(L'\0') == std::wstring::npos &&
-           platform::toCharacters(*bytes) == text;
+    return bytes && text.find(L'\0') == std::wstring::npos && toWide(*bytes) == text;
 }
 
 const RecordedLibrary* findRecord(const RecordedLibraries& libraries, const std::wstring& directory,

@@ -2,7 +2,9 @@
 
 #include "components/componentManager/exceptions.h"
 #include "components/componentTools/explain.h"
-#include "components/componentTools/platform/system.h"
+#include "components/componentTools/inspection.h"
+#include "components/componentTools/reasonText.h"
+#include "components/componentTools/uidNotes.h"
 #include "components/componentTools/verdictsFile.h"
 #include "components/platform/platform.h"
 
@@ -31,6 +33,7 @@ class Scanner {
                 report(index, count, discovery.candidates[index]);
             add(discovery.candidates[index]);
         }
+        compareUids();
         for (const Discovery::LeftOut& left : discovery.leftOut)
             leaveOut(left);
         if (!options.list.empty())
@@ -64,11 +67,11 @@ class Scanner {
     void write() {
         std::error_code failure;
         if (std::filesystem::is_directory(options.list, failure))
-            result.notWritten = L"nothing was written, for this is a folder";
+            keepFromWriting(L"nothing was written, for this is a folder");
         else if (unprobed > 0 && probed == 0)
-            result.notWritten = L"nothing was written, for no library could be tried";
+            keepFromWriting(L"nothing was written, for no library could be tried");
         else if (!result.rejected.empty() && !keepRejected())
-            result.notWritten = L"nothing was written, for what is there could not be kept";
+            keepFromWriting(L"nothing was written, for what is there could not be kept");
         if (!result.notWritten.empty())
             return;
         writeGuarded([&] { writeRecordedList(options.list, result.libraries); });
@@ -83,8 +86,12 @@ class Scanner {
         try {
             write();
         } catch (const QrStreamEx& failure) {
-            result.notWritten = System::displayName(System::pathOfArgument(failure.getReason()));
+            result.notWritten = reasonText(failure.getReason());
         }
+    }
+
+    void keepFromWriting(const wchar_t* why) {
+        result.notWritten = displayName(options.list) + L": " + why;
     }
 
     /// What is no list may be somebody's work, named by mistake.
@@ -109,7 +116,8 @@ class Scanner {
         const bool unchanged = known != old.end() && status && status->time == known->second.time &&
                                status->size == known->second.size;
         if (!status) {
-            file.verdict.verdict = Verdict::missing; // Gone since the folder was listed.
+            file.verdict.verdict =
+                verdictOnAbsence(candidate.path); // Gone since the folder was listed.
         } else if (unchanged && !isTriedAgain(known->second)) {
             file.verdict = verdictOf(known->second);
             keep(file, known->second);
@@ -187,6 +195,26 @@ class Scanner {
             library.kept = file.verdict;
         file.recorded = true;
         result.libraries.push_back(std::move(library));
+    }
+
+    /// Says of each recorded library whose builders others take over, or it takes over. A library
+    /// that loses one is recorded all the same: so a host knows it.
+    void compareUids() {
+        const UidNotes uids(result.libraries);
+        std::size_t position = 0;
+        for (ScannedFile& file : result.files) {
+            if (!file.recorded)
+                continue;
+            for (Finding& note : uids.notesOn(result.libraries[position].builders, position)) {
+                const bool first = file.verdict.verdict == Verdict::works;
+                if (first && note.verdict == Verdict::uidTaken)
+                    file.verdict = note;
+                // Looking at the file has told some of them already.
+                if (std::find(file.notes.begin(), file.notes.end(), note) == file.notes.end())
+                    file.notes.push_back(std::move(note));
+            }
+            ++position;
+        }
     }
 
     static const std::wstring* uncarriedText(const RecordedLibrary& library) {

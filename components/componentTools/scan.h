@@ -42,7 +42,7 @@ struct ScanResult {
     RecordedLibraries libraries;    ///< what was, or should have been, written
     std::wstring rejected;          ///< why the old list was rejected; empty when it was not
     std::filesystem::path keptAs;   ///< where a copy of what was rejected is; empty for nowhere
-    std::wstring notWritten;        ///< why the list, or what is beside it, was not written
+    std::wstring notWritten;        ///< names the file that was not written, and says why
     bool interrupted = false;       ///< the user stopped it; the rest of the old list was kept
 };
 

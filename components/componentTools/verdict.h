@@ -28,6 +28,8 @@ enum class Verdict {
 
     // Faults that show without running anything.
     missing,
+    unreachable, ///< a folder above it may not be entered
+    notAFolder,  ///< a search path names a file
     unreadable,
     nameNotCarried, ///< the locale has no form for the name
     notSearchable,  ///< a folder whose name has the separator of search paths in it
@@ -61,10 +63,15 @@ enum class Verdict {
     recordedFailed, ///< recorded without builders: not tried again until it changes
     recordedChanged,
 
+    // Whether a host's search path leads to the file.
+    onPath,
+    notOnPath,
+
     // What is worth knowing of its builders.
     miscounted, ///< another number was announced than given
     uidTaken,   ///< another library has the identifier and wins
     uidWins,    ///< another library has the identifier and loses
+    uidNil,     ///< the identifier is nil, forgotten as a rule
     uidTwice,   ///< the library itself offers the identifier twice
 };
 

@@ -1,7 +1,8 @@
 #include "components/componentTools/verdictsFile.h"
 
-#include "components/componentTools/replaceFile.h"
-#include "components/componentTools/utf8.h"
+#include "components/componentManager/files.h"
+#include "components/componentManager/utf8.h"
+#include "components/componentTools/openPatiently.h"
 
 #include <fstream>
 #include <map>
@@ -40,6 +41,8 @@ bool isKept(Verdict verdict) {
     case Verdict::systemFile:
     case Verdict::notRegular:
     case Verdict::missing: // and these are not recorded.
+    case Verdict::unreachable:
+    case Verdict::notAFolder:
     case Verdict::nameNotCarried:
     case Verdict::notSearchable:
     case Verdict::sameName:

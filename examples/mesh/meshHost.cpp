@@ -21,6 +21,7 @@
 #include "saving/recordedList.h"
 #include "system/system.h"
 
+#include "components/componentKit/hostKit.h"
 #include "components/componentManager/componentImp.h"
 
 #include <algorithm>
@@ -61,13 +62,8 @@ Options parseOptions(const std::vector<std::filesystem::path>& arguments) {
             options.files.push_back(arguments[index]);
     }
     if (options.components.empty())
-        options.components = console::programFolder() / ".." / "components" / "mesh";
+        options.components = Kit::programFolder() / ".." / "components" / "mesh";
     return options;
-}
-
-/// The manager wants full names, without "." and "..".
-std::wstring searchPath(const std::filesystem::path& folder) {
-    return console::wideName(std::filesystem::absolute(folder).lexically_normal());
 }
 
 class BuilderLister final : public QrEnumerator<QrCPtr<QrBuilderDescription>> {
@@ -92,25 +88,34 @@ void tellLoaded(const Options& options, const char* when) {
               << " loaded" << std::endl;
 }
 
+/// Writes the manager's list. Without it the next start takes longer, and that is all.
+void saveList(const Options& options, ConsoleController& controller) {
+    try {
+        writeRecordedList(options.list);
+    } catch (const QrStreamEx& failure) {
+        controller.error(0, displayText(failure.getReason()).c_str()); // It names the file.
+    }
+}
+
 /// Initialises the manager, with its recorded list where there is one.
 void start(const Options& options, ConsoleController& controller) {
     bool listed = false;
     try {
         listed = !options.list.empty() && readRecordedList(options.list);
     } catch (const QrStreamEx&) {
-        const std::wstring name = console::wideName(options.list);
+        const std::wstring name = displayName(options.list);
         controller.warning(0, (name + L": damaged; the rest is read from the libraries").c_str());
     }
-    QrGetComponentManager()->initialize(searchPath(options.components).c_str());
+    QrGetComponentManager()->initialize(Kit::searchPath(options.components).c_str());
     tellLoaded(options, listed ? "After a start with the recorded list"
                                : "After a start without a recorded list");
     if (!options.list.empty())
-        writeRecordedList(options.list);
+        saveList(options, controller);
 }
 
 QrPtr<Mesh> importMesh(const MeshImporter& importer, ConsoleController& controller,
                        const std::filesystem::path& file) {
-    const std::wstring name = console::wideName(file);
+    const std::wstring name = Kit::wideName(file);
     const int errorsBefore = controller.errorCount();
     bool found = false;
     const QrRef<QrCastable> object = importer.import(name.c_str(), nullptr, found);
@@ -130,9 +135,7 @@ void attempt(ConsoleController& controller, const std::filesystem::path& path, W
     try {
         work();
     } catch (const std::exception& failure) {
-        const std::string reason = failure.what();
-        const std::wstring text(reason.begin(), reason.end());
-        controller.error(0, (console::wideName(path) + L": " + text).c_str());
+        controller.error(0, (displayName(path) + L": " + displayText(failure.what())).c_str());
     }
 }
 
@@ -165,7 +168,7 @@ void run(const Options& options, ConsoleController& controller) {
     const QrRef<QrCastable> object = QrGetComponentManager()->createObject(meshImporterBuilderUid);
     const QrPtr<MeshImporter> importer = queryCast<MeshImporter>(object.get());
     if (!importer) {
-        const std::wstring folder = searchPath(options.components);
+        const std::wstring folder = Kit::searchPath(options.components);
         controller.error(0, (folder + L": no mesh importer is there").c_str());
         return;
     }

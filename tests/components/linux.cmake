@@ -16,3 +16,49 @@ foreach(style gnu sysv)
   set_target_properties(${name} PROPERTIES PREFIX ""
     LIBRARY_OUTPUT_DIRECTORY ${PROJECT_BINARY_DIR}/components/${name})
 endforeach()
+
+# Libraries that need one another, in neededTop -> neededMiddle -> neededLeaf, with the folders for
+# that in one or the other way. Those that load have to be found, and the others not.
+#   mz_add_needed(NAME FUNCTION function [NEXT function LIBRARY library] [FOLDER folder] [TAGS tags]
+#     [RPATH folders...] [SONAME name])
+function(mz_add_needed name)
+  cmake_parse_arguments(PARSE_ARGV 1 arg "" "FUNCTION;NEXT;LIBRARY;FOLDER;TAGS;SONAME" "RPATH")
+  add_library(${name} SHARED needed.cpp)
+  target_compile_definitions(${name} PRIVATE MZ_TEST_FUNCTION=${arg_FUNCTION})
+  set_target_properties(${name} PROPERTIES PREFIX "" BUILD_WITH_INSTALL_RPATH ON
+    INSTALL_RPATH "${arg_RPATH}"
+    LIBRARY_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/components/needed/${arg_FOLDER})
+  target_link_options(${name} PRIVATE -Wl,--no-as-needed,--allow-shlib-undefined)
+  if(arg_TAGS)
+    target_link_options(${name} PRIVATE -Wl,--${arg_TAGS}-new-dtags)
+  endif()
+  if(arg_SONAME)
+    set_target_properties(${name} PROPERTIES NO_SONAME ON)
+    # In a file, where neither the build tool nor the shell sees the variable.
+    file(CONFIGURE OUTPUT ${CMAKE_CURRENT_BINARY_DIR}/${name}.options @ONLY
+      CONTENT "-Wl,-soname,@arg_SONAME@\n")
+    target_link_options(${name} PRIVATE @${CMAKE_CURRENT_BINARY_DIR}/${name}.options)
+  endif()
+  if(arg_NEXT)
+    target_compile_definitions(${name} PRIVATE MZ_TEST_NEXT=${arg_NEXT})
+    target_link_libraries(${name} PRIVATE ${arg_LIBRARY})
+  endif()
+endfunction()
+
+set(entryPoint QrGetComponentDescription)
+mz_add_needed(neededLeaf FUNCTION mzLeaf FOLDER leaf)
+mz_add_needed(neededMiddle FUNCTION mzMiddle NEXT mzLeaf LIBRARY neededLeaf FOLDER middle)
+mz_add_needed(neededMiddleAlone FUNCTION mzMiddle NEXT mzLeaf LIBRARY neededLeaf FOLDER middle
+  TAGS enable RPATH /nowhere)
+mz_add_needed(neededThroughRpath FUNCTION ${entryPoint} NEXT mzMiddle LIBRARY neededMiddle
+  TAGS disable RPATH $ORIGIN/middle $ORIGIN/leaf)
+mz_add_needed(neededThroughRunpath FUNCTION ${entryPoint} NEXT mzMiddle LIBRARY neededMiddle
+  TAGS enable RPATH $ORIGIN/middle $ORIGIN/leaf)
+mz_add_needed(neededBehindRunpath FUNCTION ${entryPoint} NEXT mzMiddle LIBRARY neededMiddleAlone
+  TAGS disable RPATH $ORIGIN/middle $ORIGIN/leaf)
+mz_add_needed(neededLeafByOrigin FUNCTION mzLeaf FOLDER leaf
+  SONAME $ORIGIN/leaf/neededLeafByOrigin.so)
+mz_add_needed(neededByOrigin FUNCTION ${entryPoint} NEXT mzLeaf LIBRARY neededLeafByOrigin)
+mz_add_needed(neededLeafByLostOrigin FUNCTION mzLeaf FOLDER leaf
+  SONAME $ORIGIN/lost/neededLeafByLostOrigin.so)
+mz_add_needed(neededByLostOrigin FUNCTION ${entryPoint} NEXT mzLeaf LIBRARY neededLeafByLostOrigin)

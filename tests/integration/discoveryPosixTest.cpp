@@ -1,9 +1,11 @@
 /// What files are on Linux alone: pipes, links, and names that differ in letter case only.
+#include "components/componentKit/hostKit.h"
 #include "tests/integration/managerFixture.h"
 
 #include <clocale>
 #include <fcntl.h>
 #include <fstream>
+#include <locale.h>
 #include <pthread.h>
 #include <string_view>
 #include <sys/ioctl.h>
@@ -290,6 +292,22 @@ TEST_F(PosixDiscovery, PassesOverFilesThatMayNotBeRead) {
     ASSERT_EQ(::seteuid(before), 0);
     EXPECT_FALSE(find(file)->module);
     EXPECT_EQ(names(), (Names{L"kit"}));
+}
+
+TEST_F(PosixDiscovery, FindsAFolderThatTheKitNamedUnderTheThreadsLocale) {
+    const std::filesystem::path strange = folder.path() / "\xC3\xBC \xE6\x97\xA5";
+    std::filesystem::create_directory(strange);
+    std::filesystem::copy_file(builtComponent(L"goodWithKit"), strange / "kit.so");
+    std::thread([&] {
+        const locale_t locale = ::newlocale(LC_ALL_MASK, "C.UTF-8", nullptr);
+        ASSERT_TRUE(locale);
+        const locale_t before = ::uselocale(locale);
+        manager->initialize(Kit::searchPath(strange).c_str());
+        ::uselocale(before);
+        ::freelocale(locale);
+    }).join();
+    EXPECT_EQ(names(), (Names{L"kit"}));
+    EXPECT_TRUE(manager->libraries.front().directory.ends_with(L"\\\u00FC \u65E5"));
 }
 
 } // namespace

@@ -48,6 +48,14 @@ run_host(damaged 0 --list "damaged list")
 file(WRITE ${folder}/meshes/damaged.text "1 2 3")
 run_host(unloadable 1 --load meshes)
 
+# Where the list cannot be written, everything else goes on; the message names the list, once.
+execute_process(COMMAND ${HOST} --list "no folder/list" icosahedron.off WORKING_DIRECTORY ${folder}
+  RESULT_VARIABLE result OUTPUT_VARIABLE output ERROR_VARIABLE error)
+if(NOT result EQUAL 1 OR NOT output MATCHES "icosahedron.off: "
+    OR NOT error MATCHES "^error: no folder/list: Error opening output stream\n[^/]*$")
+  message(FATAL_ERROR "a list that cannot be written ended with ${result}: ${output}${error}")
+endif()
+
 # Where nothing can be saved; the system's own words differ.
 execute_process(COMMAND ${HOST} --save icosahedron.off icosahedron.off WORKING_DIRECTORY ${folder}
   RESULT_VARIABLE result OUTPUT_QUIET ERROR_VARIABLE error)

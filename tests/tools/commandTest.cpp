@@ -370,4 +370,54 @@ TEST_F(Command, TakesNamesWithBlanks) {
     EXPECT_EQ(result.exitCode, 0) << result.output;
 }
 
+TEST_F(Command, EndsWellWithALibraryThatLogsWhileItIsUnloaded) {
+    add(L"logsAtEnd");
+    std::ofstream(work.path() / "one.last", std::ios::binary) << "x";
+    for (const char* command : {"types", "graph"})
+        EXPECT_EQ(run({command, "--path", path()}).exitCode, 0) << command;
+    EXPECT_EQ(run({"import", "one.last", "--path", path()}).exitCode, 1);
+}
+
+TEST_F(Command, ListAndScanNameTheLibraryThatWinsABuilder) {
+    add(L"sharesUidFirst", "a");
+    add(L"sharesUidSecond", "b");
+    for (int round = 0; round < 2; ++round) {
+        const Json files = json(0, {"scan", "--cache", inWork("list")}).at("files");
+        EXPECT_EQ(files.at(0).at("verdict"), "uidTaken");
+        EXPECT_TRUE(files.at(0).at("recorded").get<bool>());
+        EXPECT_THAT(files.at(0).at("sentence").get<std::string>(), HasSubstr("\\b too, which"));
+        EXPECT_EQ(files.at(1).at("verdict"), "works");
+        EXPECT_EQ(files.at(1).at("notes").at(0).at("verdict"), "uidWins");
+    }
+    const Json listed = json(0, {"list", "--cache", inWork("list")}).at("files");
+    EXPECT_EQ(listed.at(0).at("verdict"), "uidTaken");
+    EXPECT_EQ(listed.at(1).at("verdict"), "component");
+    const ProgramResult scanned = run({"scan", "--path", path(), "--cache", inWork("list")});
+    EXPECT_THAT(scanned.output, HasSubstr("\\b too, which comes later and wins\n"));
+    EXPECT_THAT(scanned.output, HasSubstr("2 files: 2 with builders, 0 with faults"));
+}
+
+TEST_F(Command, ExplainSaysWhetherASearchPathLeadsToTheFile) {
+    const std::string file = add(L"goodWithKit").string();
+    const auto noteOf = [](const Json& result) {
+        return result.at("files").at(0).at("notes").at(0).at("verdict").get<std::string>();
+    };
+    EXPECT_EQ(noteOf(json(0, {"explain", file})), "onPath");
+    const ProgramResult elsewhere =
+        run({"explain", file, "--json", "--path", work.path().string()});
+    EXPECT_EQ(elsewhere.exitCode, 1);
+    EXPECT_EQ(noteOf(Json::parse(elsewhere.output)), "notOnPath");
+    const ProgramResult without = run({"explain", file, "--json"});
+    EXPECT_EQ(without.exitCode, 0);
+    EXPECT_TRUE(Json::parse(without.output).at("files").at(0).at("notes").empty());
+    EXPECT_EQ(run({"explain", file, "--path", ";"}).exitCode, 2);
+}
+
+TEST_F(Command, AFileAsASearchPathIsCalledThat) {
+    const std::string file = add(L"goodWithKit").string();
+    const ProgramResult result = run({"list", "--json", "--path", file});
+    EXPECT_EQ(result.exitCode, 1);
+    EXPECT_EQ(Json::parse(result.output).at("files").at(0).at("verdict"), "notAFolder");
+}
+
 } // namespace

@@ -1,7 +1,7 @@
 #include "tests/tools/toolsFixture.h"
 
 #include "components/componentManager/exceptions.h"
-#include "components/componentTools/utf8.h"
+#include "components/componentManager/utf8.h"
 
 #include <clocale>
 #include <thread>

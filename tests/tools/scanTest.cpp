@@ -1,6 +1,6 @@
 #include "tests/tools/toolsFixture.h"
 
-#include "components/componentTools/utf8.h"
+#include "components/componentManager/utf8.h"
 
 #include <clocale>
 #include <fstream>
@@ -361,6 +361,32 @@ TEST_F(Scan, GoesUpFromAFolderAsTheSystemDoes) {
     }
     EXPECT_EQ(std::filesystem::exists(up), std::filesystem::exists(plain)) << plain;
     EXPECT_EQ(plain.lexically_normal(), plain);
+}
+
+TEST_F(Scan, NamesWhatItCannotWriteWithAllItsCharacters) {
+    const std::filesystem::path list = folder.path() / u8"no \u00FC \u65E5" / "list";
+    ScanOptions scanning = options();
+    scanning.list = list;
+    const std::wstring reason = scan(scanning).notWritten;
+    EXPECT_THAT(reason, ::testing::StartsWith(displayName(list) + L": Error opening output "
+                                                                  L"stream: "));
+}
+
+TEST_F(Scan, NotesANilIdentifierAndRecordsIt) {
+    add(L"nilUid");
+    const ScanResult result = scan(options());
+    ASSERT_EQ(result.files.size(), 1u);
+    EXPECT_EQ(result.files[0].verdict.verdict, Verdict::works);
+    ASSERT_EQ(result.files[0].notes.size(), 1u);
+    EXPECT_EQ(result.files[0].notes[0].verdict, Verdict::uidNil);
+    EXPECT_EQ(result.files[0].notes[0].words, L"nameless");
+    EXPECT_EQ(result.libraries.at(0).builders.size(), 1u);
+    ExplainOptions loading;
+    loading.load = true;
+    loading.probe = patient();
+    const Explanation explanation = explainFile(result.files[0].path, loading);
+    ASSERT_EQ(explanation.notes.size(), 1u);
+    EXPECT_EQ(explanation.notes[0].verdict, Verdict::uidNil);
 }
 
 } // namespace

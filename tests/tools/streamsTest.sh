@@ -59,6 +59,11 @@ ended='a component ended the program while "exits"'
 expect 1 "$ended imported file.exit" import --path exits file.exit
 expect 1 "$ended made an object" graph --path exits
 
+# A file that cannot be written is named once.
+expect 1 '^error: no/list: Error opening output stream: ' scan --path good --cache no/list
+said=$("${program[@]}" scan --path good --cache no/list 2>&1 >/dev/null)
+[ "$(grep -o 'no/list' <<<"$said" | wc -l)" = 1 ] || { echo "named twice: $said" >&2; status=1; }
+
 touch empty
 expect 1 'empty: the file is empty' show empty
 head -c 60 list >cut

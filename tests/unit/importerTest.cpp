@@ -29,7 +29,8 @@ class Importer : public testing::Test {
                            const wchar_t* name = L"test") {
         const QrUid uid = uidOf(number++);
         QrPtr<TestImportBuilder> builder(new TestImportBuilder(
-            {.uid = uid, .name = name, .label = label}, std::move(extensions), calls));
+            {.uid = Kit::BuilderUid::atRunTime(uid), .name = name, .label = label},
+            std::move(extensions), calls));
         library.add(uid, name, builder->getCastable());
         return *builder;
     }

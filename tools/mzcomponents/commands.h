@@ -25,6 +25,7 @@ struct Common {
 
 struct ExplainArguments {
     std::vector<std::string> files;
+    std::string path; ///< of a host, as given; empty if none was
     bool load = false;
 };
 

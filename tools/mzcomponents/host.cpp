@@ -151,6 +151,8 @@ std::vector<std::filesystem::path> Host::safeOnes(std::vector<std::filesystem::p
 }
 
 void Host::start(const std::vector<std::filesystem::path>& folders) {
+    previous = QrGetSystemProcessController();
+    installed = true;
     QrSetSystemProcessController(&controller);
     const std::wstring searchPath = Tools::searchPathOf(folders);
     if (searchPath.empty())
@@ -161,7 +163,9 @@ void Host::start(const std::vector<std::filesystem::path>& folders) {
 }
 
 Host::~Host() {
-    QrSetSystemProcessController(nullptr);
+    // Libraries may ask for a controller while they are unloaded, long after this one is gone.
+    if (installed)
+        QrSetSystemProcessController(previous);
 }
 
 std::vector<QrCPtr<QrBuilderDescription>> Host::builders() const {

@@ -6,6 +6,7 @@
 #include "components/componentManager/componentImp.h"
 #include "components/componentManager/importBuilder.h"
 #include "components/componentManager/importer.h"
+#include "components/componentManager/processControl.h"
 
 #include <string>
 #include <vector>
@@ -41,6 +42,8 @@ class Host {
     void start(const std::vector<std::filesystem::path>& folders);
 
     Tools::ConsoleController controller;
+    QrProcessControl* previous = nullptr; ///< the process's controller before this one
+    bool installed = false;
     Tools::ScanResult scanned;
     bool complete = true;
 };

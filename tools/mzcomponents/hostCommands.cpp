@@ -1,17 +1,19 @@
 /// The commands that use components: types, import, graph.
 #include "tools/mzcomponents/exitGuard.h"
 #include "tools/mzcomponents/host.h"
+#include "tools/mzcomponents/inputFile.h"
 #include "tools/mzcomponents/output.h"
 
 #include "components/componentManager/binaryStream.h"
 #include "components/componentManager/bufferio.h"
+#include "components/componentManager/files.h"
+#include "components/componentManager/nativeText.h"
 #include "components/componentTools/discovery.h"
 #include "components/componentTools/graph.h"
-#include "components/componentTools/replaceFile.h"
 #include "components/objectIO/objectIO.h"
 
 #include <algorithm>
-#include <fstream>
+#include <optional>
 #include <sstream>
 #include <system_error>
 
@@ -88,13 +90,15 @@ Imported importThrough(const std::vector<std::wstring>& families, const std::wst
 
 Imported importFile(const Host& host, const std::filesystem::path& file) {
     Imported imported;
-    std::error_code failure;
-    if (!std::filesystem::is_regular_file(file, failure))
-        imported.reason = L"there is no such file";
-    else if (!std::ifstream(file, std::ios::binary))
-        imported.reason = L"the file cannot be read";
-    else
-        imported = importThrough(familiesFor(host, file), Tools::displayName(file));
+    imported.reason = obstacleTo(file);
+    if (!imported.reason.empty())
+        return imported;
+    const std::optional<std::wstring> name = toWideName(file);
+    if (name && Tools::isCarried(*name))
+        return importThrough(familiesFor(host, file), *name);
+    imported.reason =
+        L"the file's name has no form in the current locale, so no component can open "
+        L"it; rename it, or choose a locale that has its characters";
     return imported;
 }
 
@@ -139,7 +143,7 @@ void save(const std::vector<QrRef<QrCastable>>& objects, const std::filesystem::
         for (const QrRef<QrCastable>& object : objects)
             stream << object.get();
     }
-    Tools::replaceFile(file, content.view());
+    replaceFile(file, content.view());
 }
 
 /// Whether the result would take the place of what it comes from.
@@ -257,7 +261,7 @@ int graph(const Common& common, const GraphArguments& arguments) {
         results() << dot;
     }
     if (!arguments.output.empty())
-        Tools::replaceFile(Tools::pathOf(arguments.output), dot);
+        replaceFile(Tools::pathOf(arguments.output), dot);
     std::wstring why;
     if (!arguments.svg.empty() && !Tools::drawSvg(dot, Tools::pathOf(arguments.svg), why)) {
         host.console().error(0, why.c_str());

@@ -34,12 +34,28 @@ struct Recorded {
     Tools::RecordedLibraries libraries;
 };
 
+void printSentence(const Tools::Finding& finding) {
+    printLine(std::wstring(nameWidth + 2, L' ') + Tools::sentenceOf(finding));
+}
+
+/// The verdict on a component, or, if another library takes one of its builders over, that.
+Tools::Finding withUidTaken(const Tools::Explanation& explanation) {
+    if (explanation.verdict.verdict == Tools::Verdict::component)
+        for (const Tools::Finding& note : explanation.notes)
+            if (note.verdict == Tools::Verdict::uidTaken)
+                return note;
+    return explanation.verdict;
+}
+
 void printFile(const std::filesystem::path& file, const Tools::Finding& finding,
                const std::vector<Tools::Finding>& notes) {
     std::wstring line = padded(nameOf(finding), nameWidth) + L"  " + Tools::displayName(file);
     for (const Tools::Finding& note : notes)
-        line += L"  " + nameOf(note);
+        if (!(note == finding))
+            line += L"  " + nameOf(note);
     printLine(line);
+    if (finding.verdict == Tools::Verdict::uidTaken)
+        printSentence(finding);
 }
 
 Json jsonOfFile(const std::filesystem::path& file, const Tools::Finding& finding,
@@ -103,10 +119,18 @@ bool failedEarlier(const Tools::Explanation& explanation) {
            explanation.notes.front().verdict == Tools::Verdict::recordedFailed;
 }
 
+/// Whether the search path that was given does not lead to the file.
+bool isPassedBy(const Tools::Explanation& explanation) {
+    return std::any_of(
+        explanation.notes.begin(), explanation.notes.end(),
+        [](const Tools::Finding& note) { return note.verdict == Tools::Verdict::notOnPath; });
+}
+
 void printSummary(const Tools::ScanResult& result) {
     std::size_t works = 0, faults = 0, looked = 0;
     for (const Tools::ScannedFile& file : result.files) {
-        works += file.verdict.verdict == Tools::Verdict::works;
+        works += file.verdict.verdict == Tools::Verdict::works ||
+                 file.verdict.verdict == Tools::Verdict::uidTaken;
         faults += isFault(file.verdict);
         looked += file.looked;
     }
@@ -141,7 +165,7 @@ int list(const Common& common) {
         if (explanation.verdict.verdict == Tools::Verdict::component)
             explanation = Tools::explainFile(candidate.path, options);
         faults = faults || failedEarlier(explanation);
-        tell(candidate.path, explanation.verdict, explanation.notes);
+        tell(candidate.path, withUidTaken(explanation), explanation.notes);
     }
     for (const Tools::Discovery::LeftOut& left : discovery.leftOut)
         tell(left.path, left.finding, {});
@@ -156,6 +180,8 @@ int explain(const Common& common, const ExplainArguments& arguments, const Probe
     Tools::ExplainOptions options;
     options.recorded = recorded.get();
     options.load = arguments.load;
+    const auto folders = Tools::foldersOf(Tools::pathOf(arguments.path));
+    options.folders = arguments.path.empty() ? nullptr : &folders;
     options.probe = probeOptions(probe);
     options.probe.interrupted = [&] { return controller.isInterrupted(); };
     Json files = Json::array();
@@ -163,7 +189,7 @@ int explain(const Common& common, const ExplainArguments& arguments, const Probe
     for (const std::string& file : arguments.files) {
         const Tools::Explanation explanation = Tools::explainFile(Tools::pathOf(file), options);
         // Asked why a file is no component, anything but a component is an answer of that kind.
-        faults = faults || failedEarlier(explanation) ||
+        faults = faults || failedEarlier(explanation) || isPassedBy(explanation) ||
                  Tools::severityOf(explanation.verdict.verdict) != Tools::Severity::good;
         if (common.json)
             files.push_back(jsonOfExplanation(explanation));
@@ -197,7 +223,7 @@ int scan(const Common& common, const ProbeArguments& probe) {
         } else {
             printFile(file.path, file.verdict, file.notes);
             if (isFault(file.verdict))
-                printLine(std::wstring(nameWidth + 2, L' ') + Tools::sentenceOf(file.verdict));
+                printSentence(file.verdict);
         }
     }
     if (common.json)

@@ -51,11 +51,14 @@ std::string asOneName(const std::string& word) {
 }
 
 CLI::App* addCommand(CLI::App& app, Arguments& arguments, const char* name, const char* text,
-                     const char* example) {
+                     const char* example, std::string* hostPath = nullptr) {
     CLI::App* command = app.add_subcommand(name, text);
     command
-        ->add_option("--path", arguments.common.path,
-                     "The folders to search, separated by ';'; the current one if not given")
+        ->add_option("--path", hostPath ? *hostPath : arguments.common.path,
+                     hostPath ? "The search path of a host, folders separated by ';', to say "
+                                "whether it leads to the files"
+                              : "The folders to search, separated by ';'; the current one if not "
+                                "given")
         ->check(namesAFolder);
     command->add_flag("--json", arguments.common.json, "Write the result as JSON");
     command->footer(std::string("Example:\n  ") + example);
@@ -96,7 +99,7 @@ void addLookCommands(CLI::App& app, Arguments& arguments) {
     CLI::App* explain = addCommand(
         app, arguments, "explain",
         "Explains why each file is, or is not, a component library, and what to do about it.",
-        "mzcomponents explain --load /opt/app/components/mesh.so");
+        "mzcomponents explain --load /opt/app/components/mesh.so", &arguments.explain.path);
     explain->add_option("FILE", arguments.explain.files, "The files")->required();
     explain->add_flag("--load", arguments.explain.load,
                       "Load each file, in a process of its own, and say how that went");

@@ -1,10 +1,11 @@
 #include "tools/mzcomponents/output.h"
 
 #include "components/base/exBase.h"
+#include "components/componentManager/utf8.h"
 #include "components/componentTools/console.h"
 #include "components/componentTools/discovery.h"
+#include "components/componentTools/reasonText.h"
 #include "components/componentTools/standardOutput.h"
-#include "components/componentTools/utf8.h"
 
 #include <algorithm>
 #include <exception>
@@ -13,7 +14,7 @@
 namespace Mz::Commands {
 
 std::string utf8(const std::wstring& text) {
-    return Tools::toUtf8(text);
+    return toUtf8(text);
 }
 
 std::ostream& results() {
@@ -43,10 +44,10 @@ std::wstring widened(const std::string& bytes) {
 std::wstring wordsOfException() {
     try {
         throw;
+    } catch (const ExBase& failure) {
+        return Tools::reasonText(failure.getReason());
     } catch (const std::exception& failure) {
         return widened(failure.what());
-    } catch (const ExBase& failure) {
-        return widened(failure.getReason());
     } catch (...) {
         return L"a component threw what is no exception of any known kind";
     }
@@ -65,7 +66,7 @@ void tellOfList(Tools::ConsoleController& controller, const std::wstring& list,
         controller.warning(0,
                            (name + L": what was in it is kept as " + shown(result.keptAs)).c_str());
     if (!result.notWritten.empty())
-        controller.error(0, (name + L": " + result.notWritten).c_str());
+        controller.error(0, Tools::withoutControls(result.notWritten).c_str());
 }
 
 void printLine(const std::wstring& text) {

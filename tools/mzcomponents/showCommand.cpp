@@ -1,6 +1,7 @@
 /// The command that shows what is in a file: show.
 #include "tools/mzcomponents/exitGuard.h"
 #include "tools/mzcomponents/host.h"
+#include "tools/mzcomponents/inputFile.h"
 #include "tools/mzcomponents/output.h"
 
 #include "components/componentManager/binaryStream.h"
@@ -162,9 +163,10 @@ int showObjects(const Common& common, const std::filesystem::path& file, std::is
 /// What keeps the file from being read as objects, or nothing; `input` is open then.
 std::wstring obstacle(const std::filesystem::path& file, std::ifstream& input,
                       const std::wstring& whyNoList) {
+    std::wstring wrong = obstacleTo(file);
+    if (!wrong.empty())
+        return wrong;
     std::error_code failure;
-    if (!std::filesystem::is_regular_file(file, failure))
-        return L"there is no such file";
     if (std::filesystem::file_size(file, failure) == 0 && !failure)
         return L"the file is empty";
     input.open(file, std::ios::binary);

@@ -23,9 +23,6 @@ using NativePath = std::filesystem::path;
 /// `path` for people: what has no form in the current locale is shown as `\xNN`.
 std::wstring displayName(const NativePath& path);
 
-/// `path` as the manager knows it; nothing when the current locale has no form for it.
-std::optional<std::wstring> nameText(const NativePath& path);
-
 /// `text` as bytes for standard output or standard error: in the terminal's encoding where `stream`
 /// (1 or 2) is one, else in that of the locale; '?' for what has no form there.
 std::string encode(const std::wstring& text, int stream);
@@ -36,10 +33,6 @@ std::vector<std::string> arguments(int count, char** values);
 
 /// The path that such an argument names.
 NativePath pathOfArgument(const std::string& argument);
-
-/// The same place as `path`, which is absolute, without "." and "..", as the system goes there:
-/// some follow a link before they go up from it. A part that does not exist goes up by its name.
-NativePath withoutDots(const NativePath& path);
 
 // ---- Files and libraries --------------------------------------------------------------------
 
@@ -60,11 +53,17 @@ struct Located {
     NativePath file; ///< empty when it is found without a file of its own
 };
 
-/// Looks for the library `name`, needed by the one at `library`, whose image is `image`, as the
-/// loader would in this process; `programFolder`, unless empty, stands for the folder of the host's
-/// program where that matters.
-Located findDependency(const std::string& name, const NativePath& library,
-                       const LibraryImage& image, const NativePath& programFolder);
+/// A library that needs others, and the one through which it was found to be needed itself.
+struct Needer {
+    NativePath library;
+    LibraryImage image;
+    const Needer* loader = nullptr; ///< null for the one that everything began with
+};
+
+/// Looks for the library `name` that `needer` needs, as the loader would in this process;
+/// `programFolder`, unless empty, stands for the folder of the host's program where that matters.
+Located findDependency(const std::string& name, const Needer& needer,
+                       const NativePath& programFolder);
 
 /// What the loader says to `path`, which it has just failed to load.
 std::wstring loaderWords(const NativePath& path);

@@ -16,17 +16,8 @@ void useBinaryOutput();
 /// The program's arguments, without its name, with every character that the user typed.
 std::vector<std::filesystem::path> arguments(int argc, char** argv);
 
-/// The folder that the program's file stands in.
-std::filesystem::path programFolder();
-
-/// The name of a file as the component libraries want it: as buffered IO converts text while the C
-/// locale is "C", which a program has unless it changes it.
-std::wstring wideName(const std::filesystem::path& path);
-
-/// The name of a file as text, the same for the same name on every system.
-std::wstring fileText(const std::filesystem::path& path);
-
-/// The way back from `wideName`: text as it is written to the standard output.
+/// Text in the form of the library's names, as it is written to the standard output: on Linux the
+/// bytes of a name are its own again, on Windows it is UTF-8.
 std::string outputText(std::wstring_view text);
 
 } // namespace Meshes::console

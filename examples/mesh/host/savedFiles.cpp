@@ -3,6 +3,8 @@
 #include "description.h"
 
 #include "components/componentManager/componentImp.h"
+#include "components/componentManager/nativeText.h"
+#include "components/componentManager/utf8.h"
 #include "examples/mesh/console/console.h"
 #include "examples/mesh/saving/objectFile.h"
 
@@ -73,7 +75,7 @@ void SavedFiles::save(const std::filesystem::path& file, const QrPtr<Mesh>& mesh
     name += file.filename();
     saveAndCompare(folder / name, *mesh);
 
-    Scene::Instance instance{console::fileText(file.filename()), Scene::identity, mesh};
+    Scene::Instance instance{fromUtf8(utf8Name(file.filename())), Scene::identity, mesh};
     scene->add(instance);
     const Mesh::Box box = mesh->bounds();
     instance.name += L" (beside)";
@@ -101,7 +103,7 @@ void loadSavedFile(const std::filesystem::path& file) {
     const QrRef<QrCastable> object = loadObject(file, nullptr, form);
     if (!object)
         throw std::runtime_error("no object was saved there");
-    describe(console::outputText(console::wideName(file.filename())), *object);
+    describe(console::outputText(displayName(file.filename())), *object);
 }
 
 } // namespace Meshes

@@ -1,8 +1,8 @@
 #include "objectFile.h"
 
-#include "safeFile.h"
-
 #include "components/componentManager/binaryStream.h"
+#include "components/componentManager/files.h"
+#include "components/componentManager/nativeText.h"
 #include "components/componentManager/textStream.h"
 #include "components/objectIO/objectIO.h"
 
@@ -32,7 +32,7 @@ void withStream(QrCastable* io, Form form, Work&& work) {
 } // namespace
 
 void saveObject(const std::filesystem::path& file, QrCastable& object, Form form) {
-    saveSafely(file, [&](std::ostream& out) {
+    replaceFile(file, [&](std::ostream& out) {
         QrOutBuffer bytes(&out);
         QrObjectOutBuffer objects(&bytes);
         withStream(&objects, form, [&](QrStream& stream) { stream << &object; });
@@ -44,7 +44,7 @@ void saveObject(const std::filesystem::path& file, QrCastable& object, Form form
 QrRef<QrCastable> loadObject(const std::filesystem::path& file, const QrUid* wanted, Form form) {
     std::ifstream in(file, std::ios::binary);
     if (!in || std::filesystem::is_directory(file))
-        throw QrStreamEx::ExReadOpen(source, __LINE__, file.string().c_str());
+        throw QrStreamEx::ExReadOpen(source, __LINE__, utf8Name(file).c_str());
     QrInBuffer bytes(&in);
     QrObjectInBuffer objects(&bytes);
     QrRef<QrCastable> object;

@@ -9,8 +9,8 @@ namespace Meshes {
 
 enum class Form { Binary, Text };
 
-/// Saves the object, and all that it refers to, in place of whatever the file held. Raises what
-/// `saveSafely` and the writing of objects raise; then the old file is as it was.
+/// Saves the object, and all that it refers to, in place of whatever the file held. Throws what
+/// `Mz::replaceFile` and the writing of objects throw; then the old file is as it was.
 void saveObject(const std::filesystem::path& file, Mz::QrCastable& object, Form form);
 
 /// The object in the file, which answers for the interface `wanted`, or for any one when that is

@@ -1,9 +1,8 @@
 #include "recordedList.h"
 
-#include "safeFile.h"
-
 #include "components/componentManager/binaryStream.h"
 #include "components/componentManager/componentImp.h"
+#include "components/componentManager/files.h"
 
 #include <fstream>
 #include <ostream>
@@ -32,7 +31,7 @@ bool readRecordedList(const std::filesystem::path& file) {
 }
 
 void writeRecordedList(const std::filesystem::path& file) {
-    saveSafely(file, [](std::ostream& out) {
+    replaceFile(file, [](std::ostream& out) {
         QrOutBuffer bytes(&out);
         QrBinaryStream stream(&bytes);
         companion()->write(stream);

@@ -9,8 +9,8 @@ namespace Meshes {
 /// file. Raises `QrStreamEx` when it is damaged; the manager then reads what is missing afresh.
 bool readRecordedList(const std::filesystem::path& file);
 
-/// Writes the initialised manager's list, in place of whatever the file held. Raises what
-/// `saveSafely` raises.
+/// Writes the initialised manager's list, in place of whatever the file held. Throws what
+/// `Mz::replaceFile` throws.
 void writeRecordedList(const std::filesystem::path& file);
 
 } // namespace Meshes

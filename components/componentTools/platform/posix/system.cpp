@@ -1,5 +1,6 @@
 #include "components/componentTools/platform/system.h"
 
+#include "components/componentManager/nativeText.h"
 #include "components/componentTools/platform/posix/loaderCache.h"
 #include "components/platform/characters.h"
 
@@ -62,41 +63,11 @@ std::vector<std::string> foldersOfEnvironment() {
 } // namespace
 
 std::wstring displayName(const NativePath& path) {
-    const platform::CharacterConverter converter;
-    std::wstring result;
-    for (std::string_view rest = path.native(); !rest.empty();) {
-        wchar_t character;
-        const int length = converter.decode(rest, character);
-        if (length > 0) {
-            result += character;
-        } else {
-            constexpr const wchar_t* digits = L"0123456789ABCDEF";
-            const auto byte = static_cast<unsigned char>(rest.front());
-            result += L"\\x";
-            result += digits[byte >> 4];
-            result += digits[byte & 15];
-        }
-        rest.remove_prefix(length > 0 ? static_cast<std::size_t>(length) : 1);
-    }
-    return result;
-}
-
-std::optional<std::wstring> nameText(const NativePath& path) {
-    return platform::toCharacters(path.native());
+    return Mz::displayName(path);
 }
 
 std::string encode(const std::wstring& text, int) {
-    const platform::CharacterConverter converter;
-    std::string result;
-    for (const wchar_t character : text) {
-        char bytes[platform::maximumCharacterBytes];
-        const int length = converter.encode(character, bytes);
-        if (length > 0)
-            result.append(bytes, static_cast<std::size_t>(length));
-        else
-            result += '?';
-    }
-    return result;
+    return toNarrow(text, '?');
 }
 
 std::vector<std::string> arguments(int count, char** values) {
@@ -105,24 +76,6 @@ std::vector<std::string> arguments(int count, char** values) {
 
 NativePath pathOfArgument(const std::string& argument) {
     return argument;
-}
-
-NativePath withoutDots(const NativePath& path) {
-    NativePath plain;
-    for (const NativePath& part : path) {
-        if (part == "..") {
-            std::error_code failure;
-            if (std::filesystem::is_symlink(std::filesystem::symlink_status(plain, failure))) {
-                const NativePath followed = std::filesystem::weakly_canonical(plain, failure);
-                if (!failure)
-                    plain = followed;
-            }
-            plain = plain.parent_path();
-        } else if (part != ".") {
-            plain /= part;
-        }
-    }
-    return plain.lexically_normal(); // Separators that stand twice.
 }
 
 ImageFormat ownFormat() {
@@ -141,18 +94,33 @@ const wchar_t* loaderPathVariable() {
     return L"LD_LIBRARY_PATH";
 }
 
-Located findDependency(const std::string& name, const NativePath& library,
-                       const LibraryImage& image, const NativePath&) {
+namespace {
+
+/// Where the loader looks before it asks its own list. What a library has as DT_RPATH serves all
+/// that is loaded through it, but for libraries that have a DT_RUNPATH; that serves its owner
+/// alone, and takes the place of its owner's DT_RPATH.
+std::vector<std::string> foldersFor(const Needer& needer) {
+    std::vector<std::string> folders;
+    if (needer.image.runpath.empty())
+        for (const Needer* owner = &needer; owner; owner = owner->loader)
+            if (owner->image.runpath.empty())
+                for (const std::string& folder : owner->image.rpath)
+                    folders.push_back(expanded(folder, owner->library));
+    for (const std::string& folder : foldersOfEnvironment())
+        folders.push_back(expanded(folder, needer.library));
+    for (const std::string& folder : needer.image.runpath)
+        folders.push_back(expanded(folder, needer.library));
+    return folders;
+}
+
+} // namespace
+
+Located findDependency(const std::string& wanted, const Needer& needer, const NativePath&) {
+    const std::string name = expanded(wanted, needer.library);
     if (name.find('/') != std::string::npos)
         return {isFile(name), name};
-    std::vector<std::string> folders;
-    if (image.runpath.empty())
-        folders = image.rpath;
-    for (const std::string& folder : foldersOfEnvironment())
-        folders.push_back(folder);
-    folders.insert(folders.end(), image.runpath.begin(), image.runpath.end());
-    for (const std::string& folder : folders) {
-        const NativePath file = NativePath(expanded(folder, library)) / name;
+    for (const std::string& folder : foldersFor(needer)) {
+        const NativePath file = NativePath(folder) / name;
         if (isFile(file))
             return {true, file};
     }

@@ -1,5 +1,7 @@
 #include "components/componentTools/platform/system.h"
 
+#include "components/componentManager/nativeText.h"
+#include "components/componentManager/utf8.h"
 #include "components/platform/platform.h"
 
 #include "components/componentTools/platform/windows/faultName.h"
@@ -76,11 +78,7 @@ LONG WINAPI endWithFault(EXCEPTION_POINTERS* fault) {
 } // namespace
 
 std::wstring displayName(const NativePath& path) {
-    return path.wstring();
-}
-
-std::optional<std::wstring> nameText(const NativePath& path) {
-    return path.native();
+    return Mz::displayName(path);
 }
 
 std::string encode(const std::wstring& text, int stream) {
@@ -96,17 +94,13 @@ std::vector<std::string> arguments(int, char**) {
     int count = 0;
     wchar_t** const values = ::CommandLineToArgvW(::GetCommandLineW(), &count);
     for (int index = 1; index < count; ++index)
-        result.push_back(toBytes(values[index], CP_UTF8));
+        result.push_back(toUtf8(values[index]));
     ::LocalFree(values);
     return result;
 }
 
 NativePath pathOfArgument(const std::string& argument) {
-    return toCharacters(argument, CP_UTF8);
-}
-
-NativePath withoutDots(const NativePath& path) {
-    return path.lexically_normal();
+    return fromUtf8(argument);
 }
 
 ImageFormat ownFormat() {
@@ -125,8 +119,7 @@ const wchar_t* loaderPathVariable() {
     return L"PATH";
 }
 
-Located findDependency(const std::string& name, const NativePath&, const LibraryImage&,
-                       const NativePath& programFolder) {
+Located findDependency(const std::string& name, const Needer&, const NativePath& programFolder) {
     const std::wstring wide = toCharacters(name, CP_ACP);
     if (isVirtual(wide))
         return {true, {}};

@@ -1,5 +1,7 @@
 #include "../console.h"
 
+#include "components/componentManager/nativeText.h"
+
 namespace Meshes::console {
 
 void useBinaryOutput() {}
@@ -8,31 +10,8 @@ std::vector<std::filesystem::path> arguments(int argc, char** argv) {
     return {argv + (argc > 0 ? 1 : 0), argv + argc};
 }
 
-std::filesystem::path programFolder() {
-    return std::filesystem::read_symlink("/proc/self/exe").parent_path();
-}
-
-std::wstring wideName(const std::filesystem::path& path) {
-    std::wstring result;
-    for (const char byte : path.native())
-        result.push_back(static_cast<unsigned char>(byte));
-    return result;
-}
-
-std::wstring fileText(const std::filesystem::path& path) {
-    try {
-        const std::u32string text = path.u32string(); // Whatever the locale, names are UTF-8.
-        return {text.begin(), text.end()};
-    } catch (const std::exception&) {
-        return wideName(path); // The name is no text.
-    }
-}
-
 std::string outputText(std::wstring_view text) {
-    std::string result;
-    for (const wchar_t character : text)
-        result.push_back(static_cast<char>(character));
-    return result;
+    return Mz::toNarrow(text, '?');
 }
 
 } // namespace Meshes::console

@@ -1,5 +1,7 @@
 #include "../console.h"
 
+#include "components/componentManager/utf8.h"
+
 #include <windows.h>
 
 #include <fcntl.h>
@@ -25,34 +27,8 @@ std::vector<std::filesystem::path> arguments(int, char**) {
     return result;
 }
 
-std::filesystem::path programFolder() {
-    std::wstring name(MAX_PATH, L'\0');
-    while (true) {
-        const auto size = static_cast<DWORD>(name.size());
-        const DWORD length = ::GetModuleFileNameW(nullptr, name.data(), size);
-        if (length < size) {
-            name.resize(length);
-            return std::filesystem::path(name).parent_path();
-        }
-        name.resize(name.size() * 2);
-    }
-}
-
-std::wstring wideName(const std::filesystem::path& path) {
-    return path.native();
-}
-
-std::wstring fileText(const std::filesystem::path& path) {
-    return path.native();
-}
-
 std::string outputText(std::wstring_view text) {
-    const auto length = static_cast<int>(text.size());
-    const int size =
-        ::WideCharToMultiByte(CP_UTF8, 0, text.data(), length, nullptr, 0, nullptr, nullptr);
-    std::string result(static_cast<std::size_t>(size), '\0');
-    ::WideCharToMultiByte(CP_UTF8, 0, text.data(), length, result.data(), size, nullptr, nullptr);
-    return result;
+    return Mz::toUtf8(text);
 }
 
 } // namespace Meshes::console

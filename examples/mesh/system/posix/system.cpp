@@ -1,49 +1,8 @@
 #include "../system.h"
 
-#include <cerrno>
-#include <cstdio>
-
-#include <fcntl.h>
 #include <link.h>
-#include <unistd.h>
 
 namespace Meshes::system {
-
-namespace {
-
-std::error_code lastError() {
-    return {errno, std::generic_category()};
-}
-
-/// Waits for the file, or the folder, to stand on the medium.
-std::error_code synchronise(const std::filesystem::path& path) {
-    const int file = ::open(path.c_str(), O_RDONLY | O_CLOEXEC);
-    if (file < 0)
-        return lastError();
-    const std::error_code result = ::fsync(file) == 0 ? std::error_code() : lastError();
-    ::close(file);
-    return result;
-}
-
-} // namespace
-
-std::error_code createNew(const std::filesystem::path& path) {
-    const int file = ::open(path.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, 0666);
-    if (file < 0)
-        return lastError();
-    ::close(file);
-    return {};
-}
-
-std::error_code moveSafely(const std::filesystem::path& from, const std::filesystem::path& to) {
-    if (const std::error_code failure = synchronise(from))
-        return failure;
-    if (::rename(from.c_str(), to.c_str()) != 0)
-        return lastError();
-    // The name is in the folder. Not every file system lets one wait for that.
-    synchronise(to.has_parent_path() ? to.parent_path() : std::filesystem::path("."));
-    return {};
-}
 
 std::size_t mappedLibraries(const std::filesystem::path& folder) {
     struct Search {

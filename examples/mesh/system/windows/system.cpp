@@ -11,21 +11,6 @@ namespace Meshes::system {
 
 namespace {
 
-std::error_code lastError() {
-    return {static_cast<int>(::GetLastError()), std::system_category()};
-}
-
-std::error_code synchronise(const std::filesystem::path& path) {
-    const HANDLE file =
-        ::CreateFileW(path.c_str(), GENERIC_WRITE, FILE_SHARE_READ | FILE_SHARE_WRITE, nullptr,
-                      OPEN_EXISTING, FILE_ATTRIBUTE_NORMAL, nullptr);
-    if (file == INVALID_HANDLE_VALUE)
-        return lastError();
-    const std::error_code result = ::FlushFileBuffers(file) ? std::error_code() : lastError();
-    ::CloseHandle(file);
-    return result;
-}
-
 std::filesystem::path fileOf(HMODULE module) {
     std::wstring name(32768, L'\0'); // No name is longer.
     const DWORD length = ::GetModuleFileNameW(module, name.data(), static_cast<DWORD>(name.size()));
@@ -34,25 +19,6 @@ std::filesystem::path fileOf(HMODULE module) {
 }
 
 } // namespace
-
-std::error_code createNew(const std::filesystem::path& path) {
-    const HANDLE file = ::CreateFileW(path.c_str(), GENERIC_WRITE, 0, nullptr, CREATE_NEW,
-                                      FILE_ATTRIBUTE_NORMAL, nullptr);
-    if (file == INVALID_HANDLE_VALUE)
-        return ::GetLastError() == ERROR_FILE_EXISTS ? std::make_error_code(std::errc::file_exists)
-                                                     : lastError();
-    ::CloseHandle(file);
-    return {};
-}
-
-std::error_code moveSafely(const std::filesystem::path& from, const std::filesystem::path& to) {
-    if (const std::error_code failure = synchronise(from))
-        return failure;
-    if (!::MoveFileExW(from.c_str(), to.c_str(),
-                       MOVEFILE_REPLACE_EXISTING | MOVEFILE_WRITE_THROUGH))
-        return lastError();
-    return {};
-}
 
 std::size_t mappedLibraries(const std::filesystem::path& folder) {
     std::vector<HMODULE> modules(1024);

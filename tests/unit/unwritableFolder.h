@@ -3,9 +3,9 @@
 
 #include <filesystem>
 
-namespace Meshes {
+namespace Mz::Test {
 
 /// A folder in which nobody can make a file.
 std::filesystem::path unwritableFolder();
 
-} // namespace Meshes
+} // namespace Mz::Test

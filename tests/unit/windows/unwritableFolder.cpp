@@ -1,10 +1,10 @@
-#include "tests/mesh/unwritableFolder.h"
+#include "tests/unit/unwritableFolder.h"
 
-namespace Meshes {
+namespace Mz::Test {
 
 std::filesystem::path unwritableFolder() {
     // No name in it can have this character.
     return L"C:\\a?b";
 }
 
-} // namespace Meshes
+} // namespace Mz::Test

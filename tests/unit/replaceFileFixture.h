@@ -1,7 +1,7 @@
-/// A folder to save files in.
+/// A folder to replace files in.
 #pragma once
 
-#include "examples/mesh/saving/safeFile.h"
+#include "components/componentManager/files.h"
 #include "tests/support/temporaryDirectory.h"
 
 #include <gmock/gmock.h>
@@ -11,12 +11,12 @@
 #include <string>
 #include <string_view>
 
-namespace Meshes {
+namespace Mz::Test {
 
-class SafeFile : public testing::Test {
+class ReplaceFile : public testing::Test {
   protected:
     static void put(const std::filesystem::path& path, std::string_view content) {
-        saveSafely(path, [&](std::ostream& out) { out << content; });
+        replaceFile(path, content);
     }
 
     std::string content() const { return contentOf(file); }
@@ -30,8 +30,8 @@ class SafeFile : public testing::Test {
         return static_cast<std::size_t>(std::distance(begin(entries), end(entries)));
     }
 
-    Mz::Test::TemporaryDirectory folder;
+    TemporaryDirectory folder;
     const std::filesystem::path file = folder.path() / "file with spaces.bin";
 };
 
-} // namespace Meshes
+} // namespace Mz::Test

@@ -1,8 +1,10 @@
-#include "components/componentTools/utf8.h"
+// One decoder takes characters from bytes, and one encoder appends them, for both widths of
+// wchar_t.
+#include "components/componentManager/utf8.h"
 
 #include <cstdint>
 
-namespace Mz::Tools {
+namespace Mz {
 
 namespace {
 
@@ -47,7 +49,10 @@ void append(std::wstring& result, std::uint32_t code) {
     }
 }
 
-/// Takes the first character from `bytes`.
+/// What `take` returns for a byte that begins no valid sequence.
+constexpr std::uint32_t invalid = 0xFFFFFFFF;
+
+/// Takes the first character from `bytes`, or one byte that begins none.
 std::uint32_t take(std::string_view& bytes) {
     const auto byteAt = [&](std::size_t index) {
         return static_cast<std::uint32_t>(static_cast<unsigned char>(bytes[index]));
@@ -62,12 +67,16 @@ std::uint32_t take(std::string_view& bytes) {
     for (std::size_t index = 1; index < length; ++index) {
         if (index >= bytes.size() || (byteAt(index) & 0xC0) != 0x80) {
             bytes.remove_prefix(1);
-            return 0xFFFD;
+            return invalid;
         }
         code = code << 6 | (byteAt(index) & 0x3F);
     }
-    bytes.remove_prefix(length ? length : 1);
-    return length && code <= 0x10FFFF ? code : 0xFFFD;
+    // A longer sequence than the character needs is no valid one.
+    constexpr std::uint32_t least[] = {0, 0, 0x80, 0x800, 0x10000};
+    const bool valid =
+        length > 0 && code >= least[length] && code <= 0x10FFFF && !isHigh(code) && !isLow(code);
+    bytes.remove_prefix(valid ? length : 1);
+    return valid ? code : invalid;
 }
 
 } // namespace
@@ -89,9 +98,28 @@ std::string toUtf8(std::wstring_view text) {
 
 std::wstring fromUtf8(std::string_view bytes) {
     std::wstring result;
-    while (!bytes.empty())
-        append(result, take(bytes));
+    while (!bytes.empty()) {
+        const std::uint32_t code = take(bytes);
+        append(result, code == invalid ? 0xFFFD : code);
+    }
     return result;
 }
 
-} // namespace Mz::Tools
+std::string escapeInvalidUtf8(std::string_view bytes) {
+    std::string result;
+    while (!bytes.empty()) {
+        const std::string_view before = bytes;
+        if (take(bytes) == invalid) {
+            constexpr const char* digits = "0123456789ABCDEF";
+            const auto byte = static_cast<unsigned char>(before.front());
+            result += "\\x";
+            result += digits[byte >> 4];
+            result += digits[byte & 15];
+        } else {
+            result += before.substr(0, before.size() - bytes.size());
+        }
+    }
+    return result;
+}
+
+} // namespace Mz

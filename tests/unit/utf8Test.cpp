@@ -1,8 +1,8 @@
-#include "components/componentTools/utf8.h"
+#include "components/componentManager/utf8.h"
 
 #include <gtest/gtest.h>
 
-using namespace Mz::Tools;
+using namespace Mz;
 
 namespace {
 

@@ -1,0 +1,129 @@
+// A file is replaced through a new file beside it, which is renamed at the end: that is the one
+// step that all systems make whole. The new file is on the medium before the rename, or a crash
+// could leave the new name with the content missing.
+#include "components/componentManager/files.h"
+
+#include "components/componentManager/exceptions.h"
+#include "components/componentManager/nativeText.h"
+#include "components/componentManager/utf8.h"
+#include "components/platform/files.h"
+
+#include <fstream>
+#include <optional>
+#include <random>
+
+namespace Mz {
+
+namespace {
+
+constexpr const char* source = "components/componentManager/files";
+
+[[noreturn]] void failToOpen(int line, const std::filesystem::path& file,
+                             const std::string& reason) {
+    throw QrStreamEx::ExWriteOpen(source, line, utf8Name(file).c_str(), reason.c_str());
+}
+
+[[noreturn]] void failToWrite(int line, const std::filesystem::path& file) {
+    throw QrStreamEx::ExWriteError(source, line, utf8Name(file).c_str());
+}
+
+/// Where the symlinks lead that begin at `file`, whether there is anything or not; `file` itself if
+/// it is no symlink.
+std::filesystem::path targetOf(const std::filesystem::path& file) {
+    constexpr int mostLinks = 40; // As many as Linux follows.
+    std::filesystem::path target = file;
+    for (int count = 0; count < mostLinks; ++count) {
+        const auto text = platform::linkText(target);
+        if (!text)
+            return target;
+        target = target.parent_path() / *text; // An absolute text replaces the folder.
+    }
+    failToOpen(__LINE__, file, "its symlinks lead in a circle");
+}
+
+/// A new file beside the target of `file`, removed at the end unless it took the target's place.
+class NewFile {
+  public:
+    explicit NewFile(const std::filesystem::path& file) : file(file), target(targetOf(file)) {
+        std::error_code failure;
+        old = std::filesystem::status(target, failure);
+        if (std::filesystem::exists(old) && !std::filesystem::is_regular_file(old))
+            failToOpen(__LINE__, file, "it is no regular file");
+        // We write and read the file, whatever its permissions are to be in the end.
+        constexpr auto own =
+            std::filesystem::perms::owner_read | std::filesystem::perms::owner_write;
+        const auto permissions =
+            replaces() ? old.permissions() | own : std::filesystem::perms(0666);
+        std::random_device random;
+        do {
+            path = target;
+            path += ".saving-" + std::to_string(random());
+            failure = platform::createNew(path, permissions);
+        } while (failure == std::errc::file_exists);
+        if (failure)
+            failToOpen(__LINE__, file, toUtf8(platform::errorText(failure)));
+    }
+    ~NewFile() {
+        std::error_code ignored;
+        if (!path.empty())
+            std::filesystem::remove(path, ignored);
+    }
+    NewFile(const NewFile&) = delete;
+    NewFile& operator=(const NewFile&) = delete;
+
+    void fill(const std::function<void(std::ostream&)>& write) {
+        std::ofstream stream(path, std::ios::binary);
+        if (stream)
+            write(stream);
+        stream.exceptions(std::ios::goodbit);
+        stream.close();
+        if (!stream)
+            failToWrite(__LINE__, file);
+    }
+
+    void takePlace() {
+        const auto permissions = replaces() ? std::optional(old.permissions()) : std::nullopt;
+        if (platform::complete(path, permissions))
+            failToWrite(__LINE__, file);
+        if (const std::error_code failure = platform::moveOver(path, target))
+            failToOpen(__LINE__, file, toUtf8(platform::errorText(failure)));
+        path.clear();
+    }
+
+  private:
+    bool replaces() const { return std::filesystem::is_regular_file(old); }
+
+    const std::filesystem::path& file;
+    std::filesystem::path target;
+    std::filesystem::file_status old;
+    std::filesystem::path path;
+};
+
+} // namespace
+
+void replaceFile(const std::filesystem::path& file,
+                 const std::function<void(std::ostream&)>& write) {
+    NewFile replacement(file);
+    replacement.fill(write);
+    replacement.takePlace();
+}
+
+void replaceFile(const std::filesystem::path& file, std::string_view content) {
+    replaceFile(file, [&](std::ostream& stream) {
+        stream.write(content.data(), static_cast<std::streamsize>(content.size()));
+    });
+}
+
+std::filesystem::path programFolder() {
+    return platform::programFile().parent_path();
+}
+
+std::filesystem::path fullPath(const std::filesystem::path& path) {
+    std::filesystem::path full = platform::resolveDots(std::filesystem::absolute(path));
+    if (!full.has_filename() && full.has_relative_path())
+        full = full.parent_path();
+    full.make_preferred();
+    return full;
+}
+
+} // namespace Mz

@@ -1,0 +1,25 @@
+#include "components/componentTools/openPatiently.h"
+
+#include "components/platform/platform.h"
+
+#include <chrono>
+#include <optional>
+#include <thread>
+
+namespace Mz::Tools {
+
+bool openPatiently(std::ifstream& stream, const std::filesystem::path& file) {
+    constexpr int attempts = 50;
+    for (int count = 0; count < attempts; ++count) {
+        stream.clear();
+        const std::optional<platform::FileStatus> status = platform::queryFile(file.native());
+        if (!status || !status->regular)
+            return false;
+        if (platform::openForReading(stream, file.native()))
+            return true;
+        std::this_thread::sleep_for(std::chrono::milliseconds(10));
+    }
+    return false;
+}
+
+} // namespace Mz::Tools

@@ -1,0 +1,39 @@
+// One pass over the list notes who offers what; each library is then looked up by its builders.
+#include "components/componentTools/uidNotes.h"
+
+namespace Mz::Tools {
+
+UidNotes::UidNotes(const RecordedLibraries& allLibraries) : libraries(allLibraries) {
+    for (std::size_t position = 0; position < libraries.size(); ++position)
+        for (const RecordedBuilder& builder : libraries[position].builders) {
+            std::vector<std::size_t>& positions = offers[builder.uid];
+            if (positions.empty() || positions.back() != position)
+                positions.push_back(position);
+        }
+}
+
+std::vector<Finding> UidNotes::notesOn(const std::vector<RecordedBuilder>& builders,
+                                       std::size_t position) const {
+    std::vector<Finding> notes;
+    const auto note = [&](Verdict verdict, const RecordedBuilder& builder, std::size_t other) {
+        notes.push_back({verdict, textOf(builder.uid),
+                         libraries[other].directory + L"\\" + libraries[other].fileName});
+    };
+    for (const RecordedBuilder& builder : builders) {
+        if (builder.uid == QrUid{})
+            notes.push_back({Verdict::uidNil, textOf(builder.uid), builder.name});
+        const auto found = offers.find(builder.uid);
+        if (found == offers.end())
+            continue;
+        const std::vector<std::size_t>& positions = found->second;
+        if (position != behindAll && positions.back() > position)
+            note(Verdict::uidTaken, builder, positions.back());
+        else if (positions.back() != position)
+            note(Verdict::uidWins, builder, positions.back());
+        else if (positions.size() > 1)
+            note(Verdict::uidWins, builder, positions[positions.size() - 2]);
+    }
+    return notes;
+}
+
+} // namespace Mz::Tools

@@ -1,0 +1,9 @@
+#include "tests/unit/unwritableFolder.h"
+
+namespace Mz::Test {
+
+std::filesystem::path unwritableFolder() {
+    return "/proc/self";
+}
+
+} // namespace Mz::Test

@@ -1,0 +1,24 @@
+#include "tools/mzcomponents/inputFile.h"
+
+#include <fstream>
+#include <system_error>
+
+namespace Mz::Commands {
+
+std::wstring obstacleTo(const std::filesystem::path& file) {
+    std::error_code failure;
+    const std::filesystem::file_status status = std::filesystem::status(file, failure);
+    if (failure == std::errc::permission_denied)
+        return L"a folder above the file may not be entered";
+    if (failure || !std::filesystem::exists(status))
+        return L"there is no such file";
+    if (std::filesystem::is_directory(status))
+        return L"it is a folder, not a file";
+    if (!std::filesystem::is_regular_file(status))
+        return L"it is a pipe or a device, not a file";
+    if (!std::ifstream(file, std::ios::binary))
+        return L"the file cannot be read";
+    return {};
+}
+
+} // namespace Mz::Commands
