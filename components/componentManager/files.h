@@ -3,7 +3,7 @@
 /// All functions may be called from any thread.
 #pragma once
 
-#include "components/base/export.h"
+#include "components/componentManager/export.h"
 
 #include <filesystem>
 #include <functional>

@@ -13,7 +13,7 @@
 /// All functions may be called from any thread and throw nothing but `std::bad_alloc`.
 #pragma once
 
-#include "components/base/export.h"
+#include "components/componentManager/export.h"
 
 #include <filesystem>
 #include <optional>

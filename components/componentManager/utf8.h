@@ -1,7 +1,7 @@
 /// UTF-8, for text that must be the same in every locale.
 #pragma once
 
-#include "components/base/export.h"
+#include "components/componentManager/export.h"
 
 #include <string>
 #include <string_view>
