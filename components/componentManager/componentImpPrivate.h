@@ -196,6 +196,8 @@ struct MZ_COMPONENT_MANAGER_API ComponentLibrary {
     /// is made each time.
     QrGetComponentDescriptionFunction* entryPoint = nullptr;
 };
+    std::size_t claims =
+        0; ///< of a file that was found: how many recorded libraries have its names
 
 /// Stores the manager's records, so that the next start need not load what has not changed.
 class MZ_COMPONENT_MANAGER_API ComponentManagerPersistant final

@@ -136,6 +136,31 @@ TEST_F(PosixDiscovery, ReadsSuchFilesAfreshWhenNobodyCanSayWhoseTheRecordsAre) {
 
 TEST_F(PosixDiscovery, BeginsAnewAfterAThreadEndedInTheMiddle) {
     const auto first = add(L"goodWithKit", "a.so");
+TEST_F(PosixDiscovery, ReadsSuchAFileAfreshWhenItsNamesakeIsGone) {
+    const auto lower = add(L"goodByHand", "lib.so");
+    const auto upper = add(L"goodByHand", "LIB.so");
+    // Two builds of one moment and one size.
+    std::filesystem::last_write_time(upper, std::filesystem::last_write_time(lower));
+    recordBuilder(record(upper), kitUid, L"the upper one's");
+    recordBuilder(record(lower), countedUid, L"the lower one's");
+    std::filesystem::remove(lower);
+    initialize();
+    ASSERT_EQ(manager->libraries.size(), 1u);
+    EXPECT_EQ(names(), (Names{L"Name", L"name", L"third"}));
+    EXPECT_EQ(maker(goodUid), "good");
+}
+
+TEST_F(PosixDiscovery, ReadsSuchFilesAfreshWhenOneOfThreeIsGone) {
+    const auto one = add(L"goodWithKit", "LIB.so");
+    const auto two = add(L"goodWithKit", "Lib.so");
+    const auto three = add(L"goodByHand", "lib.so");
+    for (const auto& file : {one, two, three})
+        recordBuilder(record(file), countedUid, L"as recorded");
+    std::filesystem::remove(two);
+    initialize();
+    EXPECT_EQ(names(), (Names{L"kit", L"Name", L"name", L"third"}));
+}
+
     const auto second = add(L"goodByHand", "b.so");
     add(L"manyBuilders", "c.so");
     setHook([](const char* event) {

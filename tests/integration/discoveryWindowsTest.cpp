@@ -102,6 +102,17 @@ TEST_F(WindowsDiscovery, DoesNotCallDataNamedLikeTheEntryPoint) {
     EXPECT_FALSE(isMapped(file));
 }
 
+TEST_F(WindowsDiscovery, TakesTheLaterOfTwoRecordsOfOneFile) {
+    const auto file = add(L"goodByHand");
+    recordBuilder(record(file), goodUid, L"first");
+    recordBuilder(record(file), goodUid, L"second");
+    add(L"goodWithKit", "zz");
+    initialize();
+    EXPECT_EQ(manager->libraries.size(), 2u);
+    EXPECT_EQ(names(), (Names{L"second", L"kit"}));
+    EXPECT_EQ(maker(goodUid), "good");
+}
+
 TEST_F(WindowsDiscovery, RestoresTheErrorMode) {
     const UINT before = ::SetErrorMode(SEM_NOGPFAULTERRORBOX);
     folder.write("text.dll", "no library");

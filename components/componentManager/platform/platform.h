@@ -13,6 +13,7 @@
 #include <optional>
 #include <string>
 #include <string_view>
+#include <utility>
 #include <vector>
 
 namespace Mz::platform {
@@ -36,14 +37,17 @@ NativePath openingPath(const std::wstring& directory, const std::wstring& name,
 /// letters only on Linux.
 std::wstring lowerCase(std::wstring text);
 
+/// Returns whether names that differ in letter case only stand for one file.
+bool namesIgnoreCase();
+
 /// The first element of the process's command line, by which the program was started; nothing when
 /// the system does not tell, or the current locale has no form for it.
 std::optional<std::wstring> firstArgument();
 
 // ---- Files ----------------------------------------------------------------------------------
 
-/// Which file a name stands for, whatever the name. Some file systems tell the same of two files,
-/// so ask `isSameFile` before you believe it.
+/// Which file a name stands for, whatever the name. Some file systems give two files the same
+/// identity, so ask `isSameFile` before you believe it.
 struct FileIdentity {
     std::uint64_t device = 0;
     std::uint64_t index = 0;
@@ -71,10 +75,21 @@ struct DirectoryEntry {
     std::optional<FileIdentity> identity; ///< where the system allows two names for one file
 };
 
-/// The regular files of a directory that are not hidden (by attribute, or by a leading dot where
-/// that is the custom) and no system files, in a fixed order. A directory that cannot be listed
-/// has none; a name that cannot be converted is left out.
-std::vector<DirectoryEntry> listCandidates(const NativePath& directory);
+/// Returns, for each directory, its regular files that are not hidden (by attribute, or by a
+/// leading dot where that is the custom) and no system files. A directory that cannot be listed has
+/// none; a name that cannot be converted is left out.
+///
+/// The files of a directory are in the order in which NTFS lists them: on Windows the system's own;
+/// on Linux by UTF-16 code units, letters as upper case by a fixed table, ties by the bytes of the
+/// names.
+///
+/// The identities are comparable among all these directories: names of one file have the same.
+std::vector<std::vector<DirectoryEntry>> listCandidates(const std::vector<NativePath>& directories);
+
+/// Returns the candidates of one directory.
+inline std::vector<DirectoryEntry> listCandidates(const NativePath& directory) {
+    return std::move(listCandidates(std::vector<NativePath>{directory}).front());
+}
 
 /// Opens `path` for reading in binary, denying nothing to other openers. False when it cannot be
 /// opened or is a directory; the stream is then not good.

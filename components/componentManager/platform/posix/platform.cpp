@@ -3,16 +3,13 @@
 #include "components/componentManager/platform/characters.h"
 #include "components/componentManager/platform/posix/elfProbe.h"
 
-#include <algorithm>
 #include <cerrno>
 #include <cstring>
-#include <dirent.h>
 #include <dlfcn.h>
 #include <fcntl.h>
 #include <langinfo.h>
 #include <link.h>
 #include <locale.h>
-#include <memory>
 #include <pthread.h>
 #include <span>
 #include <sys/stat.h>
@@ -38,53 +35,6 @@ class Descriptor {
   private:
     int value;
 };
-
-struct CloseDirectory {
-    void operator()(DIR* directory) const { ::closedir(directory); }
-};
-
-using Directory = std::unique_ptr<DIR, CloseDirectory>;
-
-/// Whether an entry names the file by number; some file systems give a placeholder instead.
-bool hasFileNumber(const dirent& entry) {
-    constexpr ino_t placeholder = 0xFFFFFFFF;
-    return entry.d_ino != 0 && entry.d_ino != placeholder && entry.d_ino != static_cast<ino_t>(-1);
-}
-
-/// Whether the name in `directory`, which is on `device`, is a regular file, and which. Mostly the
-/// entry alone tells; asking for the status of every file takes as long as all the rest.
-std::optional<FileIdentity> regularFile(DIR* directory, dev_t device, const dirent& entry) {
-    if (entry.d_type == DT_DIR)
-        return std::nullopt;
-    if (entry.d_type == DT_REG && hasFileNumber(entry))
-        return FileIdentity{device, entry.d_ino};
-    struct stat status;
-    if (::fstatat(::dirfd(directory), entry.d_name, &status, 0) != 0 || !S_ISREG(status.st_mode))
-        return std::nullopt;
-    return FileIdentity{status.st_dev, status.st_ino};
-}
-
-/// Sorts by normalised name, so that the order is that of a system without letter case; names that
-/// differ in case only by their bytes.
-void sortByName(std::vector<DirectoryEntry>& entries) {
-    struct Keyed {
-        std::wstring key;
-        DirectoryEntry* entry;
-    };
-    std::vector<Keyed> keyed;
-    keyed.reserve(entries.size());
-    for (DirectoryEntry& entry : entries)
-        keyed.push_back({lowerCase(entry.name), &entry});
-    std::sort(keyed.begin(), keyed.end(), [](const Keyed& a, const Keyed& b) {
-        const int order = a.key.compare(b.key);
-        return order ? order < 0 : a.entry->path < b.entry->path;
-    });
-    std::vector<DirectoryEntry> sorted;
-    sorted.reserve(entries.size());
-    for (const Keyed& next : keyed)
-        sorted.push_back(std::move(*next.entry));
-    entries.swap(sorted);
-}
 
 /// The segments of a loaded library, as its file describes them.
 using Segments = std::span<const ElfW(Phdr)>;
@@ -177,6 +127,10 @@ std::wstring lowerCase(std::wstring text) {
     return text;
 }
 
+bool namesIgnoreCase() {
+    return false;
+}
+
 std::optional<std::wstring> firstArgument() {
     std::ifstream commandLine("/proc/self/cmdline", std::ios::binary);
     std::string argument;
@@ -198,27 +152,6 @@ bool isSameFile(const NativePath& a, const NativePath& b) {
     struct stat second;
     return ::stat(a.c_str(), &first) == 0 && ::stat(b.c_str(), &second) == 0 &&
            first.st_dev == second.st_dev && first.st_ino == second.st_ino;
-}
-
-std::vector<DirectoryEntry> listCandidates(const NativePath& directory) {
-    std::vector<DirectoryEntry> entries;
-    const Directory listing(::opendir(directory.c_str()));
-    struct stat own;
-    if (!listing || ::fstat(::dirfd(listing.get()), &own) != 0)
-        return entries;
-    const NativePath inDirectory = directory + "/";
-    while (const dirent* entry = ::readdir(listing.get())) {
-        if (entry->d_name[0] == '.')
-            continue;
-        const std::optional<FileIdentity> identity = regularFile(listing.get(), own.st_dev, *entry);
-        if (!identity)
-            continue;
-        std::optional<std::wstring> name = toCharacters(entry->d_name);
-        if (name)
-            entries.push_back({std::move(*name), inDirectory + entry->d_name, identity});
-    }
-    sortByName(entries);
-    return entries;
 }
 
 bool openForReading(std::ifstream& stream, const NativePath& path) {

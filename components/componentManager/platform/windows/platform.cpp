@@ -93,6 +93,20 @@ class Listing {
 
 /// Whether what stands there can be called.
 bool isCode(const void* address) {
+std::vector<DirectoryEntry> list(const NativePath& directory) {
+    std::vector<DirectoryEntry> entries;
+    Listing listing(directory + L"/*");
+    if (!listing.valid())
+        return entries;
+    constexpr unsigned int excluded = _A_HIDDEN | _A_SYSTEM | _A_SUBDIR;
+    do {
+        const _wfinddata64i32_t& entry = listing.current();
+        if (!(entry.attrib & excluded))
+            entries.push_back({entry.name, directory + L"\\" + entry.name, std::nullopt});
+    } while (listing.next());
+    return entries;
+}
+
     constexpr DWORD executable =
         PAGE_EXECUTE | PAGE_EXECUTE_READ | PAGE_EXECUTE_READWRITE | PAGE_EXECUTE_WRITECOPY;
     MEMORY_BASIC_INFORMATION memory{};
@@ -122,6 +136,10 @@ std::wstring lowerCase(std::wstring text) {
 
 std::optional<std::wstring> firstArgument() {
     // The C runtime's wide arguments are absent in a program with a narrow `main`. In the first
+bool namesIgnoreCase() {
+    return true;
+}
+
     // argument a quote only toggles, and no escape is known.
     std::wstring argument;
     bool quoted = false;
@@ -148,17 +166,12 @@ bool isSameFile(const NativePath& a, const NativePath& b) {
     return a == b;
 }
 
-std::vector<DirectoryEntry> listCandidates(const NativePath& directory) {
-    std::vector<DirectoryEntry> entries;
-    Listing listing(directory + L"/*");
-    if (!listing.valid())
-        return entries;
-    constexpr unsigned int excluded = _A_HIDDEN | _A_SYSTEM | _A_SUBDIR;
-    do {
-        const _wfinddata64i32_t& entry = listing.current();
-        if (!(entry.attrib & excluded))
-            entries.push_back({entry.name, directory + L"\\" + entry.name, std::nullopt});
-    } while (listing.next());
+std::vector<std::vector<DirectoryEntry>>
+listCandidates(const std::vector<NativePath>& directories) {
+    std::vector<std::vector<DirectoryEntry>> entries;
+    entries.reserve(directories.size());
+    for (const NativePath& directory : directories)
+        entries.push_back(list(directory));
     return entries;
 }
 
