@@ -1,9 +1,11 @@
 /// What files are on Linux alone: pipes, links, and names that differ in letter case only.
 #include "tests/integration/managerFixture.h"
+#include "tests/support/noMoreFiles.h"
 
 #include <clocale>
 #include <fcntl.h>
 #include <fstream>
+#include <optional>
 #include <pthread.h>
 #include <string_view>
 #include <sys/ioctl.h>
@@ -134,8 +136,6 @@ TEST_F(PosixDiscovery, ReadsSuchFilesAfreshWhenNobodyCanSayWhoseTheRecordsAre) {
     EXPECT_EQ(maker(kitUid), "kit");
 }
 
-TEST_F(PosixDiscovery, BeginsAnewAfterAThreadEndedInTheMiddle) {
-    const auto first = add(L"goodWithKit", "a.so");
 TEST_F(PosixDiscovery, ReadsSuchAFileAfreshWhenItsNamesakeIsGone) {
     const auto lower = add(L"goodByHand", "lib.so");
     const auto upper = add(L"goodByHand", "LIB.so");
@@ -161,6 +161,8 @@ TEST_F(PosixDiscovery, ReadsSuchFilesAfreshWhenOneOfThreeIsGone) {
     EXPECT_EQ(names(), (Names{L"kit", L"Name", L"name", L"third"}));
 }
 
+TEST_F(PosixDiscovery, BeginsAnewAfterAThreadEndedInTheMiddle) {
+    const auto first = add(L"goodWithKit", "a.so");
     const auto second = add(L"goodByHand", "b.so");
     add(L"manyBuilders", "c.so");
     setHook([](const char* event) {
@@ -299,6 +301,65 @@ TEST_F(PosixDiscovery, PassesOverATruncatedLibraryAtEveryPage) {
     folder.write("cutLast", whole.substr(0, whole.size() - 1));
     add(L"goodWithKit", "zz");
     initialize();
+    EXPECT_EQ(names(), (Names{L"kit"}));
+}
+
+/// Holds back files while libraries are recorded, from the first that describes itself on.
+std::optional<NoMoreFiles> shortage;
+
+TEST_F(PosixDiscovery, NotesNothingOfAFileThatItCannotOpenForWantOfDescriptors) {
+    add(L"goodByHand", "a.so");
+    const auto later = add(L"goodWithKit", "b.so");
+    const auto changed = add(L"countedDescription", "c.so");
+    ComponentLibrary& recorded = record(changed);
+    recordBuilder(recorded, countedUid, L"as recorded");
+    recorded.fileTime -= 1;
+    const std::uint32_t oldTime = recorded.fileTime;
+    setHook([](const char* event) {
+        if (std::string_view(event) == "enumerate")
+            shortage.emplace();
+    });
+    initialize();
+    setHook(nullptr);
+    ASSERT_TRUE(shortage);
+    shortage.reset();
+    EXPECT_EQ(names(), (Names{L"Name", L"name", L"third"}));
+    EXPECT_FALSE(find(later)->module);
+    EXPECT_EQ(find(later)->fileTime, 0u);
+    EXPECT_EQ(find(later)->fileSize, 0);
+    EXPECT_FALSE(find(changed)->module);
+    EXPECT_EQ(find(changed)->fileTime, oldTime);
+    EXPECT_FALSE(indexed(countedUid));
+    // The next start, with what this one would have stored, finds both.
+    const std::uint32_t time = find(later)->fileTime;
+    const int64 size = find(later)->fileSize;
+    restart();
+    ComponentLibrary& next = record(later, false);
+    next.fileTime = time;
+    next.fileSize = size;
+    record(changed, false).fileTime = oldTime;
+    initialize();
+    EXPECT_EQ(maker(kitUid), "kit");
+    EXPECT_EQ(maker(countedUid), "counted");
+}
+
+TEST_F(PosixDiscovery, KeepsNoNoteOfARecordedFileThatItCannotOpenForWantOfDescriptors) {
+    const auto file = add(L"goodWithKit", "a.so");
+    ComponentLibrary& library = record(file);
+    recordBuilder(library, kitUid, L"as recorded");
+    initialize();
+    const QrBuilderDescription* const held = indexed(kitUid);
+    ASSERT_TRUE(held);
+    {
+        const NoMoreFiles none;
+        EXPECT_FALSE(manager->getBuilder(kitUid));
+    }
+    EXPECT_THAT(names(), IsEmpty());
+    EXPECT_FALSE(library.module);
+    // Time and size without builders would keep the library from ever being read again.
+    EXPECT_EQ(library.fileTime, 0u);
+    EXPECT_EQ(library.fileSize, 0);
+    EXPECT_TRUE(held->getBuilder());
     EXPECT_EQ(names(), (Names{L"kit"}));
 }
 

@@ -3,11 +3,12 @@
 #include "components/componentManager/platform/platform.h"
 #include "components/componentManager/platform/upperCase.h"
 #include "tests/integration/managerFixture.h"
+#include "tests/support/noMoreFiles.h"
 
 #include <clocale>
-#include <locale.h>
 #include <dirent.h>
 #include <dlfcn.h>
+#include <locale.h>
 #include <sys/stat.h>
 
 using namespace Mz::platform;
@@ -16,7 +17,6 @@ using Mz::Test::TemporaryDirectory;
 
 namespace {
 
-class PosixPlatform : public ::testing::Test {
 /// What is added to the number of each file that is listed.
 ino_t listingOffset = 0;
 
@@ -34,6 +34,7 @@ extern "C" dirent* readdir(DIR* directory) {
 
 namespace {
 
+class PosixPlatform : public ::testing::Test {
   protected:
     ~PosixPlatform() override { std::setlocale(LC_ALL, "C"); }
     static void useUtf8() { ASSERT_TRUE(std::setlocale(LC_ALL, "C.UTF-8")); }
@@ -126,7 +127,6 @@ TEST_F(PosixPlatform, ListsNeitherPipesNorDeadLinks) {
     EXPECT_EQ(entries[0].identity, entries[1].identity);
 }
 
-TEST_F(PosixPlatform, TellsTheStatusOfWhatALinkLeadsTo) {
 TEST_F(PosixPlatform, ListsByUtf16CodeUnitsInUpperCaseWhateverTheLocale) {
     TemporaryDirectory folder;
     for (const char* name : {"mesh_obj", "meshImporter", "mesh\\x", "mesh]", "mesh[", "lib.so",
@@ -176,6 +176,7 @@ TEST_F(PosixPlatform, KnowsOneFileByItsNamesThoughListingsNumberFilesOtherwise) 
     EXPECT_EQ(listings[0][2].identity, listings[1][0].identity);
 }
 
+TEST_F(PosixPlatform, TellsTheStatusOfWhatALinkLeadsTo) {
     TemporaryDirectory folder;
     std::filesystem::create_symlink(folder.write("file", "1234567"), folder.path() / "link");
     EXPECT_EQ(queryFile(folder.path() / "link")->size, 7);
@@ -209,6 +210,27 @@ TEST_F(PosixPlatform, UsesWhatIsMappedThoughItsFileIsReplaced) {
     EXPECT_FALSE(used.loaded);
     unloadLibrary(module);
     EXPECT_FALSE(findLoadedLibrary(file));
+}
+
+TEST_F(PosixPlatform, DoesNotKnowAFileThatItCannotOpenForWantOfDescriptors) {
+    TemporaryDirectory folder;
+    const std::filesystem::path file = builtComponent(L"goodByHand");
+    const std::filesystem::path other = builtComponent(L"goodWithKit");
+    const Module mapped = loadLibrary(other);
+    {
+        const Mz::Test::NoMoreFiles none;
+        EXPECT_EQ(queryExport(file, "QrGetComponentDescription"), ExportState::unknown);
+        EXPECT_FALSE(exportsFunction(file, "QrGetComponentDescription"));
+        const UsedLibrary used = useLibrary(file, "QrGetComponentDescription");
+        EXPECT_FALSE(used.module);
+        EXPECT_TRUE(used.unknown);
+        EXPECT_EQ(useLibrary(other, "QrGetComponentDescription").module, mapped);
+    }
+    unloadLibrary(mapped);
+    EXPECT_EQ(queryExport(file, "QrGetComponentDescription"), ExportState::exported);
+    EXPECT_EQ(queryExport(folder.path() / "nothing", "QrGetComponentDescription"),
+              ExportState::absent);
+    EXPECT_FALSE(useLibrary(folder.path() / "nothing", "QrGetComponentDescription").unknown);
 }
 
 TEST_F(PosixPlatform, DoesNotWaitForAPipeItIsToLookInto) {

@@ -104,24 +104,40 @@ using Module = void*;
 /// it stays as long as whoever loaded it wants.
 Module findLoadedLibrary(const NativePath& path);
 
-/// Whether the file is a library for this system and processor that exports the function `symbol`
-/// itself. Runs nothing of the file, not even its initialisers; anything else than such a library,
-/// damaged ones included, gives false.
-bool exportsFunction(const NativePath& path, const char* symbol);
+/// What the file says of a function.
+enum class ExportState {
+    absent,   ///< the file does not export it, is no library, is damaged or cannot be opened
+    exported, ///< the file is a library that exports the function
+    unknown,  ///< the system had no resources left to open the file
+};
+
+/// Returns whether the file is a library for this system and processor that exports the function
+/// `symbol` itself. Runs nothing of the file, not even its initialisers. A bounded reader of the
+/// file's own tables decides first, so that a damaged file, a program or a library without the
+/// function is not even mapped.
+ExportState queryExport(const NativePath& path, const char* symbol);
+
+/// Returns whether `queryExport` finds the function.
+inline bool exportsFunction(const NativePath& path, const char* symbol) {
+    return queryExport(path, symbol) == ExportState::exported;
+}
 
 /// Loads the library, with its own surroundings where the system knows such (the manifest in it);
 /// null when it cannot be loaded.
 Module loadLibrary(const NativePath& path);
 
-/// A library in use, and who loaded it.
+/// The result of `useLibrary`.
 struct UsedLibrary {
-    Module module = nullptr;
-    bool loaded = false; ///< by this call, which the user has to give back
+    Module module = nullptr; ///< null if there is no such library
+    bool loaded = false;     ///< by this call; the caller must unload it
+    /// The system had no resources left to open the file: with a null module, there may be a
+    /// library all the same.
+    bool unknown = false;
 };
 
-/// The library that the process has mapped under this path already, with whatever symbols; else the
-/// one in the file, loaded, if it exports the function `symbol`. Nothing when there is neither.
-/// Runs nothing of a file that does not export the symbol.
+/// Returns the library that the process has mapped under this path already, whatever it exports.
+/// Otherwise loads the one in the file if it exports the function `symbol`. Runs nothing of a file
+/// that does not export the symbol.
 UsedLibrary useLibrary(const NativePath& path, const char* symbol);
 
 /// Gives back one load.

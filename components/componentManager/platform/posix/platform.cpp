@@ -36,6 +36,11 @@ class Descriptor {
     int value;
 };
 
+/// Whether an operation failed for want of resources, and not because of the file.
+bool isShortage(int error) {
+    return error == EMFILE || error == ENFILE || error == ENOMEM;
+}
+
 /// The segments of a loaded library, as its file describes them.
 using Segments = std::span<const ElfW(Phdr)>;
 
@@ -172,9 +177,11 @@ Module findLoadedLibrary(const NativePath& path) {
     return module;
 }
 
-bool exportsFunction(const NativePath& path, const char* symbol) {
+ExportState queryExport(const NativePath& path, const char* symbol) {
     const Descriptor file(::open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK));
-    return file && elfExportsFunction(file.get(), symbol);
+    if (!file)
+        return isShortage(errno) ? ExportState::unknown : ExportState::absent;
+    return elfExportsFunction(file.get(), symbol) ? ExportState::exported : ExportState::absent;
 }
 
 Module loadLibrary(const NativePath& path) {
@@ -186,14 +193,16 @@ Module loadLibrary(const NativePath& path) {
 
 UsedLibrary useLibrary(const NativePath& path, const char* symbol) {
     // Asking first whether the library is mapped would open every file a second time.
-    if (!exportsFunction(path, symbol))
-        return {isMappedAs(path) ? findLoadedLibrary(path) : nullptr, false};
+    const ExportState state = queryExport(path, symbol);
+    if (state != ExportState::exported)
+        return {isMappedAs(path) ? findLoadedLibrary(path) : nullptr, false,
+                state == ExportState::unknown};
     const unsigned long long before = mappingCount();
     const Module module = loadLibrary(path);
     if (!module || mappingCount() != before)
-        return {module, module != nullptr};
+        return {module, module != nullptr, false};
     unloadLibrary(module); // It stays as long as whoever loaded it wants.
-    return {module, false};
+    return {module, false, false};
 }
 
 void unloadLibrary(Module module) {

@@ -1,5 +1,7 @@
 #include "components/componentManager/platform/platform.h"
 
+#include "components/componentManager/platform/windows/exportReader.h"
+
 #include <clocale>
 #include <cstring>
 #include <cwchar>
@@ -91,8 +93,6 @@ class Listing {
     std::intptr_t handle;
 };
 
-/// Whether what stands there can be called.
-bool isCode(const void* address) {
 std::vector<DirectoryEntry> list(const NativePath& directory) {
     std::vector<DirectoryEntry> entries;
     Listing listing(directory + L"/*");
@@ -107,6 +107,8 @@ std::vector<DirectoryEntry> list(const NativePath& directory) {
     return entries;
 }
 
+/// Whether what stands there can be called.
+bool isCode(const void* address) {
     constexpr DWORD executable =
         PAGE_EXECUTE | PAGE_EXECUTE_READ | PAGE_EXECUTE_READWRITE | PAGE_EXECUTE_WRITECOPY;
     MEMORY_BASIC_INFORMATION memory{};
@@ -134,12 +136,12 @@ std::wstring lowerCase(std::wstring text) {
     return text;
 }
 
-std::optional<std::wstring> firstArgument() {
-    // The C runtime's wide arguments are absent in a program with a narrow `main`. In the first
 bool namesIgnoreCase() {
     return true;
 }
 
+std::optional<std::wstring> firstArgument() {
+    // The C runtime's wide arguments are absent in a program with a narrow `main`. In the first
     // argument a quote only toggles, and no escape is known.
     std::wstring argument;
     bool quoted = false;
@@ -187,13 +189,16 @@ Module findLoadedLibrary(const NativePath& path) {
     return ::GetModuleHandleW(loaderName(path).c_str());
 }
 
-bool exportsFunction(const NativePath& path, const char* symbol) {
+ExportState queryExport(const NativePath& path, const char* symbol) {
+    const ExportState state = readExport(fullName(path), symbol);
+    if (state != ExportState::exported)
+        return state;
     const std::wstring name = loaderName(path);
     const OwnActivationContext context(path);
     const HMODULE module = ::LoadLibraryExW(name.c_str(), nullptr, DONT_RESOLVE_DLL_REFERENCES);
     const bool found = findSymbol(module, symbol) != nullptr;
     unloadLibrary(module);
-    return found;
+    return found ? ExportState::exported : ExportState::absent;
 }
 
 Module loadLibrary(const NativePath& path) {
@@ -206,9 +211,10 @@ Module loadLibrary(const NativePath& path) {
 
 UsedLibrary useLibrary(const NativePath& path, const char* symbol) {
     if (const Module mapped = findLoadedLibrary(path))
-        return {mapped, false};
-    const Module module = exportsFunction(path, symbol) ? loadLibrary(path) : nullptr;
-    return {module, module != nullptr};
+        return {mapped, false, false};
+    const ExportState state = queryExport(path, symbol);
+    const Module module = state == ExportState::exported ? loadLibrary(path) : nullptr;
+    return {module, module != nullptr, state == ExportState::unknown};
 }
 
 void unloadLibrary(Module module) {
