@@ -140,7 +140,12 @@ class MZ_COMPONENT_MANAGER_API QrComponentManager : public QrCastable {
     /// Every regular file of a directory that is neither hidden nor a system file is looked at,
     /// whatever its extension; sub-directories are not. A file that is no component library, that
     /// cannot be loaded or that fails while it describes itself is passed over without a word. A
-    /// library without the entry point is never loaded, only read.
+    /// library without the entry point is never mapped, only read; so are programs and damaged
+    /// files. A file that cannot be opened for want of resources is passed over and not recorded,
+    /// so that the next start looks at it again.
+    ///
+    /// The files of a directory come in the order in which NTFS lists them, on every system. Of two
+    /// builders with one identifier the one that comes later is found.
     ///
     /// A search path is normalised before use: lower case, '\' between names, and runs of
     /// separators as one. "." and ".." are *not* resolved (`a/b/../c` becomes `a\b\c`), so give

@@ -46,12 +46,19 @@ class Discoverer {
         std::filesystem::directory_iterator entries(opened, failure);
         if (failure)
             return leaveOutFolder(folder, Verdict::unreadable);
-        for (const platform::DirectoryEntry& entry : platform::listCandidates(opened.native()))
-            add(directory, entry);
+        directories.push_back(directory);
+        openedNames.push_back(opened.native());
         leaveOutUnnamed(std::move(entries));
     }
 
-    Discovery take() { return std::move(result); }
+    Discovery take() {
+        // All at once, as the manager does: so one file is known by its names in several folders.
+        const auto listings = platform::listCandidates(openedNames);
+        for (std::size_t index = 0; index < listings.size(); ++index)
+            for (const platform::DirectoryEntry& entry : listings[index])
+                add(directories[index], entry);
+        return std::move(result);
+    }
 
   private:
     void add(const std::wstring& directory, const platform::DirectoryEntry& entry) {
@@ -92,6 +99,8 @@ class Discoverer {
     }
 
     Discovery result;
+    std::vector<std::wstring> directories; ///< to list, normalised
+    std::vector<platform::NativePath> openedNames;
     std::map<platform::FileIdentity, platform::NativePath> seen;
     std::map<std::pair<std::wstring, std::wstring>, std::filesystem::path> names;
 };

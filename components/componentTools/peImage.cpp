@@ -2,6 +2,7 @@
 #include "components/componentTools/libraryImage.h"
 
 #include <algorithm>
+#include <cstring>
 #include <string_view>
 
 namespace Mz::Tools {
@@ -48,13 +49,14 @@ struct ResourceEntry {
 constexpr std::uint16_t x86_64 = 0x8664;
 constexpr std::uint16_t wideOptionalHeader = 0x20B;
 constexpr std::uint16_t libraryFlag = 0x2000, programFlag = 0x0002;
-constexpr std::uint32_t codeSection = 0x20000020; // contains code, or may be run
-constexpr std::size_t exportDirectory = 0, importDirectory = 1, resourceDirectory = 2;
+constexpr std::uint32_t executableFlag = 0x20000000;
+constexpr std::size_t exportDirectory = 0, importDirectory = 1, resourceDirectory = 2,
+                      certificateDirectory = 4;
+constexpr std::uint32_t pageSize = 0x1000, sectorSize = 0x200;
 
 /// Limits that no real library comes near; they bound the work that a hostile one can cause.
 constexpr std::size_t maximumSections = 96;
 constexpr std::size_t maximumNeeded = 1024;
-constexpr std::uint32_t maximumNames = 1u << 20;
 constexpr std::size_t maximumResources = 4096;
 
 std::wstring processorName(std::uint16_t machine) {
@@ -108,7 +110,8 @@ class PeReader {
             image.otherProcessor = processorName(header.machine);
             return true;
         }
-        if (!magic || *magic != wideOptionalHeader)
+        const auto alignment = file.read<std::uint32_t>(optional + 32);
+        if (!magic || *magic != wideOptionalHeader || !alignment || *alignment < pageSize)
             return damaged(L"the header makes no sense");
         return true;
     }
@@ -117,14 +120,35 @@ class PeReader {
         if (header.sectionCount > maximumSections)
             return damaged(L"the table of sections makes no sense");
         const std::uint64_t table = optional + header.optionalSize;
+        const std::uint32_t imageSize = file.read<std::uint32_t>(optional + 56).value_or(0);
+        std::uint64_t end = 0; // of what is mapped so far
         for (std::size_t index = 0; index < header.sectionCount; ++index) {
             const auto section = file.read<Section>(table + index * sizeof(Section));
             if (!section)
                 return damaged(L"the table of sections is cut off");
             if (section->fileSize && !file.reaches(section->offset, section->fileSize))
                 return damaged(L"the end is missing");
+            if (section->address < end || section->address % pageSize ||
+                (section->fileSize && section->offset % sectorSize))
+                return damaged(L"the table of sections makes no sense");
+            end = std::uint64_t{section->address} + memorySize(*section);
             sections.push_back(*section);
         }
+        if (end > imageSize)
+            return damaged(L"the table of sections makes no sense");
+        return hasAppendix();
+    }
+
+    /// The symbols of the linker and the certificate stand behind the sections. The system loads
+    /// libraries without, but one that says it has them was cut off.
+    bool hasAppendix() {
+        const std::uint64_t strings = header.symbols + header.symbolCount * 18ull;
+        const bool hasSymbols = header.symbols && header.symbolCount;
+        const auto stringsSize = hasSymbols ? file.read<std::uint32_t>(strings) : 0;
+        const Directory certificate = directory(certificateDirectory); // by offset, not address
+        if (!stringsSize || (hasSymbols && !file.reaches(strings, *stringsSize)) ||
+            !file.reaches(certificate.address, certificate.size))
+            return damaged(L"the end is missing");
         return true;
     }
 
@@ -136,21 +160,29 @@ class PeReader {
         return file.read<Directory>(optional + offset).value_or(Directory{0, 0});
     }
 
+    static std::uint32_t memorySize(const Section& section) {
+        return section.memorySize ? section.memorySize : section.fileSize;
+    }
+
+    /// How much of the section is read from the file.
+    static std::uint32_t backedSize(const Section& section) {
+        return std::min(section.fileSize, memorySize(section));
+    }
+
     const Section* sectionOf(std::uint64_t address) const {
-        for (const Section& section : sections) {
-            const std::uint64_t size = std::max(section.memorySize, section.fileSize);
-            if (address >= section.address && address - section.address < size)
+        for (const Section& section : sections)
+            if (address >= section.address && address - section.address < memorySize(section))
                 return &section;
-        }
         return nullptr;
     }
 
-    std::optional<std::uint64_t> offsetOf(std::uint64_t address, std::size_t size) const {
+    std::optional<std::uint64_t> offsetOf(std::uint64_t address, std::uint64_t size) const {
         const Section* section = sectionOf(address);
         if (!section)
             return std::nullopt;
         const std::uint64_t inside = address - section->address;
-        if (inside > section->fileSize || size > section->fileSize - inside)
+        const std::uint64_t backed = backedSize(*section);
+        if (inside > backed || size > backed - inside)
             return std::nullopt;
         return section->offset + inside;
     }
@@ -186,35 +218,68 @@ class PeReader {
 
     void findEntryPoint() {
         const Directory directoryOfExports = directory(exportDirectory);
+        if (!directoryOfExports.address)
+            return;
         const auto exports = readAt<Exports>(directoryOfExports.address);
-        if (!directoryOfExports.address || !exports)
+        if (!exports) {
+            damaged(L"the table of exports makes no sense");
             return;
-        // Sorted by rule, but the few names of a library are quickly looked through as well.
-        const std::uint32_t count = std::min(exports->nameCount, maximumNames);
-        for (std::uint32_t index = 0; index < count; ++index) {
-            const auto name = readAt<std::uint32_t>(exports->names + index * 4ull);
-            if (!name)
+        }
+        if (directoryOfExports.size < sizeof(Exports) ||
+            !offsetOf(directoryOfExports.address, directoryOfExports.size) ||
+            !offsetOf(exports->functions, exports->functionCount * 4ull) ||
+            !offsetOf(exports->names, exports->nameCount * 4ull) ||
+            !offsetOf(exports->ordinals, exports->nameCount * 2ull)) {
+            if (exports->nameCount)
+                damaged(L"the table of exports makes no sense");
+            return;
+        }
+        // As the system searches: in names that are sorted. It finds nothing where they are not.
+        std::uint32_t first = 0;
+        for (std::uint32_t count = exports->nameCount; count > 0;) {
+            const std::uint32_t middle = first + (count - 1) / 2;
+            const auto name = readAt<std::uint32_t>(exports->names + middle * 4ull);
+            const auto order = name ? compareWithEntryPoint(*name) : std::nullopt;
+            if (!order) {
+                damaged(L"the table of exports makes no sense");
                 return;
-            if (!isEntryPointName(*name))
-                continue;
-            const auto ordinal = readAt<std::uint16_t>(exports->ordinals + index * 2ull);
-            const auto function = ordinal
-                                      ? readAt<std::uint32_t>(exports->functions + *ordinal * 4ull)
-                                      : std::nullopt;
-            if (function)
-                judge(*function, directoryOfExports);
-            return;
+            }
+            if (*order == 0)
+                return judgeOrdinal(*exports, middle, directoryOfExports);
+            const std::uint32_t before = middle - first;
+            first = *order < 0 ? middle + 1 : first;
+            count = *order < 0 ? count - before - 1 : before;
         }
     }
 
-    bool isEntryPointName(std::uint64_t address) {
-        constexpr std::string_view wanted(entryPointName);
-        char text[64];
-        static_assert(wanted.size() < sizeof text);
-        const auto offset = offsetOf(address, wanted.size() + 1);
-        return offset && file.read(*offset, text, wanted.size() + 1) &&
-               std::string_view(text, wanted.size() + 1) ==
-                   std::string_view(entryPointName, wanted.size() + 1);
+    void judgeOrdinal(const Exports& exports, std::uint32_t index, const Directory& directory) {
+        const auto ordinal = readAt<std::uint16_t>(exports.ordinals + index * 2ull);
+        const auto function = ordinal && *ordinal < exports.functionCount
+                                  ? readAt<std::uint32_t>(exports.functions + *ordinal * 4ull)
+                                  : std::nullopt;
+        if (function)
+            judge(*function, directory);
+        else
+            damaged(L"the table of exports makes no sense");
+    }
+
+    /// Compares the name at `address` with the entry point's as `strcmp` does; nothing if it is cut
+    /// off before that is decided.
+    std::optional<int> compareWithEntryPoint(std::uint64_t address) {
+        constexpr std::size_t length = std::string_view(entryPointName).size() + 1;
+        char text[length] = {};
+        const Section* section = sectionOf(address);
+        const auto offset = offsetOf(address, 1);
+        if (!section || !offset)
+            return std::nullopt;
+        const std::uint64_t left = backedSize(*section) - (address - section->address);
+        const auto present = static_cast<std::size_t>(std::min<std::uint64_t>(length, left));
+        if (!file.read(*offset, text, present))
+            return std::nullopt;
+        if (!std::memchr(text, 0, present) && present < length &&
+            std::memcmp(text, entryPointName, present) == 0)
+            return std::nullopt;
+        return std::strncmp(text, entryPointName, length);
     }
 
     /// An address among the exports themselves is the name of another library's function.
@@ -222,7 +287,7 @@ class PeReader {
         const bool forwarded =
             function >= exports.address && function - exports.address < exports.size;
         const Section* section = sectionOf(function);
-        const bool code = section && (section->flags & codeSection);
+        const bool code = section && (section->flags & executableFlag);
         image.entryPoint = code && !forwarded ? LibraryImage::EntryPoint::function
                                               : LibraryImage::EntryPoint::noFunction;
     }

@@ -12,6 +12,7 @@
 #include <optional>
 #include <string>
 #include <string_view>
+#include <utility>
 #include <vector>
 
 namespace Mz::platform {
@@ -35,14 +36,17 @@ NativePath openingPath(const std::wstring& directory, const std::wstring& name,
 /// letters only on Linux.
 std::wstring lowerCase(std::wstring text);
 
+/// Returns whether names that differ in letter case only stand for one file.
+bool namesIgnoreCase();
+
 /// The first element of the process's command line, by which the program was started; nothing when
 /// the system does not tell, or the current locale has no form for it.
 std::optional<std::wstring> firstArgument();
 
 // ---- Files ----------------------------------------------------------------------------------
 
-/// Which file a name stands for, whatever the name. Some file systems tell the same of two files,
-/// so ask `isSameFile` before you believe it.
+/// Which file a name stands for, whatever the name. Some file systems give two files the same
+/// identity, so ask `isSameFile` before you believe it.
 struct FileIdentity {
     std::uint64_t device = 0;
     std::uint64_t index = 0;
@@ -70,10 +74,21 @@ struct DirectoryEntry {
     std::optional<FileIdentity> identity; ///< where the system allows two names for one file
 };
 
-/// The regular files of a directory that are not hidden (by attribute, or by a leading dot where
-/// that is the custom) and no system files, in a fixed order. A directory that cannot be listed
-/// has none; a name that cannot be converted is left out.
-std::vector<DirectoryEntry> listCandidates(const NativePath& directory);
+/// Returns, for each directory, its regular files that are not hidden (by attribute, or by a
+/// leading dot where that is the custom) and no system files. A directory that cannot be listed has
+/// none; a name that cannot be converted is left out.
+///
+/// The files of a directory are in the order in which NTFS lists them: on Windows the system's own;
+/// on Linux by UTF-16 code units, letters as upper case by a fixed table, ties by the bytes of the
+/// names.
+///
+/// The identities are comparable among all these directories: names of one file have the same.
+std::vector<std::vector<DirectoryEntry>> listCandidates(const std::vector<NativePath>& directories);
+
+/// Returns the candidates of one directory.
+inline std::vector<DirectoryEntry> listCandidates(const NativePath& directory) {
+    return std::move(listCandidates(std::vector<NativePath>{directory}).front());
+}
 
 /// Opens `path` for reading in binary, denying nothing to other openers. False when it cannot be
 /// opened or is a directory; the stream is then not good.
@@ -88,24 +103,40 @@ using Module = void*;
 /// it stays as long as whoever loaded it wants.
 Module findLoadedLibrary(const NativePath& path);
 
-/// Whether the file is a library for this system and processor that exports the function `symbol`
-/// itself. Runs nothing of the file, not even its initialisers; anything else than such a library,
-/// damaged ones included, gives false.
-bool exportsFunction(const NativePath& path, const char* symbol);
+/// What the file says of a function.
+enum class ExportState {
+    absent,   ///< the file does not export it, is no library, is damaged or cannot be opened
+    exported, ///< the file is a library that exports the function
+    unknown,  ///< the system had no resources left to open the file
+};
+
+/// Returns whether the file is a library for this system and processor that exports the function
+/// `symbol` itself. Runs nothing of the file, not even its initialisers. A bounded reader of the
+/// file's own tables decides first, so that a damaged file, a program or a library without the
+/// function is not even mapped.
+ExportState queryExport(const NativePath& path, const char* symbol);
+
+/// Returns whether `queryExport` finds the function.
+inline bool exportsFunction(const NativePath& path, const char* symbol) {
+    return queryExport(path, symbol) == ExportState::exported;
+}
 
 /// Loads the library, with its own surroundings where the system knows such (the manifest in it);
 /// null when it cannot be loaded.
 Module loadLibrary(const NativePath& path);
 
-/// A library in use, and who loaded it.
+/// The result of `useLibrary`.
 struct UsedLibrary {
-    Module module = nullptr;
-    bool loaded = false; ///< by this call, which the user has to give back
+    Module module = nullptr; ///< null if there is no such library
+    bool loaded = false;     ///< by this call; the caller must unload it
+    /// The system had no resources left to open the file: with a null module, there may be a
+    /// library all the same.
+    bool unknown = false;
 };
 
-/// The library that the process has mapped under this path already, with whatever symbols; else the
-/// one in the file, loaded, if it exports the function `symbol`. Nothing when there is neither.
-/// Runs nothing of a file that does not export the symbol.
+/// Returns the library that the process has mapped under this path already, whatever it exports.
+/// Otherwise loads the one in the file if it exports the function `symbol`. Runs nothing of a file
+/// that does not export the symbol.
 UsedLibrary useLibrary(const NativePath& path, const char* symbol);
 
 /// Gives back one load.

@@ -1,11 +1,13 @@
 /// What files are on Linux alone: pipes, links, and names that differ in letter case only.
 #include "components/componentKit/hostKit.h"
 #include "tests/integration/managerFixture.h"
+#include "tests/support/noMoreFiles.h"
 
 #include <clocale>
 #include <fcntl.h>
 #include <fstream>
 #include <locale.h>
+#include <optional>
 #include <pthread.h>
 #include <string_view>
 #include <sys/ioctl.h>
@@ -134,6 +136,31 @@ TEST_F(PosixDiscovery, ReadsSuchFilesAfreshWhenNobodyCanSayWhoseTheRecordsAre) {
     EXPECT_EQ(names(), (Names{L"kit", L"Name", L"name", L"third"}));
     EXPECT_EQ(maker(goodUid), "good");
     EXPECT_EQ(maker(kitUid), "kit");
+}
+
+TEST_F(PosixDiscovery, ReadsSuchAFileAfreshWhenItsNamesakeIsGone) {
+    const auto lower = add(L"goodByHand", "lib.so");
+    const auto upper = add(L"goodByHand", "LIB.so");
+    // Two builds of one moment and one size.
+    std::filesystem::last_write_time(upper, std::filesystem::last_write_time(lower));
+    recordBuilder(record(upper), kitUid, L"the upper one's");
+    recordBuilder(record(lower), countedUid, L"the lower one's");
+    std::filesystem::remove(lower);
+    initialize();
+    ASSERT_EQ(manager->libraries.size(), 1u);
+    EXPECT_EQ(names(), (Names{L"Name", L"name", L"third"}));
+    EXPECT_EQ(maker(goodUid), "good");
+}
+
+TEST_F(PosixDiscovery, ReadsSuchFilesAfreshWhenOneOfThreeIsGone) {
+    const auto one = add(L"goodWithKit", "LIB.so");
+    const auto two = add(L"goodWithKit", "Lib.so");
+    const auto three = add(L"goodByHand", "lib.so");
+    for (const auto& file : {one, two, three})
+        recordBuilder(record(file), countedUid, L"as recorded");
+    std::filesystem::remove(two);
+    initialize();
+    EXPECT_EQ(names(), (Names{L"kit", L"Name", L"name", L"third"}));
 }
 
 TEST_F(PosixDiscovery, BeginsAnewAfterAThreadEndedInTheMiddle) {
@@ -276,6 +303,65 @@ TEST_F(PosixDiscovery, PassesOverATruncatedLibraryAtEveryPage) {
     folder.write("cutLast", whole.substr(0, whole.size() - 1));
     add(L"goodWithKit", "zz");
     initialize();
+    EXPECT_EQ(names(), (Names{L"kit"}));
+}
+
+/// Holds back files while libraries are recorded, from the first that describes itself on.
+std::optional<NoMoreFiles> shortage;
+
+TEST_F(PosixDiscovery, NotesNothingOfAFileThatItCannotOpenForWantOfDescriptors) {
+    add(L"goodByHand", "a.so");
+    const auto later = add(L"goodWithKit", "b.so");
+    const auto changed = add(L"countedDescription", "c.so");
+    ComponentLibrary& recorded = record(changed);
+    recordBuilder(recorded, countedUid, L"as recorded");
+    recorded.fileTime -= 1;
+    const std::uint32_t oldTime = recorded.fileTime;
+    setHook([](const char* event) {
+        if (std::string_view(event) == "enumerate")
+            shortage.emplace();
+    });
+    initialize();
+    setHook(nullptr);
+    ASSERT_TRUE(shortage);
+    shortage.reset();
+    EXPECT_EQ(names(), (Names{L"Name", L"name", L"third"}));
+    EXPECT_FALSE(find(later)->module);
+    EXPECT_EQ(find(later)->fileTime, 0u);
+    EXPECT_EQ(find(later)->fileSize, 0);
+    EXPECT_FALSE(find(changed)->module);
+    EXPECT_EQ(find(changed)->fileTime, oldTime);
+    EXPECT_FALSE(indexed(countedUid));
+    // The next start, with what this one would have stored, finds both.
+    const std::uint32_t time = find(later)->fileTime;
+    const int64 size = find(later)->fileSize;
+    restart();
+    ComponentLibrary& next = record(later, false);
+    next.fileTime = time;
+    next.fileSize = size;
+    record(changed, false).fileTime = oldTime;
+    initialize();
+    EXPECT_EQ(maker(kitUid), "kit");
+    EXPECT_EQ(maker(countedUid), "counted");
+}
+
+TEST_F(PosixDiscovery, KeepsNoNoteOfARecordedFileThatItCannotOpenForWantOfDescriptors) {
+    const auto file = add(L"goodWithKit", "a.so");
+    ComponentLibrary& library = record(file);
+    recordBuilder(library, kitUid, L"as recorded");
+    initialize();
+    const QrBuilderDescription* const held = indexed(kitUid);
+    ASSERT_TRUE(held);
+    {
+        const NoMoreFiles none;
+        EXPECT_FALSE(manager->getBuilder(kitUid));
+    }
+    EXPECT_THAT(names(), IsEmpty());
+    EXPECT_FALSE(library.module);
+    // Time and size without builders would keep the library from ever being read again.
+    EXPECT_EQ(library.fileTime, 0u);
+    EXPECT_EQ(library.fileSize, 0);
+    EXPECT_TRUE(held->getBuilder());
     EXPECT_EQ(names(), (Names{L"kit"}));
 }
 

@@ -189,6 +189,23 @@ TEST_F(Discovery, PassesOverAProgramThatExportsTheEntryPoint) {
     EXPECT_FALSE(isMapped(folder.path() / "program"));
 }
 
+TEST_F(Discovery, PassesOverTwoProgramsThatExportTheEntryPointAndNeedLibraries) {
+    // The first gets the address that both were linked for, and the second another one.
+    const auto program =
+        buildFolder / "components" / "kitProgram" / L"kitProgram" MZ_PROGRAM_EXTENSION;
+    const auto first = folder.path() / L"first" MZ_PROGRAM_EXTENSION;
+    const auto second = folder.path() / L"second" MZ_PROGRAM_EXTENSION;
+    std::filesystem::copy_file(program, first);
+    std::filesystem::copy_file(program, second);
+    add(L"goodWithKit", "zz");
+    initialize();
+    EXPECT_EQ(names(), (Names{L"kit"}));
+    for (const auto& file : {first, second}) {
+        EXPECT_FALSE(isMapped(file));
+        expectNothing(file);
+    }
+}
+
 TEST_F(Discovery, NotesAFailedFileSoThatALaterStartDoesNotTryIt) {
     const auto file = folder.write("text", "text");
     initialize();

@@ -1,6 +1,9 @@
 /// What files and libraries are on Windows alone: attributes, manifests, forwarded exports.
 #include "tests/integration/managerFixture.h"
+#include "tests/support/peFile.h"
 
+#include <fstream>
+#include <iterator>
 #include <windows.h>
 
 using namespace Mz;
@@ -9,7 +12,13 @@ using ::testing::IsEmpty;
 
 namespace {
 
-class WindowsDiscovery : public ManagerTest {};
+class WindowsDiscovery : public ManagerTest {
+  protected:
+    static std::string contentOf(const std::filesystem::path& file) {
+        std::ifstream stream(file, std::ios::binary);
+        return std::string(std::istreambuf_iterator<char>(stream), {});
+    }
+};
 
 TEST_F(WindowsDiscovery, LeavesOutHiddenAndSystemFiles) {
     const auto hidden = add(L"goodByHand", "hidden.dll");
@@ -100,6 +109,60 @@ TEST_F(WindowsDiscovery, DoesNotCallDataNamedLikeTheEntryPoint) {
     initialize();
     EXPECT_THAT(names(), IsEmpty());
     EXPECT_FALSE(isMapped(file));
+}
+
+TEST_F(WindowsDiscovery, PassesOverLibrariesWithADamagedExportDirectory) {
+    const std::string whole = contentOf(builtComponent(L"goodByHand"));
+    const std::size_t exports = exportsOf(whole);
+    ASSERT_GT(exports, 0u);
+    const auto damage = [&](const char* name, std::size_t field, std::uint32_t value) {
+        folder.write(name, changedAt(whole, exports + field, value));
+    };
+    damage("names.dll", PeField::names, 0xFF0000);
+    damage("functions.dll", PeField::functions, 0xFF0000);
+    damage("ordinals.dll", PeField::ordinals, 0xFF0000);
+    damage("count.dll", PeField::nameCount, 0x1000000);
+    damage("functionCount.dll", PeField::functionCount, 0x1000000);
+    folder.write("directory.dll",
+                 changedAt(whole, headerOf(whole) + PeField::exportAddress, 0xFF0000u));
+    add(L"goodWithKit", "zz.dll");
+    initialize();
+    EXPECT_EQ(names(), (Names{L"kit"}));
+    EXPECT_EQ(manager->libraries.size(), 7u);
+    for (const ComponentLibrary& library : manager->libraries)
+        EXPECT_EQ(library.fileTime, platform::queryFile(library.openingPath())->time)
+            << library.fileName;
+}
+
+TEST_F(WindowsDiscovery, PassesOverALibraryOf32Bits) {
+    std::string content = madeLibrary({{"QrGetComponentDescription", peCode}});
+    putAt(content, headerOf(content) + PeField::machine, std::uint16_t{0x14C});
+    putAt(content, headerOf(content) + PeField::magic, std::uint16_t{0x10B});
+    const auto file = folder.write("narrow.dll", content);
+    initialize();
+    EXPECT_FALSE(find(file)->module);
+    EXPECT_EQ(find(file)->fileTime, platform::queryFile(file)->time);
+}
+
+TEST_F(WindowsDiscovery, UsesTheProgramOfTheHostWhereItLiesInTheSearchPath) {
+    // A module that is mapped is used as it is, and not read: this one exports no entry point.
+    std::wstring name(MAX_PATH, L'\0');
+    name.resize(::GetModuleFileNameW(nullptr, name.data(), MAX_PATH));
+    const std::filesystem::path program(name);
+    const platform::UsedLibrary used = platform::useLibrary(program.native(), "noSuchFunction");
+    EXPECT_EQ(used.module, ::GetModuleHandleW(nullptr));
+    EXPECT_FALSE(used.loaded);
+}
+
+TEST_F(WindowsDiscovery, TakesTheLaterOfTwoRecordsOfOneFile) {
+    const auto file = add(L"goodByHand");
+    recordBuilder(record(file), goodUid, L"first");
+    recordBuilder(record(file), goodUid, L"second");
+    add(L"goodWithKit", "zz");
+    initialize();
+    EXPECT_EQ(manager->libraries.size(), 2u);
+    EXPECT_EQ(names(), (Names{L"second", L"kit"}));
+    EXPECT_EQ(maker(goodUid), "good");
 }
 
 TEST_F(WindowsDiscovery, RestoresTheErrorMode) {

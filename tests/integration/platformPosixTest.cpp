@@ -1,15 +1,36 @@
 /// The platform layer on Linux, where it has something of its own.
 #include "components/platform/characters.h"
 #include "components/platform/platform.h"
+#include "components/platform/upperCase.h"
 #include "tests/integration/managerFixture.h"
+#include "tests/support/noMoreFiles.h"
 
 #include <clocale>
+#include <dirent.h>
+#include <dlfcn.h>
 #include <locale.h>
 #include <sys/stat.h>
 
 using namespace Mz::platform;
 using Mz::Test::builtComponent;
 using Mz::Test::TemporaryDirectory;
+
+namespace {
+
+/// What is added to the number of each file that is listed.
+ino_t listingOffset = 0;
+
+} // namespace
+
+/// The C library's function, for this program alone.
+extern "C" dirent* readdir(DIR* directory) {
+    using Function = dirent*(DIR*);
+    static const auto next = reinterpret_cast<Function*>(::dlsym(RTLD_NEXT, "readdir"));
+    dirent* const entry = next(directory);
+    if (entry)
+        entry->d_ino += listingOffset;
+    return entry;
+}
 
 namespace {
 
@@ -106,6 +127,55 @@ TEST_F(PosixPlatform, ListsNeitherPipesNorDeadLinks) {
     EXPECT_EQ(entries[0].identity, entries[1].identity);
 }
 
+TEST_F(PosixPlatform, ListsByUtf16CodeUnitsInUpperCaseWhateverTheLocale) {
+    TemporaryDirectory folder;
+    for (const char* name : {"mesh_obj", "meshImporter", "mesh\\x", "mesh]", "mesh[", "lib.so",
+                             "LIB.so", "Lib.so", "\xC3\xA4", "\xC3\x84"})
+        folder.write(name, "x");
+    const auto names = [&] {
+        std::string result;
+        for (const DirectoryEntry& entry : listCandidates(folder.path()))
+            result += std::filesystem::path(entry.path).filename().native() + " ";
+        return result;
+    };
+    const std::string expected = "LIB.so Lib.so lib.so meshImporter mesh[ mesh\\x mesh] mesh_obj "
+                                 "\xC3\x84 \xC3\xA4 ";
+    EXPECT_EQ(names(), expected);
+    useUtf8();
+    EXPECT_EQ(names(), expected);
+}
+
+TEST_F(PosixPlatform, TakesLettersAsUpperCaseOneByOneOnly) {
+    EXPECT_EQ(upperCase(u'\u00FF'), u'\u0178');
+    EXPECT_EQ(upperCase(u'\u01C6'), u'\u01C4');
+    EXPECT_EQ(upperCase(u'\u1F80'), u'\u1F88');
+    EXPECT_EQ(upperCase(u'\uFF5A'), u'\uFF3A');
+    // Those that come from no lower case, or would become two letters, or an ASCII one.
+    for (const char16_t unit : {u'\u00DF', u'\u0131', u'\u017F', u'\u00B5', u'\u03C2', u'\u01C5',
+                                u'\u0100', u'[', u'{', u'`', u'@', u'\0', u'\uFFFF'})
+        EXPECT_EQ(upperCase(unit), unit) << static_cast<unsigned int>(unit);
+    EXPECT_EQ(sortKey(L"a\U0001F600\U0010FFFF\uFF41"), u"A\U0001F600\U0010FFFF\uFF21");
+}
+
+TEST_F(PosixPlatform, KnowsOneFileByItsNamesThoughListingsNumberFilesOtherwise) {
+    // As an overlay file system does, and a file that is mounted over another one.
+    const TemporaryDirectory folder;
+    const TemporaryDirectory other;
+    folder.write("file", "x");
+    folder.write("unlike", "x");
+    std::filesystem::create_symlink("file", folder.path() / "link");
+    std::filesystem::create_symlink(folder.path() / "unlike", other.path() / "link");
+    listingOffset = 1000000;
+    const auto listings =
+        listCandidates(std::vector<NativePath>{folder.path().native(), other.path().native()});
+    listingOffset = 0;
+    ASSERT_EQ(listings[0].size(), 3u);
+    ASSERT_EQ(listings[1].size(), 1u);
+    EXPECT_EQ(listings[0][0].identity, listings[0][1].identity);
+    EXPECT_NE(listings[0][0].identity, listings[0][2].identity);
+    EXPECT_EQ(listings[0][2].identity, listings[1][0].identity);
+}
+
 TEST_F(PosixPlatform, TellsTheStatusOfWhatALinkLeadsTo) {
     TemporaryDirectory folder;
     std::filesystem::create_symlink(folder.write("file", "1234567"), folder.path() / "link");
@@ -140,6 +210,27 @@ TEST_F(PosixPlatform, UsesWhatIsMappedThoughItsFileIsReplaced) {
     EXPECT_FALSE(used.loaded);
     unloadLibrary(module);
     EXPECT_FALSE(findLoadedLibrary(file));
+}
+
+TEST_F(PosixPlatform, DoesNotKnowAFileThatItCannotOpenForWantOfDescriptors) {
+    TemporaryDirectory folder;
+    const std::filesystem::path file = builtComponent(L"goodByHand");
+    const std::filesystem::path other = builtComponent(L"goodWithKit");
+    const Module mapped = loadLibrary(other);
+    {
+        const Mz::Test::NoMoreFiles none;
+        EXPECT_EQ(queryExport(file, "QrGetComponentDescription"), ExportState::unknown);
+        EXPECT_FALSE(exportsFunction(file, "QrGetComponentDescription"));
+        const UsedLibrary used = useLibrary(file, "QrGetComponentDescription");
+        EXPECT_FALSE(used.module);
+        EXPECT_TRUE(used.unknown);
+        EXPECT_EQ(useLibrary(other, "QrGetComponentDescription").module, mapped);
+    }
+    unloadLibrary(mapped);
+    EXPECT_EQ(queryExport(file, "QrGetComponentDescription"), ExportState::exported);
+    EXPECT_EQ(queryExport(folder.path() / "nothing", "QrGetComponentDescription"),
+              ExportState::absent);
+    EXPECT_FALSE(useLibrary(folder.path() / "nothing", "QrGetComponentDescription").unknown);
 }
 
 TEST_F(PosixPlatform, DoesNotWaitForAPipeItIsToLookInto) {

@@ -136,10 +136,44 @@ TEST_F(Platform, ListsInAFixedOrderWithPathsThatOpen) {
     EXPECT_EQ(first[3].name, L"D");
 }
 
+TEST_F(Platform, ListsInOneOrderOnEverySystem) {
+    // By UTF-16 code units in upper case: letters come before the signs between Z and a, and a
+    // character beyond U+FFFF before the last ones below it. Windows needs no locale for this.
+    static_cast<void>(std::setlocale(LC_ALL, "C.UTF-8"));
+    const std::vector<std::wstring> ordered{
+        L"-",       L"0",        L"A1",           L"a2",          L"mesh",   L"mesh.x",
+        L"meshA",   L"meshb",    L"meshImporter", L"meshz\u00E4", L"mesh[",  L"mesh]",
+        L"mesh^",   L"mesh_obj", L"mesh`",        L"z",           L"{",      L"\u00C4a",
+        L"\u00E4b", L"\u00D6",   L"\u0131",       L"\u0178",      L"\u017F", L"\u0391a",
+        L"\u03B1b", L"\u0410",   L"\u0431",       L"\u0411b",     L"\u4E2D", L"\U0001F600",
+        L"\uFF21a", L"\uFF41b"};
+    for (std::size_t index = ordered.size(); index-- > 0;)
+        folder.write(*toNative(ordered[index]), "x");
+    std::vector<std::wstring> listed;
+    for (const DirectoryEntry& entry : listCandidates(folder.path()))
+        listed.push_back(entry.name);
+    EXPECT_EQ(listed, ordered);
+    std::setlocale(LC_ALL, "C");
+}
+
 TEST_F(Platform, ListsManyFiles) {
     for (int index = 0; index < 500; ++index)
         folder.write(std::to_string(1000 + index), "");
     EXPECT_EQ(listCandidates(folder.path()).size(), 500u);
+}
+
+TEST_F(Platform, ListsSeveralFoldersAtATime) {
+    const TemporaryDirectory other;
+    folder.write("one", "x");
+    other.write("two", "x");
+    const auto listings = listCandidates(std::vector<NativePath>{
+        folder.path().native(), (folder.path() / "nothing").native(), other.path().native()});
+    ASSERT_EQ(listings.size(), 3u);
+    ASSERT_EQ(listings[0].size(), 1u);
+    EXPECT_EQ(listings[0][0].name, L"one");
+    EXPECT_THAT(listings[1], IsEmpty());
+    ASSERT_EQ(listings[2].size(), 1u);
+    EXPECT_EQ(listings[2][0].name, L"two");
 }
 
 TEST_F(Platform, ListsNothingOfWhatIsNoFolder) {

@@ -1,16 +1,23 @@
 /// The platform layer on Windows, where it has something of its own.
 #include "components/platform/platform.h"
+#include "components/platform/upperCase.h"
+#include "components/platform/windows/exportReader.h"
 #include "tests/integration/managerFixture.h"
+#include "tests/support/peFile.h"
 
 #include <fstream>
 #include <iterator>
 #include <windows.h>
 
 using namespace Mz::platform;
-using Mz::Test::builtComponent;
-using Mz::Test::TemporaryDirectory;
+using namespace Mz::Test;
+
+/// The program's own entry for the function.
+extern "C" decltype(&::LoadLibraryExW) __imp_LoadLibraryExW;
 
 namespace {
+
+constexpr const char* entryPoint = "QrGetComponentDescription";
 
 UINT errorMode() {
     const UINT mode = ::SetErrorMode(0);
@@ -65,20 +72,145 @@ TEST(WindowsPlatform, ConvertsEveryNameToANativeOne) {
     EXPECT_EQ(*toNative(name), name);
 }
 
-TEST(WindowsPlatform, FindsNothingInALibraryCutAtEveryLengthOfItsHeadersAndManyBeyond) {
+std::string contentOf(const std::filesystem::path& file) {
+    std::ifstream stream(file, std::ios::binary);
+    return std::string(std::istreambuf_iterator<char>(stream), {});
+}
+
+TEST(WindowsPlatform, FindsNothingInALibraryCutAtAnyLength) {
     TemporaryDirectory folder;
-    std::ifstream stream(builtComponent(L"tiny"), std::ios::binary);
-    const std::string whole(std::istreambuf_iterator<char>(stream), {});
+    const std::string whole = contentOf(builtComponent(L"tiny"));
     ASSERT_GT(whole.size(), 1024u);
-    ASSERT_TRUE(exportsFunction(builtComponent(L"tiny"), "QrGetComponentDescription"));
-    for (std::size_t length = 0; length < whole.size(); length += length < 1024 ? 16 : 97) {
-        const auto file = folder.write("cut.dll", whole.substr(0, length));
-        // What the system maps in spite of the cut must at least not be damaged where it counts.
-        if (const Module module = loadLibrary(file)) {
-            EXPECT_TRUE(findSymbol(module, "QrGetComponentDescription")) << length;
-            unloadLibrary(module);
-        }
+    ASSERT_TRUE(exportsFunction(builtComponent(L"tiny"), entryPoint));
+    const auto file = folder.write("cut.dll", whole);
+    for (std::size_t length = whole.size(); length-- > 0;) {
+        std::filesystem::resize_file(file, length);
+        ASSERT_EQ(readExport(file.native(), entryPoint), ExportState::absent) << length;
     }
+}
+
+/// What the system itself says of the file.
+bool systemFinds(const std::filesystem::path& file) {
+    const HMODULE module = ::LoadLibraryExW(file.c_str(), nullptr, DONT_RESOLVE_DLL_REFERENCES);
+    const bool found = findSymbol(module, entryPoint) != nullptr;
+    unloadLibrary(module);
+    return found;
+}
+
+TEST(WindowsPlatform, AgreesWithTheSystemOnEveryTestComponent) {
+    int with = 0;
+    int without = 0;
+    for (const auto& entry :
+         std::filesystem::recursive_directory_iterator(buildFolder / "components")) {
+        if (!entry.is_regular_file() || entry.path().extension() != ".dll")
+            continue;
+        const bool found = systemFinds(entry.path());
+        EXPECT_EQ(readExport(entry.path().native(), entryPoint),
+                  found ? ExportState::exported : ExportState::absent)
+            << entry.path();
+        ++(found ? with : without);
+    }
+    EXPECT_GT(with, 20);
+    EXPECT_GE(without, 3);
+}
+
+TEST(WindowsPlatform, AgreesWithTheSystemOnLibrariesMadeByHand) {
+    TemporaryDirectory folder;
+    const std::vector<std::vector<PeExport>> tables{
+        {{entryPoint, peCode}},
+        {{entryPoint, peData}},
+        {{entryPoint, 0}},
+        {{entryPoint, 0x9000}},
+        {{"A", peCode}, {entryPoint, peCode}, {"z", peCode}},
+        {{"Q", peCode},
+         {"QrGetComponentDescriptio", peCode},
+         {"QrGetComponentDescriptions", peCode}},
+        {{"z", peCode}, {"y", peCode}, {entryPoint, peCode}}, // not sorted
+        {{entryPoint, peCode}, {"b", peCode}, {"a", peCode}}};
+    int number = 0;
+    for (const std::vector<PeExport>& table : tables) {
+        const auto file =
+            folder.write("made" + std::to_string(++number) + ".dll", madeLibrary(table));
+        EXPECT_TRUE(::FreeLibrary(::LoadLibraryW(file.c_str()))) << number;
+        EXPECT_EQ(readExport(file.native(), entryPoint) == ExportState::exported, systemFinds(file))
+            << number;
+    }
+}
+
+/// Counts the calls of this program that map a library. The system tells of them only once it has
+/// resolved what a library needs, so the program's table of imports is changed for the while.
+class MappingCounter {
+  public:
+    MappingCounter() : original(__imp_LoadLibraryExW) {
+        calls = 0;
+        real = original;
+        replace(&count);
+    }
+    ~MappingCounter() { replace(original); }
+    MappingCounter(const MappingCounter&) = delete;
+    MappingCounter& operator=(const MappingCounter&) = delete;
+
+    static int calls;
+
+  private:
+    using Function = decltype(&::LoadLibraryExW);
+
+    static HMODULE WINAPI count(const wchar_t* name, HANDLE file, DWORD flags) {
+        ++calls;
+        return real(name, file, flags);
+    }
+    static void replace(Function function) {
+        DWORD before = 0;
+        EXPECT_TRUE(
+            ::VirtualProtect(&__imp_LoadLibraryExW, sizeof function, PAGE_READWRITE, &before));
+        __imp_LoadLibraryExW = function;
+        EXPECT_TRUE(::VirtualProtect(&__imp_LoadLibraryExW, sizeof function, before, &before));
+    }
+
+    static Function real;
+    Function original;
+};
+int MappingCounter::calls;
+MappingCounter::Function MappingCounter::real;
+
+TEST(WindowsPlatform, MapsNothingThatDoesNotExportTheFunction) {
+    TemporaryDirectory folder;
+    const auto with = folder.write("with.dll", madeLibrary({{entryPoint, peCode}}));
+    const auto without = folder.write("without.dll", madeLibrary({{"anotherFunction", peCode}}));
+    const auto program =
+        buildFolder / "components" / "kitProgram" / L"kitProgram" MZ_PROGRAM_EXTENSION;
+    const MappingCounter mappings;
+    EXPECT_EQ(queryExport(with.native(), entryPoint), ExportState::exported);
+    EXPECT_EQ(mappings.calls, 1);
+    for (const std::filesystem::path& file : {without, program}) {
+        EXPECT_EQ(queryExport(file.native(), entryPoint), ExportState::absent) << file;
+        EXPECT_FALSE(useLibrary(file.native(), entryPoint).module) << file;
+    }
+    EXPECT_EQ(mappings.calls, 1);
+}
+
+TEST(WindowsPlatform, HasTheSystemsTableOfUpperCaseLetters) {
+    // So that Linux sorts by the table that this system sorts by.
+    using Upcase = wchar_t __stdcall(wchar_t);
+    const auto upcase = reinterpret_cast<Upcase*>(reinterpret_cast<void*>(
+        ::GetProcAddress(::GetModuleHandleW(L"ntdll.dll"), "RtlUpcaseUnicodeChar")));
+    ASSERT_TRUE(upcase);
+    for (unsigned int unit = 0; unit < 0x10000; ++unit)
+        ASSERT_EQ(static_cast<unsigned int>(upperCase(static_cast<char16_t>(unit))),
+                  static_cast<unsigned int>(upcase(static_cast<wchar_t>(unit))))
+            << std::hex << unit;
+}
+
+TEST(WindowsPlatform, KnowsAShortageOfResourcesFromAFaultOfTheFile) {
+    for (const DWORD error : {ERROR_TOO_MANY_OPEN_FILES, ERROR_NOT_ENOUGH_MEMORY, ERROR_OUTOFMEMORY,
+                              ERROR_NO_SYSTEM_RESOURCES, ERROR_NONPAGED_SYSTEM_RESOURCES,
+                              ERROR_PAGED_SYSTEM_RESOURCES, ERROR_WORKING_SET_QUOTA,
+                              ERROR_PAGEFILE_QUOTA, ERROR_COMMITMENT_LIMIT, ERROR_NOT_ENOUGH_QUOTA})
+        EXPECT_TRUE(isShortage(error)) << error;
+    for (const DWORD error :
+         {ERROR_SUCCESS, ERROR_FILE_NOT_FOUND, ERROR_PATH_NOT_FOUND, ERROR_ACCESS_DENIED,
+          ERROR_SHARING_VIOLATION, ERROR_INVALID_NAME, ERROR_BAD_EXE_FORMAT, ERROR_DISK_FULL})
+        EXPECT_FALSE(isShortage(error)) << error;
 }
 
 } // namespace

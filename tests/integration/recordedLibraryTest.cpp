@@ -281,17 +281,6 @@ TEST_F(RecordedLibrary, TakesThePlaceOfTheNewRecordInTheOrderOfTheFiles) {
     EXPECT_EQ(&first.builders.front(), &held);
 }
 
-TEST_F(RecordedLibrary, RecordedTwiceStaysOneRecordOfItsFile) {
-    const auto file = add(L"goodByHand");
-    recordBuilder(record(file), goodUid, L"first");
-    recordBuilder(record(file), goodUid, L"second");
-    add(L"goodWithKit", "zz");
-    initialize();
-    EXPECT_EQ(manager->libraries.size(), 2u);
-    EXPECT_EQ(names().size(), 2u);
-    EXPECT_EQ(maker(goodUid), "good");
-}
-
 TEST_F(RecordedLibrary, ReindexesSoThatTheFirstOfOneIdentifierWinsInsideOneLibrary) {
     const auto file = add(L"duplicateUids");
     ComponentLibrary& library = record(file);

@@ -85,6 +85,8 @@ std::string peLibrary(const ImageTraits& traits) {
     bytes.row<Half>(header + 4, {static_cast<Half>(traits.arm ? 0xAA64 : 0x8664), 2});
     bytes.row<Half>(header + 20, {optionalSize, static_cast<Half>(traits.program ? 0x22 : 0x2022)});
     bytes.put<Half>(optional, 0x20B);
+    bytes.row<Word>(optional + 32, {0x1000, 0x200});
+    bytes.put<Word>(optional + 56, 0x3000);
     bytes.put<Word>(optional + 108, 16);
     bytes.row<Word>(optional + 112, {dataAddress, 0x80, dataAddress + 0x80, 60});
     bytes.put(table, std::string(".text"));

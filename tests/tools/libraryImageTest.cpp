@@ -7,6 +7,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include <cstring>
 #include <random>
 
 using namespace Mz::Tools;
@@ -89,6 +90,22 @@ TEST(ElfImage, WhoseNamesHaveNoEndIsDamaged) {
     const LibraryImage image = readLibraryImage(folder.write("image", bytes));
     EXPECT_EQ(image.damage, L"its table of names has no end");
     EXPECT_NE(image.entryPoint, LibraryImage::EntryPoint::function);
+}
+
+TEST(PeImage, WhoseExportsLeadNowhereIsDamaged) {
+    const std::string whole = peLibrary({});
+    const TemporaryDirectory folder;
+    const auto damageWith = [&](std::size_t field, std::uint32_t value) {
+        std::string bytes = whole;
+        const std::size_t exports = bytes.find("QrGetComponentDescription") - 0x38;
+        std::memcpy(bytes.data() + exports + field, &value, sizeof value);
+        return readLibraryImage(folder.write("image", bytes)).damage;
+    };
+    EXPECT_EQ(damageWith(16, 1), L"");
+    for (const std::size_t field : {20, 24})
+        EXPECT_EQ(damageWith(field, 0x1000000), L"the table of exports makes no sense") << field;
+    for (const std::size_t field : {28, 32, 36})
+        EXPECT_EQ(damageWith(field, 0xFF0000), L"the table of exports makes no sense") << field;
 }
 
 INSTANTIATE_TEST_SUITE_P(Formats, Image, ::testing::Values(ImageFormat::elf, ImageFormat::pe),

@@ -47,6 +47,23 @@ struct IdentityHash {
     }
 };
 
+/// The files that have a record, on a system where one file can have several names.
+class SeenFiles {
+  public:
+    bool contains(const platform::DirectoryEntry& entry) {
+        const platform::NativePath* const* const other = files.find(*entry.identity);
+        return other && platform::isSameFile(**other, entry.path);
+    }
+    /// `path` must outlive this object.
+    void add(const platform::FileIdentity& identity, const platform::NativePath& path) {
+        if (!files.find(identity))
+            files[identity] = &path;
+    }
+
+  private:
+    HashMap<platform::FileIdentity, const platform::NativePath*, IdentityHash> files;
+};
+
 /// `directory` as the system wants it, where an empty name is the current one.
 std::optional<platform::NativePath> nativeDirectory(const std::wstring& directory) {
     return platform::toNative(directory.empty() ? std::wstring_view(L".") : directory);
@@ -60,24 +77,29 @@ using LibraryKey = ComponentManager::LibraryKey;
 /// many.
 class Namesakes {
   public:
-    Namesakes(LibraryList& found, const LibraryList& recorded,
-              ComponentManager::LibraryMap& byName) {
+    /// The claims of the recorded libraries must have been counted.
+    Namesakes(LibraryList& found, ComponentManager::LibraryMap& byName) {
         if (found.size() == byName.size())
             return;
         for (auto file = found.begin(); file != found.end(); ++file) {
             const LibraryKey key(file->directory, file->fileName);
-            if (*byName.find(key) != file)
-                groups[key].others.push_back(file);
+            const LibraryList::iterator first = *byName.find(key);
+            if (first == file)
+                continue;
+            Group& group = groups[key];
+            group.claims = first->claims;
+            group.others.push_back(file);
         }
-        for (const ComponentLibrary& library : recorded)
-            if (Group* const group = groups.find({library.directory, library.fileName}))
-                ++group->recordCount;
     }
 
-    /// Whether nobody can say which record belongs to which file.
-    bool areConfused(const LibraryKey& key) const {
+    /// Returns whether it is unknown which record belongs to which file: there are more records, or
+    /// fewer. `file` is the one that is next. Where letter case tells no files apart, two records
+    /// of one name are of one file, and the later replaces the earlier.
+    bool areConfused(const LibraryKey& key, const ComponentLibrary& file) const {
+        if (platform::namesIgnoreCase())
+            return false;
         const Group* const group = groups.find(key);
-        return group && group->recordCount != group->others.size() + 1;
+        return group ? group->claims != group->others.size() + 1 : file.claims > 1;
     }
 
     /// Makes `file`, the one of this name whose turn it was last, the one whose turn it is.
@@ -89,8 +111,8 @@ class Namesakes {
 
   private:
     struct Group {
+        std::size_t claims = 0;
         std::vector<LibraryList::iterator> others; ///< all but the first
-        std::size_t recordCount = 0;
         std::size_t turn = 0;
     };
     HashMap<LibraryKey, Group, ComponentManager::LibraryKeyHash> groups;
@@ -109,44 +131,52 @@ std::wstring ComponentManager::normalisePath(const wchar_t* path, bool listMode)
 
 void ComponentManager::discover(const wchar_t* searchPath, LibraryList& newList,
                                 LibraryMap& byName) {
-    HashMap<platform::FileIdentity, const platform::NativePath*, IdentityHash> seen;
+    std::vector<std::wstring> directories; // normalised
+    std::vector<platform::NativePath> opened;
     for (const std::wstring& entry : directoriesOf(searchPath)) {
-        const std::wstring directory = normalisePath(entry.c_str(), false);
         const std::optional<platform::NativePath> native = nativeDirectory(entry);
         if (!native)
             continue;
-        for (platform::DirectoryEntry& candidate :
-             platform::listCandidates(platform::openingPath(directory, {}, *native))) {
+        directories.push_back(normalisePath(entry.c_str(), false));
+        opened.push_back(platform::openingPath(directories.back(), {}, *native));
+    }
+    SeenFiles seen;
+    std::vector<std::vector<platform::DirectoryEntry>> listings = platform::listCandidates(opened);
+    for (std::size_t index = 0; index < listings.size(); ++index)
+        for (platform::DirectoryEntry& candidate : listings[index]) {
             std::wstring fileName = normalisePath(candidate.name.c_str(), false);
             // One file, one record, however often the search path leads to it.
-            if (candidate.identity) {
-                const platform::NativePath* const* const other = seen.find(*candidate.identity);
-                if (other && platform::isSameFile(**other, candidate.path))
-                    continue;
-            } else if (byName.find({directory, fileName})) {
+            if (candidate.identity ? seen.contains(candidate)
+                                   : byName.find({directories[index], fileName}) != nullptr)
                 continue;
-            }
             ComponentLibrary& library = newList.emplace_back(*this);
-            library.directory = directory;
+            library.directory = directories[index];
             library.fileName = std::move(fileName);
             library.foundPath = std::move(candidate.path);
-            if (candidate.identity && !seen.find(*candidate.identity))
-                seen[*candidate.identity] = &library.foundPath;
+            if (candidate.identity)
+                seen.add(*candidate.identity, library.foundPath);
             const LibraryKey key(library.directory, library.fileName);
             if (!byName.find(key))
                 byName[key] = std::prev(newList.end());
         }
-    }
 }
 
 void ComponentManager::merge(LibraryList& recorded, LibraryMap& byName) {
-    Namesakes namesakes(libraries, recorded, byName);
-    LibraryList replaced; // The maps' keys stand in them.
+    std::vector<LibraryList::iterator*> places; // in the map; null where the file is gone
+    places.reserve(recorded.size());
+    for (const ComponentLibrary& library : recorded) {
+        places.push_back(byName.find({library.directory, library.fileName}));
+        if (places.back())
+            ++(*places.back())->claims;
+    }
+    Namesakes namesakes(libraries, byName);
+    LibraryList replaced; // The maps' keys point into them.
+    auto place = places.begin();
     for (auto next = recorded.begin(); next != recorded.end();) {
         const auto old = next++;
+        LibraryList::iterator* const found = *place++;
         const LibraryKey key(old->directory, old->fileName);
-        LibraryList::iterator* found = byName.find(key);
-        if (!found || namesakes.areConfused(key))
+        if (!found || namesakes.areConfused(key, **found))
             continue;
         namesakes.moveOn(key, *found);
         old->foundPath = std::move((*found)->foundPath);

@@ -96,10 +96,13 @@ bool ComponentManager::ensureLoaded(ComponentLibrary& library, bool forUse) {
         return !library.builders.empty();
 
     // What is no regular file any more must not even be opened: a pipe would keep us waiting.
-    if (!status->regular || !loadModule(library)) {
-        // Noted all the same, so that the file is not tried again until it changes.
-        library.noteFile(*status);
+    const LoadResult result = status->regular ? loadModule(library) : LoadResult::rejected;
+    if (result != LoadResult::loaded) {
         dropBuilders(library);
+        if (result == LoadResult::rejected)
+            library.noteFile(*status); // So that the file is not tried again until it changes.
+        else if (unchanged)
+            library.noteFile({}); // Or a later start would take it for a file without builders.
         return false;
     }
     // A client may hold a record whose library has changed, and an initialiser of that library may
@@ -107,7 +110,7 @@ bool ComponentManager::ensureLoaded(ComponentLibrary& library, bool forUse) {
     return unchanged || !library.builders.empty() || registerLibrary(library, *status);
 }
 
-bool ComponentManager::loadModule(ComponentLibrary& library) {
+ComponentManager::LoadResult ComponentManager::loadModule(ComponentLibrary& library) {
     const platform::NativePath path = library.openingPath();
     const platform::QuietErrors quiet;
     const platform::UsedLibrary used = platform::useLibrary(path, entryPointName);
@@ -118,7 +121,9 @@ bool ComponentManager::loadModule(ComponentLibrary& library) {
     library.module = used.module;
     library.loadedByManager = used.loaded;
     library.entryPoint = nullptr; // A load that failed may have left an address found meanwhile.
-    return used.module != nullptr;
+    if (used.module)
+        return LoadResult::loaded;
+    return used.unknown ? LoadResult::unknown : LoadResult::rejected;
 }
 
 /// The exception of a thread's cancellation has no object, which a sanitizer would complain about.

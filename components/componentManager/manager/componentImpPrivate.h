@@ -101,8 +101,13 @@ class MZ_INTERNAL_API ComponentManager final
     bool initialised = false;
 
   private:
-    /// Finds the library in the process or loads it; false when it is no component library.
-    bool loadModule(ComponentLibrary& library);
+    enum class LoadResult {
+        loaded,
+        rejected, ///< the file is no component library, or cannot be loaded
+        unknown,  ///< the system had no resources left to look into the file
+    };
+    /// Finds the library in the process or loads it.
+    LoadResult loadModule(ComponentLibrary& library);
     /// Has the loaded library describe itself. One that fails is left without builders and
     /// unloaded.
     bool registerLibrary(ComponentLibrary& library, const platform::FileStatus& status);
@@ -192,6 +197,8 @@ struct MZ_INTERNAL_API ComponentLibrary {
     bool loadedByManager = false;
 
     ComponentManager* manager;
+    std::size_t claims =
+        0; ///< of a file that was found: how many recorded libraries have its names
     platform::NativePath foundPath; ///< as the search path and the system spell it; never stored
     /// The entry point's address while the library is loaded. Only the look-up is spared: the call
     /// is made each time.

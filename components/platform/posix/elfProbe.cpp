@@ -1,5 +1,7 @@
 #include "components/platform/posix/elfProbe.h"
 
+#include "components/platform/fileBlocks.h"
+
 #include <algorithm>
 #include <array>
 #include <cerrno>
@@ -9,7 +11,6 @@
 #include <optional>
 #include <string_view>
 #include <sys/stat.h>
-#include <type_traits>
 #include <unistd.h>
 #include <vector>
 
@@ -22,86 +23,33 @@ constexpr std::size_t maximumSegments = 1024;
 constexpr std::size_t maximumDynamicEntries = 4096;
 constexpr std::size_t maximumChainLength = 4096;
 
-/// Reads pieces of a file through two remembered blocks: a library's symbol tables stand at its
-/// beginning as a rule, and the list of its tables near its end, so that most pieces cost no system
-/// call.
-class FileBlocks {
+/// The file behind a descriptor.
+class DescriptorSource final : public ByteSource {
   public:
-    explicit FileBlocks(int descriptor) : descriptor(descriptor) {
+    explicit DescriptorSource(int descriptor) : descriptor(descriptor) {
         struct stat status;
         if (::fstat(descriptor, &status) == 0)
             fileSize = static_cast<std::uint64_t>(status.st_size);
     }
 
-    /// The `T` at `offset`; nothing when the file ends before it is whole.
-    template <class T>
-    std::optional<T> read(std::uint64_t offset) {
-        static_assert(std::is_trivially_copyable_v<T>);
-        T value;
-        if (!read(offset, &value, sizeof value))
-            return std::nullopt;
-        return value;
-    }
+    std::uint64_t size() const override { return fileSize; }
 
-    /// False when the file ends before it has `size` bytes more. No piece is larger than a block.
-    bool read(std::uint64_t offset, void* data, std::size_t size) {
-        Block* block = blockWith(offset, size);
-        if (!block) {
-            block = &blocks[older];
-            load(*block, offset, size);
-            if (!block->contains(offset, size))
-                return false;
-        }
-        older = block == &blocks[0] ? 1 : 0;
-        std::memcpy(data, block->bytes.data() + (offset - block->offset), size);
-        return true;
-    }
-
-    /// Whether the file has all of these bytes.
-    bool reaches(std::uint64_t offset, std::uint64_t size) const {
-        return size <= fileSize && offset <= fileSize - size;
-    }
-
-  private:
-    struct Block {
-        std::uint64_t offset = 0;
-        std::size_t size = 0;
-        std::array<char, 4096> bytes;
-
-        bool contains(std::uint64_t wanted, std::size_t length) const {
-            return wanted >= offset && wanted - offset <= size &&
-                   length <= size - (wanted - offset);
-        }
-    };
-
-    Block* blockWith(std::uint64_t offset, std::size_t size) {
-        for (Block& block : blocks)
-            if (block.contains(offset, size))
-                return &block;
-        return nullptr;
-    }
-
-    /// Fills the block from `offset` on, with `needed` bytes at least unless the file ends before.
-    void load(Block& block, std::uint64_t offset, std::size_t needed) {
-        block.size = 0;
-        block.offset = offset;
-        if (offset > static_cast<std::uint64_t>(INT64_MAX) - block.bytes.size())
-            return;
-        while (block.size < needed) {
-            const ssize_t got =
-                ::pread(descriptor, block.bytes.data() + block.size,
-                        block.bytes.size() - block.size, static_cast<off_t>(offset + block.size));
+    std::size_t read(std::uint64_t offset, void* data, std::size_t length) override {
+        std::size_t done = 0;
+        while (done < length) {
+            const ssize_t got = ::pread(descriptor, static_cast<char*>(data) + done, length - done,
+                                        static_cast<off_t>(offset + done));
             if (got > 0)
-                block.size += static_cast<std::size_t>(got);
+                done += static_cast<std::size_t>(got);
             else if (got == 0 || errno != EINTR)
                 break;
         }
+        return done;
     }
 
+  private:
     int descriptor;
     std::uint64_t fileSize = 0;
-    std::array<Block, 2> blocks;
-    std::size_t older = 0; ///< the block to fill next
 };
 
 /// Where the tables for symbol lookup stand, as addresses in the loaded library.
@@ -118,7 +66,7 @@ struct DynamicTables {
 
 class ElfLibrary {
   public:
-    explicit ElfLibrary(int descriptor) : file(descriptor) {}
+    explicit ElfLibrary(ByteSource& source) : file(source) {}
 
     bool exports(const char* symbol) {
         if (!readHeaders() || !readDynamicTables())
@@ -305,7 +253,8 @@ class ElfLibrary {
 } // namespace
 
 bool elfExportsFunction(int descriptor, const char* symbol) {
-    return ElfLibrary(descriptor).exports(symbol);
+    DescriptorSource source(descriptor);
+    return ElfLibrary(source).exports(symbol);
 }
 
 } // namespace Mz::platform

@@ -3,16 +3,13 @@
 #include "components/platform/characters.h"
 #include "components/platform/posix/elfProbe.h"
 
-#include <algorithm>
 #include <cerrno>
 #include <cstring>
-#include <dirent.h>
 #include <dlfcn.h>
 #include <fcntl.h>
 #include <langinfo.h>
 #include <link.h>
 #include <locale.h>
-#include <memory>
 #include <pthread.h>
 #include <span>
 #include <sys/stat.h>
@@ -40,51 +37,9 @@ class Descriptor {
     int value;
 };
 
-struct CloseDirectory {
-    void operator()(DIR* directory) const { ::closedir(directory); }
-};
-
-using Directory = std::unique_ptr<DIR, CloseDirectory>;
-
-/// Whether an entry names the file by number; some file systems give a placeholder instead.
-bool hasFileNumber(const dirent& entry) {
-    constexpr ino_t placeholder = 0xFFFFFFFF;
-    return entry.d_ino != 0 && entry.d_ino != placeholder && entry.d_ino != static_cast<ino_t>(-1);
-}
-
-/// Whether the name in `directory`, which is on `device`, is a regular file, and which. Mostly the
-/// entry alone tells; asking for the status of every file takes as long as all the rest.
-std::optional<FileIdentity> regularFile(DIR* directory, dev_t device, const dirent& entry) {
-    if (entry.d_type == DT_DIR)
-        return std::nullopt;
-    if (entry.d_type == DT_REG && hasFileNumber(entry))
-        return FileIdentity{device, entry.d_ino};
-    struct stat status;
-    if (::fstatat(::dirfd(directory), entry.d_name, &status, 0) != 0 || !S_ISREG(status.st_mode))
-        return std::nullopt;
-    return FileIdentity{status.st_dev, status.st_ino};
-}
-
-/// Sorts by normalised name, so that the order is that of a system without letter case; names that
-/// differ in case only by their bytes.
-void sortByName(std::vector<DirectoryEntry>& entries) {
-    struct Keyed {
-        std::wstring key;
-        DirectoryEntry* entry;
-    };
-    std::vector<Keyed> keyed;
-    keyed.reserve(entries.size());
-    for (DirectoryEntry& entry : entries)
-        keyed.push_back({lowerCase(entry.name), &entry});
-    std::sort(keyed.begin(), keyed.end(), [](const Keyed& a, const Keyed& b) {
-        const int order = a.key.compare(b.key);
-        return order ? order < 0 : a.entry->path < b.entry->path;
-    });
-    std::vector<DirectoryEntry> sorted;
-    sorted.reserve(entries.size());
-    for (const Keyed& next : keyed)
-        sorted.push_back(std::move(*next.entry));
-    entries.swap(sorted);
+/// Whether an operation failed for want of resources, and not because of the file.
+bool isShortage(int error) {
+    return error == EMFILE || error == ENFILE || error == ENOMEM;
 }
 
 /// The segments of a loaded library, as its file describes them.
@@ -190,6 +145,10 @@ std::wstring lowerCase(std::wstring text) {
     return text;
 }
 
+bool namesIgnoreCase() {
+    return false;
+}
+
 std::optional<std::wstring> firstArgument() {
     std::ifstream commandLine("/proc/self/cmdline", std::ios::binary);
     std::string argument;
@@ -213,27 +172,6 @@ bool isSameFile(const NativePath& a, const NativePath& b) {
            first.st_dev == second.st_dev && first.st_ino == second.st_ino;
 }
 
-std::vector<DirectoryEntry> listCandidates(const NativePath& directory) {
-    std::vector<DirectoryEntry> entries;
-    const Directory listing(::opendir(directory.c_str()));
-    struct stat own;
-    if (!listing || ::fstat(::dirfd(listing.get()), &own) != 0)
-        return entries;
-    const NativePath inDirectory = directory + "/";
-    while (const dirent* entry = ::readdir(listing.get())) {
-        if (entry->d_name[0] == '.')
-            continue;
-        const std::optional<FileIdentity> identity = regularFile(listing.get(), own.st_dev, *entry);
-        if (!identity)
-            continue;
-        std::optional<std::wstring> name = toCharacters(entry->d_name);
-        if (name)
-            entries.push_back({std::move(*name), inDirectory + entry->d_name, identity});
-    }
-    sortByName(entries);
-    return entries;
-}
-
 bool openForReading(std::ifstream& stream, const NativePath& path) {
     stream.open(path, std::ios::in | std::ios::binary);
     // A directory opens like a file here and only refuses to be read.
@@ -252,9 +190,11 @@ Module findLoadedLibrary(const NativePath& path) {
     return module;
 }
 
-bool exportsFunction(const NativePath& path, const char* symbol) {
+ExportState queryExport(const NativePath& path, const char* symbol) {
     const Descriptor file(::open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK));
-    return file && elfExportsFunction(file.get(), symbol);
+    if (!file)
+        return isShortage(errno) ? ExportState::unknown : ExportState::absent;
+    return elfExportsFunction(file.get(), symbol) ? ExportState::exported : ExportState::absent;
 }
 
 Module loadLibrary(const NativePath& path) {
@@ -266,14 +206,16 @@ Module loadLibrary(const NativePath& path) {
 
 UsedLibrary useLibrary(const NativePath& path, const char* symbol) {
     // Asking first whether the library is mapped would open every file a second time.
-    if (!exportsFunction(path, symbol))
-        return {isMappedAs(path) ? findLoadedLibrary(path) : nullptr, false};
+    const ExportState state = queryExport(path, symbol);
+    if (state != ExportState::exported)
+        return {isMappedAs(path) ? findLoadedLibrary(path) : nullptr, false,
+                state == ExportState::unknown};
     const unsigned long long before = mappingCount();
     const Module module = loadLibrary(path);
     if (!module || mappingCount() != before)
-        return {module, module != nullptr};
+        return {module, module != nullptr, false};
     unloadLibrary(module); // It stays as long as whoever loaded it wants.
-    return {module, false};
+    return {module, false, false};
 }
 
 void unloadLibrary(Module module) {

@@ -1,5 +1,7 @@
 #include "components/platform/platform.h"
 
+#include "components/platform/windows/exportReader.h"
+
 #include <clocale>
 #include <cstring>
 #include <cwchar>
@@ -91,6 +93,20 @@ class Listing {
     std::intptr_t handle;
 };
 
+std::vector<DirectoryEntry> list(const NativePath& directory) {
+    std::vector<DirectoryEntry> entries;
+    Listing listing(directory + L"/*");
+    if (!listing.valid())
+        return entries;
+    constexpr unsigned int excluded = _A_HIDDEN | _A_SYSTEM | _A_SUBDIR;
+    do {
+        const _wfinddata64i32_t& entry = listing.current();
+        if (!(entry.attrib & excluded))
+            entries.push_back({entry.name, directory + L"\\" + entry.name, std::nullopt});
+    } while (listing.next());
+    return entries;
+}
+
 /// Whether what stands there can be called.
 bool isCode(const void* address) {
     constexpr DWORD executable =
@@ -118,6 +134,10 @@ NativePath openingPath(const std::wstring& directory, const std::wstring& name, 
 std::wstring lowerCase(std::wstring text) {
     ::_wcslwr(text.data());
     return text;
+}
+
+bool namesIgnoreCase() {
+    return true;
 }
 
 std::optional<std::wstring> firstArgument() {
@@ -148,17 +168,12 @@ bool isSameFile(const NativePath& a, const NativePath& b) {
     return a == b;
 }
 
-std::vector<DirectoryEntry> listCandidates(const NativePath& directory) {
-    std::vector<DirectoryEntry> entries;
-    Listing listing(directory + L"/*");
-    if (!listing.valid())
-        return entries;
-    constexpr unsigned int excluded = _A_HIDDEN | _A_SYSTEM | _A_SUBDIR;
-    do {
-        const _wfinddata64i32_t& entry = listing.current();
-        if (!(entry.attrib & excluded))
-            entries.push_back({entry.name, directory + L"\\" + entry.name, std::nullopt});
-    } while (listing.next());
+std::vector<std::vector<DirectoryEntry>>
+listCandidates(const std::vector<NativePath>& directories) {
+    std::vector<std::vector<DirectoryEntry>> entries;
+    entries.reserve(directories.size());
+    for (const NativePath& directory : directories)
+        entries.push_back(list(directory));
     return entries;
 }
 
@@ -174,13 +189,16 @@ Module findLoadedLibrary(const NativePath& path) {
     return ::GetModuleHandleW(loaderName(path).c_str());
 }
 
-bool exportsFunction(const NativePath& path, const char* symbol) {
+ExportState queryExport(const NativePath& path, const char* symbol) {
+    const ExportState state = readExport(fullName(path), symbol);
+    if (state != ExportState::exported)
+        return state;
     const std::wstring name = loaderName(path);
     const OwnActivationContext context(path);
     const HMODULE module = ::LoadLibraryExW(name.c_str(), nullptr, DONT_RESOLVE_DLL_REFERENCES);
     const bool found = findSymbol(module, symbol) != nullptr;
     unloadLibrary(module);
-    return found;
+    return found ? ExportState::exported : ExportState::absent;
 }
 
 Module loadLibrary(const NativePath& path) {
@@ -193,9 +211,10 @@ Module loadLibrary(const NativePath& path) {
 
 UsedLibrary useLibrary(const NativePath& path, const char* symbol) {
     if (const Module mapped = findLoadedLibrary(path))
-        return {mapped, false};
-    const Module module = exportsFunction(path, symbol) ? loadLibrary(path) : nullptr;
-    return {module, module != nullptr};
+        return {mapped, false, false};
+    const ExportState state = queryExport(path, symbol);
+    const Module module = state == ExportState::exported ? loadLibrary(path) : nullptr;
+    return {module, module != nullptr, state == ExportState::unknown};
 }
 
 void unloadLibrary(Module module) {

@@ -1,0 +1,35 @@
+// The block that was used last stays; the other one is filled anew. Two blocks suffice because the
+// readers go back and forth between two tables at a time.
+#include "components/platform/fileBlocks.h"
+
+#include <algorithm>
+#include <cstring>
+
+namespace Mz::platform {
+
+bool FileBlocks::read(std::uint64_t offset, void* data, std::size_t size) {
+    Block* block = blockWith(offset, size);
+    if (!block) {
+        if (size > blockSize || !reaches(offset, size))
+            return false;
+        block = &blocks[older];
+        block->offset = offset;
+        // No further than the end, or the source would have to ask once more to find it.
+        const std::uint64_t rest = std::min<std::uint64_t>(fileSize - offset, blockSize);
+        block->size = file.read(offset, block->bytes.data(), static_cast<std::size_t>(rest));
+        if (!block->contains(offset, size))
+            return false;
+    }
+    older = block == &blocks[0] ? 1 : 0;
+    std::memcpy(data, block->bytes.data() + (offset - block->offset), size);
+    return true;
+}
+
+FileBlocks::Block* FileBlocks::blockWith(std::uint64_t offset, std::size_t size) {
+    for (Block& block : blocks)
+        if (block.contains(offset, size))
+            return &block;
+    return nullptr;
+}
+
+} // namespace Mz::platform

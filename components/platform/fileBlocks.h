@@ -1,0 +1,76 @@
+/// Small reads from a file that may be damaged or hostile, for the readers of library formats.
+///
+/// Private to the platform layer.
+#pragma once
+
+#include <array>
+#include <cstddef>
+#include <cstdint>
+#include <optional>
+#include <type_traits>
+
+namespace Mz::platform {
+
+/// The bytes of an open file, read at any offset.
+class ByteSource {
+  public:
+    /// Returns the size of the file.
+    virtual std::uint64_t size() const = 0;
+
+    /// Reads up to `length` bytes at `offset` into `data` and returns how many were read: fewer
+    /// only at the end of the file and after an error.
+    virtual std::size_t read(std::uint64_t offset, void* data, std::size_t length) = 0;
+
+  protected:
+    ~ByteSource() = default;
+};
+
+/// Reads pieces of a file through two cached blocks. A library keeps the tables that are read
+/// together close to each other, so most pieces cost no system call.
+class FileBlocks {
+  public:
+    /// The longest piece that can be read.
+    static constexpr std::size_t blockSize = 4096;
+
+    /// `file` must outlive this object.
+    explicit FileBlocks(ByteSource& file) : file(file), fileSize(file.size()) {}
+
+    /// Returns the `T` at `offset`, or nothing if the file ends before it is complete.
+    template <class T>
+    std::optional<T> read(std::uint64_t offset) {
+        static_assert(std::is_trivially_copyable_v<T> && sizeof(T) <= blockSize);
+        T value;
+        if (!read(offset, &value, sizeof value))
+            return std::nullopt;
+        return value;
+    }
+
+    /// Reads exactly `size` bytes, at most `blockSize`. Returns false if the file ends before.
+    bool read(std::uint64_t offset, void* data, std::size_t size);
+
+    /// Returns whether the file contains all of these bytes.
+    bool reaches(std::uint64_t offset, std::uint64_t size) const {
+        return size <= fileSize && offset <= fileSize - size;
+    }
+
+  private:
+    struct Block {
+        std::uint64_t offset = 0;
+        std::size_t size = 0;
+        std::array<char, blockSize> bytes;
+
+        bool contains(std::uint64_t wanted, std::size_t length) const {
+            return wanted >= offset && wanted - offset <= size &&
+                   length <= size - (wanted - offset);
+        }
+    };
+
+    Block* blockWith(std::uint64_t offset, std::size_t size);
+
+    ByteSource& file;
+    std::uint64_t fileSize;
+    std::array<Block, 2> blocks;
+    std::size_t older = 0; ///< the block to fill next
+};
+
+} // namespace Mz::platform
