@@ -1,9 +1,14 @@
 #include "components/componentManager/platform/characters.h"
 
+#include "components/base/export.h"
 #include "components/componentManager/platform/platform.h"
+
+// Of the system that the build is for.
+#include "threadWord.h"
 
 #include <climits>
 #include <cwchar>
+#include <new>
 
 namespace Mz::platform {
 
@@ -11,19 +16,26 @@ static_assert(maximumCharacterBytes >= MB_LEN_MAX);
 
 namespace {
 
-constinit thread_local int plainBytesDepth = 0;
+/// How many `PlainBytes` a thread has.
+using PlainBytesDepth = ThreadWord<struct PlainBytesName>;
+
+void releaseDepth() {
+    PlainBytesDepth::release();
+}
+MZ_AT_UNLOAD(releaseDepth);
 
 } // namespace
 
 PlainBytes::PlainBytes() {
-    ++plainBytesDepth;
+    if (!PlainBytesDepth::set(PlainBytesDepth::get() + 1))
+        throw std::bad_alloc();
 }
 
 PlainBytes::~PlainBytes() {
-    --plainBytesDepth;
+    PlainBytesDepth::set(PlainBytesDepth::get() - 1);
 }
 
-CharacterConverter::CharacterConverter() : plain(plainBytesDepth > 0 || usesPlainBytes()) {}
+CharacterConverter::CharacterConverter() : plain(PlainBytesDepth::get() > 0 || usesPlainBytes()) {}
 
 int CharacterConverter::decode(std::string_view bytes, wchar_t& character) const {
     if (bytes.empty())

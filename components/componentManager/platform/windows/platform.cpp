@@ -1,4 +1,5 @@
 #include "components/componentManager/platform/platform.h"
+#include "components/componentManager/neverDestroyed.h"
 
 #include <clocale>
 #include <cstring>
@@ -242,24 +243,32 @@ bool usesPlainBytes() {
 
 namespace {
 
-/// How many want "C" at the moment, and what to go back to when the last one has gone.
+/// A lock that owns no memory, which a mutex of the standard library does here.
+class OwnLock {
+  public:
+    void lock() { ::AcquireSRWLockExclusive(&handle); }
+    void unlock() { ::ReleaseSRWLockExclusive(&handle); }
+
+  private:
+    SRWLOCK handle = SRWLOCK_INIT;
+};
+
+/// How many want "C" at the moment, and what to go back to when the last one has gone; empty when
+/// none does.
 struct LocaleSwitch {
-    std::mutex mutex;
+    OwnLock lock;
     int wanted = 0;
     std::wstring previous;
 };
 
-LocaleSwitch& localeSwitch() {
-    // Never destroyed: streams may still be written while static objects are.
-    static LocaleSwitch& instance = *new LocaleSwitch;
-    return instance;
-}
+/// Streams may still be written while static objects are destroyed.
+constinit NeverDestroyed<LocaleSwitch> localeSwitch;
 
 } // namespace
 
 CLocale::CLocale() : previous(nullptr) {
-    LocaleSwitch& state = localeSwitch();
-    const std::lock_guard lock(state.mutex);
+    LocaleSwitch& state = localeSwitch.value;
+    const std::lock_guard guard(state.lock);
     if (state.wanted == 0) {
         const wchar_t* current = ::_wsetlocale(LC_ALL, nullptr);
         state.previous = current ? current : L"C";
@@ -270,10 +279,13 @@ CLocale::CLocale() : previous(nullptr) {
 }
 
 CLocale::~CLocale() {
-    LocaleSwitch& state = localeSwitch();
-    const std::lock_guard lock(state.mutex);
-    if (--state.wanted == 0 && state.previous != L"C")
+    LocaleSwitch& state = localeSwitch.value;
+    const std::lock_guard guard(state.lock);
+    if (--state.wanted > 0)
+        return;
+    if (state.previous != L"C")
         ::_wsetlocale(LC_ALL, state.previous.c_str());
+    state.previous = std::wstring();
 }
 
 } // namespace Mz::platform
