@@ -8,7 +8,6 @@
 #include <cstdint>
 #include <filesystem>
 #include <fstream>
-#include <mutex>
 #include <optional>
 #include <string>
 #include <string_view>
@@ -142,10 +141,10 @@ UsedLibrary useLibrary(const NativePath& path, const char* symbol);
 /// Gives back one load.
 void unloadLibrary(Module module);
 
-/// Keeps the library that contains this code, the component manager's, in the process until it
-/// ends, where it could be unloaded under its own feet: components need it and so keep it mapped,
-/// and its static objects unload the components. Does nothing in a program, and where the loader
-/// defers that.
+/// Keeps the library that contains this code, the component manager's, loaded until the process
+/// ends. Components depend on that library, and its destructor unloads them: without a reference of
+/// its own, it would be unmapped with the last component, while its destructor runs. A no-op in a
+/// program, and where the loader unmaps nothing while a process ends.
 void keepOwnLibrary();
 
 /// The address of the function `symbol` in that very library, not in one it depends on; null when
@@ -184,9 +183,9 @@ struct LocaleSwitch {
     LocaleSwitch();
 
     void* plain = nullptr; ///< the "C" locale, where the system has handles for locales
-    std::mutex mutex;      ///< guards what follows
+    void* lock = nullptr;  ///< the system's lock, which guards what follows; null is unlocked
     int wanted = 0;        ///< how many `CLocale` live
-    std::wstring previous; ///< the locale to go back to
+    std::wstring previous; ///< the locale to restore; empty while none lives
 };
 
 /// While it lives, the C locale appears as "C" to the calling thread. May be nested.

@@ -1,7 +1,10 @@
 /// A plug-in of a host: a library that uses the component manager, and its registries before and
 /// after everything else.
 #include "components/componentManager/processControl.h"
+#include "components/componentManager/textStream.h"
 #include "tests/components/plain.h"
+
+#include <sstream>
 
 using namespace Mz;
 using namespace Mz::Test;
@@ -24,8 +27,24 @@ class Translator final : public QrCastImpl<Translator, PlainObject> {
     const char* maker() const override { return "translator"; }
 };
 
+/// A buffer that the library does not recognise as its own.
+class ForeignBuffer final : public QrOutBuffer {
+  public:
+    using QrOutBuffer::QrOutBuffer;
+};
+
+template <class Buffer>
+void writeNumber() {
+    std::ostringstream bytes;
+    Buffer buffer(&bytes);
+    QrTextStream stream(&buffer);
+    stream.formattedWrite(L"%d%s", 1, L"text");
+}
+
 struct FirstAndLast {
     FirstAndLast() {
+        writeNumber<QrOutBuffer>();
+        writeNumber<ForeignBuffer>();
         QrAddTranslation(&asked, &translator, [](const QrUid&) { return true; });
         QrSetThreadProcessController(controller());
         note(answered() ? "first" : "wrong");

@@ -18,11 +18,11 @@ void unloadAsHost(void* module);
 /// The address of a function that the library exports; null when there is none.
 void* functionOf(void* module, const char* name);
 
-/// How much memory of the C library's heap is in use, in bytes.
+/// How much memory of the C library's heap is in use, in bytes. 0 where a sanitizer counts instead.
 std::size_t allocatedBytes();
 
-/// Ends a copy of this process by `std::exit(0)` and returns its exit code, -1 when the system ended
-/// it. Returns 0 where processes make no copies of themselves.
+/// Ends a copy of this process by `std::exit(0)` and returns its exit code, -1 when the system
+/// ended it. Returns 0 where processes make no copies of themselves.
 int exitCodeOfCopy();
 
 /// Makes the system treat the file as hidden, by its name or its attributes, and returns its path.

@@ -261,8 +261,28 @@ bool usesPlainBytes() {
 
 LocaleSwitch::LocaleSwitch() = default;
 
+namespace {
+
+/// Locks the switch with a system lock that owns no memory, which a mutex of the standard library
+/// does on this system.
+class SwitchGuard {
+  public:
+    explicit SwitchGuard(LocaleSwitch& shared) : handle(reinterpret_cast<PSRWLOCK>(&shared.lock)) {
+        static_assert(sizeof(SRWLOCK) == sizeof shared.lock);
+        ::AcquireSRWLockExclusive(handle);
+    }
+    ~SwitchGuard() { ::ReleaseSRWLockExclusive(handle); }
+    SwitchGuard(const SwitchGuard&) = delete;
+    SwitchGuard& operator=(const SwitchGuard&) = delete;
+
+  private:
+    PSRWLOCK handle;
+};
+
+} // namespace
+
 CLocale::CLocale(LocaleSwitch& shared) : shared(shared) {
-    const std::lock_guard lock(shared.mutex);
+    const SwitchGuard guard(shared);
     if (shared.wanted == 0) {
         const wchar_t* current = ::_wsetlocale(LC_ALL, nullptr);
         shared.previous = current ? current : L"C";
@@ -273,9 +293,12 @@ CLocale::CLocale(LocaleSwitch& shared) : shared(shared) {
 }
 
 CLocale::~CLocale() {
-    const std::lock_guard lock(shared.mutex);
-    if (--shared.wanted == 0 && shared.previous != L"C")
+    const SwitchGuard guard(shared);
+    if (--shared.wanted > 0)
+        return;
+    if (shared.previous != L"C")
         ::_wsetlocale(LC_ALL, shared.previous.c_str());
+    shared.previous = std::wstring();
 }
 
 } // namespace Mz::platform
