@@ -1,4 +1,4 @@
-/// What makes writing a host short. Header-only.
+/// Functions that prepare names and search paths for the library. Header-only.
 ///
 ///     QrGetComponentManager()->initialize(Mz::Kit::searchPath("plugins").c_str());
 #pragma once
@@ -12,11 +12,13 @@
 
 namespace Mz::Kit {
 
-/// Characters from bytes, as the library reads names: in the locale "C", which every program starts
-/// in, each byte is a character; in others the C library decides. Reads the process's locale, so no
-/// other thread may set it meanwhile.
+/// Returns `bytes` as wide characters, converted as the library converts file names.
 ///
-/// \throws std::system_error when the bytes are no text in this locale
+/// In the locale "C", in which every program starts, and in "POSIX", each byte is one character. In
+/// other locales the C library converts. The function reads the locale of the process, so no other
+/// thread may set the locale at the same time.
+///
+/// \throws std::system_error  if the bytes are not valid text in this locale
 inline std::wstring wideText(std::string_view bytes) {
     const char* const locale = std::setlocale(LC_CTYPE, nullptr);
     const std::string_view name = locale ? locale : "C";
@@ -30,31 +32,35 @@ inline std::wstring wideText(std::string_view bytes) {
             length = std::mbrtowc(&character, bytes.data(), bytes.size(), &state);
         if (length > bytes.size()) // Rejected, or incomplete.
             throw std::system_error(std::make_error_code(std::errc::illegal_byte_sequence),
-                                    "no text in this locale: " + std::string(bytes));
+                                    "not valid text in this locale: " + std::string(bytes));
         text += character;
         bytes.remove_prefix(length ? length : 1);
     }
     return text;
 }
 
-/// Where names are wide already.
+/// Returns a copy of `text`, for platforms whose file names are wide already.
 inline std::wstring wideText(std::wstring_view text) {
     return std::wstring(text);
 }
 
-/// The name of a file in the characters that the library's operations take.
-/// `std::filesystem::path::wstring` is no help: where names are bytes it knows ASCII alone.
+/// Returns the name of a file in the wide characters that the library takes.
 ///
-/// \throws std::system_error when the name is no text in this locale
+/// Do not use `std::filesystem::path::wstring` for this: where file names are bytes, it converts
+/// ASCII only.
+///
+/// \throws std::system_error  if the name is not valid text in this locale
 inline std::wstring wideName(const std::filesystem::path& file) {
     return wideText(file.native());
 }
 
-/// The search path that leads the component manager to this folder: its full name, without "." and
-/// "..", which the manager deliberately does not resolve. Join several with L";", which therefore
-/// cannot stand in a folder's name.
+/// Returns the search path for one folder: its absolute name, without "." and "..". The component
+/// manager deliberately does not resolve these.
 ///
-/// \throws std::system_error when the name is no text in this locale
+/// Join several search paths with L";". The name of a folder must therefore not contain a ";".
+///
+/// \throws std::system_error  if the name is not valid text in this locale
+/// \throws std::filesystem::filesystem_error  if the current directory cannot be determined
 inline std::wstring searchPath(const std::filesystem::path& folder) {
     return wideName(std::filesystem::absolute(folder).lexically_normal());
 }
