@@ -1,3 +1,8 @@
+/// Throws the exception that aborts the current work.
+///
+/// The exception is a normal C++ exception, not a call of `std::abort`: the stack unwinds, and the
+/// code that started the work decides what follows. Its functions are defined here, not inline, so
+/// that its type information has one home and every library can catch it.
 #include "components/base/assertions.h"
 
 #include <new>

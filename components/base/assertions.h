@@ -1,4 +1,4 @@
-/// Ending the current work for good.
+/// The abort of the current work by an exception.
 #pragma once
 
 #include "components/base/exBase.h"
@@ -7,10 +7,11 @@
 
 namespace Mz {
 
+/// Scope of the function that aborts the current work, and of its exception.
 class Assertions {
   public:
-    /// Thrown by `throwProgramAborted`. Its reason, which `what()` gives too, is "Program
-    /// aborted.".
+    /// The exception of `throwProgramAborted`. The reason is "Program aborted.", which `what()`
+    /// returns too. `clone()` returns null if memory runs out.
     class MZ_BASE_API ExProgramAborted : public std::runtime_error, public ExBase {
       public:
         ExProgramAborted(const char* file, int line);
@@ -20,8 +21,12 @@ class Assertions {
         ExBase* clone() const override;
     };
 
-    /// Throws `ExProgramAborted` with the source position given; never returns. May be called from
-    /// any thread; whoever started the aborted work catches it.
+    /// Throws `ExProgramAborted`; never returns. The code that started the aborted work catches
+    /// the exception. Thread-safe.
+    ///
+    /// \param file  source name of the form `components/<library>/<file>`; null counts as empty
+    /// \param line  source line
+    /// \throws ExProgramAborted  always
     [[noreturn]] MZ_BASE_API static void throwProgramAborted(const char* file, int line);
 };
 

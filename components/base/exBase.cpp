@@ -1,3 +1,7 @@
+/// Keeps the texts of an exception.
+///
+/// Both texts are composed when they are set, not when they are read: the getters then return plain
+/// pointers that stay valid, need no memory and cannot fail inside a handler.
 #include "components/base/exBase.h"
 
 namespace Mz {
@@ -19,7 +23,7 @@ const char* ExBase::getDetailedReason() const {
 }
 
 void ExBase::setReason(const char* text) {
-    // Both texts are complete before either is taken, so that a failed allocation changes nothing.
+    // Both texts are composed before either is stored, so that a failed allocation changes nothing.
     std::string newReason(text ? text : "");
     std::string newDetailedReason = position + ": " + newReason;
     reason.swap(newReason);

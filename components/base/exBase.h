@@ -1,4 +1,4 @@
-/// The base of every exception that the library family throws.
+/// The base class of all exceptions of the library family.
 #pragma once
 
 #include "components/base/export.h"
@@ -7,37 +7,45 @@
 
 namespace Mz {
 
-/// What is known of one failure: where it was thrown, and why.
+/// The base class of all exceptions: the source position of the throw, and the reason.
 ///
-/// `ExBase` is deliberately no `std::exception`: every concrete class derives from
-/// `std::runtime_error` first and from its scope class (and through it from `ExBase`) second. Were
-/// `ExBase` a `std::exception` too, that base would be ambiguous and `catch (std::exception&)`
-/// would miss the whole family.
+/// `ExBase` deliberately does not derive from `std::exception`. Every concrete class derives from
+/// `std::runtime_error` first and from its scope class (and through it from `ExBase`) second. If
+/// `ExBase` derived from `std::exception` too, that base would be ambiguous and
+/// `catch (std::exception&)` would miss the whole family.
 ///
-/// All texts are copies of its own, so an exception stays valid when the library that threw it is
-/// unloaded or the caller's buffers are gone. Distinct objects may be used from distinct threads.
+/// The object owns copies of all texts. It therefore stays valid after the library that threw it is
+/// unloaded, and after the caller's buffers are freed. Different threads can use different objects.
 class MZ_BASE_API ExBase {
   public:
-    /// Records the source position of the throw. `file` has the form `components/<library>/<file>`,
-    /// without extension; null counts as empty. The reason starts out empty.
+    /// Records the source position of the throw; the reason is empty.
+    ///
+    /// \param file  source name of the form `components/<library>/<file>`, without extension; null
+    ///              counts as empty
+    /// \param line  source line
+    /// \throws std::bad_alloc  if memory runs out. The copy operations throw it too.
     ExBase(const char* file, int line);
     ExBase(const ExBase& other);
     ExBase& operator=(const ExBase& other);
 
-    /// Why it was thrown: never null, valid as long as this object and its reason are unchanged.
+    /// Returns the reason of the exception. It is never null, and valid until the reason changes or
+    /// this object is destroyed.
     virtual const char* getReason() const;
 
-    /// Position and reason in one text, `file(line): reason`. Lives as long as `getReason()`.
+    /// Returns position and reason in one text, `file(line): reason`, with the lifetime of
+    /// `getReason()`. Before a reason is set, the text is `file(line)`.
     virtual const char* getDetailedReason() const;
 
     virtual ~ExBase();
 
-    /// A copy on the heap, of the same dynamic type, which the caller deletes through the
-    /// `ExBase`; null when there is no memory for it.
+    /// Returns a heap copy of the same dynamic type, or null if memory runs out. The caller owns
+    /// the copy and deletes it through the `ExBase` pointer.
     virtual ExBase* clone() const = 0;
 
   protected:
     /// Replaces the reason by a copy of `reason`; null counts as empty.
+    ///
+    /// \throws std::bad_alloc  if memory runs out; the old reason stays
     void setReason(const char* reason);
 
   private:

@@ -1,12 +1,12 @@
-/// What makes writing a component library short. Header-only.
+/// Templates and a macro that keep the source of a component library short. Header-only.
 ///
-/// A component library is a handful of builders and one line that names them:
+/// A component library consists of a few builders and one line that lists them:
 ///
 ///     MZ_COMPONENT(L"Greetings", L"Says hello in several languages",
 ///                  Mz::Kit::builderOf<Greeter>({.uid = greeterUid, .name = L"greeter"}))
 ///
-/// The rest of this file writes out, once, what `componentImp.h` asks of a component library. A
-/// library that needs something else implements those interfaces by hand; both ways mix freely.
+/// This file implements the interfaces that `componentImp.h` requires of a component library. A
+/// library with other needs implements those interfaces by hand. It can combine both.
 #pragma once
 
 #include "components/componentManager/componentImp.h"
@@ -22,8 +22,8 @@
 
 namespace Mz::Kit {
 
-/// The identity of a builder, which is not nil: a builder with a constant identity whose four words
-/// are 0, or with none, does not compile.
+/// The identity of a builder, which is not nil. A builder with a constant identity of four zero
+/// words, or without one, does not compile.
 class BuilderUid {
   public:
     BuilderUid() = delete; // Each builder has an identity: set `.uid`.
@@ -46,19 +46,21 @@ class BuilderUid {
     QrUid value;
 };
 
-/// What a builder says of itself. The texts are kept as pointers, so they must live as long as the
-/// library; literals do.
+/// The description of one builder. The texts are stored as pointers, so they must stay valid until
+/// the library is unloaded. String literals do.
 struct BuilderInfo {
-    BuilderUid uid;             ///< the builder's identity; make a new one for each builder
-    const wchar_t* name = L"";  ///< by which importers find it
-    const wchar_t* label = L""; ///< for people; importers show it in file dialogs
-    const wchar_t* text = L"";  ///< a longer one
-    unsigned int number = 0;    ///< whatever you agree on with your clients
-    bool flag = false;          ///< likewise
+    BuilderUid uid;             ///< identity of the builder; generate a new one for each builder
+    const wchar_t* name = L"";  ///< name by which importers find the builder
+    const wchar_t* label = L""; ///< short text for people; importers show it in file dialogs
+    const wchar_t* text = L"";  ///< longer text for people
+    unsigned int number = 0;    ///< number whose meaning you agree on with your clients
+    bool flag = false;          ///< flag whose meaning you agree on with your clients
 };
 
-/// Adds to `Casts`, which gives a builder its casting and its lifetime, that it describes itself
-/// and stands for itself. What is left to write is `createObject`.
+/// The base of a builder that is its own description and its own builder.
+///
+/// `Casts` supplies casting and lifetime (see `castImpl.h`). The derived class implements
+/// `createObject`.
 template <class Casts>
 class SelfDescribing : public Casts {
   public:
@@ -71,7 +73,8 @@ class SelfDescribing : public Casts {
     const wchar_t* getText() const override { return info.text; }
     bool getFlag() const override { return info.flag; }
 
-    /// The manager takes these two from the library's description.
+    /// Returns an empty text, as `getComponentText` does. The manager takes both texts from the
+    /// description of the library.
     const wchar_t* getComponentLabel() const override { return L""; }
     const wchar_t* getComponentText() const override { return L""; }
 
@@ -82,10 +85,10 @@ class SelfDescribing : public Casts {
     BuilderInfo info;
 };
 
-/// The base of a builder, `Impl`, that also answers for `Ifaces`. What is left to write is
-/// `createObject` and the operations of `Ifaces`.
+/// The base of a counted builder, `Impl`, that also implements the interfaces `Ifaces`.
 ///
-/// Counted, so it stands on the heap.
+/// `Impl` implements `createObject` and the functions of `Ifaces`. Create it with
+/// `Mz::Kit::builder`: the release of the last reference deletes it.
 template <class Impl, class... Ifaces>
 class Builder
     : public SelfDescribing<QrCastRef<
@@ -95,10 +98,10 @@ class Builder
         QrCastMulti<Impl, QrBuilderDescription, QrComponentBuilder, Ifaces...>>>>::SelfDescribing;
 };
 
-/// A builder that makes each object with `new Object`. `Object` is counted (`QrCastRef`).
+/// A builder that creates each object with `new Object`. `Object` must be counted (`QrCastRef`).
 ///
-/// The builder is not: each object would pay for six references to it. It lives as long as its
-/// owner, the library's description.
+/// The builder itself is not counted: a count would cost six references to the builder for each
+/// object. The description of the library owns it.
 template <class Object>
 class ObjectBuilder final
     : public SelfDescribing<
@@ -107,11 +110,11 @@ class ObjectBuilder final
     using SelfDescribing<QrCastMulti<ObjectBuilder<Object>, QrComponentBuilder,
                                      QrBuilderDescription>>::SelfDescribing;
 
-    /// As the root's, which stand in another library.
+    /// Repeats the root's no-op here, to avoid a call into another library.
     long newReference() override { return 1; }
     long release() override { return 1; }
 
-    /// Nobody counts this reference, so nobody is asked for it.
+    /// Returns this builder. The reference is adopted, not taken: taking one is a no-op.
     QrRefPtr<QrComponentBuilder> getBuilder() override {
         return QrRefPtr<QrComponentBuilder>::adopt(this);
     }
@@ -121,17 +124,20 @@ class ObjectBuilder final
 
     QrRef<QrCastable> createObject() override {
         static_assert(!std::is_same_v<decltype(&Object::newReference), long (QrCastable::*)()>,
-                      "the object is counted (QrCastRef), or nobody would ever delete it");
-        return (new Object)->getCastable(); // The result takes the first reference.
+                      "the object is counted (QrCastRef): nothing else would delete it");
+        return (new Object)->getCastable(); // The returned `QrRef` takes the first reference.
     }
 };
 
-/// A builder that makes objects of foreign files. What is left to write is the two operations on a
-/// buffer, `canImport` and `import`.
+/// The base of a builder, `Impl`, that imports foreign files. `Impl` implements the buffer forms of
+/// `canImport` and `import`.
 template <class Impl>
 class ImportBuilder : public Builder<Impl, QrImportBuilder> {
   public:
-    /// `extensions` without dot or wildcard, kept as pointers like all texts.
+    /// Creates a builder that reads files with these extensions.
+    ///
+    /// \param fileExtensions  extensions without dot or wildcard (L"obj"). They are stored as
+    ///                        pointers, like all texts.
     ImportBuilder(const BuilderInfo& builderInfo,
                   std::initializer_list<const wchar_t*> fileExtensions)
         : Builder<Impl, QrImportBuilder>(builderInfo), extensions(fileExtensions) {}
@@ -146,15 +152,15 @@ class ImportBuilder : public Builder<Impl, QrImportBuilder> {
         return e.finished();
     }
 
-    /// There is no such object without a file.
+    /// Returns null: an object exists only as the result of an import.
     QrRef<QrCastable> createObject() override { return nullptr; }
 
   private:
     std::vector<const wchar_t*> extensions;
 };
 
-/// The end of a chain of casts (`QrCastImpl2`) for an object whose interface derives from another
-/// one, `Base`, for which it answers as well:
+/// The last link of a cast chain (`QrCastImpl2`), for an object whose interface derives from the
+/// interface `Base`. The object then supports `Base` too:
 ///
 ///     class MyImporter : public QrCastRef<QrCastHeap<QrCastImpl2<
 ///         MyImporter, IMyImporter, Kit::BaseInterface<MyImporter, QrImporter>>>>
@@ -169,24 +175,27 @@ class BaseInterface {
     static bool hasInterface(const Impl*, const QrUid& wanted) { return wanted == Base::uid; }
 };
 
-/// How a library's description owns a builder: by a reference if the builder counts, else alone.
+/// The handle through which a description owns a builder. It owns one reference to a counted
+/// builder, and is the only owner of an uncounted one.
 using OwnedBuilder = std::shared_ptr<QrBuilderDescription>;
 
-/// A new object of class `T`, which is counted and answers for `QrBuilderDescription`.
+/// Returns a new counted builder of class `T`, for `MZ_COMPONENT`.
+///
+/// \param args  arguments of the constructor of `T`
 template <class T, class... Args>
 OwnedBuilder builder(Args&&... args) {
     return OwnedBuilder(QrPtr<T>(new T(std::forward<Args>(args)...)).detach(),
                         [](T* counted) { counted->release(); });
 }
 
-/// A builder that makes objects of class `Object`.
+/// Returns a new builder of objects of class `Object`, for `MZ_COMPONENT`.
 template <class Object>
 OwnedBuilder builderOf(const BuilderInfo& info) {
     return std::make_shared<ObjectBuilder<Object>>(info);
 }
 
-/// What the library says of itself. Not counted: the entry point keeps one for all callers, from
-/// the first call until the library is unloaded.
+/// The description of the component library. It is not counted: the entry point returns the same
+/// object to all callers, from the first call until the library is unloaded.
 class Description final : public QrCastImpl<Description, QrComponentDescription> {
   public:
     using Builders = std::vector<OwnedBuilder>;
@@ -216,8 +225,8 @@ class Description final : public QrCastImpl<Description, QrComponentDescription>
         return e.finished();
     }
 
-    /// Releases all builders and the memory that they were kept in. The description stays usable
-    /// and has none from now on.
+    /// Releases all builders and frees the memory of the list. The description stays usable; it has
+    /// no builders afterwards.
     void dropBuilders() {
         uids = std::vector<QrUid>();
         const Builders dropped = std::exchange(builders, Builders());
@@ -227,17 +236,19 @@ class Description final : public QrCastImpl<Description, QrComponentDescription>
     const wchar_t* label;
     const wchar_t* text;
     Builders builders;
-    std::vector<QrUid> uids; ///< of the builders, each in its place
+    std::vector<QrUid> uids; ///< `uids[i]` is the uid of `builders[i]`
 };
 
-/// The place of a library's description, which is never destroyed: hosts may ask for it in the
-/// destructors of their static objects, and the library itself in its own. Static storage goes with
-/// the library; what the description owns elsewhere, its builders, `dropBuilders` frees.
+/// Static storage for the description of the library, which is never destroyed.
+///
+/// The destructors of static objects, of hosts and of the library itself, may still call the entry
+/// point. The storage itself disappears when the library is unloaded. The builders are on the heap;
+/// `dropBuilders` frees them.
 class StaticDescription {
   public:
     constexpr StaticDescription() = default;
 
-    /// Makes the description. To be called once.
+    /// Constructs the description and returns it. Must be called only once.
     Description* make(const wchar_t* label, const wchar_t* text, Description::Builders builders) {
         description = new (storage) Description(label, text, std::move(builders));
         return description;
@@ -255,9 +266,11 @@ class StaticDescription {
 
 } // namespace Mz::Kit
 
-/// Defines the entry point of this component library: `MZ_COMPONENT(label, text, builders...)`. The
-/// label and the text are shown to people; each builder is the result of `Mz::Kit::builderOf` or
-/// `Mz::Kit::builder`. Use it once in a library, outside all namespaces.
+/// Defines the entry point of this component library: `MZ_COMPONENT(label, text, builders...)`.
+///
+/// Use it once in a library, outside all namespaces. The label and the text are for people. They
+/// are stored as pointers and must stay valid until the library is unloaded. Each builder is the
+/// result of `Mz::Kit::builderOf` or `Mz::Kit::builder`.
 #define MZ_COMPONENT(label, text, ...)                                                             \
     static constinit Mz::Kit::StaticDescription mzComponentDescription;                            \
     static void mzDropComponentBuilders() {                                                        \

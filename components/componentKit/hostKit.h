@@ -1,4 +1,4 @@
-/// What makes writing a host short. Header-only.
+/// Functions that prepare names and search paths for the library. Header-only.
 ///
 ///     const auto plugins = Mz::Kit::programFolder() / "plugins";
 ///     QrGetComponentManager()->initialize(Mz::Kit::searchPath(plugins).c_str());
@@ -16,36 +16,41 @@
 
 namespace Mz::Kit {
 
-/// Returns `bytes` as wide text, converted as the library converts names: by the locale of the
-/// calling thread, and byte by byte in the locale "C", which every program starts in.
+/// Returns `bytes` as wide characters, converted as the library converts names: by the locale of the
+/// calling thread. In the locale "C", in which every program starts, and in "POSIX", each byte is
+/// one character.
 ///
-/// \throws std::system_error if the bytes are no text in this locale
+/// \throws std::system_error  if the bytes are not valid text in this locale
 inline std::wstring wideText(std::string_view bytes) {
     if (std::optional<std::wstring> text = toWide(bytes))
         return *std::move(text);
     throw std::system_error(std::make_error_code(std::errc::illegal_byte_sequence),
-                            "no text in this locale: " + std::string(bytes));
+                            "not valid text in this locale: " + std::string(bytes));
 }
 
-/// Returns `text`: where names are wide, nothing needs converting.
+/// Returns a copy of `text`, for platforms whose file names are wide already.
 inline std::wstring wideText(std::wstring_view text) {
     return std::wstring(text);
 }
 
-/// Returns the name of a file as the library's operations take it. `std::filesystem::path::wstring`
-/// is no substitute: on Linux it knows ASCII alone.
+/// Returns the name of a file in the wide characters that the library takes.
 ///
-/// \throws std::system_error if the name is no text in this locale
+/// Do not use `std::filesystem::path::wstring` for this: where file names are bytes, it converts
+/// ASCII only.
+///
+/// \throws std::system_error  if the name is not valid text in this locale
 inline std::wstring wideName(const std::filesystem::path& file) {
     return wideText(file.native());
 }
 
-/// Returns the search path that leads the component manager to this folder: its full name, without
-/// "." and "..", which the manager deliberately does not resolve. Join several with L";", which
-/// therefore cannot be part of a folder's name.
+/// Returns the search path for one folder: its full name, without "." and "..". The component
+/// manager deliberately does not resolve these.
 ///
-/// \throws std::system_error if the name is no text in this locale
-/// \throws std::filesystem::filesystem_error if `folder` is relative and the current folder is gone
+/// Join several search paths with L";". The name of a folder must therefore not contain a ";".
+///
+/// \throws std::system_error  if the name is not valid text in this locale
+/// \throws std::filesystem::filesystem_error  if `folder` is relative and the current folder is
+///     gone
 inline std::wstring searchPath(const std::filesystem::path& folder) {
     return wideName(fullPath(folder));
 }

@@ -1,3 +1,8 @@
+/// Implements the root of castable objects.
+///
+/// The root counts nothing, so that static, local and member objects need no counter. The casts are
+/// templates in the header; only the throw of the bad cast is compiled here, which keeps it out of
+/// each call.
 #include "components/componentManager/cast.h"
 
 namespace Mz {
@@ -13,7 +18,7 @@ long QrCastable::release() {
 QrCastable::~QrCastable() = default;
 
 void QrCastable::throwBadCast() {
-    // The position is part of what callers and logs rely on; it does not follow this file's lines.
+    // Callers and logs rely on this position. It does not change with the lines of this file.
     constexpr int reportedLine = 71;
     throw QrComponentManagerEx::ExBadCast("components/componentManager/cast", reportedLine);
 }

@@ -1,5 +1,5 @@
-/// The object model in one header: interface identities, castable objects, the references to them,
-/// the casts, the templates that implement all this, and the library's exceptions.
+/// The whole object model in one header: interface identities, castable objects, references, casts,
+/// the templates that implement them, and the exceptions.
 #pragma once
 
 #include "components/componentManager/castImpl.h"

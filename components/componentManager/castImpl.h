@@ -1,13 +1,13 @@
-/// The templates from which every concrete class takes its casting and counting.
+/// The templates that implement casts and reference counts for concrete classes.
 ///
-/// Pick by two questions, which interfaces and who owns the object:
+/// Choose by the interfaces of the class and by the owner of its objects:
 ///
 ///     class Gauge : public QrCastImpl<Gauge, IGauge>                            // static or local
 ///     class Mesh  : public QrCastRef<QrCastHeap<QrCastImpl<Mesh, IMesh>>>       // counted
 ///     class Both  : public QrCastRef<QrCastHeap<QrCastMulti<Both, IMesh, IShape>>>
 ///
-/// The parameter `Arg` of these templates is a tag that only keeps instances of different classes
-/// apart; leave it at its default.
+/// The parameter `Arg` is a tag that makes the instances of different classes different types.
+/// Leave it at its default.
 #pragma once
 
 #include "components/componentManager/castable.h"
@@ -20,26 +20,27 @@ namespace Mz {
 
 namespace detail {
 
-/// Takes one reference on `object`; `view` is an interface of the same object. The call is
+/// Takes one reference to `object`; `view` is an interface of the same object. The call is
 /// devirtualised if `Impl` is final, and omitted if `Impl` inherits the root's no-op.
 template <class Impl>
 void takeReference(Impl* object, QrCastable* view) {
-    using RootOperation = long (QrCastable::*)();
-    constexpr bool isRoots = std::is_final_v<Impl> && requires {
-        requires std::is_same_v<decltype(&Impl::newReference), RootOperation>;
+    using RootFunction = long (QrCastable::*)();
+    constexpr bool inheritsNoOp = std::is_final_v<Impl> && requires {
+        requires std::is_same_v<decltype(&Impl::newReference), RootFunction>;
     };
     if constexpr (!requires { object->newReference(); })
-        view->newReference(); // The class keeps its own private, or has others of that name.
-    else if constexpr (!isRoots)
+        view->newReference(); // `Impl` declares it private, or hides it by other overloads.
+    else if constexpr (!inheritsNoOp)
         object->newReference();
 }
 
 } // namespace detail
 
-/// An object that answers for one interface, is not counted and ignores `destroy`.
+/// The base of a class, `Impl`, that supports one interface. The object is uncounted and ignores
+/// `destroy`, unless `QrCastRef` and `QrCastHeap` are added.
 ///
-/// It answers for `Iface` only: not for `Impl`, nor for an interface that `Iface` derives from.
-/// Object and interface share one address.
+/// The object supports `Iface` only: neither the uid of `Impl` nor that of an interface from which
+/// `Iface` derives. Object and interface have the same address.
 template <class Impl, class Iface, class Arg = const Impl&>
 class QrCastImpl : public Iface {
   public:
@@ -72,9 +73,10 @@ class QrCastImpl : public Iface {
     static constexpr bool continuesChain = requires { typename Iface::CastChainLink; };
 };
 
-/// A link of a chain: answers for `Iface` and passes every other identifier on to `Next`, which has
-/// two static functions, `getInterface(Impl*, const QrUid&)` and
-/// `hasInterface(const Impl*, const QrUid&)`, with the meaning of those of `QrCastable`.
+/// A link of a cast chain: it supports `Iface` and passes every other uid to `Next`.
+///
+/// `Next` has two static functions, `getInterface(Impl*, const QrUid&)` and
+/// `hasInterface(const Impl*, const QrUid&)`. They follow the functions of `QrCastable`.
 template <class Impl, class Iface, class Next, class Arg = const Impl&>
 class QrCastHierarchy : public Iface {
   public:
@@ -94,16 +96,18 @@ class QrCastHierarchy : public Iface {
     }
 };
 
-/// An object that answers for one interface itself and leaves the others to `Next`.
+/// The base of a class, `Impl`, that supports one interface itself and leaves the others to `Next`.
 template <class Impl, class Iface, class Next, class Arg = const Impl&>
 class QrCastImpl2 : public QrCastImpl<Impl, QrCastHierarchy<Impl, Iface, Next, Arg>, Arg> {
   public:
     using QrCastImpl<Impl, QrCastHierarchy<Impl, Iface, Next, Arg>, Arg>::QrCastImpl;
 };
 
-/// The last link of a chain, for an interface that `Owner` shows through a separate companion
-/// object. Every request makes a new companion with `new Temp(owner)`, which lives as long as the
-/// reference handed out and keeps its owner referenced meanwhile; companions are not shared.
+/// The last link of a cast chain, for an interface that a separate companion object implements.
+///
+/// Every request creates a new companion with `new Temp(owner)` and returns a reference to it. The
+/// companion is counted: it lives as long as it is referenced, and owns a reference to its owner.
+/// Companions are never shared.
 template <class Owner, class Temp>
 class QrTempIface {
   public:
@@ -116,10 +120,11 @@ class QrTempIface {
     static bool hasInterface(const Owner*, const QrUid& wanted) { return wanted == Temp::uid; }
 };
 
-/// An object that answers for several interfaces at once. Each interface has an address of its own;
-/// the principal object is the first one's.
+/// The base of a class, `Impl`, that supports several interfaces. Each interface has a different
+/// address. The principal object is the first interface. The object is uncounted and ignores
+/// `destroy`, unless `QrCastRef` and `QrCastHeap` are added.
 ///
-/// A conversion of such an object to `QrCastable*` is ambiguous; write `object->getCastable()`.
+/// A conversion of such an object to `QrCastable*` is ambiguous. Write `object->getCastable()`.
 template <class Impl, class First, class... Rest>
 class QrCastMulti : public First, public Rest... {
   public:
@@ -140,7 +145,8 @@ class QrCastMulti : public First, public Rest... {
 
     void destroy() override {}
 
-    /// One body for the roots of all interfaces, so that a call through the object is unambiguous.
+    /// Overrides the functions of all root bases at once, so that a call through the object is not
+    /// ambiguous.
     long newReference() override { return First::newReference(); }
     long release() override { return First::release(); }
 
@@ -153,7 +159,7 @@ class QrCastMulti : public First, public Rest... {
     }
 };
 
-/// Adds to `Base` that `destroy` deletes the object, which therefore must stand on the heap.
+/// Adds to `Base` a `destroy` that deletes the object. Create such objects with `new`.
 template <class Base, class Arg = const Base&>
 class QrCastHeap : public Base {
   public:
@@ -161,11 +167,11 @@ class QrCastHeap : public Base {
     void destroy() override { delete this; }
 };
 
-/// Adds a reference counter to `Base`. A new object has no reference and belongs to whoever made
-/// it; the release of the last reference deletes it, so it must stand on the heap. A copy of a
-/// counted object starts without a reference of its own.
+/// Adds a reference count to `Base`.
 ///
-/// References may be taken and given back from any thread.
+/// A new object has no reference; its creator owns it until the first reference is taken. The
+/// release of the last reference deletes the object, so create it with `new`. A copy starts without
+/// references. Reference operations are thread-safe.
 template <class Base, class Arg = const Base&>
 class QrCastRef : public Base {
   public:
@@ -179,10 +185,10 @@ class QrCastRef : public Base {
 
     long newReference() override { return ++references; }
 
-    /// Not inlined: compilers that look through it warn of uses behind a deletion that the count
+    /// Not inlined: compilers that see the body warn about uses after the deletion, which the count
     /// rules out.
     [[gnu::noinline]] long release() override {
-        // The object, and the counter in it, may be gone when this function returns.
+        // The result is a local: the object and its counter may no longer exist at the return.
         const long left = --references;
         if (left < 0)
             delete this;
@@ -194,17 +200,21 @@ class QrCastRef : public Base {
     LkCounterWindows<long> references{-1};
 };
 
-/// A companion: a counted object that shows an interface on behalf of its owner, on which it holds
-/// a reference for as long as it lives.
+/// The base of a companion: a counted object that implements an interface for its owner. It owns a
+/// reference to the owner. `Base` supplies the interface and the reference count.
 ///
-/// It answers for its own interface itself and leaves every other question to the owner; the
-/// principal object is the owner's. `destroy` disposes of the companion, then asks the owner to
-/// dispose of itself, then gives the reference on the owner back: an owner whose `destroy` deletes
-/// it must not have companions that are destroyed so.
+/// The companion supports the uid of its own interface and passes all other uids to the owner.
+/// `hasInterface` returns the owner's result. The principal object is that of the owner.
+///
+/// `destroy` deletes the companion, then calls `destroy` of the owner, then releases the owner. Do
+/// not call it if the owner's `destroy` deletes the owner: the release would follow the deletion.
 template <class Owner, class Base>
 class QrTempObject : public Base {
   public:
-    /// Takes a reference on `owner`, which must not be null.
+    /// Takes a reference to `owner`.
+    ///
+    /// \param owner  owner of the companion; must not be null
+    /// \param args   arguments of the constructor of `Base`
     template <class... Args>
     explicit QrTempObject(Owner* owner, Args&&... args)
         : Base(std::forward<Args>(args)...), ownerReference(owner) {}
@@ -229,9 +239,9 @@ class QrTempObject : public Base {
     }
 
     void destroy() override {
-        const QrPtr<Owner> kept = ownerReference;
+        const QrPtr<Owner> ownerGuard = ownerReference; // Outlives the companion.
         delete this;
-        kept->destroy();
+        ownerGuard->destroy();
     }
 
   protected:

@@ -1,4 +1,4 @@
-/// The root of every object that crosses a library's border, and the casts between interfaces.
+/// The root interface of all objects that cross library boundaries, and the casts.
 #pragma once
 
 #include "components/componentManager/export.h"
@@ -11,55 +11,62 @@
 
 namespace Mz {
 
-/// The root interface: reference counting, and casting by interface identity.
+/// The root interface: reference counting, and casts by interface identity.
 ///
-/// Objects are never viewed with `dynamic_cast`; a client asks the object for an interface by its
-/// `QrUid` and is given a pointer that carries a reference. What concrete classes need for all this
-/// comes from the templates of `castImpl.h`.
+/// Do not use `dynamic_cast` on these objects. A client requests an interface by its `QrUid` and
+/// gets a pointer that carries a reference. Concrete classes derive the implementation from the
+/// templates of `castImpl.h`.
 ///
-/// The root itself counts nothing: an object that inherits its `newReference` and `release` lives
-/// as long as its storage (a static, a local, a member), whatever anybody does with references.
+/// The root does not count references. An object that inherits its `newReference` and `release` is
+/// uncounted: it lives as long as its storage (static, local or member), and references do not
+/// affect its lifetime.
 ///
-/// The order of the virtual operations is fixed for good; components built years apart meet here.
+/// The order of the virtual functions is ABI. Never reorder them or insert one.
 class MZ_COMPONENT_MANAGER_API QrCastable {
   public:
-    /// The principal object behind this interface: the object itself, or the owner of a companion.
-    /// No reference is taken; the result is never null.
+    /// Returns the principal object: this object, or the owner of this companion. The result is
+    /// never null. No reference is taken.
     virtual const QrCastable* getCastable() const = 0;
     virtual QrCastable* getCastable() = 0;
 
-    /// This object, or a companion of it, as the interface `uid`; null when it has none such.
-    /// A result carries one new reference, which the caller owns, and becomes the interface by
-    /// `static_cast`. Never throws for an identifier it does not know.
+    /// Returns this object, or a companion of it, as the interface `uid`. Prefer `safeCast` and
+    /// `queryCast`, which also consult the translators of the object.
+    ///
+    /// \return a pointer that `static_cast` converts to the interface, or null if the object does
+    ///         not support it. The caller owns one new reference. An unknown `uid` never throws.
     virtual QrCastable* getInterface(const QrUid& uid) = 0;
 
-    /// Whether `getInterface(uid)` would succeed. Takes no reference and creates nothing.
+    /// Returns whether `getInterface(uid)` would succeed. Takes no reference and creates nothing.
     virtual bool hasInterface(const QrUid& uid) const = 0;
 
-    /// Asks for the object to be disposed of. What that means is the concrete class's choice:
-    /// nothing, deletion, or deletion and the same request to an owner.
+    /// Requests the disposal of the object. The concrete class decides what happens: nothing, its
+    /// deletion, or its deletion and the same request to its owner.
     virtual void destroy() = 0;
 
-    /// Takes a reference. Counted objects return the number of references minus one, so 0 for the
-    /// first; the root returns 1 and counts nothing. Counted objects allow any thread.
+    /// Takes a reference. Thread-safe.
+    ///
+    /// \return for a counted object, the number of references minus one: 0 for the first. For an
+    ///         uncounted object 1; the call is a no-op then.
     virtual long newReference();
 
-    /// Gives a reference back. A counted object returns the number left minus one and is deleted
-    /// when that is negative; the root returns 1 and does nothing. Counted objects allow any
-    /// thread.
+    /// Releases a reference. The release of the last reference deletes a counted object.
+    /// Thread-safe.
+    ///
+    /// \return for a counted object, the number of remaining references minus one: -1 after the
+    ///         deletion. For an uncounted object 1; the call is a no-op then.
     virtual long release();
 
     virtual ~QrCastable();
 
   private:
-    /// Throws `QrComponentManagerEx::ExBadCast`.
+    /// Throws `QrComponentManagerEx::ExBadCast`; never returns.
     [[noreturn]] static void throwBadCast();
 
     template <class T>
     friend T* safeCast(QrCastable* object);
 };
 
-/// An interface that names itself, and so is what its `uid` says.
+/// An interface that declares its own `uid` and `Self`, and does not only inherit them.
 template <class T>
 concept QrInterface = std::is_same_v<T, typename T::Self> &&
     std::is_same_v<decltype(T::uid), const QrUid> && std::is_base_of_v<QrCastable, T>;
@@ -77,8 +84,10 @@ inline QrCastable* findInterface(QrCastable* object, const QrUid& uid) {
 
 } // namespace detail
 
-/// `object` as the interface `T`, or null: asks the object itself, then its translators. A null
-/// `object` gives null.
+/// Returns `object` as the interface `T`. Consults the object first, then its translators.
+///
+/// \param object  object to cast, or null
+/// \return the interface with a new reference, or null if `object` is null or has no such interface
 template <class T>
 QrPtr<T> queryCast(QrCastable* object) {
     static_assert(QrInterface<T>, "cast to an interface that has its own uid and Self");
@@ -87,15 +96,15 @@ QrPtr<T> queryCast(QrCastable* object) {
     return QrPtr<T>::adopt(static_cast<T*>(detail::findInterface(object, T::uid)));
 }
 
-/// `object` as the interface `T`: asks the object itself, then its translators.
+/// Returns `object` as the interface `T`. Consults the object first, then its translators.
 ///
-/// The result carries one reference, which the caller owns. Hand it over at once:
+/// The result is never null. The caller owns one reference; adopt it at once:
 ///
 ///     auto io = QrPtr<QrBufferedIO>::adopt(safeCast<QrBufferedIO>(object));   // right
 ///     QrPtr<QrBufferedIO> io(safeCast<QrBufferedIO>(object));                 // leaks one
 ///
-/// Throws `QrComponentManagerEx::ExBadCast` when `object` is null or has no such interface; no
-/// reference is held then.
+/// \throws QrComponentManagerEx::ExBadCast  if `object` is null or has no such interface. No
+///         reference stays taken.
 template <class T>
 T* safeCast(QrCastable* object) {
     static_assert(QrInterface<T>, "cast to an interface that has its own uid and Self");
@@ -107,22 +116,25 @@ T* safeCast(QrCastable* object) {
     return static_cast<T*>(found);
 }
 
-/// The same for objects that are at hand as const only; what was const stays so.
+/// Returns the const `object` as the const interface `T`, like the form for non-const objects.
 template <class T>
 const T* safeCast(const QrCastable* object) {
     return safeCast<T>(const_cast<QrCastable*>(object));
 }
 
+/// Returns the const `object` as the const interface `T`, like the form for non-const objects.
 template <class T>
 QrCPtr<T> queryCast(const QrCastable* object) {
     return queryCast<T>(const_cast<QrCastable*>(object));
 }
 
+/// Throws `QrComponentManagerEx::ExBadCast`, as for every null object; never returns.
 template <class T>
 T* safeCast(std::nullptr_t) {
     return safeCast<T>(static_cast<QrCastable*>(nullptr));
 }
 
+/// Returns null.
 template <class T>
 QrPtr<T> queryCast(std::nullptr_t) {
     return nullptr;

@@ -1,44 +1,50 @@
-/// Sequences that are handed out by calling back.
+/// Enumerators: callbacks that receive the elements of a sequence.
 ///
-/// An enumerating operation takes an enumerator by reference, offers it one element after the other
-/// and returns the action that ended the walk:
-/// 1. For each element in order, `process(element)`; a result other than `Continue` is returned at
-///    once, unchanged, and neither another element nor `finished` follows.
-/// 2. When the elements are used up, also when there were none, the result of `finished()`.
+/// An enumerating function takes an enumerator by reference and returns the action that ended the
+/// enumeration:
+/// 1. It calls `process(element)` for each element in order. If the result is not `Continue`, it
+///    returns that result unchanged, and calls neither `process` nor `finished` again.
+/// 2. After the last element, or if there are no elements, it returns the result of `finished()`.
 ///
-/// The enumerator belongs to the caller, usually on its stack; it is never kept beyond the call.
-/// Everything runs on the caller's thread, and exceptions of `process` pass through.
+/// The caller owns the enumerator, usually as a local. The enumerating function does not use it
+/// after the call. All callbacks run on the caller's thread, and their exceptions propagate.
 #pragma once
 
 #include "components/componentManager/export.h"
 
 namespace Mz {
 
-/// Gives enumerators their verdicts.
+/// Scope of `Action`, the result of an enumerator's callback.
 class QrEnum {
   public:
-    /// What a callback wants to happen. Only zero or not zero matters to whoever enumerates; any
-    /// 32-bit value is passed on unchanged.
+    /// The result of a callback. The enumerating function only distinguishes zero and non-zero. It
+    /// returns any 32-bit value unchanged.
     enum Action : int {
-        Continue = 0, ///< go on with the next element
-        Stop = 1,     ///< found what was wanted: stop, and report success
-        Fail = 2      ///< stop: no further element can mend it
+        Continue = 0, ///< continue with the next element
+        Stop = 1,     ///< stop with success
+        Fail = 2      ///< stop with a failure that further elements cannot repair
     };
 
   protected:
     ~QrEnum() = default;
 };
 
-/// The callback of an enumeration over `T`.
+/// The callback interface of an enumeration over elements of type `T`.
 template <class T>
 class MZ_SHARED_TYPE QrEnumerator : public virtual QrEnum {
   public:
     virtual ~QrEnumerator() = default;
 
-    /// Called once for each element, in order. References among the elements belong to the callee.
+    /// Receives one element. Called once for each element, in order.
+    ///
+    /// \param element  the element; if it is a smart reference, the callee owns it and may keep it
+    /// \return `Continue` for the next element, any other value to end the enumeration
     virtual Action process(T element) = 0;
 
-    /// Called once when the sequence ran out without a callback stopping it.
+    /// Called once after the last element, unless `process` ended the enumeration. The default
+    /// returns `Continue`.
+    ///
+    /// \return the result of the whole enumeration
     virtual Action finished() { return Continue; }
 
   private:

@@ -1,3 +1,8 @@
+/// Sets the fixed reasons of the exceptions.
+///
+/// Every constructor, copy constructor and destructor is defined here, not inline: the type
+/// information and the virtual tables then exist once, in this library, so that an exception can be
+/// caught in any other.
 #include "components/componentManager/exceptions.h"
 
 #include <string>
@@ -6,14 +11,14 @@ namespace Mz {
 
 namespace {
 
-/// `name`, then ": " and `reason`.
-std::string named(const char* name, const char* reason) {
+/// Returns `name`, then ": " and `reason`.
+std::string withName(const char* name, const char* reason) {
     return std::string(name ? name : "") + ": " + reason;
 }
 
-/// The same with a second text on a line of its own, for which `reason` has no full stop.
-std::string named(const char* name, const char* reason, const char* name2) {
-    return named(name, reason) + "\n" + (name2 ? name2 : "");
+/// Returns the same text and a second line, `name2`. The `reason` of this form has no full stop.
+std::string withName(const char* name, const char* reason, const char* name2) {
+    return withName(name, reason) + "\n" + (name2 ? name2 : "");
 }
 
 } // namespace
@@ -46,7 +51,7 @@ QrStreamEx::ExReadError::ExReadError(const char* file, int line) : QrConcreteExc
 }
 QrStreamEx::ExReadError::ExReadError(const char* file, int line, const char* name)
     : QrConcreteException(file, line) {
-    setReason(named(name, "Error reading stream.").c_str());
+    setReason(withName(name, "Error reading stream.").c_str());
 }
 QrStreamEx::ExReadError::ExReadError(const ExReadError& other) = default;
 QrStreamEx::ExReadError::~ExReadError() = default;
@@ -57,7 +62,7 @@ QrStreamEx::ExReadObject::ExReadObject(const char* file, int line)
 }
 QrStreamEx::ExReadObject::ExReadObject(const char* file, int line, const char* name)
     : QrConcreteException(file, line) {
-    setReason(named(name, "Error loading object.").c_str());
+    setReason(withName(name, "Error loading object.").c_str());
 }
 QrStreamEx::ExReadObject::ExReadObject(const ExReadObject& other) = default;
 QrStreamEx::ExReadObject::~ExReadObject() = default;
@@ -74,11 +79,11 @@ QrStreamEx::ExReadOpen::ExReadOpen(const char* file, int line) : QrConcreteExcep
 }
 QrStreamEx::ExReadOpen::ExReadOpen(const char* file, int line, const char* name)
     : QrConcreteException(file, line) {
-    setReason(named(name, "Error opening input stream.").c_str());
+    setReason(withName(name, "Error opening input stream.").c_str());
 }
 QrStreamEx::ExReadOpen::ExReadOpen(const char* file, int line, const char* name, const char* name2)
     : QrConcreteException(file, line) {
-    setReason(named(name, "Error opening input stream", name2).c_str());
+    setReason(withName(name, "Error opening input stream", name2).c_str());
 }
 QrStreamEx::ExReadOpen::ExReadOpen(const ExReadOpen& other) = default;
 QrStreamEx::ExReadOpen::~ExReadOpen() = default;
@@ -95,7 +100,7 @@ QrStreamEx::ExWriteError::ExWriteError(const char* file, int line)
 }
 QrStreamEx::ExWriteError::ExWriteError(const char* file, int line, const char* name)
     : QrConcreteException(file, line) {
-    setReason(named(name, "Error writing stream.").c_str());
+    setReason(withName(name, "Error writing stream.").c_str());
 }
 QrStreamEx::ExWriteError::ExWriteError(const ExWriteError& other) = default;
 QrStreamEx::ExWriteError::~ExWriteError() = default;
@@ -106,7 +111,7 @@ QrStreamEx::ExWriteObject::ExWriteObject(const char* file, int line)
 }
 QrStreamEx::ExWriteObject::ExWriteObject(const char* file, int line, const char* name)
     : QrConcreteException(file, line) {
-    setReason(named(name, "Error storing object.").c_str());
+    setReason(withName(name, "Error storing object.").c_str());
 }
 QrStreamEx::ExWriteObject::ExWriteObject(const ExWriteObject& other) = default;
 QrStreamEx::ExWriteObject::~ExWriteObject() = default;
@@ -123,12 +128,12 @@ QrStreamEx::ExWriteOpen::ExWriteOpen(const char* file, int line) : QrConcreteExc
 }
 QrStreamEx::ExWriteOpen::ExWriteOpen(const char* file, int line, const char* name)
     : QrConcreteException(file, line) {
-    setReason(named(name, "Error opening output stream.").c_str());
+    setReason(withName(name, "Error opening output stream.").c_str());
 }
 QrStreamEx::ExWriteOpen::ExWriteOpen(const char* file, int line, const char* name,
                                      const char* name2)
     : QrConcreteException(file, line) {
-    setReason(named(name, "Error opening output stream", name2).c_str());
+    setReason(withName(name, "Error opening output stream", name2).c_str());
 }
 QrStreamEx::ExWriteOpen::ExWriteOpen(const ExWriteOpen& other) = default;
 QrStreamEx::ExWriteOpen::~ExWriteOpen() = default;

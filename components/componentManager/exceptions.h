@@ -1,15 +1,16 @@
 /// The exceptions of the library.
 ///
-/// Every failure that the library reports is thrown by value and is at once a `std::runtime_error`,
-/// for handlers that know nothing of this library, and an `ExBase`, which knows the source position
-/// and the reason. Catch a concrete class, a whole family (`QrStreamEx`, `QrComponentManagerEx`),
-/// or `std::exception`. All can be caught in another library than the one that threw.
+/// All exceptions are thrown by value. Each is both a `std::runtime_error`, for generic handlers,
+/// and an `ExBase`, which holds the source position and the reason. Catch a concrete class, a whole
+/// family (`QrStreamEx`, `QrComponentManagerEx`), or `std::exception`. An exception can be caught
+/// in a different library than the one that threw it.
 ///
-/// The reasons are fixed texts. A constructor with a `name` (a file or object name, usually) puts
-/// the name in front of it, exactly as given; a null name counts as empty. Names and second texts
-/// are UTF-8 on every platform, whatever the locale: `utf8Name` (`nativeText.h`) gives the name of
-/// a file in that form, and `displayText` makes a reason readable. Constructors may throw
-/// `std::bad_alloc`; `clone()` answers a lack of memory with null.
+/// Each class has a fixed reason, which opens the comment of the class. A constructor with a
+/// `name`, usually the name of a file or an object, puts `name` and ": " before the reason. The
+/// name is used unchanged; null counts as empty. Names and second texts are UTF-8 on every
+/// platform, whatever the locale: `utf8Name` (`nativeText.h`) returns the name of a file in that
+/// form, and `displayText` makes a reason readable. Constructors throw `std::bad_alloc` if memory
+/// runs out; `clone()` returns null.
 #pragma once
 
 #include "components/base/exBase.h"
@@ -20,8 +21,10 @@
 
 namespace Mz {
 
-/// What all concrete exceptions share: `Self` is the exception, `Scope` its family. The message of
-/// the `std::runtime_error` stays empty; `what()` gives the reason.
+/// The base of all concrete exceptions: `Self` is the exception, `Scope` its family.
+///
+/// `what()` returns the reason of the `ExBase` part. The message of the `std::runtime_error` part
+/// is always empty.
 template <class Self, class Scope>
 class MZ_SHARED_TYPE QrConcreteException : public std::runtime_error, public Scope {
   public:
@@ -42,7 +45,7 @@ class MZ_SHARED_TYPE QrConcreteException : public std::runtime_error, public Sco
     ~QrConcreteException() override = default;
 };
 
-/// The failures of streams and of the buffers under them.
+/// The family of the exceptions of streams and of buffered IO.
 class MZ_COMPONENT_MANAGER_API QrStreamEx : public ExBase {
   public:
     QrStreamEx(const char* file, int line);
@@ -63,7 +66,7 @@ class MZ_COMPONENT_MANAGER_API QrStreamEx : public ExBase {
     class ExWriteOpen;
 };
 
-/// The failures of the component manager and of casting.
+/// The family of the exceptions of the component manager and of casts.
 class MZ_COMPONENT_MANAGER_API QrComponentManagerEx : public ExBase {
   public:
     QrComponentManagerEx(const char* file, int line);
@@ -74,8 +77,8 @@ class MZ_COMPONENT_MANAGER_API QrComponentManagerEx : public ExBase {
     class ExBadCast;
 };
 
-/// "Bad swap bytes size.": no operation of this library raises it; it is there for streams of
-/// others that reverse values of a width chosen at run time.
+/// "Bad swap bytes size.": a value of an unsupported width was to be reversed. This library does
+/// not throw it; it is for foreign streams that reverse values of a width chosen at run time.
 class MZ_COMPONENT_MANAGER_API QrStreamEx::ExBadSwapSize
     : public QrConcreteException<QrStreamEx::ExBadSwapSize, QrStreamEx> {
   public:
@@ -84,7 +87,7 @@ class MZ_COMPONENT_MANAGER_API QrStreamEx::ExBadSwapSize
     ~ExBadSwapSize() override;
 };
 
-/// "Read on output stream.": an operation that reads was called on something that only writes.
+/// "Read on output stream.": a reading function was called on an object that only writes.
 class MZ_COMPONENT_MANAGER_API QrStreamEx::ExRead
     : public QrConcreteException<QrStreamEx::ExRead, QrStreamEx> {
   public:
@@ -93,7 +96,7 @@ class MZ_COMPONENT_MANAGER_API QrStreamEx::ExRead
     ~ExRead() override;
 };
 
-/// "Error reading stream.": the input failed, ended inside a value or does not make sense.
+/// "Error reading stream.": the input failed, ended inside a value, or is invalid.
 class MZ_COMPONENT_MANAGER_API QrStreamEx::ExReadError
     : public QrConcreteException<QrStreamEx::ExReadError, QrStreamEx> {
   public:
@@ -103,7 +106,7 @@ class MZ_COMPONENT_MANAGER_API QrStreamEx::ExReadError
     ~ExReadError() override;
 };
 
-/// "Error loading object.": an object's data could not be read.
+/// "Error loading object.": the data of an object could not be read.
 class MZ_COMPONENT_MANAGER_API QrStreamEx::ExReadObject
     : public QrConcreteException<QrStreamEx::ExReadObject, QrStreamEx> {
   public:
@@ -113,7 +116,7 @@ class MZ_COMPONENT_MANAGER_API QrStreamEx::ExReadObject
     ~ExReadObject() override;
 };
 
-/// "readObject not implemented.": the buffer does not know how objects are stored.
+/// "readObject not implemented.": the buffered IO does not support objects.
 class MZ_COMPONENT_MANAGER_API QrStreamEx::ExReadObjectImp
     : public QrConcreteException<QrStreamEx::ExReadObjectImp, QrStreamEx> {
   public:
@@ -122,8 +125,10 @@ class MZ_COMPONENT_MANAGER_API QrStreamEx::ExReadObjectImp
     ~ExReadObjectImp() override;
 };
 
-/// "Error opening input stream.": with two names, the second stands on a line of its own behind the
-/// first ("name: Error opening input stream", a line feed, then `name2`).
+/// "Error opening input stream.": an input could not be opened.
+///
+/// With two names, the reason has two lines: "name: Error opening input stream" without a full
+/// stop, then `name2`.
 class MZ_COMPONENT_MANAGER_API QrStreamEx::ExReadOpen
     : public QrConcreteException<QrStreamEx::ExReadOpen, QrStreamEx> {
   public:
@@ -134,7 +139,7 @@ class MZ_COMPONENT_MANAGER_API QrStreamEx::ExReadOpen
     ~ExReadOpen() override;
 };
 
-/// "Write on input stream.": an operation that writes was called on something that only reads.
+/// "Write on input stream.": a writing function was called on an object that only reads.
 class MZ_COMPONENT_MANAGER_API QrStreamEx::ExWrite
     : public QrConcreteException<QrStreamEx::ExWrite, QrStreamEx> {
   public:
@@ -143,7 +148,7 @@ class MZ_COMPONENT_MANAGER_API QrStreamEx::ExWrite
     ~ExWrite() override;
 };
 
-/// "Error writing stream.": the output failed, or a value has no form in which it can be written.
+/// "Error writing stream.": the output failed, or a value cannot be represented in the format.
 class MZ_COMPONENT_MANAGER_API QrStreamEx::ExWriteError
     : public QrConcreteException<QrStreamEx::ExWriteError, QrStreamEx> {
   public:
@@ -163,7 +168,7 @@ class MZ_COMPONENT_MANAGER_API QrStreamEx::ExWriteObject
     ~ExWriteObject() override;
 };
 
-/// "writeObject not implemented.": the buffer does not know how objects are stored.
+/// "writeObject not implemented.": the buffered IO does not support objects.
 class MZ_COMPONENT_MANAGER_API QrStreamEx::ExWriteObjectImp
     : public QrConcreteException<QrStreamEx::ExWriteObjectImp, QrStreamEx> {
   public:
@@ -172,7 +177,8 @@ class MZ_COMPONENT_MANAGER_API QrStreamEx::ExWriteObjectImp
     ~ExWriteObjectImp() override;
 };
 
-/// "Error opening output stream.": its two-name form is as that of `ExReadOpen`.
+/// "Error opening output stream.": an output could not be opened. With two names, the reason has
+/// two lines, like that of `ExReadOpen`.
 class MZ_COMPONENT_MANAGER_API QrStreamEx::ExWriteOpen
     : public QrConcreteException<QrStreamEx::ExWriteOpen, QrStreamEx> {
   public:
@@ -183,7 +189,7 @@ class MZ_COMPONENT_MANAGER_API QrStreamEx::ExWriteOpen
     ~ExWriteOpen() override;
 };
 
-/// "Bad cast in QrCastable::safeCast": an object lacks an interface that is required.
+/// "Bad cast in QrCastable::safeCast": an object is null or lacks a required interface.
 class MZ_COMPONENT_MANAGER_API QrComponentManagerEx::ExBadCast
     : public QrConcreteException<QrComponentManagerEx::ExBadCast, QrComponentManagerEx> {
   public:

@@ -1,4 +1,4 @@
-/// Export macros of libMZcomponentManager.
+/// The export macro of libMZcomponentManager.
 #pragma once
 
 #include "components/base/export.h"

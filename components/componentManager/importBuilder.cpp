@@ -1,3 +1,7 @@
+/// Implements the file forms of `canImport` and `import` by the buffer forms.
+///
+/// File stream and buffer are locals, so that the file is closed on every return and exception. An
+/// object that kept the buffer would therefore hold a dangling pointer.
 #include "components/componentManager/importBuilder.h"
 
 #include "components/componentManager/importing/inputFile.h"

@@ -1,4 +1,4 @@
-/// Builders that turn a foreign file into an object.
+/// Import builders: builders that read a foreign file into an object.
 #pragma once
 
 #include "components/componentManager/bufferio.h"
@@ -7,18 +7,21 @@
 
 namespace Mz {
 
-/// A builder that can read one kind of foreign file.
+/// A builder that reads one kind of foreign file.
 ///
-/// It is a component builder like any other, registered under its importer's builder name, that
-/// answers this interface too. Its object therefore answers for `QrComponentBuilder`,
-/// `QrImportBuilder` and `QrBuilderDescription`; `QrCastMulti` makes such objects, and the
-/// component kit makes them short.
+/// It is a component builder that also supports this interface, and is registered under the builder
+/// name of its importer. Its object therefore supports `QrComponentBuilder`, `QrImportBuilder` and
+/// `QrBuilderDescription`. `QrCastMulti` implements such objects; `Mz::Kit::ImportBuilder` of the
+/// component kit is the shortest way.
 ///
-/// In every operation, `path` is the file's name as the caller gave it, which need not be the name
-/// under which the file was found, and `hint` is a second text that this library passes on unread.
+/// In all functions, `path` is the name that the caller passed, not necessarily the name under
+/// which the file was found. `hint` is a second text, which this library passes on without
+/// interpretation.
 ///
-/// A class that overrides one form of `canImport` or `import` hides the other; it says
-/// `using QrImportBuilder::canImport; using QrImportBuilder::import;`.
+/// A class that overrides one form of `canImport` or `import` hides the other. Declare in it:
+///
+///     using QrImportBuilder::canImport;
+///     using QrImportBuilder::import;
 class MZ_COMPONENT_MANAGER_API QrImportBuilder : public QrCastable {
   public:
     using Self = QrImportBuilder;
@@ -26,27 +29,41 @@ class MZ_COMPONENT_MANAGER_API QrImportBuilder : public QrCastable {
 
     ~QrImportBuilder() override;
 
-    /// Offers every file extension that this builder reads, without dot or wildcard ("obj"), and
-    /// returns the enumeration's result.
+    /// Passes every file extension that this builder reads to `e`, without dot or wildcard
+    /// (L"obj").
+    ///
+    /// \return the result of the enumeration (see `enumerator.h`)
     virtual QrEnum::Action enumerateExtensions(QrEnumerator<const wchar_t*>& e) const = 0;
 
-    /// Whether this builder can import the data of `io`, which stands where the data begins. It may
-    /// read as it likes; the caller restores the position.
+    /// Returns whether this builder can import the data of `io`. The function may read; the caller
+    /// restores the position.
+    ///
+    /// \param io  input, positioned at the start of the data; not null
     virtual bool canImport(QrPtr<QrBufferedIO> io, const wchar_t* path,
                            const wchar_t* hint) const = 0;
 
-    /// The same for a file, which is opened for the call, with nothing denied to other openers. A
-    /// null or empty `path` or a file that cannot be opened gives false. Exceptions of the other
-    /// form pass through, the file closed.
+    /// Returns whether this builder can import the file `path`. Opens the file, without denying any
+    /// access to other openers, calls the buffer form, and closes the file.
+    ///
+    /// \param path  name of the file, relative to the current directory; may be null or empty
+    /// \return false also if `path` is null or empty, or if the file cannot be opened
+    /// \throws only what the buffer form throws; the file is closed first
     virtual bool canImport(const wchar_t* path, const wchar_t* hint) const;
 
-    /// Reads the data of `io` and returns the object made of it, or null when it cannot: a builder
-    /// tells why through the process controller. The object must not keep `io`.
+    /// Returns the object that the data of `io` describes, or null if the data cannot be imported.
+    /// The builder reports the reason to the process controller.
+    ///
+    /// \param io  input, positioned at the start of the data; not null. It may be destroyed after
+    ///            the call, so the object must not keep it.
     virtual QrRef<QrCastable> import(QrPtr<QrBufferedIO> io, const wchar_t* path,
                                      const wchar_t* hint) const = 0;
 
-    /// The same for a file, with null where `canImport` gives false. The file is closed before the
-    /// result is returned.
+    /// Returns the object that the file `path` describes. Opens the file as `canImport` does, calls
+    /// the buffer form, and closes the file before it returns.
+    ///
+    /// \param path  name of the file, relative to the current directory; may be null or empty
+    /// \return null also if `path` is null or empty, or if the file cannot be opened
+    /// \throws only what the buffer form throws; the file is closed first
     virtual QrRef<QrCastable> import(const wchar_t* path, const wchar_t* hint) const;
 };
 

@@ -1,3 +1,8 @@
+/// Implements the base importer by three enumerators of the component manager's builders.
+///
+/// The enumerators share a base that selects the import builders of one builder name. Selection and
+/// use happen in one enumeration, without a list of candidates: a builder's library is loaded only
+/// when the enumeration reaches it, and no library after the deciding one is loaded.
 #include "components/componentManager/importer.h"
 
 #include "components/componentManager/componentImp.h"
@@ -26,7 +31,7 @@ QrPtr<QrComponentManager> componentManager() {
     return QrPtr<QrComponentManager>::adopt(safeCast<QrComponentManager>(QrGetComponentManager()));
 }
 
-/// Picks the import builders of one importer from all the builders of the manager.
+/// Selects the import builders of one importer from all builders of the manager.
 class BaseImportEnumerator : public QrEnumerator<const QrImportBuilder*>,
                              public QrEnumerator<QrCPtr<QrBuilderDescription>> {
   public:
@@ -50,6 +55,7 @@ class BaseImportEnumerator : public QrEnumerator<const QrImportBuilder*>,
     std::wstring builderName;
 };
 
+/// Passes the import builders to the enumerator of the caller.
 class ObjectEnumerator final : public BaseImportEnumerator {
   public:
     ObjectEnumerator(const wchar_t* builderName, QrEnumerator<QrCPtr<QrImportBuilder>>& caller)
@@ -63,6 +69,7 @@ class ObjectEnumerator final : public BaseImportEnumerator {
     QrEnumerator<QrCPtr<QrImportBuilder>>& caller;
 };
 
+/// Appends one entry per import builder to the filter text.
 class FiletypesEnumerator final : public BaseImportEnumerator {
   public:
     FiletypesEnumerator(const wchar_t* builderName, std::wstring& fileTypes)
@@ -98,6 +105,7 @@ class FiletypesEnumerator final : public BaseImportEnumerator {
     std::wstring& fileTypes;
 };
 
+/// Imports the data through the first import builder that accepts it.
 class ImportEnumerator final : public BaseImportEnumerator {
   public:
     ImportEnumerator(const wchar_t* builderName, QrBufferedIO& io, const wchar_t* path,
@@ -117,7 +125,7 @@ class ImportEnumerator final : public BaseImportEnumerator {
         if (position == -1)
             return Fail;
         const bool accepted = builder->canImport(&io, path.c_str(), hint.c_str());
-        returnTo(position);
+        restorePosition(position);
         if (!accepted)
             return Continue;
         object = builder->import(&io, path.c_str(), hint.c_str());
@@ -138,22 +146,22 @@ class ImportEnumerator final : public BaseImportEnumerator {
         std::wstring wanted;
     };
 
-    /// All after the last dot, wherever that is.
+    /// Returns the text after the last dot, even if that dot is part of a directory name.
     std::wstring extensionOfPath() const {
         const std::size_t dot = path.find_last_of(L'.');
         return dot == std::wstring::npos ? std::wstring() : path.substr(dot + 1);
     }
 
-    void returnTo(int64 position) {
-        if (seeks(position))
+    void restorePosition(int64 position) {
+        if (trySeek(position))
             return;
-        // A block read that met the end of input leaves a state in which nothing can be sought;
-        // reading a single byte ends that state.
+        // A block read that reached the end of input leaves the IO in a state in which every seek
+        // fails. Reading a single byte ends that state.
         io.read();
         io.seek(position, 0);
     }
 
-    bool seeks(int64 position) {
+    bool trySeek(int64 position) {
         try {
             return io.seek(position, 0) != -1;
         } catch (const QrStreamEx::ExReadError&) {
@@ -185,7 +193,7 @@ QrEnum::Action QrBaseImporter::enumerateObjects(QrEnumerator<QrCPtr<QrImportBuil
 
 const wchar_t* QrBaseImporter::getFileTypes() const {
     if (fileTypes.empty()) {
-        // Only a complete text is kept: what throws here leaves nothing behind.
+        // Composes a local text: if a builder throws, the cache stays empty.
         std::wstring text;
         FiletypesEnumerator builders(getBuilderName(), text);
         componentManager()->enumerateBuilders(builders);

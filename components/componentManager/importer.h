@@ -1,4 +1,4 @@
-/// Importing a file through whichever builder can read it.
+/// Importers, which find the builder that can read a file.
 #pragma once
 
 #include "components/componentManager/export.h"
@@ -8,7 +8,7 @@
 
 namespace Mz {
 
-/// One kind of import: a family of foreign file formats, read by the import builders that are
+/// The import of one family of foreign file formats. The import builders of the family are
 /// registered under one builder name.
 class MZ_COMPONENT_MANAGER_API QrImporter : public QrCastable {
   public:
@@ -17,29 +17,38 @@ class MZ_COMPONENT_MANAGER_API QrImporter : public QrCastable {
 
     ~QrImporter() override;
 
-    /// The name that the family's builders carry, compared with `QrBuilderDescription::getName()`
-    /// exactly. Never null, and valid as long as the importer.
+    /// Returns the builder name of the family. It is compared with
+    /// `QrBuilderDescription::getName()`, case-sensitively. It is never null, and valid as long as
+    /// the importer.
     virtual const wchar_t* getBuilderName() const = 0;
 
-    /// Imports the file `path`, looked for along `search` (directories separated by ';', or null).
-    /// `found` tells a file that does not exist (false) from one that nobody could read (true, with
-    /// a null result). This base sets it to true and leaves all else to the other form.
+    /// Returns the object that the file `path` describes, and reports whether the file was found.
+    /// The implementation here sets `found` to true and calls the other form.
+    ///
+    /// \param path    name of the file
+    /// \param search  directories to search, separated by ';', or null
+    /// \param found   false if the file does not exist. True with a null result means that the file
+    ///                could not be imported.
+    /// \return the object, or null
     virtual QrRef<QrCastable> import(const wchar_t* path, const wchar_t* search, bool& found) const;
 
-    /// The same for callers who need not know.
+    /// Returns the object that the file `path` describes, or null.
+    ///
+    /// \param path    name of the file
+    /// \param search  directories to search, separated by ';', or null
     virtual QrRef<QrCastable> import(const wchar_t* path, const wchar_t* search) const = 0;
 
   private:
     virtual void forceVtblInstantiation();
 };
 
-/// The importer that does it all, but for the builder name: a concrete importer derives from it in
-/// a component library and supplies that name.
+/// The base of importers. A concrete importer derives from it in a component library and implements
+/// only `getBuilderName`.
 ///
-/// Builders are those of the process's component manager at the time of the call, in its order. The
-/// file is looked for by the calling thread's process controller. Every operation throws
-/// `QrComponentManagerEx::ExBadCast` when one of the two is missing, and lets the exceptions of
-/// builders and buffers through, with the file closed.
+/// The functions use the builders that the component manager of the process has at the time of the
+/// call, in its order. The process controller of the calling thread finds files. If a function
+/// needs one of the two and it is missing, it throws `QrComponentManagerEx::ExBadCast`. The
+/// exceptions of builders and buffers propagate; the file is closed first.
 class MZ_COMPONENT_MANAGER_API QrBaseImporter : public QrImporter {
   public:
     QrBaseImporter();
@@ -49,34 +58,53 @@ class MZ_COMPONENT_MANAGER_API QrBaseImporter : public QrImporter {
 
     using QrImporter::import;
 
-    /// Offers every import builder of this importer to `e`, loading their libraries as needed.
+    /// Passes every import builder of this importer to `e`. Loads their libraries as needed.
+    ///
+    /// \return the result of the enumeration (see `enumerator.h`)
+    /// \throws QrComponentManagerEx::ExBadCast  if there is no component manager
     virtual QrEnum::Action enumerateObjects(QrEnumerator<QrCPtr<QrImportBuilder>>& e) const;
 
-    /// The text for a file dialog's filter: for each builder its label, "|", its extensions as
-    /// "*.a;*.b", "|"; at the end a NUL beside the string's own. With no builder only those two.
+    /// Returns the filter text for a file dialog. It consists, for each builder, of the label, "|",
+    /// the extensions as "*.a;*.b", and "|". An additional NUL precedes the terminator of the
+    /// string. Without builders, the text consists of these two characters.
     ///
-    /// It is made once for each importer object, from the builders known then, and valid for the
-    /// importer's life. The first call must not meet another one on the same importer.
+    /// The first call composes the text from the builders known then; later calls return the same
+    /// text. It is valid until the importer is destroyed or assigned to.
+    ///
+    /// Threads: the first call must not run concurrently with another call on the same importer.
+    ///
+    /// \throws QrComponentManagerEx::ExBadCast  if there is no component manager
     virtual const wchar_t* getFileTypes() const;
 
-    /// Finds the file along `search`, then along `getDefaultSearch()`, and imports it.
+    /// Returns the object that the file `path` describes, or null. The process controller searches
+    /// `search`, then `getDefaultSearch()`.
+    ///
+    /// \throws QrComponentManagerEx::ExBadCast  if there is no process controller or no component
+    ///         manager
     QrRef<QrCastable> import(const wchar_t* path, const wchar_t* search,
                              bool& found) const override;
     QrRef<QrCastable> import(const wchar_t* path, const wchar_t* search) const override;
 
-    /// Imports the data of `io`, which must be able to tell and restore its position.
+    /// Returns the object that the data of `io` describes, or null.
     ///
-    /// First the builders that list the extension of `path` (all after its last '.', compared
-    /// exactly) are asked in order whether they can import the data, then all of them; the first
-    /// that says yes decides, be its object null. A null `path` skips the first round; with a null
-    /// `path`, `search` must be null too.
+    /// The first pass calls `canImport`, in order, of the builders that list the extension of
+    /// `path` (the text after its last '.', compared case-sensitively). The second pass calls it of
+    /// all builders. The first builder that returns true imports the data, and its result is final,
+    /// even if it is null. The search also ends with null if `io` cannot report its position, or if
+    /// `enumerateExtensions` of a builder returns `Fail`.
     ///
-    /// Builders are given `path` as both their texts; the second one is empty when `search` is
-    /// null. `search` itself does not reach them.
+    /// Builders receive `path` as their `path`, and again as their `hint`. The `hint` is empty if
+    /// `search` is null. `search` itself is not passed to them.
+    ///
+    /// \param io      input whose position can be queried and restored; must not be null
+    /// \param path    name of the data; null omits the first pass
+    /// \param search  search path or null; must be null if `path` is null
+    /// \throws QrComponentManagerEx::ExBadCast  if `io` is null or there is no component manager
     virtual QrRef<QrCastable> import(QrPtr<QrBufferedIO> io, const wchar_t* path,
                                      const wchar_t* search) const;
 
-    /// Directories, separated by ';', that are searched after the caller's; null for none.
+    /// Returns the directories to search after those of the caller, separated by ';', or null. The
+    /// default is null.
     virtual const wchar_t* getDefaultSearch() const;
 
   private:

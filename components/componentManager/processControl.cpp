@@ -1,3 +1,8 @@
+/// Implements the default controller and its file lookup.
+///
+/// The default controller has no state and is never destroyed, so that work can report to it before
+/// and after all other static objects. The wide texts appear on the narrow error stream as
+/// addresses. This is deliberate: it shows every host that it needs its own controller.
 #include "components/componentManager/processControl.h"
 
 #include "components/base/assertions.h"
@@ -32,12 +37,12 @@ bool isSlash(wchar_t c) {
     return c == L'/' || c == L'\\';
 }
 
-/// Names that say by themselves where the file is.
+/// Returns whether the name contains the location of the file: rooted, or with a drive.
 bool ignoresSearchPath(std::wstring_view name) {
     return (!name.empty() && isSlash(name[0])) || (name.size() > 1 && name[1] == L':');
 }
 
-/// The first "directory/name" along `searchPath` that is a regular file, or an empty string.
+/// Returns the first regular file "directory/name" along `searchPath`, or an empty string.
 std::wstring findAlong(std::wstring_view searchPath, std::wstring_view name) {
     while (true) {
         searchPath.remove_prefix(std::min(searchPath.find_first_not_of(L';'), searchPath.size()));
@@ -54,7 +59,7 @@ std::wstring findAlong(std::wstring_view searchPath, std::wstring_view name) {
     }
 }
 
-/// `fraction` in percent, cut to a whole number; 0 where there is none.
+/// Returns `fraction` in percent, truncated to an integer; 0 if no `int` can represent it.
 int percentage(float fraction) {
     const double percent = fraction * 100.0;
     constexpr double largest = std::numeric_limits<int>::max();
@@ -62,8 +67,8 @@ int percentage(float fraction) {
     return percent > smallest - 1.0 && percent < largest + 1.0 ? static_cast<int>(percent) : 0;
 }
 
-/// The last resort: tells the error stream that something happened. Its texts appear as addresses,
-/// which shows every host that it has to install a controller of its own to be read.
+/// The controller of hosts that install none. It writes to the error stream, continues after
+/// warnings and stops at errors.
 class DefaultSystemController final
     : public QrCastImpl<DefaultSystemController, QrProcessControl, const DefaultSystemController&> {
   public:
@@ -89,7 +94,7 @@ class DefaultSystemController final
     void log(int, const wchar_t* text) override { writeLine(text); }
     [[noreturn]] void abort(int, const wchar_t* text) override {
         writeLine(text);
-        // The position is part of what callers and logs rely on, not this file's line.
+        // Callers and logs rely on this position. It does not change with the lines of this file.
         constexpr int reportedLine = 274;
         Assertions::throwProgramAborted("components/componentManager/processControl", reportedLine);
     }

@@ -1,9 +1,9 @@
-/// How long work talks to the user: messages, progress, abort, and the lookup of files.
+/// How long-running work reports to the user: messages, progress, abort and file lookup.
 ///
-/// Work that takes long (imports above all) asks `QrGetProcessController()` for the controller of
-/// its thread and reports to it, instead of opening windows of its own. A host installs controllers
-/// that speak its own language; without one the default controller serves, a last resort that
-/// writes to the standard error stream.
+/// Long-running work, such as an import, has no user interface. It reports to the process
+/// controller of its thread, which `QrGetProcessController()` returns. Hosts install their own
+/// controllers. Without one, the default controller writes to the standard error stream, as a last
+/// resort.
 #pragma once
 
 #include "components/componentManager/cast.h"
@@ -13,12 +13,13 @@
 
 namespace Mz {
 
-/// What a host implements to hear of the work done in its name.
+/// The receiver of messages and progress, which a host implements.
 ///
-/// All texts are only looked at during the call. `code` is a number of the reporter's own choosing,
-/// by which a host can tell its messages apart; 0 stands for none. Whether an operation may be
-/// called from several threads at once is the controller's own affair: install one per thread where
-/// it may not.
+/// Every `text` is valid only during the call. `code` identifies the message: the reporter chooses
+/// the number, and 0 means none.
+///
+/// Threads: the implementation decides whether several threads may use one controller at the same
+/// time. If they may not, install one controller for each thread.
 class MZ_COMPONENT_MANAGER_API QrProcessControl : public QrCastable {
   public:
     using Self = QrProcessControl;
@@ -26,52 +27,67 @@ class MZ_COMPONENT_MANAGER_API QrProcessControl : public QrCastable {
 
     ~QrProcessControl() override;
 
-    /// An opaque pointer of the host's; null when it has none. The default controller's is null.
+    /// Returns an opaque pointer of the host, or null. The default controller returns null.
     virtual void* getContext() = 0;
 
-    /// Says something worth knowing.
+    /// Reports information.
     virtual void message(int code, const wchar_t* text) = 0;
 
-    /// Whether the user wants the work to stop. Ask now and then, and stop when it is true.
+    /// Returns whether the user interrupted the work. Long-running work calls this regularly and
+    /// stops if it is true. The default controller returns false.
     virtual bool isInterrupted() = 0;
 
-    /// Says that something is doubtful; true to go on. The default controller answers true.
+    /// Reports a problem that does not stop the work.
+    ///
+    /// \return whether to continue; the default controller returns true
     virtual bool warning(int code, const wchar_t* text) = 0;
 
-    /// Whether anybody sees the progress, so that work can spare itself the reports.
+    /// Returns whether progress is shown. If it is not, the work can omit its reports. The default
+    /// controller returns false.
     virtual bool isProgressShown() = 0;
 
-    /// Reports progress: `fraction` of the whole, from 0 to 1, with a text; true to go on. The
-    /// default controller shows the percentage cut to a whole number, and answers true.
+    /// Reports progress. The default controller writes the percentage, truncated to an integer.
+    ///
+    /// \param fraction  completed part of the work, from 0 to 1
+    /// \return whether to continue; the default controller returns true
     virtual bool progress(float fraction, const wchar_t* text) = 0;
 
-    /// Whether anybody sees the status.
+    /// Returns whether the status is shown. The default controller returns false.
     virtual bool isStatusShown() = 0;
 
-    /// Says what is being done at the moment.
+    /// Reports the current activity.
     virtual void status(const wchar_t* text) = 0;
 
-    /// Says that something failed; true to go on all the same. The default controller answers
-    /// false.
+    /// Reports a failure.
+    ///
+    /// \return whether to continue despite it; the default controller returns false
     virtual bool error(int code, const wchar_t* text) = 0;
 
-    /// Whether anybody sees errors.
+    /// Returns whether errors are shown. The default controller returns false.
     virtual bool isErrorShown() = 0;
 
-    /// Notes something for later.
+    /// Writes an entry to the log. The default controller treats it like `message`.
     virtual void log(int code, const wchar_t* text) = 0;
 
-    /// Gives the work up: says why, then leaves by an exception, which the starter of the work
-    /// catches. The default controller throws `Assertions::ExProgramAborted`.
+    /// Reports the reason and aborts the work by an exception; never returns. The code that started
+    /// the work catches the exception.
+    ///
+    /// \throws Assertions::ExProgramAborted  from the default controller; other controllers may
+    ///         throw other exceptions
     [[noreturn]] virtual void abort(int code, const wchar_t* text) = 0;
 
-    /// The full name of an existing regular file, or an empty string; never throws for a missing
-    /// one. Null texts count as empty.
+    /// Returns the full name of an existing regular file, or an empty string if there is none. A
+    /// missing file never throws.
     ///
-    /// The default controller looks for `fileName` in each directory of `searchPath` (separated by
-    /// ';', in order), joined by one '/'; a name that begins with '/' or '\', or whose second
-    /// character is ':', skips that. Then it asks itself again with `fallbackSearchPath`, when
-    /// there is one, and at the very end takes `fileName` as it stands.
+    /// The default controller tries, in this order:
+    /// 1. `fileName` in each directory of `searchPath`, joined by one '/'. It omits this step if
+    ///    `fileName` begins with '/' or '\', or if its second character is ':'.
+    /// 2. The same with `fallbackSearchPath`, unless it is null.
+    /// 3. `fileName` unchanged.
+    ///
+    /// \param fileName            name to find; null counts as empty
+    /// \param searchPath          directories, separated by ';', or null
+    /// \param fallbackSearchPath  directories, separated by ';', or null
     virtual std::wstring findFile(const wchar_t* fileName, const wchar_t* searchPath,
                                   const wchar_t* fallbackSearchPath) = 0;
 
@@ -83,29 +99,35 @@ class MZ_COMPONENT_MANAGER_API QrProcessControl : public QrCastable {
 
 /// The five functions of the controller registry.
 ///
-/// The registry holds plain pointers: it takes no references, deletes nothing and checks nothing.
-/// The host keeps each controller alive for as long as it is installed, and takes a thread's
-/// controller out before the thread ends: otherwise a later thread with the same identifier of the
-/// system inherits it.
+/// Ownership: the registry holds plain pointers. It takes no references, deletes nothing and checks
+/// nothing. The host keeps each controller alive while it is installed. It removes the controller
+/// of a thread before the thread ends; otherwise a later thread with the same system identifier
+/// inherits it.
 ///
-/// Any thread may call any of them at any time, during the construction and destruction of static
-/// objects too. None of them reports an error.
+/// Threads: all five functions are thread-safe. They work during the construction and destruction
+/// of static objects. None of them reports an error.
 extern "C" {
 
-/// The controller of the calling thread if it has one, else the system-wide controller. Null only
-/// when the host made the latter null.
+/// Returns the controller of the calling thread, or the system-wide controller if the thread has
+/// none. The result is null only if the host set the system-wide controller to null. No reference
+/// is taken.
 MZ_COMPONENT_MANAGER_API Mz::QrProcessControl* QrGetProcessController();
 
-/// The system-wide controller: the default controller, until the host replaces it.
+/// Returns the system-wide controller. It is the default controller until the host replaces it. No
+/// reference is taken.
 MZ_COMPONENT_MANAGER_API Mz::QrProcessControl* QrGetSystemProcessController();
 
-/// Replaces the system-wide controller. Anything is taken as it is, null included.
+/// Replaces the system-wide controller.
+///
+/// \param controller  new controller, or null; stored without a check
 MZ_COMPONENT_MANAGER_API void QrSetSystemProcessController(Mz::QrProcessControl* controller);
 
-/// The calling thread's own controller, or null.
+/// Returns the controller of the calling thread, or null if it has none. No reference is taken.
 MZ_COMPONENT_MANAGER_API Mz::QrProcessControl* QrGetThreadProcessController();
 
-/// Sets or replaces the calling thread's own controller; null takes it out.
+/// Sets, replaces or removes the controller of the calling thread.
+///
+/// \param controller  new controller; null removes the present one
 MZ_COMPONENT_MANAGER_API void QrSetThreadProcessController(Mz::QrProcessControl* controller);
 }
 

@@ -1,4 +1,4 @@
-/// The smart references to castable objects.
+/// Smart references to castable objects.
 #pragma once
 
 #include "components/componentManager/export.h"
@@ -9,22 +9,27 @@
 
 namespace Mz {
 
-/// Holds one pointer and, while it is not null, exactly one reference to the object behind it.
+/// A smart reference: it holds a pointer and, unless the pointer is null, owns one reference to the
+/// object.
 ///
-/// Two ways lead in, and they differ in who pays for the reference:
-/// - `QrPtr<T>(pointer)` takes a *new* reference (`newReference`), the caller keeps its own;
-/// - `QrPtr<T>::adopt(pointer)` takes *over* a reference that the pointer already carries, as the
-///   results of `getInterface`, `safeCast` and `QrTranslateInterface` do.
+/// There are two ways to construct it from a raw pointer:
+/// - `QrPtr<T>(pointer)` takes a new reference (`newReference`). The caller keeps its own.
+/// - `QrPtr<T>::adopt(pointer)` takes ownership of a reference that the pointer already carries.
+///   Use it for the results of `getInterface`, `safeCast` and `QrTranslateInterface`.
 ///
-/// Two ways lead out: `get()` only looks, `detach()` gives the reference to the caller.
+/// There are two ways to get the raw pointer: `get()` keeps the reference, `detach()` passes its
+/// ownership to the caller.
 ///
-/// `release` must not throw: it is called where an exception ends the process.
+/// The `release` of the object must not throw. It is called from `noexcept` functions, where an
+/// exception terminates the process.
 ///
-/// Whether the object is deleted with its last reference is the object's own affair: objects that
-/// do not count stay as they are. One reference belongs to one thread at a time; different
-/// references to one counted object may be used by different threads.
+/// Ownership: the release of the last reference deletes a counted object. An uncounted object lives
+/// as long as its storage.
 ///
-/// Five names exist for it, which say at a glance what a result is for.
+/// Threads: one smart reference must not be used by two threads at the same time. Different threads
+/// can use different references to one counted object.
+///
+/// The template has five aliases (below), which document the purpose of a result.
 template <class T>
 class MZ_SHARED_TYPE QrReference {
   public:
@@ -33,7 +38,7 @@ class MZ_SHARED_TYPE QrReference {
     constexpr QrReference() noexcept = default;
     constexpr QrReference(std::nullptr_t) noexcept {}
 
-    /// Takes a new reference on `object`, which may be null.
+    /// Takes a new reference to `object`, which may be null.
     QrReference(T* object) : held(object) { take(); }
 
     QrReference(const QrReference& other) : held(other.held) { take(); }
@@ -51,8 +56,8 @@ class MZ_SHARED_TYPE QrReference {
 
     ~QrReference() { reset(); }
 
-    /// The new reference is taken before the old one is given back, so that assigning what the old
-    /// object alone keeps alive is safe.
+    /// Takes the new reference before it releases the old one. The assigned object may therefore be
+    /// one that only the old object keeps alive.
     QrReference& operator=(const QrReference& other) { // NOLINT(bugprone-unhandled-self-assignment)
         QrReference(other).swap(*this);
         return *this;
@@ -80,7 +85,8 @@ class MZ_SHARED_TYPE QrReference {
         return *this;
     }
 
-    /// Takes over the reference that `object` already carries; null is allowed.
+    /// Returns a smart reference that takes ownership of the reference that `object` already
+    /// carries. `object` may be null.
     [[nodiscard]] static QrReference adopt(T* object) noexcept {
         QrReference result;
         result.held = object;
@@ -92,20 +98,21 @@ class MZ_SHARED_TYPE QrReference {
     T& operator*() const noexcept { return *held; }
     explicit operator bool() const noexcept { return held != nullptr; }
 
-    /// Gives the reference back and becomes null. Null comes first: whatever the release sets off
-    /// finds this reference already empty.
+    /// Releases the reference and becomes null. It becomes null first: code that runs inside the
+    /// release already sees it null.
     void reset() noexcept {
         if (T* old = std::exchange(held, nullptr))
             mutableObject(old)->release();
     }
 
-    /// Gives the reference to the caller, who must give it back or adopt it, and becomes null.
+    /// Returns the pointer and becomes null. The caller owns the reference and must release or
+    /// adopt it.
     [[nodiscard]] T* detach() noexcept { return std::exchange(held, nullptr); }
 
     void swap(QrReference& other) noexcept { std::swap(held, other.held); }
     friend void swap(QrReference& a, QrReference& b) noexcept { a.swap(b); }
 
-    /// Whether both look at the same object, at the same interface of it.
+    /// Returns whether both hold the same pointer: the same interface of the same object.
     template <class U>
     friend bool operator==(const QrReference& a, const QrReference<U>& b) noexcept {
         return a.get() == b.get();
@@ -114,7 +121,8 @@ class MZ_SHARED_TYPE QrReference {
     friend bool operator==(const QrReference& a, std::nullptr_t) noexcept { return !a.held; }
 
   private:
-    /// Counting is no change that constness protects against.
+    /// References to const objects are counted too: the count is not part of the value that const
+    /// protects.
     static std::remove_const_t<T>* mutableObject(T* object) noexcept {
         return const_cast<std::remove_const_t<T>*>(object);
     }
@@ -126,23 +134,23 @@ class MZ_SHARED_TYPE QrReference {
     T* held = nullptr;
 };
 
-/// What operations return that create or load an object.
+/// The result of a function that creates or loads an object.
 template <class T>
 using QrRef = QrReference<T>;
 
-/// An interface that was obtained by casting.
+/// An interface obtained by a cast.
 template <class T>
 using QrPtr = QrReference<T>;
 
-/// The same, for looking only.
+/// An interface obtained by a cast, with const access only.
 template <class T>
 using QrCPtr = QrReference<const T>;
 
-/// What builders return of themselves.
+/// The result of a builder's `getBuilder`.
 template <class T>
 using QrRefPtr = QrReference<T>;
 
-/// The same, for looking only.
+/// The result of a builder's `getBuilder`, with const access only.
 template <class T>
 using QrCRefPtr = QrReference<const T>;
 

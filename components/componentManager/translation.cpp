@@ -1,3 +1,9 @@
+/// Implements the registry of translators: a hash map from the address of the translated object to
+/// its list of translators.
+///
+/// The map is constant-initialised and never destroyed, so that static objects of other libraries
+/// can use it at any time; its memory is freed at unload. It takes no lock: concurrent lookups only
+/// read, and callers serialise changes.
 #include "components/componentManager/translation.h"
 
 #include "components/componentManager/cast.h"
@@ -24,8 +30,8 @@ struct AddressHash {
     }
 };
 
-/// By translated object, which is only an address here. An object that once had translations keeps
-/// its place, empty.
+/// The translations by translated object, which is only an address here. Its key stays in the map
+/// after its last translation was removed.
 constinit NoDestructor<HashMap<QrCastable*, std::vector<Translation>, AddressHash>> registry;
 
 void clearRegistry() {
@@ -45,7 +51,7 @@ QrCastable* QrTranslateInterface(QrCastable* object, const QrUid& uid) {
     const std::vector<Translation>* translations = registry.value.find(object);
     if (!translations)
         return nullptr;
-    // By index, and with the translator copied: whoever is called here may add or remove.
+    // An index and a copy, not an iterator: the callbacks may add or remove translations.
     for (std::size_t index = 0; index < translations->size(); ++index) {
         const Translation translation = (*translations)[index];
         if (translation.accepts(uid))
@@ -66,8 +72,8 @@ void QrRemoveTranslation(QrCastable* object, QrCastable* translator) {
     std::vector<Translation>* translations = registry.value.find(object);
     if (!translations)
         return;
-    // The entry that moves up into a removed one's place is passed over; callers rely on one call
-    // removing one of two neighbours.
+    // Skips the entry that moves into the place of a removed one: callers rely on one call removing
+    // only the first of two adjacent entries.
     for (std::size_t index = 0; index < translations->size(); ++index)
         if ((*translations)[index].translator == translator)
             translations->erase(translations->begin() + static_cast<std::ptrdiff_t>(index));

@@ -1,17 +1,16 @@
-/// Interfaces that one object supplies on behalf of another.
+/// Translators: objects that supply an interface for another object.
 ///
-/// An object may lack an interface that some client needs, while another object, its *translator*,
-/// can supply it. The process keeps one registry of translators, in order, for each object;
-/// `safeCast` and `queryCast` ask it whenever the object itself answers null.
+/// An object may lack an interface that a client needs. Another object, its *translator*, can
+/// supply it. The process has one registry, with an ordered list of translators for each object.
+/// `safeCast` and `queryCast` consult the registry if the object itself returns null.
 ///
-/// The registry holds plain pointers. It takes no reference on either object, never deletes one and
-/// never looks into the translated object: whoever adds a translation keeps both objects alive and
-/// removes the translation before either dies. It is usable during the construction and destruction
-/// of static objects.
+/// Ownership: the registry holds plain pointers. It takes no references, deletes no objects, and
+/// never dereferences the translated object. The caller that adds a translation keeps both objects
+/// alive, and removes the translation before it destroys one of them.
 ///
-/// Threads: lookups may run side by side; adding or removing must not overlap any other use of the
-/// registry. No function here throws, except what a translator or predicate throws and, when
-/// adding, `std::bad_alloc` (then nothing was added).
+/// Threads: lookups can run concurrently. Adding or removing must not run concurrently with any
+/// other use of the registry. The functions work during the construction and destruction of static
+/// objects.
 #pragma once
 
 #include "components/componentManager/export.h"
@@ -25,8 +24,8 @@ class QrCastable;
 
 namespace detail {
 
-/// True once a translation was added in this process. Casts read it to avoid a call into the
-/// registry; only the registry writes it.
+/// True after the first translation of the process was added. Casts read it to avoid a call into
+/// the registry. Only the registry writes it.
 extern MZ_COMPONENT_MANAGER_API std::atomic<bool> translationsExist;
 
 } // namespace detail
@@ -35,25 +34,34 @@ extern MZ_COMPONENT_MANAGER_API std::atomic<bool> translationsExist;
 
 extern "C" {
 
-/// The interface `uid` of `object` through a translator, or null.
+/// Returns the interface `uid` of `object` from one of its translators.
 ///
-/// The first translator of `object` whose predicate accepts `uid` decides: its answer is returned
-/// as it is, even when it is null, and later ones are not asked. The result carries one reference,
-/// which the caller takes over (`QrPtr<T>::adopt`).
+/// The first translator whose predicate accepts `uid` decides. Its result is returned even if it is
+/// null; later translators are not consulted.
+///
+/// \param object  translated object; null has no translators
+/// \return the translator's result, or null if no translator accepts `uid`. The caller owns one
+///         reference (`QrPtr<T>::adopt`).
+/// \throws only what the predicates and the translator throw
 MZ_COMPONENT_MANAGER_API Mz::QrCastable* QrTranslateInterface(Mz::QrCastable* object,
                                                               const Mz::QrUid& uid);
 
-/// Lets `translator` answer for `object` wherever `accepts` says so, after the translators that
-/// `object` already has. The same pair may be added more than once. A null `object`, `translator`
-/// or `accepts` adds nothing.
+/// Adds `translator` to the end of the list of `object`. The same pair may be added more than once.
+///
+/// If any parameter is null, the call is a no-op.
+///
+/// \param object      object that lacks interfaces
+/// \param translator  object that supplies them
+/// \param accepts     predicate: whether `translator` supplies the interface `uid`
+/// \throws std::bad_alloc  if memory runs out; nothing is added
 MZ_COMPONENT_MANAGER_API void QrAddTranslation(Mz::QrCastable* object, Mz::QrCastable* translator,
                                                bool (*accepts)(const Mz::QrUid& uid));
 
-/// Removes translations of `object` by `translator`, keeping the order of the others.
+/// Removes `translator` from the list of `object`. The order of the others does not change.
 ///
-/// Of two such translations that stand directly one after the other a single call removes only the
-/// first: the walk goes on behind the entry that moved up. Whoever added the same translator
-/// several times calls this as often. Nothing happens when there is nothing to remove.
+/// Of two adjacent entries of the same translator, one call removes only the first, because the
+/// scan skips the entry that moves into its place. If you add a translator several times, call this
+/// function as many times. If there is no such entry, the call is a no-op.
 MZ_COMPONENT_MANAGER_API void QrRemoveTranslation(Mz::QrCastable* object,
                                                   Mz::QrCastable* translator);
 }

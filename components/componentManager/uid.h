@@ -1,22 +1,28 @@
-/// The identity of an interface, and the library's own integer of 64 bits.
+/// The 128-bit identity of an interface, and the 64-bit integer type of the library.
 #pragma once
 
 #include <cstdint>
 
 namespace Mz {
 
-/// The signed integer of 64 bits in every signature of the library. It is `long long` on both
-/// platforms, because `std::int64_t` is `long` on one of them, which streams treat as 32 bits.
+/// The signed 64-bit integer in all signatures of the library.
+///
+/// It is `long long` on both platforms. `std::int64_t` is `long` on one of them, and streams store
+/// a `long` in 32 bits.
 using int64 = long long;
 
-/// The 128-bit identity of an interface or of a builder: four words of 32 bits, in this order.
+/// The 128-bit identity of an interface or of a builder: four 32-bit words, in this order.
 ///
-/// Two identifiers are equal when all four words are; there is no order among them. Interfaces of
-/// one family often share three words and differ in `w0` alone.
+/// Two uids are equal if all four words are equal. They have no order. Interfaces of one family
+/// often share three words and differ only in `w0`.
 ///
-/// An interface carries its identity as `static constexpr QrUid uid` and names itself beside it
-/// with `using Self = ThatInterface;`. Both are needed: a class that only inherits a `uid` from its
-/// base is not the interface which that `uid` names, and the casts refuse it at compile time.
+/// An interface declares both members:
+///
+///     static constexpr QrUid uid{...};
+///     using Self = ThatInterface;
+///
+/// A class that only inherits `uid` is not the interface that `uid` identifies. `Self` reveals such
+/// a class, and the casts reject it at compile time.
 struct QrUid {
     std::uint32_t w0;
     std::uint32_t w1;

@@ -1,4 +1,4 @@
-/// Version of the library, as numbers for the preprocessor.
+/// The version of the library, as numbers for the preprocessor.
 ///
 /// The build reads its own version from these lines. While the major number is 0, a new minor
 /// version may break source compatibility; the `SOVERSION` of the libraries (the number in
@@ -9,5 +9,5 @@
 #define MZ_VERSION_MINOR 2
 #define MZ_VERSION_PATCH 0
 
-/// The version as one number that grows: 10,000 × major + 100 × minor + patch. Use it in `#if`.
+/// The version as one ascending number: 10,000 × major + 100 × minor + patch. Use it in `#if`.
 #define MZ_VERSION (MZ_VERSION_MAJOR * 10000 + MZ_VERSION_MINOR * 100 + MZ_VERSION_PATCH)

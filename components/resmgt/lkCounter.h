@@ -1,4 +1,4 @@
-/// The counter under every counted reference.
+/// The atomic counter of counted objects.
 #pragma once
 
 #include <atomic>
@@ -6,15 +6,17 @@
 
 namespace Mz {
 
-/// An atomic signed counter of 32 bits on every platform, whatever the width of `T`; it wraps
-/// round at the ends of that range. `T` (`long` throughout the library) is only the type in which
-/// values enter and leave.
+/// An atomic signed 32-bit counter.
 ///
-/// May be incremented and decremented from any number of threads. Decrements are ordered so that
-/// whoever brings the counter to its last value sees everything that the others did before.
+/// `T` is the type of parameters and results only (`long` throughout the library). The counter has
+/// 32 bits on every platform, whatever the width of `T`, and wraps around on overflow.
+///
+/// Thread-safe. Decrements have acquire-release order: the thread whose decrement reaches the final
+/// value sees all writes that other threads made before their decrements.
 template <class T>
 class LkCounterWindows {
   public:
+    /// Starts at `initial`, truncated to 32 bits.
     explicit constexpr LkCounterWindows(T initial) noexcept
         : count(static_cast<std::int32_t>(initial)) {}
     ~LkCounterWindows() = default;
@@ -22,16 +24,22 @@ class LkCounterWindows {
     LkCounterWindows& operator=(const LkCounterWindows&) = delete;
 
     /// Adds one and returns the new value.
-    T operator++() noexcept { return wrapped(count.fetch_add(1, std::memory_order_relaxed), 1); }
+    T operator++() noexcept {
+        return wrappingSum(count.fetch_add(1, std::memory_order_relaxed), 1);
+    }
 
-    /// Takes one away and returns the new value.
-    T operator--() noexcept { return wrapped(count.fetch_sub(1, std::memory_order_acq_rel), -1); }
+    /// Subtracts one and returns the new value.
+    T operator--() noexcept {
+        return wrappingSum(count.fetch_sub(1, std::memory_order_acq_rel), -1);
+    }
 
-    /// The value at this moment, which other threads may be changing.
+    /// Returns the current value. Other threads may change it at any time.
     T value() const noexcept { return static_cast<T>(count.load(std::memory_order_relaxed)); }
 
   private:
-    static T wrapped(std::int32_t before, int step) noexcept {
+    /// Repeats the step of the atomic operation, which returned the value before it. Unsigned
+    /// arithmetic wraps around where signed arithmetic would be undefined.
+    static T wrappingSum(std::int32_t before, int step) noexcept {
         const auto sum = static_cast<std::uint32_t>(before) + static_cast<std::uint32_t>(step);
         return static_cast<T>(static_cast<std::int32_t>(sum));
     }

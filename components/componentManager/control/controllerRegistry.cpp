@@ -1,3 +1,10 @@
+/// Implements the registry of process controllers: a hash map from the system's thread identifier
+/// to the controller, under a lock.
+///
+/// Each thread caches the result of its last lookup with the generation of the map. Every change
+/// increments the generation. The common call therefore compares two words, without a lookup and
+/// without a lock. The registry is constant-initialised and never destroyed, so that static objects
+/// can use it at any time; its memory is freed at unload.
 #include "components/componentManager/processControl.h"
 
 #include "components/componentManager/control/systemController.h"
@@ -6,7 +13,7 @@
 #include "components/componentManager/support/noDestructor.h"
 #include "components/platform/platform.h"
 
-// Of the system that the build is for.
+// The build selects the header of the target system.
 #include "threadWord.h"
 
 #include <atomic>
@@ -18,9 +25,9 @@ namespace Mz {
 
 namespace {
 
-/// A lock that needs no constructor to run, which a mutex does on one of the platforms. It is held
-/// for a look-up only, never while foreign code runs.
-class Lock {
+/// A lock that needs no run-time constructor. `std::mutex` needs one on one of the platforms. The
+/// lock is held only for one access to the map, never while foreign code runs.
+class SpinLock {
   public:
     void lock() {
         while (taken.test_and_set(std::memory_order_acquire))
@@ -33,69 +40,72 @@ class Lock {
 };
 
 struct ThreadControllers {
-    Lock mutex;
+    SpinLock spinLock;
     HashMap<std::uint32_t, QrProcessControl*, ThreadHash> byThread;
 };
 
-constinit NoDestructor<ThreadControllers> threads;
+constinit NoDestructor<ThreadControllers> registry;
 
-/// Counts the changes to `threads`, so that a thread knows whether what it remembers still holds.
+/// Counts the changes of `registry`. A thread's cache is current if it has the same generation.
+/// Starts at 1, because the cached generation of a new thread is 0.
 constinit std::atomic<std::uintptr_t> generation{1};
 
-/// What a thread found when it last looked, and the generation of that. A later thread with the
-/// same identifier finds what its predecessor left, as any look-up would.
-using RememberedGeneration = platform::ThreadWord<struct GenerationName>;
-using RememberedController = platform::ThreadWord<struct ControllerName>;
+/// The cache of each thread: the result of its last lookup, and the generation of that lookup. A
+/// new thread has an empty cache. It looks up its identifier, and may find the entry of an earlier
+/// thread with the same identifier.
+using CachedGeneration = platform::ThreadWord<struct GenerationName>;
+using CachedController = platform::ThreadWord<struct ControllerName>;
 
-QrProcessControl* rememberedController() {
-    return reinterpret_cast<QrProcessControl*>(RememberedController::get());
+QrProcessControl* cachedController() {
+    return reinterpret_cast<QrProcessControl*>(CachedController::get());
 }
 
-bool isRememberedCurrent() {
-    return RememberedGeneration::get() == generation.load(std::memory_order_acquire);
+bool isCacheCurrent() {
+    return CachedGeneration::get() == generation.load(std::memory_order_acquire);
 }
 
-/// In the copy of a process nobody may find the lock taken by a thread that is not there, nor what
-/// was remembered for the identifier that the thread had before.
-struct ForkWatch {
-    ForkWatch() {
-        platform::aroundForks([] { threads.value.mutex.lock(); },
-                              [] { threads.value.mutex.unlock(); },
+/// Registers the fork handlers. After a fork, the child must not inherit a lock held by a thread
+/// that it does not have. Its thread has a new identifier, so its cached controller must expire
+/// too.
+struct AtForkHandlers {
+    AtForkHandlers() {
+        platform::aroundForks([] { registry.value.spinLock.lock(); },
+                              [] { registry.value.spinLock.unlock(); },
                               [] {
                                   generation.fetch_add(1, std::memory_order_release);
-                                  threads.value.mutex.unlock();
+                                  registry.value.spinLock.unlock();
                               });
     }
-} const forkWatch;
+} const atForkHandlers;
 
 void clearRegistry() {
-    const std::lock_guard lock(threads.value.mutex);
-    threads.value.byThread.clear();
+    const std::lock_guard lock(registry.value.spinLock);
+    registry.value.byThread.clear();
     generation.fetch_add(1, std::memory_order_release);
-    RememberedController::release();
-    RememberedGeneration::release();
+    CachedController::release();
+    CachedGeneration::release();
 }
 MZ_AT_UNLOAD(clearRegistry);
 
-QrProcessControl* lookUp() {
-    ThreadControllers& controllers = threads.value;
-    const std::lock_guard lock(controllers.mutex);
+QrProcessControl* lookUpThreadController() {
+    ThreadControllers& controllers = registry.value;
+    const std::lock_guard lock(controllers.spinLock);
     QrProcessControl* const* found = controllers.byThread.find(platform::currentThreadId());
     QrProcessControl* const controller = found ? *found : nullptr;
-    if (RememberedController::set(reinterpret_cast<std::uintptr_t>(controller)))
-        RememberedGeneration::set(generation.load(std::memory_order_relaxed));
+    if (CachedController::set(reinterpret_cast<std::uintptr_t>(controller)))
+        CachedGeneration::set(generation.load(std::memory_order_relaxed)); // The lock orders it.
     return controller;
 }
 
 QrProcessControl* threadController() {
-    if (isRememberedCurrent()) [[likely]]
-        return rememberedController();
-    return lookUp();
+    if (isCacheCurrent()) [[likely]]
+        return cachedController();
+    return lookUpThreadController();
 }
 
-/// Apart from its caller, which then needs no frame.
-[[gnu::noinline]] QrProcessControl* lookUpAny() {
-    QrProcessControl* controller = lookUp();
+/// Not inlined: its caller then needs no stack frame for the common path.
+[[gnu::noinline]] QrProcessControl* lookUpController() {
+    QrProcessControl* controller = lookUpThreadController();
     return controller ? controller : systemController.load(std::memory_order_acquire);
 }
 
@@ -106,9 +116,9 @@ QrProcessControl* threadController() {
 using namespace Mz;
 
 QrProcessControl* QrGetProcessController() {
-    if (!isRememberedCurrent()) [[unlikely]]
-        return lookUpAny();
-    QrProcessControl* controller = rememberedController();
+    if (!isCacheCurrent()) [[unlikely]]
+        return lookUpController();
+    QrProcessControl* controller = cachedController();
     return controller ? controller : systemController.load(std::memory_order_acquire);
 }
 
@@ -125,8 +135,8 @@ QrProcessControl* QrGetThreadProcessController() {
 }
 
 void QrSetThreadProcessController(QrProcessControl* controller) {
-    ThreadControllers& controllers = threads.value;
-    const std::lock_guard lock(controllers.mutex);
+    ThreadControllers& controllers = registry.value;
+    const std::lock_guard lock(controllers.spinLock);
     const std::uint32_t thread = platform::currentThreadId();
     if (controller)
         controllers.byThread[thread] = controller;

@@ -1,4 +1,4 @@
-/// The system-wide controller, where its default is.
+/// The variable that holds the system-wide controller.
 #pragma once
 
 #include <atomic>
@@ -7,8 +7,8 @@ namespace Mz {
 
 class QrProcessControl;
 
-/// The system-wide controller; from the very beginning, before any code has run, the default
-/// controller.
+/// The system-wide controller. It is constant-initialised to the default controller, so it is valid
+/// before any code runs. Defined in `processControl.cpp`, beside the default controller.
 extern std::atomic<QrProcessControl*> systemController;
 
 } // namespace Mz

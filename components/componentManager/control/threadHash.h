@@ -1,12 +1,14 @@
-/// How thread identifiers spread over a table.
+/// The hash function of thread identifiers.
 #pragma once
 
 #include <cstdint>
 
 namespace Mz {
 
-/// One step of the minimal standard generator of Park and Miller, by Schrage's method, which needs
-/// no more than 32 bits: identifiers that systems hand out in steps spread over all buckets.
+/// Hashes a thread identifier by one step of the Park-Miller minimal standard generator.
+///
+/// Systems assign identifiers in regular steps; the generator spreads them over all buckets.
+/// Schrage's method keeps the arithmetic within 32 bits.
 struct ThreadHash {
     constexpr std::uint32_t operator()(std::uint32_t threadId) const {
         const auto x = static_cast<std::int32_t>((threadId ^ 0xDEADBEEFu) & 0x7FFFFFFFu);

@@ -1,8 +1,8 @@
-/// The hash map of the library's registries.
+/// The hash map of the registries. Private to this library.
 ///
-/// Private to this library. In contrast to `std::unordered_map` it is constant-initialised, so that
-/// registries work while other static objects are still being made, its nodes never move, and a
-/// look-up divides nothing: the table's size is a power of two and the bucket is the hash masked.
+/// Unlike `std::unordered_map`, it is constant-initialised, so that registries work while other
+/// static objects are constructed. A lookup needs no division: the size of the table is a power of
+/// two, and the bucket is the masked hash. Nodes never move.
 #pragma once
 
 #include <cstddef>
@@ -11,10 +11,10 @@
 
 namespace Mz {
 
-/// Maps `Key` (compared with `==`) to `Value`; `Hash()(key)` gives an unsigned integer. The table
-/// starts with 8 buckets and doubles before it would hold more entries than buckets.
+/// A map from `Key` (compared with `==`) to `Value`. `Hash()(key)` returns an unsigned integer.
 ///
-/// Addresses of values stay valid until their entry is erased.
+/// The table starts with 8 buckets, and doubles before it holds more entries than buckets. The
+/// address of a value is valid until its entry is erased. Not thread-safe.
 template <class Key, class Value, class Hash>
 class HashMap {
   public:
@@ -23,6 +23,7 @@ class HashMap {
     HashMap& operator=(const HashMap&) = delete;
     ~HashMap() { clear(); }
 
+    /// Returns the value of `key`, or null if there is no entry.
     Value* find(const Key& key) noexcept {
         Node* node = entries ? *slotOf(key) : nullptr;
         return node ? &node->value : nullptr;
@@ -31,7 +32,9 @@ class HashMap {
         return const_cast<HashMap*>(this)->find(key);
     }
 
-    /// The value of `key`, made with `Value()` when there was none.
+    /// Returns the value of `key`. Inserts `Value()` if there is no entry.
+    ///
+    /// \throws std::bad_alloc  if memory runs out; nothing is inserted
     Value& operator[](const Key& key) {
         if (Value* found = find(key))
             return *found;
@@ -44,7 +47,7 @@ class HashMap {
         return (*slot)->value;
     }
 
-    /// Whether there was an entry to erase.
+    /// Erases the entry of `key`. Returns whether there was one.
     bool erase(const Key& key) noexcept {
         Node** slot = entries ? slotOf(key) : nullptr;
         if (!slot || !*slot)
@@ -56,6 +59,7 @@ class HashMap {
         return true;
     }
 
+    /// Erases all entries and frees the table.
     void clear() noexcept {
         for (std::size_t bucket = 0; bucket < buckets; ++bucket)
             while (Node* node = table[bucket]) {
@@ -81,8 +85,8 @@ class HashMap {
         return &table[static_cast<std::size_t>(Hash()(key)) & (buckets - 1)];
     }
 
-    /// The link that leads to the node of `key`, or to the null at the end of its bucket. There
-    /// must be a table.
+    /// Returns the link to the node of `key`, or the null link at the end of its bucket. The table
+    /// must exist.
     Node** slotOf(const Key& key) const noexcept {
         Node** slot = bucketOf(key);
         while (*slot && !((*slot)->key == key))

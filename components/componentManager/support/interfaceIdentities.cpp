@@ -1,3 +1,7 @@
+/// Exports the uids of all interfaces.
+///
+/// Clients on Windows import each uid from this library. A uid is defined in a header, so it is
+/// exported only if the library itself uses it. This file uses them all.
 #include "components/componentManager/componentImp.h"
 #include "components/componentManager/importer.h"
 #include "components/componentManager/persistant.h"
@@ -5,8 +9,7 @@
 
 namespace Mz {
 
-/// Uses every identity: clients on Windows import them from this library, where one that is defined
-/// in a header is exported only if the library uses it itself.
+/// The address of every uid. `used` keeps the array, which no code reads.
 [[gnu::used]] const QrUid* const interfaceIdentities[] = {
     &QrBufferedIO::uid,    &QrBuilderDescription::uid,   &QrComponentBuilder::uid,
     &QrImportBuilder::uid, &QrComponentDescription::uid, &QrComponentManager::uid,

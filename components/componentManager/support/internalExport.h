@@ -1,7 +1,7 @@
-/// Export macro for what only the project's own tests reach.
+/// The export macro of internal names that only the tests use.
 ///
-/// The shipped library hides these names. The tests link another form of it, made of the same
-/// sources with `MZ_EXPORTING_INTERNALS` defined, and define `MZ_IMPORTING_INTERNALS` themselves.
+/// The shipped library hides these names. The tests link a second library, built from the same
+/// sources with `MZ_EXPORTING_INTERNALS`. They define `MZ_IMPORTING_INTERNALS`.
 #pragma once
 
 #include "components/base/export.h"

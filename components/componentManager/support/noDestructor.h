@@ -1,11 +1,13 @@
-/// Process-wide objects that outlive every other.
+/// A wrapper for process-wide objects that are never destroyed.
 #pragma once
 
 namespace Mz {
 
-/// Holds a constant-initialised object that is never destroyed: static objects of other libraries
-/// may still use it in their destructors, whose order is not defined. What such an object owns must
-/// be freed by `MZ_AT_UNLOAD`, or it leaks each time that this library is unloaded.
+/// Holds a constant-initialised object that is never destroyed.
+///
+/// The destructors of static objects of other libraries may use the object; their order is not
+/// under control. Free the memory that the object owns by `MZ_AT_UNLOAD`: otherwise it leaks each
+/// time that this library is unloaded.
 template <class T>
 union NoDestructor {
     constexpr NoDestructor() : value() {}
