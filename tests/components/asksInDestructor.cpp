@@ -14,7 +14,7 @@ class Object final : public QrCastRef<QrCastHeap<QrCastImpl<Object, PlainObject>
     const char* maker() const override { return "asks"; }
 };
 
-/// Counted, and with memory of its own.
+/// Counted; owns memory on the heap.
 class CountedBuilder final : public Kit::ImportBuilder<CountedBuilder> {
   public:
     CountedBuilder()

@@ -6,7 +6,7 @@ namespace Mz::platform {
 
 namespace {
 
-/// A look at the memory of threads clears the caller's last error, unless this stands around it.
+/// Restores the caller's last error, which reading the memory of threads clears.
 class SameLastError {
   public:
     SameLastError() : error(::GetLastError()) {}
