@@ -1,5 +1,5 @@
-/// What a program with a command line needs of the system: one description, and one implementation
-/// for each system, chosen by the build.
+/// The system functions of a command-line program: one declaration, and one implementation per
+/// system, selected by the build.
 #pragma once
 
 #include <filesystem>
@@ -9,24 +9,24 @@
 
 namespace Meshes::console {
 
-/// Makes the standard output and error write bytes as they are given, line ends included, so that
-/// the same output is the same file everywhere. Call it before anything is written.
+/// Makes the standard output and error write bytes unchanged, line ends included, so that the
+/// output is the same on every system. Call it before anything is written.
 void useBinaryOutput();
 
-/// The program's arguments, without its name, with every character that the user typed.
+/// Returns the arguments of the program, without its name and without loss of characters.
 std::vector<std::filesystem::path> arguments(int argc, char** argv);
 
-/// The folder that the program's file stands in.
+/// Returns the folder of the program's file.
 std::filesystem::path programFolder();
 
-/// The name of a file as the component libraries want it: as buffered IO converts text while the C
-/// locale is "C", which a program has unless it changes it.
+/// Returns the name of a file as the library's functions take it while the C locale is "C", in
+/// which every program starts.
 std::wstring wideName(const std::filesystem::path& path);
 
-/// The name of a file as text, the same for the same name on every system.
+/// Returns the name of a file as text, the same on every system.
 std::wstring fileText(const std::filesystem::path& path);
 
-/// The way back from `wideName`: text as it is written to the standard output.
+/// Returns text as it is written to the standard output; the reverse of `wideName`.
 std::string outputText(std::wstring_view text);
 
 } // namespace Meshes::console

@@ -1,3 +1,6 @@
+/// Writes to a new file in the same folder and renames it: a rename within one folder is atomic, so
+/// other programs see the old content or the new one. A symlink is resolved first, because the
+/// rename would otherwise replace the link.
 #include "safeFile.h"
 
 #include "examples/mesh/system/system.h"
@@ -20,7 +23,7 @@ constexpr const char* source = "examples/mesh/saving/safeFile";
     throw QrStreamEx::ExWriteOpen(source, line, file.string().c_str(), reason.message().c_str());
 }
 
-/// A new file beside `target`, which is gone at the end unless it has taken the target's place.
+/// A new file beside `target`. The destructor removes it, unless it has replaced the target.
 class TemporaryFile {
   public:
     explicit TemporaryFile(const std::filesystem::path& target) : target(target) {

@@ -1,4 +1,4 @@
-/// Saving such that nothing is lost when saving fails.
+/// Replaces a file such that a failure leaves the old file unchanged.
 #pragma once
 
 #include <filesystem>
@@ -7,15 +7,18 @@
 
 namespace Meshes {
 
-/// Has `write` fill the file `file`, whole or not at all: what it writes goes to a temporary file
-/// in the same folder, which takes the place of `file` when everything stands on the medium. Until
-/// then, through failures, full disks and crashes, the old file stays as it is; only a crash leaves
-/// the temporary file behind (`NAME.saving-…`). A symbolic link stays one, and permissions are
-/// kept.
+/// Replaces the content of `file` by what `write` puts into the stream, whole or not at all.
 ///
-/// Raises `QrStreamEx::ExWriteOpen`, with the system's reason, when the folder takes no new file or
-/// `file` cannot be replaced, `QrStreamEx::ExWriteError` when not everything could be written, and
-/// what `write` throws.
+/// `write` fills a temporary file in the same folder, which replaces `file` when its content has
+/// reached the medium. A failure, a full disk or a crash before that leaves the old file unchanged;
+/// only a crash leaves the temporary file (`NAME.saving-…`) in the folder. A symlink stays one, and
+/// permissions are kept.
+///
+/// \throws QrStreamEx::ExWriteOpen with the reason of the system, if the folder takes no new file
+/// or
+///     `file` cannot be replaced
+/// \throws QrStreamEx::ExWriteError if not everything could be written
+/// \throws whatever `write` throws
 void saveSafely(const std::filesystem::path& file, const std::function<void(std::ostream&)>& write);
 
 } // namespace Meshes

@@ -1,5 +1,5 @@
-/// What the example needs of the operating system beyond the standard library: one description, one
-/// source for each system, chosen by the build.
+/// The system functions of the example beyond the standard library: one declaration, and one
+/// implementation per system, selected by the build.
 #pragma once
 
 #include <cstddef>
@@ -8,14 +8,14 @@
 
 namespace Meshes::system {
 
-/// Makes an empty file of a name that no file has; `std::errc::file_exists` when one has.
+/// Creates an empty file. Returns `std::errc::file_exists` if the name is in use.
 std::error_code createNew(const std::filesystem::path& file);
 
-/// Waits until everything in the file `from` stands on the medium, then gives it the name `to`, in
-/// one step: whoever opens `to` meanwhile finds the file that was there or the new one.
+/// Waits until the content of the file `from` has reached the medium, then renames it to `to` in
+/// one step: other programs see the old file or the new one.
 std::error_code moveSafely(const std::filesystem::path& from, const std::filesystem::path& to);
 
-/// How many libraries of this folder the process has in its memory.
+/// Returns the number of libraries of this folder that the process has loaded.
 std::size_t mappedLibraries(const std::filesystem::path& folder);
 
 } // namespace Meshes::system

@@ -1,3 +1,5 @@
+/// On Linux names are bytes. The program stays in the "C" locale, so each byte is one wide
+/// character and back again: every name passes through unchanged, whatever its encoding.
 #include "../console.h"
 
 namespace Meshes::console {
@@ -21,10 +23,10 @@ std::wstring wideName(const std::filesystem::path& path) {
 
 std::wstring fileText(const std::filesystem::path& path) {
     try {
-        const std::u32string text = path.u32string(); // Whatever the locale, names are UTF-8.
+        const std::u32string text = path.u32string(); // Names are UTF-8 in every locale.
         return {text.begin(), text.end()};
     } catch (const std::exception&) {
-        return wideName(path); // The name is no text.
+        return wideName(path); // The name is not valid UTF-8.
     }
 }
 

@@ -1,3 +1,6 @@
+/// Flushes the file before the rename and its folder after it: without the first the name may lead
+/// to an empty file after a crash, without the second to the old one. The loaded libraries come
+/// from the list of the dynamic loader.
 #include "../system.h"
 
 #include <cerrno>
@@ -15,7 +18,7 @@ std::error_code lastError() {
     return {errno, std::generic_category()};
 }
 
-/// Waits for the file, or the folder, to stand on the medium.
+/// Waits until the file, or the folder, has reached the medium.
 std::error_code synchronise(const std::filesystem::path& path) {
     const int file = ::open(path.c_str(), O_RDONLY | O_CLOEXEC);
     if (file < 0)
@@ -40,7 +43,7 @@ std::error_code moveSafely(const std::filesystem::path& from, const std::filesys
         return failure;
     if (::rename(from.c_str(), to.c_str()) != 0)
         return lastError();
-    // The name is in the folder. Not every file system lets one wait for that.
+    // The name is in the folder. Not every file system can flush one, so a failure is ignored.
     synchronise(to.has_parent_path() ? to.parent_path() : std::filesystem::path("."));
     return {};
 }
