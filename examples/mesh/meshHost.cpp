@@ -1,18 +1,18 @@
-// Lists the mesh components, and imports files through them.
-//
-//   meshHost [OPTION...] [FILE...]
-//
-//   --components FOLDER  where the components are; beside the program's folder by default
-//   --progress           shows how far the reading is
-//   --list FILE          starts with the manager's recorded list in FILE, if it is there, and
-//   writes
-//                        it anew; tells how many component libraries are loaded
-//   --save FOLDER        saves each mesh, and a scene of all, to files in FOLDER, and reads them
-//   back
-//   --load FOLDER        reads what was saved in FOLDER
-//
-// Ends with 0 when every file was imported, saved and read, else with 1.
-
+/// A host of the mesh components: lists them, imports files through them, and saves and loads the
+/// results. It uses each part of the library that a host needs: the recorded list, an importer, a
+/// process controller, objects in files. Its output is the same on every system, so that a script
+/// can compare it.
+///
+///     meshHost [OPTION...] [FILE...]
+///
+///     --components FOLDER  where the components are; by default beside the program's folder
+///     --progress           shows the progress of reading
+///     --list FILE          starts with the recorded list in FILE, if it exists, and writes a new
+///                          one; prints how many component libraries are loaded
+///     --save FOLDER        saves each mesh, and a scene of all, to files in FOLDER, and loads them
+///     --load FOLDER        loads the files that were saved in FOLDER
+///
+/// The exit status is 0 if every file was imported, saved and loaded, else 1.
 #include "console/console.h"
 #include "console/consoleController.h"
 #include "host/description.h"
@@ -71,7 +71,8 @@ class BuilderLister final : public QrEnumerator<QrCPtr<QrBuilderDescription>> {
     Action process(QrCPtr<QrBuilderDescription> builder) override {
         std::cout << "  " << console::outputText(builder->getName()) << ": "
                   << console::outputText(builder->getLabel());
-        // The library's own label is not recorded: it is known once the library was loaded.
+        // The recorded list does not contain the label of the library: it is empty after a start
+        // with the list.
         if (builder->getComponentLabel()[0] != L'\0')
             std::cout << ", from " << console::outputText(builder->getComponentLabel());
         std::cout << '\n';
@@ -79,8 +80,8 @@ class BuilderLister final : public QrEnumerator<QrCPtr<QrBuilderDescription>> {
     }
 };
 
-/// Tells how many component libraries this process has in its memory.
-void tellLoaded(const Options& options, const char* when) {
+/// Prints how many component libraries this process has loaded.
+void printLoaded(const Options& options, const char* when) {
     if (options.list.empty())
         return;
     const std::size_t count = system::mappedLibraries(options.components);
@@ -88,7 +89,7 @@ void tellLoaded(const Options& options, const char* when) {
               << " loaded" << std::endl;
 }
 
-/// Writes the manager's list. Without it the next start takes longer, and that is all.
+/// Writes the manager's list. Without it the next start takes longer.
 void saveList(const Options& options, ConsoleController& controller) {
     try {
         writeRecordedList(options.list);
@@ -97,7 +98,7 @@ void saveList(const Options& options, ConsoleController& controller) {
     }
 }
 
-/// Initialises the manager, with its recorded list where there is one.
+/// Initialises the manager, with its recorded list if there is one.
 void start(const Options& options, ConsoleController& controller) {
     bool listed = false;
     try {
@@ -107,8 +108,8 @@ void start(const Options& options, ConsoleController& controller) {
         controller.warning(0, (name + L": damaged; the rest is read from the libraries").c_str());
     }
     QrGetComponentManager()->initialize(Kit::searchPath(options.components).c_str());
-    tellLoaded(options, listed ? "After a start with the recorded list"
-                               : "After a start without a recorded list");
+    printLoaded(options, listed ? "After a start with the recorded list"
+                                : "After a start without a recorded list");
     if (!options.list.empty())
         saveList(options, controller);
 }
@@ -124,12 +125,12 @@ QrPtr<Mesh> importMesh(const MeshImporter& importer, ConsoleController& controll
         describe(console::outputText(name), *mesh);
     else if (!found)
         controller.error(0, (name + L": there is no such file").c_str());
-    else if (controller.errorCount() == errorsBefore) // Else the builder has told why.
+    else if (controller.errorCount() == errorsBefore) // The builder has reported nothing.
         controller.error(0, (name + L": no builder takes this file").c_str());
     return mesh;
 }
 
-/// Does something with a file or folder; whatever it throws becomes an error that names it.
+/// Calls `work`. Reports an exception as an error that names the file or folder `path`.
 template <class Work>
 void attempt(ConsoleController& controller, const std::filesystem::path& path, Work&& work) {
     try {
@@ -172,7 +173,7 @@ void run(const Options& options, ConsoleController& controller) {
         controller.error(0, (folder + L": no mesh importer is there").c_str());
         return;
     }
-    tellLoaded(options, "After the first object was made");
+    printLoaded(options, "After the first object was made");
     std::cout << "File types: " << console::outputText(importer->getFileTypes()) << std::endl;
     importAll(options, controller, *importer);
 }

@@ -1,3 +1,6 @@
+/// The component that makes the mesh importer. The base importer does all the work: it finds the
+/// file, selects a builder by name and content, and calls it. The component is separate from the
+/// formats, so that a format can be added or left out without it.
 #include "mesh.h"
 
 #include "components/componentKit/componentKit.h"
@@ -7,7 +10,7 @@ using namespace Meshes;
 
 namespace {
 
-/// All the work is the base importer's. Hosts that know only importers find one here as well.
+/// Answers for `QrImporter` too, for hosts that do not know `MeshImporter`.
 class Importer final
     : public QrCastRef<QrCastHeap<
           QrCastImpl2<Importer, MeshImporter, Kit::BaseInterface<Importer, QrImporter>>>> {};

@@ -1,3 +1,6 @@
+/// The component that makes scenes and stored meshes. Objects that are loaded from a stream are
+/// made here: each builder has the uid of the class, by which the object IO finds it. Import
+/// builders cannot do that, since they need a file.
 #include "reading/meshObject.h"
 #include "sceneObject.h"
 
@@ -6,7 +9,6 @@
 using namespace Mz;
 using namespace Meshes;
 
-// What is loaded from a stream is made here: the builders bear the uids of the classes.
 MZ_COMPONENT(L"Mesh scenes", L"Scenes of meshes, and meshes that were stored",
              Kit::builderOf<MeshObject>(
                  {.uid = storedMeshUid, .name = L"stored mesh", .label = L"Stored mesh"}),

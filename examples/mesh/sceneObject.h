@@ -1,4 +1,4 @@
-/// The scene as an object.
+/// The implementation of `Scene`: a counted, persistent object.
 #pragma once
 
 #include "scene.h"
@@ -19,7 +19,9 @@ class SceneObject final
     const Mz::QrUid* getClassUid() const override { return &sceneUid; }
     unsigned int getVersion() const override { return 1; }
     void write(Mz::QrStream& stream) override;
-    /// Raises `QrStreamEx::ExReadError`, and changes nothing, when the data is no scene.
+    /// Replaces the instances by those in the stream.
+    ///
+    /// \throws QrStreamEx::ExReadError if the data is not a scene; the object is then unchanged
     void read(Mz::QrStream& stream) override;
 
   private:

@@ -1,5 +1,5 @@
-/// What a program with a command line needs of the system: one description, and one implementation
-/// for each system, chosen by the build.
+/// The system functions of a command-line program: one declaration, and one implementation per
+/// system, selected by the build.
 #pragma once
 
 #include <filesystem>
@@ -9,15 +9,15 @@
 
 namespace Meshes::console {
 
-/// Makes the standard output and error write bytes as they are given, line ends included, so that
-/// the same output is the same file everywhere. Call it before anything is written.
+/// Makes the standard output and error write bytes unchanged, line ends included, so that the
+/// output is the same on every system. Call it before anything is written.
 void useBinaryOutput();
 
-/// The program's arguments, without its name, with every character that the user typed.
+/// Returns the arguments of the program, without its name and without loss of characters.
 std::vector<std::filesystem::path> arguments(int argc, char** argv);
 
-/// Text in the form of the library's names, as it is written to the standard output: on Linux the
-/// bytes of a name are its own again, on Windows it is UTF-8.
+/// Returns text as it is written to the standard output; the reverse of `Kit::wideName`. On Linux
+/// the bytes of a name are unchanged, on Windows the output is UTF-8.
 std::string outputText(std::wstring_view text);
 
 } // namespace Meshes::console

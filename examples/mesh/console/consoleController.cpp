@@ -1,3 +1,6 @@
+/// The smallest controller that a user can read: texts become lines, `error` counts and returns
+/// false, `abort` throws. `findFile` is forwarded to the previous controller, because importers
+/// find nothing without it.
 #include "consoleController.h"
 
 #include "console.h"
@@ -61,7 +64,7 @@ std::wstring ConsoleController::findFile(const wchar_t* fileName, const wchar_t*
 }
 
 void ConsoleController::writeLine(const char* kind, const wchar_t* text) {
-    // What was written before stands before, also where both streams go to one place.
+    // Keeps the order of the lines if both streams go to one terminal or file.
     std::cout.flush();
     std::cerr << kind << outputOf(text) << std::endl;
 }

@@ -1,22 +1,21 @@
-/// A process controller that can be read, for programs with a command line.
+/// A process controller for command-line programs, which prints texts.
 #pragma once
 
 #include "components/componentManager/processControl.h"
 
 namespace Meshes {
 
-/// Writes every text as a line of its own to the standard error, and progress, when it is asked to,
-/// as a percentage that is written over by the next. Files are looked for by the controller that it
-/// stands in for. For one thread.
+/// Writes every text as a line to the standard error and, if requested, progress as a percentage
+/// that the next one overwrites. The previous controller finds files. For use by one thread.
 class ConsoleController final : public Mz::QrCastImpl<ConsoleController, Mz::QrProcessControl> {
   public:
-    /// Installs itself as the system-wide controller, and takes itself out again at its end.
+    /// Installs itself as the system-wide controller. The destructor restores the previous one.
     explicit ConsoleController(bool showProgress);
     ~ConsoleController() override;
     ConsoleController(const ConsoleController&) = delete;
     ConsoleController& operator=(const ConsoleController&) = delete;
 
-    /// How many errors were reported so far.
+    /// Returns the number of errors reported so far.
     int errorCount() const { return errors; }
 
     void* getContext() override { return nullptr; }

@@ -1,3 +1,7 @@
+/// Reads one statement per line, in one pass. Indices are converted to absolute ones at once, since
+/// negative ones depend on the number of elements read so far; whether an index is too large is
+/// known only at the end, when `MeshBuilder` checks it. Unknown statements are errors, and not
+/// skipped, so that a file of another format is not taken for an empty mesh.
 #include "objFormat.h"
 
 #include "examples/mesh/reading/failure.h"
@@ -14,7 +18,7 @@ namespace {
 
 constexpr TextReader::Rules objRules{.comments = true, .continuations = true};
 
-/// The statements of the format that say nothing of polygons.
+/// The statements of the format that do not concern polygons. They are skipped.
 constexpr std::array<std::string_view, 40> otherStatements{
     "g",         "o",      "s",     "usemtl",   "mtllib",   "p",      "l",      "vp",
     "mg",        "lod",    "bevel", "c_interp", "d_interp", "usemap", "maplib", "shadow_obj",
@@ -26,7 +30,7 @@ bool isOtherStatement(std::string_view word) {
     return std::ranges::find(otherStatements, word) != otherStatements.end();
 }
 
-/// The index that a corner names, counted from 0. `count` elements came before it.
+/// Returns the index that `digits` names, from 0. `count` is the number of elements read so far.
 std::uint32_t readIndex(const TextReader& text, std::string_view digits, std::size_t count) {
     const std::optional<std::int64_t> number = parseInteger(digits);
     if (!number)
@@ -43,7 +47,7 @@ std::uint32_t readIndex(const TextReader& text, std::string_view digits, std::si
     return static_cast<std::uint32_t>(index);
 }
 
-/// One of the forms a, a/b, a//c and a/b/c.
+/// Reads a corner in one of the forms a, a/b, a//c and a/b/c.
 Mesh::Corner readCorner(const TextReader& text, const MeshBuilder& mesh) {
     const std::string_view word = text.word();
     const std::size_t slash = std::min(word.find('/'), word.size());
@@ -73,7 +77,7 @@ Mesh::Point readPoint(TextReader& text) {
     return {x, y, text.nextNumber("z")};
 }
 
-/// Passes over at most `count` further numbers, which the line need not have.
+/// Skips up to `count` optional numbers. Anything else on the line is an error.
 void skipNumbers(TextReader& text, int count) {
     while (text.nextWord()) {
         if (!parseFloat(text.word()))
@@ -98,7 +102,7 @@ void readStatement(TextReader& text, MeshBuilder& mesh) {
     const std::string_view keyword = text.word();
     if (keyword == "v") {
         mesh.addVertex(readPoint(text));
-        skipNumbers(text, 5); // a weight, or a colour, or both
+        skipNumbers(text, 5); // An optional weight, colour, or both.
     } else if (keyword == "vn") {
         mesh.addNormal(readPoint(text));
         skipNumbers(text, 0);

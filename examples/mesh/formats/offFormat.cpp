@@ -1,3 +1,6 @@
+/// Reads the header, the counts, and then as many lines as the counts state. The counts only end
+/// the loops: they reserve no memory, so a false count ends in a message at the end of the file.
+/// Only the header states which values a vertex has, so it is parsed into flags first.
 #include "offFormat.h"
 
 #include "examples/mesh/reading/failure.h"
@@ -12,7 +15,7 @@ namespace {
 
 constexpr TextReader::Rules offRules{.comments = true, .continuations = false};
 
-/// What the header's word says of each vertex: [ST][C][N][4][n]OFF.
+/// The values of each vertex, as the first word of the file states them: [ST][C][N][4][n]OFF.
 struct Header {
     bool texCoords = false;
     bool colours = false;
@@ -37,7 +40,7 @@ std::optional<Header> parseHeader(std::string_view word) {
     return word == "OFF" ? std::optional(header) : std::nullopt;
 }
 
-/// Passes over the numbers of a colour, which the line need not have.
+/// Skips the optional numbers of a colour.
 void skipColour(TextReader& text, std::size_t atMost) {
     for (std::size_t count = 0; text.nextWord(); ++count) {
         if (!parseFloat(text.word()))

@@ -1,3 +1,6 @@
+/// Reads the elements in the order of the header. The layout of a vertex is computed once, as one
+/// role per property, so that the loop over the data compares no names. `PlyValues` hides whether
+/// the values are text or binary.
 #include "plyFormat.h"
 
 #include "plyValues.h"
@@ -14,7 +17,7 @@ namespace {
 
 // ---- Vertices -------------------------------------------------------------------------------
 
-/// What a property of a vertex is for: a place among the values below, or nothing.
+/// The meaning of a vertex property: an index into the values of a vertex, or `roleCount` for none.
 enum Role : std::size_t { X, Y, Z, NormalX, NormalY, NormalZ, U, V, roleCount };
 
 struct RoleName {
@@ -40,7 +43,7 @@ Role roleOf(const PlyProperty& property) {
     return found == roleNames.end() || property.isList ? roleCount : found->role;
 }
 
-/// How the vertices of a file look.
+/// The properties of the vertices of a file.
 struct VertexLayout {
     std::vector<Role> roles; ///< of each property
     std::array<bool, roleCount> present{};
@@ -58,7 +61,7 @@ VertexLayout layoutOf(const PlyElement& element) {
     for (const PlyProperty& property : element.properties) {
         Role role = roleOf(property);
         if (role != roleCount && layout.present[role])
-            role = roleCount; // The first of two names for one thing is taken.
+            role = roleCount; // The first of two properties with the same role counts.
         if (role != roleCount)
             layout.present[role] = true;
         layout.roles.push_back(role);
@@ -165,7 +168,7 @@ void PlyFormat::read(ByteReader& bytes, MeshBuilder& mesh) const {
     checkHeader(header, layout);
     const std::unique_ptr<PlyValues> values = makePlyValues(header, bytes);
     for (const PlyElement& element : header.elements) {
-        // An element without properties has no data, however many of it there are said to be.
+        // Without properties there is no data. The count may be huge, so the loop must not run.
         const std::uint32_t count = element.properties.empty() ? 0 : element.count;
         for (std::uint32_t index = 0; index < count; ++index) {
             values->beginItem(element, index);

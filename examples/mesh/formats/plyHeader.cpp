@@ -1,3 +1,6 @@
+/// Reads the header byte by byte, because binary data may follow at once: no byte after the last
+/// line end may be consumed. The header has its own line reader for this reason, with limits on the
+/// length of a line and on the number of declarations.
 #include "plyHeader.h"
 
 #include "examples/mesh/reading/failure.h"
@@ -28,12 +31,13 @@ constexpr std::array<TypeName, 8> typeNames{{{"char", "int8", 1},
                                              {"float", "float32", 4},
                                              {"double", "float64", 8}}};
 
-/// The header's lines, in words.
+/// Reads the lines of the header and splits them into words.
 class HeaderReader {
   public:
     explicit HeaderReader(ByteReader& bytes) : bytes(bytes) {}
 
-    /// The words of the next line. Gives up at the end of the data.
+    /// Returns the words of the next line; valid until the next call. Throws `ImportFailure` at the
+    /// end of the data.
     const std::vector<std::string>& nextLine();
 
     std::uint64_t lines() const { return lineNumber; }
@@ -43,7 +47,7 @@ class HeaderReader {
     }
 
   private:
-    /// Longer lines are no lines of a header; of comments, no more is kept.
+    /// A longer line is an error, except a comment, of which the rest is dropped.
     static constexpr std::size_t longestLine = 4096;
 
     bool endsLine(int byte);
@@ -57,8 +61,8 @@ class HeaderReader {
     char lineEnd = 0;
 };
 
-/// Data may begin with a byte that looks like the second half of a line end. So the first line's
-/// end tells what the others look like.
+/// The first line end determines the form of the others: after the last one, a byte of data may
+/// look like the second half of a CR LF.
 bool HeaderReader::endsLine(int byte) {
     if (lineEnd == 0 && byte == '\r' && bytes.peek() != '\n')
         lineEnd = '\r';
@@ -139,7 +143,7 @@ PlyProperty parseProperty(const HeaderReader& reader, const std::vector<std::str
 
 template <class T>
 void addNamed(const HeaderReader& reader, std::vector<T>& list, T added) {
-    constexpr std::size_t most = 1000; // far beyond any use, and soon searched
+    constexpr std::size_t most = 1000; // Few enough for a linear search.
     if (list.size() == most)
         reader.fail("more than " + std::to_string(most) + " of one kind");
     if (std::ranges::find(list, added.name, &T::name) != list.end())
@@ -147,7 +151,7 @@ void addNamed(const HeaderReader& reader, std::vector<T>& list, T added) {
     list.push_back(std::move(added));
 }
 
-/// Adds what a line says of the data.
+/// Adds the declaration in a line to the header.
 void readDeclaration(const HeaderReader& reader, const std::vector<std::string>& words,
                      PlyHeader& header) {
     if (words[0] == "element") {

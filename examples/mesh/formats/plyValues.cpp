@@ -1,3 +1,6 @@
+/// One implementation reads text, the other binary data, so that the code for vertices and faces is
+/// the same for both. Text goes through `TextReader`, one item per line; binary values are
+/// assembled byte by byte, which works for both byte orders on any machine.
 #include "plyValues.h"
 
 #include "examples/mesh/mesh.h"
@@ -73,7 +76,7 @@ class TextValues final : public PlyValues {
     }
 
     TextReader text;
-    bool atFirstWord = false; ///< the item's first word was taken with its line
+    bool atFirstWord = false; ///< `nextLine` has read the first word of the item
 };
 
 class BinaryValues final : public PlyValues {
@@ -119,8 +122,8 @@ class BinaryValues final : public PlyValues {
     }
 
   private:
-    /// Every type's values are exact as `double`. Too large a `double` for a `float` is infinite
-    /// there, which the conversion's rules leave open.
+    /// Reads a value of any type: a `double` represents all of them exactly. A `double` beyond the
+    /// range of `float` becomes infinite, because its conversion to `float` would be undefined.
     double take(PlyType type) {
         std::array<unsigned char, 8> buffer;
         const std::span<unsigned char> data(buffer.data(), sizeOf(type));

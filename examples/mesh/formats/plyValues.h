@@ -1,4 +1,4 @@
-/// The values behind the header of a PLY file, in whichever encoding.
+/// Reads the values after the header of a PLY file, in any encoding.
 #pragma once
 
 #include "plyHeader.h"
@@ -7,36 +7,37 @@
 
 namespace Meshes {
 
-/// Gives out the values one after the other, in the order and with the types that the header
-/// declares. Every operation gives up where the data ends or makes no sense.
+/// Reads values one after the other. The caller requests them in the order and with the types that
+/// the header declares. Every operation throws `ImportFailure` if the data ends or is invalid.
 class PlyValues {
   public:
     virtual ~PlyValues() = default;
 
-    /// Goes to the next item of an element; `index` says which, counted from 0.
+    /// Starts the next item of an element. `index` is its number, from 0, for messages.
     virtual void beginItem(const PlyElement& element, std::uint32_t index) = 0;
-    /// Says that all values of the item were taken.
+    /// Ends the item: all its values were read.
     virtual void endItem() = 0;
 
-    /// A value that has to be finite, as a `float`.
+    /// Reads a value as a `float`, which must be finite.
     virtual float number(PlyType type) = 0;
-    /// A value that has to be an integer from 0 to 4294967294: an index, or the length of a list.
+    /// Reads an index or the length of a list: an integer from 0 to 4294967294.
     virtual std::uint32_t index(PlyType type) = 0;
-    /// Passes over `count` values.
+    /// Skips `count` values.
     virtual void skip(PlyType type, std::uint32_t count) = 0;
 
-    /// Where the item begins, as "line" or "byte" and its number.
+    /// Returns the position of the current item: "line" or "byte", and its number.
     virtual const char* unit() const = 0;
     virtual std::uint64_t place() const = 0;
 
-    /// Gives up, saying that place.
+    /// Throws `ImportFailure` with the position of the current item.
     [[noreturn]] void fail(const std::string& what) const;
 
-    /// Gives up unless the data ends here, but for white space.
+    /// Throws `ImportFailure` unless only white space follows.
     virtual void expectEnd() = 0;
 };
 
-/// The values behind `header`, of which `bytes` has just been read.
+/// Returns a reader of the values after `header`. `bytes` must be positioned at their beginning,
+/// and must outlive the result.
 std::unique_ptr<PlyValues> makePlyValues(const PlyHeader& header, ByteReader& bytes);
 
 } // namespace Meshes

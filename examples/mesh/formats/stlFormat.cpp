@@ -1,3 +1,6 @@
+/// Decides between text and binary first by the size of the data, which binary files state, and
+/// then by NUL bytes in the header; the word "solid" proves nothing, since binary files may begin
+/// with it too. A hash map from coordinates to indices joins equal points while they are read.
 #include "stlFormat.h"
 
 #include "examples/mesh/reading/binaryValue.h"
@@ -22,7 +25,7 @@ constexpr std::size_t titleSize = 80;
 constexpr std::size_t headerSize = 84;
 constexpr std::size_t facetSize = 50;
 
-/// Gives points of the same coordinates one vertex of the mesh.
+/// Maps points with equal coordinates to one vertex of the mesh.
 class Welder {
   public:
     explicit Welder(MeshBuilder& mesh) : mesh(mesh) {}
@@ -40,7 +43,7 @@ class Welder {
         std::size_t operator()(const Mesh::Point& point) const {
             std::uint64_t hash = 0;
             for (const float coordinate : {point.x, point.y, point.z}) {
-                // Both zeros are the same place.
+                // +0 and -0 are equal, so they need one hash.
                 const auto bits = std::bit_cast<std::uint32_t>(coordinate + 0.0F);
                 hash = (hash ^ bits) * 0x9E3779B97F4A7C15U;
                 hash ^= hash >> 29;
@@ -59,16 +62,16 @@ std::uint64_t binarySize(std::uint64_t facets) {
     return headerSize + facetSize * facets;
 }
 
-/// Whether the size is exactly what the count of facets asks for, as it is in no text: there, the
-/// count's four characters ask for more than 25 gigabytes.
+/// Returns whether the size is exactly that of the count of facets. No text passes this test: four
+/// characters of text, read as the count, mean more than 25 gigabytes.
 bool hasBinarySize(ByteReader& bytes) {
     const std::span<const unsigned char> header = bytes.lookAhead(headerSize);
     return header.size() == headerSize && bytes.size() &&
            *bytes.size() == binarySize(unsignedValue(header.subspan(titleSize), false));
 }
 
-/// Whether a NUL stands where text would have none and a binary header has one as a rule, be it
-/// behind the title or in the upper bytes of the count.
+/// Returns whether the header contains a NUL. Text has none there; a binary header has one as a
+/// rule, after the title or in the upper bytes of the count.
 bool hasBinaryHeader(ByteReader& bytes) {
     const std::span<const unsigned char> header = bytes.lookAhead(headerSize);
     return std::ranges::find(header, 0) != header.end();
@@ -79,7 +82,7 @@ bool isWord(std::string_view word, std::string_view keyword) {
     return std::ranges::equal(word, keyword, {}, lower);
 }
 
-/// Whether `word` is a keyword or, where the data ended too early, the beginning of one.
+/// Returns whether `word` is a keyword or the beginning of one, as in truncated data.
 bool beginsKeyword(std::string_view word) {
     const auto begins = [&](std::string_view keyword) {
         return isWord(word, keyword.substr(0, word.size()));
@@ -111,7 +114,7 @@ void expectWord(TextReader& text, std::string_view keyword) {
         text.fail("the line lacks the word " + quoted(keyword));
 }
 
-/// The normal of a facet without an area may be no number at all.
+/// Skips a normal, which is not-a-number for some facets without an area.
 void skipNormal(TextReader& text) {
     expectWord(text, "normal");
     for (int count = 0; count < 3; ++count) {
@@ -132,7 +135,7 @@ Mesh::Point readTextPoint(TextReader& text) {
     return point;
 }
 
-/// The rest of a facet, whose keyword was taken.
+/// Reads the rest of a facet, after its keyword.
 void readTextFacet(TextReader& text, Welder& welder, MeshBuilder& mesh) {
     const std::uint64_t line = text.line();
     skipNormal(text);

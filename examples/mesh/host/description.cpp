@@ -1,3 +1,5 @@
+/// Casts the object to each interface that the host knows, and prints it. Numbers are formatted by
+/// `std::to_chars`, so that the output is the same under every locale and on every system.
 #include "description.h"
 
 #include "examples/mesh/console/console.h"
@@ -13,7 +15,7 @@ namespace Meshes {
 
 namespace {
 
-/// With the fewest digits that are read as that very number again, the same on every system.
+/// Writes the fewest digits that are read back as the same number.
 void writeNumber(float number) {
     char text[32];
     std::cout << std::string_view(text, std::to_chars(text, text + sizeof text, number).ptr);

@@ -1,4 +1,4 @@
-/// What the host says of the objects that it holds, a line for each, the same on every system.
+/// Prints one line about an object, the same on every system.
 #pragma once
 
 #include "components/componentManager/cast.h"
@@ -7,10 +7,10 @@
 
 namespace Meshes {
 
-/// Writes a line about a mesh or a scene to the standard output.
+/// Writes one line about a mesh or a scene, after `name`, to the standard output.
 void describe(const std::string& name, Mz::QrCastable& object);
 
-/// "1 mesh", "2 meshes".
+/// Returns a count with its noun, such as "1 mesh" or "2 meshes".
 std::string counted(std::size_t count, const char* one, const char* several);
 
 } // namespace Meshes

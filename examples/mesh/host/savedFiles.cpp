@@ -1,3 +1,6 @@
+/// Saves each object in both forms, loads it and compares: the example shows that both forms are
+/// exact. Equal scenes must also share their meshes in the same way, so the comparison keeps a map
+/// between the meshes of both, in both directions.
 #include "savedFiles.h"
 
 #include "description.h"
@@ -22,7 +25,7 @@ namespace {
 constexpr const char* binaryExtension = ".binary";
 constexpr const char* textExtension = ".text";
 
-/// Equal scenes share their meshes in the same way.
+/// Returns whether two scenes are equal and share their meshes in the same way.
 bool areEqual(const Scene& a, const Scene& b) {
     std::map<const Mesh*, const Mesh*> counterparts;
     std::map<const Mesh*, const Mesh*> back;
@@ -43,7 +46,7 @@ bool areEqual(const Scene& a, const Scene& b) {
     return a.instanceCount() == b.instanceCount();
 }
 
-/// Saves an object in both forms as `name` with their extensions, and compares what comes back.
+/// Saves an object in both forms, as `name` with an extension, loads it and compares.
 template <class Kind>
 void saveAndCompare(const std::filesystem::path& name, Kind& object) {
     const auto saveAs = [&](const char* extension, Form form) {

@@ -1,4 +1,4 @@
-/// What the host saves, and reads back.
+/// The files that the host saves and loads.
 #pragma once
 
 #include "examples/mesh/scene.h"
@@ -8,18 +8,19 @@
 
 namespace Meshes {
 
-/// Saves meshes, each in binary and as text, to files in one folder, and at the end a scene of all
-/// of them. Whatever was saved is read back and compared; a line about it is written to the
-/// standard output. Failures are `QrStreamEx`, or a `std::runtime_error` when what came back is not
-/// equal.
+/// Saves meshes, each in binary and as text, to files in one folder, and a scene of all of them.
+///
+/// Each file is loaded again and compared, and one line about it goes to the standard output. The
+/// operations throw `QrStreamEx`, and `std::runtime_error` if the loaded object is not equal.
 class SavedFiles {
   public:
-    /// Makes the folder, where there is none.
+    /// Creates the folder, if it does not exist.
     explicit SavedFiles(std::filesystem::path folder);
 
-    /// Saves the mesh that was imported from `file`, and places it in the scene, twice.
+    /// Saves the mesh that was imported from `file`, and adds two instances of it to the scene.
     void save(const std::filesystem::path& file, const Mz::QrPtr<Mesh>& mesh);
 
+    /// Saves the scene.
     void saveScene();
 
   private:
@@ -28,10 +29,10 @@ class SavedFiles {
     int meshes = 0;
 };
 
-/// Everything in the folder that a `SavedFiles` may have put there, in the order of the names.
+/// Returns the files in the folder that have the extensions of saved files, sorted by name.
 std::vector<std::filesystem::path> savedFiles(const std::filesystem::path& folder);
 
-/// Reads one of these files and writes a line about it. Failures are as those of `SavedFiles`.
+/// Loads one of these files and prints one line about it. Throws as the operations of `SavedFiles`.
 void loadSavedFile(const std::filesystem::path& file);
 
 } // namespace Meshes

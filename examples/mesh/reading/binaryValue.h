@@ -1,4 +1,4 @@
-/// Numbers in binary data, of either byte order, whatever this machine's own is.
+/// Conversion of numbers from binary data in either byte order, on a machine of any byte order.
 #pragma once
 
 #include <bit>
@@ -7,7 +7,7 @@
 
 namespace Meshes {
 
-/// The unsigned number in `bytes`, of which there are at most eight.
+/// Returns the unsigned number in `bytes`, which has at most eight elements.
 inline std::uint64_t unsignedValue(std::span<const unsigned char> bytes, bool bigEndian) {
     std::uint64_t value = 0;
     for (std::size_t index = 0; index < bytes.size(); ++index)
@@ -15,7 +15,7 @@ inline std::uint64_t unsignedValue(std::span<const unsigned char> bytes, bool bi
     return value;
 }
 
-/// The IEEE number of 32 bits in `bytes`, of which there are four.
+/// Returns the 32-bit IEEE number in `bytes`, which has four elements.
 inline float floatValue(std::span<const unsigned char> bytes, bool bigEndian) {
     return std::bit_cast<float>(static_cast<std::uint32_t>(unsignedValue(bytes, bigEndian)));
 }

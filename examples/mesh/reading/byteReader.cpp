@@ -1,3 +1,6 @@
+/// Fills one block of 64 KiB at a time. A block is the unit of progress and of interruption, so a
+/// large file costs one virtual call per block and not one per byte. The size of the data is found
+/// by seeking to its end and back; without it the progress stays at 0.
 #include "byteReader.h"
 
 #include "failure.h"
@@ -19,7 +22,7 @@ std::string quoted(std::string_view word) {
 
 namespace {
 
-/// How many bytes there are from here on. The IO stands where it stood afterwards.
+/// Returns the number of bytes from the current position to the end. Restores the position.
 std::optional<std::uint64_t> remainingBytes(Mz::QrBufferedIO& io) {
     const Mz::int64 begin = io.tell();
     if (begin < 0)

@@ -1,4 +1,4 @@
-/// Bytes from a buffered IO, block by block, with progress.
+/// Reads bytes from a buffered IO, block by block, and reports progress.
 #pragma once
 
 #include "components/componentManager/bufferio.h"
@@ -15,37 +15,42 @@ class QrProcessControl;
 
 namespace Meshes {
 
-/// Reads from where the IO stands to its end, in blocks of a fixed size, whatever the data says of
-/// itself. The IO's own exceptions pass through.
+/// Reads from the current position of the IO to its end. Blocks have a fixed size, whatever counts
+/// the data contains. Exceptions of the IO pass through.
 class ByteReader {
   public:
+    /// The result of `peek` and `get` at the end of the data.
     static constexpr int end = -1;
 
-    /// With a controller, each block is reported as progress, and asks whether to go on: when not,
-    /// `ImportInterrupted` is thrown. Null reports nothing.
+    /// Starts at the current position of `io`.
+    ///
+    /// \param controller receives progress before each block; reading throws `ImportInterrupted` if
+    ///     it is interrupted or its `progress` returns false. Null reports nothing.
     explicit ByteReader(Mz::QrBufferedIO& io, Mz::QrProcessControl* controller = nullptr);
 
-    /// The next byte, 0 to 255, or `end`; `peek` leaves it where it is.
+    /// Returns the next byte, 0 to 255, or `end`. `peek` does not consume it.
     int peek() { return position < filled || fill() ? block[position] : end; }
     int get() { return position < filled || fill() ? block[position++] : end; }
 
-    /// Up to `count` of the next bytes, which stay where they are. Before anything was read these
-    /// are fewer only at the end of the data, or beyond a block (64 KiB).
+    /// Returns up to `count` of the next bytes, without consuming them. If nothing was read before,
+    /// the result is shorter only at the end of the data or if `count` exceeds a block (64 KiB).
     std::span<const unsigned char> lookAhead(std::size_t count);
 
-    /// Fills `bytes` and returns how many came; fewer only at the end of the data.
+    /// Fills `bytes` and returns the number of bytes read; less than its size only at the end of
+    /// the data.
     std::size_t read(std::span<unsigned char> bytes);
-    /// Passes over `count` bytes and returns how many there were.
+    /// Skips up to `count` bytes and returns the number of bytes skipped.
     std::uint64_t skip(std::uint64_t count);
 
-    /// Passes over the mark that some editors put in front of Unicode text.
+    /// Skips a UTF-8 byte order mark, if there is one.
     void skipByteOrderMark();
 
-    /// How many bytes were read so far, and how many there are in all, where the IO can tell.
+    /// Returns the number of bytes read so far.
     std::uint64_t offset() const { return blockOffset + position; }
+    /// Returns the total number of bytes; nothing if the IO cannot seek.
     std::optional<std::uint64_t> size() const { return total; }
 
-    /// Gives up with the reason "byte 123: what", where 123 is `at`.
+    /// Throws `ImportFailure` with the reason "byte 123: what", where 123 is `at`.
     [[noreturn]] static void fail(std::uint64_t at, const std::string& what);
 
   private:
@@ -60,7 +65,7 @@ class ByteReader {
     std::size_t position = 0;
     std::size_t filled = 0;
     std::uint64_t blockOffset = 0;
-    bool ended = false; ///< nothing comes behind this block
+    bool ended = false; ///< no block follows this one
     std::optional<std::uint64_t> total;
 };
 

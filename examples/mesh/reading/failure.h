@@ -1,4 +1,4 @@
-/// How reading code gives up: by an exception that never leaves the builder.
+/// The exceptions of reading code, which never leave the builder.
 #pragma once
 
 #include <string>
@@ -6,16 +6,16 @@
 
 namespace Meshes {
 
-/// The data is not what it should be. The builder tells the user and gives no object.
+/// Thrown when the data is invalid. The builder reports the reason and returns null.
 struct ImportFailure {
-    std::string reason; ///< where and what, in plain ASCII
+    std::string reason; ///< position and fault, in ASCII
 };
 
-/// The user wants the work to stop. There is nothing to tell.
+/// Thrown when the user stops the import. The builder returns null and reports nothing.
 struct ImportInterrupted {};
 
-/// `word` as it may be shown: in quotes, cut to a length that fits a line, with everything that is
-/// not printable ASCII replaced.
+/// Returns `word` for a message: in quotes, truncated to 40 characters, with a question mark in
+/// place of every byte that is not printable ASCII.
 std::string quoted(std::string_view word);
 
 } // namespace Meshes

@@ -1,3 +1,6 @@
+/// Calls a format and translates its outcome. The exceptions of the formats end here: they become
+/// an error of the process controller and a null result, because callers in other libraries know
+/// neither these exceptions nor the formats.
 #include "importMesh.h"
 
 #include "failure.h"
@@ -22,7 +25,7 @@ wchar_t lowerAscii(wchar_t c) {
     return c >= L'A' && c <= L'Z' ? static_cast<wchar_t>(c - L'A' + L'a') : c;
 }
 
-/// Whether `path` ends in "." and `extension`, which is in lower case.
+/// Returns whether `path` ends with "." and `extension`, ignoring case. `extension` is lower case.
 bool hasExtension(std::wstring_view path, std::wstring_view extension) {
     if (path.size() <= extension.size())
         return false;
@@ -41,7 +44,7 @@ void report(Mz::QrProcessControl* controller, const wchar_t* path, std::string_v
     controller->error(0, text.c_str());
 }
 
-/// The end of the work, as the user sees it.
+/// Reports that the import is complete.
 void reportDone(Mz::QrProcessControl* controller) {
     if (controller && controller->isProgressShown())
         controller->progress(1.0F, L"Reading");

@@ -1,4 +1,4 @@
-/// What all builders of the family do around the reading of their own format.
+/// The part of an import that is common to all mesh formats: recognition, failures and progress.
 #pragma once
 
 #include "byteReader.h"
@@ -8,28 +8,34 @@
 
 namespace Meshes {
 
-/// One format: how to tell it and how to read it.
+/// The interface of a format.
 class MeshFormat {
   public:
-    /// Whether the data is of this format. `named` says that the file's extension is the format's:
-    /// then damaged data that can hardly be anything else is better accepted, so that its reading
-    /// tells what is wrong with it. Otherwise only data that is clearly of this format is.
+    /// Returns whether the data has this format.
+    ///
+    /// \param named whether the file has the extension of the format. If so, accept damaged data
+    ///     that can hardly be anything else: `read` then reports the damage. Otherwise accept only
+    ///     data that certainly has this format.
     virtual bool recognises(ByteReader& bytes, bool named) const = 0;
 
-    /// Reads the data into `mesh`, or gives up with an `ImportFailure`.
+    /// Reads the data into `mesh`.
+    ///
+    /// \throws ImportFailure if the data is invalid
     virtual void read(ByteReader& bytes, MeshBuilder& mesh) const = 0;
 
   protected:
     ~MeshFormat() = default;
 };
 
-/// Whether the data of `io` is of this format; false when it cannot be read.
+/// Returns whether the data of `io` has this format; false if it cannot be read.
 bool recognisesMesh(const MeshFormat& format, Mz::QrBufferedIO& io, const wchar_t* path,
                     const wchar_t* extension);
 
-/// The mesh in `io`, or null. Reports progress to the thread's process controller, and there as an
-/// error, "path: place: reason", whatever is wrong with the data, its reading or the memory for it.
-/// Null without an error means that the user wants no more.
+/// Returns the mesh in `io`, or null. The caller owns the reference.
+///
+/// Reports progress to the process controller of the thread. Invalid data, a failure of the IO and
+/// a lack of memory are reported there as an error, "path: position: reason". Null without an error
+/// means that the user stopped the import.
 Mz::QrRef<Mz::QrCastable> importMesh(const MeshFormat& format, Mz::QrBufferedIO& io,
                                      const wchar_t* path, const wchar_t* label);
 

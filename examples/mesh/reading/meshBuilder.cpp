@@ -1,3 +1,6 @@
+/// Checks indices once, at the end: for each kind of element it remembers the largest index and the
+/// first face that used it. That costs one comparison per corner, needs no second pass over the
+/// faces, and still names the position of the fault.
 #include "meshBuilder.h"
 
 #include "failure.h"
@@ -8,7 +11,7 @@ namespace Meshes {
 
 namespace {
 
-/// Adds to one of the lists whose indices are 32 bits wide, the largest of which means none.
+/// Appends to a list whose indices have 32 bits. The largest index is `Mesh::absent`.
 template <class T>
 void append(std::vector<T>& list, const T& element) {
     if (list.size() >= Mesh::absent)

@@ -1,4 +1,4 @@
-/// Puts a mesh together as its file is read.
+/// Collects the elements of a mesh while its file is read.
 #pragma once
 
 #include "meshObject.h"
@@ -7,7 +7,10 @@
 
 namespace Meshes {
 
-/// Collects a mesh. Faces may name vertices that come later; `finish` finds those that never came.
+/// Collects a mesh. A face may refer to vertices that follow it; `finish` checks that all exist.
+///
+/// `addVertex`, `addTexCoord` and `addNormal` throw `ImportFailure` if 32-bit indices do not
+/// suffice.
 class MeshBuilder {
   public:
     std::size_t vertexCount() const { return data.vertices.size(); }
@@ -18,24 +21,28 @@ class MeshBuilder {
     void addTexCoord(Mesh::TexCoord texCoord);
     void addNormal(Mesh::Point normal);
 
-    /// Adds a corner to the face that is being read.
+    /// Adds a corner to the current face.
     void addCorner(const Mesh::Corner& corner);
 
-    /// The corners of the face that is being read.
+    /// Returns the corners of the current face; valid until one is added.
     std::span<Mesh::Corner> openFace();
 
-    /// Ends that face. `place` says where it stands in the file ("line 12") when an index in it
-    /// turns out to be wrong. Gives up at once when it has fewer than three corners.
+    /// Ends the current face. `unit` and `place` are its position in the file ("line", 12), for the
+    /// failure that `finish` throws if one of its indices is invalid. `unit` is not copied.
+    ///
+    /// \throws ImportFailure if the face has fewer than three corners
     void endFace(const char* unit, std::uint64_t place);
 
-    /// Gives up when a face names something that does not exist; else gives the mesh away.
+    /// Moves the mesh out of the builder, which must not be used after that.
+    ///
+    /// \throws ImportFailure if a face refers to an element that does not exist
     MeshData finish();
 
-    /// Numbers begin at this in the format's files, and so in what is said about them.
+    /// Sets the first index of the format, for messages; 0 by default.
     void countFrom(unsigned int first) { firstIndex = first; }
 
   private:
-    /// The largest index that was used, and the face that used it first.
+    /// The largest index used so far, and the position of the first face that used it.
     struct Largest {
         std::int64_t index = -1;
         const char* unit = "";

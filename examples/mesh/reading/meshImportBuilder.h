@@ -1,4 +1,4 @@
-/// The import builder of a mesh format: the one thing that a component of the family has to name.
+/// The import builder of a mesh format, as each component of the family describes it.
 #pragma once
 
 #include "importMesh.h"
@@ -7,7 +7,8 @@
 
 namespace Meshes {
 
-/// `Format` is a `MeshFormat` with three constants: `uid`, `label` and `extension`.
+/// An import builder for `Format`, a `MeshFormat` with the constants `uid`, `label` and
+/// `extension`.
 template <class Format>
 class MeshImportBuilder final : public Mz::Kit::ImportBuilder<MeshImportBuilder<Format>> {
   public:

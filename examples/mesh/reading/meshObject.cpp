@@ -1,3 +1,6 @@
+/// Stores a mesh as lists of plain values, each with its count, in blocks: one stream call per 1024
+/// elements instead of one per value. Reading trusts no count: lists grow as blocks arrive, every
+/// value and index is checked, and the object is changed only when the whole mesh is valid.
 #include "meshObject.h"
 
 #include "components/objectIO/objectIO.h"
@@ -21,10 +24,10 @@ constexpr const char* source = "examples/mesh/reading/meshObject";
     throw QrStreamEx::ExReadError(source, line, what);
 }
 
-/// Lists are written and read in blocks of so many elements.
+/// The number of elements in a block.
 constexpr std::size_t blockSize = 1024;
 
-/// The values that an element of a list consists of.
+/// The type of the values of which an element of a list consists.
 template <class Element>
 using ValueOf = std::conditional_t<std::is_same_v<Element, Mesh::Corner>, unsigned int, float>;
 template <class Element>
@@ -38,7 +41,7 @@ void writeCount(QrStream& stream, std::size_t count) {
     stream << static_cast<unsigned int>(count);
 }
 
-/// The elements without their number.
+/// Writes the elements without their count.
 template <class Element>
 void writeElements(QrStream& stream, std::span<const Element> elements) {
     std::array<ValueOf<Element>, blockSize * valueCount<Element>> block;
@@ -58,7 +61,7 @@ void writeList(QrStream& stream, const std::vector<Element>& elements) {
     writeElements<Element>(stream, elements);
 }
 
-/// Appends `count` elements as they arrive: the number is only a claim.
+/// Appends `count` elements as they arrive. The count is not trusted: it reserves no memory.
 template <class Element>
 void readElements(QrStream& stream, std::vector<Element>& elements, std::size_t count) {
     std::array<ValueOf<Element>, blockSize * valueCount<Element>> block;
@@ -91,7 +94,7 @@ std::vector<Element> readList(QrStream& stream) {
     return elements;
 }
 
-/// The faces: how many, and for each the number of its corners and those.
+/// Writes the number of faces and, for each, the number of its corners and the corners.
 void writeFaces(QrStream& stream, const Mesh& mesh) {
     writeCount(stream, mesh.faceCount());
     for (std::size_t index = 0; index < mesh.faceCount(); ++index) {

@@ -1,4 +1,4 @@
-/// The mesh as an object that any host can hold, store and load.
+/// The implementation of `Mesh`: a counted, persistent object.
 #pragma once
 
 #include "examples/mesh/mesh.h"
@@ -10,22 +10,23 @@
 
 namespace Meshes {
 
-/// What a mesh is made of. It grows as data arrives; nothing is reserved on a file's word.
+/// The elements of a mesh. The lists grow as data arrives; no count of a file reserves memory.
 struct MeshData {
     std::vector<Mesh::Point> vertices;
     std::vector<Mesh::TexCoord> texCoords;
     std::vector<Mesh::Point> normals;
-    std::vector<Mesh::Corner> corners; ///< of all faces, one face behind the other
+    std::vector<Mesh::Corner> corners; ///< of all faces, one face after the other
     std::vector<std::size_t> faceEnds; ///< for each face, where its corners end
 };
 
 class MeshObject final
     : public Mz::QrCastRef<Mz::QrCastHeap<Mz::QrCastMulti<MeshObject, Mesh, Mz::QrPersistant>>> {
   public:
-    /// Without anything in it, to be read into.
+    /// Makes an empty mesh, for `read`.
     MeshObject() = default;
     MeshObject(MeshData meshData, const wchar_t* formatLabel);
 
+    /// Returns a new mesh. The caller owns the reference.
     static Mz::QrRef<Mz::QrCastable> make(MeshData data, const wchar_t* formatLabel);
 
     const wchar_t* formatLabel() const override { return label.c_str(); }
@@ -39,8 +40,10 @@ class MeshObject final
     const Mz::QrUid* getClassUid() const override { return &storedMeshUid; }
     unsigned int getVersion() const override { return 1; }
     void write(Mz::QrStream& stream) override;
-    /// Raises `QrStreamEx::ExReadError`, and changes nothing, when the data is no mesh that keeps
-    /// what `Mesh` promises.
+    /// Replaces the mesh by the one in the stream.
+    ///
+    /// \throws QrStreamEx::ExReadError if the data is not a mesh with the properties that `Mesh`
+    ///     promises; the object is then unchanged
     void read(Mz::QrStream& stream) override;
 
   private:

@@ -1,3 +1,6 @@
+/// Parses with `std::from_chars`, which knows no locale and rounds correctly. It reports the same
+/// error for a number that is too small and for one that is too large; a look at the decimal
+/// exponent of the first significant digit distinguishes them.
 #include "number.h"
 
 #include <algorithm>
@@ -9,7 +12,7 @@ namespace Meshes {
 
 namespace {
 
-/// Without the '+' that `from_chars` does not know.
+/// Returns `word` without a leading '+', which `from_chars` does not accept.
 std::string_view withoutPlus(std::string_view word) {
     if (word.size() > 1 && word[0] == '+' && word[1] != '-')
         word.remove_prefix(1);
@@ -24,8 +27,8 @@ std::optional<T> parseWhole(std::string_view word) {
     return error == std::errc() && stop == end ? std::optional(value) : std::nullopt;
 }
 
-/// Whether the first digit that counts stands behind the point: tells a number that is too small
-/// from one that is too large. `word` is a number.
+/// Returns whether the first significant digit of the number `word` is after the decimal point: a
+/// number out of range is then too small, otherwise too large.
 bool isSmall(std::string_view word) {
     const std::size_t exponentMark = word.find_first_of("eE");
     const std::string_view digits = word.substr(0, exponentMark);
@@ -38,7 +41,7 @@ bool isSmall(std::string_view word) {
         return place <= 0;
     const std::string_view exponentText = word.substr(exponentMark + 1);
     const std::optional<std::int64_t> exponent = parseInteger(exponentText);
-    // An exponent beyond all bounds decides by its sign alone.
+    // An exponent that does not fit 64 bits decides by its sign.
     return exponent ? place + *exponent <= 0 : exponentText.starts_with('-');
 }
 

@@ -1,4 +1,4 @@
-/// Numbers in text, read alike whatever the process's locale is.
+/// Parsing of numbers, independent of the locale of the process.
 #pragma once
 
 #include <cstdint>
@@ -7,17 +7,18 @@
 
 namespace Meshes {
 
-/// `word` as a finite `float`, rounded to the nearest one, with an optional sign in front. Nothing
-/// when it is anything else, or too large; what is too small to be a `float` is 0.
+/// Returns `word`, which may begin with a sign, as the nearest finite `float`; 0 if it is too small
+/// for a `float`. Nothing if it is too large or not a number.
 std::optional<float> parseFloat(std::string_view word);
 
-/// `word` as an integer without a sign.
+/// Returns `word` as an integer; nothing if it has a sign, is too large or is not an integer.
 std::optional<std::uint32_t> parseUnsigned(std::string_view word);
 
-/// `word` as an integer with an optional sign.
+/// Returns `word`, which may begin with a sign, as an integer; nothing if it is too large or not an
+/// integer.
 std::optional<std::int64_t> parseInteger(std::string_view word);
 
-/// Whether `word` is a number of any size, or one of the spellings of infinity and "not a number".
+/// Returns whether `word` is a number of any size, or a spelling of infinity or not-a-number.
 bool isNumber(std::string_view word);
 
 } // namespace Meshes

@@ -1,3 +1,6 @@
+/// Reads byte by byte with one byte of lookahead, and stores one word. Line ends inside a continued
+/// line are counted separately and added when the next word begins, so that a message names the
+/// line in which the word is and not the one in which its statement began.
 #include "textReader.h"
 
 #include "failure.h"
@@ -75,7 +78,7 @@ void TextReader::skipBlanks() {
             bytes.get();
 }
 
-/// Passes over a '\' and the line end behind it. A '\' before anything else begins a word.
+/// Skips a '\' and the line end after it. A '\' before anything else begins a word.
 bool TextReader::skipContinuation() {
     if (!rules.continuations || bytes.peek() != '\\')
         return false;
@@ -95,7 +98,7 @@ void TextReader::skipLine() {
          byte = bytes.peek()) {
         bytes.get();
         comment = comment || (rules.comments && byte == '#' && isBlank(previous));
-        // In a comment a path may well end with such a character.
+        // A '\' at the end of a comment does not continue the line: the comment may be a path.
         if (rules.continuations && !comment && byte == '\\' && isLineEnd(bytes.peek()))
             skipLineEnd();
         previous = byte;

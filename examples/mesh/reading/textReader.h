@@ -1,4 +1,4 @@
-/// Lines of words from a byte reader.
+/// Reads lines and words from a byte reader.
 #pragma once
 
 #include "byteReader.h"
@@ -8,11 +8,11 @@
 
 namespace Meshes {
 
-/// Walks through text line by line, and through a line word by word. Lines end with LF, CR LF or
-/// CR, words with white space.
+/// Reads text line by line, and a line word by word. Lines end with LF, CR LF or CR; words end with
+/// white space.
 ///
-/// Nothing is stored but one word, which has a limit: a line, and the text, may be as long as they
-/// like.
+/// Only one word is stored, and its length is limited; lines and texts may have any length. All
+/// operations that read throw `ImportFailure` for a longer word.
 class TextReader {
   public:
     struct Rules {
@@ -20,33 +20,39 @@ class TextReader {
         bool continuations = false; ///< a '\' at the end of a line joins it with the next
     };
 
-    /// The longest word that is read, in bytes. Longer ones are no numbers and no keywords.
+    /// The length of the longest accepted word, in bytes. No number or keyword is longer.
     static constexpr std::size_t longestWord = 1024;
 
-    /// Begins in front of the first line, which has the number `firstLine`.
+    /// Starts before the first line, which has the number `firstLine`.
     TextReader(ByteReader& bytes, Rules rules, std::uint64_t firstLine = 1);
 
-    /// Goes to the next line that has a word, and takes that word; false at the end of the data.
-    /// What was left of the current line is passed over.
+    /// Goes to the next line that has a word, and reads that word. Skips the rest of the current
+    /// line.
+    ///
+    /// \return false at the end of the data
     bool nextLine();
 
-    /// Takes the next word of the line; false where the line ends.
+    /// Reads the next word of the line.
+    ///
+    /// \return false at the end of the line
     bool nextWord();
 
-    /// The word taken last. Valid until the next one is taken.
+    /// Returns the last word read; valid until the next one is read.
     std::string_view word() const { return current; }
 
-    /// The number of the line, counted from 1, that the word taken last stands in.
+    /// Returns the number of the line that contains the last word.
     std::uint64_t line() const { return lineNumber; }
 
-    /// The next word of the line as a number; gives up where there is none. `what` names it.
+    /// Reads the next word of the line and returns it as a number. `what` names it in messages.
+    ///
+    /// \throws ImportFailure if the line ends or the word is not such a number
     float nextNumber(const char* what);
     std::uint32_t nextCount(const char* what);
 
-    /// Gives up unless the line ends here.
+    /// Throws `ImportFailure` unless the line ends here.
     void expectEndOfLine();
 
-    /// Gives up with the reason "line 12: what".
+    /// Throws `ImportFailure` with the reason "line 12: what".
     [[noreturn]] void fail(const std::string& what) const;
 
   private:
@@ -60,9 +66,9 @@ class TextReader {
     Rules rules;
     std::string current;
     std::uint64_t lineNumber;
-    std::uint64_t lineEnds = 0; ///< passed, but not yet counted in `lineNumber`
-    bool started = false;       ///< the first line is no longer ahead
-    bool escaped = false;       ///< a '\' was taken that did not end its line
+    std::uint64_t lineEnds = 0; ///< line ends that are not yet counted in `lineNumber`
+    bool started = false;       ///< whether the first line was reached
+    bool escaped = false;       ///< whether a '\' was consumed that did not end its line
 };
 
 } // namespace Meshes

@@ -1,3 +1,6 @@
+/// Puts a stream on an object IO on a buffer, as docs/objects.md explains. A text file ends with a
+/// line end, for people and their tools. Loading checks that nothing follows the object, because a
+/// longer file is not one that was saved here.
 #include "objectFile.h"
 
 #include "components/componentManager/binaryStream.h"
@@ -17,7 +20,7 @@ namespace {
 
 constexpr const char* source = "examples/mesh/saving/objectFile";
 
-/// Calls `work` with a stream of that form over `io`.
+/// Calls `work` with a stream of the given form on `io`.
 template <class Work>
 void withStream(QrCastable* io, Form form, Work&& work) {
     if (form == Form::Binary) {

@@ -1,4 +1,4 @@
-/// Objects in files of their own.
+/// Saves and loads one object, with all that it refers to, in one file.
 #pragma once
 
 #include "components/componentManager/cast.h"
@@ -7,17 +7,23 @@
 
 namespace Meshes {
 
+/// The kind of stream in a file.
 enum class Form { Binary, Text };
 
-/// Saves the object, and all that it refers to, in place of whatever the file held. Throws what
-/// `Mz::replaceFile` and the writing of objects throw; then the old file is as it was.
+/// Replaces the content of `file` by `object` and all objects that it refers to. If it throws, the
+/// old file is unchanged.
+///
+/// \throws QrStreamEx as `Mz::replaceFile` and the writing of objects do
 void saveObject(const std::filesystem::path& file, Mz::QrCastable& object, Form form);
 
-/// The object in the file, which answers for the interface `wanted`, or for any one when that is
-/// null. All that is read has been told of the end of the load.
+/// Returns the object in the file; null if null was saved. The caller owns the reference. The
+/// post-load list has been notified.
 ///
-/// Raises `QrStreamEx::ExReadOpen` when there is no such file, and `ExReadObject`, with the place
-/// in the file, when it holds anything but one such object.
+/// \param wanted the uid of an interface that the object must have; may be null
+/// \throws QrStreamEx::ExReadOpen if the file does not exist or cannot be opened
+/// \throws QrStreamEx::ExReadObject with the position, if the file does not contain exactly one
+/// such
+///     object
 Mz::QrRef<Mz::QrCastable> loadObject(const std::filesystem::path& file, const Mz::QrUid* wanted,
                                      Form form);
 

@@ -1,3 +1,5 @@
+/// Asks the manager for `QrPersistant` and passes it a binary stream on a file. The list is
+/// replaced in one step, so that a start never finds half a list.
 #include "recordedList.h"
 
 #include "components/componentManager/binaryStream.h"
@@ -13,7 +15,7 @@ namespace Meshes {
 
 namespace {
 
-/// The companion that reads and writes on the manager's behalf.
+/// Returns the interface of the manager that reads and writes the list.
 QrPtr<QrPersistant> companion() {
     return QrPtr<QrPersistant>::adopt(safeCast<QrPersistant>(QrGetComponentManager()));
 }
@@ -25,7 +27,7 @@ bool readRecordedList(const std::filesystem::path& file) {
     if (!in)
         return false;
     QrInBuffer bytes(&in);
-    QrBinaryStream stream(&bytes); // Names are strings, which text does not carry.
+    QrBinaryStream stream(&bytes); // Text would not carry the names.
     companion()->read(stream);
     return true;
 }

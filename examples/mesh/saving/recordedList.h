@@ -1,16 +1,22 @@
-/// The component manager's recorded list in a file, so that a start loads only what has changed.
+/// The recorded list of the component manager in a file, so that a start loads only what has
+/// changed.
 #pragma once
 
 #include <filesystem>
 
 namespace Meshes {
 
-/// Gives the list to the manager, which must not be initialised yet. False when there is no such
-/// file. Raises `QrStreamEx` when it is damaged; the manager then reads what is missing afresh.
+/// Reads the list into the manager, which must not be initialised yet.
+///
+/// \return false if the file cannot be opened
+/// \throws QrStreamEx if the list is damaged; `initialize` then loads the libraries that were not
+/// read
 bool readRecordedList(const std::filesystem::path& file);
 
-/// Writes the initialised manager's list, in place of whatever the file held. Throws what
-/// `Mz::replaceFile` throws.
+/// Replaces the content of the file by the list of the initialised manager.
+///
+/// \throws QrStreamEx as `Mz::replaceFile` does, and `ExWriteError` if the locale cannot carry one
+///     of the texts; the old file is then unchanged
 void writeRecordedList(const std::filesystem::path& file);
 
 } // namespace Meshes

@@ -1,5 +1,5 @@
-/// What the example needs of the operating system beyond the standard library: one description, one
-/// source for each system, chosen by the build.
+/// The system functions of the example beyond the standard library: one declaration, and one
+/// implementation per system, selected by the build.
 #pragma once
 
 #include <cstddef>
@@ -7,7 +7,7 @@
 
 namespace Meshes::system {
 
-/// How many libraries of this folder the process has in its memory.
+/// Returns the number of libraries of this folder that the process has loaded.
 std::size_t mappedLibraries(const std::filesystem::path& folder);
 
 } // namespace Meshes::system

@@ -1,3 +1,5 @@
+/// On Linux names are bytes. The program stays in the "C" locale, so each byte is one wide
+/// character and back again: every name passes through unchanged, whatever its encoding.
 #include "../console.h"
 
 #include "components/componentManager/nativeText.h"

@@ -1,3 +1,6 @@
+/// On Windows names are wide, and the output is UTF-8 bytes in binary mode, so that it equals the
+/// output on Linux. The arguments come from the wide command line, because `argv` is limited to the
+/// code page.
 #include "../console.h"
 
 #include "components/componentManager/utf8.h"
@@ -17,7 +20,6 @@ void useBinaryOutput() {
 }
 
 std::vector<std::filesystem::path> arguments(int, char**) {
-    // The narrow arguments lack what the code page cannot express.
     int count = 0;
     wchar_t** const words = ::CommandLineToArgvW(::GetCommandLineW(), &count);
     if (!words)

@@ -1,3 +1,4 @@
+/// The loaded libraries come from the list of the dynamic loader.
 #include "../system.h"
 
 #include <link.h>

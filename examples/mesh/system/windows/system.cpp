@@ -1,3 +1,6 @@
+/// Flushes the file before the rename, and lets the system write the rename through: otherwise the
+/// name may lead to an empty file after a crash. The loaded libraries come from the process status
+/// API.
 #include "../system.h"
 
 #include <windows.h>
@@ -12,7 +15,7 @@ namespace Meshes::system {
 namespace {
 
 std::filesystem::path fileOf(HMODULE module) {
-    std::wstring name(32768, L'\0'); // No name is longer.
+    std::wstring name(32768, L'\0'); // The longest name of the system.
     const DWORD length = ::GetModuleFileNameW(module, name.data(), static_cast<DWORD>(name.size()));
     name.resize(length);
     return name;
