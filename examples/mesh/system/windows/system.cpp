@@ -1,6 +1,4 @@
-/// Flushes the file before the rename, and lets the system write the rename through: otherwise the
-/// name may lead to an empty file after a crash. The loaded libraries come from the process status
-/// API.
+/// The loaded libraries come from the process status API.
 #include "../system.h"
 
 #include <windows.h>
