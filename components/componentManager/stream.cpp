@@ -32,6 +32,24 @@ class EndOfArguments {
     std::va_list& list;
 };
 
+/// Names what is written or read for as long as it exists, unless there is a name already: the
+/// operators call `formattedWrite` and `formattedRead`.
+class TextScope {
+  public:
+    using Kind = QrStream::TextKind;
+    TextScope(Kind& current, Kind kind) : current(current), previous(current) {
+        if (current == Kind::Other)
+            current = kind;
+    }
+    ~TextScope() { current = previous; }
+    TextScope(const TextScope&) = delete;
+    TextScope& operator=(const TextScope&) = delete;
+
+  private:
+    Kind& current;
+    const Kind previous;
+};
+
 } // namespace
 
 QrStream::QrStream(QrCastable* io)
@@ -107,6 +125,7 @@ int QrStream::formattedWrite(const wchar_t* format, ...) {
 
 int QrStream::writeText(const wchar_t* text, int length) {
     const NumericLocale bracket(io());
+    const TextScope scope(currentText, TextKind::Formatted);
     writeSeparator();
     column = addCharacters(column, io().writeChar(text, length));
     return length;
@@ -138,11 +157,13 @@ int QrStream::formattedRead(const wchar_t* format, ...) {
     std::va_list arguments;
     va_start(arguments, format);
     const EndOfArguments end(arguments);
+    const TextScope scope(currentText, TextKind::Formatted);
     return scanText(io(), format, arguments);
 }
 
 template <class T>
-QrStream& QrStream::writeFormatted(const wchar_t* format, T value) {
+QrStream& QrStream::writeFormatted(const wchar_t* format, T value, TextKind kind) {
+    const TextScope scope(currentText, kind);
     formattedWrite(format, value);
     separatorPending = true;
     return *this;
@@ -203,7 +224,7 @@ QrStream& QrStream::operator<<(wchar_t value) {
     const auto code = static_cast<std::uint32_t>(value);
     if (code > 0xFFFF)
         throw QrStreamEx::ExWriteError(source, __LINE__);
-    return writeFormatted(L"%d", static_cast<int>(code));
+    return writeFormatted(L"%d", static_cast<int>(code), TextKind::Character);
 }
 
 QrStream& QrStream::operator<<(char value) {
@@ -211,6 +232,7 @@ QrStream& QrStream::operator<<(char value) {
 }
 
 QrStream& QrStream::operator<<(bool value) {
+    const TextScope scope(currentText, TextKind::Value);
     writeSeparator();
     const wchar_t digit = value ? L'1' : L'0';
     column = addCharacters(column, io().writeChar(&digit, 1));
@@ -221,8 +243,8 @@ QrStream& QrStream::operator<<(const std::wstring& value) {
     if (value.size() > static_cast<std::size_t>(std::numeric_limits<int>::max()))
         throw QrStreamEx::ExWriteError(source, __LINE__);
     const int length = static_cast<int>(value.size());
-    formattedWrite(L"%d", length);
-    separatorPending = true;
+    writeFormatted(L"%d", length);
+    const TextScope scope(currentText, TextKind::String);
     writeSeparator();
     column = addCharacters(column, io().writeChar(value.data(), length));
     return *this;
@@ -290,6 +312,7 @@ QrStream& QrStream::operator>>(char& value) {
 
 QrStream& QrStream::operator>>(bool& value) {
     skipSeparator();
+    const TextScope scope(currentText, TextKind::Value);
     wchar_t digit;
     if (io().readChar(&digit, 1, 1) == 0)
         throw QrStreamEx::ExReadError(source, __LINE__);
@@ -301,6 +324,7 @@ QrStream& QrStream::operator>>(std::wstring& value) {
     int length = 0;
     *this >> length;
     skipSeparator();
+    const TextScope scope(currentText, TextKind::String);
     if (!readCharacters(value, length))
         throw QrStreamEx::ExReadError(source, __LINE__);
     return *this;

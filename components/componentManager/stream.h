@@ -148,6 +148,19 @@ class MZ_COMPONENT_MANAGER_API QrStream {
     /// read so far, at most the largest `int`.
     virtual int formattedRead(const wchar_t* format, ...);
 
+    /// What a call of the IO belongs to.
+    enum class TextKind : unsigned char {
+        Other,     ///< Binary data, or whatever a derived class does by itself.
+        Value,     ///< A number or a `bool`, by an operator.
+        String,    ///< The characters of a string in the text form of `<<` and `>>`.
+        Character, ///< The code of a `wchar_t`, which is never read back.
+        Formatted  ///< Text by a format of the caller, or a number that is read.
+    };
+
+    /// Returns what the stream writes or reads at this moment. For an IO that must know it: the
+    /// same characters may come from several operations, of which some cannot be read back.
+    TextKind textKind() const { return currentText; }
+
     /// Reads one whole object through the IO, which knows what `uid`, `a` and `b` mean to it (the
     /// interface wanted, and two names; each may be null). An object that asked to be told when the
     /// load is over joins this stream's list, after those that were read inside it. The list is
@@ -189,7 +202,7 @@ class MZ_COMPONENT_MANAGER_API QrStream {
     /// Writes the digits that stand from `begin + 1` to `end`; the separator may be put at `begin`.
     int writeNumber(char* begin, const char* end);
     template <class T>
-    QrStream& writeFormatted(const wchar_t* format, T value);
+    QrStream& writeFormatted(const wchar_t* format, T value, TextKind kind = TextKind::Value);
     template <class T>
     QrStream& readFormatted(const wchar_t* format, T& value);
 
@@ -200,6 +213,7 @@ class MZ_COMPONENT_MANAGER_API QrStream {
     /// How many characters the current line of text has; at most the largest `int`.
     int column = 0;
     bool separatorPending = false;
+    TextKind currentText = TextKind::Other;
 };
 
 /// An identifier is its four words in order, each as an `unsigned int`.

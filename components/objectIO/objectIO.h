@@ -25,13 +25,23 @@
 /// once and comes back as one; cycles and null are fine. An object that is still being read may
 /// already be handed to others, so resolve links in `loadFinished`, not while reading.
 ///
-/// **Strings.** Wide strings come back exactly from a binary stream that is read in the locale in
-/// which it was written; a character without a form there, and L'\0', raise
-/// `QrStreamEx::ExWriteError` when they are written. The text form of a stream cannot carry strings
-/// exactly: inside an object, reading one that is not empty raises `QrStreamEx::ExReadError`, and
-/// so does writing one, with `ExWriteError`, unless it looks like a number. Write strings with
-/// `QrWriteExactText`, which every stream carries exactly. Infinities and NaNs are refused in text
-/// likewise. A `bool` inside an object comes back from text too, wherever it stands.
+/// **What comes back.** Every kind of stream carries numbers, `bool`, objects, and strings written
+/// with `QrWriteExactText`. Inside an object, what would not be read back as it was raises
+/// `QrStreamEx::ExWriteError` when it is written:
+/// - in text, a string that is not empty, an array of `wchar_t`, infinities and NaNs;
+/// - everywhere, a single `wchar_t`;
+/// - a character without a form in the locale, and L'\0', in strings and formatted text. Read
+///   strings in the locale in which they were written.
+///
+/// **Formatted text.** `formattedWrite` needs no separator after its text: where a value follows,
+/// the IO writes a blank. Formatted text directly after formatted text, without white space between
+/// them, and the words "inf" and "nan" in it are refused. On a binary stream nothing of this is
+/// done: there the format itself must end what it writes.
+///
+/// **Streams of both forms.** A stream of a class derived from `QrStream` itself, neither text nor
+/// binary, writes single values as text and counted ones as binary data. Inside an object the IO
+/// puts a line end between the two and skips it when it reads; formatted text before binary data
+/// must not end in white space.
 #pragma once
 
 #include "components/componentManager/stream.h"
@@ -114,9 +124,17 @@ class MZ_OBJECT_IO_API QrObjectOutBuffer
     void writeObject(const QrCastable* obj, QrStream& s, const wchar_t* a,
                      const wchar_t* b) override;
 
-    /// Raises `QrStreamEx::ExWriteError` for a character that cannot be read back.
+    /// Raises `QrStreamEx::ExWriteError` for text that cannot be read back. Inside an object, ends
+    /// formatted text with a blank before the next value.
     int writeChar(const wchar_t* s, int count) override;
     using QrForwardingIO::writeChar;
+
+    /// Inside an object on a stream that is neither text nor binary throughout, begins on a new
+    /// line after text.
+    void write(const void* data, int size) override;
+    using QrForwardingIO::write;
+    void writeEol() override;
+    void writeSpace() override;
 
   private:
     void writeRecord(QrStream& s, std::uint32_t number, QrPersistant* object);
@@ -149,10 +167,11 @@ class MZ_OBJECT_IO_API QrObjectInBuffer
 
     /// Raises `QrStreamEx::ExReadError` for a string in the text form of a stream, or with a NUL.
     int readChar(wchar_t* buf, int size, int count) override;
+    int readChar(wchar_t& c) override;
     using QrForwardingIO::readChar;
 
-    /// Raises `QrStreamEx::ExReadError` for an array of `wchar_t` in the text form of a stream: it
-    /// is written as numbers there and read as bytes.
+    /// Raises `QrStreamEx::ExReadError` for an array of `wchar_t` in the text form of a stream,
+    /// which has none. Skips the line end that a writer puts between text and binary data.
     int read(void* data, int size) override;
     using QrForwardingIO::read;
 

@@ -2,6 +2,7 @@
 #include "components/objectIO/objectIO.h"
 #include "components/objectIO/objectRecord.h"
 #include "components/objectIO/objectTable.h"
+#include "components/objectIO/objectText.h"
 
 #include <algorithm>
 #include <string_view>
@@ -18,6 +19,24 @@ bool answersFor(QrCastable& object, const QrUid& uid) {
            QrPtr<QrCastable>::adopt(QrTranslateInterface(&object, uid)) != nullptr;
 }
 
+/// A string in the text form of a stream, of which only the empty one is written.
+int readTextString(QrBufferedIO& io, wchar_t* buf, int size, int count) {
+    if (size > 0)
+        throw QrStreamEx::ExReadError(source, __LINE__,
+                                      "a text stream cannot carry strings exactly");
+    io.skipWhiteSpace(1); // The separator after its length.
+    return io.readChar(buf, size, count);
+}
+
+int readTextBool(QrBufferedIO& io, wchar_t* digit) {
+    // A separator may come before it, which the stream does not skip.
+    io.skipWhiteSpace(1);
+    const int got = io.readChar(digit, 1, 1);
+    if (got == 1 && *digit != L'0' && *digit != L'1')
+        throw QrStreamEx::ExReadError(source, __LINE__, "a bool is neither 0 nor 1");
+    return got;
+}
+
 } // namespace
 
 struct QrObjectInBuffer::State {
@@ -25,9 +44,15 @@ struct QrObjectInBuffer::State {
     using Objects = ObjectTable<QrRef<QrCastable>>;
     Objects objects;
     int depth = 0;
-    bool exactStrings = true; ///< whether the stream that reads carries strings as they are
+    const QrStream* stream = nullptr; ///< the one that reads an object
+    ObjectForm form = ObjectForm::Binary;
+    bool readText = false; ///< whether what was read last is text
     bool failed = false;
     std::string explanation; ///< what the last failure has said, where and what
+
+    QrStream::TextKind textKind() const {
+        return stream ? stream->textKind() : QrStream::TextKind::Other;
+    }
 
     [[noreturn]] void fail(int line, int64 position, const std::string& what) {
         failed = true;
@@ -68,19 +93,22 @@ QrRef<QrCastable> QrObjectInBuffer::readObject(QrStream& s, const QrUid* id, con
     // Until all is well, the object counts as failed.
     struct Reading {
         State& state;
-        const bool previousExactStrings;
+        const QrStream* const previousStream;
+        const ObjectForm previousForm;
         bool complete = false;
-        Reading(State& now, bool exactStrings)
-            : state(now), previousExactStrings(now.exactStrings) {
-            state.exactStrings = exactStrings;
+        Reading(State& now, const QrStream& stream)
+            : state(now), previousStream(now.stream), previousForm(now.form) {
+            state.stream = &stream;
+            state.form = formOf(stream);
             ++state.depth;
         }
         ~Reading() {
             --state.depth;
-            state.exactStrings = previousExactStrings;
+            state.stream = previousStream;
+            state.form = previousForm;
             state.failed = state.failed || !complete;
         }
-    } reading(*state, s.isBinaryStream());
+    } reading(*state, s);
 
     QrRef<QrCastable> object;
     try {
@@ -149,28 +177,36 @@ QrRef<QrCastable> QrObjectInBuffer::readNewObject(QrStream& s, std::uint32_t num
 int QrObjectInBuffer::readChar(wchar_t* buf, int size, int count) {
     // Only strings are read without a limit of characters, and only a bool is read as one.
     constexpr int noLimit = 0x7fffffff;
-    if (state->exactStrings || size < 1 || (count != noLimit && (count != 1 || size != 1))) {
-        const int got = inner().readChar(buf, size, count);
-        // A NUL byte is never consumed: it would fill each of any number of strings.
-        if (count == noLimit && got > 0 && std::find(buf, buf + got, L'\0') != buf + got)
-            throw QrStreamEx::ExReadError(source, __LINE__, "a string has a NUL in it");
-        return got;
-    }
-    if (count == noLimit)
-        throw QrStreamEx::ExReadError(source, __LINE__,
-                                      "a text stream cannot carry strings exactly");
-    // In text, a separator may stand before a bool, which the stream does not skip.
-    inner().skipWhiteSpace(1);
+    const bool isText = state->form == ObjectForm::Text;
+    const QrStream::TextKind kind = state->textKind();
+    state->readText = kind != QrStream::TextKind::Other;
+    if (count == noLimit && (isText || kind == QrStream::TextKind::String))
+        return readTextString(inner(), buf, size, count);
+    if (count == 1 && size == 1 &&
+        (isText || (state->form == ObjectForm::Mixed && kind == QrStream::TextKind::Value)))
+        return readTextBool(inner(), buf);
     const int got = inner().readChar(buf, size, count);
-    if (got == 1 && *buf != L'0' && *buf != L'1')
-        throw QrStreamEx::ExReadError(source, __LINE__, "a bool is neither 0 nor 1");
+    // A NUL byte is never consumed: it would fill each of any number of strings.
+    if (count == noLimit && got > 0 && std::find(buf, buf + got, L'\0') != buf + got)
+        throw QrStreamEx::ExReadError(source, __LINE__, "a string has a NUL in it");
     return got;
 }
 
+int QrObjectInBuffer::readChar(wchar_t& c) {
+    state->readText = state->textKind() != QrStream::TextKind::Other;
+    return inner().readChar(c);
+}
+
 int QrObjectInBuffer::read(void* data, int size) {
-    if (!state->exactStrings)
+    if (state->form == ObjectForm::Text)
         throw QrStreamEx::ExReadError(source, __LINE__,
                                       "a text stream cannot carry arrays of characters");
+    if (state->form == ObjectForm::Mixed && size > 0 && state->readText) {
+        if (inner().read() != '\n')
+            throw QrStreamEx::ExReadError(source, __LINE__,
+                                          "binary data after text begins on a new line");
+        state->readText = false;
+    }
     return inner().read(data, size);
 }
 

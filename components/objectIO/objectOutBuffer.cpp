@@ -1,11 +1,11 @@
 #include "components/objectIO/objectIO.h"
 #include "components/objectIO/objectRecord.h"
 #include "components/objectIO/objectTable.h"
+#include "components/objectIO/objectText.h"
 
 #include <algorithm>
-#include <climits>
-#include <cwchar>
 #include <limits>
+#include <string_view>
 #include <unordered_map>
 
 namespace Mz {
@@ -18,26 +18,6 @@ constexpr const char* source = "components/objectIO/objectOutBuffer";
     throw QrStreamEx::ExWriteObject(source, line, ObjectRecord::reason(io.tell(), what).c_str());
 }
 
-/// Whether a text stream writes the character as part of a number that can be read back: those of
-/// infinities and of what is no number are not.
-bool isOfNumber(wchar_t c) {
-    return c != L'\0' && std::wcschr(L"0123456789+-.e", c);
-}
-
-/// Whether the character, if the locale writes it at all, comes back. Some locales write one that
-/// looks similar instead.
-bool readsBack(wchar_t character) {
-    char bytes[MB_LEN_MAX];
-    std::mbstate_t writing{};
-    const std::size_t length = std::wcrtomb(bytes, character, &writing);
-    if (length == static_cast<std::size_t>(-1))
-        return true; // It is refused where it is written.
-    wchar_t again = L'\0';
-    std::mbstate_t reading{};
-    const std::size_t read = std::mbrtowc(&again, bytes, length, &reading);
-    return read == (character == L'\0' ? 0 : length) && again == character;
-}
-
 } // namespace
 
 struct QrObjectOutBuffer::State {
@@ -46,8 +26,14 @@ struct QrObjectOutBuffer::State {
     using Objects = ObjectTable<QrCPtr<QrCastable>>;
     Objects kept;
     int depth = 0;
-    bool exactStrings = true; ///< whether the stream that writes carries strings as they are
+    const QrStream* stream = nullptr; ///< the one that writes an object
+    ObjectForm form = ObjectForm::Binary;
+    ObjectTextOutput text;
     bool failed = false;
+
+    QrStream::TextKind textKind() const {
+        return stream ? stream->textKind() : QrStream::TextKind::Other;
+    }
 
     /// Gives the next number to an object, which is written while the result exists.
     Objects::Entry add(const QrCastable* principal) {
@@ -94,19 +80,22 @@ void QrObjectOutBuffer::writeRecord(QrStream& s, std::uint32_t number, QrPersist
     // Until the record is whole, it counts as failed.
     struct Writing {
         State& state;
-        const bool previousExactStrings;
+        const QrStream* const previousStream;
+        const ObjectForm previousForm;
         bool complete = false;
-        Writing(State& now, bool exactStrings)
-            : state(now), previousExactStrings(now.exactStrings) {
-            state.exactStrings = exactStrings;
+        Writing(State& now, const QrStream& stream)
+            : state(now), previousStream(now.stream), previousForm(now.form) {
+            state.stream = &stream;
+            state.form = formOf(stream);
             ++state.depth;
         }
         ~Writing() {
             --state.depth;
-            state.exactStrings = previousExactStrings;
+            state.stream = previousStream;
+            state.form = previousForm;
             state.failed = state.failed || !complete;
         }
-    } writing(*state, s.isBinaryStream());
+    } writing(*state, s);
     s << number;
     if (object) {
         s << *object->getClassUid() << object->getVersion();
@@ -120,17 +109,28 @@ void QrObjectOutBuffer::writeRecord(QrStream& s, std::uint32_t number, QrPersist
 }
 
 int QrObjectOutBuffer::writeChar(const wchar_t* s, int count) {
-    const wchar_t* end = s + std::max(count, 0);
-    if (state->exactStrings && std::find(s, end, L'\0') != end)
-        throw QrStreamEx::ExWriteError(source, __LINE__, "a string has a NUL in it");
-    if (state->exactStrings && !std::all_of(s, end, readsBack))
-        throw QrStreamEx::ExWriteError(source, __LINE__,
-                                       "a string has a character that the locale does not know");
-    constexpr const char* inexact =
-        "a text stream carries neither strings nor infinite numbers exactly";
-    if (!state->exactStrings && !std::all_of(s, end, isOfNumber))
-        throw QrStreamEx::ExWriteError(source, __LINE__, inexact);
+    const std::wstring_view text(s, static_cast<std::size_t>(std::max(count, 0)));
+    const QrStream::TextKind kind = state->textKind();
+    ObjectTextOutput::check(kind, state->form, text);
+    if (state->stream)
+        state->text.begin(inner(), kind, state->form, text);
     return inner().writeChar(s, count);
+}
+
+void QrObjectOutBuffer::write(const void* data, int size) {
+    if (state->stream && size > 0)
+        state->text.beginData(inner(), state->form);
+    inner().write(data, size);
+}
+
+void QrObjectOutBuffer::writeEol() {
+    inner().writeEol();
+    state->text.noteLineEnd();
+}
+
+void QrObjectOutBuffer::writeSpace() {
+    inner().writeSpace();
+    state->text.noteSpace();
 }
 
 } // namespace Mz

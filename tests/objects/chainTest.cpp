@@ -8,14 +8,13 @@ namespace {
 using namespace Mz;
 using namespace Mz::Test;
 
-template <class Stream>
-class Chain : public ObjectsOn<Stream> {
+class Chain : public Objects {
   protected:
     /// Far more than could be freed from inside one another.
     static constexpr int length = 200'000;
 
     static QrPtr<Node> holder(int number, std::vector<QrPtr<Node>> links = {}) {
-        QrPtr<Node> result = Objects::make(holderUid);
+        QrPtr<Node> result = make(holderUid);
         result->number = number;
         result->links = std::move(links);
         return result;
@@ -39,59 +38,57 @@ class Chain : public ObjectsOn<Stream> {
     static std::string savedSiblings() {
         std::vector<QrPtr<Node>> all = siblings();
         const QrPtr<Node> root = holder(-1, all);
-        const std::string bytes = saved<Stream>(root.get());
+        const std::string bytes = saved<QrBinaryStream>(root.get());
         root->links.clear();
         dropFromTheEnd(std::move(all));
         return bytes;
     }
 };
-TYPED_TEST_SUITE(Chain, StreamKinds);
-
-TYPED_TEST(Chain, OfSiblingsIsFreedInALoopByTheLoader) {
-    const std::string bytes = this->savedSiblings();
-    const int before = this->alive();
+TEST_F(Chain, OfSiblingsIsFreedInALoopByTheLoader) {
+    const std::string bytes = savedSiblings();
+    const int before = alive();
     {
-        Loading<TypeParam> in(bytes);
+        Loading<QrBinaryStream> in(bytes);
         EXPECT_TRUE(in.object());
-        EXPECT_EQ(this->alive(), before + this->length + 1);
+        EXPECT_EQ(alive(), before + length + 1);
     }
-    EXPECT_EQ(this->alive(), before);
+    EXPECT_EQ(alive(), before);
 }
 
-TYPED_TEST(Chain, OfObjectsSideBySideIsFreedInALoopByTheLoader) {
-    const int before = this->alive();
+TEST_F(Chain, OfObjectsSideBySideIsFreedInALoopByTheLoader) {
+    const int before = alive();
     {
-        Saving<TypeParam> out;
-        std::vector<QrPtr<Node>> all = this->siblings();
+        Saving<QrBinaryStream> out;
+        std::vector<QrPtr<Node>> all = siblings();
         for (const QrPtr<Node>& each : all)
             out.stream << each.get();
-        this->dropFromTheEnd(std::move(all));
-        Loading<TypeParam> in(out.bytes());
-        for (int index = 0; index < this->length; ++index)
+        dropFromTheEnd(std::move(all));
+        Loading<QrBinaryStream> in(out.bytes());
+        for (int index = 0; index < length; ++index)
             ASSERT_TRUE(in.object());
     }
-    EXPECT_EQ(this->alive(), before);
+    EXPECT_EQ(alive(), before);
 }
 
-TYPED_TEST(Chain, IsFreedInALoopWhenTheLoadFailsHalfWay) {
-    const std::string bytes = this->savedSiblings();
-    const int before = this->alive();
+TEST_F(Chain, IsFreedInALoopWhenTheLoadFailsHalfWay) {
+    const std::string bytes = savedSiblings();
+    const int before = alive();
     for (const std::size_t size : {bytes.size() - 1, bytes.size() / 2}) {
-        Loading<TypeParam> in(std::string_view(bytes).substr(0, size));
+        Loading<QrBinaryStream> in(std::string_view(bytes).substr(0, size));
         readFailure([&] { in.object(); });
-        EXPECT_GT(this->alive(), before + this->length / 3);
+        EXPECT_GT(alive(), before + length / 3);
     }
-    EXPECT_EQ(this->alive(), before);
+    EXPECT_EQ(alive(), before);
 }
 
-TYPED_TEST(Chain, IsFreedInALoopByTheSaverThatOutlivesIt) {
-    const int before = this->alive();
+TEST_F(Chain, IsFreedInALoopByTheSaverThatOutlivesIt) {
+    const int before = alive();
     {
-        Saving<TypeParam> out;
-        out.stream << this->holder(-1, this->siblings()).get();
-        EXPECT_EQ(this->alive(), before + this->length + 1);
+        Saving<QrBinaryStream> out;
+        out.stream << holder(-1, siblings()).get();
+        EXPECT_EQ(alive(), before + length + 1);
     }
-    EXPECT_EQ(this->alive(), before);
+    EXPECT_EQ(alive(), before);
 }
 
 } // namespace

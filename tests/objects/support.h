@@ -2,6 +2,7 @@
 #pragma once
 
 #include "tests/objects/objectStreams.h"
+#include "tests/streams/streamKinds.h"
 #include "tests/support/journal.h"
 
 #include <gmock/gmock.h>
@@ -79,6 +80,6 @@ class Objects : public testing::Test {
 /// The same for each kind of stream.
 template <class Stream>
 class ObjectsOn : public Objects {};
-using StreamKinds = testing::Types<QrBinaryStream, QrTextStream>;
+using StreamKinds = testing::Types<QrBinaryStream, QrTextStream, BaseStream>;
 
 } // namespace Mz::Test

@@ -69,6 +69,9 @@ inline constexpr QrUid misleadingUid = classUid(11);
 /// A node that stores its number and its links, and holds those as soon as it has read them.
 inline constexpr QrUid holderUid = classUid(12);
 
+/// A node that writes a value for each letter of its name, and demands them back as they were.
+inline constexpr QrUid spelledUid = classUid(13);
+
 /// No builder has this one.
 inline constexpr QrUid unknownUid = classUid(0x99);
 
