@@ -35,7 +35,7 @@ use() {
   local prefix=$1 folder=$2 suffix=$3 module=$4
   shift 4
   cmake -S "$top/tests/package/outside" -B "$folder" -G Ninja -D CMAKE_PREFIX_PATH="$prefix" \
-    -D WANTED=0.2 "$@"
+    -D WANTED=REQUIRED "$@"
   cmake --build "$folder"
   shows '^Hello, world!$' "$folder/helloHost$suffix" "$folder/components"
   use_tool "$prefix" "$folder" "$suffix" "$module"
