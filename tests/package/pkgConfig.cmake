@@ -13,7 +13,11 @@ run(sh -ec "${compiler} -std=c++20 ${source}/helloHost.cpp -o ${work}/helloHost 
 run(sh -ec "${compiler} -std=c++20 -shared -fPIC -fvisibility=hidden ${source}/helloComponent.cpp -o ${work}/components/hello.so ${flags}")
 says("Hello, world!" ${work}/helloHost ${work}/components)
 
-# Each library's file is complete.
+# The libraries that a library's headers need come with it: here libMZbase.
+run(sh -ec "${compiler} -std=c++20 ${CMAKE_CURRENT_LIST_DIR}/parent/parent.cpp -o ${work}/parent ${flags}")
+says("in the parent" ${work}/parent)
+
+# Each library has a file of its own.
 foreach(library MZbase MZcomponentManager MZobjectIO ${tools})
   run(sh -ec "echo 'int main() {}' | ${compiler} -x c++ - -Wl,--no-as-needed $(${pkgConfig} --cflags --libs ${library}) -o ${work}/${library}")
   says("${version}" ${pkgConfig} --modversion ${library})
