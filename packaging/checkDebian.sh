@@ -2,7 +2,7 @@
 # Installs, uses and removes the Debian packages. Run on a fresh system, in a folder that contains
 # packages/ and hello/.
 set -euo pipefail
-install="apt-get install -y -qq --no-install-recommends"
+install() { apt-get install -y -qq --no-install-recommends "$@"; }
 
 fail() {
   echo "failed: $*" >&2
@@ -27,27 +27,26 @@ list_files() {
 apt-get update -qq
 echo "== the command line alone, on a minimal system"
 list_files >/tmp/minimal
-$install ./packages/mzcomponents_*.deb ./packages/libmzcomponentmanager0_*.deb
+install ./packages/mzcomponents_*.deb ./packages/libmzcomponentmanager0_*.deb
 mzcomponents --version
 says "notALibrary" bash -c 'mzcomponents explain /etc/passwd | sed -n "s/^[^ ]*: //p"; true'
 apt-get purge -y -qq --autoremove mzcomponents libmzcomponentmanager0
-# What they need was there: even C++ programs of the base system need the same libraries.
 list_files | diff /tmp/minimal - || fail "removal leaves the files above"
 
 echo "== everything, where there is a compiler"
-$install cmake g++ make pkg-config
+install cmake g++ make pkg-config
 list_files >/tmp/before
-$install ./packages/*.deb
+install ./packages/*.deb
 
 cmake -S hello -B /tmp/hello
 cmake --build /tmp/hello
 says "Hello, world!" /tmp/hello/helloHost /tmp/hello/components
 
 mkdir -p /tmp/byHand/components
-flags=$(pkg-config --cflags --libs MZcomponentManager)
-g++ -std=c++20 hello/helloHost.cpp -o /tmp/byHand/helloHost $flags
+read -ra flags <<<"$(pkg-config --cflags --libs MZcomponentManager)"
+g++ -std=c++20 hello/helloHost.cpp -o /tmp/byHand/helloHost "${flags[@]}"
 g++ -std=c++20 -shared -fPIC -fvisibility=hidden -fno-gnu-unique hello/helloComponent.cpp \
-  -o /tmp/byHand/components/hello.so $flags
+  -o /tmp/byHand/components/hello.so "${flags[@]}"
 says "Hello, world!" /tmp/byHand/helloHost /tmp/byHand/components
 
 # The probe is found: a scan loads the component in a process of its own.

@@ -1,3 +1,4 @@
+# shellcheck shell=bash
 # Functions of the scripts that look into packages; to be sourced.
 
 # unpack PACKAGE FOLDER

@@ -14,6 +14,7 @@ suite=bookworm
 
 # The mirror that this machine uses.
 mirror() {
+  # shellcheck disable=SC2016 # apt replaces these
   apt-get indextargets --format '$(REPO_URI) $(RELEASE)' 'Created-By: Packages' |
     awk -v suite=$suite '$2 == suite && $1 ~ /\/debian\/*$/ { print $1; exit }'
 }

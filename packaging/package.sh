@@ -1,3 +1,4 @@
+# shellcheck shell=bash disable=SC2154
 # `./run package`: makes the packages twice, compares them, describes what is inside, and uses them.
 # Sourced by run, whose functions it uses.
 
@@ -6,7 +7,7 @@ again=$build/package-again
 checks=$build/package-check
 
 need_packaging() {
-  need cmake ninja-build g++ g++-mingw-w64-x86-64-posix wine wine64 libcli11-dev \
+  need git cmake ninja-build g++ g++-mingw-w64-x86-64-posix wine wine64 libcli11-dev \
     nlohmann-json3-dev librang-dev debhelper dpkg-dev lintian nsis zip unzip p7zip-full debootstrap
   if [ "$(id -u)" != 0 ] && ! command -v sudo >/dev/null; then
     echo "failed: the packages are tried on a fresh system, which only root can make; run this as" \

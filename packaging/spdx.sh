@@ -16,7 +16,7 @@ license() {
   case $1 in
   */libstdc++-6.dll | */libgcc_s_seh-1.dll) echo 'GPL-3.0-or-later WITH GCC-exception-3.1' ;;
   */libwinpthread-1.dll) echo 'MIT AND BSD-3-Clause' ;;
-  */\$PLUGINSDIR/* | */Uninstall.exe | */Uninstall.exe.nsis) echo 'Zlib' ;;
+  */\$PLUGINSDIR/* | */Uninstall.exe) echo 'Zlib' ;;
   */GPL-3.txt | */copyright) echo NOASSERTION ;;
   *.dll.a | *.so | *.so.0) echo 'BSL-1.0' ;;
   */libMZcomponentTools.* | */mzcomponents-probe*) echo "BSL-1.0 AND MIT AND Unlicense$startup" ;;
