@@ -21,6 +21,7 @@ says() {
 list_files() {
   find / -xdev \( -path /proc -o -path /sys -o -path /dev -o -path /input -o -path /tmp \
     -o -path /var/lib/apt -o -path /var/lib/dpkg -o -path /var/cache -o -path /var/log \) -prune -o \
+    -type d -printf '%p %y %m %U %G\n' -o \
     ! -path /etc/ld.so.cache -printf '%p %y %m %U %G %s %l\n' | sort
 }
 
