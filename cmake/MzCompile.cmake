@@ -16,9 +16,9 @@ set(CMAKE_ARCHIVE_OUTPUT_DIRECTORY ${PROJECT_BINARY_DIR}/lib)
 # Tests of what libMZcomponentManager hides, and the form of the library that they link.
 set(MZ_INTERNALS_FOLDER ${PROJECT_BINARY_DIR}/internals)
 
+include(MzRuntime)
 if(WIN32)
   enable_language(RC)
-  include(MzRuntime)
   # Beside the programs, or they do not start.
   mz_find_runtime(MZ_RUNTIME_FILES)
   file(COPY ${MZ_RUNTIME_FILES} DESTINATION ${PROJECT_BINARY_DIR}/bin)

@@ -31,6 +31,8 @@ if(TARGET MZcomponentTools)
 endif()
 if(MZ_BUILD_TOOLS)
   install(TARGETS mzcomponents RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR} COMPONENT tools)
+endif()
+if(MZ_BUILD_TOOLS AND NOT WIN32)
   install(FILES ${PROJECT_SOURCE_DIR}/docs/mzcomponents.1
     DESTINATION ${CMAKE_INSTALL_MANDIR}/man1 COMPONENT tools)
   install(FILES ${PROJECT_SOURCE_DIR}/tools/mzcomponents/mzcomponents.bash

@@ -1,44 +1,21 @@
 # Installs `build` below `work`, builds the project `source` against that, and runs its host.
-function(run)
-  execute_process(COMMAND ${ARGN} RESULT_VARIABLE result OUTPUT_VARIABLE text ERROR_VARIABLE text)
-  if(NOT result EQUAL 0)
-    message(FATAL_ERROR "${ARGN}\n${text}")
-  endif()
-  set(output "${text}" PARENT_SCOPE)
-endfunction()
+include(${CMAKE_CURRENT_LIST_DIR}/common.cmake)
 
 file(REMOVE_RECURSE ${work})
 run(${CMAKE_COMMAND} --install ${build} --prefix ${work}/prefix)
-
-set(options -D CMAKE_PREFIX_PATH=${work}/prefix -D MZcomponentManager_DIR=${work}/prefix/lib/cmake/MZcomponentManager)
-if(toolchain)
-  list(APPEND options --toolchain ${toolchain})
-else()
-  list(APPEND options -D CMAKE_CXX_COMPILER=${compiler})
-endif()
-if(sanitize)
-  list(APPEND options -D CMAKE_CXX_FLAGS=-fsanitize=address,undefined)
-endif()
-run(${CMAKE_COMMAND} -S ${source} -B ${work}/build -G ${generator} ${options})
+run(${CMAKE_COMMAND} -S ${source} -B ${work}/build -G ${generator}
+  -D CMAKE_PREFIX_PATH=${work}/prefix ${toolchainOptions})
 run(${CMAKE_COMMAND} --build ${work}/build)
 
 # Windows programs look for libraries along this path; elsewhere it means nothing.
 set(ENV{WINEPATH} "${work}/prefix/bin;${build}/bin")
-run(${emulator} ${work}/build/helloHost${suffix} ${work}/build/components)
-string(STRIP "${output}" output)
-if(NOT output STREQUAL "Hello, world!")
-  message(FATAL_ERROR "the host said: ${output}")
-endif()
+says("Hello, world!" ${emulator} ${work}/build/helloHost${suffix} ${work}/build/components)
 
-# Wherever the components stand, and whatever the locale, where arguments come as bytes.
+# Wherever the components are, and whatever the locale, where arguments come as bytes.
 if(NOT suffix)
   file(RENAME ${work}/build/components "${work}/build/ü 日")
   foreach(locale C C.UTF-8)
     set(ENV{LC_ALL} ${locale})
-    run(${emulator} ${work}/build/helloHost "${work}/build/ü 日")
-    string(STRIP "${output}" output)
-    if(NOT output STREQUAL "Hello, world!")
-      message(FATAL_ERROR "in ${locale} the host said: ${output}")
-    endif()
+    says("Hello, world!" ${work}/build/helloHost "${work}/build/ü 日")
   endforeach()
 endif()

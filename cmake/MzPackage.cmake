@@ -1,0 +1,54 @@
+# What packages contain besides what is installed otherwise: licences and the list of changes, as the
+# component `documents`; and what CPack needs to make the installer for Windows. Included before
+# MzInstall. packaging/package.sh makes the packages.
+include_guard()
+include(GNUInstallDirs)
+
+set(mzPackaging ${PROJECT_SOURCE_DIR}/packaging)
+set(mzPackageFiles ${PROJECT_BINARY_DIR}/packageFiles)
+set(mzDocuments ${CMAKE_INSTALL_DATADIR}/doc/libMZcomponentManager)
+file(MAKE_DIRECTORY ${mzPackageFiles})
+
+set(mzCopyright ${mzPackaging}/copyright)
+if(WIN32)
+  # The compiler's runtime DLLs are installed, too: without the symbols that only a debugger reads,
+  # which are nine tenths of them; with their licences and the versions of their sources.
+  set(mzStripped)
+  foreach(file IN LISTS MZ_RUNTIME_FILES)
+    cmake_path(GET file FILENAME name)
+    execute_process(COMMAND ${CMAKE_STRIP} -o ${mzPackageFiles}/${name} ${file}
+      COMMAND_ERROR_IS_FATAL ANY)
+    list(APPEND mzStripped ${mzPackageFiles}/${name})
+  endforeach()
+  set(MZ_RUNTIME_FILES ${mzStripped})
+  execute_process(
+    COMMAND dpkg-query -W
+      -f "\${Package} \${Version}, from \${source:Package} \${source:Version}\\n"
+      gcc-mingw-w64-x86-64-posix-runtime mingw-w64-x86-64-dev
+    OUTPUT_FILE ${mzPackageFiles}/RUNTIME-VERSIONS.txt COMMAND_ERROR_IS_FATAL ANY)
+  file(READ ${mzPackaging}/copyright copyright)
+  file(READ ${mzPackaging}/copyright.windows copyrightOfRuntime)
+  file(WRITE ${mzPackageFiles}/copyright "${copyright}${copyrightOfRuntime}")
+  set(mzCopyright ${mzPackageFiles}/copyright)
+  install(FILES ${mzPackageFiles}/RUNTIME-VERSIONS.txt DESTINATION ${mzDocuments}
+    COMPONENT documents)
+  install(FILES /usr/share/common-licenses/GPL-3 RENAME GPL-3.txt DESTINATION ${mzDocuments}
+    COMPONENT documents)
+endif()
+install(FILES ${PROJECT_SOURCE_DIR}/LICENSE ${PROJECT_SOURCE_DIR}/CHANGELOG.md ${mzCopyright}
+  DESTINATION ${mzDocuments} COMPONENT documents)
+
+# ---- The installer for Windows ----------------------------------------------------------------
+set(CPACK_GENERATOR NSIS)
+set(CPACK_PACKAGE_NAME libMZcomponentManager)
+set(CPACK_PACKAGE_FILE_NAME libMZcomponentManager-${PROJECT_VERSION}-windows-x86_64)
+set(CPACK_PACKAGE_VENDOR "libMZcomponentManager authors")
+set(CPACK_RESOURCE_FILE_LICENSE ${PROJECT_SOURCE_DIR}/LICENSE)
+set(CPACK_MONOLITHIC_INSTALL ON)
+set(CPACK_STRIP_FILES ON)
+# CPack's script makes a program of 32 bits unless it names another target; where the system has no
+# 32-bit part, that program ends without a word and without having installed anything.
+set(CPACK_NSIS_DEFINES "Target amd64-unicode\n  SetDateSave off")
+set(CPACK_NSIS_PACKAGE_NAME "libMZcomponentManager ${PROJECT_VERSION}")
+set(CPACK_NSIS_DISPLAY_NAME "libMZcomponentManager ${PROJECT_VERSION}")
+include(CPack)

@@ -1,0 +1,69 @@
+#!/usr/bin/env bash
+# Builds the packages of the source tree that this script is in:
+#   buildPackages.sh OUTPUT
+# They depend on the sources, the compilers and SOURCE_DATE_EPOCH, and on nothing else: not on the
+# folder, the user, the time or the order of files in a folder. Everything that makes them so is here
+# and in the package presets.
+set -euo pipefail
+top=$(cd "$(dirname "${BASH_SOURCE[0]}")/.." && pwd)
+output=$1
+: "${SOURCE_DATE_EPOCH:?}"
+umask 022
+export TZ=UTC LC_ALL=C.UTF-8
+
+version=$(sed -n 's/^#define MZ_VERSION_[A-Z]* \([0-9]*\)$/\1/p' \
+  "$top/components/componentManager/version.h" | paste -sd.)
+linux=$top/build/package-linux
+windows=$top/build/package-windows
+
+# compile PRESET
+compile() { (cd "$top" && cmake --preset "$1" && cmake --build --preset "$1"); }
+
+# stage BUILD NAME: installs into BUILD/stage/NAME, the content of an archive.
+stage() {
+  local folder=$1/stage/$2
+  rm -rf "$1/stage"
+  cmake --install "$1" --strip --prefix "$folder"
+  find "$folder" -exec touch --no-dereference --date="@$SOURCE_DATE_EPOCH" {} +
+}
+
+# For the Debian packages and the archive one folder is enough: they differ in how programs are
+# linked, not in how sources are compiled.
+make_debian() {
+  compile package-debian
+  local folder=$linux/debian
+  rm -rf "$folder" "$linux"/*.deb
+  mkdir -p "$folder"
+  cp -R "$top/packaging/debian" "$folder/debian"
+  cp "$top/packaging/copyright" "$folder/debian/copyright"
+  if [[ "$(head -n 1 "$folder/debian/changelog")" != "libmzcomponentmanager ($version-"* ]]; then
+    echo "packaging/debian/changelog does not begin with version $version" >&2
+    return 1
+  fi
+  (cd "$folder" && BUILD=$linux SOURCE=$top debian/rules binary)
+  mv "$linux"/*.deb "$output"
+}
+
+make_linux_archive() {
+  local name=libMZcomponentManager-$version-linux-x86_64
+  compile package-linux
+  stage "$linux" "$name"
+  tar --sort=name --owner=0 --group=0 --numeric-owner --format=gnu -C "$linux/stage" -cf - "$name" |
+    gzip -9n >"$output/$name.tar.gz"
+}
+
+make_windows() {
+  local name=libMZcomponentManager-$version-windows-x86_64
+  compile package-windows
+  stage "$windows" "$name"
+  rm -f "$output/$name.zip"
+  (cd "$windows/stage" && find "$name" | sort | zip -X -9 -q -@ "$output/$name.zip")
+  (cd "$windows" && cpack -G NSIS)
+  mv "$windows/$name.exe" "$output"
+}
+
+rm -rf "$output"
+mkdir -p "$output"
+make_debian
+make_linux_archive
+make_windows
