@@ -3,6 +3,7 @@
 // Input: the kind of stream, the stored objects.
 #include "fuzz/fuzz.h"
 #include "tests/objects/objectStreams.h"
+#include "tests/streams/streamKinds.h"
 #include "tests/support/journal.h"
 
 #include <optional>
@@ -64,9 +65,10 @@ int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
     QrGetComponentManager()->initialize(MZ_BUILD_PATH L"/components/objects");
     forgetNotes(); // The classes take notes of what they go through, for other tests.
     Fuzz::Input input(data, size);
-    if (input.byte() % 2)
-        load<QrTextStream>(input.rest());
-    else
-        load<QrBinaryStream>(input.rest());
+    switch (input.byte() % 4) {
+    case 0: load<QrBinaryStream>(input.rest()); break;
+    case 2: load<BaseStream>(input.rest()); break;
+    default: load<QrTextStream>(input.rest()); break;
+    }
     return 0;
 }

@@ -45,7 +45,10 @@ std::string readFailure(Work&& work) {
 /// The component manager with the test's classes.
 class Objects : public testing::Test {
   protected:
-    Objects() { QrGetComponentManager()->initialize(MZ_BUILD_PATH L"/components/objects"); }
+    Objects() {
+        QrGetComponentManager()->initialize(
+            MZ_BUILD_PATH L"/components/objects;" MZ_BUILD_PATH L"/components/objectForms");
+    }
 
     static QrPtr<Node> make(const QrUid& uid) {
         const QrRef<QrCastable> object = QrGetComponentManager()->createObject(uid);

@@ -55,6 +55,7 @@ class NodeObject final : public QrCastRef<QrCastHeap<QrCastMulti<NodeObject, Nod
     std::vector<Node*> pending;
 };
 
+/// Does not hold what is still being read: a load that fails would leave a circle of references.
 class HolderObject final
     : public QrCastRef<QrCastHeap<QrCastMulti<HolderObject, Node, QrPersistant>>> {
   public:
@@ -73,9 +74,18 @@ class HolderObject final
     void read(QrStream& stream) override {
         unsigned int count = 0;
         stream >> number >> count;
-        for (; count > 0; --count)
-            links.push_back(queryCast<Node>(stream.readObject(&Node::uid, nullptr, nullptr).get()));
+        for (; count > 0; --count) {
+            QrPtr<Node> link =
+                queryCast<Node>(stream.readObject(&Node::uid, nullptr, nullptr).get());
+            const auto* holder = dynamic_cast<const HolderObject*>(link.get());
+            if (!holder || holder->whole)
+                links.push_back(std::move(link));
+        }
+        whole = true;
     }
+
+  private:
+    bool whole = false;
 };
 
 class CensusObject final : public QrCastRef<QrCastHeap<QrCastImpl<CensusObject, Census>>> {
