@@ -2,6 +2,7 @@
 
 #include "components/componentManager/platform/platform.h"
 #include "components/componentTools/discovery.h"
+#include "components/componentTools/hostNeeds.h"
 #include "components/componentTools/inspection.h"
 
 #include <algorithm>
@@ -48,8 +49,11 @@ void compareUids(Explanation& explanation, const RecordedLibraries& recorded,
                      textOf(builder.uid), other.directory + L"\\" + other.fileName});
 }
 
-void load(Explanation& explanation, const ProbeOptions& options) {
-    ProbeResult result = probeLibrary(explanation.file, options);
+void load(Explanation& explanation, const ExplainOptions& options) {
+    ProbeResult result = probeLibrary(explanation.file, options.probe);
+    if (result.verdict.verdict == Verdict::loadFailed && options.followDependencies)
+        if (auto symbol = symbolOfHost(explanation.file, explanation.dependencies))
+            result.verdict = std::move(*symbol);
     // What is missing says more than the loader's words about it.
     if (result.verdict.verdict != Verdict::loadFailed ||
         explanation.verdict.verdict != Verdict::dependencyMissing)
@@ -68,20 +72,25 @@ Explanation explainFile(const std::filesystem::path& file, const ExplainOptions&
     explanation.file = candidate.path;
     LibraryImage image;
     explanation.verdict = inspectFile(candidate.path, image);
-    const bool component = explanation.verdict.verdict == Verdict::component;
+    bool component = explanation.verdict.verdict == Verdict::component;
     if (options.followDependencies && image.format != ImageFormat::none &&
         explanation.verdict.verdict != Verdict::otherSystem)
         explanation.dependencies = dependenciesOf(candidate.path, image, options.programFolder);
-    if (component)
-        if (auto missing = missingDependency(candidate.path, explanation.dependencies))
+    if (component) {
+        if (auto program = programOfHost(image, explanation.dependencies)) {
+            explanation.verdict = std::move(*program);
+            component = false;
+        } else if (auto missing = missingDependency(candidate.path, explanation.dependencies)) {
             explanation.verdict = std::move(*missing);
+        }
+    }
     const RecordedLibrary* record =
         options.recorded ? findRecord(*options.recorded, candidate.directory, candidate.fileName)
                          : nullptr;
     if (options.recorded)
         explanation.notes.push_back(judgeRecord(record, candidate.path));
     if (options.load && component)
-        load(explanation, options.probe);
+        load(explanation, options);
     else if (record)
         explanation.builders = record->builders;
     if (options.recorded)
