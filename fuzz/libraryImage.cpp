@@ -2,6 +2,8 @@
 #include "components/componentTools/libraryImage.h"
 #include "fuzz/fuzz.h"
 
+#include <set>
+
 int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
     using namespace Mz;
     const Fuzz::InputFile file(Fuzz::Input(data, size).rest());
@@ -10,5 +12,12 @@ int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
     // No more than the file has room for.
     std::size_t texts = image.needed.size() + image.rpath.size() + image.runpath.size();
     Fuzz::expect(texts <= size, "as many names as bytes at most");
+    // Symbols are looked at where loading failed, and what failed may be damaged.
+    std::set<std::string> names;
+    for (std::string& name : Tools::wantedSymbols(file.path()))
+        names.insert(std::move(name));
+    const std::size_t wanted = names.size();
+    if (!Tools::removeDefined(file.path(), names))
+        Fuzz::expect(names.size() == wanted, "what cannot be read defines nothing");
     return 0;
 }

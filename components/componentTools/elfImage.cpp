@@ -47,6 +47,9 @@ constexpr std::size_t maximumSegments = 1024;
 constexpr std::size_t maximumDynamicEntries = 4096;
 constexpr std::size_t maximumNeeded = 1024;
 constexpr std::size_t maximumChainLength = 4096;
+constexpr std::uint64_t maximumSymbols = 1u << 18;
+constexpr std::size_t maximumNameBytes = std::size_t{16} << 20;
+constexpr unsigned int globalBinding = 1;
 
 std::wstring processorName(std::uint16_t machine, bool narrow) {
     switch (machine) {
@@ -74,6 +77,29 @@ class ElfReader {
             image.kind = LibraryImage::Kind::program;
         else
             findEntryPoint();
+    }
+
+    /// The symbols that somebody else must define before the library can be loaded, but for those
+    /// that it wants in a certain version, which only the libraries that it needs can have.
+    std::vector<std::string> wantedSymbols() {
+        std::vector<std::string> names;
+        std::size_t bytes = 0;
+        const std::uint64_t count = std::min<std::uint64_t>(unhashedSymbols(), maximumSymbols);
+        for (std::uint64_t index = 1; index < count && bytes < maximumNameBytes; ++index) {
+            const auto symbol = readAt<Symbol>(symbols + index * sizeof(Symbol));
+            if (!symbol || symbol->section != 0 || symbol->info >> 4 != globalBinding ||
+                isVersioned(index))
+                continue;
+            if (auto text = name(symbol->name)) {
+                bytes += text->size();
+                names.push_back(std::move(*text));
+            }
+        }
+        return names;
+    }
+
+    bool defines(std::string_view wanted) {
+        return symbols && strings && (gnuHash || hash) && find(wanted);
     }
 
   private:
@@ -163,6 +189,7 @@ class ElfReader {
         case 15: rpaths.push_back(entry.value); break;
         case 29: runpaths.push_back(entry.value); break;
         case 0x6FFFFEF5: gnuHash = entry.value; break;
+        case 0x6FFFFFF0: versions = entry.value; break;
         case 0x6FFFFFFB: program = (entry.value & 0x08000000) != 0; break;
         default: break;
         }
@@ -230,19 +257,43 @@ class ElfReader {
             damaged(L"it has no table of symbols");
             return;
         }
-        if (gnuHash)
-            findByGnuHash(entryPointName);
-        else
-            findByHash(entryPointName);
+        const auto symbol = find(entryPointName);
+        if (!symbol)
+            return;
+        // Functions written in assembly often carry no type; one may be chosen at load time.
+        const unsigned int type = symbol->info & 15;
+        const bool function = type == 0 || type == 2 || type == 10;
+        image.entryPoint =
+            function ? LibraryImage::EntryPoint::function : LibraryImage::EntryPoint::noFunction;
     }
 
-    void findByGnuHash(std::string_view wanted) {
+    /// The symbol with that name that is defined here for others to see.
+    std::optional<Symbol> find(std::string_view wanted) {
+        return gnuHash ? findByGnuHash(wanted) : findByHash(wanted);
+    }
+
+    /// How many symbols there may be that others define: the newer table begins behind them.
+    std::uint64_t unhashedSymbols() {
+        if (!symbols || !strings)
+            return 0;
+        if (gnuHash)
+            return readAt<std::uint32_t>(gnuHash + 4).value_or(0);
+        return hash ? readAt<std::uint32_t>(hash + 4).value_or(0) : 0;
+    }
+
+    bool isVersioned(std::uint64_t index) {
+        constexpr std::uint16_t hidden = 0x8000, firstVersion = 2;
+        const auto version = versions ? readAt<std::uint16_t>(versions + index * 2) : std::nullopt;
+        return version && (*version & ~hidden) >= firstVersion;
+    }
+
+    std::optional<Symbol> findByGnuHash(std::string_view wanted) {
         struct Table {
             std::uint32_t bucketCount, firstSymbol, bloomCount, bloomShift;
         };
         const auto table = readAt<Table>(gnuHash);
         if (!table || !table->bucketCount)
-            return;
+            return std::nullopt;
         std::uint32_t code = 5381;
         for (const char c : wanted)
             code = code * 33 + static_cast<unsigned char>(c);
@@ -250,22 +301,28 @@ class ElfReader {
         const std::uint64_t chains = buckets + table->bucketCount * 4ull;
         const auto bucket = readAt<std::uint32_t>(buckets + code % table->bucketCount * 4ull);
         if (!bucket || *bucket < table->firstSymbol)
-            return;
+            return std::nullopt;
         for (std::size_t step = 0; step < maximumChainLength; ++step) {
             const std::uint64_t index = *bucket + step;
             const auto entry = readAt<std::uint32_t>(chains + (index - table->firstSymbol) * 4);
-            if (!entry || ((*entry | 1) == (code | 1) && isEntryPoint(index)) || (*entry & 1))
-                return;
+            if (!entry)
+                return std::nullopt;
+            if ((*entry | 1) == (code | 1))
+                if (auto symbol = definition(index, wanted))
+                    return symbol;
+            if (*entry & 1)
+                return std::nullopt;
         }
+        return std::nullopt;
     }
 
-    void findByHash(std::string_view wanted) {
+    std::optional<Symbol> findByHash(std::string_view wanted) {
         struct Table {
             std::uint32_t bucketCount, chainCount;
         };
         const auto table = readAt<Table>(hash);
         if (!table || !table->bucketCount)
-            return;
+            return std::nullopt;
         std::uint32_t code = 0;
         for (const char c : wanted) {
             code = (code << 4) + static_cast<unsigned char>(c);
@@ -275,26 +332,22 @@ class ElfReader {
         const std::uint64_t chains = buckets + table->bucketCount * 4ull;
         auto index = readAt<std::uint32_t>(buckets + code % table->bucketCount * 4ull);
         for (std::size_t step = 0; index && *index && step < maximumChainLength; ++step) {
-            if (isEntryPoint(*index))
-                return;
+            if (auto symbol = definition(*index, wanted))
+                return symbol;
             index = readAt<std::uint32_t>(chains + *index * 4ull);
         }
+        return std::nullopt;
     }
 
-    /// Whether the symbol is the one sought, and defined here for others to see; notes it if so.
-    bool isEntryPoint(std::uint64_t index) {
+    /// The symbol if it has that name and is defined here for others to see.
+    std::optional<Symbol> definition(std::uint64_t index, std::string_view wanted) {
         const auto symbol = readAt<Symbol>(symbols + index * sizeof(Symbol));
-        if (!symbol || symbol->section == 0 || name(symbol->name) != entryPointName)
-            return false;
-        const unsigned int type = symbol->info & 15, binding = symbol->info >> 4;
-        const unsigned int visibility = symbol->other & 3;
+        if (!symbol || symbol->section == 0 || name(symbol->name) != wanted)
+            return std::nullopt;
+        const unsigned int binding = symbol->info >> 4, visibility = symbol->other & 3;
         if (binding == 0 || visibility == 1 || visibility == 2)
-            return false;
-        // Functions written in assembly often carry no type; one may be chosen at load time.
-        const bool function = type == 0 || type == 2 || type == 10;
-        image.entryPoint =
-            function ? LibraryImage::EntryPoint::function : LibraryImage::EntryPoint::noFunction;
-        return true;
+            return std::nullopt;
+        return symbol;
     }
 
     FileBytes& file;
@@ -304,13 +357,45 @@ class ElfReader {
     std::optional<Segment> dynamic;
     bool program = false;
     std::uint64_t symbols = 0, strings = 0, stringsSize = 0, hash = 0, gnuHash = 0;
-    std::uint64_t ownName = 0;
+    std::uint64_t ownName = 0, versions = 0;
 };
 
 } // namespace
 
 void readElfImage(FileBytes& file, LibraryImage& image) {
     ElfReader(file, image).read();
+}
+
+namespace {
+
+bool isElf(FileBytes& file) {
+    const auto magic = file.read<std::array<char, 4>>(0);
+    return magic && std::string_view(magic->data(), magic->size()) == "\177ELF";
+}
+
+} // namespace
+
+std::vector<std::string> wantedSymbols(const std::filesystem::path& path) {
+    FileBytes file(path);
+    if (!isElf(file))
+        return {};
+    LibraryImage image;
+    ElfReader reader(file, image);
+    reader.read();
+    return reader.wantedSymbols();
+}
+
+bool removeDefined(const std::filesystem::path& path, std::set<std::string>& names) {
+    FileBytes file(path);
+    if (!isElf(file))
+        return false;
+    LibraryImage image;
+    ElfReader reader(file, image);
+    reader.read();
+    if (!image.damage.empty())
+        return false;
+    std::erase_if(names, [&](const std::string& name) { return reader.defines(name); });
+    return true;
 }
 
 } // namespace Mz::Tools

@@ -1,6 +1,7 @@
 #include "components/componentTools/explain.h"
 
 #include "components/componentTools/discovery.h"
+#include "components/componentTools/hostNeeds.h"
 #include "components/componentTools/inspection.h"
 #include "components/componentTools/uidNotes.h"
 #include "components/platform/platform.h"
@@ -53,8 +54,11 @@ Finding judgePath(const std::vector<std::filesystem::path>& folders,
     return {leads ? Verdict::onPath : Verdict::notOnPath, {}, {}};
 }
 
-void load(Explanation& explanation, const ProbeOptions& options) {
-    ProbeResult result = probeLibrary(explanation.file, options);
+void load(Explanation& explanation, const ExplainOptions& options) {
+    ProbeResult result = probeLibrary(explanation.file, options.probe);
+    if (result.verdict.verdict == Verdict::loadFailed && options.followDependencies)
+        if (auto symbol = symbolOfHost(explanation.file, explanation.dependencies))
+            result.verdict = std::move(*symbol);
     // What is missing says more than the loader's words about it.
     if (result.verdict.verdict != Verdict::loadFailed ||
         explanation.verdict.verdict != Verdict::dependencyMissing)
@@ -73,20 +77,25 @@ Explanation explainFile(const std::filesystem::path& file, const ExplainOptions&
     explanation.file = candidate.path;
     LibraryImage image;
     explanation.verdict = inspectFile(candidate.path, image);
-    const bool component = explanation.verdict.verdict == Verdict::component;
+    bool component = explanation.verdict.verdict == Verdict::component;
     if (options.followDependencies && image.format != ImageFormat::none &&
         explanation.verdict.verdict != Verdict::otherSystem)
         explanation.dependencies = dependenciesOf(candidate.path, image, options.programFolder);
-    if (component)
-        if (auto missing = missingDependency(candidate.path, explanation.dependencies))
+    if (component) {
+        if (auto program = programOfHost(image, explanation.dependencies)) {
+            explanation.verdict = std::move(*program);
+            component = false;
+        } else if (auto missing = missingDependency(candidate.path, explanation.dependencies)) {
             explanation.verdict = std::move(*missing);
+        }
+    }
     const RecordedLibrary* record =
         options.recorded ? findRecord(*options.recorded, candidate.directory, candidate.fileName)
                          : nullptr;
     if (options.recorded)
         explanation.notes.push_back(judgeRecord(record, candidate.path));
     if (options.load && component)
-        load(explanation, options.probe);
+        load(explanation, options);
     else if (record)
         explanation.builders = record->builders;
     const RecordedLibraries nothing;

@@ -75,7 +75,7 @@ bool drawSvg(const std::string& dot, const std::filesystem::path& svg, std::wstr
         return false;
     }
     const System::ChildLimits limits{
-        std::chrono::minutes(2), std::uint64_t{4} << 30, std::size_t{256} << 20, {}};
+        std::chrono::minutes(2), std::uint64_t{4} << 30, 0, std::size_t{256} << 20, {}};
     std::filesystem::path input = svg;
     input += ".dot-" + std::to_string(System::processNumber());
     replaceFile(input, dot);

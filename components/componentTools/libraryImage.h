@@ -10,6 +10,7 @@
 #include <filesystem>
 #include <fstream>
 #include <optional>
+#include <set>
 #include <string>
 #include <type_traits>
 #include <vector>
@@ -86,6 +87,15 @@ LibraryImage readLibraryImage(const std::filesystem::path& path);
 /// does, up to the first thing that is wrong.
 void readElfImage(FileBytes& file, LibraryImage& image);
 void readPeImage(FileBytes& file, LibraryImage& image);
+
+/// The symbols that others must define before the library at `path`, in the format of Linux, can be
+/// loaded. Leaves out those that may be missing (weak), and those that it wants in a certain
+/// version: these can only come from the libraries that it needs.
+std::vector<std::string> wantedSymbols(const std::filesystem::path& path);
+
+/// Removes from `names` what the library at `path`, in the format of Linux, defines for others.
+/// False when it cannot be read or is damaged.
+bool removeDefined(const std::filesystem::path& path, std::set<std::string>& names);
 
 /// The entry point of component libraries.
 inline constexpr const char* entryPointName = "QrGetComponentDescription";

@@ -43,6 +43,16 @@ Finding completed(const ProbeAnswer& answer, const System::ChildResult& child,
     return fault;
 }
 
+/// The process has ended without a fault and without a description.
+Finding judgeMissingAnswer(const System::ChildResult& child, const ProbeAnswer& answer) {
+    if (child.status != answeredStatus)
+        return {Verdict::exited, nameOf(answer.stage), std::to_wstring(child.status)};
+    // It did answer, so the library has got at the pipe.
+    if (answer.cutOff)
+        return {Verdict::garbled, L"its last message is not whole", {}};
+    return {Verdict::answerLost, nameOf(answer.stage), {}};
+}
+
 Finding judgeEnd(const System::ChildResult& child, const ProbeAnswer& answer,
                  const ProbeOptions& options) {
     using End = System::ChildResult::End;
@@ -51,8 +61,9 @@ Finding judgeEnd(const System::ChildResult& child, const ProbeAnswer& answer,
     case End::notStarted: return {Verdict::probeFailed, child.words, {}};
     case End::interrupted: return {Verdict::interrupted, {}, {}};
     case End::timedOut: return {Verdict::timedOut, stage, seconds(options.timeLimit)};
-    case End::outOfMemory:
-    case End::tooMuchOutput: return memoryFinding(answer, options);
+    case End::outOfMemory: return memoryFinding(answer, options);
+    case End::tooMuchOutput:
+        return {Verdict::answerTooLong, std::to_wstring(longestAnswer >> 20), {}};
     default: break;
     }
     if (answer.garbled)
@@ -69,7 +80,7 @@ Finding judgeEnd(const System::ChildResult& child, const ProbeAnswer& answer,
                 L"it ended at once, with status " + std::to_wstring(child.status),
                 {}};
     if (!answer.description)
-        return {Verdict::exited, stage, std::to_wstring(child.status)};
+        return judgeMissingAnswer(child, answer);
     const std::size_t count = answer.description->builders.size();
     if (count == 0)
         return {Verdict::offersNothing, {}, {}};
@@ -94,14 +105,27 @@ void noteBuilders(const Description& description, std::vector<Finding>& notes) {
         notes.push_back({Verdict::uidTwice, textOf(*twice), {}});
 }
 
-} // namespace
+/// Whether a library may get this verdict because it was refused memory.
+bool mayLackMemory(Verdict verdict) {
+    switch (verdict) {
+    case Verdict::loadFailed:
+    case Verdict::nullDescription:
+    case Verdict::wrongItem:
+    case Verdict::threw:
+    case Verdict::crashed:
+    case Verdict::aborted:
+    case Verdict::exited: return true;
+    default: return false;
+    }
+}
 
-ProbeResult probeLibrary(const std::filesystem::path& file, const ProbeOptions& options) {
-    const System::ChildLimits limits{options.timeLimit, options.memoryLimit, longestAnswer,
+/// `refused` is how much memory the system refuses the process, in bytes; 0 for no such limit.
+ProbeResult probeOnce(const std::filesystem::path& file, const ProbeOptions& options,
+                      std::uint64_t refused) {
+    const System::ChildLimits limits{options.timeLimit, options.memoryLimit, refused, longestAnswer,
                                      options.interrupted};
     const System::ChildResult child = System::runChild(
-        probeProgram(options),
-        {std::filesystem::absolute(file), std::to_string(options.memoryLimit)}, limits);
+        probeProgram(options), {std::filesystem::absolute(file), std::to_string(refused)}, limits);
     ProbeAnswer answer = decodeAnswer(child.output);
     ProbeResult result;
     result.verdict = judgeEnd(child, answer, options);
@@ -113,6 +137,17 @@ ProbeResult probeLibrary(const std::filesystem::path& file, const ProbeOptions& 
         result.text = std::move(answer.description->text);
         result.builders = std::move(answer.description->builders);
     }
+    return result;
+}
+
+} // namespace
+
+ProbeResult probeLibrary(const std::filesystem::path& file, const ProbeOptions& options) {
+    // What is only reserved counts for the system as well, so it refuses no less than this.
+    const std::uint64_t refused = options.memoryLimit * 2 + (std::uint64_t{1} << 30);
+    ProbeResult result = probeOnce(file, options, refused);
+    if (mayLackMemory(result.verdict.verdict))
+        result = probeOnce(file, options, 0);
     return result;
 }
 

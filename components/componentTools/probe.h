@@ -21,7 +21,8 @@ namespace Mz::Tools {
 struct ProbeOptions {
     /// A library that takes longer to load and describe itself is killed.
     std::chrono::milliseconds timeLimit{10'000};
-    /// So is one whose process uses more memory, in bytes. Looked at some hundred times a second.
+    /// So is one whose process uses more memory, in bytes: addresses that are only reserved do not
+    /// count. Looked at some hundred times a second.
     std::uint64_t memoryLimit = std::uint64_t{1} << 30;
     /// The program to run; empty for the one beside libMZcomponentTools.
     std::filesystem::path program;
@@ -38,6 +39,10 @@ struct ProbeResult {
 };
 
 /// Loads the file in a new process and tells how that went. Blocks until it has ended.
+///
+/// The system refuses the process far more memory than `memoryLimit`, for what is taken faster than
+/// it can be noticed. A library that fails may have failed for that alone, with reservations that
+/// it never uses: it is tried once more without the refusal, and the second result counts.
 MZ_COMPONENT_TOOLS_API ProbeResult probeLibrary(const std::filesystem::path& file,
                                                 const ProbeOptions& options = {});
 

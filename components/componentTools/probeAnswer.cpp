@@ -179,11 +179,10 @@ ProbeAnswer decodeAnswer(std::string_view bytes) {
             answer.garbled = true;
             break;
         }
-        if (bytes.size() < frameSize)
+        answer.cutOff = bytes.size() < frameSize || wordAt(bytes, 5) > bytes.size() - frameSize;
+        if (answer.cutOff)
             break;
         const std::size_t size = wordAt(bytes, 5);
-        if (size > bytes.size() - frameSize)
-            break;
         const std::string_view payload = bytes.substr(9, size);
         try {
             if (wordAt(bytes, 9 + size) != sumOf(payload))

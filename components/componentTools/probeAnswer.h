@@ -36,12 +36,16 @@ struct ProbeAnswer {
     Stage stage = Stage::starting;
     bool anything = false; ///< whether the process has said a word
     bool garbled = false;  ///< there is something that is no message
+    bool cutOff = false;   ///< the last message is not whole, and counts as not sent
     std::optional<Finding> fault;
     std::optional<Description> description;
 };
 
-/// Reads the messages up to the end, or up to the first thing that is none. A message that was cut
-/// off at the end counts as not sent.
+/// The status with which the process ends by itself, after its last message: one that no library is
+/// likely to exit with.
+inline constexpr int answeredStatus = 217;
+
+/// Reads the messages up to the end, or up to the first thing that is none.
 ProbeAnswer decodeAnswer(std::string_view bytes);
 
 } // namespace Mz::Tools

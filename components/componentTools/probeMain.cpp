@@ -187,5 +187,5 @@ int main(int argc, char** argv) {
     std::set_terminate(onTerminate);
     send(encodeStage(Stage::starting));
     probe(System::pathOfArgument(arguments[0]));
-    System::endProcess(0);
+    System::endProcess(answeredStatus);
 }

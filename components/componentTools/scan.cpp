@@ -184,6 +184,10 @@ class Scanner {
         library.fileName = file.fileName;
         library.time = status.time;
         library.size = status.size;
+        if (file.verdict.verdict == Verdict::needsHost) {
+            result.unjudged.push_back(std::move(library)); // The host alone can tell.
+            return;
+        }
         if (file.verdict.verdict == Verdict::works)
             library.builders = std::move(explanation.builders);
         if (const std::wstring* text = uncarriedText(library)) {

@@ -40,10 +40,12 @@ struct ScannedFile {
 struct ScanResult {
     std::vector<ScannedFile> files; ///< in the host's order, those left out behind them
     RecordedLibraries libraries;    ///< what was, or should have been, written
-    std::wstring rejected;          ///< why the old list was rejected; empty when it was not
-    std::filesystem::path keptAs;   ///< where a copy of what was rejected is; empty for nowhere
-    std::wstring notWritten;        ///< names the file that was not written, and says why
-    bool interrupted = false;       ///< the user stopped it; the rest of the old list was kept
+    /// What needs its host (`needsHost`), without builders; not written.
+    RecordedLibraries unjudged;
+    std::wstring rejected;        ///< why the old list was rejected; empty when it was not
+    std::filesystem::path keptAs; ///< where a copy of what was rejected is; empty for nowhere
+    std::wstring notWritten;      ///< names the file that was not written, and says why
+    bool interrupted = false;     ///< the user stopped it; the rest of the old list was kept
 };
 
 /// Scans the folders, loading each library that is new, has changed, or lacks something that may
@@ -53,6 +55,9 @@ struct ScanResult {
 /// the list does not load it either, until its file changes. What was wrong is kept beside the
 /// list, in the file `verdictsFileOf(list)`. What is no component library is recorded in the same
 /// way, as the manager does.
+///
+/// A library that needs its host's own program cannot be tried. It is not recorded, so a host loads
+/// it at each start. A program that must not load it adds `unjudged` to the list for its manager.
 ///
 /// A damaged or foreign list is rejected whole and built anew; a copy of it stays beside the new
 /// one, with ".rejected" behind its name. Two scans at once do not damage each other: each writes a

@@ -75,6 +75,11 @@ constexpr Entry entries[] = {
      L"install what has %1, or add its folder to the loader's path (%L)"},
 
     {Verdict::loadFailed, "loadFailed", Severity::fault, L"the system cannot load it: %2", L""},
+    {Verdict::needsHost, "needsHost", Severity::fault,
+     L"it needs %1 from the program of its host%2, so only that host can load it, and a scan does "
+     L"not record it",
+     L"if the host has it, let the host load the library; to have it scanned as well, move what it "
+     L"needs into a library that both link. If no host has it, link the library that defines it"},
     {Verdict::nullDescription, "nullDescription", Severity::fault,
      L"its entry point returns null instead of a description", L"return the description"},
     {Verdict::wrongInterface, "wrongInterface", Severity::fault,
@@ -89,14 +94,24 @@ constexpr Entry entries[] = {
     {Verdict::aborted, "aborted", Severity::fault, L"it aborts the process in %1%2", L""},
     {Verdict::exited, "exited", Severity::fault, L"it ends the process in %1, with status %2", L""},
     {Verdict::timedOut, "timedOut", Severity::fault,
-     L"it did not come to an end in %1 within %2 seconds", L"if it only needs longer, allow more"},
+     L"it did not come to an end in %1 within %2 seconds; --time-limit allows more",
+     L"if it only needs longer, raise --time-limit (in a host: ProbeOptions::timeLimit)"},
     {Verdict::outOfMemory, "outOfMemory", Severity::fault,
-     L"it takes more memory in %1 than the %2 MiB allowed", L"if it really needs more, allow more"},
+     L"it uses more memory in %1 than the %2 MiB allowed; --memory-limit allows more",
+     L"if it really needs more, raise --memory-limit (in a host: ProbeOptions::memoryLimit)"},
     {Verdict::textNotCarried, "textNotCarried", Severity::fault,
      L"the text \"%1\" of a builder has no form in the current locale, so it cannot be recorded",
      L"choose a locale that has its characters"},
     {Verdict::garbled, "garbled", Severity::fault,
      L"the process that loaded it did not answer as it should (%1)", L""},
+    {Verdict::answerLost, "answerLost", Severity::fault,
+     L"it closed files in %1 that it did not open, the connection to this process among them, so "
+     L"what it offers is unknown",
+     L"close only what the library itself has opened"},
+    {Verdict::answerTooLong, "answerTooLong", Severity::fault,
+     L"the process that loaded it answered with more than %1 MiB, the most that a description may "
+     L"have",
+     L"offer fewer builders, or shorter texts"},
     {Verdict::probeFailed, "probeFailed", Severity::fault,
      L"the process to load it in could not be started: %1",
      L"check that mzcomponents-probe stands beside libMZcomponentTools"},

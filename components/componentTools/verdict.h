@@ -42,6 +42,7 @@ enum class Verdict {
 
     // Faults that show when the library is loaded and described in a process of its own.
     loadFailed,
+    needsHost, ///< needs its host's own program, so it loads nowhere else
     nullDescription,
     wrongInterface, ///< the description does not answer for `QrComponentDescription`
     wrongItem,      ///< one of the builders offered is none
@@ -53,6 +54,8 @@ enum class Verdict {
     outOfMemory,
     textNotCarried, ///< the locale has no form for a text of a builder
     garbled,        ///< the process answered with something else than an answer
+    answerLost,     ///< the process came to its end, and its answer did not arrive
+    answerTooLong,  ///< the process answered with more than a description may have
     probeFailed,    ///< the process could not be started
     endUnknown,     ///< the system does not tell this program how the process ended
     interrupted,    ///< the user wanted it to end

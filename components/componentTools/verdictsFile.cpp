@@ -47,6 +47,7 @@ bool isKept(Verdict verdict) {
     case Verdict::notSearchable:
     case Verdict::sameName:
     case Verdict::textNotCarried:
+    case Verdict::needsHost:
     case Verdict::probeFailed:
     case Verdict::interrupted: return false;
     default: return severityOf(verdict) != Severity::note;

@@ -2,6 +2,7 @@
 #pragma once
 
 #include <cstddef>
+#include <cstdint>
 #include <filesystem>
 #include <string>
 #include <vector>
@@ -36,6 +37,20 @@ void setEnvironment(const std::string& name, const std::string& value);
 
 /// `path` as a search path that works on this system: absolute, and in the system's spelling.
 std::wstring searchPathOf(const std::filesystem::path& path);
+
+/// Reserves so many bytes of addresses without using any memory, writable or not; false when the
+/// system refuses. They stay reserved.
+bool reserveAddresses(std::uint64_t size, bool writable);
+
+/// Takes so many bytes of memory that processes could share and writes to them; false when the
+/// system refuses. They stay taken.
+bool useSharedMemory(std::uint64_t size);
+
+/// Closes every pipe of this process that a library has no business with.
+void closePipes();
+
+/// Writes to every such pipe.
+void writeToPipes(const std::string& bytes);
 
 struct ProgramResult {
     bool finished = false; ///< ended by itself, not by the system

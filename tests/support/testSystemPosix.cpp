@@ -1,10 +1,13 @@
 #include "tests/support/testSystem.h"
 
 #include <cstdlib>
+#include <cstring>
 #include <dlfcn.h>
 #include <fcntl.h>
 #include <fstream>
 #include <malloc.h>
+#include <sys/mman.h>
+#include <sys/stat.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
@@ -69,6 +72,48 @@ void setEnvironment(const std::string& name, const std::string& value) {
 
 std::wstring searchPathOf(const std::filesystem::path& path) {
     return path.wstring();
+}
+
+bool reserveAddresses(std::uint64_t size, bool writable) {
+    return ::mmap(nullptr, size, writable ? PROT_READ | PROT_WRITE : PROT_NONE,
+                  MAP_PRIVATE | MAP_ANONYMOUS | MAP_NORESERVE, -1, 0) != MAP_FAILED;
+}
+
+bool useSharedMemory(std::uint64_t size) {
+    void* const memory =
+        ::mmap(nullptr, size, PROT_READ | PROT_WRITE, MAP_SHARED | MAP_ANONYMOUS, -1, 0);
+    if (memory == MAP_FAILED)
+        return false;
+    std::memset(memory, 1, size);
+    return true;
+}
+
+namespace {
+
+/// Calls `action` with each descriptor of a pipe but the standard ones.
+template <class Action>
+void forEachPipe(Action action) {
+    struct stat status;
+    for (int descriptor = 3; descriptor < 1024; ++descriptor)
+        if (::fstat(descriptor, &status) == 0 && S_ISFIFO(status.st_mode))
+            action(descriptor);
+}
+
+} // namespace
+
+void closePipes() {
+    forEachPipe([](int descriptor) { ::close(descriptor); });
+}
+
+void writeToPipes(const std::string& bytes) {
+    forEachPipe([&](int descriptor) {
+        for (std::size_t done = 0; done < bytes.size();) {
+            const ssize_t written = ::write(descriptor, bytes.data() + done, bytes.size() - done);
+            if (written <= 0)
+                return;
+            done += static_cast<std::size_t>(written);
+        }
+    });
 }
 
 namespace {

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <cstdlib>
+#include <cstring>
 #include <fstream>
 #include <iterator>
 #include <malloc.h>
@@ -87,6 +88,51 @@ void setEnvironment(const std::string& name, const std::string& value) {
 
 std::wstring searchPathOf(const std::filesystem::path& path) {
     return fullName(path);
+}
+
+bool reserveAddresses(std::uint64_t size, bool writable) {
+    return ::VirtualAlloc(nullptr, size, MEM_RESERVE, writable ? PAGE_READWRITE : PAGE_NOACCESS) !=
+           nullptr;
+}
+
+bool useSharedMemory(std::uint64_t size) {
+    const HANDLE section =
+        ::CreateFileMappingW(INVALID_HANDLE_VALUE, nullptr, PAGE_READWRITE,
+                             static_cast<DWORD>(size >> 32), static_cast<DWORD>(size), nullptr);
+    void* const memory = section ? ::MapViewOfFile(section, FILE_MAP_WRITE, 0, 0, size) : nullptr;
+    if (!memory)
+        return false;
+    std::memset(memory, 1, size);
+    return true;
+}
+
+namespace {
+
+/// Calls `action` with each handle of a pipe.
+template <class Action>
+void forEachPipe(Action action) {
+    for (std::uintptr_t number = 4; number < 0x1000; number += 4) {
+        const HANDLE handle = reinterpret_cast<HANDLE>(number);
+        if (::GetFileType(handle) == FILE_TYPE_PIPE)
+            action(handle);
+    }
+}
+
+} // namespace
+
+void closePipes() {
+    forEachPipe([](HANDLE handle) { ::CloseHandle(handle); });
+}
+
+void writeToPipes(const std::string& bytes) {
+    forEachPipe([&](HANDLE handle) {
+        DWORD written = 0;
+        for (std::size_t done = 0; done < bytes.size(); done += written)
+            if (!::WriteFile(handle, bytes.data() + done, static_cast<DWORD>(bytes.size() - done),
+                             &written, nullptr) ||
+                written == 0)
+                return;
+    });
 }
 
 ProgramResult runProgram(const std::filesystem::path& program, const std::string& firstArgument,

@@ -200,6 +200,24 @@ TEST_F(Command, LeavesStandardOutputToItsResults) {
               "talks                 *.talk            Talks\n");
 }
 
+TEST_F(Command, EveryCommandThatLoadsLibrariesTakesTheLimits) {
+    add(L"eatsMemory");
+    add(L"notes");
+    const Json files = json(1, {"scan", "--cache", "list", "--memory-limit", "100"}).at("files");
+    EXPECT_EQ(files.at(0).at("sentence"), "it uses more memory in enumerateBuilders than the 100 "
+                                          "MiB allowed; --memory-limit allows more");
+    EXPECT_EQ(json(1, {"types", "--memory-limit", "100"}).at("types").size(), 1u);
+    EXPECT_EQ(json(1, {"graph", "--memory-limit", "100"}).at("libraries").size(), 1u);
+    std::ofstream(work.path() / "one.note", std::ios::binary) << "N1";
+    const auto limited = {"--memory-limit", "100", "--time-limit", "60"};
+    std::vector<std::string> import{"import", "one.note", "--save", inWork("saved")};
+    import.insert(import.end(), limited.begin(), limited.end());
+    EXPECT_TRUE(json(1, import).at("files").at(0).at("imported"));
+    std::vector<std::string> show{"show", inWork("saved")};
+    show.insert(show.end(), limited.begin(), limited.end());
+    EXPECT_EQ(json(1, show).at("objects").size(), 5u);
+}
+
 TEST_F(Command, GoesOnWhateverAComponentThrows) {
     add(L"notes");
     add(L"throwsInCanImport");
@@ -233,6 +251,12 @@ TEST_F(Command, EndsWithOneWhenAComponentExits) {
     EXPECT_FALSE(std::filesystem::exists(work.path() / "saved"));
     EXPECT_EQ(run({"graph", "--path", path()}).exitCode, 1);
     EXPECT_EQ(run({"types", "--path", path()}).exitCode, 0);
+}
+
+TEST_F(Command, UsesTheOthersBesideALibraryThatNeedsItsHost) {
+    add(L"notes");
+    add(L"takesFromHost");
+    EXPECT_EQ(json(1, {"types"}).at("types").size(), 1u);
 }
 
 TEST_F(Command, EndsWithOneWhereALibraryIsFaulty) {

@@ -95,6 +95,16 @@ TEST_F(Explain, NamesTheLibraryThroughWhichADependencyIsMissing) {
     EXPECT_TRUE(indirect);
 }
 
+TEST_F(Explain, NamesWhatALibraryNeedsFromTheProgramOfItsHost) {
+    const Finding finding = loadedVerdict(L"takesFromHost");
+    EXPECT_EQ(finding.verdict, Verdict::needsHost);
+    // One system's libraries name the program, the other's only the symbol.
+    const std::wstring program = std::wstring(L"recordedHost") + MZ_PROGRAM_EXTENSION;
+    EXPECT_EQ(finding.subject, program == L"recordedHost" ? L"mzTestHostNumber" : program);
+    EXPECT_THAT(sentenceOf(finding), HasSubstr(L"from the program of its host"));
+    EXPECT_THAT(cureOf(finding), HasSubstr(L"let the host load"));
+}
+
 TEST_F(Explain, RunsNothingOfTheFileUnlessTold) {
     forgetNotes();
     explainFile(add(L"goodByHand"));

@@ -3,6 +3,7 @@
 
 #include "components/componentTools/libraryImage.h"
 #include "tests/support/temporaryDirectory.h"
+#include "tests/tools/toolsFixture.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -112,5 +113,29 @@ INSTANTIATE_TEST_SUITE_P(Formats, Image, ::testing::Values(ImageFormat::elf, Ima
                          [](const auto& format) {
                              return format.param == ImageFormat::elf ? "Elf" : "Pe";
                          });
+
+TEST(LibrarySymbols, AreThoseThatOthersMustDefine) {
+    const auto names = [](const std::filesystem::path& file) {
+        const std::vector<std::string> wanted = wantedSymbols(file);
+        return std::set<std::string>(wanted.begin(), wanted.end());
+    };
+    const std::filesystem::path component = builtComponent(L"takesFromHost");
+    std::set<std::string> wanted = names(component);
+    if (readLibraryImage(component).format != ImageFormat::elf) {
+        EXPECT_TRUE(wanted.empty());
+        return;
+    }
+    EXPECT_TRUE(wanted.contains("mzTestHostNumber"));
+    // Those of the standard library have versions, and this one may be missing.
+    EXPECT_FALSE(wanted.contains("_Znwm"));
+    EXPECT_FALSE(wanted.contains("__gmon_start__"));
+    // Nor does it want what it defines.
+    EXPECT_FALSE(wanted.contains(entryPointName));
+
+    std::set<std::string> defined{entryPointName, "mzTestHostNumber"};
+    EXPECT_TRUE(removeDefined(component, defined));
+    EXPECT_EQ(defined, std::set<std::string>{"mzTestHostNumber"});
+    EXPECT_FALSE(removeDefined(component.parent_path() / "nothing", defined));
+}
 
 } // namespace

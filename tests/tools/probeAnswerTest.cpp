@@ -40,6 +40,7 @@ TEST(ProbeAnswer, CutOffAnywhereHoldsNoDescriptionAndIsNotGarbled) {
         const ProbeAnswer answer = decodeAnswer(std::string_view(all).substr(0, size));
         ASSERT_FALSE(answer.description) << size;
         ASSERT_FALSE(answer.garbled) << size;
+        ASSERT_EQ(answer.cutOff, size != 0 && size != stage.size()) << size;
         ASSERT_EQ(answer.anything, size >= stage.size()) << size;
     }
 }

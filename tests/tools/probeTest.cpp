@@ -6,6 +6,7 @@
 using namespace Mz;
 using namespace Mz::Tools;
 using namespace Mz::Test;
+using ::testing::HasSubstr;
 
 namespace {
 
@@ -31,6 +32,51 @@ TEST_F(Probe, LeavesNoProcessWhenTheUserInterruptsIt) {
     options.interrupted = [] { return true; };
     EXPECT_EQ(probeLibrary(add(L"loopsForever"), options).verdict.verdict, Verdict::interrupted);
     EXPECT_FALSE(hasChildProcess());
+}
+
+TEST_F(Probe, CountsMemoryThatIsUsedAndNoAddresses) {
+    ProbeOptions options = patient();
+    options.memoryLimit = std::uint64_t{300} << 20;
+    EXPECT_EQ(probeLibrary(add(L"reservesAddresses"), options).verdict,
+              (Finding{Verdict::works, L"1", {}}));
+    EXPECT_EQ(probeLibrary(add(L"reservesMemory"), options).verdict,
+              (Finding{Verdict::works, L"1", {}}));
+}
+
+TEST_F(Probe, CountsMemoryThatProcessesShare) {
+    ProbeOptions options = patient();
+    options.memoryLimit = std::uint64_t{300} << 20;
+    EXPECT_EQ(probeLibrary(add(L"eatsSharedMemory"), options).verdict,
+              (Finding{Verdict::outOfMemory, L"enumerateBuilders", L"300"}));
+}
+
+TEST_F(Probe, NamesTheLimitAndTheOptionThatRaisesIt) {
+    const Finding memory{Verdict::outOfMemory, L"its entry point", L"300"};
+    EXPECT_EQ(sentenceOf(memory), L"it uses more memory in its entry point than the 300 MiB "
+                                  L"allowed; --memory-limit allows more");
+    EXPECT_THAT(cureOf(memory), HasSubstr(L"ProbeOptions::memoryLimit"));
+    const Finding time{Verdict::timedOut, L"its entry point", L"10"};
+    EXPECT_EQ(sentenceOf(time), L"it did not come to an end in its entry point within 10 seconds; "
+                                L"--time-limit allows more");
+    EXPECT_THAT(cureOf(time), HasSubstr(L"ProbeOptions::timeLimit"));
+}
+
+TEST_F(Probe, TellsALibraryThatClosesWhatItDidNotOpenFromOneThatExits) {
+    EXPECT_EQ(probeLibrary(add(L"closesPipes"), patient()).verdict,
+              (Finding{Verdict::answerLost, L"enumerateBuilders", {}}));
+    EXPECT_EQ(probeLibrary(add(L"exits"), patient()).verdict,
+              (Finding{Verdict::exited, L"enumerateBuilders", L"0"}));
+}
+
+TEST_F(Probe, TellsALibraryThatWritesIntoItsAnswerFromOneThatExits) {
+    EXPECT_EQ(probeLibrary(add(L"writesToPipes"), patient()).verdict,
+              (Finding{Verdict::garbled, L"its last message is not whole", {}}));
+}
+
+TEST_F(Probe, TellsAnAnswerThatIsTooLongFromTooMuchMemory) {
+    const Finding finding = probeLibrary(add(L"writesForever"), patient()).verdict;
+    EXPECT_EQ(finding, (Finding{Verdict::answerTooLong, L"64", {}}));
+    EXPECT_THAT(sentenceOf(finding), HasSubstr(L"64 MiB"));
 }
 
 } // namespace

@@ -126,6 +126,22 @@ TEST_F(Scan, WritesWhatTheManagerItselfWouldWrite) {
     EXPECT_EQ(runHost(folder.path()), "1 builders, 0 mapped, no word\n1 made\n");
 }
 
+TEST_F(Scan, LeavesOutALibraryThatNeedsItsHostSoThatTheHostLoadsIt) {
+    const auto file = add(L"takesFromHost");
+    add(L"goodWithKit");
+    for (int round = 0; round < 2; ++round) {
+        const ScanResult result = scan(options());
+        EXPECT_EQ(verdicts(result)[file.filename().string()], Verdict::needsHost) << round;
+        ASSERT_EQ(result.libraries.size(), 1u);
+        ASSERT_EQ(result.unjudged.size(), 1u);
+        EXPECT_TRUE(result.unjudged[0].builders.empty());
+        EXPECT_EQ(readRecordedList(list()).libraries.size(), 1u);
+    }
+    const std::string host = runHost(folder.path());
+    EXPECT_THAT(host, ::testing::StartsWith("2 builders, 1 mapped"));
+    EXPECT_THAT(host, HasSubstr("\n2 made\n"));
+}
+
 TEST_F(Scan, LooksAgainAtALibraryThatChanged) {
     const auto file = add(L"changingOne", "changing");
     EXPECT_EQ(looked(scan(options())), 1);

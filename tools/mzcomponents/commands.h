@@ -5,6 +5,8 @@
 #include "components/componentTools/console.h"
 #include "components/componentTools/scan.h"
 
+#include <chrono>
+#include <cstdint>
 #include <filesystem>
 #include <string>
 #include <vector>
@@ -33,6 +35,13 @@ struct ProbeArguments {
     double seconds = 10;
     unsigned int mebibytes = 1024;
     bool retry = false;
+
+    Tools::ProbeOptions options() const {
+        Tools::ProbeOptions result;
+        result.timeLimit = std::chrono::milliseconds(static_cast<long long>(seconds * 1000));
+        result.memoryLimit = std::uint64_t{mebibytes} << 20;
+        return result;
+    }
 };
 
 struct ImportArguments {
@@ -47,9 +56,10 @@ struct GraphArguments {
 int list(const Common& common);
 int explain(const Common& common, const ExplainArguments& arguments, const ProbeArguments& probe);
 int scan(const Common& common, const ProbeArguments& probe);
-int types(const Common& common);
-int importFiles(const Common& common, const ImportArguments& arguments);
-int show(const Common& common, const std::string& file);
-int graph(const Common& common, const GraphArguments& arguments);
+int types(const Common& common, const ProbeArguments& probe);
+int importFiles(const Common& common, const ImportArguments& arguments,
+                const ProbeArguments& probe);
+int show(const Common& common, const std::string& file, const ProbeArguments& probe);
+int graph(const Common& common, const GraphArguments& arguments, const ProbeArguments& probe);
 
 } // namespace Mz::Commands

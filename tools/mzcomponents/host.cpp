@@ -53,7 +53,8 @@ class Judged {
   public:
     explicit Judged(const Tools::ScanResult& scanned) {
         for (const Tools::ScannedFile& file : scanned.files)
-            if (file.recorded || file.verdict.verdict == Tools::Verdict::textNotCarried)
+            if (file.recorded || file.verdict.verdict == Tools::Verdict::textNotCarried ||
+                file.verdict.verdict == Tools::Verdict::needsHost)
                 names.emplace(file.directory, file.fileName);
     }
     bool has(const Tools::Candidate& candidate) const {
@@ -104,13 +105,14 @@ void tellOfDoubt(Tools::ConsoleController& controller, const std::filesystem::pa
 
 } // namespace
 
-Host::Host(const Common& common) {
+Host::Host(const Common& common, const ProbeArguments& probe) {
     reserveResults();
     guardExit();
     Tools::ScanOptions options;
     options.folders = Tools::foldersOf(Tools::pathOf(common.path));
     if (!common.cache.empty())
         options.list = Tools::pathOf(common.cache);
+    options.probe = probe.options();
     options.probe.interrupted = [this] { return controller.isInterrupted(); };
     scanned = Tools::scan(options);
     tellFaults(common.cache);
@@ -157,7 +159,9 @@ void Host::start(const std::vector<std::filesystem::path>& folders) {
     const std::wstring searchPath = Tools::searchPathOf(folders);
     if (searchPath.empty())
         return; // The manager would take the folder of this program instead.
-    giveToManager(scanned.libraries);
+    Tools::RecordedLibraries known = scanned.libraries;
+    known.insert(known.end(), scanned.unjudged.begin(), scanned.unjudged.end());
+    giveToManager(known);
     const Activity activity(L"the component manager started");
     QrGetComponentManager()->initialize(searchPath.c_str());
 }

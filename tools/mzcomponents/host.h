@@ -21,7 +21,7 @@ namespace Mz::Commands {
 /// only one.
 class Host {
   public:
-    explicit Host(const Common& common);
+    Host(const Common& common, const ProbeArguments& probe);
     ~Host();
     Host(const Host&) = delete;
     Host& operator=(const Host&) = delete;

@@ -190,8 +190,8 @@ Json jsonOf(const Host& host, const std::vector<Tools::GraphImporter>& importers
 
 } // namespace
 
-int types(const Common& common) {
-    Host host(common);
+int types(const Common& common, const ProbeArguments& probe) {
+    Host host(common, probe);
     if (host.interrupted())
         return subjectIsWrong;
     Json all = Json::array();
@@ -220,12 +220,13 @@ int types(const Common& common) {
     return host.status();
 }
 
-int importFiles(const Common& common, const ImportArguments& arguments) {
+int importFiles(const Common& common, const ImportArguments& arguments,
+                const ProbeArguments& probe) {
     if (!arguments.save.empty() && isOneOf(Tools::pathOf(arguments.save), arguments.files)) {
         complain(widened(arguments.save) + L": this file is to be imported, not overwritten");
         return wrongUse;
     }
-    Host host(common);
+    Host host(common, probe);
     if (host.interrupted())
         return subjectIsWrong;
     std::vector<QrRef<QrCastable>> objects;
@@ -249,8 +250,8 @@ int importFiles(const Common& common, const ImportArguments& arguments) {
     return host.status();
 }
 
-int graph(const Common& common, const GraphArguments& arguments) {
-    Host host(common);
+int graph(const Common& common, const GraphArguments& arguments, const ProbeArguments& probe) {
+    Host host(common, probe);
     if (host.interrupted())
         return subjectIsWrong;
     const std::vector<Tools::GraphImporter> importers = importersOf(host);

@@ -106,13 +106,6 @@ Json jsonOfExplanation(const Tools::Explanation& explanation) {
     return entry;
 }
 
-Tools::ProbeOptions probeOptions(const ProbeArguments& arguments) {
-    Tools::ProbeOptions options;
-    options.timeLimit = std::chrono::milliseconds(static_cast<long long>(arguments.seconds * 1000));
-    options.memoryLimit = std::uint64_t{arguments.mebibytes} << 20;
-    return options;
-}
-
 /// A component that failed when it was scanned shows no fault from the outside.
 bool failedEarlier(const Tools::Explanation& explanation) {
     return explanation.verdict.verdict == Tools::Verdict::component && !explanation.notes.empty() &&
@@ -182,7 +175,7 @@ int explain(const Common& common, const ExplainArguments& arguments, const Probe
     options.load = arguments.load;
     const auto folders = Tools::foldersOf(Tools::pathOf(arguments.path));
     options.folders = arguments.path.empty() ? nullptr : &folders;
-    options.probe = probeOptions(probe);
+    options.probe = probe.options();
     options.probe.interrupted = [&] { return controller.isInterrupted(); };
     Json files = Json::array();
     bool faults = !recorded.sound;
@@ -207,7 +200,7 @@ int scan(const Common& common, const ProbeArguments& probe) {
     options.folders = Tools::foldersOf(Tools::pathOf(common.path));
     options.list = Tools::pathOf(common.cache);
     options.retry = probe.retry;
-    options.probe = probeOptions(probe);
+    options.probe = probe.options();
     options.controller = &controller;
     const Tools::ScanResult result = Tools::scan(options);
     controller.clearLine();

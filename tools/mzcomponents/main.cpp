@@ -131,8 +131,10 @@ void addUseCommands(CLI::App& app, Arguments& arguments) {
         addCommand(app, arguments, "types", "Lists the file types that the components import.",
                    "mzcomponents types --path /opt/app/components");
     addCache(types, arguments, updatedCache);
-    types->callback(
-        [&] { arguments.command = [&] { return Mz::Commands::types(arguments.common); }; });
+    addLimits(types, arguments);
+    types->callback([&] {
+        arguments.command = [&] { return Mz::Commands::types(arguments.common, arguments.probe); };
+    });
 
     CLI::App* importer = addCommand(app, arguments, "import",
                                     "Imports files through whichever component can read them.",
@@ -143,9 +145,10 @@ void addUseCommands(CLI::App& app, Arguments& arguments) {
                      "Store the imported objects in this file, if all of them can be stored")
         ->check(namesAFile);
     addCache(importer, arguments, updatedCache);
+    addLimits(importer, arguments);
     importer->callback([&] {
         arguments.command = [&] {
-            return Mz::Commands::importFiles(arguments.common, arguments.import);
+            return Mz::Commands::importFiles(arguments.common, arguments.import, arguments.probe);
         };
     });
 
@@ -155,8 +158,11 @@ void addUseCommands(CLI::App& app, Arguments& arguments) {
         "mzcomponents show ~/.cache/app/components.list");
     show->add_option("FILE", arguments.shown, "The file")->required();
     addCache(show, arguments, updatedCache);
+    addLimits(show, arguments);
     show->callback([&] {
-        arguments.command = [&] { return Mz::Commands::show(arguments.common, arguments.shown); };
+        arguments.command = [&] {
+            return Mz::Commands::show(arguments.common, arguments.shown, arguments.probe);
+        };
     });
 
     CLI::App* graph =
@@ -172,8 +178,11 @@ void addUseCommands(CLI::App& app, Arguments& arguments) {
                      "Have Graphviz, which must be installed, draw it to this file")
         ->check(namesAFile);
     addCache(graph, arguments, updatedCache);
+    addLimits(graph, arguments);
     graph->callback([&] {
-        arguments.command = [&] { return Mz::Commands::graph(arguments.common, arguments.graph); };
+        arguments.command = [&] {
+            return Mz::Commands::graph(arguments.common, arguments.graph, arguments.probe);
+        };
     });
 }
 

@@ -1,7 +1,8 @@
 # Completion of mzcomponents for bash.
 _mzcomponents() {
   local current=${COMP_WORDS[COMP_CWORD]} previous=${COMP_WORDS[COMP_CWORD - 1]}
-  local common="--path --cache --json --help" options word command=
+  local common="--path --cache --json --help" limits="--time-limit --memory-limit"
+  local options word command=
   for word in "${COMP_WORDS[@]:1:COMP_CWORD-1}"; do
     case $word in
     list | explain | scan | types | import | show | graph)
@@ -25,11 +26,12 @@ _mzcomponents() {
   esac
   case $command in
   '') options="list explain scan types import show graph --help --version" ;;
-  explain) options="$common --load --time-limit --memory-limit" ;;
-  scan) options="$common --retry --time-limit --memory-limit" ;;
-  import) options="$common --save" ;;
-  graph) options="$common --output --svg" ;;
-  *) options=$common ;;
+  list) options=$common ;;
+  explain) options="$common $limits --load" ;;
+  scan) options="$common $limits --retry" ;;
+  import) options="$common $limits --save" ;;
+  graph) options="$common $limits --output --svg" ;;
+  *) options="$common $limits" ;;
   esac
   mapfile -t COMPREPLY < <(compgen -W "$options" -- "$current")
   case $command in

@@ -140,8 +140,8 @@ bool beginsWithAnObject(std::istream& input) {
 
 /// Only components know what their objects hold, so the stream is read through them.
 int showObjects(const Common& common, const std::filesystem::path& file, std::istream& input,
-                const std::wstring& whyNoList) {
-    Host host(common);
+                const std::wstring& whyNoList, const ProbeArguments& probe) {
+    Host host(common, probe);
     if (host.interrupted())
         return subjectIsWrong;
     const Activity activity(L"the objects of " + Tools::displayName(file) + L" were read");
@@ -179,7 +179,7 @@ std::wstring obstacle(const std::filesystem::path& file, std::ifstream& input,
 
 } // namespace
 
-int show(const Common& common, const std::string& argument) {
+int show(const Common& common, const std::string& argument, const ProbeArguments& probe) {
     const std::filesystem::path file = Tools::pathOf(argument);
     const Tools::ListReading reading = Tools::readRecordedList(file);
     if (reading.state == Tools::ListReading::State::good) {
@@ -189,7 +189,7 @@ int show(const Common& common, const std::string& argument) {
     std::ifstream input;
     const std::wstring wrong = obstacle(file, input, reading.reason);
     if (wrong.empty())
-        return showObjects(common, file, input, reading.reason);
+        return showObjects(common, file, input, reading.reason, probe);
     complain(widened(argument) + L": " + wrong);
     return subjectIsWrong;
 }

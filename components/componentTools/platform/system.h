@@ -82,6 +82,7 @@ const char* programExtension();
 struct ChildLimits {
     std::chrono::milliseconds time;
     std::uint64_t memory;              ///< in bytes, of what it really uses
+    std::uint64_t refused;             ///< in bytes, of what the system lets it have; 0 for all
     std::size_t output;                ///< in bytes
     std::function<bool()> interrupted; ///< asked now and then; true ends the child
 };
@@ -113,7 +114,8 @@ ChildResult runChild(const NativePath& program, const std::vector<NativePath>& a
 /// The calling thread's own pipe to the process that started this one.
 ///
 /// Made of standard output, which from then on leads nowhere, as does standard error: what others
-/// write there does not get between our words.
+/// write there does not get between our words. Other files that this process has inherited are
+/// closed.
 class AnswerPipe {
   public:
     AnswerPipe();
@@ -136,8 +138,9 @@ bool writeReserved(int descriptor, const char* data, std::size_t size);
 void wantEndsOfChildren();
 
 /// Sees to it that this process, which is to load libraries that may do anything, goes with the one
-/// that started it, opens no dialogs, leaves no dump, and cannot take far more than `memory` bytes.
-void confine(std::uint64_t memory);
+/// that started it, opens no dialogs, leaves no dump, and is refused more than `refused` bytes of
+/// memory unless that is 0. Reserved addresses count where they may be written to.
+void confine(std::uint64_t refused);
 
 /// Ends this process at once; nothing of the libraries in it is run.
 [[noreturn]] void endProcess(int status);

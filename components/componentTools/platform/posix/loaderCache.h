@@ -9,12 +9,12 @@ namespace Mz::Tools::System {
 /// The file that the loader's cache has for the library `name`.
 std::optional<std::string> findInLoaderCache(const std::string& name);
 
-/// Whether a limit on addresses leaves the process working: the sanitizers need nearly all there
-/// are.
+/// Whether a limit on private memory leaves the process working: what the sanitizers reserve
+/// counts.
 #ifdef MZ_UNLIMITED_ADDRESSES
-inline constexpr bool addressSpaceMayBeLimited = false;
+inline constexpr bool dataMayBeLimited = false;
 #else
-inline constexpr bool addressSpaceMayBeLimited = true;
+inline constexpr bool dataMayBeLimited = true;
 #endif
 
 } // namespace Mz::Tools::System

@@ -13,6 +13,7 @@
 #include <sys/prctl.h>
 #include <sys/resource.h>
 #include <sys/stat.h>
+#include <sys/syscall.h>
 #include <unistd.h>
 
 namespace Mz::Tools::System {
@@ -185,6 +186,8 @@ bool writeAll(int descriptor, const char* data, std::size_t size) {
 } // namespace
 
 AnswerPipe::AnswerPipe() {
+    // What the host let its children inherit is no business of a library's.
+    ::syscall(SYS_close_range, STDERR_FILENO + 1, ~0u, 0);
     // A high number, which nobody meets by counting.
     handle = ::fcntl(STDOUT_FILENO, F_DUPFD_CLOEXEC, 500);
     const int nowhere = ::open("/dev/null", O_RDWR);
@@ -219,17 +222,17 @@ void wantEndsOfChildren() {
     std::signal(SIGCHLD, SIG_DFL);
 }
 
-void confine(std::uint64_t memory) {
+void confine(std::uint64_t refused) {
     ::prctl(PR_SET_PDEATHSIG, SIGKILL);
     ::prctl(PR_SET_DUMPABLE, 0);
     const rlimit noDump{0, 0};
     ::setrlimit(RLIMIT_CORE, &noDump);
-    // The parent watches what is really used. This is for what is asked for faster than it looks;
-    // a process has far more addresses than memory.
-    if (memory && addressSpaceMayBeLimited) {
-        const rlim_t most = static_cast<rlim_t>(memory) * 2 + (rlim_t{1} << 30);
-        const rlimit addresses{most, most};
-        ::setrlimit(RLIMIT_AS, &addresses);
+    // The parent watches what is really used. This is for what is taken faster than it looks. A
+    // limit on addresses would hit generators of code and drivers, which reserve many times what
+    // they use.
+    if (refused && dataMayBeLimited) {
+        const rlimit data{static_cast<rlim_t>(refused), static_cast<rlim_t>(refused)};
+        ::setrlimit(RLIMIT_DATA, &data);
     }
 }
 

@@ -74,15 +74,17 @@ class Inherited {
     LPPROC_THREAD_ATTRIBUTE_LIST list;
 };
 
-/// A job that takes what is in it along when it ends, and lets it take twice the memory allowed:
-/// the parent watches what is really used.
-HANDLE newJob(std::uint64_t memory) {
+/// A job that takes what is in it along when it ends. Unless `refused` is 0, the system refuses to
+/// commit more memory in it; the parent watches what is really used.
+HANDLE newJob(std::uint64_t refused) {
     const HANDLE job = ::CreateJobObjectW(nullptr, nullptr);
     JOBOBJECT_EXTENDED_LIMIT_INFORMATION limit{};
-    limit.BasicLimitInformation.LimitFlags = JOB_OBJECT_LIMIT_KILL_ON_JOB_CLOSE |
-                                             JOB_OBJECT_LIMIT_DIE_ON_UNHANDLED_EXCEPTION |
-                                             JOB_OBJECT_LIMIT_PROCESS_MEMORY;
-    limit.ProcessMemoryLimit = static_cast<SIZE_T>(memory) * 2;
+    limit.BasicLimitInformation.LimitFlags =
+        JOB_OBJECT_LIMIT_KILL_ON_JOB_CLOSE | JOB_OBJECT_LIMIT_DIE_ON_UNHANDLED_EXCEPTION;
+    if (refused) {
+        limit.BasicLimitInformation.LimitFlags |= JOB_OBJECT_LIMIT_PROCESS_MEMORY;
+        limit.ProcessMemoryLimit = static_cast<SIZE_T>(refused);
+    }
     ::SetInformationJobObject(job, JobObjectExtendedLimitInformation, &limit, sizeof limit);
     return job;
 }
@@ -171,9 +173,9 @@ class Watch {
         PROCESS_MEMORY_COUNTERS counters{};
         counters.cb = sizeof counters;
         if (::K32GetProcessMemoryInfo(child, &counters, sizeof counters))
-            judgement.memory =
-                std::max<std::uint64_t>({judgement.memory, counters.PagefileUsage,
-                                         counters.WorkingSetSize, counters.PeakWorkingSetSize});
+            judgement.memory = std::max<std::uint64_t>(
+                {judgement.memory, counters.PagefileUsage, counters.PeakPagefileUsage,
+                 counters.WorkingSetSize, counters.PeakWorkingSetSize});
         return judgement.memory;
     }
 
@@ -233,7 +235,7 @@ ChildResult runChild(const NativePath& program, const std::vector<NativePath>& a
         return failed;
     }
     ::SetHandleInformation(output.get(), HANDLE_FLAG_INHERIT, 0);
-    const Handle job(newJob(limits.memory));
+    const Handle job(newJob(limits.refused));
     PROCESS_INFORMATION process{};
     if (!start(program, arguments, input.get(), job.get(), process)) {
         failed.words = displayName(program) + L": error " + std::to_wstring(::GetLastError());

@@ -1,0 +1,48 @@
+/// On Windows a library names the program that it imports from. On Linux it only lacks a
+/// definition, which shows when everything that it needs was asked for it. That takes a look-up for
+/// each symbol and library, so it is done after a load has failed, and not for each file of a
+/// folder.
+#include "components/componentTools/hostNeeds.h"
+
+#include "components/componentTools/platform/system.h"
+#include "components/platform/platform.h"
+
+#include <set>
+
+namespace Mz::Tools {
+
+std::optional<Finding> programOfHost(const LibraryImage& image,
+                                     const std::vector<Dependency>& dependencies) {
+    if (image.format != ImageFormat::pe)
+        return std::nullopt;
+    for (const Dependency& dependency : dependencies)
+        if (platform::lowerCase(dependency.name).ends_with(L".exe"))
+            return Finding{Verdict::needsHost, dependency.name, {}};
+    return std::nullopt;
+}
+
+std::optional<Finding> symbolOfHost(const std::filesystem::path& file,
+                                    const std::vector<Dependency>& dependencies) {
+    std::vector<std::filesystem::path> libraries{file};
+    for (const Dependency& dependency : dependencies) {
+        const auto path = platform::toNative(dependency.path);
+        if (dependency.path.empty() || !path)
+            return std::nullopt;
+        libraries.emplace_back(*path);
+    }
+    std::vector<std::string> wanted;
+    for (const std::filesystem::path& library : libraries)
+        for (std::string& name : wantedSymbols(library))
+            wanted.push_back(std::move(name));
+    std::set<std::string> undefined(wanted.begin(), wanted.end());
+    for (const std::filesystem::path& library : libraries)
+        if (!removeDefined(library, undefined))
+            return std::nullopt;
+    for (const std::string& name : wanted)
+        if (undefined.contains(name))
+            return Finding{Verdict::needsHost, System::displayName(System::pathOfArgument(name)),
+                           L", a symbol that no library it needs defines"};
+    return std::nullopt;
+}
+
+} // namespace Mz::Tools

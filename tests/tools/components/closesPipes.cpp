@@ -1,0 +1,5 @@
+/// Closes what it did not open.
+#include "tests/support/testSystem.h"
+#include "tests/tools/components/enumerates.h"
+
+MZ_TEST_ENUMERATES(Mz::Test::closePipes())

@@ -1,0 +1,13 @@
+/// The same with addresses that could be written to.
+#include "tests/support/testSystem.h"
+#include "tests/tools/components/enumerates.h"
+
+#include <cstdlib>
+
+static void reserve() {
+    constexpr std::uint64_t much = std::uint64_t{8} << 30;
+    if (!Mz::Test::reserveAddresses(much, true))
+        std::abort();
+}
+
+MZ_TEST_ENUMERATES(reserve())

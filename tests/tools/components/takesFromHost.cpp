@@ -1,0 +1,5 @@
+/// Needs a function of its host's program.
+#include "tests/tools/components/enumerates.h"
+#include "tests/tools/recordedHost.h"
+
+MZ_TEST_ENUMERATES(if (mzTestHostNumber() != 42) throw 1)
