@@ -35,7 +35,7 @@ std::filesystem::path targetOf(const std::filesystem::path& file) {
     constexpr int maximumLinks = 40; // The limit of Linux.
     std::filesystem::path target = file;
     for (int count = 0; count < maximumLinks; ++count) {
-        const auto text = platform::linkText(target);
+        const auto text = platform::symlinkTarget(target);
         if (!text)
             return target;
         target = target.parent_path() / *text; // An absolute target replaces the folder.
@@ -86,7 +86,7 @@ class NewFile {
 
     void replaceTarget() {
         const auto permissions = replaces() ? std::optional(old.permissions()) : std::nullopt;
-        if (platform::complete(path, permissions))
+        if (platform::syncFile(path, permissions))
             failToWrite(__LINE__, file);
         if (const std::error_code failure = platform::moveOver(path, target))
             failToOpen(__LINE__, file, toUtf8(platform::errorText(failure)));

@@ -121,7 +121,7 @@ ComponentManager::LoadResult ComponentManager::loadModule(ComponentLibrary& libr
     const platform::QuietErrors quiet;
     const platform::UsedLibrary used = platform::useLibrary(path, entryPointName);
     if (used.loaded)
-        platform::keepOwnLibrary();
+        platform::pinThisLibrary();
     // Set these after the load: initialisers of the library may have asked for one of its builders.
     // Such a nested call found the library mapped and set them, too.
     library.module = used.module;
