@@ -184,8 +184,8 @@ class MZ_COMPONENT_MANAGER_API QrComponentManager : public QrCastable {
 
     /// Searches directories for component libraries and registers the builders that they describe.
     ///
-    /// Only the first call has an effect. Later calls, and calls from code that runs during the
-    /// first one, are no-ops.
+    /// Works once. Calls after a successful one, and calls from code that runs during one, are
+    /// no-ops.
     ///
     /// **Candidates.** All regular files of a directory that are neither hidden nor system files,
     /// whatever their extension. Sub-directories are not searched. A file is skipped silently if it
@@ -256,13 +256,14 @@ MZ_COMPONENT_MANAGER_API Mz::QrComponentManager* QrGetComponentManager();
 /// loaded unless it exports this very name itself; an export of one of its dependencies does not
 /// count.
 ///
-/// **Initialisers and finalisers.** They must neither throw nor end their thread. On Linux both
-/// call `std::terminate`, whatever the host catches, because an exception that passes the loader
-/// leaves the loader locked.
+/// **Initialisers and finalisers.** They must neither throw nor end their thread. On Linux
+/// either one calls `std::terminate`, whatever the host catches, because an exception that passes
+/// the loader leaves the loader locked.
 ///
 /// **Lifetime of the library.** A library that fails to describe itself is unloaded at once. Any
 /// other library stays loaded until the manager is destroyed. Its builders and objects may use its
-/// code and its static objects until then.
+/// code and its static objects until then. The manager never unloads a library that the process had
+/// mapped before.
 ///
 /// **Forbidden.** The entry point and the description must not call `initialize`, must not use the
 /// enumerator after `enumerateBuilders` has returned, and must not rely on another component

@@ -60,7 +60,8 @@ MZ_COMPONENT_MANAGER_API std::filesystem::path programFolder();
 /// The result names the same file as `path`. On Linux a symlink before a `..` is therefore resolved
 /// first. Other symlinks stay. The path need not exist.
 ///
-/// \throws std::filesystem::filesystem_error if `path` is relative and the current folder is gone
+/// \throws std::filesystem::filesystem_error if `path` is relative and the current folder does
+///     not exist any more
 MZ_COMPONENT_MANAGER_API std::filesystem::path fullPath(const std::filesystem::path& path);
 
 } // namespace Mz

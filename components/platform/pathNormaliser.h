@@ -19,9 +19,9 @@ namespace Mz {
 /// The recorded lists of users contain these forms. They must never change.
 ///
 /// \param path  the path; for null the result is an empty string
-/// \param listMode  whether `path` is a list of paths, separated by ';', each of which is
-/// normalised.
-///     Runs of ';' become one, and those at the ends are removed.
+/// \param listMode  whether `path` is a list, separated by ';'. Then each element is normalised,
+/// runs
+///     of ';' become one, and those at the ends are removed.
 std::wstring normalisePath(const wchar_t* path, bool listMode);
 
 } // namespace Mz

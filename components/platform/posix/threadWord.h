@@ -7,8 +7,8 @@
 namespace Mz::platform {
 
 /// The thread-local word of the tag type `Name`, which is 0 in a new thread. Here it is a
-/// `thread_local` variable. The build selects the initial-exec model, so that an access is not a
-/// call.
+/// `thread_local` variable. A source that is compiled for the initial-exec model accesses it
+/// without a call.
 template <class Name>
 class ThreadWord {
   public:
