@@ -1,3 +1,8 @@
+/// The interfaces, and the manager's operations.
+///
+/// The destructors and the empty private functions are defined here, so that each interface's
+/// vtable and type information exist once, in this library. The manager is a static object without
+/// a lock. Its constructor loads nothing; only `initialize` does.
 #include "components/componentManager/manager/componentImpPrivate.h"
 
 namespace Mz {
@@ -21,9 +26,9 @@ QrComponentManager::~QrComponentManager() = default;
 ComponentManager::ComponentManager() = default;
 
 ComponentManager::~ComponentManager() {
-    // Libraries that call the manager while they are unloaded find it as if it had never started.
+    // To libraries that call the manager while they are unloaded, it looks uninitialised.
     initialised = false;
-    initialising = true; // For good: whoever comes now must not start it again.
+    initialising = true; // Never reset, so that such a call cannot initialise it again.
     builderIndex.clear();
     while (!libraries.empty())
         libraries.pop_back();
@@ -44,8 +49,8 @@ QrEnum::Action ComponentManager::enumerateBuilders(QrEnumerator<QrCPtr<QrBuilder
     if (!initialised)
         return e.finished();
     for (ComponentLibrary& library : libraries) {
-        // By index: the callee may use a builder whose library turns out to have changed, which
-        // replaces the records under this walk.
+        // By index: the callee may use a builder whose library has changed. That replaces the
+        // records during this walk.
         for (std::size_t index = 0; index < library.builders.size(); ++index) {
             const QrEnum::Action action = e.process(&library.builders[index]);
             if (action != QrEnum::Continue)
@@ -63,8 +68,9 @@ void ComponentManager::initialize(const wchar_t* searchPath) {
         explicit Initialising(bool& value) : flag(value) { flag = true; }
         ~Initialising() { flag = false; }
     } const guard(initialising);
-    // An exception may end this anywhere, and another attempt follow: until all is found, what was
-    // recorded stays where it is, and the index never outlives a record.
+    // An exception may end this call anywhere, and another call may follow. Therefore the restored
+    // records stay in `libraries` until discovery is complete, and the index never refers to a
+    // destroyed record.
     LibraryList recorded;
     {
         LibraryList found;
@@ -78,7 +84,7 @@ void ComponentManager::initialize(const wchar_t* searchPath) {
     recorded.clear();
     for (ComponentLibrary& library : libraries)
         if (library.module)
-            reindexBuilders(library); // The work of an earlier attempt.
+            reindexBuilders(library); // Loaded by an earlier call that threw.
         else
             ensureLoaded(library, false);
     initialised = true;

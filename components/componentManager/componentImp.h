@@ -1,9 +1,10 @@
-/// The component manager, and what a component library gives to it.
+/// The component manager, and the interfaces of a component library.
 ///
 /// For hosts: `QrGetComponentManager()` and `QrComponentManager`.
-/// For component libraries: the entry point (at the end of this file), `QrComponentDescription`,
-/// `QrBuilderDescription` and `QrComponentBuilder`. The component kit makes all three short; read
-/// on here to know what it does, or to do it by hand.
+/// For component libraries: the entry point (`QrGetComponentDescriptionFunction`, at the end of
+/// this file), `QrComponentDescription`, `QrBuilderDescription` and `QrComponentBuilder`. The
+/// component kit implements all of them in a few lines. Read on here to know what it does, or to
+/// implement them by hand.
 #pragma once
 
 #include "components/componentManager/cast.h"
@@ -12,7 +13,7 @@
 
 namespace Mz {
 
-/// A builder: makes objects of one kind, for whoever asks the manager for its identifier.
+/// A builder: makes objects of one kind. The component manager finds it by its uid.
 class MZ_COMPONENT_MANAGER_API QrComponentBuilder : public QrCastable {
   public:
     using Self = QrComponentBuilder;
@@ -20,25 +21,35 @@ class MZ_COMPONENT_MANAGER_API QrComponentBuilder : public QrCastable {
 
     ~QrComponentBuilder() override;
 
-    /// The builder to work with: itself, with a new reference, unless it stands for another.
+    /// Returns the builder to use. The default returns this builder; one that represents another
+    /// builder returns that one.
+    ///
+    /// The caller owns the reference.
     virtual QrRefPtr<QrComponentBuilder> getBuilder();
 
-    /// A new object of this builder's kind, or null when it cannot make one. The reference is the
-    /// caller's; so is the duty to drop it before the manager, and with it the library, is gone.
+    /// Returns a new object of this builder's kind.
+    ///
+    /// The caller owns the reference. Release it before the manager is destroyed: that unloads the
+    /// object's code.
+    ///
+    /// \return the object, or null if the builder cannot make one
     virtual QrRef<QrCastable> createObject() = 0;
 };
 
-/// What is known of a builder without using it.
+/// The description of one builder, which is available without the builder itself.
 ///
-/// A component library implements it once for each builder it describes; the manager copies what it
-/// says into a record of its own, which implements it again, so that clients list and choose
-/// builders without their libraries being loaded. What label, number, text and flag mean is agreed
-/// between the libraries and their clients; the manager keeps them unread.
+/// A component library implements this interface once for each of its builders. The manager copies
+/// the values into a builder record, which implements the interface again. Clients list and choose
+/// builders by these records, without loading any library. The libraries and their clients agree on
+/// the meaning of label, number, text and flag; the manager does not interpret them.
 ///
-/// No text is ever null in a record, and each is valid until the manager is destroyed; only the two
-/// texts of the component, which belong to all builders of a library, are replaced when the library
-/// is read anew, at the first use of one whose file has changed since the start. A library's own
-/// descriptions may give null for an empty text.
+/// A record never returns a null text. A library's own description may return null for an empty
+/// text.
+///
+/// The texts of a record are valid until the manager is destroyed, with one exception: the two
+/// texts of the component. All builders of a library share them, and the manager replaces them when
+/// it records the library anew. That happens at the first use of a library whose file has changed
+/// since the manager was initialised.
 class MZ_COMPONENT_MANAGER_API QrBuilderDescription : public QrCastable {
   public:
     using Self = QrBuilderDescription;
@@ -46,23 +57,35 @@ class MZ_COMPONENT_MANAGER_API QrBuilderDescription : public QrCastable {
 
     ~QrBuilderDescription() override;
 
-    /// The builder's identity, by which the manager finds it.
+    /// Returns the builder's identity, by which the manager finds it.
     virtual const QrUid& getUid() const = 0;
-    /// The builder's name, by which importers find it; compared exactly.
+    /// Returns the builder's name, by which importers find it. They compare it exactly, including
+    /// letter case.
     virtual const wchar_t* getName() const = 0;
+    /// Returns the builder's label.
     virtual const wchar_t* getLabel() const = 0;
+    /// Returns the builder's number.
     virtual unsigned int getNumber() const = 0;
+    /// Returns the builder's text.
     virtual const wchar_t* getText() const = 0;
-    /// The label of the component library. Of a library that is recorded but was not loaded in this
-    /// process, label and text are empty.
+    /// Returns the label of the component library.
+    ///
+    /// Recorded lists do not contain label and text of a library. Both are empty for a library that
+    /// was restored from such a list, and stay empty when the library is loaded, until it is
+    /// recorded anew because its file has changed.
     virtual const wchar_t* getComponentLabel() const = 0;
-    /// The text of the component library.
+    /// Returns the text of the component library, which is empty when the label is not available.
     virtual const wchar_t* getComponentText() const = 0;
+    /// Returns the builder's flag.
     virtual bool getFlag() const = 0;
 
-    /// The builder itself. A manager's record loads the library first, where needed, and gives null
-    /// when that fails or the library does not make the builder; exceptions of the library's own
-    /// code pass through.
+    /// Returns the builder itself. A record of the manager loads the library first, if necessary.
+    ///
+    /// The caller owns the reference.
+    ///
+    /// \return the builder; a record returns null if the library cannot be loaded or does not make
+    ///     the builder
+    /// \throws whatever the library's own code throws
     virtual QrRefPtr<QrComponentBuilder> getBuilder() = 0;
     virtual QrCRefPtr<QrComponentBuilder> getBuilder() const = 0;
 
@@ -70,14 +93,16 @@ class MZ_COMPONENT_MANAGER_API QrBuilderDescription : public QrCastable {
     virtual void forceVtblInstantiation();
 };
 
-/// What a component library says of itself: the interface of the object that its entry point
-/// returns.
+/// The description of a component library: the object that its entry point returns.
 ///
-/// The manager calls it on whatever thread asked for a builder, in this order when it records the
-/// library: `getComponentValue`, `getComponentText`, `getComponentLabel`, `getBuilderCount`,
-/// `enumerateBuilders`, `release`. Whatever it throws there is caught: the library is then recorded
-/// without builders and unloaded. When a client asks for a builder, what `createBuilder` or the
-/// `release` of the description throws reaches that client.
+/// To record a library, the manager calls, in this order: `getComponentValue`, `getComponentText`,
+/// `getComponentLabel`, `getBuilderCount`, `enumerateBuilders`, `release`. It catches whatever they
+/// throw, drops the builders of the library and unloads it. The next start tries the library again.
+///
+/// When a client asks for a builder, the manager calls `createBuilder` and `release`. Their
+/// exceptions propagate to that client.
+///
+/// All calls run on the thread that initialises the manager or asks for a builder.
 class MZ_COMPONENT_MANAGER_API QrComponentDescription : public QrCastable {
   public:
     using Self = QrComponentDescription;
@@ -85,39 +110,55 @@ class MZ_COMPONENT_MANAGER_API QrComponentDescription : public QrCastable {
 
     ~QrComponentDescription() override;
 
-    /// The builder with the identifier `uid`, which answers for `QrComponentBuilder`; null when the
-    /// library has none such. Called each time that a client asks, so a library that wants one
-    /// builder for all keeps it.
+    /// Returns the builder with the identity `uid`.
+    ///
+    /// The manager calls this for each request of a client. A library that has one builder for all
+    /// clients keeps it and returns it each time.
+    ///
+    /// The caller owns the reference.
+    ///
+    /// \return an object that casts to `QrComponentBuilder`, or null if the library has no such
+    ///     builder
     virtual QrRef<QrCastable> createBuilder(const QrUid& uid) = 0;
 
-    /// A value that the manager stores without reading it.
+    /// Returns a value that the manager stores and does not interpret.
     virtual int64 getComponentValue() = 0;
-    /// A label for people; null counts as empty.
+    /// Returns the library's label, for people. Null means empty.
     virtual const wchar_t* getComponentLabel() = 0;
-    /// A text for people; null counts as empty.
+    /// Returns a text about the library, for people. Null means empty.
     virtual const wchar_t* getComponentText() = 0;
 
-    /// How many builders `enumerateBuilders` offers. A hint, on which nothing depends.
+    /// Returns the number of builders that `enumerateBuilders` passes. This is a hint: the manager
+    /// works with a wrong number, too.
     virtual unsigned int getBuilderCount() = 0;
 
-    /// Offers a description of every builder, following the rules of `enumerator.h`. What is not a
-    /// `QrBuilderDescription`, null included, makes the manager drop the whole library.
+    /// Passes the description of each builder to `e`, by the rules of `enumerator.h`.
+    ///
+    /// If an element is null or does not cast to `QrBuilderDescription`, the manager's enumerator
+    /// throws, and the manager drops all builders of the library.
+    ///
+    /// \param e  the enumerator; it must not be used after the call
+    /// \return the action that ended the enumeration
     virtual QrEnum::Action enumerateBuilders(QrEnumerator<QrCPtr<QrBuilderDescription>>& e) = 0;
 
   private:
     virtual void forceVtblInstantiation();
 };
 
-/// The process-wide object through which builders are found.
+/// The component manager: the process-wide object that finds builders and makes objects.
 ///
-/// Threads: initialise it once, from one thread, before others use it. After that the operations
-/// may run side by side for builders whose libraries are loaded; the first use of a builder loads
-/// its library and must not overlap any other use of the manager.
+///     Mz::QrGetComponentManager()->initialize(searchPath);
+///     const Mz::QrRef<Mz::QrCastable> object =
+///         Mz::QrGetComponentManager()->createObject(builderUid); // may be null
 ///
-/// The manager is destroyed when this library is unloaded, at the end of the process as a rule, and
-/// takes the libraries that it loaded with it: objects, builders and descriptions must be given
-/// back before. Once it has loaded a component library, this library stays until the process ends,
-/// even if the host unloads it.
+/// **Threads.** Initialise the manager once, from one thread, before other threads use it. After
+/// that its operations may run concurrently for builders whose libraries are loaded. The first use
+/// of a builder loads its library and must not run concurrently with any other use of the manager.
+///
+/// **Lifetime.** The manager is destroyed when this library is unloaded, usually at the end of the
+/// process, and unloads the libraries that it loaded. Release all objects, builders and
+/// descriptions before that. Once the manager has loaded a component library, this library stays
+/// loaded until the process ends, even if the host unloads it.
 class MZ_COMPONENT_MANAGER_API QrComponentManager : public QrCastable {
   public:
     using Self = QrComponentManager;
@@ -125,35 +166,58 @@ class MZ_COMPONENT_MANAGER_API QrComponentManager : public QrCastable {
 
     ~QrComponentManager() override;
 
-    /// The builder registered for `uid`, its library loaded if need be; null before `initialize`,
-    /// for an unknown identifier, and when the library no longer gives it.
+    /// Returns the builder that is registered for `uid`. Loads its library, if necessary.
+    ///
+    /// The caller owns the reference.
+    ///
+    /// \return the builder; null before `initialize`, if `uid` is unknown, if the library cannot be
+    ///     loaded, or if the library does not make the builder
+    /// \throws whatever the library's own code throws
     virtual QrRefPtr<QrComponentBuilder> getBuilder(const QrUid& uid) = 0;
 
-    /// Offers every builder known, library by library in the order of the search path, and returns
-    /// what ended the walk. Before `initialize` there is none. Loads nothing.
+    /// Passes each builder record to `e`, library by library in the order of the search path. Loads
+    /// no library. Before `initialize` there are no records.
+    ///
+    /// \return the action that ended the enumeration
+    /// \throws whatever `e` throws
     virtual QrEnum::Action enumerateBuilders(QrEnumerator<QrCPtr<QrBuilderDescription>>& e) = 0;
 
-    /// Looks through the directories of `searchPath` (separated by ';') for component libraries and
-    /// records the builders that each describes. Null, or nothing but ';', means the directory of
-    /// the executable. Works once; every later call, also one from within, does nothing.
+    /// Searches directories for component libraries and registers the builders that they describe.
     ///
-    /// Every regular file of a directory that is neither hidden nor a system file is looked at,
-    /// whatever its extension; sub-directories are not. A file that is no component library, that
-    /// cannot be loaded or that fails while it describes itself is passed over without a word. A
-    /// library without the entry point is never mapped, only read; so are programs and damaged
-    /// files. A file that cannot be opened for want of resources is passed over and not recorded,
-    /// so that the next start looks at it again.
+    /// Works once. Calls after a successful one, and calls from code that runs during one, are
+    /// no-ops.
     ///
-    /// The files of a directory come in the order in which NTFS lists them, on every system. Of two
-    /// builders with one identifier the one that comes later is found.
+    /// **Candidates.** All regular files of a directory that are neither hidden nor system files,
+    /// whatever their extension. Sub-directories are not searched. A file is skipped silently if it
+    /// is not a component library, if it cannot be loaded, or if it fails to describe itself.
+    /// Programs, damaged files and libraries without the entry point are only read, never mapped.
+    /// If the system lacks the resources to open a file, the file is skipped and not recorded, so
+    /// that the next start tries it again.
     ///
-    /// A search path is normalised before use: lower case, '\' between names, and runs of
-    /// separators as one. "." and ".." are *not* resolved (`a/b/../c` becomes `a\b\c`), so give
-    /// full paths without them: on Windows the normalised path is what is opened.
+    /// **Order.** The files of a directory are in the order in which NTFS lists them, on every
+    /// system. If several libraries describe a builder with the same uid, the last one is
+    /// registered. One library must not describe two builders with the same uid: the last one is
+    /// registered if the library is loaded, the first one if its record is restored.
+    ///
+    /// **Normalisation.** The search path is normalised before use: lower case, '\' between names,
+    /// one separator for each run of separators. "." and ".." are *not* resolved (`a/b/../c`
+    /// becomes `a\b\c`), and on Windows the normalised path is opened. Therefore pass full paths
+    /// without them; `fullPath` (`files.h`) returns such a path.
+    ///
+    /// \param searchPath  the directories, separated by ';'. Null, or nothing but ';', means the
+    ///     directory of the executable as the command line names it. If the program was started by
+    ///     its bare name, that is the current directory; `programFolder` (`files.h`) always returns
+    ///     the executable's own.
+    /// \throws std::bad_alloc if memory runs out. Another call then starts again.
     virtual void initialize(const wchar_t* searchPath) = 0;
 
-    /// A new object made by the builder registered for `uid`, or null where there is no builder or
-    /// it makes none.
+    /// Returns a new object, made by the builder that is registered for `uid`. Loads its library,
+    /// if necessary.
+    ///
+    /// The caller owns the reference. Release it before the manager is destroyed.
+    ///
+    /// \return the object; null if `getBuilder` returns null or the builder makes no object
+    /// \throws whatever the library's own code throws
     virtual QrRef<QrCastable> createObject(const QrUid& uid) = 0;
 };
 
@@ -161,38 +225,50 @@ class MZ_COMPONENT_MANAGER_API QrComponentManager : public QrCastable {
 
 extern "C" {
 
-/// The manager of this process. Never null, takes no reference, may be called at any time.
+/// Returns the component manager of this process.
+///
+/// Never returns null, and takes no reference for the caller. May be called at any time, from any
+/// thread.
 MZ_COMPONENT_MANAGER_API Mz::QrComponentManager* QrGetComponentManager();
 
-/// The name under which a component library exports its entry point, a plain function without
-/// arguments:
+/// The type of the entry point: the function that each component library exports under the name
+/// `QrGetComponentDescription`.
 ///
 ///     extern "C" MZ_EXPORT Mz::QrCastable* QrGetComponentDescription();
 ///
-/// **What it returns.** An object that answers for `QrComponentDescription`. The manager takes a
-/// reference of its own on it and gives that back when it is done, so the function may return a
-/// static object that does not count, or a new counted object without any reference. Null, an
-/// object without that interface or an exception make the manager drop the library.
+/// **Result.** The entry point returns an object that casts to `QrComponentDescription`. The
+/// manager takes its own reference and releases it after use. The function may therefore return a
+/// static object without a reference count, or a new counted object whose count is zero.
 ///
-/// **When it is called.** By the host's process, on the thread that initialises the manager or asks
-/// for a builder: once when the library is recorded, and again for each request for one of its
-/// builders. It must therefore be quick, and must always describe the same builders. A library
-/// whose file has not changed since it was recorded is not called until a builder is wanted.
+/// **Failure.** If the result is null or does not cast, or if the function throws, the library is
+/// unloaded and has no builders. After an exception the next start tries it again, otherwise not
+/// until the file changes. If it fails only when a client asks for a builder, the library stays
+/// loaded, and the client gets null or the exception.
 ///
-/// **What runs before it.** The initialisers of the library and of those that it needs, and nothing
-/// else. Before that, the file has only been read: a library that does not export this very name
-/// itself (not merely through one it depends on) is never loaded at all. Initialisers must neither
-/// throw nor end their thread. On Linux both call `std::terminate`, whatever the host catches: an
-/// exception that passed the loader would leave it locked. The same holds while the library is
-/// unloaded.
+/// **Calls.** The manager calls the entry point in the host's process, on the thread that
+/// initialises the manager or asks for a builder: once to record the library, and again for each
+/// request for one of its builders. The function must be quick and must always describe the same
+/// builders. For a library whose file has not changed since it was recorded, the first call is at
+/// the first request for a builder.
 ///
-/// **How long the library stays.** One that describes no builders because it failed is unloaded at
-/// once. Otherwise it stays loaded until the manager is destroyed, so builders and objects may use
-/// its code and its statics throughout.
+/// **Code that runs before.** Only the initialisers of the library and of its dependencies. Before
+/// they run, the manager has checked the file without running any of its code. A library is never
+/// loaded unless it exports this very name itself; an export of one of its dependencies does not
+/// count.
 ///
-/// **What it must not do.** Call `initialize`, keep the enumerator it is given, or rely on another
-/// component library being there already: libraries are recorded in the order of their names, and
-/// another process may record yours alone.
+/// **Initialisers and finalisers.** They must neither throw nor end their thread. On Linux
+/// either one calls `std::terminate`, whatever the host catches, because an exception that passes
+/// the loader leaves the loader locked.
+///
+/// **Lifetime of the library.** A library that fails to describe itself is unloaded at once. Any
+/// other library stays loaded until the manager is destroyed. Its builders and objects may use its
+/// code and its static objects until then. The manager never unloads a library that the process had
+/// mapped before.
+///
+/// **Forbidden.** The entry point and the description must not call `initialize`, must not use the
+/// enumerator after `enumerateBuilders` has returned, and must not rely on another component
+/// library being loaded. Libraries are recorded in the order of their names, and another process
+/// may record a library alone.
 using QrGetComponentDescriptionFunction = Mz::QrCastable*();
 }
 

@@ -1,6 +1,8 @@
-// A file is replaced through a new file beside it, which is renamed at the end: that is the one
-// step that all systems make whole. The new file is on the medium before the rename, or a crash
-// could leave the new name with the content missing.
+/// Replaces files safely, and makes paths full.
+///
+/// The new content goes into a new file in the same folder, which is renamed at the end: renaming
+/// is the one step that is atomic on all systems. The new file is on the medium before the rename.
+/// Otherwise a crash could leave the new name without the content.
 #include "components/componentManager/files.h"
 
 #include "components/componentManager/exceptions.h"
@@ -27,33 +29,34 @@ constexpr const char* source = "components/componentManager/files";
     throw QrStreamEx::ExWriteError(source, line, utf8Name(file).c_str());
 }
 
-/// Where the symlinks lead that begin at `file`, whether there is anything or not; `file` itself if
-/// it is no symlink.
+/// Returns the file to which the chain of symlinks at `file` leads, which need not exist. Returns
+/// `file` itself if it is not a symlink.
 std::filesystem::path targetOf(const std::filesystem::path& file) {
-    constexpr int mostLinks = 40; // As many as Linux follows.
+    constexpr int maximumLinks = 40; // The limit of Linux.
     std::filesystem::path target = file;
-    for (int count = 0; count < mostLinks; ++count) {
-        const auto text = platform::linkText(target);
+    for (int count = 0; count < maximumLinks; ++count) {
+        const auto text = platform::symlinkTarget(target);
         if (!text)
             return target;
-        target = target.parent_path() / *text; // An absolute text replaces the folder.
+        target = target.parent_path() / *text; // An absolute target replaces the folder.
     }
-    failToOpen(__LINE__, file, "its symlinks lead in a circle");
+    failToOpen(__LINE__, file, "its symlinks form a loop");
 }
 
-/// A new file beside the target of `file`, removed at the end unless it took the target's place.
+/// A new file in the folder of the target of `file`. The destructor removes it, unless it has
+/// replaced the target.
 class NewFile {
   public:
     explicit NewFile(const std::filesystem::path& file) : file(file), target(targetOf(file)) {
         std::error_code failure;
         old = std::filesystem::status(target, failure);
         if (std::filesystem::exists(old) && !std::filesystem::is_regular_file(old))
-            failToOpen(__LINE__, file, "it is no regular file");
-        // We write and read the file, whatever its permissions are to be in the end.
-        constexpr auto own =
+            failToOpen(__LINE__, file, "it is not a regular file");
+        // This process must write and read the file, whatever its final permissions are.
+        constexpr auto ownerAccess =
             std::filesystem::perms::owner_read | std::filesystem::perms::owner_write;
         const auto permissions =
-            replaces() ? old.permissions() | own : std::filesystem::perms(0666);
+            replaces() ? old.permissions() | ownerAccess : std::filesystem::perms(0666);
         std::random_device random;
         do {
             path = target;
@@ -81,9 +84,9 @@ class NewFile {
             failToWrite(__LINE__, file);
     }
 
-    void takePlace() {
+    void replaceTarget() {
         const auto permissions = replaces() ? std::optional(old.permissions()) : std::nullopt;
-        if (platform::complete(path, permissions))
+        if (platform::syncFile(path, permissions))
             failToWrite(__LINE__, file);
         if (const std::error_code failure = platform::moveOver(path, target))
             failToOpen(__LINE__, file, toUtf8(platform::errorText(failure)));
@@ -105,7 +108,7 @@ void replaceFile(const std::filesystem::path& file,
                  const std::function<void(std::ostream&)>& write) {
     NewFile replacement(file);
     replacement.fill(write);
-    replacement.takePlace();
+    replacement.replaceTarget();
 }
 
 void replaceFile(const std::filesystem::path& file, std::string_view content) {

@@ -1,4 +1,4 @@
-/// What hosts and tools do with files: replacing one safely, and naming folders fully.
+/// File operations for hosts and tools: safe replacement of a file, and full paths.
 ///
 /// All functions may be called from any thread.
 #pragma once
@@ -12,28 +12,30 @@
 
 namespace Mz {
 
-/// Replaces the content of `file` by what `write` puts into the stream, whole or not at all.
+/// Replaces the content of `file` by what `write` writes to the stream, completely or not at all.
 ///
-/// `write` fills a new file in the same folder (`NAME.saving-` and a number). When that file has
-/// reached the medium, it takes the place of `file` in one step: other programs see the old content
-/// or the new one, and after a failure, a full disk or a crash the old file is as it was. Only a
-/// crash leaves the new file behind. When the function returns, the new content is on the medium;
-/// on Linux, so is its name in the folder.
+/// `write` fills a new file in the same folder (`NAME.saving-` and a number). After that file has
+/// reached the medium, it replaces `file` in one atomic step. Other programs see the old content or
+/// the new one. After a failure, a full disk or a crash, the old file is unchanged. Only a crash
+/// leaves the new file in the folder. When the function returns, the new content is on the medium;
+/// on Linux the file's name is on the medium, too.
 ///
 /// - A file that does not exist is created.
-/// - A symlink stays one: the file to which it leads is replaced, or created if it is not there.
-/// - The permissions of an old file are kept. Other attributes and hard links are not.
-/// - If several threads or programs replace one file at once, each replaces it whole and the last
-///   one wins.
+/// - A symlink stays a symlink: its target is replaced, or created if it does not exist.
+/// - The permissions of the old file are kept. Other attributes and hard links are not.
+/// - If several threads or programs replace one file concurrently, each replaces it completely and
+///   the last one wins.
 /// - Windows cannot replace a file while another program has it open. The function then retries for
 ///   half a second.
 ///
-/// The stream is binary and belongs to the call.
-///
-/// \throws QrStreamEx::ExWriteOpen with the file's name and the system's reason, if `file` is a
-///     folder or no regular file, if its folder takes no new file, or if `file` cannot be replaced
+/// \param file  the file to replace
+/// \param write  writes the new content to its argument, a binary stream that is valid during the
+///     call only
+/// \throws QrStreamEx::ExWriteOpen with the file's name and the system's reason, if `file`
+///     exists and is not a regular file, if no new file can be created in its folder, or if `file`
+///     cannot be replaced
 /// \throws QrStreamEx::ExWriteError with the file's name, if the stream has failed when `write`
-///     returns, or if not everything reached the medium
+///     returns, or if the content cannot be written to the medium
 /// \throws whatever `write` throws
 MZ_COMPONENT_MANAGER_API void replaceFile(const std::filesystem::path& file,
                                           const std::function<void(std::ostream&)>& write);
@@ -42,21 +44,24 @@ MZ_COMPONENT_MANAGER_API void replaceFile(const std::filesystem::path& file,
 MZ_COMPONENT_MANAGER_API void replaceFile(const std::filesystem::path& file,
                                           std::string_view content);
 
-/// Returns the folder of the running program's file, as a full path without symlinks.
+/// Returns the folder of the running program's file, as a full path. On Linux the path contains no
+/// symlinks.
 ///
-/// The system is asked for it. The first argument of `main` is no substitute: a program that is
-/// started by its bare name gets no folder there, and others may put anything into it.
+/// The path comes from the system. The first argument of `main` is no substitute: it contains no
+/// folder if the program was started by its bare name, and the parent process may set it to
+/// anything.
 ///
 /// \throws std::system_error if the system does not know it (on Linux, if /proc is not mounted)
 MZ_COMPONENT_MANAGER_API std::filesystem::path programFolder();
 
 /// Returns `path` as a full path without `.` and `..`, without a separator at its end, and with the
-/// system's own separators: the form in which hosts name folders to the component manager.
+/// system's preferred separators. Hosts pass folders to the component manager in this form.
 ///
-/// The path leads to where the system goes. On Linux a symlink is followed before a `..` behind it
-/// goes up; other symlinks stay, and the path need not exist.
+/// The result names the same file as `path`. On Linux a symlink before a `..` is therefore resolved
+/// first. Other symlinks stay. The path need not exist.
 ///
-/// \throws std::filesystem::filesystem_error if `path` is relative and the current folder is gone
+/// \throws std::filesystem::filesystem_error if `path` is relative and the current folder does
+///     not exist any more
 MZ_COMPONENT_MANAGER_API std::filesystem::path fullPath(const std::filesystem::path& path);
 
 } // namespace Mz

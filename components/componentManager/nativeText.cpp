@@ -1,5 +1,8 @@
-// Names are bytes on one system and wide on the other. Both forms are handled by overloads, and the
-// type of `std::filesystem::path::native()` chooses one, so that nothing here asks for the system.
+/// Converts between wide text, bytes and file names.
+///
+/// File names are bytes on one system and wide text on the other. Overloads handle both forms, and
+/// the type of `std::filesystem::path::native()` selects one, so that no condition here depends on
+/// the system. Characters are converted by `platform::CharacterConverter`.
 #include "components/componentManager/nativeText.h"
 
 #include "components/componentManager/utf8.h"
@@ -14,15 +17,15 @@ namespace {
 
 constexpr bool namesAreBytes = std::is_same_v<std::filesystem::path::value_type, char>;
 
-[[maybe_unused]] std::optional<std::wstring> wideOf(std::string_view name) {
+[[maybe_unused]] std::optional<std::wstring> widen(std::string_view name) {
     return platform::toCharacters(name);
 }
 
-[[maybe_unused]] std::optional<std::wstring> wideOf(std::wstring_view name) {
+[[maybe_unused]] std::optional<std::wstring> widen(std::wstring_view name) {
     return std::wstring(name);
 }
 
-std::wstring displayed(std::string_view name) {
+std::wstring forDisplay(std::string_view name) {
     const platform::CharacterConverter converter;
     std::wstring result;
     while (!name.empty()) {
@@ -42,7 +45,7 @@ std::wstring displayed(std::string_view name) {
     return result;
 }
 
-[[maybe_unused]] std::wstring displayed(std::wstring_view name) {
+[[maybe_unused]] std::wstring forDisplay(std::wstring_view name) {
     return std::wstring(name);
 }
 
@@ -50,11 +53,11 @@ bool namesArePlainBytes() {
     return namesAreBytes && platform::CharacterConverter().plainBytes();
 }
 
-[[maybe_unused]] std::string utf8Of(std::string_view name) {
-    return namesArePlainBytes() ? escapeInvalidUtf8(name) : toUtf8(displayed(name));
+[[maybe_unused]] std::string nameInUtf8(std::string_view name) {
+    return namesArePlainBytes() ? escapeInvalidUtf8(name) : toUtf8(forDisplay(name));
 }
 
-[[maybe_unused]] std::string utf8Of(std::wstring_view name) {
+[[maybe_unused]] std::string nameInUtf8(std::wstring_view name) {
     return toUtf8(name);
 }
 
@@ -83,7 +86,7 @@ std::string toNarrow(std::wstring_view text, char substitute) {
 }
 
 std::optional<std::wstring> toWideName(const std::filesystem::path& path) {
-    return wideOf(path.native());
+    return widen(path.native());
 }
 
 std::optional<std::filesystem::path> toNativePath(std::wstring_view name) {
@@ -94,15 +97,15 @@ std::optional<std::filesystem::path> toNativePath(std::wstring_view name) {
 }
 
 std::wstring displayName(const std::filesystem::path& path) {
-    return displayed(path.native());
+    return forDisplay(path.native());
 }
 
 std::string utf8Name(const std::filesystem::path& path) {
-    return utf8Of(path.native());
+    return nameInUtf8(path.native());
 }
 
 std::wstring displayText(std::string_view utf8) {
-    return namesArePlainBytes() ? displayed(utf8) : fromUtf8(utf8);
+    return namesArePlainBytes() ? forDisplay(utf8) : fromUtf8(utf8);
 }
 
 } // namespace Mz

@@ -1,5 +1,8 @@
-// One decoder takes characters from bytes, and one encoder appends them, for both widths of
-// wchar_t.
+/// Converts UTF-8.
+///
+/// One decoder takes code points from bytes, and one encoder for each kind of text appends them.
+/// Both work for 16-bit and 32-bit `wchar_t`. The decoder skips only one byte of an invalid
+/// sequence, so that a valid sequence after it is not lost.
 #include "components/componentManager/utf8.h"
 
 #include <cstdint>
@@ -8,7 +11,7 @@ namespace Mz {
 
 namespace {
 
-constexpr bool pairs = sizeof(wchar_t) == 2;
+constexpr bool usesSurrogates = sizeof(wchar_t) == 2;
 
 bool isHigh(std::uint32_t unit) {
     return unit >= 0xD800 && unit < 0xDC00;
@@ -41,7 +44,7 @@ void append(std::string& result, std::uint32_t code) {
 }
 
 void append(std::wstring& result, std::uint32_t code) {
-    if (pairs && code > 0xFFFF) {
+    if (usesSurrogates && code > 0xFFFF) {
         result += static_cast<wchar_t>(0xD800 + ((code - 0x10000) >> 10));
         result += static_cast<wchar_t>(0xDC00 + ((code - 0x10000) & 0x3FF));
     } else {
@@ -49,10 +52,11 @@ void append(std::wstring& result, std::uint32_t code) {
     }
 }
 
-/// What `take` returns for a byte that begins no valid sequence.
+/// The result of `take` for a byte that begins no valid sequence.
 constexpr std::uint32_t invalid = 0xFFFFFFFF;
 
-/// Takes the first character from `bytes`, or one byte that begins none.
+/// Removes the first character from `bytes` and returns its code point. If the first byte begins no
+/// valid sequence, removes that byte and returns `invalid`.
 std::uint32_t take(std::string_view& bytes) {
     const auto byteAt = [&](std::size_t index) {
         return static_cast<std::uint32_t>(static_cast<unsigned char>(bytes[index]));
@@ -71,10 +75,10 @@ std::uint32_t take(std::string_view& bytes) {
         }
         code = code << 6 | (byteAt(index) & 0x3F);
     }
-    // A longer sequence than the character needs is no valid one.
-    constexpr std::uint32_t least[] = {0, 0, 0x80, 0x800, 0x10000};
+    // A sequence that is longer than necessary is invalid.
+    constexpr std::uint32_t minimum[] = {0, 0, 0x80, 0x800, 0x10000};
     const bool valid =
-        length > 0 && code >= least[length] && code <= 0x10FFFF && !isHigh(code) && !isLow(code);
+        length > 0 && code >= minimum[length] && code <= 0x10FFFF && !isHigh(code) && !isLow(code);
     bytes.remove_prefix(valid ? length : 1);
     return valid ? code : invalid;
 }

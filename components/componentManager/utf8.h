@@ -1,4 +1,6 @@
-/// UTF-8, for text that must be the same in every locale.
+/// Conversions from and to UTF-8, independent of the locale.
+///
+/// All functions may be called from any thread and throw `std::bad_alloc` only.
 #pragma once
 
 #include "components/componentManager/export.h"
@@ -8,22 +10,16 @@
 
 namespace Mz {
 
-/// Returns `text` in UTF-8. Surrogate pairs are joined on every platform; what is no character
-/// becomes U+FFFD.
-///
-/// Depends on no locale. May be called from any thread. Throws nothing but `std::bad_alloc`.
+/// Returns `text` in UTF-8. Surrogate pairs are joined on every platform. An element that is not a
+/// character, such as an unpaired surrogate, becomes U+FFFD.
 MZ_COMPONENT_MANAGER_API std::string toUtf8(std::wstring_view text);
 
-/// Returns UTF-8 as wide text, with surrogate pairs where `wchar_t` has 16 bits. Each byte that
-/// begins no valid sequence becomes U+FFFD.
-///
-/// Depends on no locale. May be called from any thread. Throws nothing but `std::bad_alloc`.
+/// Returns the UTF-8 text `bytes` as wide text, with surrogate pairs where `wchar_t` has 16 bits.
+/// Each byte that begins no valid sequence becomes U+FFFD.
 MZ_COMPONENT_MANAGER_API std::wstring fromUtf8(std::string_view bytes);
 
-/// Returns `bytes` as they are, but for each byte that begins no valid UTF-8 sequence: that is
-/// replaced by the four characters `\xNN`, its value in hexadecimal.
-///
-/// Depends on no locale. May be called from any thread. Throws nothing but `std::bad_alloc`.
+/// Returns `bytes` with each byte that begins no valid UTF-8 sequence replaced by the four
+/// characters `\xNN`, its value in hexadecimal.
 MZ_COMPONENT_MANAGER_API std::string escapeInvalidUtf8(std::string_view bytes);
 
 } // namespace Mz

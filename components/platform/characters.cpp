@@ -1,3 +1,7 @@
+/// Converts characters one by one, each from the initial shift state.
+///
+/// The "C" locale is handled here, because the C libraries disagree about bytes above 127. The
+/// restartable functions of the C library convert in all other locales.
 #include "components/platform/characters.h"
 
 #include "components/platform/platform.h"

@@ -1,7 +1,7 @@
-/// Multibyte characters in the current C locale, the same on every system.
+/// Conversion of multibyte characters in the current C locale, the same on every system.
 ///
-/// While LC_CTYPE is "C" or "POSIX", byte and character code are the same from 0 to 255. The C
-/// libraries do not agree on that, so it is not left to them; every other locale is.
+/// While LC_CTYPE is "C" or "POSIX", a byte and its character have the same value, from 0 to 255.
+/// The C libraries differ in that, so they are not used for it. They convert in all other locales.
 #pragma once
 
 #include <cstddef>
@@ -11,36 +11,44 @@
 
 namespace Mz::platform {
 
-/// No character has more bytes than this.
+/// The maximum number of bytes of one character.
 inline constexpr std::size_t maximumCharacterBytes = 16;
 
-/// Converts characters by the locale that the calling thread had when the converter was made.
+/// Converts characters in the locale that the calling thread had when the converter was created.
+/// That locale must not change while the converter is used.
 class CharacterConverter {
   public:
     CharacterConverter();
 
-    /// Converts as in the "C" locale if `plainBytes`, else by the thread's locale, which then must
-    /// be another one.
+    /// Converts as in the "C" locale if `plainBytes`, else in the locale of the calling thread,
+    /// which then must not be "C" or "POSIX".
     explicit CharacterConverter(bool plainBytes) : plain(plainBytes) {}
 
-    /// Reads the character at the beginning of `bytes` into `character` and returns how many bytes
-    /// it takes: 0 for a NUL, -1 when the sequence is rejected, incomplete or empty.
+    /// Decodes the first character of `bytes`.
+    ///
+    /// \param character  receives the character
+    /// \return the number of bytes of the character; 0 for a NUL; -1 if the sequence is invalid,
+    ///     incomplete or empty
     int decode(std::string_view bytes, wchar_t& character) const;
 
-    /// Writes the bytes of `character` and returns how many, -1 when it has none in this locale.
+    /// Encodes `character`.
+    ///
+    /// \param bytes  receives the bytes of the character, without a terminator
+    /// \return the number of bytes; -1 if the locale cannot represent the character
     int encode(wchar_t character, char (&bytes)[maximumCharacterBytes]) const;
 
-    /// Whether byte and character are one.
+    /// Returns whether each byte is the character of the same value.
     bool plainBytes() const { return plain; }
 
   private:
     bool plain;
 };
 
-/// The whole of `text` in bytes; nothing when one character has no form.
+/// Returns `text` as bytes; `std::nullopt` if the locale cannot represent one of the characters.
 std::optional<std::string> toBytes(std::wstring_view text);
 
-/// The whole of `bytes` as characters, a NUL counting as one; nothing when they are no text.
+/// Returns `bytes` as characters; `std::nullopt` if they are invalid in the locale's encoding. A
+/// NUL is a character.
 std::optional<std::wstring> toCharacters(std::string_view bytes);
 
 } // namespace Mz::platform

@@ -1,5 +1,7 @@
-// The block that was used last stays; the other one is filled anew. Two blocks suffice because the
-// readers go back and forth between two tables at a time.
+/// Caches two blocks of a file.
+///
+/// A read that neither block contains refills the block that was not used last. Two blocks suffice,
+/// because the readers alternate between two tables at a time.
 #include "components/platform/fileBlocks.h"
 
 #include <algorithm>
@@ -14,7 +16,7 @@ bool FileBlocks::read(std::uint64_t offset, void* data, std::size_t size) {
             return false;
         block = &blocks[older];
         block->offset = offset;
-        // No further than the end, or the source would have to ask once more to find it.
+        // Not past the end: the source would need another system call to detect the end.
         const std::uint64_t rest = std::min<std::uint64_t>(fileSize - offset, blockSize);
         block->size = file.read(offset, block->bytes.data(), static_cast<std::size_t>(rest));
         if (!block->contains(offset, size))

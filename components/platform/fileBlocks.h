@@ -1,5 +1,4 @@
 /// Small reads from a file that may be damaged or hostile, for the readers of library formats.
-///
 /// Private to the platform layer.
 #pragma once
 
@@ -17,25 +16,25 @@ class ByteSource {
     /// Returns the size of the file.
     virtual std::uint64_t size() const = 0;
 
-    /// Reads up to `length` bytes at `offset` into `data` and returns how many were read: fewer
-    /// only at the end of the file and after an error.
+    /// Reads up to `length` bytes at `offset` into `data`. Returns the number of bytes read, which
+    /// is smaller than `length` only at the end of the file and after an error.
     virtual std::size_t read(std::uint64_t offset, void* data, std::size_t length) = 0;
 
   protected:
     ~ByteSource() = default;
 };
 
-/// Reads pieces of a file through two cached blocks. A library keeps the tables that are read
-/// together close to each other, so most pieces cost no system call.
+/// Reads pieces of a file through two cached blocks. The tables of a library that are read together
+/// are close to each other in the file, so most pieces cost no system call.
 class FileBlocks {
   public:
-    /// The longest piece that can be read.
+    /// The maximum size of a piece.
     static constexpr std::size_t blockSize = 4096;
 
-    /// `file` must outlive this object.
+    /// Creates a reader of `file`, which must outlive it.
     explicit FileBlocks(ByteSource& file) : file(file), fileSize(file.size()) {}
 
-    /// Returns the `T` at `offset`, or nothing if the file ends before it is complete.
+    /// Returns the `T` at `offset`, or `std::nullopt` if the file ends before.
     template <class T>
     std::optional<T> read(std::uint64_t offset) {
         static_assert(std::is_trivially_copyable_v<T> && sizeof(T) <= blockSize);
@@ -59,9 +58,9 @@ class FileBlocks {
         std::size_t size = 0;
         std::array<char, blockSize> bytes;
 
-        bool contains(std::uint64_t wanted, std::size_t length) const {
-            return wanted >= offset && wanted - offset <= size &&
-                   length <= size - (wanted - offset);
+        bool contains(std::uint64_t position, std::size_t length) const {
+            return position >= offset && position - offset <= size &&
+                   length <= size - (position - offset);
         }
     };
 

@@ -1,8 +1,8 @@
-/// What it takes of the system to replace a file safely and to name files fully: one description,
-/// and one implementation for each system, as with `platform.h`.
+/// The system functions for replacing a file safely and for full paths. Each system has its own
+/// implementation, as with `platform.h`.
 ///
-/// All functions may be called from any thread and throw nothing but `std::bad_alloc`, where
-/// nothing else is said.
+/// All functions may be called from any thread. They throw `std::bad_alloc` only, unless their
+/// comment says otherwise. A function that returns an error code returns an empty one for success.
 #pragma once
 
 #include <filesystem>
@@ -12,32 +12,34 @@
 
 namespace Mz::platform {
 
-/// Creates an empty file with these permissions, as far as the system knows them and the process
-/// may give them; `std::errc::file_exists` if there is a file of that name.
+/// Creates an empty file with `permissions`, as far as the system supports them and the process may
+/// set them.
+///
+/// \return `std::errc::file_exists` if a file of that name exists
 std::error_code createNew(const std::filesystem::path& file, std::filesystem::perms permissions);
 
-/// Gives the file these permissions, unless there are none or the process may not, and waits until
+/// Sets the permissions of the file, if there are any and the process may set them, and waits until
 /// the file is on the medium.
-std::error_code complete(const std::filesystem::path& file,
+std::error_code syncFile(const std::filesystem::path& file,
                          std::optional<std::filesystem::perms> permissions);
 
-/// Gives the file `from` the name `to`, in one step and in place of a file of that name, and waits
-/// until the name is on the medium, where the system can. A file that others have open may make
-/// this wait for half a second.
+/// Renames the file `from` to `to` in one atomic step, and replaces a file of that name. Then waits
+/// until the name is on the medium, where the system supports that. If other programs have the old
+/// file open, the function may retry for half a second.
 std::error_code moveOver(const std::filesystem::path& from, const std::filesystem::path& to);
 
-/// The text of a symlink; nothing if `path` is none.
-std::optional<std::filesystem::path> linkText(const std::filesystem::path& path);
+/// Returns the target of a symlink, as it is stored; `std::nullopt` if `path` is not a symlink.
+std::optional<std::filesystem::path> symlinkTarget(const std::filesystem::path& path);
 
-/// The system's words for an error.
+/// Returns the system's message for an error.
 std::wstring errorText(const std::error_code& error);
 
-/// The file of the running program.
+/// Returns the file of the running program.
 ///
 /// \throws std::system_error if the system does not know it
 std::filesystem::path programFile();
 
-/// `path`, which is absolute, without `.` and `..`, leading to where the system goes.
+/// Returns `path`, which must be absolute, without `.` and `..`. The result names the same file.
 std::filesystem::path resolveDots(const std::filesystem::path& path);
 
 } // namespace Mz::platform

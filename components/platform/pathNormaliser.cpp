@@ -1,3 +1,8 @@
+/// Normalises a path in one pass from left to right.
+///
+/// The input is a view from which roots, names and separators are removed at the front, and the
+/// output grows at the end. No name is ever removed from the output again: ".." removes only the
+/// separator before it. The rules are odd, but recorded lists depend on them.
 #include "components/platform/pathNormaliser.h"
 
 #include "components/platform/platform.h"
@@ -17,7 +22,7 @@ bool isLetter(wchar_t c) {
     return (c >= L'a' && c <= L'z') || (c >= L'A' && c <= L'Z');
 }
 
-/// Takes the run of characters for which `belongs` holds from the front of `rest`.
+/// Removes the leading characters for which `belongs` is true from `rest`, and returns them.
 template <class Predicate>
 std::wstring_view takeWhile(std::wstring_view& rest, Predicate belongs) {
     const auto end = std::find_if_not(rest.begin(), rest.end(), belongs);
@@ -34,14 +39,14 @@ std::wstring_view takeSeparators(std::wstring_view& rest) {
     return takeWhile(rest, isSeparator);
 }
 
-/// Moves the root of `rest`, which may be empty, to `result`.
+/// Moves the root of `rest`, if there is one, to `result`.
 void copyRoot(std::wstring_view& rest, std::wstring& result) {
     if (rest.starts_with(L"\\\\")) {
         result += rest.substr(0, 2);
         rest.remove_prefix(2);
-        result += takeName(rest); // The server,
+        result += takeName(rest); // The server
         result += takeSeparators(rest);
-        result += takeName(rest); // and the share.
+        result += takeName(rest); // The share
     } else if (rest.size() > 1 && isLetter(rest[0]) && rest[1] == L':') {
         result += rest.substr(0, 2);
         rest.remove_prefix(2);
@@ -50,14 +55,14 @@ void copyRoot(std::wstring_view& rest, std::wstring& result) {
         result += L'\\';
 }
 
-/// Appends the normal form of one name to `result`.
+/// Appends the normal form of one path to `result`.
 void appendEntry(std::wstring_view rest, std::wstring& result) {
     copyRoot(rest, result);
     const std::size_t rootEnd = result.size();
     while (!rest.empty()) {
         const std::wstring_view name = takeName(rest);
         if (name == L".." && result.size() > rootEnd)
-            result.pop_back(); // The separator before it; the one behind it follows below.
+            result.pop_back(); // The separator before it. The one after it follows below.
         else if (name != L".")
             result += name;
         if (!takeSeparators(rest).empty() && !rest.empty())

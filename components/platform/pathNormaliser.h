@@ -1,21 +1,27 @@
-/// The one form of directory and file names.
+/// The normal form of directory and file names.
 #pragma once
 
 #include <string>
 
 namespace Mz {
 
-/// `path` in the form in which names are stored and compared; the same text always gives the same
-/// result, and no file is looked at.
+/// Returns `path` in the form in which names are stored and compared. The result depends on the
+/// text alone; no file is accessed.
 ///
-/// Lower case; one '\' for each run of separators between names and none at the end. A root stays
-/// as it is: `\\server\share`, a drive letter, a leading separator. "." leaves the separators on
-/// both sides of it (`a/./b` gives `a\\b`), ".." behind something else leaves one of them
-/// (`a/b/../c` gives `a\b\c`), and neither is resolved: these forms are in the recorded lists of
-/// users and must never change. What would be empty is ".", but null gives an empty string.
+/// - All letters are in lower case.
+/// - Each run of separators between names becomes one '\'. Separators at the end are removed.
+/// - A root is kept: `\\server\share`, a drive letter, a leading separator.
+/// - "." is removed, but the separators on both sides of it stay (`a/./b` becomes `a\\b`).
+/// - ".." is removed with one of the separators beside it (`a/b/../c` becomes `a\b\c`); the name
+///   before it stays. Directly after the root, or at the beginning, ".." is kept.
+/// - An empty result becomes ".".
 ///
-/// In list mode `path` is a list of names separated by ';', each of which is treated so; runs of
-/// ';' become one, those at the ends vanish.
+/// The recorded lists of users contain these forms. They must never change.
+///
+/// \param path  the path; for null the result is an empty string
+/// \param listMode  whether `path` is a list, separated by ';'. Then each element is normalised,
+/// runs
+///     of ';' become one, and those at the ends are removed.
 std::wstring normalisePath(const wchar_t* path, bool listMode);
 
 } // namespace Mz

@@ -1,8 +1,7 @@
-/// What the library needs of the operating system: one description, and one implementation for each
-/// system (`windows/`, `posix/`), chosen by the build. No other file knows which system it is on.
+/// What the library needs from the operating system. Each system has its own implementation
+/// (`windows/`, `posix/`), which the build selects. No other file depends on the system.
 ///
-/// Every function may be called from any thread; those that touch one library at a time say so. No
-/// function throws anything but `std::bad_alloc`.
+/// All functions may be called from any thread and throw `std::bad_alloc` only.
 #pragma once
 
 #include <cstdint>
@@ -18,70 +17,77 @@ namespace Mz::platform {
 
 // ---- Names ----------------------------------------------------------------------------------
 
-/// A name as the system wants it, in bytes or wide characters.
+/// A file name as the system spells it: bytes on Linux, wide text on Windows.
 using NativePath = std::filesystem::path::string_type;
 
-/// `name` as the system wants it; nothing when the current locale has no form for it. On Linux
-/// characters become bytes as buffered IO writes them.
+/// Returns `name` as the system spells it; `std::nullopt` if the current locale cannot represent
+/// it. On Linux the characters are converted as buffered IO converts text.
 std::optional<NativePath> toNative(std::wstring_view name);
 
-/// The name by which to open what was found as `found` and is stored as `directory`, and `name` in
-/// it unless that is empty: the stored names where letter case and the kind of separator make no
-/// difference, else the found one.
+/// Returns the path by which to open a directory, or a file in it.
+///
+/// Where letter case and the kind of separator do not matter (Windows), that is the normalised
+/// path; elsewhere it is the path as it was found.
+///
+/// \param directory  the normalised directory
+/// \param name  the normalised name of the file; empty for the directory itself
+/// \param found  the path as it was found
 NativePath openingPath(const std::wstring& directory, const std::wstring& name,
                        const NativePath& found);
 
-/// `text` in lower case, as file names are compared: by the C runtime's rules on Windows, ASCII
-/// letters only on Linux.
+/// Returns `text` in lower case, for the comparison of file names: by the rules of the C runtime on
+/// Windows, for ASCII letters only on Linux.
 std::wstring lowerCase(std::wstring text);
 
-/// Returns whether names that differ in letter case only stand for one file.
+/// Returns whether names that differ only in letter case refer to the same file.
 bool namesIgnoreCase();
 
-/// The first element of the process's command line, by which the program was started; nothing when
-/// the system does not tell, or the current locale has no form for it.
+/// Returns the first element of the process's command line, usually the name by which the program
+/// was started; `std::nullopt` if it is not available or has no wide form in the current locale.
 std::optional<std::wstring> firstArgument();
 
 // ---- Files ----------------------------------------------------------------------------------
 
-/// Which file a name stands for, whatever the name. Some file systems give two files the same
-/// identity, so ask `isSameFile` before you believe it.
+/// The identity of a file, independent of its names. Some file systems assign the same identity to
+/// two files, so confirm a match with `isSameFile`.
 struct FileIdentity {
     std::uint64_t device = 0;
     std::uint64_t index = 0;
-    // The check takes the comparison with zero inside it for a null pointer.
+    // clang-tidy mistakes the zero in the defaulted comparison for a null pointer.
     // NOLINTNEXTLINE(modernize-use-nullptr)
     friend auto operator<=>(const FileIdentity&, const FileIdentity&) = default;
 };
 
+/// The status of a file.
 struct FileStatus {
-    std::uint32_t time = 0; ///< last modification, seconds since 1970, cut to 32 bits
+    std::uint32_t time = 0; ///< last modification, seconds since 1970, truncated to 32 bits
     long long size = 0;     ///< in bytes
-    bool regular = false;   ///< a regular file, or a link to one
+    bool regular = false;   ///< a regular file, or a symlink to one
 };
 
-/// The status of the file, links followed, from one query; nothing when there is none to be had.
+/// Returns the status of the file, from one query that follows symlinks; `std::nullopt` if the
+/// query fails.
 std::optional<FileStatus> queryFile(const NativePath& path);
 
-/// Whether two names, neither of which may be a folder's, stand for one file.
+/// Returns whether two paths refer to the same file. Neither may be the path of a directory.
 bool isSameFile(const NativePath& a, const NativePath& b);
 
-/// One file that may be a component library.
+/// A candidate: a file that may be a component library.
 struct DirectoryEntry {
     std::wstring name;                    ///< as the system spells it
-    NativePath path;                      ///< the directory as it was given, and the name
-    std::optional<FileIdentity> identity; ///< where the system allows two names for one file
+    NativePath path;                      ///< the directory as it was passed, and the name
+    std::optional<FileIdentity> identity; ///< on systems where this file may have several names
 };
 
-/// Returns, for each directory, its regular files that are not hidden (by attribute, or by a
-/// leading dot where that is the custom) and no system files. A directory that cannot be listed has
-/// none; a name that cannot be converted is left out.
+/// Returns the candidates of each directory: its regular files that are neither hidden (by
+/// attribute on Windows, by a leading dot on Linux) nor system files. A directory that cannot be
+/// listed has no candidates. A file whose name cannot be converted is skipped.
 ///
-/// The files of a directory are in the order in which NTFS lists them: on Windows the system's own;
-/// on Linux by UTF-16 code units, letters as upper case by a fixed table, ties by the bytes of the
-/// names.
+/// The files of a directory are in the order in which NTFS lists them. On Windows that is the order
+/// of the system. On Linux they are sorted by UTF-16 code units, with letters in upper case by a
+/// fixed table; names that are equal then are sorted by their bytes.
 ///
-/// The identities are comparable among all these directories: names of one file have the same.
+/// All identities in the result are comparable: several names of one file have the same identity.
 std::vector<std::vector<DirectoryEntry>> listCandidates(const std::vector<NativePath>& directories);
 
 /// Returns the candidates of one directory.
@@ -89,8 +95,9 @@ inline std::vector<DirectoryEntry> listCandidates(const NativePath& directory) {
     return std::move(listCandidates(std::vector<NativePath>{directory}).front());
 }
 
-/// Opens `path` for reading in binary, denying nothing to other openers. False when it cannot be
-/// opened or is a directory; the stream is then not good.
+/// Opens `path` for binary reading, without denying access to other programs.
+///
+/// \return whether the stream is good; false if the file cannot be opened or is a directory
 bool openForReading(std::ifstream& stream, const NativePath& path);
 
 // ---- Libraries ------------------------------------------------------------------------------
@@ -98,60 +105,60 @@ bool openForReading(std::ifstream& stream, const NativePath& path);
 /// A loaded library.
 using Module = void*;
 
-/// The library if the process has it mapped under this path already, else null. Takes no reference:
-/// it stays as long as whoever loaded it wants.
+/// Returns the library if the process has already mapped it under this path, else null. Takes no
+/// reference: the library stays loaded until the code that loaded it unloads it.
 Module findLoadedLibrary(const NativePath& path);
 
-/// What the file says of a function.
+/// Whether a file exports a function.
 enum class ExportState {
-    absent,   ///< the file does not export it, is no library, is damaged or cannot be opened
+    absent,   ///< the file does not export it, is not a library, is damaged or cannot be opened
     exported, ///< the file is a library that exports the function
-    unknown,  ///< the system had no resources left to open the file
+    unknown,  ///< the system lacked the resources to open the file
 };
 
 /// Returns whether the file is a library for this system and processor that exports the function
-/// `symbol` itself. Runs nothing of the file, not even its initialisers. A bounded reader of the
-/// file's own tables decides first, so that a damaged file, a program or a library without the
-/// function is not even mapped.
+/// `symbol` itself. Runs no code of the file, not even its initialisers. A bounded reader checks
+/// the tables in the file first, so that a damaged file, a program or a library without the
+/// function is not mapped.
 ExportState queryExport(const NativePath& path, const char* symbol);
 
-/// Returns whether `queryExport` finds the function.
+/// Returns whether the result of `queryExport` is `exported`.
 inline bool exportsFunction(const NativePath& path, const char* symbol) {
     return queryExport(path, symbol) == ExportState::exported;
 }
 
-/// Loads the library, with its own surroundings where the system knows such (the manifest in it);
-/// null when it cannot be loaded.
+/// Loads the library and returns it; null if it cannot be loaded. On Windows the manifest in the
+/// library is active while it loads. The caller must unload the library.
 Module loadLibrary(const NativePath& path);
 
 /// The result of `useLibrary`.
 struct UsedLibrary {
     Module module = nullptr; ///< null if there is no such library
-    bool loaded = false;     ///< by this call; the caller must unload it
-    /// The system had no resources left to open the file: with a null module, there may be a
-    /// library all the same.
+    bool loaded = false;     ///< whether this call loaded it; then the caller must unload it
+    /// The system lacked the resources to open the file. If the module is null, the file may be a
+    /// library nevertheless.
     bool unknown = false;
 };
 
-/// Returns the library that the process has mapped under this path already, whatever it exports.
-/// Otherwise loads the one in the file if it exports the function `symbol`. Runs nothing of a file
-/// that does not export the symbol.
+/// Returns the library that the process has already mapped under this path, whatever it exports.
+/// Otherwise loads the file if it exports the function `symbol`. Runs no code of a file that does
+/// not export the function.
 UsedLibrary useLibrary(const NativePath& path, const char* symbol);
 
-/// Gives back one load.
+/// Unloads a library: releases one reference that a load took. A no-op for null.
 void unloadLibrary(Module module);
 
-/// Keeps the library that contains this code, the component manager's, loaded until the process
-/// ends. Components depend on that library, and its destructor unloads them: without a reference of
-/// its own, it would be unmapped with the last component, while its destructor runs. A no-op in a
-/// program, and where the loader unmaps nothing while a process ends.
-void keepOwnLibrary();
+/// Keeps the library that contains this code (the component manager's) loaded until the process
+/// ends. Components depend on that library, and its destructor unloads them. Without this reference
+/// it would be unmapped with the last component, while its destructor runs. A no-op in a program,
+/// and on Windows, where the loader unmaps nothing while a process ends.
+void pinThisLibrary();
 
-/// The address of the function `symbol` in that very library, not in one it depends on; null when
-/// it has none, when that is no code, and when `module` is null.
+/// Returns the address of the function `symbol` in the library itself, not in a dependency; null if
+/// the library does not export it, if the address is not in code, or if `module` is null.
 void* findSymbol(Module module, const char* symbol);
 
-/// Keeps the system from showing dialogs to the user, for as long as it lives, on loads that fail.
+/// Prevents the system from showing dialogs when a load fails, during the lifetime of the object.
 class QuietErrors {
   public:
     QuietErrors();
@@ -160,40 +167,40 @@ class QuietErrors {
     QuietErrors& operator=(const QuietErrors&) = delete;
 
   private:
-    [[maybe_unused]] unsigned int previousMode; ///< where the system has such a mode
+    [[maybe_unused]] unsigned int previousMode; ///< the process's error mode, on Windows
 };
 
 // ---- Threads and locale ---------------------------------------------------------------------
 
-/// The system's identifier of the calling thread. The system may give it to another thread when
-/// this one has ended.
+/// Returns the system's identifier of the calling thread. The system may reuse it after the thread
+/// has ended.
 std::uint32_t currentThreadId();
 
-/// Has `before` called before the process makes a copy of itself, and afterwards `inParent` in the
-/// process and `inChild` in the copy, where only the calling thread lives on, by another
-/// identifier. Does nothing where processes make no copies of themselves.
+/// Registers handlers for `fork()`: `before` is called before it, then `inParent` in the parent and
+/// `inChild` in the child. The child has only the thread that called `fork()`, under a new
+/// identifier. A no-op on Windows, which has no `fork()`.
 void aroundForks(void (*before)(), void (*inParent)(), void (*inChild)());
 
-/// Whether LC_CTYPE of the calling thread is "C" or "POSIX".
+/// Returns whether LC_CTYPE of the calling thread is "C" or "POSIX".
 bool usesPlainBytes();
 
-/// What the users of `CLocale` in one process share. The platform layer keeps no state, so its user
-/// provides one object for the whole process, which must outlive every `CLocale` made with it.
+/// The state that all `CLocale` objects of one process share. The platform layer has no state, so
+/// its user provides one object for the whole process, which must outlive all these `CLocale`.
 struct LocaleSwitch {
     LocaleSwitch();
 
     void* plain = nullptr; ///< the "C" locale, where the system has handles for locales
-    void* lock = nullptr;  ///< the system's lock, which guards what follows; null is unlocked
-    int wanted = 0;        ///< how many `CLocale` live
-    std::wstring previous; ///< the locale to restore; empty while none lives
+    void* lock = nullptr;  ///< the system's lock, which guards the next members; null is unlocked
+    int useCount = 0;      ///< the number of `CLocale` objects
+    std::wstring previous; ///< the locale to restore; empty while there is no `CLocale`
 };
 
-/// While it lives, the C locale appears as "C" to the calling thread. May be nested.
+/// Sets the C locale of the calling thread to "C" during its lifetime. May be nested.
 ///
-/// Where the system knows locales of threads (Linux), no other thread notices. Elsewhere (Windows)
-/// the locale of the process is switched, by the first that comes, and restored by the last that
-/// goes, whichever threads they are: other threads see "C" meanwhile, and a locale that somebody
-/// else sets meanwhile is lost. Nothing is switched where it is "C" already.
+/// On Linux threads have their own locales, and no other thread is affected. On Windows the first
+/// object sets the locale of the process, and the last one restores it, whatever their threads.
+/// Meanwhile other threads see "C", too, and a locale that other code sets is lost. If the locale
+/// is already "C", it is not set.
 class CLocale {
   public:
     explicit CLocale(LocaleSwitch& shared);

@@ -1,7 +1,9 @@
-// NTFS keeps a folder sorted by UTF-16 code units, each in upper case by a table that maps one unit
-// to one unit. The table here follows that rule: it has a unit's simple upper-case mapping of
-// Unicode 14, where both have 16 bits and the simple lower-case mapping leads back. So the dotless
-// i and the long s, for instance, remain letters of their own.
+/// Maps UTF-16 code units to upper case by a table of ranges.
+///
+/// NTFS keeps a folder sorted by UTF-16 code units, each mapped to upper case by a table of single
+/// units. The table here follows that rule: it contains the simple upper-case mapping of Unicode 14
+/// if both units have 16 bits and the simple lower-case mapping is the reverse. So the dotless i
+/// and the long s, for example, are not mapped.
 #include "components/platform/upperCase.h"
 
 #include <algorithm>
@@ -12,14 +14,14 @@ namespace Mz::platform {
 
 namespace {
 
-/// Letters at equal distances from each other and from their upper case.
+/// Letters from `first` to `last`, every `step` units, whose upper case is at the same `distance`.
 struct Range {
     char16_t first, last;
     std::uint16_t step;
     std::int32_t distance;
 };
 
-// Made from the Unicode data of Python 3.11: for each code unit c, u = c.upper(), or c.title()
+// Generated from the Unicode data of Python 3.11: for each code unit c, u = c.upper(), or c.title()
 // where c.upper() is longer than one character; c is in the table if u is one other character below
 // U+10000 and u.lower() == c.
 constexpr Range ranges[] = {
@@ -84,7 +86,7 @@ constexpr Range ranges[] = {
 } // namespace
 
 char16_t upperCase(char16_t unit) {
-    if (unit < 0x80) // Most names have nothing else.
+    if (unit < 0x80) // Most names are ASCII.
         return unit >= u'a' && unit <= u'z' ? static_cast<char16_t>(unit - 32) : unit;
     const auto* const range = std::ranges::lower_bound(ranges, unit, {}, &Range::last);
     if (range == std::end(ranges) || unit < range->first || (unit - range->first) % range->step)

@@ -1,4 +1,4 @@
-/// The order in which Windows lists the files of a folder.
+/// Upper case and sort keys, for the order in which Windows lists the files of a folder.
 #pragma once
 
 #include <string>
@@ -6,12 +6,12 @@
 
 namespace Mz::platform {
 
-/// Returns the upper case of one UTF-16 code unit by a fixed table, whatever the locale; the unit
-/// itself if it has none.
+/// Returns the upper case of one UTF-16 code unit, or the unit itself if it has none. The mapping
+/// is a fixed table and does not depend on the locale.
 char16_t upperCase(char16_t unit);
 
-/// Returns `name` as it is compared to sort the files of a folder: in UTF-16 code units, each in
-/// upper case. `name` has one character in each element, or is UTF-16 already.
+/// Returns the sort key of a file name: its UTF-16 code units, each in upper case. Keys are
+/// compared by code unit. `name` may be in UTF-16 or UTF-32.
 std::u16string sortKey(std::wstring_view name);
 
 } // namespace Mz::platform

@@ -1,3 +1,9 @@
+/// Lists the candidates of a search path, and merges them with the restored records.
+///
+/// All directories are listed in one call, so that a file with several names gets one record. The
+/// normalised names identify a record; a candidate is opened by the names in which it was found,
+/// where letter case matters. The merge keeps the restored record and discards the new one, because
+/// builder records point to their library record.
 #include "components/componentManager/manager/componentImpPrivate.h"
 
 #include "components/platform/pathNormaliser.h"
@@ -10,8 +16,9 @@ namespace Mz {
 
 namespace {
 
-/// The directory in which the program that was started stands, as its command line tells it.
-/// Nothing when that cannot be told: the current one instead would run whatever lies there.
+/// Returns the directory part of the program's name on the command line, which is empty if the name
+/// has none; `std::nullopt` if the system does not know the command line. The current directory is
+/// no substitute in that case: whatever libraries it contains would be loaded.
 std::optional<std::wstring> programDirectory() {
     const std::optional<std::wstring> program = platform::firstArgument();
     if (!program)
@@ -19,11 +26,11 @@ std::optional<std::wstring> programDirectory() {
     const std::size_t separator = program->find_last_of(L"/\\");
     if (separator == std::wstring::npos)
         return std::wstring();
-    // A root is nothing without its separator.
+    // The separator of a root is part of its name.
     return program->substr(0, std::max<std::size_t>(separator, 1));
 }
 
-/// The directories to search, as the caller spells them.
+/// Returns the directories to search, as the caller spells them.
 std::vector<std::wstring> directoriesOf(const wchar_t* searchPath) {
     std::vector<std::wstring> directories;
     std::wstring_view rest(searchPath ? searchPath : L"");
@@ -47,7 +54,7 @@ struct IdentityHash {
     }
 };
 
-/// The files that have a record, on a system where one file can have several names.
+/// The files that have a record, for systems where one file can have several names.
 class SeenFiles {
   public:
     bool contains(const platform::DirectoryEntry& entry) {
@@ -64,7 +71,7 @@ class SeenFiles {
     HashMap<platform::FileIdentity, const platform::NativePath*, IdentityHash> files;
 };
 
-/// `directory` as the system wants it, where an empty name is the current one.
+/// Returns `directory` as the system spells it, "." if it is empty.
 std::optional<platform::NativePath> nativeDirectory(const std::wstring& directory) {
     return platform::toNative(directory.empty() ? std::wstring_view(L".") : directory);
 }
@@ -72,13 +79,13 @@ std::optional<platform::NativePath> nativeDirectory(const std::wstring& director
 using LibraryList = ComponentManager::LibraryList;
 using LibraryKey = ComponentManager::LibraryKey;
 
-/// Several files whose records have the same names, as where letter case tells files apart. Of what
-/// was recorded of them the first record belongs to the first file, and so on, if there are as
-/// many.
-class Namesakes {
+/// Groups of new records with the same names. These occur where letter case distinguishes files. If
+/// there are as many restored records with these names, the first one belongs to the first file,
+/// the second one to the second file, and so on.
+class SameNameGroups {
   public:
-    /// The claims of the recorded libraries must have been counted.
-    Namesakes(LibraryList& found, ComponentManager::LibraryMap& byName) {
+    /// Requires that the `restoredCount` of each record in `byName` is set.
+    SameNameGroups(LibraryList& found, ComponentManager::LibraryMap& byName) {
         if (found.size() == byName.size())
             return;
         for (auto file = found.begin(); file != found.end(); ++file) {
@@ -87,33 +94,34 @@ class Namesakes {
             if (first == file)
                 continue;
             Group& group = groups[key];
-            group.claims = first->claims;
+            group.restoredCount = first->restoredCount;
             group.others.push_back(file);
         }
     }
 
-    /// Returns whether it is unknown which record belongs to which file: there are more records, or
-    /// fewer. `file` is the one that is next. Where letter case tells no files apart, two records
-    /// of one name are of one file, and the later replaces the earlier.
-    bool areConfused(const LibraryKey& key, const ComponentLibrary& file) const {
+    /// Returns whether it is unknown which restored record belongs to which file, because their
+    /// numbers differ. `file` is the next new record of the name. Where letter case does not
+    /// distinguish files, two restored records of one name are about one file, and the later one
+    /// replaces the earlier one.
+    bool isAmbiguous(const LibraryKey& key, const ComponentLibrary& file) const {
         if (platform::namesIgnoreCase())
             return false;
         const Group* const group = groups.find(key);
-        return group ? group->claims != group->others.size() + 1 : file.claims > 1;
+        return group ? group->restoredCount != group->others.size() + 1 : file.restoredCount > 1;
     }
 
-    /// Makes `file`, the one of this name whose turn it was last, the one whose turn it is.
-    void moveOn(const LibraryKey& key, LibraryList::iterator& file) {
+    /// Replaces `file`, the previous new record of this name, by the next one.
+    void advance(const LibraryKey& key, LibraryList::iterator& file) {
         Group* const group = groups.find(key);
-        if (group && group->turn++ > 0)
-            file = group->others[group->turn - 2];
+        if (group && group->used++ > 0)
+            file = group->others[group->used - 2];
     }
 
   private:
     struct Group {
-        std::size_t claims = 0;
+        std::size_t restoredCount = 0;
         std::vector<LibraryList::iterator> others; ///< all but the first
-        std::size_t turn = 0;
+        std::size_t used = 0;                      ///< how many have met their restored record
     };
     HashMap<LibraryKey, Group, ComponentManager::LibraryKeyHash> groups;
 };
@@ -132,20 +140,21 @@ std::wstring ComponentManager::normalisePath(const wchar_t* path, bool listMode)
 void ComponentManager::discover(const wchar_t* searchPath, LibraryList& newList,
                                 LibraryMap& byName) {
     std::vector<std::wstring> directories; // normalised
-    std::vector<platform::NativePath> opened;
+    std::vector<platform::NativePath> openingPaths;
     for (const std::wstring& entry : directoriesOf(searchPath)) {
         const std::optional<platform::NativePath> native = nativeDirectory(entry);
         if (!native)
             continue;
         directories.push_back(normalisePath(entry.c_str(), false));
-        opened.push_back(platform::openingPath(directories.back(), {}, *native));
+        openingPaths.push_back(platform::openingPath(directories.back(), {}, *native));
     }
     SeenFiles seen;
-    std::vector<std::vector<platform::DirectoryEntry>> listings = platform::listCandidates(opened);
+    std::vector<std::vector<platform::DirectoryEntry>> listings =
+        platform::listCandidates(openingPaths);
     for (std::size_t index = 0; index < listings.size(); ++index)
         for (platform::DirectoryEntry& candidate : listings[index]) {
             std::wstring fileName = normalisePath(candidate.name.c_str(), false);
-            // One file, one record, however often the search path leads to it.
+            // Each file gets one record, even if the search path leads to it several times.
             if (candidate.identity ? seen.contains(candidate)
                                    : byName.find({directories[index], fileName}) != nullptr)
                 continue;
@@ -162,23 +171,23 @@ void ComponentManager::discover(const wchar_t* searchPath, LibraryList& newList,
 }
 
 void ComponentManager::merge(LibraryList& recorded, LibraryMap& byName) {
-    std::vector<LibraryList::iterator*> places; // in the map; null where the file is gone
+    std::vector<LibraryList::iterator*> places; // In the map; null if the file is gone.
     places.reserve(recorded.size());
     for (const ComponentLibrary& library : recorded) {
         places.push_back(byName.find({library.directory, library.fileName}));
         if (places.back())
-            ++(*places.back())->claims;
+            ++(*places.back())->restoredCount;
     }
-    Namesakes namesakes(libraries, byName);
-    LibraryList replaced; // The maps' keys point into them.
+    SameNameGroups groups(libraries, byName);
+    LibraryList replaced; // Kept alive because the keys of both maps are views into these records.
     auto place = places.begin();
     for (auto next = recorded.begin(); next != recorded.end();) {
         const auto old = next++;
         LibraryList::iterator* const found = *place++;
         const LibraryKey key(old->directory, old->fileName);
-        if (!found || namesakes.areConfused(key, **found))
+        if (!found || groups.isAmbiguous(key, **found))
             continue;
-        namesakes.moveOn(key, *found);
+        groups.advance(key, *found);
         old->foundPath = std::move((*found)->foundPath);
         libraries.splice(*found, recorded, old);
         replaced.splice(replaced.end(), libraries, *found);

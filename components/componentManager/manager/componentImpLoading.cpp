@@ -1,3 +1,9 @@
+/// Loads one component library, and records what it describes.
+///
+/// A library is loaded only if its file is new or has changed, or if a client asks for one of its
+/// builders. All code of the library may throw, even `release`, and the code and type of an
+/// exception may be in the library itself. Therefore each reference is released explicitly, and a
+/// library is unloaded only after the exception is destroyed.
 #include "components/componentManager/manager/componentImpPrivate.h"
 
 #include <cxxabi.h>
@@ -10,41 +16,41 @@ namespace {
 
 constexpr const char* entryPointName = "QrGetComponentDescription";
 
-const wchar_t* textOf(const wchar_t* text) {
+const wchar_t* nonNull(const wchar_t* text) {
     return text ? text : L"";
 }
 
-/// A reference on an object of a component library, given back by hand: its `release` may throw,
-/// which the destructor of a smart reference answers with `std::terminate`.
+/// A reference to an object of a component library, which is released explicitly. The object's
+/// `release` may throw; in the destructor of a smart reference that calls `std::terminate`.
 template <class T>
 class LibraryReference {
   public:
-    /// Takes over the reference that `carried` carries.
-    explicit LibraryReference(T* carried) : held(carried) {}
-    /// Gives back what is left when another exception is on its way, which is the one to report.
+    /// Adopts the reference of `adopted`, which may be null.
+    explicit LibraryReference(T* adopted) : object(adopted) {}
+    /// Releases the reference if another exception skipped `release`. Only that one propagates.
     ~LibraryReference() {
         try {
-            giveBack();
+            release();
         } catch (...) { // NOLINT(bugprone-empty-catch)
         }
     }
     LibraryReference(const LibraryReference&) = delete;
     LibraryReference& operator=(const LibraryReference&) = delete;
 
-    T* get() const { return held; }
-    [[nodiscard]] T* detach() { return std::exchange(held, nullptr); }
+    T* get() const { return object; }
+    [[nodiscard]] T* detach() { return std::exchange(object, nullptr); }
 
-    /// Throws what `release` throws; the reference counts as given back all the same.
-    void giveBack() {
-        if (T* const object = detach())
-            const_cast<std::remove_const_t<T>*>(object)->release();
+    /// Releases the reference, once: if the object's `release` throws, it is not called again.
+    void release() {
+        if (T* const released = detach())
+            const_cast<std::remove_const_t<T>*>(released)->release();
     }
 
   private:
-    T* held;
+    T* object;
 };
 
-/// Copies each description that a library offers into a record of the library's.
+/// Copies each builder description into a record of the library, and registers it.
 class AddBuilders final : public QrEnumerator<QrCPtr<QrBuilderDescription>> {
   public:
     AddBuilders(ComponentManager& manager, ComponentLibrary& library)
@@ -55,7 +61,7 @@ class AddBuilders final : public QrEnumerator<QrCPtr<QrBuilderDescription>> {
             safeCast<QrBuilderDescription>(item.get()));
         ComponentManager::Builder& added = builders.emplace_back(recordOf(*description.get()));
         manager.builderIndex[added.uid] = &added;
-        description.giveBack();
+        description.release();
         return Continue;
     }
 
@@ -64,9 +70,9 @@ class AddBuilders final : public QrEnumerator<QrCPtr<QrBuilderDescription>> {
         ComponentManager::Builder record;
         record.library = &library;
         record.uid = description.getUid();
-        record.name = textOf(description.getName());
-        record.label = textOf(description.getLabel());
-        record.text = textOf(description.getText());
+        record.name = nonNull(description.getName());
+        record.label = nonNull(description.getLabel());
+        record.text = nonNull(description.getText());
         record.number = description.getNumber();
         record.flag = description.getFlag();
         return record;
@@ -95,18 +101,18 @@ bool ComponentManager::ensureLoaded(ComponentLibrary& library, bool forUse) {
     if (unchanged && (!forUse || library.builders.empty()))
         return !library.builders.empty();
 
-    // What is no regular file any more must not even be opened: a pipe would keep us waiting.
+    // Never open what is no longer a regular file: opening a pipe could block.
     const LoadResult result = status->regular ? loadModule(library) : LoadResult::rejected;
     if (result != LoadResult::loaded) {
         dropBuilders(library);
         if (result == LoadResult::rejected)
-            library.noteFile(*status); // So that the file is not tried again until it changes.
-        else if (unchanged)
-            library.noteFile({}); // Or a later start would take it for a file without builders.
+            library.noteFile(*status); // The file is not tried again until it changes.
+        else if (unchanged) // A later start must not take the file for one without builders.
+            library.noteFile({});
         return false;
     }
-    // A client may hold a record whose library has changed, and an initialiser of that library may
-    // use the client: then the library was registered while it was loaded.
+    // If the library has changed, one of its initialisers may have used a builder record that a
+    // client holds. Then that nested call has registered the library already.
     return unchanged || !library.builders.empty() || registerLibrary(library, *status);
 }
 
@@ -115,18 +121,19 @@ ComponentManager::LoadResult ComponentManager::loadModule(ComponentLibrary& libr
     const platform::QuietErrors quiet;
     const platform::UsedLibrary used = platform::useLibrary(path, entryPointName);
     if (used.loaded)
-        platform::keepOwnLibrary();
-    // Only now: initialisers of the library may have asked for one of its builders meanwhile, and
-    // found it mapped.
+        platform::pinThisLibrary();
+    // Set these after the load: initialisers of the library may have asked for one of its builders.
+    // Such a nested call found the library mapped and set them, too.
     library.module = used.module;
     library.loadedByManager = used.loaded;
-    library.entryPoint = nullptr; // A load that failed may have left an address found meanwhile.
+    library.entryPoint = nullptr; // A nested call may have set it before the load failed.
     if (used.module)
         return LoadResult::loaded;
     return used.unknown ? LoadResult::unknown : LoadResult::rejected;
 }
 
-/// The exception of a thread's cancellation has no object, which a sanitizer would complain about.
+/// Not sanitized for null: the exception of a thread's cancellation has no object, and binding the
+/// reference to it would be reported.
 __attribute__((no_sanitize("null"))) bool
 ComponentManager::registerLibrary(ComponentLibrary& library, const platform::FileStatus& status) {
     bool described = false;
@@ -136,17 +143,17 @@ ComponentManager::registerLibrary(ComponentLibrary& library, const platform::Fil
         const bool found = description.get() != nullptr;
         if (found)
             readDescription(library, *description.get());
-        description.giveBack();
+        description.release();
         described = found;
     } catch (abi::__forced_unwind&) {
-        // The thread is being cancelled, and this is not the exception of anybody's code. Half a
-        // description must not pass for a whole one.
+        // The thread is being cancelled, and this exception must propagate. An incomplete
+        // description must not stay registered.
         dropBuilders(library);
         unload(library);
         throw;
     } catch (...) {
-        // Nothing more in here: the exception's own code may live in the library, which must not
-        // be unloaded before the exception is gone.
+        // Unload the library only after this handler: it may contain the code that destroys the
+        // exception.
         failed = true;
     }
     if (failed)
@@ -161,10 +168,10 @@ ComponentManager::registerLibrary(ComponentLibrary& library, const platform::Fil
 void ComponentManager::readDescription(ComponentLibrary& library,
                                        QrComponentDescription& description) {
     library.descriptionValue = description.getComponentValue();
-    library.componentText2 = textOf(description.getComponentText());
-    library.componentText1 = textOf(description.getComponentLabel());
-    // The count is the library's word for it and decides nothing: records are added one by one,
-    // where they stay.
+    library.componentText2 = nonNull(description.getComponentText());
+    library.componentText1 = nonNull(description.getComponentLabel());
+    // The count may be wrong, so nothing is reserved. Records are allocated one by one and never
+    // move. The call is part of the fixed sequence.
     static_cast<void>(description.getBuilderCount());
     AddBuilders adder(*this, library);
     description.enumerateBuilders(adder);
@@ -183,7 +190,7 @@ QrPtr<QrComponentDescription> ComponentManager::getDescription(ComponentLibrary&
     LibraryReference<QrCastable> described(QrPtr<QrCastable>(library.entryPoint()).detach());
     LibraryReference<QrComponentDescription> description(
         queryCast<QrComponentDescription>(described.get()).detach());
-    described.giveBack();
+    described.release();
     return QrPtr<QrComponentDescription>::adopt(description.detach());
 }
 
@@ -197,8 +204,8 @@ QrRefPtr<QrComponentBuilder> ComponentManager::getComponentBuilder(ComponentLibr
     LibraryReference<QrCastable> created(description.get()->createBuilder(uid).detach());
     LibraryReference<QrComponentBuilder> builder(
         queryCast<QrComponentBuilder>(created.get()).detach());
-    created.giveBack();
-    description.giveBack();
+    created.release();
+    description.release();
     return QrRefPtr<QrComponentBuilder>::adopt(builder.detach());
 }
 

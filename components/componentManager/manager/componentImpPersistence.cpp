@@ -1,3 +1,8 @@
+/// Writes and reads the recorded list.
+///
+/// The order of the fields is the stored format and must not change. A list may come from a damaged
+/// file, so counts in it only end loops: records are created one by one as they are read, and a
+/// record that cannot be read completely is reset, so that its file is recorded anew.
 #include "components/componentManager/manager/componentImpPrivate.h"
 
 #include "components/componentManager/stream.h"
@@ -18,13 +23,14 @@ void writeBuilder(QrStream& stream, const ComponentManager::Builder& builder) {
 void writeLibrary(QrStream& stream, const ComponentLibrary& library) {
     stream << library.directory << library.fileName << library.fileTime << library.fileSize
            << static_cast<unsigned int>(library.builders.size());
-    // Last first: so lists have always been written.
+    // Last to first: this order is part of the stored format.
     for (std::size_t index = library.builders.size(); index-- > 0;)
         writeBuilder(stream, library.builders[index]);
 }
 
-/// A text of a record. No name or path holds a NUL, and one is never consumed when it is read as a
-/// character: it would fill every text that is claimed, of which a small file could claim many.
+/// Reads a text of a record, and throws if it contains a NUL. No name or path contains one. A NUL
+/// that is read as a character is not consumed, so it would fill a text of any claimed length, and
+/// a small file could claim many long texts.
 void readText(QrStream& stream, std::wstring& text) {
     stream >> text;
     if (text.find(L'\0') != std::wstring::npos)
@@ -44,7 +50,7 @@ void readLibrary(QrStream& stream, ComponentLibrary& library) {
     readText(stream, library.directory);
     readText(stream, library.fileName);
     stream >> library.fileTime >> library.fileSize >> count;
-    // The count is only a claim, so records come one by one.
+    // The count may be wrong, so nothing is reserved.
     for (; count > 0; --count) {
         ComponentManager::Builder& builder = library.builders.emplace_back();
         builder.library = &library;
@@ -68,7 +74,7 @@ void ComponentManager::readRecords(QrStream& stream) {
         return;
     int count = 0;
     if (stream.read(count, 1) == 0) {
-        // The position is part of what callers and logs rely on, not this file's line.
+        // A fixed line, because callers and logs rely on it. It is not a line of this file.
         constexpr int reportedLine = 1260;
         throw QrStreamEx::ExReadObject(source, reportedLine);
     }
@@ -79,7 +85,7 @@ void ComponentManager::readRecords(QrStream& stream) {
         try {
             readLibrary(stream, library);
         } catch (...) {
-            // Half a record must not pass for what is known of the file.
+            // An incomplete record must not count as the state of the file.
             library.fileTime = 0;
             library.fileSize = 0;
             library.builders.clear();

@@ -1,8 +1,8 @@
-/// The component manager's own classes. Not for clients: exported for the tests alone.
+/// The private classes of the component manager. Exported for the tests only.
 ///
-/// The sources around it, one thought each: `componentImp.cpp` (the interfaces and the manager's
-/// operations), `componentImpRegistry.cpp` (builder records), `componentImpDiscovery.cpp` (search
-/// path and merge), `componentImpLoading.cpp` (one library's loading and description),
+/// The sources: `componentImp.cpp` (the interfaces and the manager's operations),
+/// `componentImpRegistry.cpp` (builder records), `componentImpDiscovery.cpp` (search path and
+/// merge), `componentImpLoading.cpp` (loading and recording one library), and
 /// `componentImpPersistence.cpp` (the recorded list).
 #pragma once
 
@@ -27,8 +27,8 @@ struct UidHash {
     std::uint32_t operator()(const QrUid& uid) const { return uid.w0; }
 };
 
-/// The manager. There is one for the process, which `QrGetComponentManager` gives out; tests make
-/// others.
+/// The implementation of the component manager. `QrGetComponentManager` returns the one of the
+/// process; tests create others.
 class MZ_INTERNAL_API ComponentManager final
     : public QrCastImpl2<ComponentManager, QrComponentManager,
                          QrTempIface<ComponentManager, ComponentManagerPersistant>,
@@ -37,7 +37,7 @@ class MZ_INTERNAL_API ComponentManager final
     class Builder;
     class BuilderList;
 
-    /// Directory and file name of a library, as they stand in its record.
+    /// The directory and the file name of a library record. Views into that record.
     using LibraryKey = std::pair<std::wstring_view, std::wstring_view>;
     struct MZ_INTERNAL_API LibraryKeyHash {
         std::size_t operator()(const LibraryKey& key) const;
@@ -55,45 +55,50 @@ class MZ_INTERNAL_API ComponentManager final
     void initialize(const wchar_t* searchPath) override;
     QrRef<QrCastable> createObject(const QrUid& uid) override;
 
-    /// The one form in which directory and file names are stored and compared. In list mode, `path`
-    /// is a list separated by ';'. Null gives an empty string.
+    /// Returns `path` in the form in which directory and file names are stored and compared. In
+    /// list mode, `path` is a list separated by ';'. Returns an empty string for null.
     static std::wstring normalisePath(const wchar_t* path, bool listMode);
 
-    /// Appends a record to `newList` for every candidate file along `searchPath`, and enters it in
-    /// `byName` unless another one has its names.
+    /// Appends a record to `newList` for each candidate in the directories of `searchPath`, and
+    /// enters it in `byName` unless another record has the same names.
     void discover(const wchar_t* searchPath, LibraryList& newList, LibraryMap& byName);
 
-    /// Puts each recorded library whose file was found again in the place of the new record, with
-    /// all that is known of it. The nodes move, no record does.
+    /// Replaces each new record by the restored record of the same file, if there is one, with its
+    /// time, size and builders. List nodes are spliced; no record is copied or moved in memory.
     void merge(LibraryList& recorded, LibraryMap& byName);
 
-    /// Makes the library's builders known, and when it is `forUse` has it loaded; false when it has
-    /// no builders. A library whose file is as recorded is not loaded unless it is for use.
+    /// Registers the builders of the library and, if `forUse`, loads it. Without `forUse`, a
+    /// library whose file has not changed since it was recorded is not loaded. Returns false if the
+    /// library was recorded without builders, cannot be loaded, or fails to describe itself.
     bool ensureLoaded(ComponentLibrary& library, bool forUse);
 
-    /// What the library says of itself; null when it is not loaded or has nothing to say.
+    /// Calls the entry point and returns the description; null if the library cannot be loaded, has
+    /// no entry point, or returns no description. Throws what the code of the library throws.
     QrPtr<QrComponentDescription> getDescription(ComponentLibrary& library);
 
-    /// The builder of the library with this identifier, the library loaded if need be, or null.
+    /// Returns the builder with this uid, or null. Loads the library, if necessary. Throws what the
+    /// code of the library throws.
     QrRefPtr<QrComponentBuilder> getComponentBuilder(ComponentLibrary& library, const QrUid& uid);
 
-    /// Gives the library back to the system if the manager loaded it. No exception made by its code
-    /// may be alive.
+    /// Unloads the library if the manager loaded it. No exception object of its code may be alive.
     void unload(ComponentLibrary& library);
 
-    /// Writes the recorded libraries and their builders; nothing before `initialize`.
+    /// Writes the library records with their builder records. Writes nothing before `initialize`.
     void writeRecords(QrStream& stream);
 
-    /// Appends recorded libraries to those that `initialize` will compare with what it finds. Does
-    /// nothing once that has begun. After a failure the libraries read whole stay, and the one that
-    /// was being read is left such that it is read afresh from its file.
+    /// Appends library records, which `initialize` merges with the files that it finds. A no-op
+    /// once `initialize` has begun. After a failure the records that were read completely stay. The
+    /// incomplete one loses its time, size and builders, so that `initialize` records its file
+    /// anew.
     void readRecords(QrStream& stream);
 
-    /// Enters the library's builders in the index; of two with one identifier the first one stays.
+    /// Enters the builders of the library in the index, replacing entries of the same uid. If two
+    /// builders of the library have the same uid, the first one wins.
     void reindexBuilders(ComponentLibrary& library);
 
-    /// Takes the library's builders out of the index, by identifier alone, whoever's builder stands
-    /// there, and out of the library. The records stay readable for those who still look at them.
+    /// Removes the builder records from the library, and their uids from the index, even where the
+    /// entry refers to a builder of another library. The records stay valid, because clients may
+    /// still hold pointers to them.
     void dropBuilders(ComponentLibrary& library);
 
     LibraryList libraries;
@@ -103,24 +108,25 @@ class MZ_INTERNAL_API ComponentManager final
   private:
     enum class LoadResult {
         loaded,
-        rejected, ///< the file is no component library, or cannot be loaded
-        unknown,  ///< the system had no resources left to look into the file
+        rejected, ///< the file is not a component library, or cannot be loaded
+        unknown,  ///< the system lacked the resources to open the file
     };
-    /// Finds the library in the process or loads it.
+    /// Uses the library that is mapped in the process already, or else loads it.
     LoadResult loadModule(ComponentLibrary& library);
-    /// Has the loaded library describe itself. One that fails is left without builders and
-    /// unloaded.
+    /// Records the builders that the loaded library describes. On failure, drops them and unloads
+    /// the library. Returns whether the library has a description.
     bool registerLibrary(ComponentLibrary& library, const platform::FileStatus& status);
+    /// Copies the values and builders of the description into the library record.
     void readDescription(ComponentLibrary& library, QrComponentDescription& description);
 
-    /// While `initialize` runs, so that a library that calls it does nothing.
+    /// True while `initialize` runs, so that a nested call is a no-op.
     bool initialising = false;
 
-    /// Records that were dropped while somebody may still look at them.
+    /// Dropped records, to which clients may still hold pointers.
     std::list<BuilderList> droppedBuilders;
 };
 
-/// What the manager knows of one builder: a copy of what the library's description said.
+/// A builder record: the manager's copy of a builder description.
 class MZ_INTERNAL_API ComponentManager::Builder final
     : public QrCastImpl<ComponentManager::Builder, QrBuilderDescription,
                         const ComponentManager::Builder&> {
@@ -150,8 +156,8 @@ class MZ_INTERNAL_API ComponentManager::Builder final
     bool flag = false;
 };
 
-/// The builders of one library, by number. Grows without moving a record: clients and the index
-/// point at them.
+/// The builder records of one library. Growing does not move a record in memory, because clients
+/// and the index hold pointers to them.
 class ComponentManager::BuilderList {
   public:
     bool empty() const { return records.empty(); }
@@ -171,41 +177,41 @@ class ComponentManager::BuilderList {
     std::vector<std::unique_ptr<Builder>> records;
 };
 
-/// What the manager knows of one candidate file.
+/// A library record: what the manager knows of one candidate.
 struct MZ_INTERNAL_API ComponentLibrary {
     explicit ComponentLibrary(ComponentManager& manager);
-    /// Gives the library back to the system if the manager loaded it.
+    /// Unloads the library if the manager loaded it.
     ~ComponentLibrary();
     ComponentLibrary(const ComponentLibrary&) = delete;
     ComponentLibrary& operator=(const ComponentLibrary&) = delete;
 
-    /// The name under which the file is opened.
+    /// Returns the path by which the file is opened.
     platform::NativePath openingPath() const;
 
-    /// Remembers that the builders are those of this state of the file.
+    /// Stores the file's time and size, for which the builder records are valid.
     void noteFile(const platform::FileStatus& status);
 
     std::wstring directory; ///< normalised
     std::wstring fileName;  ///< normalised
     platform::Module module = nullptr;
-    std::uint32_t fileTime = 0; ///< as it was when the builders were last read
-    int64 fileSize = 0;         ///< likewise
-    int64 descriptionValue = 0;
+    std::uint32_t fileTime = 0;  ///< when the builders were last read
+    int64 fileSize = 0;          ///< when the builders were last read
+    int64 descriptionValue = 0;  ///< not interpreted
     std::wstring componentText1; ///< the label
     std::wstring componentText2; ///< the text
     ComponentManager::BuilderList builders;
-    bool loadedByManager = false;
+    bool loadedByManager = false; ///< false if the process had mapped the module before
 
     ComponentManager* manager;
-    std::size_t claims =
-        0; ///< of a file that was found: how many recorded libraries have its names
+    std::size_t restoredCount = 0;  ///< in a new record: how many restored ones have its names
     platform::NativePath foundPath; ///< as the search path and the system spell it; never stored
-    /// The entry point's address while the library is loaded. Only the look-up is spared: the call
-    /// is made each time.
+    /// The address of the entry point, cached while the library is loaded. The function is still
+    /// called each time.
     QrGetComponentDescriptionFunction* entryPoint = nullptr;
 };
 
-/// Stores the manager's records, so that the next start need not load what has not changed.
+/// The persistent companion of the manager: writes and reads the recorded list, so that the next
+/// start loads only libraries that are new or have changed.
 class MZ_INTERNAL_API ComponentManagerPersistant final
     : public QrTempObject<ComponentManager,
                           QrCastRef<QrCastHeap<QrCastImpl<ComponentManagerPersistant, QrPersistant,

@@ -1,3 +1,9 @@
+/// Builder records, and their index.
+///
+/// A record holds copies of the texts of its builder, so that clients read them without loading the
+/// library. The texts of the component are in the library record, which all its builders share. The
+/// index is keyed by uid alone: the last registered builder wins, and dropping a library removes
+/// its uids, even if a builder of another library has replaced the entry.
 #include "components/componentManager/manager/componentImpPrivate.h"
 
 namespace Mz {
@@ -50,6 +56,7 @@ QrCRefPtr<QrComponentBuilder> Builder::getBuilder() const {
 }
 
 void ComponentManager::reindexBuilders(ComponentLibrary& library) {
+    // Last to first, so that the first of several builders with the same uid wins.
     for (std::size_t index = library.builders.size(); index-- > 0;)
         builderIndex[library.builders[index].uid] = &library.builders[index];
 }

@@ -1,10 +1,13 @@
-// A listing names most files by kind and number, so their status is not asked for: that would take
-// as long as all the rest. A symlink is asked for, since its own kind and number say nothing.
-//
-// The two sources need not agree. On an overlay file system, and where a file is mounted over
-// another one, a listing gives other numbers than the status. A link to a file of the same search
-// then looks like a file of its own. So where a link leads to something that no listing named, the
-// status decides for every file of the search.
+/// Lists the candidates of directories.
+///
+/// A listing contains the kind and number of most files, so their status is not queried: that would
+/// take as long as everything else. A symlink is queried, because its own kind and number do not
+/// identify its target.
+///
+/// Listing and status need not agree. On an overlay file system, and where a file is mounted over
+/// another one, a listing contains other numbers than the status. A symlink to a file of the same
+/// search then looks like a separate file. So if a symlink leads to a file that no listing
+/// contains, the status identifies all files of the search.
 #include "components/platform/platform.h"
 
 #include "components/platform/characters.h"
@@ -27,24 +30,24 @@ struct CloseDirectory {
 
 using Directory = std::unique_ptr<DIR, CloseDirectory>;
 
-/// Where a file's identity comes from.
+/// The origin of a file's identity.
 enum class Source { listing, status };
 
 struct Listed {
     DirectoryEntry entry;
     Source source;
-    std::u16string key; ///< to sort by
+    std::u16string key; ///< the sort key
 };
 
 using Listing = std::vector<Listed>;
 
-/// Whether an entry names the file by number; some file systems give a placeholder instead.
+/// Returns whether an entry contains the number of its file. Some file systems use a placeholder.
 bool hasFileNumber(const dirent& entry) {
     constexpr ino_t placeholder = 0xFFFFFFFF;
     return entry.d_ino != 0 && entry.d_ino != placeholder && entry.d_ino != static_cast<ino_t>(-1);
 }
 
-/// The identity of a regular file, links followed, by its status.
+/// Returns the identity of a regular file, or of the one to which a symlink leads, from its status.
 std::optional<FileIdentity> identityByStatus(int directory, const char* name) {
     struct stat status;
     if (::fstatat(directory, name, &status, 0) != 0 || !S_ISREG(status.st_mode))
@@ -52,7 +55,7 @@ std::optional<FileIdentity> identityByStatus(int directory, const char* name) {
     return FileIdentity{status.st_dev, status.st_ino};
 }
 
-/// Adds the file that `item` names, if it is a candidate. The directory is on `device`.
+/// Adds the file of `item` if it is a candidate. `device` is the device of the directory.
 void addCandidate(Listing& listing, const NativePath& path, DIR* directory, dev_t device,
                   const dirent& item) {
     if (item.d_name[0] == '.' || item.d_type == DT_DIR)
@@ -75,28 +78,29 @@ void addCandidate(Listing& listing, const NativePath& path, DIR* directory, dev_
 Listing list(const NativePath& path) {
     Listing listing;
     const Directory directory(::opendir(path.c_str()));
-    struct stat own;
-    if (!directory || ::fstat(::dirfd(directory.get()), &own) != 0)
+    struct stat status;
+    if (!directory || ::fstat(::dirfd(directory.get()), &status) != 0)
         return listing;
     while (const dirent* item = ::readdir(directory.get()))
-        addCandidate(listing, path, directory.get(), own.st_dev, *item);
+        addCandidate(listing, path, directory.get(), status.st_dev, *item);
     return listing;
 }
 
-/// Whether a link leads to a file that no listing named.
-bool isOneUnnamed(const std::vector<Listing>& listings) {
-    std::set<FileIdentity> linked;
+/// Returns whether a file that was identified by its status, such as the target of a symlink, is in
+/// no listing.
+bool hasUnlistedTarget(const std::vector<Listing>& listings) {
+    std::set<FileIdentity> targets;
     for (const Listing& listing : listings)
         for (const Listed& file : listing)
             if (file.source == Source::status)
-                linked.insert(*file.entry.identity);
-    if (linked.empty())
+                targets.insert(*file.entry.identity);
+    if (targets.empty())
         return false;
     for (const Listing& listing : listings)
         for (const Listed& file : listing)
             if (file.source == Source::listing)
-                linked.erase(*file.entry.identity);
-    return !linked.empty();
+                targets.erase(*file.entry.identity);
+    return !targets.empty();
 }
 
 void identifyByStatus(Listing& listing) {
@@ -106,7 +110,8 @@ void identifyByStatus(Listing& listing) {
                 file.entry.identity = identity;
 }
 
-/// Sorts as a file system without letter case does; names with one key by their bytes.
+/// Returns the entries in the order of their keys; entries with equal keys in the order of the
+/// bytes of their paths.
 std::vector<DirectoryEntry> sorted(Listing listing) {
     std::vector<Listed*> order;
     order.reserve(listing.size());
@@ -131,7 +136,7 @@ listCandidates(const std::vector<NativePath>& directories) {
     listings.reserve(directories.size());
     for (const NativePath& directory : directories)
         listings.push_back(list(directory));
-    if (isOneUnnamed(listings))
+    if (hasUnlistedTarget(listings))
         for (Listing& listing : listings)
             identifyByStatus(listing);
     std::vector<std::vector<DirectoryEntry>> entries;

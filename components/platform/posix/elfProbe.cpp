@@ -1,3 +1,8 @@
+/// Looks up a symbol in an ELF file as the loader would.
+///
+/// The check reads the headers, the dynamic section and the hash table, and follows one chain of
+/// that table, so it costs a few reads in a library of any size. All offsets, counts and addresses
+/// are checked against the file, because the loader crashes on some damaged files.
 #include "components/platform/posix/elfProbe.h"
 
 #include "components/platform/fileBlocks.h"
@@ -18,12 +23,12 @@ namespace Mz::platform {
 
 namespace {
 
-/// Limits that no real library comes near; they bound the work that a hostile one can cause.
+/// Limits that bound the work for a hostile file. Real libraries are far below them.
 constexpr std::size_t maximumSegments = 1024;
 constexpr std::size_t maximumDynamicEntries = 4096;
 constexpr std::size_t maximumChainLength = 4096;
 
-/// The file behind a descriptor.
+/// The bytes of the file of a descriptor, which stays open.
 class DescriptorSource final : public ByteSource {
   public:
     explicit DescriptorSource(int descriptor) : descriptor(descriptor) {
@@ -52,16 +57,16 @@ class DescriptorSource final : public ByteSource {
     std::uint64_t fileSize = 0;
 };
 
-/// Where the tables for symbol lookup stand, as addresses in the loaded library.
+/// The tables for symbol lookup, by their addresses in the loaded library.
 struct DynamicTables {
     std::uint64_t symbols = 0;
     std::uint64_t strings = 0;
     std::uint64_t stringsSize = 0;
     std::uint64_t gnuHash = 0;
     std::uint64_t hash = 0;
-    /// The highest of the positions in the string table at which the loader takes names.
+    /// The highest position in the string table at which the loader reads a name.
     std::uint64_t lastName = 0;
-    bool program = false; ///< position-independent, but to be started and not to be loaded
+    bool isProgram = false; ///< a position-independent executable, which cannot be loaded
 };
 
 class ElfLibrary {
@@ -71,7 +76,8 @@ class ElfLibrary {
     bool exports(const char* symbol) {
         if (!readHeaders() || !readDynamicTables())
             return false;
-        return (tables.gnuHash ? foundByGnuHash(symbol) : foundByHash(symbol)) && namesEnd();
+        return (tables.gnuHash ? foundByGnuHash(symbol) : foundByHash(symbol)) &&
+               namesAreTerminated();
     }
 
   private:
@@ -82,7 +88,7 @@ class ElfLibrary {
             header->e_type != ET_DYN || header->e_machine != EM_X86_64 ||
             header->e_phentsize != sizeof(Elf64_Phdr) || header->e_phnum > maximumSegments)
             return false;
-        // The section headers stand at the end, as a rule: a file that was cut off lacks them.
+        // The section headers are usually at the end of the file, so a truncated file lacks them.
         if (header->e_shnum != 0 &&
             !file.reaches(header->e_shoff, header->e_shnum * std::uint64_t{header->e_shentsize}))
             return false;
@@ -91,11 +97,11 @@ class ElfLibrary {
                 file.read<Elf64_Phdr>(header->e_phoff + index * sizeof(Elf64_Phdr));
             if (!segment)
                 return false;
-            // The system maps what is not there as well, and ends the process that touches it.
+            // The system also maps parts that the file lacks. Accessing them kills the process.
             if (segment->p_type == PT_LOAD && !file.reaches(segment->p_offset, segment->p_filesz))
                 return false;
             if (segment->p_type == PT_LOAD)
-                loaded.push_back(*segment);
+                loadSegments.push_back(*segment);
             else if (segment->p_type == PT_DYNAMIC)
                 dynamic = *segment;
         }
@@ -111,19 +117,19 @@ class ElfLibrary {
                 return false;
             if (entry->d_tag == DT_NULL)
                 break;
-            note(*entry);
+            store(*entry);
         }
-        return !tables.program && tables.symbols && tables.strings &&
+        return !tables.isProgram && tables.symbols && tables.strings &&
                (tables.gnuHash || tables.hash);
     }
 
-    void note(const Elf64_Dyn& entry) {
+    void store(const Elf64_Dyn& entry) {
         switch (entry.d_tag) {
         case DT_SYMTAB: tables.symbols = entry.d_un.d_ptr; break;
         case DT_STRTAB: tables.strings = entry.d_un.d_ptr; break;
         case DT_STRSZ: tables.stringsSize = entry.d_un.d_val; break;
         case DT_GNU_HASH: tables.gnuHash = entry.d_un.d_ptr; break;
-        case DT_FLAGS_1: tables.program = (entry.d_un.d_val & DF_1_PIE) != 0; break;
+        case DT_FLAGS_1: tables.isProgram = (entry.d_un.d_val & DF_1_PIE) != 0; break;
         case DT_HASH: tables.hash = entry.d_un.d_ptr; break;
         case DT_NEEDED:
         case DT_SONAME:
@@ -133,16 +139,16 @@ class ElfLibrary {
         }
     }
 
-    /// Whether all names that the loader takes from the string table end in it: the loader follows
-    /// them wherever they lead.
-    bool namesEnd() {
+    /// Returns whether all names that the loader reads from the string table end inside it. The
+    /// loader does not check that.
+    bool namesAreTerminated() {
         if (tables.lastName >= tables.stringsSize)
             return false;
         const std::optional<std::uint64_t> offset = offsetOf(tables.strings, tables.stringsSize);
         return offset && file.read<char>(*offset + tables.stringsSize - 1) == '\0';
     }
 
-    /// The `T` that the loaded library would have at `address`.
+    /// Returns the `T` that the loaded library would contain at `address`.
     template <class T>
     std::optional<T> readAt(std::uint64_t address) {
         const std::optional<std::uint64_t> offset = offsetOf(address, sizeof(T));
@@ -151,8 +157,10 @@ class ElfLibrary {
         return file.read<T>(*offset);
     }
 
+    /// Returns the offset in the file of the `size` bytes at `address`, if one segment contains all
+    /// of them.
     std::optional<std::uint64_t> offsetOf(std::uint64_t address, std::size_t size) const {
-        for (const Elf64_Phdr& segment : loaded) {
+        for (const Elf64_Phdr& segment : loadSegments) {
             if (address < segment.p_vaddr)
                 continue;
             const std::uint64_t inside = address - segment.p_vaddr;
@@ -227,13 +235,13 @@ class ElfLibrary {
         const unsigned int type = ELF64_ST_TYPE(symbol->st_info);
         const unsigned int binding = ELF64_ST_BIND(symbol->st_info);
         const unsigned int visibility = ELF64_ST_VISIBILITY(symbol->st_other);
-        // Functions written in assembly often carry no type.
+        // Functions written in assembly often have no type.
         return (type == STT_FUNC || type == STT_GNU_IFUNC || type == STT_NOTYPE) &&
                binding != STB_LOCAL && visibility != STV_HIDDEN && visibility != STV_INTERNAL &&
                isName(symbol->st_name, name);
     }
 
-    /// Whether the string table holds `name`, and its terminator, at `position`.
+    /// Returns whether the string table contains `name` and its terminator at `position`.
     bool isName(std::uint64_t position, std::string_view name) {
         if (position >= tables.stringsSize || name.size() >= tables.stringsSize - position)
             return false;
@@ -245,7 +253,7 @@ class ElfLibrary {
     }
 
     FileBlocks file;
-    std::vector<Elf64_Phdr> loaded;
+    std::vector<Elf64_Phdr> loadSegments;
     std::optional<Elf64_Phdr> dynamic;
     DynamicTables tables;
 };

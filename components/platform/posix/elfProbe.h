@@ -1,13 +1,13 @@
-/// Looking into a shared library without loading it.
+/// Checks a shared library without loading it.
 #pragma once
 
 namespace Mz::platform {
 
-/// Whether the open file is a shared library for this processor whose dynamic symbol table defines
-/// the function `symbol`, for others to see.
+/// Returns whether the open file is a shared library for this processor that exports the function
+/// `symbol`: its dynamic symbol table defines it, visible to other libraries.
 ///
-/// Reads a few small pieces of the file, whatever its size; nothing in it is trusted. What is
-/// damaged, truncated or anything else than such a library gives false.
+/// Reads a few small pieces of the file, whatever its size, and does not trust its contents.
+/// Returns false for damaged, truncated and all other files.
 bool elfExportsFunction(int descriptor, const char* symbol);
 
 } // namespace Mz::platform

@@ -1,3 +1,7 @@
+/// The file functions for Linux.
+///
+/// A rename is atomic here. `fsync` of the file brings its content to the medium, and `fsync` of
+/// its folder brings its name there.
 #include "components/platform/files.h"
 
 #include "components/platform/characters.h"
@@ -27,7 +31,7 @@ std::error_code createNew(const std::filesystem::path& path, std::filesystem::pe
     return {};
 }
 
-std::error_code complete(const std::filesystem::path& path,
+std::error_code syncFile(const std::filesystem::path& path,
                          std::optional<std::filesystem::perms> permissions) {
     const int file = ::open(path.c_str(), O_RDONLY | O_CLOEXEC);
     if (file < 0)
@@ -42,12 +46,13 @@ std::error_code complete(const std::filesystem::path& path,
 std::error_code moveOver(const std::filesystem::path& from, const std::filesystem::path& to) {
     if (std::rename(from.c_str(), to.c_str()) != 0)
         return lastError();
-    // Not every file system lets one wait for the name, and the file is there in any case.
-    complete(to.has_parent_path() ? to.parent_path() : std::filesystem::path("."), std::nullopt);
+    // Failures are ignored: some file systems cannot sync a folder, and the file is renamed
+    // already.
+    syncFile(to.has_parent_path() ? to.parent_path() : std::filesystem::path("."), std::nullopt);
     return {};
 }
 
-std::optional<std::filesystem::path> linkText(const std::filesystem::path& path) {
+std::optional<std::filesystem::path> symlinkTarget(const std::filesystem::path& path) {
     std::error_code failure;
     std::filesystem::path text = std::filesystem::read_symlink(path, failure);
     if (failure)
@@ -82,7 +87,7 @@ std::filesystem::path resolveDots(const std::filesystem::path& path) {
             plain /= part;
         }
     }
-    return plain.lexically_normal(); // Repeated separators.
+    return plain.lexically_normal(); // Removes repeated separators.
 }
 
 } // namespace Mz::platform

@@ -1,3 +1,9 @@
+/// The platform functions for Linux.
+///
+/// Libraries are checked by the reader of ELF files before they are loaded. The loader has no
+/// function that reports whether a load mapped a library or only took a reference, so its count of
+/// mapped libraries is compared. It also finds symbols in dependencies, so the address of a symbol
+/// is compared with the code segments of the library itself.
 #include "components/platform/platform.h"
 
 #include "components/platform/characters.h"
@@ -20,6 +26,7 @@ namespace Mz::platform {
 
 namespace {
 
+/// A file descriptor, closed at the end.
 class Descriptor {
   public:
     explicit Descriptor(int value) : value(value) {}
@@ -37,23 +44,23 @@ class Descriptor {
     int value;
 };
 
-/// Whether an operation failed for want of resources, and not because of the file.
+/// Returns whether an operation failed for lack of resources, not because of the file.
 bool isShortage(int error) {
     return error == EMFILE || error == ENFILE || error == ENOMEM;
 }
 
-/// The segments of a loaded library, as its file describes them.
+/// The program headers of a loaded library.
 using Segments = std::span<const ElfW(Phdr)>;
 
-/// What `walkToSegments` looks for among the loaded libraries.
+/// The argument and result of a search for the segments of one library.
 struct SegmentSearch {
     ElfW(Addr) base;
-    ElfW(Addr) dynamic; ///< its dynamic section, which tells it from others with the same base
+    ElfW(Addr) dynamic; ///< the dynamic section, unique among libraries with the same base
     Segments found;
 };
 
-/// Looks at one loaded library; not zero ends the walk.
-int lookForSegments(dl_phdr_info* library, std::size_t, void* data) {
+/// The callback of the search, called for each loaded library. A result other than zero ends it.
+int checkForSegments(dl_phdr_info* library, std::size_t, void* data) {
     auto& search = *static_cast<SegmentSearch*>(data);
     if (library->dlpi_addr != search.base)
         return 0;
@@ -64,27 +71,28 @@ int lookForSegments(dl_phdr_info* library, std::size_t, void* data) {
     return search.found.empty() ? 0 : 1;
 }
 
-/// The segments of `library`, found among those of all loaded libraries.
-Segments walkToSegments(const link_map& library) {
+/// Returns the segments of `library` by a search through all loaded libraries.
+Segments searchSegments(const link_map& library) {
     SegmentSearch search{library.l_addr, reinterpret_cast<ElfW(Addr)>(library.l_ld), {}};
-    ::dl_iterate_phdr(lookForSegments, &search);
+    ::dl_iterate_phdr(checkForSegments, &search);
     return search.found;
 }
 
+/// Returns the segments of `library`.
 Segments segmentsOf(Module module, const link_map& library) {
-    // RTLD_DI_PHDR, which younger C libraries know: with a walk over all libraries for each of them
-    // the time of a start would grow with the square of their number.
+    // RTLD_DI_PHDR, which newer C libraries support. A search through all libraries for each one
+    // would make the time of a start quadratic in their number.
     constexpr int programHeaders = 11;
     const ElfW(Phdr)* first = nullptr;
     const int count = ::dlinfo(module, programHeaders, &first);
     if (count > 0 && first)
         return {first, static_cast<std::size_t>(count)};
-    ::dlerror(); // The message belongs to nobody.
-    return walkToSegments(library);
+    ::dlerror(); // Discards the message.
+    return searchSegments(library);
 }
 
-/// Whether the address lies in the code of that very library: neither in one that it depends on,
-/// nor in its data.
+/// Returns whether the address is in the code of the library itself, not in a dependency and not in
+/// its data.
 bool isCodeOf(Module module, void* address) {
     link_map* library = nullptr;
     if (::dlinfo(module, RTLD_DI_LINKMAP, &library) != 0)
@@ -99,17 +107,17 @@ bool isCodeOf(Module module, void* address) {
 
 /// Calls a function of the loader that runs initialisers or finalisers of libraries.
 ///
-/// What they throw ends the process here: once it has passed the loader, the loader's lock is never
-/// released. So does the end of the thread, which unwinds the stack, too. The pointer is volatile
-/// because the C library declares these functions as not throwing: a compiler that knew which one
-/// it calls would drop the guard.
+/// An exception of theirs terminates the process here, because one that passes the loader leaves
+/// the loader's lock locked. Ending the thread unwinds the stack, too, and terminates the process
+/// as well. The pointer is volatile because the C library declares these functions as not throwing:
+/// a compiler that knows the called function would omit the handler.
 template <class Result, class... Args>
 Result callLoader(Result (*function)(Args...), std::type_identity_t<Args>... args) noexcept {
-    Result (*const volatile unknown)(Args...) = function;
-    return unknown(args...);
+    Result (*const volatile opaque)(Args...) = function;
+    return opaque(args...);
 }
 
-/// How many libraries the process has ever mapped.
+/// Returns the number of libraries that the process has ever mapped.
 unsigned long long mappingCount() {
     unsigned long long count = 0;
     const auto takeCount = [](dl_phdr_info* library, std::size_t, void* data) {
@@ -120,7 +128,7 @@ unsigned long long mappingCount() {
     return count;
 }
 
-/// Whether a library was mapped by this very path, whatever stands there now.
+/// Returns whether a library was mapped under exactly this path, whatever file has that path now.
 bool isMappedAs(const NativePath& path) {
     const auto compareName = [](dl_phdr_info* library, std::size_t, void* data) {
         return *static_cast<const NativePath*>(data) == library->dlpi_name ? 1 : 0;
@@ -174,7 +182,7 @@ bool isSameFile(const NativePath& a, const NativePath& b) {
 
 bool openForReading(std::ifstream& stream, const NativePath& path) {
     stream.open(path, std::ios::in | std::ios::binary);
-    // A directory opens like a file here and only refuses to be read.
+    // A directory can be opened like a file here, but not read.
     std::error_code ignored;
     if (stream.good() && std::filesystem::is_directory(path, ignored)) {
         stream.close();
@@ -200,12 +208,12 @@ ExportState queryExport(const NativePath& path, const char* symbol) {
 Module loadLibrary(const NativePath& path) {
     const Module module = callLoader(::dlopen, path.c_str(), RTLD_NOW | RTLD_LOCAL);
     if (!module)
-        ::dlerror(); // The message belongs to nobody.
+        ::dlerror(); // Discards the message.
     return module;
 }
 
 UsedLibrary useLibrary(const NativePath& path, const char* symbol) {
-    // Asking first whether the library is mapped would open every file a second time.
+    // The file is checked first: asking the loader for a mapped library opens the file once more.
     const ExportState state = queryExport(path, symbol);
     if (state != ExportState::exported)
         return {isMappedAs(path) ? findLoadedLibrary(path) : nullptr, false,
@@ -214,7 +222,7 @@ UsedLibrary useLibrary(const NativePath& path, const char* symbol) {
     const Module module = loadLibrary(path);
     if (!module || mappingCount() != before)
         return {module, module != nullptr, false};
-    unloadLibrary(module); // It stays as long as whoever loaded it wants.
+    unloadLibrary(module); // The code that loaded it decides how long it stays.
     return {module, false, false};
 }
 
@@ -223,19 +231,19 @@ void unloadLibrary(Module module) {
         callLoader(::dlclose, module);
 }
 
-void keepOwnLibrary() {
-    static const Module own = [] {
+void pinThisLibrary() {
+    static const Module pinned = [] {
         Dl_info ignored;
         void* entry = nullptr;
-        const auto* here = reinterpret_cast<const void*>(&keepOwnLibrary);
+        const auto* here = reinterpret_cast<const void*>(&pinThisLibrary);
         if (::dladdr1(here, &ignored, &entry, RTLD_DL_LINKMAP) == 0)
             return Module();
-        // Never given back. The loader knows the library by this name, whatever is in the file now;
-        // a program has none.
+        // This reference is never released. The loader finds the library by this name, even if the
+        // file has been replaced. The name of a program is empty.
         const char* const name = static_cast<const link_map*>(entry)->l_name;
         return *name ? ::dlopen(name, RTLD_LAZY | RTLD_NOLOAD) : nullptr;
     }();
-    static_cast<void>(own);
+    static_cast<void>(pinned);
 }
 
 void* findSymbol(Module module, const char* symbol) {
@@ -244,7 +252,7 @@ void* findSymbol(Module module, const char* symbol) {
     void* address = ::dlsym(module, symbol);
     if (!address)
         return nullptr;
-    // The search goes through the dependencies as well, whose symbols do not count.
+    // The search includes dependencies, whose symbols do not count.
     return isCodeOf(module, address) ? address : nullptr;
 }
 

@@ -1,23 +1,26 @@
-/// A word of memory for each thread. The build chooses between this file and the one of the same
-/// name in `windows/`.
+/// A word of memory in each thread. The build selects this file or the one of the same name in
+/// `windows/`.
 #pragma once
 
 #include <cstdint>
 
 namespace Mz::platform {
 
-/// The word called `Name`, which is 0 in a new thread. Here it lies in the thread's own memory, at
-/// a distance that the loader knows, so that reading it takes no call.
+/// The thread-local word of the tag type `Name`, which is 0 in a new thread. Here it is a
+/// `thread_local` variable. A source that is compiled for the initial-exec model accesses it
+/// without a call.
 template <class Name>
 class ThreadWord {
   public:
+    /// Returns the word of the calling thread.
     static std::uintptr_t get() { return word; }
-    /// Returns false when there is no memory for it; it is 0 then.
+    /// Sets the word of the calling thread. Returns false if there is no memory for it; then it is
+    /// 0.
     static bool set(std::uintptr_t value) {
         word = value;
         return true;
     }
-    /// Gives back what the words of all threads take. To be called when the library is unloaded.
+    /// Frees the words of all threads. Call it when the library is unloaded.
     static void release() {}
 
   private:

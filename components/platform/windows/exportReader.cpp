@@ -1,4 +1,7 @@
-// The file is opened as every reader of files is: others may read, write and delete it meanwhile.
+/// Reads a library through a file handle.
+///
+/// The file is opened with all sharing modes, so that other programs may read, write and delete it
+/// meanwhile.
 #include "components/platform/windows/exportReader.h"
 
 #include "components/platform/windows/peProbe.h"
@@ -9,6 +12,7 @@ namespace Mz::platform {
 
 namespace {
 
+/// The bytes of a file, which is open during the lifetime of the object.
 class FileSource final : public ByteSource {
   public:
     explicit FileSource(const NativePath& path)
@@ -17,7 +21,7 @@ class FileSource final : public ByteSource {
                              OPEN_EXISTING, FILE_ATTRIBUTE_NORMAL, nullptr)),
           error(isOpen() ? ERROR_SUCCESS : ::GetLastError()) {
         LARGE_INTEGER value{};
-        // A pipe or a device would keep the reader waiting; it has no size.
+        // A pipe or a device has no size here, so it is never read: that could block.
         if (isOpen() && ::GetFileType(file) == FILE_TYPE_DISK && ::GetFileSizeEx(file, &value))
             fileSize = static_cast<std::uint64_t>(value.QuadPart);
     }
@@ -34,11 +38,11 @@ class FileSource final : public ByteSource {
     std::uint64_t size() const override { return fileSize; }
 
     std::size_t read(std::uint64_t offset, void* data, std::size_t length) override {
-        OVERLAPPED place{};
-        place.Offset = static_cast<DWORD>(offset);
-        place.OffsetHigh = static_cast<DWORD>(offset >> 32);
+        OVERLAPPED position{};
+        position.Offset = static_cast<DWORD>(offset);
+        position.OffsetHigh = static_cast<DWORD>(offset >> 32);
         DWORD done = 0;
-        return ::ReadFile(file, data, static_cast<DWORD>(length), &done, &place) ? done : 0;
+        return ::ReadFile(file, data, static_cast<DWORD>(length), &done, &position) ? done : 0;
     }
 
   private:

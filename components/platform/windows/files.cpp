@@ -1,3 +1,7 @@
+/// The file functions for Windows.
+///
+/// A rename with `MOVEFILE_WRITE_THROUGH` replaces a file in one step. It fails while another
+/// program has the file open, so it is retried for half a second.
 #include "components/platform/files.h"
 
 #include <windows.h>
@@ -20,7 +24,7 @@ std::error_code lastError() {
     return errorOf(::GetLastError());
 }
 
-/// A handle of the system, closed at the end.
+/// A system handle, closed at the end.
 class Handle {
   public:
     explicit Handle(HANDLE handle) : value(handle) {}
@@ -38,7 +42,7 @@ class Handle {
     HANDLE value;
 };
 
-/// Whether waiting may help: other programs, and scanners of viruses, close files again.
+/// Returns whether a retry may succeed: other programs, such as virus scanners, close files soon.
 bool isInUse(DWORD error, const std::filesystem::path& file) {
     if (error != ERROR_ACCESS_DENIED && error != ERROR_SHARING_VIOLATION)
         return false;
@@ -58,8 +62,8 @@ std::error_code createNew(const std::filesystem::path& path, std::filesystem::pe
                                                  : lastError();
 }
 
-std::error_code complete(const std::filesystem::path& path, std::optional<std::filesystem::perms>) {
-    // The only permission that is known here forbids replacing the file in the first place.
+std::error_code syncFile(const std::filesystem::path& path, std::optional<std::filesystem::perms>) {
+    // The only permission on this system is "read-only", and a read-only file cannot be replaced.
     const Handle file(::CreateFileW(path.c_str(), GENERIC_WRITE, FILE_SHARE_READ | FILE_SHARE_WRITE,
                                     nullptr, OPEN_EXISTING, FILE_ATTRIBUTE_NORMAL, nullptr));
     return file && ::FlushFileBuffers(file.get()) ? std::error_code() : lastError();
@@ -79,9 +83,9 @@ std::error_code moveOver(const std::filesystem::path& from, const std::filesyste
     }
 }
 
-std::optional<std::filesystem::path> linkText(const std::filesystem::path& path) {
-    // The head of REPARSE_DATA_BUFFER, which only the headers for drivers define, for a symlink.
-    struct Head {
+std::optional<std::filesystem::path> symlinkTarget(const std::filesystem::path& path) {
+    // The header of REPARSE_DATA_BUFFER for a symlink. Only the headers for drivers define it.
+    struct Header {
         std::uint32_t tag;
         std::uint16_t length, reserved;
         std::uint16_t substituteOffset, substituteLength, printOffset, printLength;
@@ -98,14 +102,14 @@ std::optional<std::filesystem::path> linkText(const std::filesystem::path& path)
     if (!link || !::DeviceIoControl(link.get(), FSCTL_GET_REPARSE_POINT, nullptr, 0, data.data(),
                                     static_cast<DWORD>(data.size()), &size, nullptr))
         return std::nullopt;
-    Head head{};
-    if (size < sizeof head)
+    Header header{};
+    if (size < sizeof header)
         return std::nullopt;
-    std::memcpy(&head, data.data(), sizeof head);
-    const std::size_t begin = sizeof head + head.printOffset;
-    if (head.tag != IO_REPARSE_TAG_SYMLINK || size < begin + head.printLength)
+    std::memcpy(&header, data.data(), sizeof header);
+    const std::size_t begin = sizeof header + header.printOffset;
+    if (header.tag != IO_REPARSE_TAG_SYMLINK || size < begin + header.printLength)
         return std::nullopt;
-    std::wstring text(head.printLength / sizeof(wchar_t), L'\0');
+    std::wstring text(header.printLength / sizeof(wchar_t), L'\0');
     std::memcpy(text.data(), data.data() + begin, text.size() * sizeof(wchar_t));
     return text;
 }

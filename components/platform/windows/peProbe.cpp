@@ -1,12 +1,14 @@
-// Follows the way of the system's loader: headers, sections, export directory, and a binary search
-// in the sorted table of names. The search takes the same steps as the loader's, so every entry
-// that the loader looks at for this name was found to be in bounds here, and an unsorted table
-// gives the same answer in both. The three tables must lie in the file as a whole; with that, what
-// a false count can cost is one step for each bit of the file's size.
-//
-// Addresses are mapped to the file by the sections alone. These must be laid out as linkers do it:
-// aligned, in ascending order and complete in the file. One address then has one place in the file,
-// and the loader sees the bytes that were checked here.
+/// Looks up an export in a DLL file as the loader would.
+///
+/// The check reads the headers, the sections and the export directory, and does a binary search in
+/// the sorted table of names. The search takes the same steps as the loader's. So each entry that
+/// the loader examines for this name was checked here, and an unsorted table has the same result in
+/// both. The three export tables must be in the file completely. Therefore a wrong count costs at
+/// most one step for each bit of the file's size.
+///
+/// Only the sections map addresses to file offsets. They must have the layout that linkers produce:
+/// aligned, in ascending order and complete in the file. Then each address has one offset, and the
+/// loader sees the bytes that were checked here.
 #include "components/platform/windows/peProbe.h"
 
 #include <algorithm>
@@ -27,7 +29,7 @@ struct FileHeader {
     std::uint16_t optionalSize, characteristics;
 };
 
-/// The part of the optional header that is the same for all, with 64-bit addresses.
+/// The fixed part of the optional header, with 64-bit addresses.
 struct OptionalHeader {
     std::uint16_t magic;
     std::uint16_t linkerVersion;
@@ -74,7 +76,8 @@ constexpr std::uint32_t sectorSize = 0x200;
 constexpr std::size_t exportDirectory = 0, importDirectory = 1, certificateDirectory = 4;
 constexpr std::uint64_t symbolSize = 18;
 
-/// Limits that no real library comes near. The first was the system's own for a long time.
+/// Limits that bound the work for a hostile file. Real libraries are far below them. Older versions
+/// of the system had the first one, too.
 constexpr std::size_t maximumSections = 96;
 constexpr std::size_t maximumImports = 1024;
 
@@ -84,7 +87,7 @@ class PeLibrary {
 
     bool exports(std::string_view symbol) {
         return readHeaders() && readSections() && isComplete() && readExports() &&
-               leadsToCode(ordinalOf(symbol)) && importsEnd();
+               isCodeOfLibrary(ordinalOf(symbol)) && importsAreTerminated();
     }
 
   private:
@@ -110,11 +113,11 @@ class PeLibrary {
         if (header.sectionCount > maximumSections)
             return false;
         const std::uint64_t table = optionalOffset + header.optionalSize;
-        std::uint64_t end = 0; // of what is mapped so far
+        std::uint64_t end = 0; // The end of the previous section.
         for (std::size_t index = 0; index < header.sectionCount; ++index) {
             const auto section = file.read<Section>(table + index * sizeof(Section));
             if (!section || section->address < end || section->address % pageSize ||
-                !isSound(*section))
+                !isInFile(*section))
                 return false;
             end = section->address + std::uint64_t{memorySize(*section)};
             sections.push_back(*section);
@@ -122,14 +125,15 @@ class PeLibrary {
         return end <= optional.imageSize;
     }
 
-    /// The system rounds offsets down to a sector, and maps what the file lacks as well.
-    bool isSound(const Section& section) const {
+    /// Returns whether the file contains the section completely, at an aligned offset. The system
+    /// rounds offsets down to a sector, and also maps parts that the file lacks.
+    bool isInFile(const Section& section) const {
         return section.fileSize == 0 ||
                (section.offset % sectorSize == 0 && file.reaches(section.offset, section.fileSize));
     }
 
-    /// Whether the file also has what linkers and signing tools append to the sections. The system
-    /// does not need it; a file without it was cut off.
+    /// Returns whether the file also contains the data that linkers and signing tools append after
+    /// the sections. The system does not need it, but a file without it is truncated.
     bool isComplete() {
         if (header.symbolTable && header.symbolCount) {
             const std::uint64_t strings = header.symbolTable + header.symbolCount * symbolSize;
@@ -137,25 +141,27 @@ class PeLibrary {
             if (!stringsSize || !file.reaches(strings, *stringsSize))
                 return false;
         }
-        const Directory certificates = directory(certificateDirectory); // by offset, not address
+        const Directory certificates = directory(certificateDirectory); // Its address is an offset.
         return file.reaches(certificates.address, certificates.size);
     }
 
     bool readExports() {
-        place = directory(exportDirectory);
-        if (place.size < sizeof(Exports) || !offsetOf(place.address, place.size))
+        exportRange = directory(exportDirectory);
+        if (exportRange.size < sizeof(Exports) || !offsetOf(exportRange.address, exportRange.size))
             return false;
-        table = readAt<Exports>(place.address).value_or(Exports{});
+        table = readAt<Exports>(exportRange.address).value_or(Exports{});
         return hasTable(table.functions, table.functionCount, sizeof(std::uint32_t)) &&
                hasTable(table.names, table.nameCount, sizeof(std::uint32_t)) &&
                hasTable(table.ordinals, table.nameCount, sizeof(std::uint16_t));
     }
 
+    /// Returns whether the file contains a table of `count` elements of `width` bytes.
     bool hasTable(std::uint32_t address, std::uint32_t count, std::uint64_t width) const {
         return offsetOf(address, count * width).has_value();
     }
 
-    /// Returns the position in the table of functions that belongs to the name.
+    /// Returns the index of `symbol` in the table of functions; `std::nullopt` if it is not
+    /// exported.
     std::optional<std::uint16_t> ordinalOf(std::string_view symbol) {
         std::int64_t low = 0;
         std::int64_t high = std::int64_t{table.nameCount} - 1;
@@ -176,8 +182,8 @@ class PeLibrary {
         return std::nullopt;
     }
 
-    /// Compares the name at `address` with `symbol` as `strcmp` does; nothing if the section ends
-    /// before that is decided.
+    /// Compares the name at `address` with `symbol` as `strcmp` does. Returns `std::nullopt` if the
+    /// section ends before the result is known.
     std::optional<std::strong_ordering> compare(std::uint32_t address, std::string_view symbol) {
         std::array<char, 64> text;
         const Section* section = sectionOf(address);
@@ -198,20 +204,22 @@ class PeLibrary {
         return std::nullopt;
     }
 
-    /// An address among the exports themselves is the name of another library's function.
-    bool leadsToCode(std::optional<std::uint16_t> ordinal) {
+    /// Returns whether the function is in an executable section of this library. An address inside
+    /// the export directory is not: it is the name to which the export is forwarded.
+    bool isCodeOfLibrary(std::optional<std::uint16_t> ordinal) {
         if (!ordinal || *ordinal >= table.functionCount)
             return false;
         const auto function = readAt<std::uint32_t>(table.functions + *ordinal * 4ull);
-        if (!function || (*function >= place.address && *function - place.address < place.size))
+        if (!function || (*function >= exportRange.address &&
+                          *function - exportRange.address < exportRange.size))
             return false;
         const Section* section = sectionOf(*function);
         return section && (section->flags & executableFlag);
     }
 
-    /// Whether the list of the libraries that it needs has an end, and their names have one: the
-    /// loader follows them wherever they lead.
-    bool importsEnd() {
+    /// Returns whether the list of imported libraries and their names are terminated inside the
+    /// file. The loader does not check that.
+    bool importsAreTerminated() {
         const Directory imports = directory(importDirectory);
         if (!imports.address)
             return true;
@@ -219,13 +227,14 @@ class PeLibrary {
             const auto import = readAt<Import>(imports.address + index * sizeof(Import));
             if (!import || !import->name)
                 return import.has_value();
-            if (!isText(import->name))
+            if (!isTerminated(import->name))
                 return false;
         }
         return false;
     }
 
-    bool isText(std::uint32_t address) {
+    /// Returns whether the text at `address` ends inside its section.
+    bool isTerminated(std::uint32_t address) {
         std::array<char, 256> text;
         const Section* section = sectionOf(address);
         if (!section || address - section->address >= backedSize(*section))
@@ -237,6 +246,7 @@ class PeLibrary {
                std::memchr(text.data(), '\0', length);
     }
 
+    /// Returns an entry of the table of directories; an empty one if the table is shorter.
     Directory directory(std::size_t index) {
         const std::uint64_t offset = sizeof(OptionalHeader) + index * sizeof(Directory);
         if (index >= optional.directoryCount || offset + sizeof(Directory) > header.optionalSize)
@@ -244,15 +254,17 @@ class PeLibrary {
         return file.read<Directory>(optionalOffset + offset).value_or(Directory{0, 0});
     }
 
+    /// Returns the size of the section in memory.
     static std::uint32_t memorySize(const Section& section) {
         return section.memorySize ? section.memorySize : section.fileSize;
     }
 
-    /// How much of the section comes from the file; the rest is zero.
+    /// Returns how many bytes of the section come from the file. The rest is zero.
     static std::uint32_t backedSize(const Section& section) {
         return std::min(section.fileSize, memorySize(section));
     }
 
+    /// Returns the section that contains `address`, or null.
     const Section* sectionOf(std::uint64_t address) const {
         for (const Section& section : sections)
             if (address >= section.address && address - section.address < memorySize(section))
@@ -260,7 +272,8 @@ class PeLibrary {
         return nullptr;
     }
 
-    /// Returns where the bytes at `address` lie in the file, if all of them do, in one section.
+    /// Returns the offset in the file of the `size` bytes at `address`; `std::nullopt` unless one
+    /// section contains all of them in the file.
     std::optional<std::uint64_t> offsetOf(std::uint64_t address, std::uint64_t size) const {
         const Section* section = sectionOf(address);
         if (!section)
@@ -272,6 +285,7 @@ class PeLibrary {
         return section->offset + inside;
     }
 
+    /// Returns the `T` at `address`; `std::nullopt` if it is not in the file.
     template <class T>
     std::optional<T> readAt(std::uint64_t address) {
         const std::optional<std::uint64_t> offset = offsetOf(address, sizeof(T));
@@ -283,7 +297,7 @@ class PeLibrary {
     std::uint64_t optionalOffset = 0;
     OptionalHeader optional{};
     std::vector<Section> sections;
-    Directory place{}; ///< of the export directory
+    Directory exportRange{}; ///< the address range of the export directory
     Exports table{};
 };
 

@@ -1,3 +1,8 @@
+/// The platform functions for Windows.
+///
+/// File names are wide text here, and the system ignores their letter case, so the normalised path
+/// opens a file. A library is loaded by its full path with an explicit extension, because the
+/// loader would search other folders and append ".dll" otherwise.
 #include "components/platform/platform.h"
 
 #include "components/platform/windows/exportReader.h"
@@ -14,8 +19,8 @@ namespace Mz::platform {
 
 namespace {
 
-/// The loader looks for a name that is not a full one in the program's folder first, and elsewhere;
-/// what was found is in the current one.
+/// Returns the full path of `path`, relative to the current folder. The loader would search for a
+/// relative one in the program's folder and elsewhere.
 std::wstring fullName(const NativePath& path) {
     std::wstring full(MAX_PATH, L'\0');
     while (true) {
@@ -30,8 +35,8 @@ std::wstring fullName(const NativePath& path) {
     }
 }
 
-/// The loader takes a name without an extension to mean one with ".dll" behind it; a dot at the end
-/// says that there is none.
+/// Returns the full path for the loader. The loader appends ".dll" to a name without an extension,
+/// unless the name ends with a dot.
 std::wstring loaderName(const NativePath& path) {
     const std::wstring name = fullName(path);
     const std::size_t separator = name.find_last_of(L"/\\");
@@ -41,8 +46,8 @@ std::wstring loaderName(const NativePath& path) {
     return hasExtension ? name : name + L".";
 }
 
-/// The activation context that a library carries in its own manifest, active on this thread for as
-/// long as this lives. Libraries without a manifest load in the surroundings of the caller.
+/// Activates the activation context of a library's own manifest on this thread, during the lifetime
+/// of the object. A library without a manifest is loaded in the context of the caller.
 class OwnActivationContext {
   public:
     explicit OwnActivationContext(const NativePath& path) {
@@ -93,6 +98,7 @@ class Listing {
     std::intptr_t handle;
 };
 
+/// Returns the candidates of one directory, in the order of the system.
 std::vector<DirectoryEntry> list(const NativePath& directory) {
     std::vector<DirectoryEntry> entries;
     Listing listing(directory + L"/*");
@@ -107,7 +113,7 @@ std::vector<DirectoryEntry> list(const NativePath& directory) {
     return entries;
 }
 
-/// Whether what stands there can be called.
+/// Returns whether the memory at `address` is executable.
 bool isCode(const void* address) {
     constexpr DWORD executable =
         PAGE_EXECUTE | PAGE_EXECUTE_READ | PAGE_EXECUTE_READWRITE | PAGE_EXECUTE_WRITECOPY;
@@ -141,8 +147,8 @@ bool namesIgnoreCase() {
 }
 
 std::optional<std::wstring> firstArgument() {
-    // The C runtime's wide arguments are absent in a program with a narrow `main`. In the first
-    // argument a quote only toggles, and no escape is known.
+    // The C runtime has no wide arguments in a program with a narrow `main`. In the first argument
+    // a quote only starts or ends quoting, and there are no escapes.
     std::wstring argument;
     bool quoted = false;
     for (const wchar_t* next = ::GetCommandLineW(); *next; ++next) {
@@ -205,7 +211,7 @@ Module loadLibrary(const NativePath& path) {
     const OwnActivationContext context(path);
     const HMODULE module = ::LoadLibraryW(loaderName(path).c_str());
     if (!module)
-        static_cast<void>(::GetLastError()); // The reason belongs to nobody.
+        static_cast<void>(::GetLastError()); // Discards the reason.
     return module;
 }
 
@@ -222,8 +228,8 @@ void unloadLibrary(Module module) {
         ::FreeLibrary(static_cast<HMODULE>(module));
 }
 
-// While a process ends, the system unloads nothing; until then the components keep it loaded.
-void keepOwnLibrary() {}
+// The system unloads nothing while a process ends. Until then the components keep it loaded.
+void pinThisLibrary() {}
 
 void* findSymbol(Module module, const char* symbol) {
     if (!module)
@@ -263,17 +269,18 @@ LocaleSwitch::LocaleSwitch() = default;
 
 namespace {
 
-/// Locks the switch with a system lock that owns no memory, which a mutex of the standard library
-/// does on this system.
-class SwitchGuard {
+/// Locks the shared state. Uses a system lock, because a mutex of the standard library allocates
+/// memory on this system.
+class LocaleSwitchLock {
   public:
-    explicit SwitchGuard(LocaleSwitch& shared) : handle(reinterpret_cast<PSRWLOCK>(&shared.lock)) {
+    explicit LocaleSwitchLock(LocaleSwitch& shared)
+        : handle(reinterpret_cast<PSRWLOCK>(&shared.lock)) {
         static_assert(sizeof(SRWLOCK) == sizeof shared.lock);
         ::AcquireSRWLockExclusive(handle);
     }
-    ~SwitchGuard() { ::ReleaseSRWLockExclusive(handle); }
-    SwitchGuard(const SwitchGuard&) = delete;
-    SwitchGuard& operator=(const SwitchGuard&) = delete;
+    ~LocaleSwitchLock() { ::ReleaseSRWLockExclusive(handle); }
+    LocaleSwitchLock(const LocaleSwitchLock&) = delete;
+    LocaleSwitchLock& operator=(const LocaleSwitchLock&) = delete;
 
   private:
     PSRWLOCK handle;
@@ -282,19 +289,19 @@ class SwitchGuard {
 } // namespace
 
 CLocale::CLocale(LocaleSwitch& shared) : shared(shared) {
-    const SwitchGuard guard(shared);
-    if (shared.wanted == 0) {
+    const LocaleSwitchLock guard(shared);
+    if (shared.useCount == 0) {
         const wchar_t* current = ::_wsetlocale(LC_ALL, nullptr);
         shared.previous = current ? current : L"C";
         if (shared.previous != L"C")
             ::_wsetlocale(LC_ALL, L"C");
     }
-    ++shared.wanted;
+    ++shared.useCount;
 }
 
 CLocale::~CLocale() {
-    const SwitchGuard guard(shared);
-    if (--shared.wanted > 0)
+    const LocaleSwitchLock guard(shared);
+    if (--shared.useCount > 0)
         return;
     if (shared.previous != L"C")
         ::_wsetlocale(LC_ALL, shared.previous.c_str());

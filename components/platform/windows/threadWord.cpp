@@ -1,3 +1,7 @@
+/// Thread-local words by an index of the system.
+///
+/// The index is allocated without a lock: threads that set the first value concurrently each
+/// allocate one, and all but one of them free theirs again.
 #include "components/platform/windows/threadWord.h"
 
 #include <windows.h>
@@ -6,13 +10,13 @@ namespace Mz::platform {
 
 namespace {
 
-/// Restores the caller's last error, which reading the memory of threads clears.
-class SameLastError {
+/// Preserves the caller's last error, which `TlsGetValue` clears.
+class LastErrorGuard {
   public:
-    SameLastError() : error(::GetLastError()) {}
-    ~SameLastError() { ::SetLastError(error); }
-    SameLastError(const SameLastError&) = delete;
-    SameLastError& operator=(const SameLastError&) = delete;
+    LastErrorGuard() : error(::GetLastError()) {}
+    ~LastErrorGuard() { ::SetLastError(error); }
+    LastErrorGuard(const LastErrorGuard&) = delete;
+    LastErrorGuard& operator=(const LastErrorGuard&) = delete;
 
   private:
     DWORD error;
@@ -20,31 +24,31 @@ class SameLastError {
 
 } // namespace
 
-std::uintptr_t ThreadPlace::get() const {
-    const std::uint32_t taken = place.load(std::memory_order_acquire);
+std::uintptr_t ThreadSlot::get() const {
+    const std::uint32_t taken = index.load(std::memory_order_acquire);
     if (taken == 0 || taken == released)
         return 0;
-    const SameLastError same;
+    const LastErrorGuard guard;
     return reinterpret_cast<std::uintptr_t>(::TlsGetValue(taken - 1));
 }
 
-bool ThreadPlace::set(std::uintptr_t value) {
-    const SameLastError same;
-    std::uint32_t taken = place.load(std::memory_order_acquire);
+bool ThreadSlot::set(std::uintptr_t value) {
+    const LastErrorGuard guard;
+    std::uint32_t taken = index.load(std::memory_order_acquire);
     if (taken == 0) {
-        const DWORD index = ::TlsAlloc();
-        if (index == TLS_OUT_OF_INDEXES)
+        const DWORD allocated = ::TlsAlloc();
+        if (allocated == TLS_OUT_OF_INDEXES)
             return false;
-        if (place.compare_exchange_strong(taken, index + 1, std::memory_order_acq_rel))
-            taken = index + 1;
+        if (index.compare_exchange_strong(taken, allocated + 1, std::memory_order_acq_rel))
+            taken = allocated + 1;
         else
-            ::TlsFree(index); // Another thread was faster.
+            ::TlsFree(allocated); // Another thread was faster.
     }
     return taken != released && ::TlsSetValue(taken - 1, reinterpret_cast<void*>(value)) != 0;
 }
 
-void ThreadPlace::release() {
-    const std::uint32_t taken = place.exchange(released, std::memory_order_acq_rel);
+void ThreadSlot::release() {
+    const std::uint32_t taken = index.exchange(released, std::memory_order_acq_rel);
     if (taken != 0 && taken != released)
         ::TlsFree(taken - 1);
 }

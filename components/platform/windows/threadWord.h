@@ -1,8 +1,8 @@
-/// A word of memory for each thread. The build chooses between this file and the one of the same
-/// name in `posix/`.
+/// A word of memory in each thread. The build selects this file or the one of the same name in
+/// `posix/`.
 ///
-/// The compiler's `thread_local` is no choice here: its memory stays with the thread when the
-/// library is unloaded, so it would grow with each cycle of loading and unloading.
+/// `thread_local` of this compiler is not used: its memory stays allocated in each thread after the
+/// library is unloaded, so each cycle of loading and unloading would leak.
 #pragma once
 
 #include <atomic>
@@ -10,31 +10,37 @@
 
 namespace Mz::platform {
 
-/// A place in the memory that the system keeps for each thread, taken at the first `set`.
-class ThreadPlace {
+/// An index of thread-local storage, which is allocated by the first `set`.
+class ThreadSlot {
   public:
+    /// Returns the value of the calling thread; 0 if it was never set.
     std::uintptr_t get() const;
+    /// Sets the value of the calling thread. Returns false if the system has no index or no memory
+    /// left, and after `release`.
     bool set(std::uintptr_t value);
+    /// Frees the index. All values are 0 afterwards.
     void release();
 
   private:
-    /// The system's index plus one; 0 before the first `set`, and `released` in the end.
-    std::atomic<std::uint32_t> place{0};
+    /// The system's index plus one; 0 before the first `set`, `released` after `release`.
+    std::atomic<std::uint32_t> index{0};
     static constexpr std::uint32_t released = 0xFFFFFFFF;
 };
 
-/// The word called `Name`, which is 0 in a new thread.
+/// The thread-local word of the tag type `Name`, which is 0 in a new thread.
 template <class Name>
 class ThreadWord {
   public:
-    static std::uintptr_t get() { return place.get(); }
-    /// Returns false when there is no memory for it; it is 0 then.
-    static bool set(std::uintptr_t value) { return place.set(value); }
-    /// Gives back what the words of all threads take. To be called when the library is unloaded.
-    static void release() { place.release(); }
+    /// Returns the word of the calling thread.
+    static std::uintptr_t get() { return slot.get(); }
+    /// Sets the word of the calling thread. Returns false if there is no memory for it; then it is
+    /// 0.
+    static bool set(std::uintptr_t value) { return slot.set(value); }
+    /// Frees the words of all threads. Call it when the library is unloaded.
+    static void release() { slot.release(); }
 
   private:
-    static constinit inline ThreadPlace place;
+    static constinit inline ThreadSlot slot;
 };
 
 } // namespace Mz::platform
