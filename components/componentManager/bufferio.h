@@ -50,7 +50,7 @@ class MZ_COMPONENT_MANAGER_API QrBufferedIO : public QrCastable {
     /// \param s    the stream on this IO to which the object writes itself
     /// \param a    a name for IOs that use one, or null
     /// \param b    a second name, or null
-    /// \throws QrStreamEx::ExWriteObjectImp if the IO does not write objects, as `QrInBuffer` and
+    /// \throws QrStreamEx::ExWriteObjectImp if the IO does not write objects, like `QrInBuffer` and
     ///         `QrOutBuffer`
     virtual void writeObject(const QrCastable* obj, QrStream& s, const wchar_t* a,
                              const wchar_t* b) = 0;
@@ -62,7 +62,7 @@ class MZ_COMPONENT_MANAGER_API QrBufferedIO : public QrCastable {
     /// \param a   a name as for `writeObject`, or null
     /// \param b   a second name, or null
     /// \return a reference to the object
-    /// \throws QrStreamEx::ExReadObjectImp if the IO does not read objects, as `QrInBuffer` and
+    /// \throws QrStreamEx::ExReadObjectImp if the IO does not read objects, like `QrInBuffer` and
     ///         `QrOutBuffer`
     virtual QrRef<QrCastable> readObject(QrStream& s, const QrUid* id, const wchar_t* a,
                                          const wchar_t* b) = 0;

@@ -78,7 +78,7 @@ void QrPostLoadList::loadFinished() {
     while (first) {
         const std::shared_ptr<Node> node = first;
         // During its notification an object may move this list to another one. If that list is
-        // notified too, the object is skipped; if not, the node in it holds no object any more.
+        // notified too, the object is skipped; if not, the node in it has no object any more.
         QrPtr<QrPersistant> notified;
         if (!node->beingNotified)
             notified = node->notify();

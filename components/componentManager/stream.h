@@ -177,9 +177,12 @@ class MZ_COMPONENT_MANAGER_API QrStream {
     ///
     /// **There is no `hh` and no `ll`**: a repeated `h` or `l` counts once. `%hhu` stores two
     /// bytes, past the end of an `unsigned char`, and `%lld` stores a `long` with the low 32 bits
-    /// of the number. Of the types of `<cstdint>`, 8 bits have no format: use `%d` or `%u` with an
-    /// `int` or `unsigned int`. 16 bits take `h`, 32 bits neither. `std::int64_t` is a `long` on
-    /// Linux and a `long long` on Windows: use an `int64` with `%I64d` instead.
+    /// of the number. For the types of `<cstdint>` use these formats:
+    /// - 8 bits: none. Read an `int` with `%d`, or an `unsigned int` with `%u`, and convert it.
+    /// - 16 bits: `%hd` and `%hu`.
+    /// - 32 bits: `%d` and `%u`.
+    /// - 64 bits: `%I64d` and `%I64u`, with an `int64` or `unsigned long long`. `std::int64_t` is a
+    ///   `long` on Linux and a `long long` on Windows.
     ///
     ///     int64 size = 0;
     ///     unsigned int level = 0;
@@ -202,10 +205,10 @@ class MZ_COMPONENT_MANAGER_API QrStream {
     /// operations that write the same characters, some of which cannot be read back.
     TextKind textKind() const { return currentText; }
 
-    /// Reads one whole object through the IO. An object that requested it (`postLoad`) is appended
-    /// to this stream's post-load list, after the objects read inside it. The stream does not
-    /// notify the list: `transfer` it and call `QrPostLoadList::loadFinished` when the load is
-    /// over.
+    /// Reads one whole object through the IO. If its `read` called `postLoad`, that request is
+    /// appended to this stream's post-load list, after those of the objects read inside it. The
+    /// stream does not notify the list: `transfer` it and call `QrPostLoadList::loadFinished` when
+    /// the load is over.
     ///
     /// \param uid  the interface that the object must have, or null; its meaning is up to the IO
     /// \param a    a name for IOs that use one, or null

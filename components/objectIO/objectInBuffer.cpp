@@ -19,7 +19,7 @@ namespace {
 constexpr const char* source = "components/objectIO/objectInBuffer";
 
 /// Whether the object has the interface, itself or by a translation, in the order of the casts.
-bool answersFor(QrCastable& object, const QrUid& uid) {
+bool supports(QrCastable& object, const QrUid& uid) {
     return object.hasInterface(uid) ||
            QrPtr<QrCastable>::adopt(QrTranslateInterface(&object, uid)) != nullptr;
 }
@@ -127,7 +127,7 @@ QrRef<QrCastable> QrObjectInBuffer::readObject(QrStream& s, const QrUid* id, con
     } catch (const QrComponentManagerEx& failure) {
         state->failInside(position, failure);
     }
-    if (object && id && !answersFor(*object, *id))
+    if (object && id && !supports(*object, *id))
         state->fail(__LINE__, position,
                     "the object has not the interface " + ObjectRecord::text(*id));
     reading.complete = true;

@@ -73,7 +73,7 @@ void ObjectTextOutput::check(TextKind kind, ObjectForm form, std::wstring_view t
         refuse(__LINE__, "a single wchar_t, and an array of them in text, is written as a code and "
                          "never read back: write a number instead");
     if (kind == TextKind::String && !text.empty())
-        refuse(__LINE__, "a string in text does not come back exactly: use QrWriteExactText");
+        refuse(__LINE__, "text cannot carry a string exactly: use QrWriteExactText");
     if (kind == TextKind::Value && form != ObjectForm::Binary) {
         if (!std::all_of(text.begin(), text.end(), isOfNumber))
             refuse(__LINE__, "text cannot carry an infinity or a NaN exactly");
