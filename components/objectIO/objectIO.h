@@ -130,8 +130,7 @@ class MZ_OBJECT_IO_API QrObjectOutBuffer
     /// Writes an object, or null. The names are ignored. Exceptions of the object's `write` pass
     /// through.
     ///
-    /// \throws QrStreamEx::ExWriteObject, with the position, if the object or one inside it is not
-    /// a
+    /// \throws QrStreamEx::ExWriteObject, with the position, if the object or one inside it is no
     ///         `QrPersistant` or is nested too deeply, or if an earlier object failed
     void writeObject(const QrCastable* obj, QrStream& s, const wchar_t* a,
                      const wchar_t* b) override;
@@ -195,17 +194,16 @@ class MZ_OBJECT_IO_API QrObjectInBuffer
 
     /// Reads characters, as `QrBufferedIO`.
     ///
-    /// \throws QrStreamEx::ExReadError if the characters are those of a string with a NUL or of a
-    ///         string in text form that is not empty
+    /// \throws QrStreamEx::ExReadError for a string with a NUL, a string in text form that is not
+    ///         empty, or a `bool` in text form that is neither 0 nor 1
     int readChar(wchar_t* buf, int size, int count) override;
     int readChar(wchar_t& c) override;
     using QrForwardingIO::readChar;
 
     /// Reads bytes. On a stream of both forms, skips the line end between text and the bytes.
     ///
-    /// \throws QrStreamEx::ExReadError if the line end is missing, or on a text stream: only an
-    /// array
-    ///         of `wchar_t` is read as bytes there, and its text form is different
+    /// \throws QrStreamEx::ExReadError if the line end is missing, or on a text stream, where only
+    ///         an array of `wchar_t` is read as bytes and its written form is text
     int read(void* data, int size) override;
     using QrForwardingIO::read;
 
@@ -220,7 +218,8 @@ class MZ_OBJECT_IO_API QrObjectInBuffer
 /// Writes `text` in a form that every kind of stream reads back exactly, in every locale: the
 /// number of its characters and their codes, each an `unsigned int`.
 ///
-/// \throws QrStreamEx::ExWriteError if the medium fails
+/// \throws QrStreamEx::ExWriteError if the medium fails or the text has more characters than an
+///         `unsigned int` can count
 MZ_OBJECT_IO_API void QrWriteExactText(QrStream& stream, const std::wstring& text);
 
 /// Reads what `QrWriteExactText` wrote.
