@@ -1,4 +1,4 @@
-/// The stream whose data is binary throughout.
+/// The stream that writes every value in binary form.
 #pragma once
 
 #include "components/componentManager/export.h"
@@ -6,19 +6,18 @@
 
 namespace Mz {
 
-/// A `QrStream` that writes single values as binary data too, in the form that `QrStream`
-/// describes.
+/// The binary stream: a `QrStream` that writes single values in binary form too.
 ///
-/// One type stays as in the base, on purpose: a single `wchar_t` is written as its code in decimal
-/// text, after which the next binary value starts on a new line, and can never be read; arrays of
-/// `wchar_t` are binary.
+/// `QrStream` describes the form. A single `wchar_t` is deliberately an exception: it is written as
+/// its code in decimal text, after which the next binary value begins on a new line, and it cannot
+/// be read. Arrays of `wchar_t` are binary.
 ///
-/// The characters of strings take the form that the IO gives to wide characters, which is that of
-/// the current locale: write and read them under the same one.
+/// The IO writes the characters of strings in the current locale. Read them in the same locale.
 class MZ_COMPONENT_MANAGER_API QrBinaryStream : public QrStream {
   public:
-    /// Takes a reference on the `QrBufferedIO` of `io`. Throws `QrComponentManagerEx::ExBadCast`
-    /// when it has none or is null.
+    /// Takes a reference to the `QrBufferedIO` of `io`.
+    ///
+    /// \throws QrComponentManagerEx::ExBadCast if `io` is null or has no `QrBufferedIO`
     explicit QrBinaryStream(QrCastable* io);
     ~QrBinaryStream() override;
 
@@ -42,7 +41,9 @@ class MZ_COMPONENT_MANAGER_API QrBinaryStream : public QrStream {
     QrStream& operator<<(unsigned char value) override;
     QrStream& operator<<(char value) override;
 
-    /// Each raises `QrStreamEx::ExReadError` when the value cannot be read whole.
+    /// Each reads one value.
+    ///
+    /// \throws QrStreamEx::ExReadError if the value is not complete
     QrStream& operator>>(unsigned long long& value) override;
     QrStream& operator>>(int64& value) override;
     QrStream& operator>>(std::wstring& value) override;

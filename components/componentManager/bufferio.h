@@ -1,5 +1,5 @@
-/// Bytes and characters over standard streams: what every persistent stream and every importer
-/// reads from and writes to.
+/// The byte and character layer below streams and importers, and its two implementations on
+/// standard streams.
 #pragma once
 
 #include "components/componentManager/cast.h"
@@ -12,25 +12,27 @@ namespace Mz {
 class QrStream;
 struct StandardStreams;
 
-/// The byte and character layer under streams and importers.
+/// The byte and character layer below streams and importers: the buffered IO.
 ///
-/// Narrow text is bytes in the multibyte encoding of the current C locale, wide text is `wchar_t`.
-/// While LC_CTYPE is "C" or "POSIX", byte and character code are one and the same from 0 to 255, on
-/// every platform, and larger codes cannot be written. In any other locale the C library converts;
-/// a sequence that it rejects or calls incomplete is given further bytes, up to four in all, before
-/// it is an error.
+/// **Units.** Positions and sizes are in bytes, counts in characters. A size or count below 1 reads
+/// and writes nothing, unless a comment says otherwise.
 ///
-/// The two implementations here, `QrInBuffer` and `QrOutBuffer`, work in one direction and refuse
-/// the other: reading on output raises `QrStreamEx::ExRead`, writing on input
-/// `QrStreamEx::ExWrite`. They hand whole objects to nobody: `writeObject` and `readObject` raise
-/// `ExWriteObjectImp` and `ExReadObjectImp`. Hosts that store objects bring an IO of their own.
+/// **Characters.** Narrow text is bytes in the multibyte encoding of the current C locale. Wide
+/// text is `wchar_t`. While LC_CTYPE is "C" or "POSIX", byte and character code are equal from 0 to
+/// 255, on every platform, and larger codes cannot be written. In any other locale the C library
+/// converts. If it calls a sequence invalid or incomplete, further bytes are read, up to four in
+/// all, before the sequence is an error.
 ///
-/// End of input is a result (-1, 0, a short count), never an exception. A failure of the medium
-/// raises `QrStreamEx::ExReadError` or `QrStreamEx::ExWriteError`; what was read or written before
-/// it stays so. Counts and sizes below 1 read and write nothing, where nothing else is said.
+/// **Failures.** The end of input is a result (-1, 0 or a short count), never an exception. A
+/// medium that fails throws `QrStreamEx::ExReadError` or `QrStreamEx::ExWriteError`; what was read
+/// or written before remains.
 ///
-/// An IO is used by one thread at a time. All positions and sizes are in bytes, all counts in
-/// characters. The order of the virtual operations is fixed.
+/// **Implementations.** `QrInBuffer` only reads: its write functions throw `QrStreamEx::ExWrite`.
+/// `QrOutBuffer` only writes: its read functions throw `QrStreamEx::ExRead`. Neither transfers
+/// whole objects. `QrObjectOutBuffer` and `QrObjectInBuffer` of libMZobjectIO do, and a host may
+/// have another class for that.
+///
+/// Used by one thread at a time. The order of the virtual functions is ABI.
 class MZ_COMPONENT_MANAGER_API QrBufferedIO : public QrCastable {
   public:
     using Self = QrBufferedIO;
@@ -38,16 +40,30 @@ class MZ_COMPONENT_MANAGER_API QrBufferedIO : public QrCastable {
 
     ~QrBufferedIO() override;
 
-    /// Whether users should not rely on the buffering below. False in this library.
+    /// Returns whether callers should not rely on the buffering below. False for both buffers of
+    /// this library.
     virtual bool isBufferIgnored() const = 0;
 
-    /// Writes a whole object for the stream `s`, which works on this IO. `a` and `b` are two names
-    /// that IOs which know objects may use; both may be null. No reference is kept on `obj`.
+    /// Writes a whole object.
+    ///
+    /// \param obj  the object; whether it may be null is up to the IO
+    /// \param s    the stream on this IO to which the object writes itself
+    /// \param a    a name for IOs that use one, or null
+    /// \param b    a second name, or null
+    /// \throws QrStreamEx::ExWriteObjectImp if the IO does not write objects, like `QrInBuffer` and
+    ///         `QrOutBuffer`
     virtual void writeObject(const QrCastable* obj, QrStream& s, const wchar_t* a,
                              const wchar_t* b) = 0;
 
-    /// Reads a whole object for the stream `s`. `id` names the interface that is wanted, `a` and
-    /// `b` are as for `writeObject`; each may be null.
+    /// Reads a whole object.
+    ///
+    /// \param s   the stream on this IO from which the object reads itself
+    /// \param id  the interface that the object must have, or null
+    /// \param a   a name as for `writeObject`, or null
+    /// \param b   a second name, or null
+    /// \return a reference to the object
+    /// \throws QrStreamEx::ExReadObjectImp if the IO does not read objects, like `QrInBuffer` and
+    ///         `QrOutBuffer`
     virtual QrRef<QrCastable> readObject(QrStream& s, const QrUid* id, const wchar_t* a,
                                          const wchar_t* b) = 0;
 
@@ -56,81 +72,113 @@ class MZ_COMPONENT_MANAGER_API QrBufferedIO : public QrCastable {
     /// Writes one byte.
     virtual void write(char c) = 0;
 
-    /// Reads up to `size` bytes into `data` and returns how many came. After a short count the
-    /// standard stream keeps its end-of-file state, so that `tell` answers -1, until the next read
-    /// of a single byte or character clears it.
+    /// Reads up to `size` bytes into `data`. After a short count the standard stream remains at end
+    /// of file, where `tell` returns -1, until the next read of a single byte or character.
+    ///
+    /// \return the number of bytes read
     virtual int read(void* data, int size) = 0;
-    /// Reads one byte: 0 to 255, or -1 at the end of input.
+    /// Reads one byte.
+    ///
+    /// \return 0 to 255, or -1 at the end of input
     virtual int read() = 0;
 
-    /// Writes a line end, the single byte 10 on every platform. Failures are not noticed here.
+    /// Writes a line end: the single byte 10, on every platform. Does not check for failures.
     virtual void writeEol() = 0;
-    /// Writes a space, the byte 32. Failures are not noticed here.
+    /// Writes a space: the byte 32. Does not check for failures.
     virtual void writeSpace() = 0;
 
-    /// Writes `count` wide characters and returns `count`. A character that cannot be converted
-    /// raises `ExWriteError`; those before it are written.
+    /// Writes `count` wide characters.
+    ///
+    /// \return `count`
+    /// \throws QrStreamEx::ExWriteError if a character cannot be converted; those before it are
+    ///         written
     virtual int writeChar(const wchar_t* s, int count) = 0;
-    /// Writes `size` bytes of multibyte text and returns how many characters they hold; a NUL is a
-    /// character too. Bytes that are no text raise `ExWriteError`, and nothing is written.
+    /// Writes `size` bytes of multibyte text.
+    ///
+    /// \return the number of characters in it; a NUL counts as one
+    /// \throws QrStreamEx::ExWriteError if the bytes are not valid text; none is written
     virtual int writeChar(const char* s, int size) = 0;
-    /// Writes one wide character. `ExWriteError` when it cannot be converted.
+    /// Writes one wide character.
+    ///
+    /// \throws QrStreamEx::ExWriteError if it cannot be converted
     virtual void writeChar(wchar_t c) = 0;
-    /// Writes one byte that is a character by itself. `ExWriteError` when it is not.
+    /// Writes one byte that is a whole character.
+    ///
+    /// \throws QrStreamEx::ExWriteError if it is not
     virtual void writeChar(char c) = 0;
 
-    /// Skips at most `count` characters of white space. A carriage return and line feed count as
-    /// one; a carriage return without a line feed is consumed and ends the skip.
+    /// Skips at most `count` white-space characters. A carriage return with a line feed counts as
+    /// one. A carriage return without a line feed is consumed and ends the skip.
     virtual void skipWhiteSpace(int count) = 0;
 
-    /// Reads up to the smaller of `size` and `count` wide characters into `buf`, without a
-    /// terminator, and returns how many. A NUL byte fills all that is still wanted with L'\0' and
-    /// stays unread. Four bytes that form no character raise `ExReadError`.
+    /// Reads wide characters into `buf`, at most the smaller of `size` and `count`. Appends no
+    /// terminator. A NUL byte fills the rest of the request with L'\0' and stays unread.
+    ///
+    /// \return the number of characters stored
+    /// \throws QrStreamEx::ExReadError if four bytes form no character
     virtual int readChar(wchar_t* buf, int size, int count) = 0;
-    /// Reads up to `count` whole multibyte characters into the `size` bytes at `buf`, without a
-    /// terminator, and returns how many *bytes* they take; a negative `count` sets no limit. Stops
-    /// before a NUL, which stays unread, as do the bytes of a character that did not fit. The bytes
-    /// of `buf` behind the result are undefined.
+    /// Reads whole multibyte characters into the `size` bytes at `buf`. Appends no terminator.
+    /// Stops before a NUL, which stays unread. The bytes of a character that did not fit stay
+    /// unread too.
+    ///
+    /// \param count  the largest number of characters; a negative one sets no limit
+    /// \return the number of *bytes* that the characters take. The bytes of `buf` after them are
+    ///         undefined.
+    /// \throws QrStreamEx::ExReadError if four bytes form no character
     virtual int readChar(char* buf, int size, int count) = 0;
-    /// Reads one wide character, as `readChar(&c, 1, 1)` does, and returns 1, or 0 at the end.
+    /// Reads one wide character, by `readChar(&c, 1, 1)`.
+    ///
+    /// \return 1, or 0 at the end of input
     virtual int readChar(wchar_t& c) = 0;
-    /// Reads one byte, be it a whole character or not, and returns 1, or 0 at the end.
+    /// Reads one byte, which need not be a whole character.
+    ///
+    /// \return 1, or 0 at the end of input
     virtual int readChar(char& c) = 0;
 
-    /// Puts a wide character back, to be read next. `ExReadError` when it cannot be converted or
-    /// the standard stream fails for good.
+    /// Puts a wide character back, to be read next.
+    ///
+    /// \throws QrStreamEx::ExReadError if it cannot be converted, or the standard stream does not
+    ///         take it back
     virtual void ungetc(wchar_t c) = 0;
-    /// Puts a byte back, to be read next. Failures are not noticed here.
+    /// Puts a byte back, to be read next. Does not check for failures.
     virtual void ungetc(char c) = 0;
 
-    /// Whether `tell` has an answer at this moment.
+    /// Returns whether `tell` would return a position now.
     virtual bool canSeek() const = 0;
-    /// Moves to `offset` bytes from `origin` (0 the beginning, 1 the current position, 2 the end)
-    /// and returns the new position. `seek(0, 1)` is `tell()` and cannot fail; otherwise a position
-    /// that cannot be reached, or another origin, raises `ExReadError` or `ExWriteError`.
+    /// Moves to another position. `seek(0, 1)` only calls `tell` and never throws.
+    ///
+    /// \param offset  the distance from `origin` in bytes
+    /// \param origin  0 for the beginning, 1 for the current position, 2 for the end
+    /// \return the new position
+    /// \throws QrStreamEx::ExReadError on input, QrStreamEx::ExWriteError on output, if the
+    ///         position cannot be reached or `origin` is another number
     virtual int64 seek(int64 offset, int origin) = 0;
-    /// The current position, or -1 when there is none or the stream has failed. Never throws.
+    /// Returns the current position in bytes, or -1 if there is none or the standard stream has
+    /// failed. Never throws.
     virtual int64 tell() const = 0;
 
   private:
+    /// Has no effect. Anchors the vtable in this library.
     virtual void forceVtblInstantiation();
 };
 
-/// Reads from a `std::istream` that the caller keeps alive; the buffer neither opens nor closes it.
+/// The input buffer: reads from a `std::istream`.
 ///
-/// Uncounted, and usually a local variable around one piece of work: references to it keep nothing
-/// alive. All state is the stream's.
+/// The caller owns the stream and keeps it alive; the buffer neither opens nor closes it. All state
+/// is the stream's. The buffer is not counted: references do not keep it alive. It is usually a
+/// local variable for one operation.
 ///
-/// The stream may have an exception mask: what the mask throws does not come through, and the flags
-/// decide as for any other stream. This holds under `unitbuf` too, and where the stream's buffer
-/// throws while it is flushed. A stream that is tied to another one flushes that one before each
-/// operation, as ever; if the flush fails, the tied stream gets the flag, and the operation is done
-/// all the same. During an operation the stream has neither mask, tie nor `unitbuf`; each is back
-/// when the operation returns or throws.
+/// The stream may have an exception mask, `unitbuf`, or a tied stream:
+/// - The exceptions of the mask do not pass through. The flags of the stream decide, as without a
+///   mask, also if the stream's buffer throws in a flush.
+/// - A tied stream is flushed before each operation. If that fails, only the tied stream records
+///   the failure, and the operation is carried out.
+/// - During an operation the stream has no mask, tie or `unitbuf`. They are restored before the
+///   operation returns or throws.
 class MZ_COMPONENT_MANAGER_API QrInBuffer
     : public QrCastImpl<QrInBuffer, QrBufferedIO, const QrInBuffer&> {
   public:
-    /// Only stores the pointer, which must not be null when anything is read.
+    /// Stores the pointer. It must not be null in any later operation on the stream.
     explicit QrInBuffer(std::istream* in);
     ~QrInBuffer() override;
 
@@ -166,11 +214,11 @@ class MZ_COMPONENT_MANAGER_API QrInBuffer
     std::istream* in;
 };
 
-/// Writes to a `std::ostream`, with the same rules as `QrInBuffer`.
+/// The output buffer: writes to a `std::ostream`, with the same rules as `QrInBuffer`.
 class MZ_COMPONENT_MANAGER_API QrOutBuffer
     : public QrCastImpl<QrOutBuffer, QrBufferedIO, const QrOutBuffer&> {
   public:
-    /// Only stores the pointer, which must not be null when anything is written.
+    /// Stores the pointer. It must not be null in any later operation on the stream.
     explicit QrOutBuffer(std::ostream* out);
     ~QrOutBuffer() override;
 

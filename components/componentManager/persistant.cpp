@@ -1,3 +1,7 @@
+/// Post-load lists are chains of nodes, each of which owns the next. A list knows its last node by
+/// a weak pointer, as that may move to another list or end with its notification. Objects may
+/// change the lists from within `loadFinished`: the loop keeps the current node alive, and flags in
+/// the node show what has happened to it meanwhile.
 #include "components/componentManager/persistant.h"
 
 #include <utility>
@@ -13,24 +17,24 @@ void QrPersistant::forceVtblInstantiation() {}
 struct QrPostLoadList::Node {
     QrPtr<QrPersistant> object;
     std::shared_ptr<Node> next;
-    bool beingTold = false;
-    /// No longer part of any list, though somebody may still look at it.
+    bool beingNotified = false;
+    /// Whether the node has left its list. It may still be referenced.
     bool removed = false;
 
-    /// Tells the object and gives it back, which stays when it throws.
-    QrPtr<QrPersistant> tell() {
-        struct BeingTold {
+    /// Notifies the object and returns its reference. If it throws, the node keeps the reference.
+    QrPtr<QrPersistant> notify() {
+        struct BeingNotified {
             bool& flag;
-            explicit BeingTold(bool& value) : flag(value) { flag = true; }
-            ~BeingTold() { flag = false; }
-        } const guard(beingTold);
+            explicit BeingNotified(bool& value) : flag(value) { flag = true; }
+            ~BeingNotified() { flag = false; }
+        } const guard(beingNotified);
         if (object)
             object->loadFinished();
         return std::move(object);
     }
 
-    /// Takes the node out of the list that begins with `first`, where it stands first. What follows
-    /// is not left with the node: whoever still holds that would hold, and drop, the whole chain.
+    /// Removes the node, which is the first, from the list that begins with `first`. The node does
+    /// not keep its successor: a reference to the node would keep, and free, the whole chain.
     void removeFrom(std::shared_ptr<Node>& first) {
         removed = true;
         first = std::move(next);
@@ -40,7 +44,7 @@ struct QrPostLoadList::Node {
 QrPostLoadList::QrPostLoadList() = default;
 
 QrPostLoadList::~QrPostLoadList() {
-    // One by one: each node owns the next, and a long chain would be dropped by deep recursion.
+    // One by one: each node owns the next, and freeing a long chain at once recurses deeply.
     while (first) {
         const std::shared_ptr<Node> node = first;
         node->removeFrom(first);
@@ -50,10 +54,10 @@ QrPostLoadList::~QrPostLoadList() {
 void QrPostLoadList::postLoad(QrPersistant* obj) {
     const auto added = std::make_shared<Node>();
     added->object = obj;
-    const std::shared_ptr<Node> behind = last.lock();
+    const std::shared_ptr<Node> previous = last.lock();
     std::shared_ptr<Node>* slot = &first;
-    if (behind && !behind->removed)
-        slot = &behind->next;
+    if (previous && !previous->removed)
+        slot = &previous->next;
     else
         while (*slot)
             slot = &(*slot)->next;
@@ -63,21 +67,21 @@ void QrPostLoadList::postLoad(QrPersistant* obj) {
 }
 
 void QrPostLoadList::loadFinished() {
-    if (telling)
+    if (notifying)
         return;
-    struct Telling {
+    struct Notifying {
         bool& flag;
-        explicit Telling(bool& value) : flag(value) { flag = true; }
-        ~Telling() { flag = false; }
-    } const guard(telling);
+        explicit Notifying(bool& value) : flag(value) { flag = true; }
+        ~Notifying() { flag = false; }
+    } const guard(notifying);
 
     while (first) {
         const std::shared_ptr<Node> node = first;
-        // An object may move its list to another one while it is told. If that is told as well, the
-        // object is not told a second time; if it is not, the node left there holds nobody.
-        QrPtr<QrPersistant> told;
-        if (!node->beingTold)
-            told = node->tell();
+        // During its notification an object may move this list to another one. If that list is
+        // notified too, the object is skipped; if not, the node in it has no object any more.
+        QrPtr<QrPersistant> notified;
+        if (!node->beingNotified)
+            notified = node->notify();
         if (first == node)
             node->removeFrom(first);
     }

@@ -1,4 +1,4 @@
-/// Objects that are stored, and the second pass after a load.
+/// Objects that are stored on streams, and their notification after a load.
 #pragma once
 
 #include "components/componentManager/cast.h"
@@ -12,9 +12,8 @@ class QrStream;
 
 /// The interface of objects that write themselves to a stream and read themselves back.
 ///
-/// An object that needs others to be complete before it can resolve its links to them asks for a
-/// second pass: while it is being read it calls `QrStream::postLoad(this)`, and is told
-/// `loadFinished` when the whole load is over.
+/// An object whose links need other complete objects resolves them after the load: its `read` calls
+/// `stream.postLoad(this)`, and `loadFinished` is called when the whole load is over.
 class MZ_COMPONENT_MANAGER_API QrPersistant : public QrCastable {
   public:
     using Self = QrPersistant;
@@ -22,55 +21,61 @@ class MZ_COMPONENT_MANAGER_API QrPersistant : public QrCastable {
 
     ~QrPersistant() override;
 
-    /// The identity of the object's class, not of this interface. Never null, valid for good.
+    /// Returns the identity of the object's class, not of this interface. Never null. The pointer
+    /// stays valid as long as the class's library is loaded.
     virtual const QrUid* getClassUid() const = 0;
-    /// The version of the stored form, by which `read` and its users tell old data from new.
+    /// Returns the version of the stored form, which distinguishes old data from new.
     virtual unsigned int getVersion() const = 0;
-    /// Stores the object. What the stream throws passes through.
+    /// Writes the object. Exceptions of the stream pass through.
     virtual void write(QrStream& stream) = 0;
-    /// Restores the object from what `write` stored. What the stream throws passes through.
+    /// Reads what `write` wrote. Exceptions of the stream pass through.
     virtual void read(QrStream& stream) = 0;
 
-    /// The whole load is over; the default does nothing.
+    /// Notifies the object that the whole load is over, if it requested that. The default is a
+    /// no-op.
     virtual void loadFinished();
 
   private:
+    /// Has no effect. Anchors the vtable in this library.
     virtual void forceVtblInstantiation();
 };
 
-/// The objects that want to be told when a load is over, in order.
+/// The post-load list: the objects to notify after a load, in order.
 ///
-/// Holds one reference for each entry; an object that was appended twice is told twice. Used by one
-/// thread at a time.
+/// Owns one reference for each entry. An object that was appended twice is notified twice. Used by
+/// one thread at a time.
 class MZ_COMPONENT_MANAGER_API QrPostLoadList {
   public:
     QrPostLoadList();
-    /// Drops what is left, without telling anybody.
+    /// Releases the remaining objects without notifying them.
     ~QrPostLoadList();
     QrPostLoadList(const QrPostLoadList&) = delete;
     QrPostLoadList& operator=(const QrPostLoadList&) = delete;
 
-    /// Appends `obj`, with a new reference: behind the entry that was appended last, wherever that
-    /// stands now, or at the end when there is none. Null may be appended; nobody is told for it.
+    /// Appends `obj` and takes a reference to it. The new entry follows the one appended last, even
+    /// if that is in another list by now (`transfer`); without one it goes to the end.
+    ///
+    /// \param obj  the object, or null for an entry without a notification
     void postLoad(QrPersistant* obj);
 
-    /// Tells every object in order and drops it; those that are appended meanwhile are told too. A
-    /// call from within leaves the work to the one that is running. When an object throws, it and
-    /// those behind it stay.
+    /// Notifies each object in order and releases it, also those appended meanwhile. A nested call
+    /// is a no-op: the running one continues.
+    ///
+    /// If an object throws, the exception passes through; that object and those after it remain.
     void loadFinished();
 
-    /// Moves all entries to the end of `other`. An entry that was appended last stays so for this
-    /// list: the next one appended here goes behind it, into the other list. Moving to itself does
-    /// nothing.
+    /// Moves all entries to the end of `other`. This list still appends after the entry that it
+    /// appended last, so its next entry goes into `other` too. A no-op if `other` is this list.
     void transfer(QrPostLoadList& other);
 
   private:
     struct Node;
 
     std::shared_ptr<Node> first;
-    /// The entry appended last, which may stand in another list by now; nothing once it was told.
+    /// The entry appended last, which may be in another list by now; expired after its
+    /// notification.
     std::weak_ptr<Node> last;
-    bool telling = false;
+    bool notifying = false;
 };
 
 } // namespace Mz

@@ -1,3 +1,7 @@
+/// The text half of `QrStream`: every number goes through `formattedWrite` and `formattedRead`,
+/// which derived classes may override. A separator is written late, before the next value, so that
+/// data does not end in one. Numbers in the stream's own formats skip the general formatter, and
+/// their digits go straight to the standard buffer where the caller cannot tell the difference.
 #include "components/componentManager/stream.h"
 
 #include "components/componentManager/buffers/directBuffer.h"
@@ -17,10 +21,10 @@ namespace {
 
 constexpr const char* source = "components/componentManager/stream";
 
-/// A line of text is ended by the next separator once it is longer than this.
+/// After a line longer than this, the next separator is a line end.
 constexpr int longestLine = 70;
 
-/// Ends a list of arguments, also when an exception leaves.
+/// Scope of a list of arguments: calls `va_end` also after an exception.
 class EndOfArguments {
   public:
     explicit EndOfArguments(std::va_list& arguments) : list(arguments) {}
@@ -32,8 +36,8 @@ class EndOfArguments {
     std::va_list& list;
 };
 
-/// Names what is written or read for as long as it exists, unless there is a name already: the
-/// operators call `formattedWrite` and `formattedRead`.
+/// Scope of a text kind. The outermost scope decides, because the operators call `formattedWrite`
+/// and `formattedRead`.
 class TextScope {
   public:
     using Kind = QrStream::TextKind;
@@ -109,7 +113,7 @@ int QrStream::formattedWrite(const wchar_t* format, ...) {
     std::va_list arguments;
     va_start(arguments, format);
     const EndOfArguments end(arguments);
-    char number[1 + longestNumberText]; // A separator goes before it.
+    char number[1 + longestNumberText]; // The first place is for a separator.
     char* numberEnd = number + 1;
     const NumberText kind = formatNumber(numberEnd, format, arguments);
     if (kind == NumberText::DoesNotFit)
@@ -298,8 +302,8 @@ QrStream& QrStream::operator>>(unsigned char& value) {
 }
 
 QrStream& QrStream::operator>>(wchar_t& value) {
-    // A format without a conversion character assigns nothing: a character's code cannot be read
-    // back, on purpose.
+    // A format without a conversion character assigns nothing: deliberately, the code of a
+    // character cannot be read back.
     return readFormatted(L"%w", value);
 }
 
@@ -331,14 +335,14 @@ QrStream& QrStream::operator>>(std::wstring& value) {
 }
 
 bool QrStream::readCharacters(std::wstring& value, int length) {
-    // A length is only a claim: memory grows with the characters that arrive.
+    // The length is not trusted: memory grows with the characters that arrive.
     constexpr int chunk = 64 * 1024;
     constexpr int longestFill = 1024 * 1024;
     if (length < 0)
         return false;
     value.clear();
     int done = 0;
-    do { // Once at least: an IO of somebody else's is asked for an empty text as well.
+    do { // At least once: a foreign IO is called for an empty string too.
         const int wanted = std::min(chunk, length - done);
         value.resize(static_cast<std::size_t>(done) + static_cast<std::size_t>(wanted));
         wchar_t* arrived = value.data() + done;
@@ -349,7 +353,8 @@ bool QrStream::readCharacters(std::wstring& value, int length) {
             return false;
         }
         done += wanted;
-        // A NUL byte is never consumed and would fill any length.
+        // A NUL byte is never consumed and would fill any length, so a long run of them ends the
+        // read.
         if (done > longestFill &&
             std::all_of(arrived, arrived + wanted, [](wchar_t c) { return c == L'\0'; }))
             return false;

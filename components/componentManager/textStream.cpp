@@ -1,3 +1,6 @@
+/// Each array is a sequence of single values. Writing calls the base's `<<` by name. Reading does
+/// not call `>>`, which throws: here the end of the input is a short count. Numbers are read by
+/// `formattedRead` with the format of the type.
 #include "components/componentManager/textStream.h"
 
 namespace Mz {
@@ -27,7 +30,7 @@ int QrTextStream::readText(const wchar_t* format, T& values, int count) {
     return readThrough<T, T>(format, values, count);
 }
 
-/// Reads each value as a `Number`, for which there is a format, and stores its low bits.
+/// Reads each value as a `Number`, a type that has a format, and stores its low bits.
 template <class T, class Number>
 int QrTextStream::readThrough(const wchar_t* format, T& values, int count) {
     int done = 0;

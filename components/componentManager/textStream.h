@@ -1,4 +1,4 @@
-/// The stream whose data is text throughout.
+/// The stream that writes every value as text.
 #pragma once
 
 #include "components/componentManager/export.h"
@@ -6,14 +6,16 @@
 
 namespace Mz {
 
-/// A `QrStream` that writes and reads counted values as text too, in the form that `QrStream`
-/// describes, edges included: readable, separated by blanks, the same under every locale.
+/// The text stream: a `QrStream` that writes and reads arrays as text too.
 ///
-/// One operation stays as in the base, on purpose: counted reading of `wchar_t` is binary.
+/// The text is legible, separated by blanks, and its numbers do not depend on the locale.
+/// `QrStream` describes the form and its special cases. An array of `wchar_t` is written as text
+/// but, deliberately, read as binary data.
 class MZ_COMPONENT_MANAGER_API QrTextStream : public QrStream {
   public:
-    /// Takes a reference on the `QrBufferedIO` of `io`. Throws `QrComponentManagerEx::ExBadCast`
-    /// when it has none or is null.
+    /// Takes a reference to the `QrBufferedIO` of `io`.
+    ///
+    /// \throws QrComponentManagerEx::ExBadCast if `io` is null or has no `QrBufferedIO`
     explicit QrTextStream(QrCastable* io);
     ~QrTextStream() override;
 
@@ -22,6 +24,7 @@ class MZ_COMPONENT_MANAGER_API QrTextStream : public QrStream {
     using QrStream::read;
     using QrStream::write;
 
+    /// Each writes `count` values, as `<<` does; a count below 1 writes nothing.
     void write(const unsigned long long& values, int count) override;
     void write(const int64& values, int count) override;
     void write(const std::wstring& values, int count) override;
@@ -38,8 +41,10 @@ class MZ_COMPONENT_MANAGER_API QrTextStream : public QrStream {
     void write(const wchar_t& values, int count) override;
     void write(const char& values, int count) override;
 
-    /// Each stops at the first value that cannot be read and returns how many could. Strings whose
-    /// characters run short raise `QrStreamEx::ExReadError`.
+    /// Each reads up to `count` values and stops at the first that cannot be read.
+    ///
+    /// \return the number of values read
+    /// \throws QrStreamEx::ExReadError if a string has fewer characters than its length
     int read(unsigned long long& values, int count) override;
     int read(int64& values, int count) override;
     int read(std::wstring& values, int count) override;

@@ -1,3 +1,6 @@
+/// Exact text is a sequence of numbers, because numbers are the one thing that every kind of stream
+/// carries exactly in every locale. The codes are those of whole characters: surrogate pairs are
+/// joined when written and split when read where `wchar_t` has 16 bits, so files are portable.
 #include "components/objectIO/objectIO.h"
 
 #include <cstdint>
@@ -9,8 +12,7 @@ namespace {
 
 constexpr const char* source = "components/objectIO/exactText";
 
-/// Where `wchar_t` has 16 bits, two of them make up a character beyond those; on streams it is one
-/// code, as it is where `wchar_t` has 32.
+/// Whether characters beyond 16 bits are surrogate pairs. On streams each is one code.
 constexpr bool wideCharactersArePairs = sizeof(wchar_t) == 2;
 
 bool isHighHalf(std::uint32_t code) {
@@ -40,7 +42,7 @@ void append(std::wstring& text, std::uint32_t code) {
         return;
     }
     if (code > 0x10FFFF)
-        throw QrStreamEx::ExReadError(source, __LINE__, "a character that does not exist");
+        throw QrStreamEx::ExReadError(source, __LINE__, "the code of a character is above 10FFFF");
     text += static_cast<wchar_t>(0xD800 + ((code - 0x10000) >> 10));
     text += static_cast<wchar_t>(0xDC00 + ((code - 0x10000) & 0x3FF));
 }
@@ -59,7 +61,7 @@ void QrWriteExactText(QrStream& stream, const std::wstring& text) {
 std::wstring QrReadExactText(QrStream& stream) {
     std::uint32_t count = 0;
     stream >> count;
-    std::wstring text; // Grows with what arrives: the count is only a claim.
+    std::wstring text; // Grows with the data that arrives, because the count is not trusted.
     for (; count > 0; --count) {
         std::uint32_t code = 0;
         stream >> code;

@@ -1,3 +1,6 @@
+/// Forwards every operation to the inner IO, one call for one call, so that a derived class that
+/// overrides some operations leaves the calls of the others as they are. The reference keeps a
+/// counted inner IO alive.
 #include "components/objectIO/objectIO.h"
 
 namespace Mz {

@@ -1,7 +1,7 @@
-/// Whole objects on streams: what the library's own buffers refuse to do.
+/// Buffered IO for whole objects, which `QrInBuffer` and `QrOutBuffer` do not transfer.
 ///
-/// Put one of these between a stream and the buffer under it, and `stream << object` and
-/// `stream.readObject(…)` work. Saving:
+/// Put one of these classes between a stream and its buffer to use `stream << object` and
+/// `stream.readObject(…)`. Saving:
 ///
 ///     std::ofstream file("scene.bin", std::ios::binary);
 ///     QrOutBuffer bytes(&file);
@@ -20,28 +20,28 @@
 ///     stream.transfer(list);
 ///     list.loadFinished();
 ///
-/// An object is stored with the identity and version of its class (`QrPersistant`) and made again
-/// by the component manager's builder of that identity. An object that is reached twice is stored
-/// once and comes back as one; cycles and null are fine. An object that is still being read may
-/// already be handed to others, so resolve links in `loadFinished`, not while reading.
+/// **Identity.** An object is stored with the identity and version of its class (`QrPersistant`).
+/// The component manager's builder of that identity makes it again. An object that is reached twice
+/// is stored once and read as one object. Cycles and null are allowed. Other objects may receive an
+/// object that is still being read, so resolve links in `loadFinished`, not in `read`.
 ///
-/// **What comes back.** Every kind of stream carries numbers, `bool`, objects, and strings written
-/// with `QrWriteExactText`. Inside an object, what would not be read back as it was raises
+/// **Values.** Every kind of stream carries numbers, `bool`, objects, and strings written with
+/// `QrWriteExactText`. Inside an object, a value that would not be read back exactly throws
 /// `QrStreamEx::ExWriteError` when it is written:
-/// - in text, a string that is not empty, an array of `wchar_t`, infinities and NaNs;
-/// - everywhere, a single `wchar_t`;
-/// - a character without a form in the locale, and L'\0', in strings and formatted text. Read
-///   strings in the locale in which they were written.
+/// - in text, a string that is not empty, an array of `wchar_t`, an infinity or a NaN;
+/// - in every form, a single `wchar_t`;
+/// - in strings and formatted text, L'\0' and a character that the locale lacks. Read strings in
+///   the locale in which they were written.
 ///
-/// **Formatted text.** `formattedWrite` needs no separator after its text: where a value follows,
-/// the IO writes a blank. Formatted text directly after formatted text, without white space between
-/// them, and the words "inf" and "nan" in it are refused. On a binary stream nothing of this is
-/// done: there the format itself must end what it writes.
+/// **Formatted text.** `formattedWrite` needs no separator after its text: the IO writes a blank
+/// before the next value. Formatted text directly after formatted text, without white space between
+/// them, throws `ExWriteError`, as do the words "inf" and "nan" in it. None of this applies to
+/// binary streams: there the format itself must end its text.
 ///
 /// **Streams of both forms.** A stream of a class derived from `QrStream` itself, neither text nor
-/// binary, writes single values as text and counted ones as binary data. Inside an object the IO
-/// puts a line end between the two and skips it when it reads; formatted text before binary data
-/// must not end in white space.
+/// binary, writes single values as text and arrays as binary data. Inside an object the IO writes a
+/// line end between the two and skips it when it reads. Formatted text before binary data must not
+/// end in white space.
 #pragma once
 
 #include "components/componentManager/stream.h"
@@ -53,17 +53,18 @@
 
 namespace Mz {
 
-/// Objects may be nested in one another to this depth. More is an error, where it would else be an
-/// overflow of the stack; long chains are written as a list of their elements.
+/// The largest depth to which objects may be nested in one another. More throws, to prevent an
+/// overflow of the stack. Write a long chain as a list of its elements.
 ///
-/// The depth bounds reading and writing. It does not bound how objects hold one another: siblings
-/// may form a chain of any length, each holding the one before. A chain that is dropped at its
-/// unheld end is freed by recursion, one destructor inside the other, and a long one overflows the
-/// stack. The IO objects here free what they hold one by one, also after a failure; a host that
-/// drops the graph after them must unlink long chains in a loop.
+/// The limit applies to reading and writing, not to references between objects: siblings may form a
+/// chain of any length, each with a reference to the one before. Releasing such a chain at its
+/// unreferenced end recurses, one destructor inside the other, and a long one overflows the stack.
+/// The IO objects release their objects one by one, also after a failure. A host that releases the
+/// objects after them must unlink long chains in a loop.
 inline constexpr int QrMaximumObjectDepth = 500;
 
-/// An IO that leaves everything to another one, on which it holds a reference.
+/// A buffered IO that forwards every call to another one, to which it owns a reference. A base for
+/// an IO that changes single operations.
 class MZ_OBJECT_IO_API QrForwardingIO : public QrBufferedIO {
   public:
     bool isBufferIgnored() const override;
@@ -93,44 +94,58 @@ class MZ_OBJECT_IO_API QrForwardingIO : public QrBufferedIO {
     int64 tell() const override;
 
   protected:
-    /// Throws `QrComponentManagerEx::ExBadCast` when `io` is null or no `QrBufferedIO`.
+    /// Takes a reference to the `QrBufferedIO` of `io`.
+    ///
+    /// \throws QrComponentManagerEx::ExBadCast if `io` is null or has no `QrBufferedIO`
     explicit QrForwardingIO(QrCastable* io);
     ~QrForwardingIO() override;
 
+    /// Returns the IO that receives the calls.
     QrBufferedIO& inner() const { return *target; }
 
   private:
     QrPtr<QrBufferedIO> target;
 };
 
-/// Writes whole objects. Not counted; lives as long as the stream over it needs it.
+/// The IO that writes whole objects.
 ///
-/// Holds a reference on every object that was written, until it is destroyed: what was stored is
-/// known by its address, which must not pass to another object meanwhile. References are dropped in
-/// the reverse of the order in which the objects were complete.
+/// Not counted: the caller keeps it alive as long as the stream on it.
 ///
-/// After a failure inside an object nothing more can be written through this IO: what came before
-/// is complete, the object is not. An object that is refused before anything of it was written
-/// leaves this IO as it was.
+/// Owns a reference to every object that it has written, until it is destroyed: objects are
+/// identified by address, which must not be reused meanwhile. It releases them in the reverse of
+/// the order in which they were complete.
+///
+/// After a failure inside an object, every further write of an object throws. The data before that
+/// object is complete, the object is not. An object that is rejected before any of it was written
+/// does not change this IO.
 class MZ_OBJECT_IO_API QrObjectOutBuffer
     : public QrCastImpl<QrObjectOutBuffer, QrForwardingIO, const QrObjectOutBuffer&> {
   public:
+    /// Takes a reference to the `QrBufferedIO` of `io`, which receives the bytes and characters.
+    ///
+    /// \throws QrComponentManagerEx::ExBadCast if `io` is null or has no `QrBufferedIO`
     explicit QrObjectOutBuffer(QrCastable* io);
     ~QrObjectOutBuffer() override;
 
-    /// Raises `QrStreamEx::ExWriteObject`, with the position, when the object (or one in it) is no
-    /// `QrPersistant`, is nested too deeply, or an earlier object failed; and whatever the object's
-    /// own writing raises.
+    /// Writes an object, or null. The names are ignored. Exceptions of the object's `write` pass
+    /// through.
+    ///
+    /// \throws QrStreamEx::ExWriteObject, with the position, if the object or one inside it is no
+    ///         `QrPersistant` or is nested too deeply, or if an earlier object failed
     void writeObject(const QrCastable* obj, QrStream& s, const wchar_t* a,
                      const wchar_t* b) override;
 
-    /// Raises `QrStreamEx::ExWriteError` for text that cannot be read back. Inside an object, ends
-    /// formatted text with a blank before the next value.
+    /// Writes characters. Inside an object, writes a blank between formatted text and a value.
+    ///
+    /// \return `count`
+    /// \throws QrStreamEx::ExWriteError if the text cannot be read back
     int writeChar(const wchar_t* s, int count) override;
     using QrForwardingIO::writeChar;
 
-    /// Inside an object on a stream that is neither text nor binary throughout, begins on a new
-    /// line after text.
+    /// Writes bytes. Inside an object, on a stream of both forms, writes a line end between text
+    /// and the bytes.
+    ///
+    /// \throws QrStreamEx::ExWriteError if formatted text before them ends in white space
     void write(const void* data, int size) override;
     using QrForwardingIO::write;
     void writeEol() override;
@@ -143,35 +158,52 @@ class MZ_OBJECT_IO_API QrObjectOutBuffer
     std::unique_ptr<State> state;
 };
 
-/// Reads whole objects. Not counted; lives as long as the stream over it needs it. Holds a
-/// reference on every object that was read, until it is destroyed; references are dropped in the
-/// reverse of the order in which the objects were complete.
+/// The IO that reads whole objects.
+///
+/// Not counted: the caller keeps it alive as long as the stream on it. Owns a reference to every
+/// object that it has read, until it is destroyed. It releases them in the reverse of the order in
+/// which they were complete.
 class MZ_OBJECT_IO_API QrObjectInBuffer
     : public QrCastImpl<QrObjectInBuffer, QrForwardingIO, const QrObjectInBuffer&> {
   public:
+    /// Takes a reference to the `QrBufferedIO` of `io`, which supplies the bytes and characters.
+    ///
+    /// \throws QrComponentManagerEx::ExBadCast if `io` is null or has no `QrBufferedIO`
     explicit QrObjectInBuffer(QrCastable* io);
     ~QrObjectInBuffer() override;
 
-    /// The object as its principal interface; null when null was written. When `id` is given, the
-    /// object answers for it, by itself or through a translation.
+    /// Reads an object. Other exceptions of the object's code pass through unchanged.
     ///
-    /// Raises `QrStreamEx::ExReadObject`, whose reason names the position and what is wrong there:
-    /// no object begins here, a class that no builder makes, an object of another class or version,
-    /// data that ends or fails inside an object, a bad cast in it, an object that read less or more
-    /// than was written, objects nested too deeply, an object without the interface wanted. What
-    /// else an object's own code throws passes through unchanged. After either, nothing more can be
-    /// read through this IO, and what the stream has for `transfer` is of no use: objects of the
-    /// load that failed may be among it.
+    /// After any exception, every further read of an object throws. Do not notify the post-load
+    /// list of the stream then: it may contain objects of the load that failed.
+    ///
+    /// \param s   the stream on this IO
+    /// \param id  the interface that the object must have, itself or by a translation, or null
+    /// \return the object as its principal interface, or null if null was written
+    /// \throws QrStreamEx::ExReadObject if
+    ///         - no object begins here,
+    ///         - no builder makes its class, or makes objects of another class or version,
+    ///         - the data ends or fails inside the object, or a cast in it fails,
+    ///         - the object reads less or more than was written,
+    ///         - objects are nested too deeply,
+    ///         - the object does not have the interface `id`, or
+    ///         - an earlier object failed.
+    ///         The reason names the position and the fault.
     QrRef<QrCastable> readObject(QrStream& s, const QrUid* id, const wchar_t* a,
                                  const wchar_t* b) override;
 
-    /// Raises `QrStreamEx::ExReadError` for a string in the text form of a stream, or with a NUL.
+    /// Reads characters, as `QrBufferedIO`.
+    ///
+    /// \throws QrStreamEx::ExReadError for a string with a NUL, a string in text form that is not
+    ///         empty, or a `bool` in text form that is neither 0 nor 1
     int readChar(wchar_t* buf, int size, int count) override;
     int readChar(wchar_t& c) override;
     using QrForwardingIO::readChar;
 
-    /// Raises `QrStreamEx::ExReadError` for an array of `wchar_t` in the text form of a stream,
-    /// which has none. Skips the line end that a writer puts between text and binary data.
+    /// Reads bytes. On a stream of both forms, skips the line end between text and the bytes.
+    ///
+    /// \throws QrStreamEx::ExReadError if the line end is missing, or on a text stream, where only
+    ///         an array of `wchar_t` is read as bytes and its written form is text
     int read(void* data, int size) override;
     using QrForwardingIO::read;
 
@@ -183,12 +215,18 @@ class MZ_OBJECT_IO_API QrObjectInBuffer
     std::unique_ptr<State> state;
 };
 
-/// Writes `text` in a form that every kind of stream gives back exactly, in every locale: its
-/// length, then the code of each character, all as `unsigned int`.
+/// Writes `text` in a form that every kind of stream reads back exactly, in every locale: the
+/// number of its characters and their codes, each an `unsigned int`.
+///
+/// \throws QrStreamEx::ExWriteError if the medium fails or the text has more characters than an
+///         `unsigned int` can count
 MZ_OBJECT_IO_API void QrWriteExactText(QrStream& stream, const std::wstring& text);
 
-/// Reads what `QrWriteExactText` wrote. `QrStreamEx::ExReadError` when it is cut, or has a
-/// character that this platform's `wchar_t` cannot hold.
+/// Reads what `QrWriteExactText` wrote.
+///
+/// \return the text
+/// \throws QrStreamEx::ExReadError if it is not complete, or has a character that the platform's
+///         `wchar_t` cannot represent
 MZ_OBJECT_IO_API std::wstring QrReadExactText(QrStream& stream);
 
 } // namespace Mz

@@ -1,3 +1,8 @@
+/// Reads object records (objectRecord.h). A new object is in the table before it reads itself, so
+/// that an object inside it can refer back to it. Nested objects pass through `readObject` again;
+/// each level restores the stream and form of the level around it. A failure is explained once, at
+/// each level with the position of that level's object, and stops all later reads: after it the
+/// position in the data is unknown.
 #include "components/componentManager/componentImp.h"
 #include "components/objectIO/objectIO.h"
 #include "components/objectIO/objectRecord.h"
@@ -13,13 +18,13 @@ namespace {
 
 constexpr const char* source = "components/objectIO/objectInBuffer";
 
-/// As the casts ask: the object itself, then the translations.
-bool answersFor(QrCastable& object, const QrUid& uid) {
+/// Whether the object has the interface, itself or by a translation, in the order of the casts.
+bool supports(QrCastable& object, const QrUid& uid) {
     return object.hasInterface(uid) ||
            QrPtr<QrCastable>::adopt(QrTranslateInterface(&object, uid)) != nullptr;
 }
 
-/// A string in the text form of a stream, of which only the empty one is written.
+/// Reads a string in text form. Only the empty one is written.
 int readTextString(QrBufferedIO& io, wchar_t* buf, int size, int count) {
     if (size > 0)
         throw QrStreamEx::ExReadError(source, __LINE__,
@@ -29,7 +34,7 @@ int readTextString(QrBufferedIO& io, wchar_t* buf, int size, int count) {
 }
 
 int readTextBool(QrBufferedIO& io, wchar_t* digit) {
-    // A separator may come before it, which the stream does not skip.
+    // The stream does not skip the separator that may precede it.
     io.skipWhiteSpace(1);
     const int got = io.readChar(digit, 1, 1);
     if (got == 1 && *digit != L'0' && *digit != L'1')
@@ -40,15 +45,15 @@ int readTextBool(QrBufferedIO& io, wchar_t* digit) {
 } // namespace
 
 struct QrObjectInBuffer::State {
-    /// All objects; some may still be being read.
+    /// All objects, including those that are still being read.
     using Objects = ObjectTable<QrRef<QrCastable>>;
     Objects objects;
     int depth = 0;
-    const QrStream* stream = nullptr; ///< the one that reads an object
+    const QrStream* stream = nullptr; ///< the stream that reads an object; null outside objects
     ObjectForm form = ObjectForm::Binary;
-    bool readText = false; ///< whether what was read last is text
+    bool readText = false; ///< whether the last read was of text
     bool failed = false;
-    std::string explanation; ///< what the last failure has said, where and what
+    std::string explanation; ///< the reason of the last failure: position and fault
 
     QrStream::TextKind textKind() const {
         return stream ? stream->textKind() : QrStream::TextKind::Other;
@@ -60,13 +65,13 @@ struct QrObjectInBuffer::State {
         throw QrStreamEx::ExReadObject(source, line, explanation.c_str());
     }
 
-    /// Whether a failure is one of these on its way out.
+    /// Whether `fail` threw this exception, at this level or inside it.
     bool hasExplained(const ExBase& failure) const {
         return !explanation.empty() &&
                std::string_view(failure.getReason()).starts_with(explanation);
     }
 
-    /// What passes through an object's own code, told with the place of the object.
+    /// Throws the exception of an object's code again, with the position of the object.
     [[noreturn]] void failInside(int64 position, const ExBase& failure) {
         fail(__LINE__, position,
              std::string("inside the object that begins here: ") + failure.getReason());
@@ -90,7 +95,7 @@ QrRef<QrCastable> QrObjectInBuffer::readObject(QrStream& s, const QrUid* id, con
     const int64 position = inner().tell();
     if (state->failed)
         state->fail(__LINE__, position, "an earlier object failed");
-    // Until all is well, the object counts as failed.
+    // The object counts as failed until it is complete.
     struct Reading {
         State& state;
         const QrStream* const previousStream;
@@ -122,7 +127,7 @@ QrRef<QrCastable> QrObjectInBuffer::readObject(QrStream& s, const QrUid* id, con
     } catch (const QrComponentManagerEx& failure) {
         state->failInside(position, failure);
     }
-    if (object && id && !answersFor(*object, *id))
+    if (object && id && !supports(*object, *id))
         state->fail(__LINE__, position,
                     "the object has not the interface " + ObjectRecord::text(*id));
     reading.complete = true;
@@ -149,7 +154,7 @@ QrRef<QrCastable> QrObjectInBuffer::readNewObject(QrStream& s, std::uint32_t num
     QrUid classUid{};
     std::uint32_t version = 0;
     s >> classUid >> version;
-    // This reference keeps the object alive while its own code runs, whatever that does with it.
+    // Keeps the object alive while its code runs, whatever the code does with other references.
     const QrRef<QrCastable> object = QrGetComponentManager()->createObject(classUid);
     const QrPtr<QrPersistant> persistant = queryCast<QrPersistant>(object.get());
     if (!persistant)
@@ -175,7 +180,8 @@ QrRef<QrCastable> QrObjectInBuffer::readNewObject(QrStream& s, std::uint32_t num
 }
 
 int QrObjectInBuffer::readChar(wchar_t* buf, int size, int count) {
-    // Only strings are read without a limit of characters, and only a bool is read as one.
+    // The operation shows in the arguments: only strings are read without a limit of characters,
+    // and only a bool as a single one.
     constexpr int noLimit = 0x7fffffff;
     const bool isText = state->form == ObjectForm::Text;
     const QrStream::TextKind kind = state->textKind();

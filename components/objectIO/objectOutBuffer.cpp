@@ -1,3 +1,7 @@
+/// Writes object records (objectRecord.h). Each object gets its number before it writes itself, so
+/// that an object inside it can refer back to it. Nested objects pass through `writeObject` again;
+/// each level restores the stream and form of the level around it. Checks that reject an object run
+/// before any of it is written; a failure after that stops all later writes.
 #include "components/objectIO/objectIO.h"
 #include "components/objectIO/objectRecord.h"
 #include "components/objectIO/objectTable.h"
@@ -24,9 +28,9 @@ struct QrObjectOutBuffer::State {
     /// The numbers of the objects, by principal object.
     std::unordered_map<const QrCastable*, std::uint32_t> numbers;
     using Objects = ObjectTable<QrCPtr<QrCastable>>;
-    Objects kept;
+    Objects objects;
     int depth = 0;
-    const QrStream* stream = nullptr; ///< the one that writes an object
+    const QrStream* stream = nullptr; ///< the stream that writes an object; null outside objects
     ObjectForm form = ObjectForm::Binary;
     ObjectTextOutput text;
     bool failed = false;
@@ -35,12 +39,12 @@ struct QrObjectOutBuffer::State {
         return stream ? stream->textKind() : QrStream::TextKind::Other;
     }
 
-    /// Gives the next number to an object, which is written while the result exists.
+    /// Gives the next number to an object. The result exists while the object is written.
     Objects::Entry add(const QrCastable* principal) {
-        const auto number = static_cast<std::uint32_t>(kept.size() + 1);
+        const auto number = static_cast<std::uint32_t>(objects.size() + 1);
         const auto place = numbers.emplace(principal, number).first;
         try {
-            return Objects::Entry(kept, QrCPtr<QrCastable>(principal));
+            return Objects::Entry(objects, QrCPtr<QrCastable>(principal));
         } catch (...) {
             numbers.erase(place);
             throw;
@@ -60,24 +64,24 @@ void QrObjectOutBuffer::writeObject(const QrCastable* obj, QrStream& s, const wc
     const QrCastable* principal = obj ? obj->getCastable() : nullptr;
     const auto known = state->numbers.find(principal);
     const bool isNew = principal && known == state->numbers.end();
-    // What is new must be fit for writing, before anything of it is written.
+    // A new object is checked before any of it is written: a rejection must leave the IO usable.
     const QrPtr<QrPersistant> object =
         isNew ? queryCast<QrPersistant>(const_cast<QrCastable*>(obj)) : nullptr;
     if (isNew && !object)
         fail(inner(), __LINE__, "the object is not persistent");
     if (isNew && state->depth >= QrMaximumObjectDepth)
         fail(inner(), __LINE__, "objects are nested too deeply");
-    if (isNew && state->kept.size() == std::numeric_limits<std::uint32_t>::max())
+    if (isNew && state->objects.size() == std::numeric_limits<std::uint32_t>::max())
         fail(inner(), __LINE__, "there are too many objects");
 
     if (!isNew)
         return writeRecord(s, principal ? known->second : ObjectRecord::null, nullptr);
     const State::Objects::Entry entry = state->add(principal);
-    writeRecord(s, static_cast<std::uint32_t>(state->kept.size()), object.get());
+    writeRecord(s, static_cast<std::uint32_t>(state->objects.size()), object.get());
 }
 
 void QrObjectOutBuffer::writeRecord(QrStream& s, std::uint32_t number, QrPersistant* object) {
-    // Until the record is whole, it counts as failed.
+    // The record counts as failed until it is complete.
     struct Writing {
         State& state;
         const QrStream* const previousStream;

@@ -1,16 +1,16 @@
-/// How an object stands on a stream.
+/// The form of an object on a stream.
 ///
 ///     number                 0 for null, a known number for an object that was stored before, the
 ///                            next number for a new one, which then follows:
 ///       class identity       four words
 ///       version
 ///       …                    what the object writes
-///     end mark               tells that the object read exactly what it had written
+///     end mark               shows that the object has read exactly what it wrote
 ///
-/// Null and known objects have an end mark only where they stand in no other object: inside one,
-/// the mark of that object guards them too.
+/// Null and known objects have an end mark only outside other objects: inside one, the mark of that
+/// object covers them too.
 ///
-/// Every word is an `unsigned int` of the stream, so the record has the stream's own form.
+/// Every word is an `unsigned int` of the stream, so the record has the form of the stream.
 #pragma once
 
 #include "components/objectIO/objectIO.h"
@@ -22,14 +22,15 @@ namespace Mz::ObjectRecord {
 
 constexpr std::uint32_t null = 0;
 
+/// Returns the end mark of the object with this number.
 constexpr std::uint32_t endMark(std::uint32_t number) {
     return 0x454F424Au ^ number;
 }
 
-/// "byte 123: what", or "unknown position: what" where the IO could not tell.
+/// Returns "byte 123: what", or "unknown position: what" for a negative position.
 std::string reason(int64 position, const std::string& what);
 
-/// The identity as it is written in sources and messages.
+/// Returns a uid in the form of messages: four words of eight hexadecimal digits, with hyphens.
 std::string text(const QrUid& uid);
 
 } // namespace Mz::ObjectRecord

@@ -1,4 +1,4 @@
-/// The objects that an object IO holds, by number.
+/// The numbered references of an object IO to its objects.
 #pragma once
 
 #include <cstddef>
@@ -7,13 +7,14 @@
 
 namespace Mz {
 
-/// References to the objects of one IO, numbered from 1 in the order in which they begin.
+/// The references to the objects of one IO, numbered from 1 in the order in which the objects
+/// begin.
 ///
-/// When the table is destroyed it drops the references in the reverse of the order in which the
-/// objects ended. An object that ended holds only objects that ended before it, since it got them
-/// while it was read or written; the exception, an object around it, closes a circle. So each
-/// reference that is dropped frees one object at most, and a chain of objects, however long, is
-/// freed in a loop, where dropping it from the other end would recurse through all of it.
+/// The destructor releases them in the reverse of the order in which the objects ended. An object
+/// received its references to others while it was read or written, so these ended before it; the
+/// exception, an object around it, closes a cycle. Each release therefore frees at most one object,
+/// and a chain of any length is freed in a loop. Releasing it from the other end would recurse
+/// through the whole chain.
 template <class Reference>
 class ObjectTable {
   public:
@@ -26,17 +27,17 @@ class ObjectTable {
     }
 
     std::size_t size() const { return references.size(); }
+    /// Returns the reference with this number, from 1 to `size()`.
     const Reference& at(std::uint32_t number) const { return references[number - 1]; }
 
-    /// One object while it is read or written. Its reference is in the table from now on, whether
-    /// it ends well or not.
+    /// One object while it is read or written. The table keeps its reference, also after a failure.
     class Entry {
       public:
         Entry(ObjectTable& table, Reference object) : table(table) {
             table.references.push_back(std::move(object));
             number = static_cast<std::uint32_t>(table.references.size());
             try {
-                // The end of an object must find room for its number.
+                // The destructor appends the number and must not need memory.
                 table.ended.reserve(table.references.capacity());
             } catch (...) {
                 table.references.pop_back();

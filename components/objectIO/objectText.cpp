@@ -1,3 +1,6 @@
+/// Decides from the kind of each piece of text (`QrStream::textKind`) whether it can be read back
+/// and which separator it needs. All that it keeps of earlier output is how the last piece ended.
+/// It throws when the object is written, because the data is lost by the time it is read.
 #include "components/objectIO/objectText.h"
 
 #include <algorithm>
@@ -16,20 +19,20 @@ using TextKind = QrStream::TextKind;
     throw QrStreamEx::ExWriteError(source, line, what);
 }
 
-/// Whether a text stream writes the character as part of a number that can be read back: those of
-/// infinities and of what is no number are not.
+/// Whether the character belongs to a number that can be read back. The letters of "inf" and "nan"
+/// do not.
 bool isOfNumber(wchar_t c) {
     return c != L'\0' && std::wcschr(L"0123456789+-.e", c);
 }
 
-/// Whether the character, if the locale writes it at all, comes back. Some locales write one that
-/// looks similar instead.
+/// Whether the character is read back, if the locale writes it at all. Some locales write a similar
+/// one in its place.
 bool readsBack(wchar_t character) {
     char bytes[MB_LEN_MAX];
     std::mbstate_t writing{};
     const std::size_t length = std::wcrtomb(bytes, character, &writing);
     if (length == static_cast<std::size_t>(-1))
-        return true; // It is refused where it is written.
+        return true; // The IO throws when it writes the character.
     wchar_t again = L'\0';
     std::mbstate_t reading{};
     const std::size_t read = std::mbrtowc(&again, bytes, length, &reading);
@@ -40,7 +43,7 @@ wchar_t lowerCase(wchar_t c) {
     return c >= L'A' && c <= L'Z' ? static_cast<wchar_t>(c - L'A' + L'a') : c;
 }
 
-/// Whether a word of the text is what `%g` makes of a number that `%g` does not read.
+/// Whether a word of the text is one that `%g` writes for a number and does not read.
 bool hasInfiniteNumber(std::wstring_view text) {
     std::wstring word;
     const auto ends = [&] {
@@ -58,7 +61,7 @@ bool hasInfiniteNumber(std::wstring_view text) {
     return ends();
 }
 
-/// White space is that of the scanner.
+/// White space as the scanner of formatted text defines it.
 bool isSpace(wchar_t c) {
     return c == L' ' || (c >= L'\t' && c <= L'\r');
 }
@@ -70,19 +73,19 @@ void ObjectTextOutput::check(TextKind kind, ObjectForm form, std::wstring_view t
         refuse(__LINE__, "a single wchar_t, and an array of them in text, is written as a code and "
                          "never read back: write a number instead");
     if (kind == TextKind::String && !text.empty())
-        refuse(__LINE__, "a string in text does not come back exactly: use QrWriteExactText");
+        refuse(__LINE__, "text cannot carry a string exactly: use QrWriteExactText");
     if (kind == TextKind::Value && form != ObjectForm::Binary) {
         if (!std::all_of(text.begin(), text.end(), isOfNumber))
-            refuse(__LINE__, "text carries no infinite numbers, nor NaNs, exactly");
+            refuse(__LINE__, "text cannot carry an infinity or a NaN exactly");
         return;
     }
     if (text.find(L'\0') != std::wstring_view::npos)
         refuse(__LINE__, "a string has a NUL in it");
     if (!std::all_of(text.begin(), text.end(), readsBack))
-        refuse(__LINE__, "a string has a character that the locale does not know");
+        refuse(__LINE__, "a string has a character that the locale lacks");
     if (kind == TextKind::Formatted && form != ObjectForm::Binary && hasInfiniteNumber(text))
-        refuse(__LINE__, "formatted text has the word \"inf\" or \"nan\": an infinite number, or a "
-                         "NaN, is not read back");
+        refuse(__LINE__, "formatted text has the word \"inf\" or \"nan\": an infinity or a NaN "
+                         "cannot be read back");
 }
 
 void ObjectTextOutput::begin(QrBufferedIO& io, TextKind kind, ObjectForm form,
@@ -92,8 +95,8 @@ void ObjectTextOutput::begin(QrBufferedIO& io, TextKind kind, ObjectForm form,
         return;
     if (isFormatted && last == Last::Formatted && form != ObjectForm::Binary &&
         !isSpace(text.front()))
-        refuse(__LINE__, "formatted text directly after formatted text, whose end could not be "
-                         "found: write white space between them, or both by one format");
+        refuse(__LINE__, "formatted text directly after formatted text, whose end a reader could "
+                         "not find: write white space between them, or use one format");
     const bool isByOperator = kind == TextKind::Value || kind == TextKind::String;
     if (last == Last::Formatted && isByOperator && form != ObjectForm::Binary)
         io.writeSpace();
@@ -107,8 +110,8 @@ void ObjectTextOutput::begin(QrBufferedIO& io, TextKind kind, ObjectForm form,
 
 void ObjectTextOutput::beginData(QrBufferedIO& io, ObjectForm form) {
     if (form == ObjectForm::Mixed && last == Last::FormattedAndBlank)
-        refuse(__LINE__, "formatted text that ends in white space stands before binary data, whose "
-                         "beginning could not be found: leave the white space out");
+        refuse(__LINE__, "formatted text before binary data ends in white space, so a reader could "
+                         "not find the beginning of the data: omit the white space");
     if (form == ObjectForm::Mixed && last != Last::LineEndOrData)
         io.writeEol();
     last = Last::LineEndOrData;

@@ -1,16 +1,17 @@
-/// The form of objects on each kind of stream, as text and as binary data.
+/// The separators between the values of an object, for each kind of stream.
 ///
-/// A stream writes no more than a value needs, and the program sees to it that a reader finds the
-/// end of it. Inside an object that is not enough: what follows is often written by the IO, or by
-/// another class. So the IO completes what the stream writes:
+/// A stream writes no more than a value needs; the program ensures that a reader finds its end.
+/// Inside an object that is not enough, because the IO or another class often writes what follows.
+/// So the IO completes the stream's output:
 ///
 /// - Formatted text has no separator after it. The IO writes a blank before the next value.
-/// - On a stream that is neither text nor binary throughout, single values are text and arrays are
-///   binary data. Between text and binary data there is always one line end, from the stream or
-///   from the IO, which the reader consumes. Characters that a class writes and reads by count
-///   are data in this sense.
+/// - On a stream that is neither text nor binary, single values are text and arrays are binary
+/// data.
+///   Between text and binary data there is always one line end, from the stream or from the IO,
+///   which the reader consumes. Characters that a class writes and reads by count are data in this
+///   sense.
 ///
-/// Text that cannot be read back even so is refused when it is written.
+/// Writing text that still cannot be read back throws.
 #pragma once
 
 #include "components/componentManager/stream.h"
@@ -19,32 +20,35 @@
 
 namespace Mz {
 
-/// The forms of an object: that of its stream.
+/// The form of an object, which is that of its stream.
 enum class ObjectForm {
     Binary,
     Text,
     Mixed ///< Single values as text, arrays as binary data.
 };
 
+/// Returns the form in which `stream` writes objects.
 inline ObjectForm formOf(const QrStream& stream) {
     return stream.isBinaryStream() ? ObjectForm::Binary
            : stream.isTextStream() ? ObjectForm::Text
                                    : ObjectForm::Mixed;
 }
 
-/// What an object writes, between its values.
+/// The separators that the writing IO adds, and the checks of the text between them.
 class ObjectTextOutput {
   public:
-    /// Throws `QrStreamEx::ExWriteError` for text that is not read back as it was.
+    /// Throws `QrStreamEx::ExWriteError` if the text would not be read back exactly.
     static void check(QrStream::TextKind kind, ObjectForm form, std::wstring_view text);
 
-    /// Writes what is due before text of this kind, and remembers how the text ends. Throws
-    /// `QrStreamEx::ExWriteError` where a reader could not find its beginning.
+    /// Writes the separator that text of this kind needs before it, and records how the text ends.
+    /// Throws `QrStreamEx::ExWriteError` if a reader could not find the beginning of the text.
     void begin(QrBufferedIO& io, QrStream::TextKind kind, ObjectForm form, std::wstring_view text);
-    /// Writes what is due before binary data. Throws `QrStreamEx::ExWriteError` where the reader
-    /// could not find its beginning.
+    /// Writes the line end that binary data needs before it. Throws `QrStreamEx::ExWriteError` if a
+    /// reader could not find the beginning of the data.
     void beginData(QrBufferedIO& io, ObjectForm form);
+    /// Records that the stream has written a blank.
     void noteSpace();
+    /// Records that the stream has written a line end.
     void noteLineEnd();
 
   private:

@@ -1,3 +1,7 @@
+/// The input buffer fetches single bytes, converts them, and puts back those that it did not need,
+/// so that the position is exact after each operation. It keeps no data: all state is the stream's.
+/// Where the stream's guard has no effect, the bytes come straight from the standard buffer
+/// (directBuffer.h).
 #include "components/componentManager/bufferio.h"
 
 #include "components/componentManager/buffers/directBuffer.h"
@@ -12,7 +16,7 @@ namespace {
 
 constexpr const char* source = "components/componentManager/bufferio";
 
-/// A sequence of this many bytes that is still no character will never become one.
+/// A sequence of this many bytes that is not a character is an error.
 constexpr int maximumPendingBytes = 4;
 
 constexpr int endOfInput = -1;
@@ -28,8 +32,8 @@ void throwIfBad(const std::istream& in, int line) {
 
 constexpr int endOfBuffer = std::streambuf::traits_type::eof();
 
-/// The next byte, 0 to 255, or -1 when there is none, whyever; then the stream is usable again.
-/// The caller tests for a broken medium, when it has put away what it holds.
+/// Returns the next byte, 0 to 255, or -1 if there is none, and clears the end of input. The caller
+/// checks for a medium that failed, after it has stored its bytes.
 int fetch(std::istream& in) {
     int byte = endOfInput;
     if (std::streambuf* const buffer = directBuffer(in)) {
@@ -46,7 +50,7 @@ int fetch(std::istream& in) {
     return endOfInput;
 }
 
-/// An operation that clears the end of input before it begins.
+/// Runs an operation that clears the end of input before it begins.
 template <class Work>
 void operateFromEnd(std::istream& in, Work&& work) {
     ignoringExceptions([&] { in.clear(in.rdstate() & ~std::ios::eofbit); });
@@ -60,14 +64,14 @@ void putBack(std::istream& in, char byte) {
         operateFromEnd(in, [&] { in.putback(byte); });
 }
 
-/// Puts back what stands from `begin` to `end`, so that it is read again in its order.
+/// Puts back the bytes from `begin` to `end`, last first, so that they are read again in order.
 void putBack(std::istream& in, const char* begin, const char* end) {
     while (end != begin)
         putBack(in, *--end);
 }
 
-/// Reads up to `wanted` characters that are bytes. A NUL is delivered but never consumed, so it is
-/// all that the rest can be.
+/// Reads up to `wanted` characters of one byte each. A NUL is delivered but never consumed, so it
+/// fills the rest.
 int readPlainCharacters(std::istream& in, std::streambuf& buffer, wchar_t* characters, int wanted) {
     for (int stored = 0; stored < wanted; ++stored) {
         const int byte = peekDirectly(in, buffer);
@@ -147,7 +151,7 @@ int QrInBuffer::readChar(char* buf, int size, int count) {
         const auto pending = static_cast<std::size_t>(fetched - used);
         const int length = converter.decode({buf + used, pending}, ignored);
         if (length == 0)
-            break; // A NUL counts for all characters that are still wanted, and stays unread.
+            break; // A NUL counts for the rest of the request and stays unread.
         if (length > 0) {
             used += length;
             ++characters;
@@ -182,7 +186,7 @@ int QrInBuffer::readChar(wchar_t* buf, int size, int count) {
             ++stored;
             pendingBytes = 0;
         } else if (length == 0) {
-            // A NUL is delivered but never consumed, so it is all that the rest can be.
+            // A NUL is delivered but never consumed, so it fills the rest.
             std::fill(buf + stored, buf + wanted, L'\0');
             stored = wanted;
         } else if (pendingBytes == maximumPendingBytes) {
@@ -200,7 +204,7 @@ void QrInBuffer::skipWhiteSpace(int count) {
         throwIfBad(*in, __LINE__);
         if (byte == endOfInput)
             return;
-        // Bytes from 0x80 keep their sign here, and so are white space in no locale.
+        // A byte from 0x80 keeps its sign, so it is not white space in any locale.
         const auto character = static_cast<std::wint_t>(static_cast<signed char>(byte));
         if (!std::iswspace(character)) {
             putBack(*in, static_cast<char>(byte));

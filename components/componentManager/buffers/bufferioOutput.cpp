@@ -1,3 +1,6 @@
+/// The output buffer converts wide characters one by one and writes the bytes of each; it keeps no
+/// data. Where byte and character code are equal, it writes text in blocks. Where the stream's
+/// guard has no effect, the bytes go straight to the standard buffer (directBuffer.h).
 #include "components/componentManager/bufferio.h"
 
 #include "components/componentManager/buffers/directBuffer.h"
@@ -47,7 +50,8 @@ void putCharacter(std::ostream& out, const platform::CharacterConverter& convert
     put(out, bytes, length);
 }
 
-/// Puts characters that are bytes, many at a time. Those before one that is no byte are written.
+/// Writes characters of one byte each, in blocks. Throws at one that is larger; those before it are
+/// written.
 void putPlainCharacters(std::ostream& out, const wchar_t* text, int count) {
     constexpr int blockSize = 256;
     constexpr std::uint32_t largestByte = 0xFF;
@@ -68,7 +72,7 @@ void putPlainCharacters(std::ostream& out, const wchar_t* text, int count) {
     }
 }
 
-/// The characters in `text`, a NUL being one; -1 when it is no text.
+/// Returns the number of characters in `text`, where a NUL counts as one, or -1 if it is not valid.
 int countCharacters(std::string_view text) {
     const platform::CharacterConverter converter = bufferedConverter();
     if (converter.plainBytes())

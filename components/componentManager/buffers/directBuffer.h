@@ -1,9 +1,9 @@
-/// The way past a standard stream to its buffer, taken where nobody can tell the difference.
+/// Direct access to the buffer of a standard stream, where the caller cannot tell the difference.
 ///
-/// A standard stream guards every single operation, which costs several times what moving a value
-/// costs. What the guard does is nothing as long as the stream is in order, is tied to no other and
-/// need not flush; and which calls a buffer of the standard library gets is seen by nobody.
-/// Anything else, a buffer that somebody wrote himself included, gets every call as ever.
+/// The guard of a standard stream takes several times as long as the transfer of a value. It has no
+/// effect if the stream is in a good state, is not tied and is not flushed after each operation.
+/// The calls that a buffer of the standard library receives cannot be observed. Any other stream,
+/// and any other class of buffer, receives every call.
 #pragma once
 
 #include "components/componentManager/bufferio.h"
@@ -17,15 +17,15 @@
 
 namespace Mz {
 
-/// Whether `buffer` is exactly one of the standard library's own.
+/// Returns whether the class of `buffer` is exactly one of the standard library.
 inline bool isStandardBuffer(const std::streambuf& buffer) {
     const std::type_info& type = typeid(buffer);
-    // Mostly there is one description of a type in a process; comparing two takes longer.
+    // A process usually has one description of each type, and comparing addresses is faster.
     return &type == &typeid(std::stringbuf) || &type == &typeid(std::filebuf) ||
            type == typeid(std::stringbuf) || type == typeid(std::filebuf);
 }
 
-/// The buffer of `stream`, where it may be used instead of the stream at this moment; else null.
+/// Returns the buffer of `stream` if it may be used in place of the stream now, else null.
 template <class Stream>
 std::streambuf* directBuffer(const Stream& stream) {
     if (!stream.good() || stream.tie() || (stream.flags() & std::ios::unitbuf))
@@ -34,8 +34,8 @@ std::streambuf* directBuffer(const Stream& stream) {
     return isStandardBuffer(*buffer) ? buffer : nullptr;
 }
 
-/// Runs `work` on the buffer of `stream`, which answers whether it succeeded; if it did not, or
-/// threw, the stream is broken, as after an operation of its own.
+/// Runs `work`, an operation on the buffer of `stream`. If it returns false or throws, sets badbit,
+/// as the same operation of the stream does.
 template <class Work>
 __attribute__((no_sanitize("undefined"))) void directly(std::ios& stream, Work&& work) {
     bool succeeded = false;
@@ -45,37 +45,38 @@ __attribute__((no_sanitize("undefined"))) void directly(std::ios& stream, Work&&
         ignoringExceptions([&] { stream.setstate(std::ios::badbit); });
         throw;
     } catch (...) {
-        // What is thrown where the stream is not asked is dropped where it is.
+        // The failure is in the flags, as after an operation of the stream.
     }
     if (!succeeded) [[unlikely]]
         ignoringExceptions([&] { stream.setstate(std::ios::badbit); });
 }
 
-/// The library's own buffers, seen from within.
+/// Access to the standard streams of this library's buffers.
 struct StandardStreams {
-    /// The standard stream under `io` if that is exactly a `QrInBuffer`, else null.
+    /// Returns the standard stream of `io` if its class is exactly `QrInBuffer`, else null.
     static std::istream* inputUnder(const QrBufferedIO& io) {
         return &typeid(io) == &typeid(QrInBuffer) ? static_cast<const QrInBuffer&>(io).in : nullptr;
     }
-    /// The standard stream under `io` if that is exactly a `QrOutBuffer`, else null.
+    /// Returns the standard stream of `io` if its class is exactly `QrOutBuffer`, else null.
     static std::ostream* outputUnder(const QrBufferedIO& io) {
         return &typeid(io) == &typeid(QrOutBuffer) ? static_cast<const QrOutBuffer&>(io).out
                                                    : nullptr;
     }
 };
 
-/// What the buffers raise when the medium is broken.
+/// Throw the exceptions of the buffers for a medium that fails. Defined beside each buffer, whose
+/// source name they record.
 [[noreturn]] void throwBrokenInput();
 [[noreturn]] void throwBrokenOutput();
 
-/// Writes to the `buffer` of `out` as `QrOutBuffer::write` does.
+/// Writes to `buffer`, that of `out`, as `QrOutBuffer::write` does.
 inline void writeDirectly(std::ostream& out, std::streambuf& buffer, const char* data, int size) {
     directly(out, [&] { return buffer.sputn(data, size) == size; });
     if (out.bad()) [[unlikely]]
         throwBrokenOutput();
 }
 
-/// Reads from the `buffer` of `in` as `QrInBuffer::read` does.
+/// Reads from `buffer`, that of `in`, as `QrInBuffer::read` does. Returns the number of bytes read.
 inline int readDirectly(std::istream& in, std::streambuf& buffer, char* data, int size) {
     std::streamsize got = 0;
     directly(in, [&] {
@@ -90,7 +91,7 @@ inline int readDirectly(std::istream& in, std::streambuf& buffer, char* data, in
     return static_cast<int>(got);
 }
 
-/// The next byte of the `buffer` of `in`, which stays unread: 0 to 255, or -1 at the end.
+/// Returns the next byte of `buffer`, that of `in`, which stays unread: 0 to 255, or -1 at the end.
 inline int peekDirectly(std::istream& in, std::streambuf& buffer) {
     constexpr int end = std::streambuf::traits_type::eof();
     int byte = end;

@@ -1,11 +1,10 @@
-/// Calls into standard streams of which only the stream's flags tell the outcome.
+/// Operations on standard streams whose result is only in the stream's flags.
 ///
-/// Before and after each operation a standard stream does more than the operation: it flushes the
-/// stream that it is tied to, flushes itself under `unitbuf`, and throws what its exception mask
-/// demands. Some of that happens in a destructor, where an exception ends the process; and an
-/// exception of the tied stream keeps the operation from being done. So mask, tie and `unitbuf` are
-/// taken off for the length of one operation, and the flushes are made here, at the same moments
-/// and by the same calls of the buffers.
+/// Around each operation a standard stream flushes the stream that it is tied to, flushes itself
+/// under `unitbuf`, and throws the exceptions of its mask. Some of this happens in a destructor,
+/// where an exception terminates the process, and an exception of the tied stream prevents the
+/// operation. So mask, tie and `unitbuf` are removed for one operation, and the flushes are made
+/// here, at the same moments and by the same calls of the buffers.
 #pragma once
 
 #include <cxxabi.h>
@@ -15,9 +14,9 @@
 
 namespace Mz {
 
-/// Runs `work`, drops what it throws, and returns whether it threw nothing. The cancellation of a
-/// thread is no exception of the stream's and passes through; it has no object, which a sanitizer
-/// would complain about.
+/// Runs `work`, discards its exceptions, and returns whether there was none. The cancellation of a
+/// thread is not an exception of the stream and passes through. That one has no object, which a
+/// sanitizer would report.
 template <class Work>
 __attribute__((no_sanitize("undefined"))) bool ignoringExceptions(Work&& work) {
     try {
@@ -26,17 +25,17 @@ __attribute__((no_sanitize("undefined"))) bool ignoringExceptions(Work&& work) {
     } catch (abi::__forced_unwind&) {
         throw;
     } catch (...) {
-        // The stream has set its flags before it threw.
+        // The stream set its flags before it threw.
         return false;
     }
 }
 
-/// Clears the end of input and the failure that comes with it; a broken medium stays broken.
+/// Clears eofbit and failbit. Keeps badbit: a medium that failed remains so.
 inline void clearEndOfInput(std::ios& stream) {
     ignoringExceptions([&] { stream.clear(stream.rdstate() & std::ios::badbit); });
 }
 
-/// Takes mask, tie and `unitbuf` off a stream, and puts them back when it is destroyed.
+/// Scope in which a stream has no mask, tie or `unitbuf`. The destructor restores them.
 class BareStream {
   public:
     explicit BareStream(std::ios& stream)
@@ -49,20 +48,20 @@ class BareStream {
         if (flushesEach)
             stream.setf(std::ios::unitbuf);
         stream.tie(tiedStream);
-        // Throws where a flag of the mask is set; the mask is back before that.
+        // Throws if a flag of the mask is set, after it has restored the mask.
         ignoringExceptions([&] { stream.exceptions(mask); });
     }
     BareStream(const BareStream&) = delete;
     BareStream& operator=(const BareStream&) = delete;
 
-    /// Whether there is nothing to take off.
+    /// Returns whether the stream has none of them.
     static bool is(const std::ios& stream) {
         return stream.exceptions() == std::ios::goodbit && !stream.tie() &&
                !(stream.flags() & std::ios::unitbuf);
     }
 
     std::ostream* tied() const { return tiedStream; }
-    /// Whether the stream is to be flushed after an operation that ends now.
+    /// Returns whether an operation that ends now must flush the stream.
     bool isFlushDue() const { return flushesEach && std::uncaught_exceptions() == 0; }
 
   private:
@@ -72,7 +71,7 @@ class BareStream {
     const bool flushesEach;
 };
 
-/// Hands on what the buffer of a stream without a mask still holds.
+/// Flushes the buffer of a stream without a mask. Sets badbit if that fails.
 __attribute__((no_sanitize("undefined"))) inline void synchronise(std::ostream& out) {
     bool succeeded = false;
     try {
@@ -89,7 +88,7 @@ __attribute__((no_sanitize("undefined"))) inline void synchronise(std::ostream& 
 
 void flushTied(const std::ios& stream, std::ostream* tied);
 
-/// Runs `work`, one operation of `out`, so that nothing but its flags tells how it went.
+/// Runs `work`, one operation of `out`, so that its result is only in the stream's flags.
 template <class Work>
 void operate(std::ostream& out, Work&& work) {
     if (BareStream::is(out)) {
@@ -102,7 +101,7 @@ void operate(std::ostream& out, Work&& work) {
         synchronise(out);
 }
 
-/// The same for one operation of `in`.
+/// Runs `work`, one operation of `in`, in the same way.
 template <class Work>
 void operate(std::istream& in, Work&& work) {
     if (BareStream::is(in)) {
@@ -114,8 +113,8 @@ void operate(std::istream& in, Work&& work) {
     ignoringExceptions(work);
 }
 
-/// Flushes what `stream` is tied to, as is done before each operation of a stream in order. Whether
-/// that succeeds concerns the tied stream alone.
+/// Flushes `tied`, the stream to which `stream` is tied, as before each operation of a stream in a
+/// good state. Only the tied stream records a failure.
 inline void flushTied(const std::ios& stream, std::ostream* tied) {
     if (tied && tied->rdbuf() && stream.good())
         operate(*tied, [&] { tied->flush(); });

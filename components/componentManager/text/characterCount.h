@@ -1,7 +1,7 @@
-/// Counts of characters that stay at the largest `int` instead of overflowing.
+/// Saturating counts of characters, which stop at the largest `int` and do not overflow.
 ///
-/// A line, or what one format reads, may be longer than an `int` can count. Past that the exact
-/// length tells nothing more: a line is long, and a count has no room.
+/// A line, or the text of one format, may have more characters than an `int` can count. The exact
+/// number does not matter then: the line is long, and `%n` has no room for it.
 #pragma once
 
 #include <algorithm>
@@ -10,8 +10,8 @@
 
 namespace Mz {
 
-/// The sum of `count` and `more`, or the limit of `int` that it passes. `more` may be negative:
-/// a foreign IO reports what it likes.
+/// Returns the sum of `count` and `more`, or the limit of `int` that it exceeds. `more` may be
+/// negative: a foreign IO may return any number.
 inline int addCharacters(int count, int more) {
     using Limits = std::numeric_limits<int>;
     const std::int64_t sum = std::int64_t{count} + more;

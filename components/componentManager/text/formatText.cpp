@@ -1,3 +1,7 @@
+/// A formatter that parses the wide `printf` formats itself. The C libraries differ between
+/// platforms in `%s`, exponents and the width of a `long`, depend on the locale, and limit the
+/// length of the output. `std::to_chars` supplies the digits of floating-point numbers: it rounds
+/// correctly and ignores the locale.
 #include "components/componentManager/text/formatText.h"
 
 #include "components/componentManager/uid.h"
@@ -32,7 +36,7 @@ bool isDigit(wchar_t c) {
     return c >= L'0' && c <= L'9';
 }
 
-/// A run of digits, clamped far above anything that fits in memory.
+/// Reads a run of digits. The number is clamped, so that it does not overflow.
 int takeNumber(const wchar_t*& format) {
     constexpr int limit = std::numeric_limits<int>::max() / 16;
     int number = 0;
@@ -79,7 +83,7 @@ Size parseSize(const wchar_t*& format) {
     return Size::None;
 }
 
-/// Puts sign, prefix and digits together, in the width that is wanted.
+/// Appends sign, prefix and digits, padded to the width of the directive.
 void appendPadded(std::wstring& result, const Directive& directive, std::wstring_view prefix,
                   std::wstring_view body, bool zeros) {
     const std::size_t length = prefix.size() + body.size();
@@ -126,7 +130,7 @@ void appendInteger(std::wstring& result, const Directive& directive, std::uint64
     appendPadded(result, directive, prefix, digits, directive.zero && directive.precision < 0);
 }
 
-/// False when the value does not fit the width that a `long` has on every platform's streams.
+/// Returns false if a `long` does not fit 32 bits, its width on the streams of every platform.
 bool formatSigned(std::wstring& result, const Directive& directive, std::va_list& arguments) {
     int64 value = 0;
     switch (directive.size) {
@@ -162,7 +166,7 @@ bool formatUnsigned(std::wstring& result, const Directive& directive, std::va_li
     return true;
 }
 
-/// The digits of a finite, non-negative value.
+/// Returns the digits of a finite, non-negative value.
 template <class Float>
 std::string toCharacters(Float value, std::chars_format format, int precision) {
     // The longest fixed form has as many digits before its point as the largest value.
@@ -183,7 +187,7 @@ int exponentOf(const std::string& scientific) {
     return exponent;
 }
 
-/// `%#g`: as `%g`, with the zeros at the end that it would leave out.
+/// Returns the text of `%#g`: that of `%g` with the trailing zeros, which `std::to_chars` omits.
 template <class Float>
 std::string toGeneralWithZeros(Float value, int precision) {
     const int digits = precision == 0 ? 1 : precision;
@@ -194,7 +198,7 @@ std::string toGeneralWithZeros(Float value, int precision) {
     return toCharacters(value, std::chars_format::fixed, digits - 1 - exponent);
 }
 
-/// A decimal point where the alternate form wants one and there is none.
+/// Inserts the decimal point that the alternate form requires, if there is none.
 void ensurePoint(std::string& digits) {
     if (digits.find('.') == std::string::npos)
         digits.insert(std::min(digits.find_first_of("ep"), digits.size()), 1, '.');
@@ -252,7 +256,7 @@ void formatFloat(std::wstring& result, const Directive& directive, std::va_list&
         appendFloat(result, directive, va_arg(arguments, double));
 }
 
-/// Whether a text or character is wide: the small letters are, unless the size says otherwise.
+/// Whether a string or character is wide: `s` and `c` are, unless a size specifies otherwise.
 bool isWide(const Directive& directive) {
     if (directive.size == Size::Short || directive.size == Size::Byte)
         return false;
@@ -261,7 +265,8 @@ bool isWide(const Directive& directive) {
     return directive.conversion == L's' || directive.conversion == L'c';
 }
 
-/// Copies a text up to its end or the precision, whichever comes first, and reads no further.
+/// Copies a string up to its end or the precision, and reads no further: with a precision it need
+/// not be terminated.
 template <class Character>
 std::wstring copyText(const Character* text, int precision) {
     if (!text)
@@ -317,14 +322,14 @@ void parseWidth(const wchar_t*& format, Directive& directive, std::va_list& argu
 void parsePrecision(const wchar_t*& format, Directive& directive, std::va_list& arguments) {
     if (!take(format, L"."))
         return;
-    // A negative one counts as none.
+    // A negative precision counts as none.
     directive.precision = take(format, L"*") ? va_arg(arguments, int) : takeNumber(format);
     if (directive.precision < 0)
         directive.precision = -1;
 }
 
-/// Formats the directive that begins behind the '%' at `format`, and moves `format` behind it.
-/// `start` is where the text of this call begins in `result`.
+/// Formats the directive at `format`, which begins after the '%', and moves `format` to its end.
+/// The text of this call begins at `start` in `result`. Returns false as `formatText`.
 bool formatDirective(std::wstring& result, std::size_t start, const wchar_t*& format,
                      std::va_list& arguments) {
     const wchar_t* begin = format;
@@ -359,7 +364,7 @@ bool formatDirective(std::wstring& result, std::size_t start, const wchar_t*& fo
     case L'p': formatPointer(result, directive, arguments); return true;
     case L'n': storeCount(directive, result.size() - start, arguments); return true;
     case L'%': result += L'%'; return true;
-    default: // Nothing is known by this name, so it is text.
+    default: // An unknown conversion is text.
         result.append(L"%").append(begin, format);
         return true;
     }

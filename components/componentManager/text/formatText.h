@@ -1,4 +1,4 @@
-/// Text formatted in the manner of the wide `printf`, alike on every platform and in every locale.
+/// The formatter of the wide `printf` formats, equal on every platform and in every locale.
 #pragma once
 
 #include <cstdarg>
@@ -6,13 +6,16 @@
 
 namespace Mz {
 
-/// Appends to `result` what `format` makes of `arguments`: flags, width, precision and the sizes
-/// `hh h l ll j z t L w I I32 I64` before `d i u o x X c C s S e E f F g G a A p n %`. Conventions
-/// are those of Windows (wide `%s` and `%c`, a `long` of 32 bits, `%p` of 16 upper-case digits),
-/// numbers those of the "C" locale with exponents of at least two digits. A null text is "(null)".
+/// Appends the text of `arguments` in `format` to `result`.
 ///
-/// False when there is no such text: a `long` that does not fit 32 bits, or a '%' with nothing
-/// behind it. What stands in `result` then means nothing. Throws `std::bad_alloc`.
+/// A directive has flags, a width, a precision, a size of `hh h l ll j z t L w I I32 I64` and a
+/// conversion of `d i u o x X c C s S e E f F g G a A p n %`. The conventions are those of Windows:
+/// wide `%s` and `%c`, a `long` of 32 bits, `%p` of 16 upper-case digits. Numbers have the form of
+/// the "C" locale, with exponents of at least two digits. A null string is "(null)".
+///
+/// \return false if a `long` does not fit 32 bits or the format ends after a '%'; the end of
+///         `result` is undefined then
+/// \throws std::bad_alloc
 bool formatText(std::wstring& result, const wchar_t* format, std::va_list& arguments);
 
 } // namespace Mz

@@ -1,3 +1,7 @@
+/// Formats single numbers into a small buffer. The 16 digits of a `double` take most of the time:
+/// the standard library finds the fewest digits that read back much faster than any fixed number of
+/// them. So these are used where they provably are, or round to, the digits of `%.16g`. The other
+/// values take the standard library's rounding.
 #include "components/componentManager/text/numberText.h"
 
 #include "components/componentManager/uid.h"
@@ -27,14 +31,14 @@ char* writeInteger(char* text, Integer value) {
     return std::to_chars(text, text + longestNumberText, value).ptr;
 }
 
-/// What is no number by digits.
+/// Writes a zero, an infinity or a NaN.
 char* writeSpecial(char* text, double value) {
     if (std::signbit(value))
         *text++ = '-';
     return writeText(text, std::isnan(value) ? "nan" : std::isinf(value) ? "inf" : "0");
 }
 
-/// `%.*g`, the standard library's way.
+/// Writes the text of `%.*g` by the standard library.
 char* writeRounded(char* text, double value, int digits) {
     if (!std::isfinite(value))
         return writeSpecial(text, value);
@@ -42,14 +46,14 @@ char* writeRounded(char* text, double value, int digits) {
         .ptr;
 }
 
-/// A decimal number d.ddd…e±x: its digits without the point, no zero at the end.
+/// A decimal number d.ddd…e±x: its digits without the point, and without trailing zeros.
 struct Decimal {
     char digits[24];
     int count = 0;
     int exponent = 0;
 };
 
-/// The fewest digits that read back as `value`, which is positive and finite.
+/// Returns the fewest digits that read back as `value`, which is positive and finite.
 Decimal shortest(double value) {
     char text[32];
     const char* const end =
@@ -73,8 +77,8 @@ void dropZeros(Decimal& decimal) {
         --decimal.count;
 }
 
-/// Rounds 17 digits to 16. False when the last one is a 5, which does not tell on which side of the
-/// middle the number itself is.
+/// Rounds 17 digits to 16. Returns false if the last one is a 5: the number itself may be on either
+/// side of the middle.
 bool dropLastDigit(Decimal& decimal) {
     const char last = decimal.digits[--decimal.count];
     if (last == '5')
@@ -104,8 +108,8 @@ constexpr auto powersOfTen = [] {
     return powers;
 }();
 
-/// Whether this thread computes with all the bits of the type. On Windows it depends on who started
-/// the thread.
+/// Whether this thread computes with all bits of the type. On Windows the precision depends on the
+/// code that started the thread.
 bool hasFullPrecision() {
     if (std::numeric_limits<Wide>::digits < 64)
         return false;
@@ -115,9 +119,9 @@ bool hasFullPrecision() {
 }
 
 /// Whether no other number of 16 digits is nearer to `value` than this one of fewer digits. False
-/// where that is not certain.
+/// if that is not certain.
 bool isNearest(const Decimal& decimal, double value) {
-    // The distance then comes out a thousand times finer than it is needed.
+    // With full precision the distance is a thousand times finer than needed.
     if (!hasFullPrecision())
         return false;
     const int scale = decimal.count - 1 - decimal.exponent;
@@ -127,13 +131,13 @@ bool isNearest(const Decimal& decimal, double value) {
     std::from_chars(decimal.digits, decimal.digits + decimal.count, number);
     const Wide scaled = static_cast<Wide>(value) * powersOfTen[static_cast<std::size_t>(scale)];
     const Wide distance = std::fabs(scaled - static_cast<Wide>(number));
-    // In units of the 16th digit; half of one is the middle. Below a power of ten they are smaller.
+    // The distance in units of the 16th digit: below half a unit, this number is the nearest. Below
+    // a power of ten the units are smaller.
     const int missing = digitsOfDouble - decimal.count + (number == 1 ? 1 : 0);
     return distance * powersOfTen[static_cast<std::size_t>(missing)] < Wide(0.49);
 }
 
-/// The digits of `%.16g` where they follow from the fewest that read back, which the standard
-/// library finds much faster than any fixed number of them. False where they do not.
+/// Stores the digits of `%.16g` if they follow from the fewest that read back, else returns false.
 bool sixteenDigits(Decimal& decimal, double value) {
     decimal = shortest(value);
     if (decimal.count < digitsOfDouble)
@@ -141,11 +145,11 @@ bool sixteenDigits(Decimal& decimal, double value) {
     std::uint64_t bits;
     std::memcpy(&bits, &value, sizeof bits);
     constexpr std::uint64_t fraction = (std::uint64_t(1) << 52) - 1;
-    // At a power of two, and so at no other number, the neighbours are not equally far away, and
-    // the nearest number of 16 digits may be one that does not read back.
+    // Only at a power of two do the neighbours have different distances. The nearest number of 16
+    // digits may then be one that does not read back.
     if (!(bits & fraction))
         return false;
-    // Of several with the same number of digits the nearest is taken, so 16 are the ones wanted.
+    // Of several shortest numbers `std::to_chars` returns the nearest, so 16 digits are the result.
     return decimal.count == digitsOfDouble || dropLastDigit(decimal);
 }
 
@@ -163,7 +167,7 @@ char* writeDigits(char* text, const char* digits, int count) {
     return text + count;
 }
 
-/// Lays the digits out as `%.16g` does.
+/// Writes the digits in the layout of `%.16g`.
 char* writeGeneral(char* text, const Decimal& decimal) {
     const auto& [digits, count, exponent] = decimal;
     if (exponent < -4 || exponent >= digitsOfDouble) {
@@ -188,7 +192,7 @@ char* writeGeneral(char* text, const Decimal& decimal) {
 char* writeDouble(char* text, double value) {
     if (!std::isfinite(value) || value == 0)
         return writeSpecial(text, value);
-    // Whole numbers of up to 15 digits, the most frequent of all, need no search.
+    // Whole numbers of up to 15 digits, the most frequent values, need no search.
     constexpr double wholeLimit = 1e15;
     if (std::fabs(value) < wholeLimit && value == std::trunc(value))
         return writeInteger(text, static_cast<std::int64_t>(value));
@@ -200,7 +204,7 @@ char* writeDouble(char* text, double value) {
     return writeGeneral(text, decimal);
 }
 
-/// Narrows a `long` to the width that it has on every platform's streams.
+/// Writes a `long` if it fits 32 bits, its width on the streams of every platform.
 template <class Narrow, class Wide>
 NumberText writeLong(char*& text, Wide value) {
     if (static_cast<Wide>(static_cast<Narrow>(value)) != value)

@@ -1,4 +1,4 @@
-/// The text of single numbers, in the forms in which streams write them.
+/// The fast formatter for single numbers in the formats of the streams' operators.
 #pragma once
 
 #include <cstdarg>
@@ -6,18 +6,19 @@
 
 namespace Mz {
 
-/// Long enough for every number here.
+/// The size of a buffer that has room for every number here.
 inline constexpr std::size_t longestNumberText = 40;
 
-/// What `formatNumber` made of a format.
+/// The result of `formatNumber`.
 enum class NumberText {
-    None,      ///< the format is none of a single number; no argument was taken
-    Written,   ///< the number stands between the buffer's beginning and the end that is returned
-    DoesNotFit ///< a `long` that does not fit 32 bits
+    None,      ///< The format is not one of these. No argument was taken.
+    Written,   ///< The number was written.
+    DoesNotFit ///< The argument is a `long` that does not fit 32 bits.
 };
 
-/// Writes to `text` what `formatText` makes of the formats `%d %u %ld %lu %I64d %I64u %.9g %.16g`,
-/// which are nearly all that streams are asked for, and moves `text` behind it.
+/// Writes the text that `formatText` returns for one of the formats `%d %u %ld %lu %I64d %I64u %.9g
+/// %.16g`, which are nearly all that streams use, to `text` and moves `text` to its end. `text`
+/// must have room for `longestNumberText` characters.
 NumberText formatNumber(char*& text, const wchar_t* format, std::va_list& arguments);
 
 } // namespace Mz

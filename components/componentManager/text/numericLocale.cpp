@@ -1,3 +1,5 @@
+/// Chooses between the two ways to the "C" locale by the exact class of the IO. The way without the
+/// C library is preferred: it is fast and has no effect on other threads.
 #include "components/componentManager/text/numericLocale.h"
 
 #include "components/componentManager/bufferio.h"
@@ -10,8 +12,8 @@ namespace Mz {
 
 namespace {
 
-/// The library's own, as the platform layer has no state. It is never destroyed, because static
-/// objects may write streams in their destructors.
+/// The switch of this library, as the platform layer has no state. Never destroyed: static objects
+/// may write streams in their destructors.
 platform::LocaleSwitch& localeSwitch() {
     static NoDestructor<platform::LocaleSwitch> instance;
     return instance.value;
@@ -20,7 +22,7 @@ platform::LocaleSwitch& localeSwitch() {
 } // namespace
 
 NumericLocale::NumericLocale(const QrBufferedIO& io) {
-    // A derived class may do anything; only what is exactly ours is known not to look.
+    // A derived class may use the C library; only these exact classes are known not to.
     if (typeid(io) == typeid(QrInBuffer) || typeid(io) == typeid(QrOutBuffer))
         ownBuffer.emplace();
     else

@@ -1,4 +1,4 @@
-/// The "C" locale for as long as a stream reads or writes text.
+/// Scope in which a stream reads or writes text in the "C" locale.
 #pragma once
 
 #include "components/componentManager/text/plainBytes.h"
@@ -10,11 +10,11 @@ namespace Mz {
 
 class QrBufferedIO;
 
-/// While it lives, `io` converts characters as in the "C" locale on the calling thread.
+/// While an object lives, its IO converts characters as in the "C" locale on the calling thread.
 ///
-/// The library's own buffers are only told so. Any other IO may ask the C library, whose locale is
-/// therefore switched: for the calling thread where the system can do that, else for the process
-/// (`platform::CLocale` says what that means for other threads).
+/// `QrInBuffer` and `QrOutBuffer` use `PlainBytes`. Any other IO may use the C library, so its
+/// locale is switched: for the calling thread where the system supports that, else for the process
+/// (`platform::CLocale` describes the effect on other threads).
 class NumericLocale {
   public:
     explicit NumericLocale(const QrBufferedIO& io);

@@ -1,11 +1,12 @@
-/// A depth for each thread, so that scopes nest and no other thread notices them. The word that holds
-/// it takes no heap memory that would stay when the library is unloaded.
+/// Counts the depth of the scopes for each thread, so that they nest and do not affect other
+/// threads. The count is in a word of the platform layer, which leaves no heap memory when the
+/// library is unloaded.
 #include "components/componentManager/text/plainBytes.h"
 
 #include "components/base/export.h"
 #include "components/platform/platform.h"
 
-// Of the system that the build is for.
+// From the folder of the platform.
 #include "threadWord.h"
 
 #include <new>

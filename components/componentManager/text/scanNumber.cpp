@@ -1,3 +1,7 @@
+/// Copies what the standard buffer holds into a small window, parses the number there, and moves
+/// the buffer back to its end: a few pointer moves in place of a call for each character. The
+/// parser accepts only ordinary numbers that end inside the window. Everything else is put back for
+/// the general scanner, so there is one place that decides the special cases.
 #include "components/componentManager/text/scanNumber.h"
 
 #include "components/componentManager/buffers/directBuffer.h"
@@ -14,8 +18,8 @@ namespace {
 
 enum class Target { None, Int, Short, Long, UnsignedLong, Int64, Float, Double };
 
-/// Formats end here at the first character that does not belong to one of ours, so a short-cut is a
-/// few comparisons.
+/// Returns the target of a format that this file reads. The comparisons stop at the first character
+/// that fits none, so an unsuccessful attempt is cheap.
 Target targetOf(const wchar_t* format) {
     if (format[0] != L'%')
         return Target::None;
@@ -46,8 +50,8 @@ bool isReal(Target target) {
     return target == Target::Float || target == Target::Double;
 }
 
-/// How much is looked at: white space, the longest number that is written, and what follows it. All
-/// that is not needed has to be given back, so not more.
+/// Returns the size of the window: white space, the longest number that streams write, and the
+/// character after it. Not more, because every unneeded character must be put back.
 int windowOf(Target target) {
     constexpr int real = 28;
     constexpr int longInteger = 23;
@@ -63,16 +67,16 @@ bool isDigit(char c) {
     return c >= '0' && c <= '9';
 }
 
-/// A number in the window, and the place behind it.
+/// A number in the window.
 struct Number {
     bool negative = false;
-    std::uint64_t digits = 0;    ///< without the point
-    int exponent = 0;            ///< of ten, by which they are multiplied
-    const char* begin = nullptr; ///< behind the sign
+    std::uint64_t digits = 0;    ///< the digits, without the point
+    int exponent = 0;            ///< the power of ten by which they are multiplied
+    const char* begin = nullptr; ///< after the sign
     const char* end = nullptr;
 };
 
-/// More digits might not fit 64 bits.
+/// Up to this many digits always fit 64 bits. A number with more is unusual.
 constexpr std::ptrdiff_t mostDigits = 18;
 
 const char* takeDigits(const char* at, const char* end, std::uint64_t& value) {
@@ -81,7 +85,7 @@ const char* takeDigits(const char* at, const char* end, std::uint64_t& value) {
     return at;
 }
 
-/// The fraction and the exponent behind the digits at `at`; null where they are not ordinary.
+/// Reads the fraction and the exponent at `at` and returns their end, or null if they are unusual.
 const char* takeFraction(const char* at, const char* end, Number& number) {
     if (at != end && *at == '.') {
         const char* const fraction = at + 1;
@@ -97,15 +101,15 @@ const char* takeFraction(const char* at, const char* end, Number& number) {
     if (at != end && (*at == '-' || *at == '+'))
         ++at;
     std::uint64_t exponent = 0;
-    const char* const behind = takeDigits(at, end, exponent);
+    const char* const after = takeDigits(at, end, exponent);
     constexpr std::ptrdiff_t mostExponentDigits = 3;
-    if (behind == at || behind - at > mostExponentDigits)
+    if (after == at || after - at > mostExponentDigits)
         return nullptr;
     number.exponent += negative ? -static_cast<int>(exponent) : static_cast<int>(exponent);
-    return behind;
+    return after;
 }
 
-/// Reads the number in the window. False where it does not end inside, or is in any way unusual.
+/// Parses the number in the window. Returns false if it does not end there or is unusual.
 bool parse(const char* at, const char* end, bool real, Number& number) {
     while (at != end && isSpace(*at))
         ++at;
@@ -119,11 +123,12 @@ bool parse(const char* at, const char* end, bool real, Number& number) {
     if (real)
         at = takeFraction(at, end, number);
     number.end = at;
-    // What follows is seen, and it is a character that is none of a number in any form.
+    // The next character must be in the window and ASCII: neither a NUL nor part of a multibyte
+    // sequence.
     return at && at != end && *at > 0;
 }
 
-/// The value of the number. False where it is not finite, or zero by being too small.
+/// Computes the value of the number. Returns false if it is too large or too small for a `double`.
 bool valueOf(const Number& number, double& value) {
     constexpr auto powers = [] {
         std::array<double, 23> table{1};
@@ -135,7 +140,7 @@ bool valueOf(const Number& number, double& value) {
     constexpr int exactPower = static_cast<int>(powers.size()) - 1;
     if (number.digits <= exactLimit && number.exponent >= -exactPower &&
         number.exponent <= exactPower) {
-        // Both factors are exact, so the one rounding is the right one.
+        // Both operands are exact, so the single rounding is correct.
         const auto digits = static_cast<double>(number.digits);
         value = number.exponent < 0 ? digits / powers[static_cast<std::size_t>(-number.exponent)]
                                     : digits * powers[static_cast<std::size_t>(number.exponent)];
@@ -183,13 +188,13 @@ bool scanNumber(std::istream& in, std::streambuf& buffer, const wchar_t* format,
     const Target target = targetOf(format);
     if (target == Target::None)
         return false;
-    // What stands in the buffer is read and given back by moving a pointer only. A single character
-    // may be one that was put back, which buffers keep elsewhere.
+    // Characters in the buffer are read and put back by moving a pointer. A single one may be a
+    // putback character, which buffers keep elsewhere.
     constexpr std::streamsize fewest = 2;
     char window[32];
     std::streamsize got = 0;
     directly(in, [&] {
-        // With nothing in the buffer, what is available would be a guess at the rest of the medium.
+        // Fills the buffer first: if it is empty, `in_avail` only estimates the rest of the medium.
         if (buffer.sgetc() == std::streambuf::traits_type::eof())
             return true;
         const std::streamsize available = buffer.in_avail();

@@ -1,4 +1,5 @@
-/// One number read straight from a standard buffer: what nearly all formatted reading is.
+/// The fast scanner for a single number in a standard buffer, which is nearly all formatted
+/// reading.
 #pragma once
 
 #include <cstdarg>
@@ -6,11 +7,13 @@
 
 namespace Mz {
 
-/// Does what `scanText` does with the formats `%d %u %hd %hu %ld %lu %I64d %I64u %g %lg` where the
-/// number stands whole in what `buffer`, that of `in`, holds, is an ordinary one and is followed by
-/// an ordinary character: stores it, and true. In every other case, which is left to the general
-/// way, false, and the buffer and the arguments are as they were. Raises what a read of
-/// `QrInBuffer` raises.
+/// Reads a number, as `scanText` does, in one of the formats `%d %u %hd %hu %ld %lu %I64d %I64u %g
+/// %lg`. `buffer` is the buffer of `in`.
+///
+/// \return true if the number was stored. False if the format is another one, or the number is
+///         unusual or not complete in the buffer with an ASCII character after it. The input and
+///         the arguments are then unchanged.
+/// \throws QrStreamEx::ExReadError if the medium fails
 bool scanNumber(std::istream& in, std::streambuf& buffer, const wchar_t* format,
                 std::va_list& arguments);
 

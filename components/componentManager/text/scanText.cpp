@@ -1,3 +1,7 @@
+/// A scanner that reads character by character and never further than one lookahead character, so
+/// that the next read continues exactly where this one stopped. The C library's scanner cannot do
+/// that on a `QrBufferedIO`, and differs between platforms and locales. The scanner is a template
+/// of its input: a standard buffer supplies bytes directly, any other IO by its virtual functions.
 #include "components/componentManager/text/scanText.h"
 
 #include "components/componentManager/bufferio.h"
@@ -17,12 +21,12 @@ namespace Mz {
 
 namespace {
 
-/// White space is that of the "C" locale, whatever the C library holds for it.
+/// White space is that of the "C" locale, whatever the locale of the process.
 bool isSpace(wchar_t c) {
     return c == L' ' || (c >= L'\t' && c <= L'\r');
 }
 
-/// The value of a digit, 16 for everything else.
+/// Returns the value of a digit, or 16 for any other character.
 unsigned int digitValue(wchar_t c) {
     if (c >= L'0' && c <= L'9')
         return static_cast<unsigned int>(c - L'0');
@@ -33,12 +37,12 @@ unsigned int digitValue(wchar_t c) {
     return 16;
 }
 
-/// The input, seen through one character of look-ahead.
-class IOInput {
+/// The input by the virtual functions of an IO, with one lookahead character.
+class LookaheadInput {
   public:
-    explicit IOInput(QrBufferedIO& source) : io(source) {}
+    explicit LookaheadInput(QrBufferedIO& source) : io(source) {}
 
-    /// Whether there is a next character, which `next()` then gives.
+    /// Returns whether there is a next character, which is then `next()`.
     bool available() {
         if (!held && !ended) {
             held = io.readChar(character) == 1;
@@ -53,14 +57,14 @@ class IOInput {
         consumed = addCharacters(consumed, 1);
     }
 
-    /// Gives the look-ahead back. A NUL was never consumed, so it must not be put in twice.
-    void giveBack() {
+    /// Puts the lookahead character back, except a NUL, which was not consumed.
+    void putBack() {
         if (held && character != L'\0')
             io.ungetc(character);
         held = false;
     }
 
-    /// The characters that were used up, without the lookahead; at most the largest `int`.
+    /// Returns the number of characters consumed, without the lookahead; at most the largest `int`.
     int consumedCharacters() const { return consumed; }
 
   private:
@@ -71,8 +75,8 @@ class IOInput {
     int consumed = 0;
 };
 
-/// The same straight from a standard buffer, where bytes are characters: the next one is looked at
-/// and stays where it is, so there is nothing to give back.
+/// The input from a standard buffer, where bytes are characters. The lookahead stays in the buffer,
+/// so nothing needs to be put back.
 class DirectInput {
   public:
     DirectInput(std::istream& source, std::streambuf& bytes) : in(source), buffer(bytes) {}
@@ -84,14 +88,14 @@ class DirectInput {
     }
     wchar_t next() const { return static_cast<wchar_t>(byte); }
 
-    /// What follows is not looked at before somebody asks: there may be nothing for a long time.
+    /// Does not look at the next character yet: an interactive input could block.
     void consume() {
         buffer.sbumpc();
         byte = unknown;
         consumed = addCharacters(consumed, 1);
     }
 
-    void giveBack() {}
+    void putBack() {}
 
     int consumedCharacters() const { return consumed; }
 
@@ -114,7 +118,8 @@ struct Directive {
     wchar_t conversion = 0;
 };
 
-/// Reads modifiers and width, in any order, and leaves `format` at the conversion character.
+/// Reads modifiers and width, in any order, and moves `format` to the conversion character. A
+/// repeated modifier counts once.
 Directive parseDirective(const wchar_t*& format) {
     Directive directive;
     for (;; ++format) {
@@ -140,11 +145,11 @@ Directive parseDirective(const wchar_t*& format) {
     return directive;
 }
 
-/// The characters that a `[` accepts, of the 16 bits that a character has on every platform.
+/// The set of characters that a `[` accepts. Characters have 16 bits on every platform.
 class CharacterSet {
   public:
-    /// Reads the set at `format`, behind the '[', and moves `format` to its ']' or the format's
-    /// end.
+    /// Reads the set at `format`, after the '[', and moves `format` to its ']' or the end of the
+    /// format.
     explicit CharacterSet(const wchar_t*& format) : members(std::make_unique<Members>()) {
         if (*format == L'^') {
             negated = true;
@@ -179,7 +184,7 @@ class CharacterSet {
     bool negated = false;
 };
 
-/// For a number outside the range of `double`: whether it is the tiny end of it.
+/// Whether a number outside the range of `double` is too small and not too large.
 bool isBelowOne(const char* begin, const char* end) {
     int64 magnitude = 0; // The decimal exponent of the first digit that is not zero.
     bool point = false;
@@ -206,8 +211,8 @@ bool isBelowOne(const char* begin, const char* end) {
     return magnitude + (negative ? -exponent : exponent) <= 0;
 }
 
-/// As the C library converts in the "C" locale: the longest prefix that is a number, infinity for
-/// what is too large, zero for what is too small.
+/// Converts the longest prefix that is a number, as the C library does in the "C" locale: infinity
+/// if it is too large, zero if it is too small.
 double doubleOf(const char* begin, const char* end) {
     const bool negative = *begin == '-';
     if (negative || *begin == '+')
@@ -227,12 +232,13 @@ class Scanner {
     int scan(const wchar_t* format) {
         while (*format && step(format)) {
         }
-        input.giveBack();
+        input.putBack();
         return assigned;
     }
 
   private:
-    /// Follows one piece of the format and moves `format` behind it; false when the scan ends.
+    /// Processes one element of the format and moves `format` to its end. Returns false at the end
+    /// of the scan.
     bool step(const wchar_t*& format) {
         if (isSpace(*format)) {
             while (isSpace(*format))
@@ -262,8 +268,8 @@ class Scanner {
         return true;
     }
 
-    /// A directive without a conversion character is compared, after white space, with the format's
-    /// terminator, which nothing equals.
+    /// Handles a directive without a conversion character. It compares the next character after
+    /// white space with the terminator of the format, which never matches.
     bool endsUnfinished() {
         skipSpace();
         return false;
@@ -307,7 +313,7 @@ class Scanner {
         }
     }
 
-    /// Counts down the characters that a conversion may still take.
+    /// The number of characters that a conversion may still take.
     class Budget {
       public:
         explicit Budget(int width) : left(width > 0 ? width : std::numeric_limits<int>::max()) {}
@@ -349,8 +355,8 @@ class Scanner {
         return true;
     }
 
-    /// The "0x" of `x` and `i`, and the leading "0" that makes the number of an `i` octal. A zero
-    /// without an "x" behind it is a digit of the number.
+    /// Reads the "0x" of `x` and `i`, or the leading "0" that makes the number of `i` octal. A zero
+    /// without an "x" after it is a digit of the number.
     void readPrefix(const Directive& directive, Budget& budget, unsigned int& base,
                     bool& anyDigit) {
         const bool detects = directive.conversion == L'i' || directive.conversion == L'I';
@@ -377,7 +383,7 @@ class Scanner {
         } else if (directive.isShort) {
             *va_arg(arguments, std::uint16_t*) = static_cast<std::uint16_t>(value);
         } else if (directive.isLong) {
-            // 32 bits in the text, whatever a `long` has here.
+            // A `long` has 32 bits in the text, whatever its width on this platform.
             const bool isSigned = directive.conversion == L'd' || directive.conversion == L'D' ||
                                   directive.conversion == L'i' || directive.conversion == L'I';
             const long wide = isSigned ? static_cast<long>(static_cast<std::int32_t>(low))
@@ -400,7 +406,7 @@ class Scanner {
         return true;
     }
 
-    /// The characters of a number, of which none has more, as they stand in the input.
+    /// The characters of a floating-point number. The length is a fixed limit of the formats.
     struct FloatText {
         static constexpr int longest = 349;
         char characters[longest];
@@ -463,7 +469,7 @@ class Scanner {
         return directive.conversion != L'C' && directive.conversion != L'S';
     }
 
-    /// Stores characters one after the other, wide or narrow.
+    /// The argument that receives the characters, wide or narrow.
     class Target {
       public:
         Target(bool assigns, bool isWide, std::va_list& argumentList) {
@@ -473,7 +479,7 @@ class Scanner {
                 narrow = va_arg(argumentList, char*);
         }
 
-        /// False when the character has no narrow form.
+        /// Returns false if the character has no narrow form.
         bool store(wchar_t c) {
             if (wide)
                 *wide++ = c;
@@ -500,8 +506,8 @@ class Scanner {
         const platform::CharacterConverter converter = bufferedConverter();
     };
 
-    /// `c`, `s` and `[`: characters as long as the conversion accepts them. A NUL, which is never
-    /// consumed, ends each of them.
+    /// Reads the characters that `c`, `s` or `[` accepts. A NUL, which is never consumed, ends each
+    /// of them.
     bool readText(const Directive& directive, char kind, const CharacterSet* set) {
         Budget budget(kind == 'c' && directive.width == 0 ? 1 : directive.width);
         Target target(directive.assigns, storesWide(directive), arguments);
@@ -539,7 +545,7 @@ int scanText(QrBufferedIO& io, const wchar_t* format, std::va_list& arguments) {
         return Scanner(DirectInput(*in, *buffer), arguments).scan(format);
     }
     const NumericLocale bracket(io);
-    return Scanner(IOInput(io), arguments).scan(format);
+    return Scanner(LookaheadInput(io), arguments).scan(format);
 }
 
 } // namespace Mz

@@ -1,5 +1,4 @@
-/// Text read by a format in the manner of the wide `scanf`, alike on every platform and in every
-/// locale.
+/// The scanner of the wide `scanf` formats, equal on every platform and in every locale.
 #pragma once
 
 #include <cstdarg>
@@ -8,9 +7,10 @@ namespace Mz {
 
 class QrBufferedIO;
 
-/// Reads from `io`, character by character, what `format` describes, stores it through `arguments`
-/// and returns how many were assigned. What `QrStream::formattedRead` promises, its locale
-/// included. Exceptions of `io` pass through.
+/// Reads values from `io` in `format` and stores them through `arguments`, in the "C" locale, as
+/// `QrStream::formattedRead` documents. Exceptions of `io` pass through.
+///
+/// \return the number of arguments assigned
 int scanText(QrBufferedIO& io, const wchar_t* format, std::va_list& arguments);
 
 } // namespace Mz

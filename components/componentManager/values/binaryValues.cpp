@@ -1,3 +1,8 @@
+/// The binary half of `QrStream`: each type has a wire type of fixed width, whose bytes are
+/// reversed in blocks on writing and in place after reading. A single value, the most frequent
+/// case, skips the blocks and goes straight to the standard buffer where the caller cannot tell the
+/// difference. `bool` has its own reader, because a byte other than 0 and 1 is not a valid `bool`
+/// in memory.
 #include "components/componentManager/buffers/directBuffer.h"
 #include "components/componentManager/stream.h"
 
@@ -14,7 +19,7 @@ namespace {
 
 constexpr const char* source = "components/componentManager/stream";
 
-/// Binary data goes out in blocks of at most this many bytes.
+/// Arrays are written in blocks of at most this many bytes.
 constexpr int blockSize = 1024;
 
 template <std::size_t Width>
@@ -51,8 +56,8 @@ std::uint64_t reversed(std::uint64_t bits) {
 
 static_assert(std::endian::native == std::endian::little);
 
-/// The type whose width a value has in binary data: that of `T`, but for types whose width differs
-/// from platform to platform.
+/// The type whose width and bits a `T` has in binary data. It is `T` itself, except for `bool` and
+/// the types whose width depends on the platform.
 template <class T>
 struct Wire {
     using Type = T;
@@ -83,7 +88,7 @@ using WireBits = typename Bits<sizeof(WireType<T>)>::Type;
 template <class T>
 constexpr bool alwaysFits = sizeof(T) == sizeof(WireType<T>);
 
-/// Whether binary data can hold the value as it is. Only integers can be too wide.
+/// Whether binary data can hold this value. Only integers can be too wide.
 template <class T>
 bool fits(T value) {
     if constexpr (alwaysFits<T>)
@@ -97,7 +102,7 @@ WireBits<T> packed(T value) {
     return reversed(std::bit_cast<WireBits<T>>(static_cast<WireType<T>>(value)));
 }
 
-/// One value, as most come: without a block, and straight to the medium where that is the same.
+/// Writes one value without a block, straight to the standard buffer where possible.
 template <class T>
 void writeValue(QrBufferedIO& io, T value) {
     if (!fits(value))
@@ -113,8 +118,8 @@ void writeValue(QrBufferedIO& io, T value) {
         io.write(bytes, width);
 }
 
-/// Packs values from `values` into `block` up to one that does not fit, at most `count`, and
-/// returns how many.
+/// Packs up to `count` values into `block`, stops before one that does not fit, and returns the
+/// number packed.
 template <class T>
 int packBlock(const T* values, int count, WireBits<T>* block) {
     int ready = 0;
@@ -137,13 +142,13 @@ void writeValues(QrBufferedIO& io, const T* values, int count) {
         const int ready = packBlock(values + done, wanted, block);
         if (ready > 0)
             io.write(block, ready * width);
-        if (ready < wanted) // What came before it is written, as it is with text.
+        if (ready < wanted) // The values before it are written, as in text.
             throw QrStreamEx::ExWriteError(source, __LINE__);
         done += ready;
     }
 }
 
-/// Single bytes are written from where they stand.
+/// Writes values of one byte without a copy.
 void writeBytes(QrBufferedIO& io, const void* values, int count) {
     const auto* bytes = static_cast<const char*>(values);
     for (int done = 0; done < count;) {
@@ -153,8 +158,8 @@ void writeBytes(QrBufferedIO& io, const void* values, int count) {
     }
 }
 
-/// Reads bytes in one call of the IO, or in as few as an `int` can count them, and returns how many
-/// whole values of `width` bytes came.
+/// Reads `count` values of `width` bytes and returns the number of complete ones. Takes one call of
+/// the IO, or as few as the range of `int` allows.
 int readBlock(QrBufferedIO& io, void* values, int count, int width) {
     const int perCall = std::numeric_limits<int>::max() / width;
     int done = 0;
@@ -177,8 +182,7 @@ T unpacked(const char* packed) {
     return static_cast<T>(std::bit_cast<WireType<T>>(reversed(bits)));
 }
 
-/// Turns `count` values, which stand packed at the front of the array as they were read, into
-/// values of the host.
+/// Converts `count` packed values at the front of the array into values of the host, in place.
 template <class T>
 void unpack(T* values, int count) {
     const auto* packed = reinterpret_cast<const char*>(values);
@@ -187,7 +191,7 @@ void unpack(T* values, int count) {
     if constexpr (sizeof(T) == width)
         for (std::size_t index = 0; index < size; ++index)
             values[index] = unpacked<T>(packed + index * width);
-    else // From the last to the first: none overwrites one that is still packed.
+    else // From the last to the first, so that none overwrites a packed one.
         for (std::size_t index = size; index-- > 0;)
             values[index] = unpacked<T>(packed + index * width);
 }

@@ -1,3 +1,6 @@
+/// Objects and uids on streams. The IO reads and writes objects; the stream keeps the requests for
+/// a notification. An object joins the post-load list when it is complete, so objects inside it
+/// come before it. An object whose reading throws does not join.
 #include "components/componentManager/stream.h"
 
 #include <utility>
@@ -15,20 +18,20 @@ void QrStream::transfer(QrPostLoadList& target) {
 
 QrRef<QrCastable> QrStream::readObject(const QrUid* uid, const wchar_t* a, const wchar_t* b) {
     skipSeparator();
-    QrPtr<QrPersistant> wantsToBeTold;
+    QrPtr<QrPersistant> request;
     QrRef<QrCastable> object;
     {
-        // Objects may be read inside the object, each with a place of its own; whatever happens,
-        // the place of the object around this one is the current one again afterwards.
+        // Objects inside this one have their own holders. The holder of the object around this one
+        // is current again afterwards, also after an exception.
         struct Holder {
             QrPtr<QrPersistant>*& current;
             QrPtr<QrPersistant>* const previous;
             ~Holder() { current = previous; }
-        } const holder{postLoadHolder, std::exchange(postLoadHolder, &wantsToBeTold)};
+        } const holder{postLoadHolder, std::exchange(postLoadHolder, &request)};
         object = io().readObject(*this, uid, a, b);
     }
-    if (wantsToBeTold)
-        postLoadList.postLoad(wantsToBeTold.get());
+    if (request)
+        postLoadList.postLoad(request.get());
     return object;
 }
 
