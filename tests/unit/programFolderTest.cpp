@@ -12,7 +12,7 @@ const std::filesystem::path buildFolder = MZ_BUILD_PATH;
 
 TEST(ProgramFolder, IsThatOfTheProgramsFile) {
     EXPECT_TRUE(Kit::programFolder().is_absolute());
-    EXPECT_TRUE(std::filesystem::equivalent(Kit::programFolder(), buildFolder / "bin"));
+    EXPECT_TRUE(std::filesystem::equivalent(Kit::programFolder(), buildFolder / "internals"));
     EXPECT_EQ(Kit::programFolder(), programFolder());
 }
 
