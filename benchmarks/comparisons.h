@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The comparisons, by subject. Each function adds its lines to the table.
 #pragma once
 

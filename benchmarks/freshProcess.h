@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Work that can be measured only once in a process.
 #pragma once
 

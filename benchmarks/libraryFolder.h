@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Folders full of libraries to search through.
 #pragma once
 

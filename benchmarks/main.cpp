@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Measures the library, each piece of work beside its limit, and prints a table of ratios.
 #include "comparisons.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// How an operation of a few nanoseconds is repeated.
 #pragma once
 

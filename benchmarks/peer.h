@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The other side of a library's border: objects made elsewhere, of which the measuring program
 /// knows the interface only. Nothing here can be inlined or resolved at compile time.
 #pragma once

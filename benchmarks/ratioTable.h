@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Each piece of work beside its limit.
 #pragma once
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// What can be measured only once in a process: mzBenchmarkStart WORK FOLDER
 ///
 /// Does the work on the libraries of the folder and writes the processor time that it took, in

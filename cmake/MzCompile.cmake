@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: BSL-1.0
 # How everything of this project is compiled, and where it is put.
 include_guard()
 

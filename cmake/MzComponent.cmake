@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: BSL-1.0
 # mz_add_component(NAME [FOLDER folder] sources...): a component library, which hosts find by
 # scanning the folder it stands in; by default that is components/ in the build folder.
 #

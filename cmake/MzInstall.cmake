@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: BSL-1.0
 # Installation: the libraries, their public headers, the command line, and what finds them again
 # (a CMake package and pkg-config files).
 include_guard()

@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: BSL-1.0
 # Locales for tests and measurements: a minimal system has none but "C". The C library reads them
 # from any folder that LOCPATH names, so they are made in the build folder.
 include_guard(GLOBAL)

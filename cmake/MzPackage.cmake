@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: BSL-1.0
 # What packages contain besides what is installed otherwise: licences and the list of changes, as the
 # component `documents`; and what CPack needs to make the installer for Windows. Included before
 # MzInstall. packaging/package.sh makes the packages.

@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: BSL-1.0
 # The DLLs that programs need beside themselves on Windows. Installed, for users of the package.
 include_guard()
 

@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: BSL-1.0
 # GoogleTest from the sources of Debian's package, and how test programs are made.
 include_guard()
 

@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: BSL-1.0
 # The header-only libraries of others that the tools use. Each is seen through a folder of the build
 # tree that holds its headers and nothing else: a compiler for another system must not see the rest
 # of where they are installed.

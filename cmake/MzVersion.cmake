@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: BSL-1.0
 # The version's home is components/componentManager/version.h. Sets MZ_VERSION, and MZ_SOVERSION,
 # which grows when binary compatibility breaks (see CONTRIBUTING.md).
 include_guard()

@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: BSL-1.0
 # Copies the DLLs of the folder `from` to the folder `to`, apart from the one that `to` has in a form
 # of its own.
 file(GLOB libraries RELATIVE ${from} ${from}/*.dll)

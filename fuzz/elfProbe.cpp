@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 // Files as the component manager looks at them before it loads one. Two readers of the same format,
 // written apart, see to each other.
 #include "components/componentTools/libraryImage.h"

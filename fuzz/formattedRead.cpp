@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 // Any format on any content.
 //
 // Input: the length of the format, the format, the content.

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// What the fuzz targets share. A target is one source: a function that takes any bytes, gives them
 /// to a reader of the library, and stops the program where something does not hold. What a reader
 /// refuses in the stated way holds.

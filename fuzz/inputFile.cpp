@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 #include "fuzz/fuzz.h"
 #include "tests/support/temporaryDirectory.h"
 

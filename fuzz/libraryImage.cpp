@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 // Files as `explain` looks at them, in the formats of both systems.
 #include "components/componentTools/libraryImage.h"
 #include "fuzz/fuzz.h"

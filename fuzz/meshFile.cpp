@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 // Mesh files of every format, by content alone; and every mesh through a store and back.
 //
 // Input: which format, the file.

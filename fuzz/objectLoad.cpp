@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 // Stored objects: of classes that do what is asked of them, and of classes that do not.
 //
 // Input: the kind of stream, the stored objects.

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 // Windows libraries as the component manager looks at them before it maps one. Two readers of the
 // same format, written independently, check each other.
 #include "components/platform/windows/peProbe.h"

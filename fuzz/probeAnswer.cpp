@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 // What a process that loads a component library answers: the library may have written it.
 #include "components/componentTools/probeAnswer.h"
 #include "fuzz/fuzz.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// One content, read past the standard stream where the library can, and through every call where
 /// it cannot know who watches: both must come to the same.
 #pragma once

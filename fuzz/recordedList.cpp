@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 // The recorded list, as the tools read it from a file and as a manager reads it from a stream.
 #include "components/componentTools/recordedList.h"
 #include "components/componentManager/binaryStream.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 // Gives a target, once each, the inputs that are kept: for builds without a fuzzer.
 #include "fuzz/fuzz.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 // Values of all types, single and counted, in all kinds of stream.
 //
 // Input: the kind of stream, the number of steps, the steps, the content.

@@ -1,4 +1,5 @@
 #!/usr/bin/env bash
+# SPDX-License-Identifier: BSL-1.0
 # Builds the packages of the source tree that this script is in:
 #   buildPackages.sh OUTPUT
 # They depend on the sources, the compilers and SOURCE_DATE_EPOCH, and on nothing else: not on the

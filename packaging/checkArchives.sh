@@ -1,4 +1,5 @@
 #!/usr/bin/env bash
+# SPDX-License-Identifier: BSL-1.0
 # Uses the archives and the installer as somebody who downloads them does:
 #   checkArchives.sh PACKAGES WORK
 # Builds a host and a component against each archive, and runs them and the archive's mzcomponents.

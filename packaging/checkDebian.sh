@@ -1,4 +1,5 @@
 #!/usr/bin/env bash
+# SPDX-License-Identifier: BSL-1.0
 # Installs, uses and removes the Debian packages. Run on a fresh system, in a folder that contains
 # packages/ and hello/.
 set -euo pipefail

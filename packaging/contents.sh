@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: BSL-1.0
 # shellcheck shell=bash
 # Functions of the scripts that look into packages; to be sourced.
 

@@ -1,4 +1,5 @@
 #!/usr/bin/env bash
+# SPDX-License-Identifier: BSL-1.0
 # Runs a script in a fresh minimal Debian system, which is gone afterwards:
 #   fresh-root.sh CACHE FOLDER SCRIPT [ARGUMENTS…]
 # FOLDER is copied to /input there, and is the working folder. Needs root: for debootstrap, which

@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: BSL-1.0
 # shellcheck shell=bash disable=SC2154
 # `./run package`: makes the packages twice, compares them, describes what is inside, and uses them.
 # Sourced by run, whose functions it uses.

@@ -1,4 +1,5 @@
 #!/usr/bin/env bash
+# SPDX-License-Identifier: BSL-1.0
 # Writes what is inside a package, with checksums and licences, in SPDX 2.3 as tags and values:
 #   spdx.sh PACKAGE >PACKAGE.spdx
 set -euo pipefail

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// An ordinary shared library that stands among components without being one: it exports functions
 /// of its own, and no entry point.
 #include "components/base/export.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// An ordinary small component library, of which the benchmarks make many.
 #include "identity.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The identity of a generated component library. It stands in the file as plain bytes, which each
 /// copy of the file has replaced by its own.
 #pragma once

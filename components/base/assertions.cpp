@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Throws the exception that aborts the current work.
 ///
 /// The exception is a normal C++ exception, not a call of `std::abort`: the stack unwinds, and the

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The abort of the current work by an exception.
 #pragma once
 

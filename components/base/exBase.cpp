@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Keeps the texts of an exception.
 ///
 /// Both texts are composed when they are set, not when they are read: the getters then return plain

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The base class of all exceptions of the library family.
 #pragma once
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Export and import macros of the shared libraries, and a hook that runs at unload. Apart from the
 /// platform layer, only this header depends on the object file format.
 ///

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Templates and a macro that keep the source of a component library short. Header-only.
 ///
 /// A component library consists of a few builders and one line that lists them:

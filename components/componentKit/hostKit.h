@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Functions that prepare names and search paths for the library. Header-only.
 ///
 ///     const auto plugins = Mz::Kit::programFolder() / "plugins";
@@ -16,9 +17,9 @@
 
 namespace Mz::Kit {
 
-/// Returns `bytes` as wide characters, converted as the library converts names: by the locale of the
-/// calling thread. In the locale "C", in which every program starts, and in "POSIX", each byte is
-/// one character.
+/// Returns `bytes` as wide characters, converted as the library converts names: by the locale of
+/// the calling thread. In the locale "C", in which every program starts, and in "POSIX", each byte
+/// is one character.
 ///
 /// \throws std::system_error  if the bytes are not valid text in this locale
 inline std::wstring wideText(std::string_view bytes) {

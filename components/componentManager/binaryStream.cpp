@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Each single value is an array of one: the operators call the base's `write` and `read`. They
 /// name the base class, so these calls are not virtual.
 #include "components/componentManager/binaryStream.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The stream that writes every value in binary form.
 #pragma once
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The virtual functions that anchor the vtable of `QrBufferedIO` in this library, so that every
 /// component library shares one type description. The buffers are in buffers/.
 #include "components/componentManager/bufferio.h"

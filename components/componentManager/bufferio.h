@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The byte and character layer below streams and importers, and its two implementations on
 /// standard streams.
 #pragma once

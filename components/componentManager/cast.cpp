@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Implements the root of castable objects.
 ///
 /// The root counts nothing, so that static, local and member objects need no counter. The casts are

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The whole object model in one header: interface identities, castable objects, references, casts,
 /// the templates that implement them, and the exceptions.
 #pragma once

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The templates that implement casts and reference counts for concrete classes.
 ///
 /// Choose by the interfaces of the class and by the owner of its objects:

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The root interface of all objects that cross library boundaries, and the casts.
 #pragma once
 

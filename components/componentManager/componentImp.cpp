@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The interfaces, and the manager's operations.
 ///
 /// The destructors and the empty private functions are defined here, so that each interface's

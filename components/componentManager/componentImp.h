@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The component manager, and the interfaces of a component library.
 ///
 /// For hosts: `QrGetComponentManager()` and `QrComponentManager`.

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Enumerators: callbacks that receive the elements of a sequence.
 ///
 /// An enumerating function takes an enumerator by reference and returns the action that ended the

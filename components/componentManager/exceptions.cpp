@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Sets the fixed reasons of the exceptions.
 ///
 /// Every constructor, copy constructor and destructor is defined here, not inline: the type

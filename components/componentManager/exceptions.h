@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The exceptions of the library.
 ///
 /// All exceptions are thrown by value. Each is both a `std::runtime_error`, for generic handlers,

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The export macro of libMZcomponentManager.
 #pragma once
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Replaces files safely, and makes paths full.
 ///
 /// The new content goes into a new file in the same folder, which is renamed at the end: renaming

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// File operations for hosts and tools: safe replacement of a file, and full paths.
 ///
 /// All functions may be called from any thread.

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Implements the file forms of `canImport` and `import` by the buffer forms.
 ///
 /// File stream and buffer are locals, so that the file is closed on every return and exception. An

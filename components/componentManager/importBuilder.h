@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Import builders: builders that read a foreign file into an object.
 #pragma once
 

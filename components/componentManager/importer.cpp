@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Implements the base importer by three enumerators of the component manager's builders.
 ///
 /// The enumerators share a base that selects the import builders of one builder name. Selection and

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Importers, which find the builder that can read a file.
 #pragma once
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Converts between wide text, bytes and file names.
 ///
 /// File names are bytes on one system and wide text on the other. Overloads handle both forms, and

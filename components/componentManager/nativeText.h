@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Conversions between the wide names of the library's functions and the system's file names.
 ///
 /// The component manager, its controllers and its importers take names as wide text. On Windows the

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Post-load lists are chains of nodes, each of which owns the next. A list knows its last node by
 /// a weak pointer, as that may move to another list or end with its notification. Objects may
 /// change the lists from within `loadFinished`: the loop keeps the current node alive, and flags in

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Objects that are stored on streams, and their notification after a load.
 #pragma once
 

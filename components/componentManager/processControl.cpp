@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Implements the default controller and its file lookup.
 ///
 /// The default controller has no state and is never destroyed, so that work can report to it before

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// How long-running work reports to the user: messages, progress, abort and file lookup.
 ///
 /// Long-running work, such as an import, has no user interface. It reports to the process

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The text half of `QrStream`: every number goes through `formattedWrite` and `formattedRead`,
 /// which derived classes may override. A separator is written late, before the next value, so that
 /// data does not end in one. Numbers in the stream's own formats skip the general formatter, and

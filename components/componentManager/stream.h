@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The base of the persistent streams: typed values on a `QrBufferedIO`, as text or binary data.
 #pragma once
 

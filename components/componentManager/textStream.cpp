@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Each array is a sequence of single values. Writing calls the base's `<<` by name. Reading does
 /// not call `>>`, which throws: here the end of the input is a short count. Numbers are read by
 /// `formattedRead` with the format of the type.

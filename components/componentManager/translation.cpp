@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Implements the registry of translators: a hash map from the address of the translated object to
 /// its list of translators.
 ///

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Translators: objects that supply an interface for another object.
 ///
 /// An object may lack an interface that a client needs. Another object, its *translator*, can

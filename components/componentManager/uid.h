@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The 128-bit identity of an interface, and the 64-bit integer type of the library.
 #pragma once
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Converts UTF-8.
 ///
 /// One decoder takes code points from bytes, and one encoder for each kind of text appends them.

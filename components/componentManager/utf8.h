@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Conversions from and to UTF-8, independent of the locale.
 ///
 /// All functions may be called from any thread and throw `std::bad_alloc` only.

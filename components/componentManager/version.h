@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The version of the library, as numbers for the preprocessor.
 ///
 /// The build reads its own version from these lines. While the major number is 0, a new minor

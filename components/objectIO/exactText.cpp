@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Exact text is a sequence of numbers, because numbers are the one thing that every kind of stream
 /// carries exactly in every locale. The codes are those of whole characters: surrogate pairs are
 /// joined when written and split when read where `wchar_t` has 16 bits, so files are portable.

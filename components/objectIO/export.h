@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Export macro of libMZobjectIO.
 #pragma once
 

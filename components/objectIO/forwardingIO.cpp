@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Forwards every operation to the inner IO, one call for one call, so that a derived class that
 /// overrides some operations leaves the calls of the others as they are. The reference keeps a
 /// counted inner IO alive.

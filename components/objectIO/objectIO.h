@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Buffered IO for whole objects, which `QrInBuffer` and `QrOutBuffer` do not transfer.
 ///
 /// Put one of these classes between a stream and its buffer to use `stream << object` and

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Reads object records (objectRecord.h). A new object is in the table before it reads itself, so
 /// that an object inside it can refer back to it. Nested objects pass through `readObject` again;
 /// each level restores the stream and form of the level around it. A failure is explained once, at

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Writes object records (objectRecord.h). Each object gets its number before it writes itself, so
 /// that an object inside it can refer back to it. Nested objects pass through `writeObject` again;
 /// each level restores the stream and form of the level around it. Checks that reject an object run

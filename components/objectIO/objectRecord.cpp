@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Formats the positions and uids of the object IO's messages. Both IOs use them, so that the
 /// reasons of their exceptions have one form.
 #include "components/objectIO/objectRecord.h"

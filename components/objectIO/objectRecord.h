@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The form of an object on a stream.
 ///
 ///     number                 0 for null, a known number for an object that was stored before, the

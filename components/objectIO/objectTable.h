@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The numbered references of an object IO to its objects.
 #pragma once
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Decides from the kind of each piece of text (`QrStream::textKind`) whether it can be read back
 /// and which separator it needs. All that it keeps of earlier output is how the last piece ended.
 /// It throws when the object is written, because the data is lost by the time it is read.

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The separators between the values of an object, for each kind of stream.
 ///
 /// A stream writes no more than a value needs; the program ensures that a reader finds its end.

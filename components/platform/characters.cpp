@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Converts characters one by one, each from the initial shift state.
 ///
 /// The "C" locale is handled here, because the C libraries disagree about bytes above 127. The

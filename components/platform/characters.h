@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Conversion of multibyte characters in the current C locale, the same on every system.
 ///
 /// While LC_CTYPE is "C" or "POSIX", a byte and its character have the same value, from 0 to 255.

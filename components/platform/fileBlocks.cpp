@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Caches two blocks of a file.
 ///
 /// A read that neither block contains refills the block that was not used last. Two blocks suffice,

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Small reads from a file that may be damaged or hostile, for the readers of library formats.
 /// Private to the platform layer.
 #pragma once

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The system functions for replacing a file safely and for full paths. Each system has its own
 /// implementation, as with `platform.h`.
 ///

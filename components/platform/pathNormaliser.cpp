@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Normalises a path in one pass from left to right.
 ///
 /// The input is a view from which roots, names and separators are removed at the front, and the

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The normal form of directory and file names.
 #pragma once
 

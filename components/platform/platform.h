@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// What the library needs from the operating system. Each system has its own implementation
 /// (`windows/`, `posix/`), which the build selects. No other file depends on the system.
 ///

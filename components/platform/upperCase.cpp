@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Maps UTF-16 code units to upper case by a table of ranges.
 ///
 /// NTFS keeps a folder sorted by UTF-16 code units, each mapped to upper case by a table of single

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Upper case and sort keys, for the order in which Windows lists the files of a folder.
 #pragma once
 

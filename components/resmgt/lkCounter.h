@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The atomic counter of counted objects.
 #pragma once
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// What the mesh components share with their hosts: the interface of meshes, the importer, and the
 /// names and identities by which both are found.
 #pragma once

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// A host of the mesh components: lists them, imports files through them, and saves and loads the
 /// results. It uses each part of the library that a host needs: the recorded list, an importer, a
 /// process controller, objects in files. Its output is the same on every system, so that a script

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The component that makes the mesh importer. The base importer does all the work: it finds the
 /// file, selects a builder by name and content, and calls it. The component is separate from the
 /// formats, so that a format can be added or left out without it.

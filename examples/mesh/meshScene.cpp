@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The component that makes scenes and stored meshes. Objects that are loaded from a stream are
 /// made here: each builder has the uid of the class, by which the object IO finds it. Import
 /// builders cannot do that, since they need a file.

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// What the scene component shares with its hosts: the interface of scenes of meshes.
 #pragma once
 

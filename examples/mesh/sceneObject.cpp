@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Writes a scene as the number of its instances and, for each, its name, its transformation and
 /// its mesh as an object. Names go through `QrWriteExactText`, because a text stream carries no
 /// other strings exactly. Reading builds a second list and replaces the instances only when all are

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The implementation of `Scene`: a counted, persistent object.
 #pragma once
 

@@ -1,4 +1,5 @@
 #!/usr/bin/env bash
+# SPDX-License-Identifier: BSL-1.0
 # Compares the names that a built library exports with the list that is kept here.
 #   checkExports.sh LIBRARY LIST SYMBOL_TOOL DEMANGLER [--write]
 # LIST ends in .linux.txt or .windows.txt; SYMBOL_TOOL is nm for the one, objdump for the other.

@@ -1,4 +1,5 @@
 #!/usr/bin/env bash
+# SPDX-License-Identifier: BSL-1.0
 # The rules of the house that a search through the tree can check.
 #   checkTree.sh SOURCE_DIRECTORY RULE
 set -u

@@ -1,4 +1,5 @@
 #!/usr/bin/env bash
+# SPDX-License-Identifier: BSL-1.0
 # Proves that each rule of checkTree.sh notices what it is there for, in a tree that breaks it.
 set -u
 here=$(cd "$(dirname "$0")" && pwd)

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// A client that casts to every interface, and so needs the identity of each from the library.
 #include "components/componentManager/componentImp.h"
 #include "components/componentManager/importer.h"

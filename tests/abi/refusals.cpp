@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Pieces of code that must not compile, one at a time.
 #include "components/componentKit/componentKit.h"
 #include "components/componentManager/cast.h"

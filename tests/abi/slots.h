@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Where virtual operations stand in the tables of classes.
 #pragma once
 

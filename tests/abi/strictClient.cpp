@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 // A client that makes something of every template that the headers offer, to be compiled with all
 // the warnings that people ask for. Headers that are found by `-I` have to stand those, too.
 #include "components/componentKit/componentKit.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The library that `missesDependency` cannot find.
 #include "components/base/export.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Written with the kit. A static object asks for the library's own description in its destructor.
 #include "components/componentKit/componentKit.h"
 #include "tests/components/testUids.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// One of two versions of a library, MZ_TEST_VERSION; the second has another builder besides.
 #include "tests/components/testUids.h"
 

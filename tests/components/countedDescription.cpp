@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Returns a new counted description each time, without any reference on it.
 #include "tests/components/testUids.h"
 

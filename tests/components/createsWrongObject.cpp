@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// What it gives as a builder is a counted object of another kind.
 #include "tests/components/testUids.h"
 

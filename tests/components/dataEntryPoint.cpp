@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// What it exports under the entry point's name is no function.
 #include "components/base/export.h"
 

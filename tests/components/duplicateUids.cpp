@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Two builders with one identifier.
 #include "tests/components/testUids.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Ends the thread that loads it.
 #include "tests/components/testUids.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Exports the entry point for `entryPointInDependency`, which does not.
 #include "tests/components/testUids.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Exports no entry point, but needs a library that does.
 #include "components/base/export.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Ends its enumeration with a failure, which says nothing about the builders it offered.
 #include "tests/components/testUids.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// A program that exports the entry point. It is no library for all that.
 #include "components/base/export.h"
 

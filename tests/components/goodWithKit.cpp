@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 #include "components/componentKit/componentKit.h"
 #include "tests/components/testUids.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Initialises the manager while it is being unloaded.
 #include "tests/components/testUids.h"
 

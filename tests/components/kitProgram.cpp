@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// A program that is built like a component, and exports what a component exports.
 #include "components/componentKit/componentKit.h"
 #include "tests/components/testUids.h"

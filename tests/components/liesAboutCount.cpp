@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Says MZ_TEST_COUNT, and offers another number of builders.
 #include "tests/components/testUids.h"
 

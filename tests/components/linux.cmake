@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: BSL-1.0
 # What ends a process here.
 mz_add_fault(endsThreadInInitialiser endsThreadInInitialiser.cpp)
 mz_add_fault(throwsInFinaliser throwsInFinaliser.cpp)

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Libraries that need one another, for the rules by which the loader finds them. Each calls the
 /// next one, so that the linker keeps the need.
 #if defined(MZ_TEST_NEXT)

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Exports something, but not the entry point. Its initialiser must never run; if it does, it
 /// leaves the file that the environment names.
 #include "components/base/export.h"

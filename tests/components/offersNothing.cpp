@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// A sound library without a single builder.
 #include "tests/components/testUids.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Its item has the class of a builder description, but does not answer for that interface.
 #include "tests/components/testUids.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Component libraries written by hand, without the component kit, down to the few classes that
 /// each of them needs. A library with a fault derives from one of them and gets one thing wrong.
 #pragma once

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Uses the manager from within everything that the manager calls.
 #include "tests/components/testUids.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Asks for its own builder while it is being loaded.
 #include "tests/components/testUids.h"
 

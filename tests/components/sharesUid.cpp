@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// One of two libraries with a builder of the same identifier; MZ_TEST_SHARER says which.
 #include "tests/components/testUids.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Stands in the folder of a private assembly.
 #include "components/base/export.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Offers some builders, then throws an exception of a type that nobody else knows.
 #include "tests/components/testUids.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Has no description, and throws while it is unloaded for that.
 #include "tests/components/testUids.h"
 

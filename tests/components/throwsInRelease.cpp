@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Its description throws from `release`, from the MZ_TEST_RELEASE-th call on.
 ///
 /// A registration releases twice: the pointer of the entry point, and the interface cast from it.

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// One of its items throws when asked for its text.
 #include "tests/components/testUids.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The smallest library with the entry point; it needs no other library.
 #include "components/base/export.h"
 

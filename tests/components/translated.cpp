@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Neither what the entry point returns nor its item nor its builder answers for its interface;
 /// translators do for each.
 #include "tests/components/testUids.h"

@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: BSL-1.0
 # A library whose entry point is forwarded to another library's.
 mz_add_fault(forwardsEntryPoint forwardsEntryPoint.cpp forwardsEntryPoint.def)
 

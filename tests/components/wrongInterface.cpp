@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// What it returns is no description, and counted.
 #include "tests/components/testUids.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// What discovery leaves in the map of the libraries' names.
 #include "tests/integration/managerFixture.h"
 

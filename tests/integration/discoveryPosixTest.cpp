@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// What files are on Linux alone: pipes, links, and names that differ in letter case only.
 #include "components/componentKit/hostKit.h"
 #include "tests/integration/managerFixture.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Which files of which folders become records, and what becomes of those that are no libraries.
 #include "tests/integration/managerFixture.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// What files and libraries are on Windows alone: attributes, manifests, forwarded exports.
 #include "tests/integration/managerFixture.h"
 #include "tests/support/peFile.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The reader of ELF symbol tables, on sound libraries and on everything else.
 #include "components/platform/posix/elfProbe.h"
 #include "tests/integration/managerFixture.h"

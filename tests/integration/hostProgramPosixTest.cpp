@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// What ends a process on Linux, shown in a process of its own.
 #include "tests/integration/managerFixture.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// A host that loads the component manager while it runs and unloads it again.
 ///
 ///     loadingHost LIBRARY FUNCTION MODE PATH...

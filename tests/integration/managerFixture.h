@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// A component manager of the test's own, and a folder for the libraries that it is to find.
 #pragma once
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The reader of Windows libraries, on sound libraries and on everything else. It is the same on
 /// every system.
 #include "components/platform/windows/peProbe.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The platform layer on Linux, where it has something of its own.
 #include "components/platform/characters.h"
 #include "components/platform/platform.h"

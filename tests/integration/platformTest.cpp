@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// What every system's platform layer must do. The same tests everywhere.
 #include "components/platform/platform.h"
 

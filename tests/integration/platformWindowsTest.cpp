@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The platform layer on Windows, where it has something of its own.
 #include "components/platform/platform.h"
 #include "components/platform/upperCase.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// A plug-in of a host: a library that uses the component manager, and its registries before and
 /// after everything else.
 #include "components/componentManager/processControl.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The manager that a process has from the start. It initialises once, so each of these tests needs
 /// a process of its own, which it has as an entry of ctest.
 #include "tests/integration/managerFixture.h"

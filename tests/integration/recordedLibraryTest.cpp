@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// What a start makes of the records of an earlier one. The records are put in by hand.
 #include "tests/integration/managerFixture.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// A host to be run by tests: initialises the manager and prints what it found.
 ///
 ///     testHost [OPTION...] [PATH]   initialises with that search path, by default with null

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// What happens when a host unloads the component manager, or a plug-in that uses it, before it
 /// ends.
 #include "tests/integration/managerFixture.h"

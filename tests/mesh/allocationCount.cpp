@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 // The program's own allocation functions. They have a file to themselves, where no compiler inlines
 // one half of a pair and misses the other.
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Counts what the program allocates.
 #pragma once
 

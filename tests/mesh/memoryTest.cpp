@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 // The formats by themselves, in a program that counts what they allocate.
 
 #include "allocationCount.h"

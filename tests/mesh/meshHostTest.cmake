@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: BSL-1.0
 # Runs the host over the samples and compares what it writes, byte for byte, with what is written
 # here for every platform.
 #   cmake -DHOST=command -DSAMPLES=folder -DEXPECTED=folder -DOUTPUT=folder -P meshHostTest.cmake

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 // Meshes and scenes that are stored and loaded.
 #include "meshTestSupport.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Importing test data through the mesh components, and hearing what is said about it.
 #pragma once
 

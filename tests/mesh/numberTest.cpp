@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 #include "examples/mesh/reading/number.h"
 
 #include <gtest/gtest.h>

@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: BSL-1.0
 # Makes the samples anew and compares them with those of the repository.
 #   cmake -DPYTHON=program -DSAMPLES=folder -DOUTPUT=folder -P samplesTest.cmake
 file(REMOVE_RECURSE ${OUTPUT})

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 // Saving that never loses the file that was there.
 #include "examples/mesh/saving/objectFile.h"
 #include "examples/mesh/saving/recordedList.h"

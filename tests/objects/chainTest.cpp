@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 // Chains of objects that are longer than the stack is deep.
 #include "tests/objects/support.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 // Files that were cut or changed anywhere: an exception, in bounded memory, and nothing half done.
 #include "tests/objects/support.h"
 

@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: BSL-1.0
 # The examples of docs/objects.md, in files of their own: they are compiled as they stand there.
 set(page ${PROJECT_SOURCE_DIR}/docs/objects.md)
 set_property(DIRECTORY APPEND PROPERTY CMAKE_CONFIGURE_DEPENDS ${page})

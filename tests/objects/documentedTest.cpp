@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 // What the documentation shows, compiled from there.
 #include "documentedHost.h"
 

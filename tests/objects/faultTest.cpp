@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 // What is wrong with an object, its class or its file, and what is said about it.
 #include "tests/objects/support.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 // The forms that values have inside objects: what comes back exactly, and what is refused when it
 // is written.
 #include "tests/objects/support.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 // Graphs of objects that are written and come back.
 #include "tests/objects/support.h"
 

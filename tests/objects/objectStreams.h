@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Whole objects on streams over bytes in memory.
 #pragma once
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 // Strings inside objects: exact, or refused.
 #include "tests/objects/support.h"
 

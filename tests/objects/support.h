@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// What the tests of whole objects share: nodes, and objects whose stored form is made up.
 #pragma once
 

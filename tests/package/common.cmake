@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: BSL-1.0
 # Functions of the tests with outside projects.
 
 # run(COMMAND...): the output is `output`; fails the test if the command fails.

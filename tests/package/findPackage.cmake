@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: BSL-1.0
 # Installs `build` below `work` and asks for it in several ways, by the project `source`.
 include(${CMAKE_CURRENT_LIST_DIR}/common.cmake)
 

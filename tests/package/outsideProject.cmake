@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: BSL-1.0
 # Installs `build` below `work`, builds the project `source` against that, and runs its host.
 include(${CMAKE_CURRENT_LIST_DIR}/common.cmake)
 

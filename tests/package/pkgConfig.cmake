@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: BSL-1.0
 # Installs `build` below `work` and compiles the host and the component of `source` with one line
 # each, as pkg-config says.
 include(${CMAKE_CURRENT_LIST_DIR}/common.cmake)

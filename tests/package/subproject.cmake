@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: BSL-1.0
 # Adds a copy of the library's sources to the project `source` as a folder of it, where no headers of
 # third parties are found; builds and installs the project; and looks at where it wrote.
 include(${CMAKE_CURRENT_LIST_DIR}/common.cmake)

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// A locale whose decimal separator is a comma, from whatever the system has.
 #pragma once
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 // Input that ends too early, or claims more than it has.
 #include "tests/streams/support.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 // Files of the system's that fail: reading one's own memory at no address, writing to a full
 // device.
 #include "tests/streams/support.h"

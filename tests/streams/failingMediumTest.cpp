@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 // Media that fail at the n-th call, for every n.
 #include "tests/support/failingMedium.h"
 #include "tests/streams/support.h"

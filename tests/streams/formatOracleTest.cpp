@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 // Random formats and inputs, against the C library.
 #include "tests/streams/commaLocale.h"
 #include "tests/streams/oracle.h"

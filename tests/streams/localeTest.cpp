@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 // Streams under a locale whose decimal separator is a comma, and the locale after them.
 #include "tests/streams/commaLocale.h"
 #include "tests/streams/recordingIO.h"

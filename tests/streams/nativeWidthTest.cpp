@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 // Values that the host's types can hold and the stream's widths cannot. Only where there are such.
 #include "tests/streams/support.h"
 

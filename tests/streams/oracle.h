@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The C library's own wide printer and scanner, with the conventions of our formats.
 #pragma once
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// A foreign IO: works like the library's own, writes down every call, and may look at the locale.
 #pragma once
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 // Random values through streams and back, with fixed seeds.
 #include "tests/streams/support.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 // Where the library goes past a standard stream to its buffer, everything comes out as if it did
 // not.
 #include "tests/streams/support.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Streams whose every call might be watched, and one kind of stream more.
 #pragma once
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// What the tests of the streams share: bytes to read from and to write to.
 #pragma once
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 // The C library's locale and formatting on Linux, for comparison.
 #include "tests/streams/commaLocale.h"
 #include "tests/streams/oracle.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// A medium that fails at a call of one's choice, for every reader and writer.
 #pragma once
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// What component libraries made for the tests tell about themselves while they are used.
 ///
 /// A shared library of its own, so that a test and the components that it loads write to the same

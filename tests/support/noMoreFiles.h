@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// A process that can open no further file (POSIX).
 #pragma once
 

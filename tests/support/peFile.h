@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Libraries in the format of Windows, made and damaged byte by byte on any system.
 #pragma once
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// A folder of its own for each test.
 #pragma once
 

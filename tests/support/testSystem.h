@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// What the tests need of the operating system: one description, one source for each system.
 #pragma once
 

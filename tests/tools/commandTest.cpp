@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The command line, as scripts use it.
 #include "tests/tools/toolsFixture.h"
 

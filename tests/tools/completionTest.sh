@@ -1,4 +1,5 @@
 #!/usr/bin/env bash
+# SPDX-License-Identifier: BSL-1.0
 # The completion offers what the program has: every command and every option in its help.
 #   completionTest.sh COMPLETION PROGRAM...
 set -euo pipefail

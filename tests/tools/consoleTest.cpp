@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 #include "components/componentTools/console.h"
 #include "components/base/assertions.h"
 #include "tests/support/temporaryDirectory.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The smallest libraries in either system's format, made byte by byte.
 #pragma once
 

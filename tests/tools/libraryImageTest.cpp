@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Both formats, on every system, whole and damaged.
 #include "tests/tools/images.h"
 

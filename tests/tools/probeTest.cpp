@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The process in which a library is tried: how it ends, and what is taken for its answer.
 #include "tests/tools/toolsFixture.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The table of the benchmarks, as other programs read it.
 #include "benchmarks/ratioJson.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// A host that starts with a recorded list, and tells what that cost it.
 ///
 ///     recordedHost LIST PATH

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// What the test host's program has for its components.
 #pragma once
 

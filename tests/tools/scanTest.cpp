@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 #include "tests/tools/toolsFixture.h"
 
 #include "components/componentManager/utf8.h"

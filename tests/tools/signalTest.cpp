@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Hosts that ignore the ends of their children, where the system knows such.
 #include "tests/tools/toolsFixture.h"
 

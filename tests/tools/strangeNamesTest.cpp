@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// File names that only some systems allow.
 #include "tests/tools/toolsFixture.h"
 

@@ -1,4 +1,5 @@
 #!/usr/bin/env bash
+# SPDX-License-Identifier: BSL-1.0
 # What the program says on standard error, and what it does when its output is lost.
 #   streamsTest.sh COMPONENTS PROGRAM...
 set -uo pipefail

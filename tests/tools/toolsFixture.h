@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// A folder of component libraries, sound ones and others, for the tools to look at.
 #pragma once
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Running out of memory on request.
 #pragma once
 

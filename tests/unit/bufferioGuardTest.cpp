@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 // Standard streams that do more than one operation: they flush themselves or another stream, and
 // throw what a mask demands.
 #include "components/componentManager/bufferio.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 #include "components/componentManager/bufferio.h"
 #include "components/platform/characters.h"
 #include "tests/unit/locales.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 #include "components/componentManager/enumerator.h"
 #include "components/componentManager/manager/componentImpPrivate.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 #include "components/base/assertions.h"
 #include "components/componentManager/cast.h"
 #include "components/platform/platform.h"

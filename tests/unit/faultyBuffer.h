@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// A medium that fails, or throws, at a call of one's choice.
 #pragma once
 

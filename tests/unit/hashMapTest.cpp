@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 #include "components/componentManager/support/hashMap.h"
 #include "components/componentManager/control/threadHash.h"
 

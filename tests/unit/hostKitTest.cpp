@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 // Names of files on their way from a host to the library.
 #include "components/componentKit/hostKit.h"
 #include "tests/unit/locales.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Import builders that do what a test tells them, in the process's component manager.
 #pragma once
 

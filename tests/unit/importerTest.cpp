@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 #include "components/componentManager/processControl.h"
 #include "tests/support/temporaryDirectory.h"
 #include "tests/unit/importTestObjects.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The locales in which multibyte text is tested; each platform has its own.
 #pragma once
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 // Names and text between the system and the library.
 #include "components/componentManager/nativeText.h"
 #include "components/componentManager/utf8.h"

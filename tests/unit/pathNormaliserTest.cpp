@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 #include "components/componentManager/manager/componentImpPrivate.h"
 
 #include <gtest/gtest.h>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// A folder to replace files in.
 #pragma once
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 // Replacing a file such that the old one is never lost.
 #include "components/componentManager/exceptions.h"
 #include "components/componentManager/files.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// What is written to the standard error stream.
 #pragma once
 

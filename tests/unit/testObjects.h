@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Interfaces and objects that the tests of the object model share.
 #pragma once
 

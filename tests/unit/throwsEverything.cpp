@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 #include "tests/unit/throwsEverything.h"
 
 #include "components/base/assertions.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// A library that throws each exception there is.
 #pragma once
 

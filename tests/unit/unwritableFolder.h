@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Where files cannot be written.
 #pragma once
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The input buffer fetches single bytes, converts them, and puts back those that it did not need,
 /// so that the position is exact after each operation. It keeps no data: all state is the stream's.
 /// Where the stream's guard has no effect, the bytes come straight from the standard buffer

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The output buffer converts wide characters one by one and writes the bytes of each; it keeps no
 /// data. Where byte and character code are equal, it writes text in blocks. Where the stream's
 /// guard has no effect, the bytes go straight to the standard buffer (directBuffer.h).

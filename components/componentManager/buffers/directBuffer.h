@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Direct access to the buffer of a standard stream, where the caller cannot tell the difference.
 ///
 /// The guard of a standard stream takes several times as long as the transfer of a value. It has no

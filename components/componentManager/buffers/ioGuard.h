@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Operations on standard streams whose result is only in the stream's flags.
 ///
 /// Around each operation a standard stream flushes the stream that it is tied to, flushes itself

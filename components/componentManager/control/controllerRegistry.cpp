@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Implements the registry of process controllers: a hash map from the system's thread identifier
 /// to the controller, under a lock.
 ///

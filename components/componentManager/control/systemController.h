@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The variable that holds the system-wide controller.
 #pragma once
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The hash function of thread identifiers.
 #pragma once
 

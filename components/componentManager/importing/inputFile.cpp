@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Opens input files through the platform layer: standard file streams do not take wide names on
 /// every platform, and on some they open directories.
 #include "components/componentManager/importing/inputFile.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Opens the files that importers read.
 #pragma once
 

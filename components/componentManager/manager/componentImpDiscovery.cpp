@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Lists the candidates of a search path, and merges them with the restored records.
 ///
 /// All directories are listed in one call, so that a file with several names gets one record. The

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Loads one component library, and records what it describes.
 ///
 /// A library is loaded only if its file is new or has changed, or if a client asks for one of its

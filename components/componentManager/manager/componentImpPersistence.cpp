@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Writes and reads the recorded list.
 ///
 /// The order of the fields is the stored format and must not change. A list may come from a damaged

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The private classes of the component manager. Exported for the tests only.
 ///
 /// The sources: `componentImp.cpp` (the interfaces and the manager's operations),

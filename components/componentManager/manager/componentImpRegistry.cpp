@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Builder records, and their index.
 ///
 /// A record holds copies of the texts of its builder, so that clients read them without loading the

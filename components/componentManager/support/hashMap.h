@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The hash map of the registries. Private to this library.
 ///
 /// Unlike `std::unordered_map`, it is constant-initialised, so that registries work while other

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Exports the uids of all interfaces.
 ///
 /// Clients on Windows import each uid from this library. A uid is defined in a header, so it is

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The export macro of internal names that only the tests use.
 ///
 /// The shipped library hides these names. The tests link a second library, built from the same

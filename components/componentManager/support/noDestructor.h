@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// A wrapper for process-wide objects that are never destroyed.
 #pragma once
 

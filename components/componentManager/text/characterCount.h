@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Saturating counts of characters, which stop at the largest `int` and do not overflow.
 ///
 /// A line, or the text of one format, may have more characters than an `int` can count. The exact

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// A formatter that parses the wide `printf` formats itself. The C libraries differ between
 /// platforms in `%s`, exponents and the width of a `long`, depend on the locale, and limit the
 /// length of the output. `std::to_chars` supplies the digits of floating-point numbers: it rounds

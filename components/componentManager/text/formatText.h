@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The formatter of the wide `printf` formats, equal on every platform and in every locale.
 #pragma once
 

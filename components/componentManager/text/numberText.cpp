@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Formats single numbers into a small buffer. The 16 digits of a `double` take most of the time:
 /// the standard library finds the fewest digits that read back much faster than any fixed number of
 /// them. So these are used where they provably are, or round to, the digits of `%.16g`. The other

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The fast formatter for single numbers in the formats of the streams' operators.
 #pragma once
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Chooses between the two ways to the "C" locale by the exact class of the IO. The way without the
 /// C library is preferred: it is fast and has no effect on other threads.
 #include "components/componentManager/text/numericLocale.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Scope in which a stream reads or writes text in the "C" locale.
 #pragma once
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Counts the depth of the scopes for each thread, so that they nest and do not affect other
 /// threads. The count is in a word of the platform layer, which leaves no heap memory when the
 /// library is unloaded.

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Scope in which buffered IO converts characters as in the "C" locale.
 #pragma once
 

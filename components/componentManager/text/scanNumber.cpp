@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Copies what the standard buffer holds into a small window, parses the number there, and moves
 /// the buffer back to its end: a few pointer moves in place of a call for each character. The
 /// parser accepts only ordinary numbers that end inside the window. Everything else is put back for

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The fast scanner for a single number in a standard buffer, which is nearly all formatted
 /// reading.
 #pragma once

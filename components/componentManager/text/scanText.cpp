@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// A scanner that reads character by character and never further than one lookahead character, so
 /// that the next read continues exactly where this one stopped. The C library's scanner cannot do
 /// that on a `QrBufferedIO`, and differs between platforms and locales. The scanner is a template

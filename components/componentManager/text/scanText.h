@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The scanner of the wide `scanf` formats, equal on every platform and in every locale.
 #pragma once
 

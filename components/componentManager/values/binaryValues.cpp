@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The binary half of `QrStream`: each type has a wire type of fixed width, whose bytes are
 /// reversed in blocks on writing and in place after reading. A single value, the most frequent
 /// case, skips the blocks and goes straight to the standard buffer where the caller cannot tell the

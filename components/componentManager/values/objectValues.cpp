@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Objects and uids on streams. The IO reads and writes objects; the stream keeps the requests for
 /// a notification. An object joins the post-load list when it is complete, so objects inside it
 /// come before it. An object whose reading throws does not join.

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Lists the candidates of directories.
 ///
 /// A listing contains the kind and number of most files, so their status is not queried: that would

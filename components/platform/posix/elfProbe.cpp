@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Looks up a symbol in an ELF file as the loader would.
 ///
 /// The check reads the headers, the dynamic section and the hash table, and follows one chain of

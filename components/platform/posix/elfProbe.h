@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Checks a shared library without loading it.
 #pragma once
 

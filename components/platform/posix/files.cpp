@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The file functions for Linux.
 ///
 /// A rename is atomic here. `fsync` of the file brings its content to the medium, and `fsync` of

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The platform functions for Linux.
 ///
 /// Libraries are checked by the reader of ELF files before they are loaded. The loader has no

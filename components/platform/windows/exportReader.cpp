@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Reads a library through a file handle.
 ///
 /// The file is opened with all sharing modes, so that other programs may read, write and delete it

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Checks a file with the reader of Windows libraries.
 #pragma once
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The file functions for Windows.
 ///
 /// A rename with `MOVEFILE_WRITE_THROUGH` replaces a file in one step. It fails while another

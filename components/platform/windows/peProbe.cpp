@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Looks up an export in a DLL file as the loader would.
 ///
 /// The check reads the headers, the sections and the export directory, and does a binary search in

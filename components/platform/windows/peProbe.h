@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Checks a Windows library without mapping it. Compiled on every system, so that tests and the
 /// fuzzer on Linux cover it.
 #pragma once

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The platform functions for Windows.
 ///
 /// File names are wide text here, and the system ignores their letter case, so the normalised path

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Thread-local words by an index of the system.
 ///
 /// The index is allocated without a lock: threads that set the first value concurrently each

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// A word of memory in each thread. The build selects this file or the one of the same name in
 /// `posix/`.
 ///

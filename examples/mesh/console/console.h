@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The system functions of a command-line program: one declaration, and one implementation per
 /// system, selected by the build.
 #pragma once

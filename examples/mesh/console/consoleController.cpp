@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The smallest controller that a user can read: texts become lines, `error` counts and returns
 /// false, `abort` throws. `findFile` is forwarded to the previous controller, because importers
 /// find nothing without it.

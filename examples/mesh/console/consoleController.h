@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// A process controller for command-line programs, which prints texts.
 #pragma once
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Reads one statement per line, in one pass. Indices are converted to absolute ones at once, since
 /// negative ones depend on the number of elements read so far; whether an index is too large is
 /// known only at the end, when `MeshBuilder` checks it. Unknown statements are errors, and not

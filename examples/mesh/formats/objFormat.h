@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The format Wavefront OBJ: one statement per line, about vertices and faces.
 #pragma once
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Reads the header, the counts, and then as many lines as the counts state. The counts only end
 /// the loops: they reserve no memory, so a false count ends in a message at the end of the file.
 /// Only the header states which values a vertex has, so it is parsed into flags first.

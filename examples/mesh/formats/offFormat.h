@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The format OFF (object file format): counts, then one line for each vertex and each face.
 #pragma once
 

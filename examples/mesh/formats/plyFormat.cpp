@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Reads the elements in the order of the header. The layout of a vertex is computed once, as one
 /// role per property, so that the loop over the data compares no names. `PlyValues` hides whether
 /// the values are text or binary.

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The format PLY (polygon file format): elements with properties that the file itself declares.
 #pragma once
 

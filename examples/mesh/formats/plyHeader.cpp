@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Reads the header byte by byte, because binary data may follow at once: no byte after the last
 /// line end may be consumed. The header has its own line reader for this reason, with limits on the
 /// length of a line and on the number of declarations.

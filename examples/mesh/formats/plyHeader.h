@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The header of a PLY file, which declares the layout of the data after it.
 #pragma once
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// One implementation reads text, the other binary data, so that the code for vertices and faces is
 /// the same for both. Text goes through `TextReader`, one item per line; binary values are
 /// assembled byte by byte, which works for both byte orders on any machine.

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Reads the values after the header of a PLY file, in any encoding.
 #pragma once
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Decides between text and binary first by the size of the data, which binary files state, and
 /// then by NUL bytes in the header; the word "solid" proves nothing, since binary files may begin
 /// with it too. A hash map from coordinates to indices joins equal points while they are read.

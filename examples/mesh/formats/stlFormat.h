@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The format STL: triangles, each with its own three points, as text or in binary.
 #pragma once
 

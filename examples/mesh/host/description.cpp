@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Casts the object to each interface that the host knows, and prints it. Numbers are formatted by
 /// `std::to_chars`, so that the output is the same under every locale and on every system.
 #include "description.h"

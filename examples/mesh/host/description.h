@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Prints one line about an object, the same on every system.
 #pragma once
 

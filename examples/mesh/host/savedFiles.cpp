@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Saves each object in both forms, loads it and compares: the example shows that both forms are
 /// exact. Equal scenes must also share their meshes in the same way, so the comparison keeps a map
 /// between the meshes of both, in both directions.

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The files that the host saves and loads.
 #pragma once
 

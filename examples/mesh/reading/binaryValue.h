@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Conversion of numbers from binary data in either byte order, on a machine of any byte order.
 #pragma once
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Fills one block of 64 KiB at a time. A block is the unit of progress and of interruption, so a
 /// large file costs one virtual call per block and not one per byte. The size of the data is found
 /// by seeking to its end and back; without it the progress stays at 0.

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Reads bytes from a buffered IO, block by block, and reports progress.
 #pragma once
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The exceptions of reading code, which never leave the builder.
 #pragma once
 

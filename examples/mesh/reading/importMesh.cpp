@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Calls a format and translates its outcome. The exceptions of the formats end here: they become
 /// an error of the process controller and a null result, because callers in other libraries know
 /// neither these exceptions nor the formats.

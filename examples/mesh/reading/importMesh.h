@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The part of an import that is common to all mesh formats: recognition, failures and progress.
 #pragma once
 

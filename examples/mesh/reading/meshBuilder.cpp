@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Checks indices once, at the end: for each kind of element it remembers the largest index and the
 /// first face that used it. That costs one comparison per corner, needs no second pass over the
 /// faces, and still names the position of the fault.

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Collects the elements of a mesh while its file is read.
 #pragma once
 

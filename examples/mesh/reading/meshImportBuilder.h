@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The import builder of a mesh format, as each component of the family describes it.
 #pragma once
 

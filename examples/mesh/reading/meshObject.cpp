@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Stores a mesh as lists of plain values, each with its count, in blocks: one stream call per 1024
 /// elements instead of one per value. Reading trusts no count: lists grow as blocks arrive, every
 /// value and index is checked, and the object is changed only when the whole mesh is valid.

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Parses with `std::from_chars`, which knows no locale and rounds correctly. It reports the same
 /// error for a number that is too small and for one that is too large; a look at the decimal
 /// exponent of the first significant digit distinguishes them.

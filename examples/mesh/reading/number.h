@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Parsing of numbers, independent of the locale of the process.
 #pragma once
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Reads byte by byte with one byte of lookahead, and stores one word. Line ends inside a continued
 /// line are counted separately and added when the next word begins, so that a message names the
 /// line in which the word is and not the one in which its statement began.

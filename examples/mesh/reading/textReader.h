@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Reads lines and words from a byte reader.
 #pragma once
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Puts a stream on an object IO on a buffer, as docs/objects.md explains. A text file ends with a
 /// line end, for people and their tools. Loading checks that nothing follows the object, because a
 /// longer file is not one that was saved here.

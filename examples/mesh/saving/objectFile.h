@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Saves and loads one object, with all that it refers to, in one file.
 #pragma once
 

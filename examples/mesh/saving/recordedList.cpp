@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Asks the manager for `QrPersistant` and passes it a binary stream on a file. The list is
 /// replaced in one step, so that a start never finds half a list.
 #include "recordedList.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The recorded list of the component manager in a file, so that a start loads only what has
 /// changed.
 #pragma once

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The system functions of the example beyond the standard library: one declaration, and one
 /// implementation per system, selected by the build.
 #pragma once

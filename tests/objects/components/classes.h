@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The persistent classes that the tests store and load, and the builders that make them.
 #pragma once
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 // Persistent classes that do all that is asked of them.
 #include "components/componentKit/componentKit.h"
 #include "components/objectIO/objectIO.h"

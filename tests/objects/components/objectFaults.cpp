@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 // Classes and builders with an edge or a fault each, in a library of their own.
 #include "components/componentKit/componentKit.h"
 #include "components/objectIO/objectIO.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 // A persistent class that uses every form that a value has on a stream.
 #include "components/componentKit/componentKit.h"
 #include "components/objectIO/objectIO.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 // A component library with two builders, whose records are written and read back.
 #include "components/componentKit/componentKit.h"
 #include "tests/streams/components/recordedUids.h"

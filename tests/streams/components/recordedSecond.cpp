@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 // A component library with one builder, to stand beside the first.
 #include "components/componentKit/componentKit.h"
 #include "tests/streams/components/recordedUids.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// A good library that talks on the standard streams while it is loaded and described.
 #include "tests/components/testUids.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 #include "tests/tools/components/enumerates.h"
 #include "tests/tools/components/faults.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Uses more and more memory of the kind that processes share.
 #include "tests/support/testSystem.h"
 #include "tests/tools/components/enumerates.h"

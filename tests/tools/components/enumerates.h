@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// A component library that does something else where it should offer its builders.
 #pragma once
 

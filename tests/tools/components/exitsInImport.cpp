@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Ends the process, with status 0, where it should import a file or make an object.
 #include "components/componentKit/componentKit.h"
 #include "tests/components/testUids.h"

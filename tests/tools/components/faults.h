@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// What a component library must not do to its host.
 #pragma once
 

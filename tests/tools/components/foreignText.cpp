@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// A builder with a text that few locales can carry.
 #include "tests/components/testUids.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// An importer whose library still has something to say when it is unloaded.
 #include "components/componentKit/componentKit.h"
 #include "components/componentManager/processControl.h"

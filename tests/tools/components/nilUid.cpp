@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Offers a builder whose identity was forgotten.
 #include "tests/components/plain.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Imports files with the extension "note" as objects that can be stored: a number, and a note
 /// inside, that stands in two places.
 #include "components/componentKit/componentKit.h"

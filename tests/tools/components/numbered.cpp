@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// One of many good libraries, each with a builder of its own.
 #include "tests/components/testUids.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Offers builders without an end.
 #include "tests/tools/components/enumerates.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Reserves far more addresses than it may use memory, as generators of code do, and works.
 #include "tests/support/testSystem.h"
 #include "tests/tools/components/enumerates.h"

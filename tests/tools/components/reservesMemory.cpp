@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The same with addresses that could be written to.
 #include "tests/support/testSystem.h"
 #include "tests/tools/components/enumerates.h"

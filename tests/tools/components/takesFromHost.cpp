@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Needs a function of its host's program.
 #include "tests/tools/components/enumerates.h"
 #include "tests/tools/recordedHost.h"

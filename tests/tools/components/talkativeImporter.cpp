@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// An importer that talks on standard output when it is loaded and whenever it is asked something.
 #include "components/componentKit/componentKit.h"
 #include "tests/components/testUids.h"

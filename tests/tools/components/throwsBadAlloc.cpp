@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Says that there is no memory, though it takes hardly any.
 #include "tests/tools/components/enumerates.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// An importer that throws what nobody knows, when it is asked whether it can import.
 #include "components/componentKit/componentKit.h"
 #include "tests/components/testUids.h"

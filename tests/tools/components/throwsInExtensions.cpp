@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// An importer that throws what nobody knows, when it is asked what it reads. Its label does to a
 /// terminal what it likes.
 #include "components/componentKit/componentKit.h"

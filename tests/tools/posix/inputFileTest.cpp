@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// What `import` and `show` say of what they cannot read.
 #include "tests/tools/toolsFixture.h"
 

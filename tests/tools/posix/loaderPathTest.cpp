@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Where dependencies are looked for, against what the loader itself does.
 #include "tests/tools/toolsFixture.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Files that cannot be looked at, and those that are none.
 #include "tests/tools/toolsFixture.h"
 

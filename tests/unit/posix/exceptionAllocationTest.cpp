@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 // Exceptions without memory, where a program's operator new is that of the libraries too.
 #include "components/componentManager/exceptions.h"
 #include "tests/unit/allocationFailure.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 // A process that is a copy of another one.
 #include "components/componentManager/processControl.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 // Names that are bytes, under the locales of threads.
 #include "components/componentManager/nativeText.h"
 #include "components/componentKit/hostKit.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 // Replacing files on systems that can be made to run full, and that know symlinks and permissions.
 #include "components/componentManager/exceptions.h"
 #include "tests/unit/replaceFileFixture.h"

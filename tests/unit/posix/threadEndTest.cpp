@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 // Threads that end inside a standard stream under a buffer.
 #include "components/componentManager/bufferio.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// On Linux names are bytes. The program stays in the "C" locale, so each byte is one wide
 /// character and back again: every name passes through unchanged, whatever its encoding.
 #include "../console.h"

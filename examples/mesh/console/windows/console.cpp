@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// On Windows names are wide, and the output is UTF-8 bytes in binary mode, so that it equals the
 /// output on Linux. The arguments come from the wide command line, because `argv` is limited to the
 /// code page.

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The loaded libraries come from the process status API.
 #include "../system.h"
 
