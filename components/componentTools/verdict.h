@@ -29,7 +29,7 @@ enum class Verdict {
 
     // Faults that reading the file or its folder shows.
     missing,
-    unreachable, ///< a folder above it must not be entered
+    unreachable, ///< a folder above it denies access
     notAFolder,  ///< the search path names a file
     unreadable,
     nameNotCarried, ///< the name cannot be encoded in the locale
