@@ -1,5 +1,4 @@
-/// For hosts without a window: a process controller that people can read, and the console's way of
-/// writing names and texts.
+/// A process controller for hosts without a window, and text conversion for the console.
 #pragma once
 
 #include "components/componentTools/export.h"
@@ -14,50 +13,65 @@
 
 namespace Mz::Tools {
 
-/// Writes messages as text, in the terminal's encoding, to the standard error stream. They may have
-/// lines and tabulators; other control characters show as `\xNN`.
+/// A process controller that writes messages as text to standard error, in the terminal's encoding.
 ///
-/// Progress is a bar that stays on its line where standard error is a terminal; elsewhere it is a
-/// line of its own for each tenth of the work. Warnings and errors say so, in colour on a terminal.
+/// Line ends and tabs of messages are kept; other control characters are written as `\xNN`. On a
+/// terminal, progress is a bar that is redrawn on one line. Elsewhere it is one line for each tenth
+/// of the work. Warnings, errors and aborts start with their kind, which is coloured on a terminal.
 ///
-/// While one of these exists, Ctrl-C does not end the process: `isInterrupted` then answers true,
-/// and so do `warning`, `progress` and `error` answer false, so that work stops at its next report.
-/// A second Ctrl-C ends the process as ever.
+/// While a controller exists, the first Ctrl-C does not end the process. It makes `isInterrupted`
+/// return true, and `warning` and `progress` return false, so that work stops at its next report.
+/// `error` always returns false. A second Ctrl-C ends the process.
 ///
-/// Not counted: install it with `QrSetSystemProcessController` or for one thread, keep it alive
-/// while it is installed, and use it from one thread at a time.
+/// Lifetime: references are not counted. Install the controller with
+/// `QrSetSystemProcessController`, or for one thread, and keep it alive while it is installed.
+/// Threads: not thread-safe. Use, construct and destroy controllers in one thread at a time.
+///
+///     ConsoleController controller;
+///     QrSetSystemProcessController(&controller);
 class MZ_COMPONENT_TOOLS_API ConsoleController final
     : public QrCastImpl<ConsoleController, QrProcessControl> {
   public:
+    /// Writes to `std::cerr`.
     ConsoleController();
-    /// The same on another stream, which must outlive it; `terminal` says whether that is one.
+    /// Writes to another stream.
+    /// \param stream    must outlive the controller
+    /// \param terminal  whether `stream` is a terminal
     ConsoleController(std::ostream& stream, bool terminal);
     ~ConsoleController() override;
     ConsoleController(const ConsoleController&) = delete;
     ConsoleController& operator=(const ConsoleController&) = delete;
 
+    /// Returns null.
     void* getContext() override;
     void message(int code, const wchar_t* text) override;
+    /// Returns whether Ctrl-C was pressed since the first of the existing controllers was made.
     bool isInterrupted() override;
+    /// Returns false after Ctrl-C, else true.
     bool warning(int code, const wchar_t* text) override;
     bool isProgressShown() override;
-    /// A fraction outside 0 to 1 counts as the nearer of the two; what is no number as 0.
+    /// Shows progress.
+    /// \param fraction  is clamped to 0 … 1; NaN counts as 0
+    /// \param text      may be null
+    /// \return false after Ctrl-C, else true
     bool progress(float fraction, const wchar_t* text) override;
     bool isStatusShown() override;
     void status(const wchar_t* text) override;
+    /// Counts and writes an error. Returns false.
     bool error(int code, const wchar_t* text) override;
     bool isErrorShown() override;
     void log(int code, const wchar_t* text) override;
-    /// Throws `Assertions::ExProgramAborted`.
+    /// Writes the text.
+    /// \throws Assertions::ExProgramAborted always
     [[noreturn]] void abort(int code, const wchar_t* text) override;
-    /// As the controller that was the system's when this one was made.
+    /// Returns the result of the system's controller at the time of construction.
     std::wstring findFile(const wchar_t* fileName, const wchar_t* searchPath,
                           const wchar_t* fallbackSearchPath) override;
 
-    /// How many errors were reported.
+    /// Returns the number of errors that were reported.
     int errorCount() const;
 
-    /// Takes a bar or status from its line; call it before others write to the terminal.
+    /// Erases a progress bar or status. Call it before other code writes to the terminal.
     void clearLine();
 
   private:
@@ -72,19 +86,20 @@ class MZ_COMPONENT_TOOLS_API ConsoleController final
     int errors = 0;
 };
 
-/// `text` with each control character, line ends too, in the form `\xNN`: a terminal may do more
-/// than show them, and a name need not stay on its line.
+/// Returns `text` with each control character, line ends included, replaced by `\xNN`. Use it for
+/// names: a terminal interprets control characters, and a line end would fake a second line.
 MZ_COMPONENT_TOOLS_API std::wstring withoutControls(const std::wstring& text);
 
-/// `text` as bytes for standard output: in the terminal's encoding where it is one, else in the
-/// locale's; '?' for what has no form there.
+/// Returns `text` as bytes for standard output. The encoding is the terminal's if standard output
+/// is one, else the locale's. A character that cannot be encoded becomes '?'.
 MZ_COMPONENT_TOOLS_API std::string forOutput(const std::wstring& text);
 
-/// The arguments of this process without its name: the system's own bytes, or UTF-8 where names are
-/// not bytes. Takes what `main` was given.
+/// Returns the arguments of this process without the program's name: the original bytes on Linux,
+/// UTF-8 on Windows.
+/// \param count, values  the parameters of `main`; unused on Windows
 MZ_COMPONENT_TOOLS_API std::vector<std::string> argumentsOfProcess(int count, char** values);
 
-/// The path that such an argument names.
+/// Returns the path that an argument from `argumentsOfProcess` names.
 MZ_COMPONENT_TOOLS_API std::filesystem::path pathOf(const std::string& argument);
 
 } // namespace Mz::Tools

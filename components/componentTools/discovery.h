@@ -1,4 +1,4 @@
-/// Which files a component manager looks at.
+/// Lists the files of a search path that a component manager examines.
 #pragma once
 
 #include "components/componentTools/verdict.h"
@@ -9,43 +9,47 @@
 
 namespace Mz::Tools {
 
-/// A file on a search path, in the order in which the manager comes to it.
+/// A file in a search folder, with the names under which it is recorded.
 struct Candidate {
-    std::filesystem::path path; ///< as the system spells it
-    std::wstring directory;     ///< normalised, as it is recorded
-    std::wstring fileName;      ///< likewise
+    std::filesystem::path path; ///< in the system's spelling
+    std::wstring directory;     ///< normalised, as in the recorded list
+    std::wstring fileName;      ///< normalised, as in the recorded list
 };
 
-/// What a search path leads to.
+/// The result of `discover`.
 struct Discovery {
-    std::vector<Candidate> candidates;
+    std::vector<Candidate> candidates; ///< in the order in which the manager examines them
 
-    /// What cannot be searched, or cannot be recorded, for its name.
+    /// A folder that cannot be searched, or a file whose name cannot be recorded.
     struct LeftOut {
         std::filesystem::path path;
-        Finding finding;
-        bool folder = false; ///< one of those that were to be searched; else a file in one
+        Finding finding;     ///< the reason
+        bool folder = false; ///< true for a search folder, false for a file in one
     };
     std::vector<LeftOut> leftOut;
 };
 
-/// The folders of a search path (separated by ';'), each made absolute and free of "." and "..":
-/// hosts must give the manager such names, and only then do recorded names match.
+/// Returns the folders of a search path (separated by ';'), made absolute and without "." and "..".
+/// Recorded names match only if the host passes folders in this form to its manager. Empty parts
+/// are skipped.
 MZ_COMPONENT_TOOLS_API std::vector<std::filesystem::path>
 foldersOf(const std::filesystem::path& searchPath);
 
-/// The search path that leads a manager to these folders; those whose names the locale does not
-/// carry, or have the separator in them, are left out.
+/// Returns the search path that consists of these folders. A folder is skipped if its name contains
+/// ';' or cannot be encoded in the current locale.
 MZ_COMPONENT_TOOLS_API std::wstring searchPathOf(const std::vector<std::filesystem::path>& folders);
 
-/// Lists the candidate files of the folders. Nothing of them is read. A folder that does not exist,
-/// or cannot be listed, or that no search path can lead to, is left out.
+/// Lists the candidates of the folders without reading them.
+///
+/// A file that several folders contain is listed once. A folder that does not exist, cannot be
+/// listed, or cannot be part of a search path is returned in `leftOut`.
 MZ_COMPONENT_TOOLS_API Discovery discover(const std::vector<std::filesystem::path>& folders);
 
-/// The names under which a file is recorded.
+/// Returns the full path of `file` and the names under which it is recorded. A name that has no
+/// form as text is empty. The file need not exist.
 MZ_COMPONENT_TOOLS_API Candidate candidateOf(const std::filesystem::path& file);
 
-/// `path` for people, whatever it holds.
+/// Returns `path` as text for people. What has no form as text is escaped.
 MZ_COMPONENT_TOOLS_API std::wstring displayName(const std::filesystem::path& path);
 
 } // namespace Mz::Tools

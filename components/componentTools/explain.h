@@ -1,8 +1,7 @@
-/// Why a file is, or is not, known to the component manager as a component library.
+/// Explains why a file is, or is not, a component library for the component manager.
 ///
-/// The manager says nothing about the files that it passes over. This does, in two depths: from the
-/// outside, by reading the file; and by loading it in a process of its own, which may end as it
-/// likes.
+/// The manager skips files silently. `explainFile` reports the reason, in two depths: by reading
+/// the file, and by loading it in a child process, which may crash or hang without harm.
 #pragma once
 
 #include "components/componentTools/probe.h"
@@ -15,45 +14,52 @@
 
 namespace Mz::Tools {
 
-/// A library that the file needs, directly or through others.
+/// A library that the file needs, directly or indirectly.
 struct Dependency {
-    std::wstring name;     ///< as the one that needs it calls it
+    std::wstring name;     ///< the name in the file that needs it
     std::wstring neededBy; ///< the file that needs it
-    std::wstring path;     ///< where it is; empty when it is not a file of its own, or not found
+    std::wstring path;     ///< its file; empty if it was not found or the system has no file for it
     bool found = false;
 };
 
+/// The result of `explainFile`.
 struct Explanation {
-    std::filesystem::path file; ///< the full path
-    Finding verdict;            ///< the one that decides
-    std::vector<Finding> notes; ///< what else is worth knowing, by its record and its builders
-    std::vector<Dependency> dependencies;
+    std::filesystem::path file;           ///< the full path
+    Finding verdict;                      ///< the most important finding
+    std::vector<Finding> notes;           ///< findings on its record, its builders and its folder
+    std::vector<Dependency> dependencies; ///< each name once, in the loader's order
 
-    // What the library says of itself, after it was loaded without a fault.
-    std::wstring label, text;
-    std::vector<RecordedBuilder> builders;
+    std::wstring label, text;              ///< of the component; empty unless it was loaded
+    std::vector<RecordedBuilder> builders; ///< from the library if it was loaded, else its record
 };
 
+/// The options of `explainFile`.
 struct ExplainOptions {
-    /// A recorded list to look the file up in; null for none.
+    /// A recorded list in which to look the file up; may be null.
     const RecordedLibraries* recorded = nullptr;
-    /// The folders of a host's search path, to say whether it leads to the file; null for none.
+    /// The folders of a host's search path, to check whether the file is in one; may be null.
     const std::vector<std::filesystem::path>* folders = nullptr;
-    /// Load the file in a process of its own, where it looks sound from the outside.
+    /// Load the file in a child process if reading it shows no fault. A missing dependency does not
+    /// prevent the attempt.
     bool load = false;
+    /// Limits and program of that process.
     ProbeOptions probe;
-    /// The folder of the host's program, where the system looks for libraries too (Windows).
+    /// The folder of the host's program, in which Windows looks for libraries too; empty for none.
     std::filesystem::path programFolder;
-    /// Ask the system for every library that is needed. Without it files are judged faster, and
-    /// none is found to miss one.
+    /// Look for every library that the file needs. If false, the check is faster, and
+    /// `dependencyMissing` and `needsHost` are not found.
     bool followDependencies = true;
 };
 
-/// Explains one file. Runs nothing of it in this process; of a file that shows a fault from the
-/// outside, or is no component library, nothing is run at all.
+/// Explains one file.
 ///
-/// Dependencies are judged as the loader would in this process. Where it is not sure of the
-/// loader's rules (a library that describes its own surroundings), none counts as missing.
+/// No code of the file runs in this process. Code of the file runs in the child process only if
+/// `options.load` is set, reading the file found a component library, and the file does not import
+/// from a program (see `needsHost`).
+///
+/// Dependencies are searched as the loader would search them in this process. If a library has a
+/// manifest, which changes the loader's rules, none of its dependencies counts as missing.
+/// \throws whatever `options.probe.interrupted` throws
 MZ_COMPONENT_TOOLS_API Explanation explainFile(const std::filesystem::path& file,
                                                const ExplainOptions& options = {});
 

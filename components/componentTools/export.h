@@ -1,4 +1,4 @@
-/// How the names of libMZcomponentTools enter and leave it.
+/// The export macro of libMZcomponentTools: `MZ_COMPONENT_TOOLS_API` marks its public names.
 #pragma once
 
 #include "components/base/export.h"

@@ -1,9 +1,9 @@
-/// Loading a component library in a process of its own, which may end as it likes.
+/// Loads a component library in a child process, which may crash or hang without harm.
 ///
-/// The process runs `mzcomponents-probe`, a program that stands beside libMZcomponentTools. It
-/// loads the one library, asks it for its description, as the component manager does, and answers
-/// through a pipe. The answer is checked and never trusted; what the library itself writes goes
-/// nowhere.
+/// The child process runs `mzcomponents-probe`, a program in the folder of libMZcomponentTools. It
+/// loads one library, requests its description as the component manager does, and reports through a
+/// pipe. The report is validated. Everything that the library itself writes to standard output and
+/// standard error is discarded.
 #pragma once
 
 #include "components/componentTools/recordedList.h"
@@ -18,31 +18,35 @@
 
 namespace Mz::Tools {
 
+/// The limits of the child process, and how it is started and interrupted.
 struct ProbeOptions {
-    /// A library that takes longer to load and describe itself is killed.
+    /// The time that the library may take to load and describe itself. Then the process is killed.
     std::chrono::milliseconds timeLimit{10'000};
-    /// So is one whose process uses more memory, in bytes: addresses that are only reserved do not
-    /// count. Looked at some hundred times a second.
+    /// The memory, in bytes, that the process may use. Then it is killed. Reserved but unused
+    /// addresses do not count. The use is polled about a hundred times a second.
     std::uint64_t memoryLimit = std::uint64_t{1} << 30;
-    /// The program to run; empty for the one beside libMZcomponentTools.
+    /// The program to run; empty for `mzcomponents-probe` in the folder of libMZcomponentTools.
     std::filesystem::path program;
-    /// Asked now and then; true ends the process, and so does an exception, which is passed on.
-    /// Empty for never.
+    /// A callback that is polled while the process runs; may be empty. If it returns true or
+    /// throws, the process is killed; the exception is passed on to the caller.
     std::function<bool()> interrupted;
 };
 
+/// The result of `probeLibrary`.
 struct ProbeResult {
     Finding verdict;                       ///< `works`, `offersNothing` or a fault
-    std::vector<Finding> notes;            ///< about its builders
+    std::vector<Finding> notes;            ///< findings on its builders
     std::wstring label, text;              ///< of the component
     std::vector<RecordedBuilder> builders; ///< empty unless the verdict is `works`
 };
 
-/// Loads the file in a new process and tells how that went. Blocks until it has ended.
+/// Loads the file in a child process and returns the verdict. Blocks until the process has ended.
 ///
-/// The system refuses the process far more memory than `memoryLimit`, for what is taken faster than
-/// it can be noticed. A library that fails may have failed for that alone, with reservations that
-/// it never uses: it is tried once more without the refusal, and the second result counts.
+/// The system also limits the process, far above `memoryLimit`, to stop a library that takes memory
+/// faster than polling can notice. That limit includes reserved addresses, so a library may fail
+/// only because of it. A library that may have is tried a second time without the system's limit,
+/// and the second result counts.
+/// \throws whatever `options.interrupted` throws
 MZ_COMPONENT_TOOLS_API ProbeResult probeLibrary(const std::filesystem::path& file,
                                                 const ProbeOptions& options = {});
 

@@ -1,4 +1,4 @@
-/// Filling a recorded list without putting the host at risk.
+/// Fills a recorded list in child processes, so that a faulty library cannot harm the host.
 #pragma once
 
 #include "components/componentTools/discovery.h"
@@ -13,60 +13,66 @@
 
 namespace Mz::Tools {
 
+/// The options of `scan`.
 struct ScanOptions {
     /// The folders to search, in the host's order; see `foldersOf`.
     std::vector<std::filesystem::path> folders;
-    /// The list to bring up to date; empty to record nothing.
+    /// The list to update; empty to write none.
     std::filesystem::path list;
-    /// Try libraries that failed earlier again, though they have not changed.
+    /// Retry unchanged libraries that failed earlier.
     bool retry = false;
-    /// For each library; when `interrupted` answers true, the whole scan ends.
+    /// The limits for each library. If `interrupted` returns true, the whole scan stops.
     ProbeOptions probe;
-    /// Hears of the progress and is asked whether to stop; null for nobody.
+    /// Receives the progress and decides whether to stop; may be null. The caller owns it.
     QrProcessControl* controller = nullptr;
 };
 
-/// What became of one file.
+/// The result for one file or folder.
 struct ScannedFile {
     std::filesystem::path path;
     std::wstring directory, fileName; ///< as recorded
     Finding verdict;
     std::vector<Finding> notes;
     bool recorded = false; ///< whether `libraries` has it
-    bool looked = false;   ///< false when the list had it already, and it has not changed
-    bool folder = false;   ///< one of the folders, which could not be searched
+    bool looked = false;   ///< whether it was examined now; false if its old record was used
+    bool folder = false;   ///< true for a search folder that could not be searched
 };
 
+/// The result of `scan`.
 struct ScanResult {
-    std::vector<ScannedFile> files; ///< in the host's order, those left out behind them
-    RecordedLibraries libraries;    ///< what was, or should have been, written
-    /// What needs its host (`needsHost`), without builders; not written.
+    std::vector<ScannedFile> files; ///< in the host's order, followed by those left out
+    RecordedLibraries libraries;    ///< the new list, whether or not it could be written
+    /// The libraries with the verdict `needsHost`, without builders. They are not in the list.
     RecordedLibraries unjudged;
-    std::wstring rejected;        ///< why the old list was rejected; empty when it was not
-    std::filesystem::path keptAs; ///< where a copy of what was rejected is; empty for nowhere
-    std::wstring notWritten;      ///< names the file that was not written, and says why
-    bool interrupted = false;     ///< the user stopped it; the rest of the old list was kept
+    std::wstring rejected;        ///< why the old list was rejected; empty if it was not
+    std::filesystem::path keptAs; ///< the copy of a rejected list; empty if there is none
+    std::wstring notWritten;      ///< the file that was not written, and why; empty if all were
+    bool interrupted = false;     ///< the user stopped the scan
 };
 
-/// Scans the folders, loading each library that is new, has changed, or lacks something that may
-/// have arrived meanwhile, in a process of its own, and writes the list.
+/// Scans the folders and writes the list. Blocks until the scan has ended.
 ///
-/// A library that fails is recorded with its time and size and no builders, so a host that reads
-/// the list does not load it either, until its file changes. What was wrong is kept beside the
-/// list, in the file `verdictsFileOf(list)`. What is no component library is recorded in the same
-/// way, as the manager does.
+/// Each library is loaded in a child process if it is new, has changed, or failed for a reason that
+/// may have disappeared, such as a missing dependency. Other libraries keep their record.
 ///
-/// A library that needs its host's own program cannot be tried. It is not recorded, so a host loads
-/// it at each start. A program that must not load it adds `unjudged` to the list for its manager.
+/// A library that fails is recorded with its time and size and no builders. A host that reads the
+/// list does not load it until its file changes. The verdict is saved beside the list, in the file
+/// `verdictsFileOf(list)`. A file that is not a component library is recorded in the same way, as
+/// by the manager.
 ///
-/// A damaged or foreign list is rejected whole and built anew; a copy of it stays beside the new
-/// one, with ".rejected" behind its name. Two scans at once do not damage each other: each writes a
-/// whole list, and the later one stays.
+/// A library that needs its host's program cannot be tried. It is not recorded, and a host loads it
+/// at each start. A program that must not load it adds `unjudged` to the list that it passes to its
+/// manager.
 ///
-/// When the process to load libraries in cannot be started, that says nothing of the libraries:
-/// they are not recorded, but for what the old list has of those that have not changed, and where
-/// none could be loaded nothing is written. A list that cannot be written takes none of the
-/// findings away.
+/// A damaged file, or one that is not a list, is rejected as a whole and replaced by a new list. A
+/// copy is saved beside it, with ".rejected" appended to its name. Two concurrent scans do not
+/// damage the list: each writes it atomically, and the last one wins.
+///
+/// If the child process cannot be started, unchanged libraries keep their record and the others are
+/// not recorded. If no library could be tried for that reason, no list is written. If the list
+/// cannot be written, `notWritten` is set and the rest of the result is valid. After an
+/// interruption, libraries that were not examined keep their record.
+/// \throws whatever `options.probe.interrupted` or the controller throws
 MZ_COMPONENT_TOOLS_API ScanResult scan(const ScanOptions& options);
 
 } // namespace Mz::Tools

@@ -1,4 +1,4 @@
-/// What a program has to see to before components run in it, when its results go to scripts.
+/// Protects the standard output of a program from the components that run in it.
 #pragma once
 
 #include "components/componentTools/export.h"
@@ -8,16 +8,18 @@
 
 namespace Mz::Tools {
 
-/// Gives this process what it may have been started without: the user's locale, and word of how its
-/// children end, which a program that ignores that passes on to those that it starts. Call it first
-/// thing in `main`.
+/// Sets the user's locale, and resets SIGCHLD to its default, so that the exit status of child
+/// processes is available. A parent process that ignores SIGCHLD passes this on to its children.
+/// Call it first in `main`. On Windows it sets the locale only.
 MZ_COMPONENT_TOOLS_API void prepareProgram();
 
-/// Standard output, for one writer alone: from its creation on, up to the end of the process, what
-/// anybody else writes there goes to standard error. Put a `std::ostream` on it; a `flush` that
-/// leaves that one good means that everything has arrived.
+/// A stream buffer with exclusive access to standard output.
 ///
-/// There can be only one.
+/// From its construction until the end of the process, output that other code writes to standard
+/// output goes to standard error. Create a `std::ostream` with this buffer. If the stream is good
+/// after `flush`, everything was written. The destructor flushes, and ignores a failure.
+///
+/// Only one object may be created in a process.
 class MZ_COMPONENT_TOOLS_API ReservedOutput final : public std::streambuf {
   public:
     ReservedOutput();

@@ -1,5 +1,5 @@
-/// What can be said of a file that is, or should be, a component library: verdicts, each with a
-/// sentence that a person understands and, where there is one, the cure.
+/// The verdicts on a file that is, or should be, a component library. Each has a sentence for
+/// people and, where possible, a hint how to solve the problem.
 #pragma once
 
 #include "components/componentTools/export.h"
@@ -10,102 +10,105 @@
 
 namespace Mz::Tools {
 
-/// One answer. New ones may be added at any place: store the names (`nameOf`), not the numbers.
+/// The kind of a finding. The numeric values may change between versions: store the name
+/// (`nameOf`).
 enum class Verdict {
-    // All is well.
-    component,     ///< a component library, as far as can be seen without running it
+    // Good.
+    component,     ///< a component library, as far as reading the file can show
     works,         ///< loads, and describes builders
     offersNothing, ///< loads, and describes no builder
 
-    // The manager passes the file over, and rightly so.
+    // Not a component library. The manager correctly skips the file.
     directory,
     hidden,
-    systemFile,   ///< by its attributes, where the system knows such
-    notRegular,   ///< a pipe, a device
-    notALibrary,  ///< neither a library nor a program of any system known here
-    program,      ///< to be started, not to be loaded
+    systemFile,   ///< it has the system attribute (Windows)
+    notRegular,   ///< a pipe or a device
+    notALibrary,  ///< neither a library nor a program for Linux or Windows
+    program,      ///< an executable program
     noEntryPoint, ///< a library that does not export "QrGetComponentDescription" itself
 
-    // Faults that show without running anything.
+    // Faults that reading the file or its folder shows.
     missing,
-    unreachable, ///< a folder above it may not be entered
-    notAFolder,  ///< a search path names a file
+    unreachable, ///< a folder above it denies access
+    notAFolder,  ///< the search path names a file
     unreadable,
-    nameNotCarried, ///< the locale has no form for the name
-    notSearchable,  ///< a folder whose name has the separator of search paths in it
-    sameName,       ///< another file has the same name but for the case of letters
+    nameNotCarried, ///< the name cannot be encoded in the locale
+    notSearchable,  ///< a folder whose name contains ';', the separator of search paths
+    sameName,       ///< its name equals that of another file except for case
     otherSystem,
     otherProcessor,
     damaged,
-    entryPointNoFunction, ///< exported, but as data
+    entryPointNoFunction, ///< the exported entry point is not a function of this library
     dependencyMissing,
 
-    // Faults that show when the library is loaded and described in a process of its own.
+    // Faults that loading and describing the library in a child process shows.
     loadFailed,
-    needsHost, ///< needs its host's own program, so it loads nowhere else
+    needsHost, ///< it needs the program of its host, and cannot be loaded elsewhere
     nullDescription,
-    wrongInterface, ///< the description does not answer for `QrComponentDescription`
-    wrongItem,      ///< one of the builders offered is none
+    wrongInterface, ///< the description does not support `QrComponentDescription`
+    wrongItem,      ///< an enumerated object is null or does not support `QrBuilderDescription`
     threw,
     crashed,
     aborted,
-    exited, ///< ended the process itself
+    exited, ///< it ended the process by `exit` or similar
     timedOut,
     outOfMemory,
-    textNotCarried, ///< the locale has no form for a text of a builder
-    garbled,        ///< the process answered with something else than an answer
-    answerLost,     ///< the process came to its end, and its answer did not arrive
-    answerTooLong,  ///< the process answered with more than a description may have
-    probeFailed,    ///< the process could not be started
-    endUnknown,     ///< the system does not tell this program how the process ended
-    interrupted,    ///< the user wanted it to end
+    textNotCarried, ///< a text of a builder cannot be encoded in the locale
+    garbled,        ///< the report of the child process is invalid
+    answerLost,     ///< the child process ended regularly, but its report did not arrive
+    answerTooLong,  ///< the report of the child process exceeds the limit
+    probeFailed,    ///< the child process could not be started
+    endUnknown,     ///< the exit status of the child process is not available
+    interrupted,    ///< the user stopped the check
 
-    // What a recorded list says of the file.
+    // The file's record in a recorded list.
     notRecorded,
     recordedUnchanged,
-    recordedFailed, ///< recorded without builders: not tried again until it changes
+    recordedFailed, ///< recorded without builders: a host does not load it until it changes
     recordedChanged,
 
     // Whether a host's search path leads to the file.
     onPath,
     notOnPath,
 
-    // What is worth knowing of its builders.
-    miscounted, ///< another number was announced than given
-    uidTaken,   ///< another library has the identifier and wins
-    uidWins,    ///< another library has the identifier and loses
-    uidNil,     ///< the identifier is nil, forgotten as a rule
-    uidTwice,   ///< the library itself offers the identifier twice
+    // Notes on its builders.
+    miscounted, ///< the announced number of builders differs from the enumerated one
+    uidTaken,   ///< another library has the uid and wins
+    uidWins,    ///< another library has the uid and loses
+    uidNil,     ///< the uid is nil, usually because it was forgotten
+    uidTwice,   ///< the library has the uid twice
 };
 
+/// How serious a verdict is.
 enum class Severity {
-    good,
-    bystander, ///< no component library, and no fault of anybody
-    note,      ///< worth knowing, no judgement by itself
-    fault,
+    good,      ///< a component library
+    bystander, ///< not a component library, or one without builders; not a fault
+    note,      ///< additional information
+    fault,     ///< a problem that must be solved
 };
 
-/// The verdict's name, as it is spelled above; stable.
+/// Returns the verdict's name, which is the enumerator's. Names never change.
 MZ_COMPONENT_TOOLS_API const char* nameOf(Verdict verdict);
 
-/// The verdict with that name, if there is one.
+/// Returns the verdict with that name; `std::nullopt` if there is none.
 MZ_COMPONENT_TOOLS_API std::optional<Verdict> verdictNamed(std::string_view name);
 
+/// Returns how serious the verdict is.
 MZ_COMPONENT_TOOLS_API Severity severityOf(Verdict verdict);
 
-/// A verdict on one file, and what it is about.
+/// A verdict on one file, with the details for its sentence.
 struct Finding {
     Verdict verdict = Verdict::component;
-    std::wstring subject; ///< what it is about: a library's name, a stage, a number
-    std::wstring words; ///< what somebody else said: the loader, an exception, another file's name
+    std::wstring subject; ///< for example the name of a library, a stage or a number
+    std::wstring words;   ///< for example the text of an exception or of the loader, or a file name
 
     friend bool operator==(const Finding&, const Finding&) = default;
 };
 
-/// What is the matter, in a sentence without a full stop.
+/// Returns the finding as a sentence without a full stop.
 MZ_COMPONENT_TOOLS_API std::wstring sentenceOf(const Finding& finding);
 
-/// What to do about it, likewise; empty where there is nothing to be done.
+/// Returns the remedy as a sentence without a full stop; empty if there is none.
 MZ_COMPONENT_TOOLS_API std::wstring cureOf(const Finding& finding);
 
 } // namespace Mz::Tools
