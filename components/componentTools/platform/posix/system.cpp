@@ -135,7 +135,7 @@ Located findDependency(const std::string& wanted, const Needer& needer, const Na
     return {isLoaded(name), {}};
 }
 
-std::wstring loaderWords(const NativePath& path) {
+std::wstring loaderError(const NativePath& path) {
     ::dlerror();
     if (::dlopen(path.c_str(), RTLD_NOW | RTLD_LOCAL))
         return L"it loads at the second attempt";
@@ -143,9 +143,9 @@ std::wstring loaderWords(const NativePath& path) {
     return displayName(words ? words : "");
 }
 
-NativePath ownFolder() {
+NativePath moduleFolder() {
     Dl_info info;
-    if (::dladdr(reinterpret_cast<const void*>(&ownFolder), &info) == 0 || !info.dli_fname)
+    if (::dladdr(reinterpret_cast<const void*>(&moduleFolder), &info) == 0 || !info.dli_fname)
         return {};
     std::error_code failure;
     const NativePath file = std::filesystem::canonical(info.dli_fname, failure);
@@ -218,7 +218,7 @@ bool writeReserved(int descriptor, const char* data, std::size_t size) {
     return writeAll(descriptor, data, size);
 }
 
-void wantEndsOfChildren() {
+void resetChildSignal() {
     std::signal(SIGCHLD, SIG_DFL);
 }
 
@@ -240,7 +240,7 @@ void endProcess(int status) {
     ::_exit(status);
 }
 
-std::wstring passedFault() {
+std::wstring caughtFault() {
     return {};
 }
 

@@ -149,18 +149,18 @@ std::wstring textOfError(DWORD number) {
 
 } // namespace
 
-std::wstring loaderWords(const NativePath& path) {
+std::wstring loaderError(const NativePath& path) {
     const std::wstring name = path.native() + (path.has_extension() ? L"" : L".");
     if (::LoadLibraryW(name.c_str()))
         return L"it loads at the second attempt";
     return textOfError(::GetLastError());
 }
 
-NativePath ownFolder() {
+NativePath moduleFolder() {
     HMODULE module = nullptr;
     constexpr DWORD flags =
         GET_MODULE_HANDLE_EX_FLAG_FROM_ADDRESS | GET_MODULE_HANDLE_EX_FLAG_UNCHANGED_REFCOUNT;
-    if (!::GetModuleHandleExW(flags, reinterpret_cast<const wchar_t*>(&ownFolder), &module))
+    if (!::GetModuleHandleExW(flags, reinterpret_cast<const wchar_t*>(&moduleFolder), &module))
         return {};
     wchar_t path[32768];
     const DWORD length = ::GetModuleFileNameW(module, path, 32768);
@@ -230,7 +230,7 @@ bool writeReserved(int descriptor, const char* data, std::size_t size) {
     return true;
 }
 
-void wantEndsOfChildren() {}
+void resetChildSignal() {}
 
 void confine(std::uint64_t) {
     ::SetErrorMode(SEM_FAILCRITICALERRORS | SEM_NOGPFAULTERRORBOX | SEM_NOOPENFILEERRORBOX);
@@ -244,7 +244,7 @@ void endProcess(int status) {
         ::Sleep(INFINITE);
 }
 
-std::wstring passedFault() {
+std::wstring caughtFault() {
     const DWORD code = lastFault;
     return code ? faultName(code) : std::wstring();
 }
