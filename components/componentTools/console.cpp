@@ -1,3 +1,6 @@
+/// All controllers share one flag, which the SIGINT handler sets: a signal handler has no object to
+/// address. The first controller installs the handler, and the last one restores the old handler.
+/// On a terminal, output is cut to 79 columns, because a wrapped line could not be erased.
 #include "components/componentTools/console.h"
 
 #include "components/base/assertions.h"
@@ -23,15 +26,15 @@ namespace {
 constexpr const char* source = "components/componentTools/console";
 
 std::atomic<bool> interrupted{false};
-static_assert(std::atomic<bool>::is_always_lock_free); // A handler of a signal sets it.
+static_assert(std::atomic<bool>::is_always_lock_free); // The signal handler sets it.
 
-/// How many controllers there are, and what Ctrl-C did before.
+/// The number of controllers, and the SIGINT handler before the first one.
 int controllers = 0;
 void (*previousHandler)(int) = SIG_DFL;
 
 void onInterrupt(int) {
     interrupted = true;
-    // The next one ends the process, should the work not listen.
+    // The next Ctrl-C ends the process, even if the work does not poll `isInterrupted`.
     std::signal(SIGINT, SIG_DFL);
 }
 
@@ -39,7 +42,7 @@ bool isControl(wchar_t character) {
     return character < L' ' || (character >= 0x7F && character < 0xA0);
 }
 
-/// `text` with those of its control characters escaped that are not among `left`.
+/// Returns `text` with its control characters escaped, except those in `left`.
 std::wstring escaped(const std::wstring& text, std::wstring_view left) {
     constexpr const wchar_t* digits = L"0123456789ABCDEF";
     std::wstring result;
@@ -59,7 +62,7 @@ std::string errorText(const wchar_t* text) {
     return System::encode(escaped(text ? text : L"", L"\n\t"), 2);
 }
 
-/// How many columns of a terminal a character takes at most.
+/// Returns the maximum number of terminal columns of a character.
 std::size_t columnsOf(wchar_t character) {
     constexpr std::pair<std::uint32_t, std::uint32_t> wide[] = {
         {0x1100, 0x115F},   {0x2600, 0x27BF},  {0x2E80, 0xA4CF}, {0xAC00, 0xD7A3},
@@ -72,7 +75,7 @@ std::size_t columnsOf(wchar_t character) {
     return isWide ? 2 : 1;
 }
 
-/// The beginning of `text` that fits so many columns, and how many of them it takes.
+/// Returns the longest prefix of `text` that fits into `widest` columns, and its width.
 std::pair<std::wstring, std::size_t> fitted(const std::wstring& text, std::size_t widest) {
     std::size_t taken = 0, length = 0;
     for (; length < text.size(); ++length) {
@@ -81,7 +84,7 @@ std::pair<std::wstring, std::size_t> fitted(const std::wstring& text, std::size_
             break;
         taken += columns;
     }
-    // Half of a character, where one takes two units, is none.
+    // Do not split a surrogate pair.
     if (length > 0 && length < text.size() && (text[length - 1] & ~wchar_t{0x3FF}) == 0xD800)
         --length, --taken;
     return {text.substr(0, length), taken};
@@ -190,7 +193,6 @@ void ConsoleController::line(const char* kind, const wchar_t* text) {
     out << errorText(text) << std::endl;
 }
 
-/// What does not fit a narrow terminal is cut, or it could not be taken back.
 void ConsoleController::showOnLine(const std::wstring& text) {
     constexpr std::size_t widest = 79;
     const auto [fitting, width] = fitted(escaped(text, {}), widest);

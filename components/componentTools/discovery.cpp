@@ -1,3 +1,6 @@
+/// Repeats the manager's own rules, with the manager's functions: normalised names, one record for
+/// each file, and all folders listed in one call. In addition, reports what the manager skips
+/// silently, because its name cannot be encoded or recorded.
 #include "components/componentTools/discovery.h"
 
 #include "components/componentManager/files.h"
@@ -15,14 +18,14 @@ namespace Mz::Tools {
 
 namespace {
 
-/// The full path; the path as it is where the current folder is gone.
+/// Returns the full path; `path` unchanged if the current folder no longer exists.
 std::filesystem::path fullPathOf(const std::filesystem::path& path) {
     std::error_code failure;
     const std::filesystem::path absolute = std::filesystem::absolute(path, failure);
     return failure ? path : fullPath(absolute);
 }
 
-/// Whether a search path can lead there.
+/// Returns whether a search path can contain the folder.
 bool isSearchable(const std::wstring& folder) {
     return folder.find(L';') == std::wstring::npos;
 }
@@ -52,7 +55,7 @@ class Discoverer {
     }
 
     Discovery take() {
-        // All at once, as the manager does: so one file is known by its names in several folders.
+        // In one call, like the manager: only then are identities comparable between folders.
         const auto listings = platform::listCandidates(openedNames);
         for (std::size_t index = 0; index < listings.size(); ++index)
             for (const platform::DirectoryEntry& entry : listings[index])
@@ -62,7 +65,7 @@ class Discoverer {
 
   private:
     void add(const std::wstring& directory, const platform::DirectoryEntry& entry) {
-        // One file, one record, however often the search path leads to it.
+        // A file has one record, even if several folders or names lead to it.
         if (entry.identity) {
             const auto [other, isFirst] = seen.emplace(*entry.identity, entry.path);
             if (!isFirst && platform::isSameFile(other->second, entry.path))
@@ -89,7 +92,7 @@ class Discoverer {
         result.leftOut.push_back({folder, {verdict, {}, {}}, true});
     }
 
-    /// Names that are no text are passed over silently by the manager's own listing.
+    /// Reports names that have no wide form. `listCandidates` skips them silently.
     void leaveOutUnnamed(std::filesystem::directory_iterator entry) {
         std::error_code failure;
         for (const std::filesystem::directory_iterator end; !failure && entry != end;
@@ -99,7 +102,7 @@ class Discoverer {
     }
 
     Discovery result;
-    std::vector<std::wstring> directories; ///< to list, normalised
+    std::vector<std::wstring> directories; ///< the folders to list, normalised
     std::vector<platform::NativePath> openedNames;
     std::map<platform::FileIdentity, platform::NativePath> seen;
     std::map<std::pair<std::wstring, std::wstring>, std::filesystem::path> names;

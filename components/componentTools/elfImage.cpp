@@ -1,4 +1,6 @@
-/// Libraries and programs in the format of Linux.
+/// Reads ELF files as the loader does: from the segments and the dynamic section, not from the
+/// sections, which may be stripped. The entry point is looked up through the hash tables, so the
+/// time does not depend on the number of symbols.
 #include "components/componentTools/libraryImage.h"
 
 #include <algorithm>
@@ -42,7 +44,7 @@ constexpr std::uint16_t executable = 2, shared = 3;
 constexpr std::uint16_t x86_64 = 62;
 constexpr std::uint32_t loadSegment = 1, dynamicSegment = 2;
 
-/// Limits that no real library comes near; they bound the work that a hostile one can cause.
+/// Limits far above those of real libraries. They bound the time and memory for a malicious file.
 constexpr std::size_t maximumSegments = 1024;
 constexpr std::size_t maximumDynamicEntries = 4096;
 constexpr std::size_t maximumNeeded = 1024;
@@ -79,8 +81,8 @@ class ElfReader {
             findEntryPoint();
     }
 
-    /// The symbols that somebody else must define before the library can be loaded, but for those
-    /// that it wants in a certain version, which only the libraries that it needs can have.
+    /// Returns the undefined global symbols without a version. A symbol with a version can only
+    /// come from a dependency.
     std::vector<std::string> wantedSymbols() {
         std::vector<std::string> names;
         std::size_t bytes = 0;
@@ -136,7 +138,7 @@ class ElfReader {
     bool readSegments() {
         if (header.segmentSize != sizeof(Segment) || header.segmentCount > maximumSegments)
             return damaged(L"the table of segments makes no sense");
-        // The section headers stand at the end, as a rule: a file that was cut off lacks them.
+        // Section headers are usually at the end, so a truncated file lacks them.
         if (!file.reaches(header.sections, header.sectionCount * std::uint64_t{header.sectionSize}))
             return damaged(L"the end is missing");
         for (std::size_t index = 0; index < header.segmentCount; ++index) {
@@ -195,7 +197,7 @@ class ElfReader {
         }
     }
 
-    /// The loader follows names wherever they lead.
+    /// Returns whether the string table ends with NUL. The loader does not check the ends of names.
     bool namesEnd() {
         if (ownName >= stringsSize)
             return false;
@@ -260,19 +262,19 @@ class ElfReader {
         const auto symbol = find(entryPointName);
         if (!symbol)
             return;
-        // Functions written in assembly often carry no type; one may be chosen at load time.
+        // Functions in assembly often have no type; type 10 is resolved at load time (IFUNC).
         const unsigned int type = symbol->info & 15;
         const bool function = type == 0 || type == 2 || type == 10;
         image.entryPoint =
             function ? LibraryImage::EntryPoint::function : LibraryImage::EntryPoint::noFunction;
     }
 
-    /// The symbol with that name that is defined here for others to see.
+    /// Returns the exported symbol with that name.
     std::optional<Symbol> find(std::string_view wanted) {
         return gnuHash ? findByGnuHash(wanted) : findByHash(wanted);
     }
 
-    /// How many symbols there may be that others define: the newer table begins behind them.
+    /// Returns the number of symbols that may be undefined. The GNU hash table begins after them.
     std::uint64_t unhashedSymbols() {
         if (!symbols || !strings)
             return 0;
@@ -339,7 +341,7 @@ class ElfReader {
         return std::nullopt;
     }
 
-    /// The symbol if it has that name and is defined here for others to see.
+    /// Returns the symbol if it has that name and is exported.
     std::optional<Symbol> definition(std::uint64_t index, std::string_view wanted) {
         const auto symbol = readAt<Symbol>(symbols + index * sizeof(Symbol));
         if (!symbol || symbol->section == 0 || name(symbol->name) != wanted)

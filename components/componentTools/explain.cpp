@@ -1,3 +1,6 @@
+/// Examines a file in stages, from cheap to expensive: its path and content, its dependencies, its
+/// record, and then, on request, a probe. A later stage replaces the verdict of an earlier one only
+/// if it explains more.
 #include "components/componentTools/explain.h"
 
 #include "components/componentTools/discovery.h"
@@ -14,7 +17,7 @@ namespace Mz::Tools {
 
 namespace {
 
-/// What the list says of the file.
+/// Compares the file with its record, which may be null.
 Finding judgeRecord(const RecordedLibrary* record, const std::filesystem::path& file) {
     if (!record)
         return {Verdict::notRecorded, {}, {}};
@@ -34,7 +37,7 @@ Finding judgeRecord(const RecordedLibrary* record, const std::filesystem::path& 
     return {Verdict::recordedUnchanged, std::to_wstring(record->builders.size()), {}};
 }
 
-/// What a list says of the file's builders.
+/// Adds the notes on builders whose uids collide with the list.
 void compareUids(Explanation& explanation, const RecordedLibraries& recorded,
                  const RecordedLibrary* own) {
     const std::size_t position =
@@ -43,7 +46,7 @@ void compareUids(Explanation& explanation, const RecordedLibraries& recorded,
         explanation.notes.push_back(std::move(note));
 }
 
-/// Whether one of the folders is the one that the file is in.
+/// Returns whether one of the folders contains the file, as a verdict.
 Finding judgePath(const std::vector<std::filesystem::path>& folders,
                   const std::filesystem::path& file) {
     const bool leads =
@@ -59,7 +62,7 @@ void load(Explanation& explanation, const ExplainOptions& options) {
     if (result.verdict.verdict == Verdict::loadFailed && options.followDependencies)
         if (auto symbol = symbolOfHost(explanation.file, explanation.dependencies))
             result.verdict = std::move(*symbol);
-    // What is missing says more than the loader's words about it.
+    // The missing dependency explains more than the loader's error about it.
     if (result.verdict.verdict != Verdict::loadFailed ||
         explanation.verdict.verdict != Verdict::dependencyMissing)
         explanation.verdict = std::move(result.verdict);

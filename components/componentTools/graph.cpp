@@ -1,3 +1,6 @@
+/// The DOT text has one cluster for each library. Nodes are numbered in the order of the list, so
+/// that equal input results in equal text. Graphviz reads the text from a temporary file beside the
+/// result, because child processes have no standard input here.
 #include "components/componentTools/graph.h"
 
 #include "components/componentManager/files.h"
@@ -10,7 +13,7 @@ namespace Mz::Tools {
 
 namespace {
 
-/// `text` as a quoted string of the language.
+/// Returns `text` as a quoted DOT string, in UTF-8. Control characters are dropped.
 std::string quoted(const std::wstring& text) {
     std::string result = "\"";
     for (const char character : toUtf8(text)) {
@@ -40,7 +43,7 @@ std::string libraryBox(const RecordedLibrary& library, std::size_t number) {
     return box + "  }\n";
 }
 
-/// Calls `action` with the numbers of each builder and the builder.
+/// Calls `action` with the node's name and the record of each builder.
 template <class Action>
 void forEachBuilder(const RecordedLibraries& libraries, Action action) {
     for (std::size_t library = 0; library < libraries.size(); ++library)

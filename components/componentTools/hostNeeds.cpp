@@ -1,7 +1,6 @@
-/// On Windows a library names the program that it imports from. On Linux it only lacks a
-/// definition, which shows when everything that it needs was asked for it. That takes a look-up for
-/// each symbol and library, so it is done after a load has failed, and not for each file of a
-/// folder.
+/// A Windows library names the program from which it imports. A Linux library only has an undefined
+/// symbol, which is detected by searching all dependencies for it. That takes a look-up for each
+/// symbol and library, so it is done only after a load has failed, not for each file of a folder.
 #include "components/componentTools/hostNeeds.h"
 
 #include "components/componentTools/platform/system.h"

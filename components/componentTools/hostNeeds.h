@@ -1,7 +1,7 @@
-/// Libraries that need their host's own program.
+/// Detects libraries that need the program of their host.
 ///
-/// A host may export functions from its program for its components. Such a component loads in that
-/// host alone, and fails in every process that only tries it, so the failure says nothing about it.
+/// A host may export functions from its program for its components. Such a component can be loaded
+/// by that host only. It fails in a probe, and that failure is no fault of the component.
 #pragma once
 
 #include "components/componentTools/explain.h"
@@ -13,15 +13,15 @@
 
 namespace Mz::Tools {
 
-/// The verdict `needsHost` when the library, or one that it needs, names a program among what it
-/// needs, as libraries of Windows do; else nothing. Such a library must not be tried: the system
-/// would map the program like a library if it found it.
+/// Returns the verdict `needsHost` if a Windows library, or one of its dependencies, imports from a
+/// program; else `std::nullopt`. Such a library must not be loaded: the system would map the
+/// program like a library.
 std::optional<Finding> programOfHost(const LibraryImage& image,
                                      const std::vector<Dependency>& dependencies);
 
-/// The verdict `needsHost` when the library at `file`, which could not be loaded, wants a symbol
-/// that none of its dependencies defines, as libraries of Linux do; else nothing, also where a
-/// dependency cannot be read. A symbol that was forgotten, and is nowhere, looks the same.
+/// Returns the verdict `needsHost` if the Linux library at `file`, which failed to load, needs a
+/// symbol that none of its dependencies defines; else, or if a dependency cannot be read,
+/// `std::nullopt`. A symbol that was forgotten, and that no host defines, looks the same.
 std::optional<Finding> symbolOfHost(const std::filesystem::path& file,
                                     const std::vector<Dependency>& dependencies);
 

@@ -1,3 +1,6 @@
+/// Checks the cheapest properties first: attributes, then the content, then the encoding of the
+/// name. Dependencies are followed like the loader does, breadth first, because the order decides
+/// which file a name leads to.
 #include "components/componentTools/inspection.h"
 
 #include "components/componentManager/nativeText.h"
@@ -56,7 +59,7 @@ Finding judgeImage(const LibraryImage& image) {
     }
 }
 
-std::wstring widened(const std::string& name) {
+std::wstring toText(const std::string& name) {
     return displayName(System::pathOfArgument(name));
 }
 
@@ -67,7 +70,7 @@ Finding inspectFile(const std::filesystem::path& file, LibraryImage& image) {
         return *finding;
     image = readLibraryImage(file);
     Finding finding = judgeImage(image);
-    // The name of what is passed over anyway does not matter.
+    // Files that the manager skips may have any name.
     if (severityOf(finding.verdict) != Severity::bystander && !isNameCarried(file))
         finding = {Verdict::nameNotCarried, {}, {}};
     return finding;
@@ -81,7 +84,7 @@ Verdict verdictOnAbsence(const std::filesystem::path& file) {
 
 namespace {
 
-/// Follows what is needed in the loader's order: breadth first, each name once.
+/// Follows dependencies in the loader's order: breadth first, each name once.
 class DependencyWalk {
   public:
     explicit DependencyWalk(const std::filesystem::path& folder) : programFolder(folder) {}
@@ -104,7 +107,8 @@ class DependencyWalk {
         loaded.push_back(std::move(needer));
     }
 
-    /// A name with a variable of the loader means another file for each library that has it.
+    /// Returns whether the name was not searched yet. A name with a variable such as `$ORIGIN`
+    /// names another file for each library, so it is searched for each.
     bool isNew(const std::string& name, const System::Needer& needer) {
         const bool variable = name.find('$') != std::string::npos;
         return seen.emplace(variable ? needer.library : std::filesystem::path(), name).second;
@@ -115,7 +119,7 @@ class DependencyWalk {
         const System::Located located = present != byOwnName.end()
                                             ? System::Located{true, loaded[present->second].library}
                                             : System::findDependency(name, needer, programFolder);
-        dependencies.push_back({widened(name), displayName(needer.library),
+        dependencies.push_back({toText(name), displayName(needer.library),
                                 displayName(located.file),
                                 located.found || needer.image.hasManifest});
         if (!located.file.empty() && present == byOwnName.end())
@@ -124,7 +128,8 @@ class DependencyWalk {
 
     const std::filesystem::path& programFolder;
     std::vector<Dependency> dependencies;
-    std::deque<System::Needer> loaded; ///< in the loader's order; addresses stay
+    std::deque<System::Needer>
+        loaded; ///< in the loader's order; a deque, because `Needer::loader` points into it
     std::map<std::string, std::size_t> byOwnName;
     std::set<std::pair<std::filesystem::path, std::string>> seen;
 };

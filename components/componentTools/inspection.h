@@ -1,4 +1,4 @@
-/// Judging a file from the outside.
+/// Examines a file without running any of its code.
 #pragma once
 
 #include "components/componentTools/explain.h"
@@ -6,18 +6,22 @@
 
 namespace Mz::Tools {
 
-/// The verdict on the file by its place, its attributes and its bytes; `image` is filled in where
-/// it could be read. Dependencies are not looked at.
+/// Returns the verdict on a file from its path, attributes and content. Ignores its dependencies.
+/// \param image  receives the file's content if the file is a candidate; else it is unchanged
 Finding inspectFile(const std::filesystem::path& file, LibraryImage& image);
 
-/// Why the status of a file cannot be queried: `unreachable`, else `missing`.
+/// Returns why the status of a file cannot be queried: `unreachable` if access is denied, else
+/// `missing`.
 Verdict verdictOnAbsence(const std::filesystem::path& file);
 
-/// Every library that is needed by the file whose image this is, each once.
+/// Returns the direct and indirect dependencies of a file, each name once, in the loader's order.
+/// \param image          the image of `file`
+/// \param programFolder  the folder of the host's program (Windows); may be empty
 std::vector<Dependency> dependenciesOf(const std::filesystem::path& file, const LibraryImage& image,
                                        const std::filesystem::path& programFolder);
 
-/// The verdict `dependencyMissing` when one is, else nothing.
+/// Returns the verdict `dependencyMissing` for the first dependency that was not found;
+/// `std::nullopt` if all were found.
 std::optional<Finding> missingDependency(const std::filesystem::path& file,
                                          const std::vector<Dependency>& dependencies);
 

@@ -1,3 +1,5 @@
+/// Files are read through two cached blocks, because the readers alternate between a table and the
+/// names that it refers to. A foreign library then costs few reads, whatever its size.
 #include "components/componentTools/libraryImage.h"
 
 #include "components/platform/platform.h"

@@ -1,7 +1,7 @@
-/// What a file says of itself as a library or program, read from its bytes alone.
+/// Reads ELF and PE libraries and programs without running any of their code.
 ///
-/// Both formats are read on every system, so that a library for the wrong one is called by its
-/// name. Nothing in the file is trusted, and nothing of it is run.
+/// Both formats are read on every system, so that a library for the wrong system is recognised. The
+/// readers do not trust the file: every offset, size and count is checked.
 #pragma once
 
 #include <array>
@@ -17,7 +17,7 @@
 
 namespace Mz::Tools {
 
-/// Reads pieces of a file through two remembered blocks.
+/// Reads pieces of a file through two cached blocks.
 class FileBytes {
   public:
     explicit FileBytes(const std::filesystem::path& path);
@@ -25,12 +25,12 @@ class FileBytes {
     bool isOpen() const { return opened; }
     std::uint64_t size() const { return fileSize; }
 
-    /// Whether the file has all of these bytes.
+    /// Returns whether the file contains all of these bytes.
     bool reaches(std::uint64_t offset, std::uint64_t length) const {
         return length <= fileSize && offset <= fileSize - length;
     }
 
-    /// The `T` at `offset`; nothing when the file ends before it is whole.
+    /// Returns the `T` at `offset`; `std::nullopt` if the file ends before its end.
     template <class T>
     std::optional<T> read(std::uint64_t offset) {
         static_assert(std::is_trivially_copyable_v<T>);
@@ -40,10 +40,11 @@ class FileBytes {
         return value;
     }
 
-    /// False when the file ends before. No piece is larger than a block.
+    /// Reads `length` bytes, at most the size of a block. Returns false if it cannot read all.
     bool read(std::uint64_t offset, void* data, std::size_t length);
 
-    /// The text at `offset` up to its NUL; nothing when it is longer than any sensible name.
+    /// Returns the NUL-terminated text at `offset`; `std::nullopt` if it is not terminated or has
+    /// 4096 bytes or more.
     std::optional<std::string> text(std::uint64_t offset);
 
   private:
@@ -70,34 +71,34 @@ struct LibraryImage {
     bool readable = false;
     ImageFormat format = ImageFormat::none;
     Kind kind = Kind::other;
-    std::wstring otherProcessor; ///< its name, when it is not x86-64
-    std::wstring damage;         ///< what is wrong, when something is
+    std::wstring otherProcessor; ///< the name of its processor; empty for x86-64
+    std::wstring damage;         ///< the first fault in the file; empty if none was found
     EntryPoint entryPoint = EntryPoint::absent;
-    std::string ownName;              ///< by which others need it, where it carries one (SONAME)
-    std::vector<std::string> needed;  ///< the libraries that the system loads with it
-    std::vector<std::string> rpath;   ///< folders for all that is loaded through it, as written
-    std::vector<std::string> runpath; ///< folders for what it needs itself
-    bool hasManifest = false;         ///< describes surroundings of its own to load in
+    std::string ownName;             ///< the SONAME (ELF); empty if there is none
+    std::vector<std::string> needed; ///< its direct dependencies
+    std::vector<std::string> rpath;  ///< DT_RPATH, unexpanded: applies to indirect dependencies too
+    std::vector<std::string> runpath; ///< DT_RUNPATH, unexpanded: for direct dependencies
+    bool hasManifest = false;         ///< has a manifest, which changes how dependencies are found
 };
 
-/// Reads the file, which must be a regular one.
+/// Returns the image of a file, which must be a regular file: opening a pipe would block.
 LibraryImage readLibraryImage(const std::filesystem::path& path);
 
-/// What `readLibraryImage` is made of: each fills `image` from a file that begins as its format
-/// does, up to the first thing that is wrong.
+/// The parts of `readLibraryImage`. Each fills `image` from a file with the magic number of its
+/// format, and stops at the first fault.
 void readElfImage(FileBytes& file, LibraryImage& image);
 void readPeImage(FileBytes& file, LibraryImage& image);
 
-/// The symbols that others must define before the library at `path`, in the format of Linux, can be
-/// loaded. Leaves out those that may be missing (weak), and those that it wants in a certain
-/// version: these can only come from the libraries that it needs.
+/// Returns the symbols that other files must define before the ELF library at `path` can be loaded.
+/// Skips weak symbols, which may be undefined, and symbols with a version, which can only come from
+/// its dependencies.
 std::vector<std::string> wantedSymbols(const std::filesystem::path& path);
 
-/// Removes from `names` what the library at `path`, in the format of Linux, defines for others.
-/// False when it cannot be read or is damaged.
+/// Removes from `names` the symbols that the ELF library at `path` exports.
+/// \return false if the library cannot be read or is damaged
 bool removeDefined(const std::filesystem::path& path, std::set<std::string>& names);
 
-/// The entry point of component libraries.
+/// The name of the entry point of component libraries.
 inline constexpr const char* entryPointName = "QrGetComponentDescription";
 
 } // namespace Mz::Tools

@@ -1,3 +1,5 @@
+/// Windows denies access to a file during a replacement, so a failure may be temporary. Each
+/// attempt queries the status again, because the file may disappear or become something else.
 #include "components/componentTools/openPatiently.h"
 
 #include "components/platform/platform.h"

@@ -1,4 +1,4 @@
-/// Opening a file that other programs replace.
+/// Opens a file that other processes may replace.
 #pragma once
 
 #include <filesystem>
@@ -6,9 +6,9 @@
 
 namespace Mz::Tools {
 
-/// Opens a regular file that may be replaced at this very moment, for which some systems refuse it
-/// for a while. False if there is none or it still cannot be opened after half a second. Never
-/// opens anything but a regular file: a pipe would block.
+/// Opens a regular file for reading, with retries: some systems deny access for a moment while the
+/// file is being replaced. Opens regular files only, because a pipe would block.
+/// \return false if there is no regular file, or it still cannot be opened after half a second
 bool openPatiently(std::ifstream& stream, const std::filesystem::path& file);
 
 } // namespace Mz::Tools

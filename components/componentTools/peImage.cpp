@@ -1,4 +1,5 @@
-/// Libraries and programs in the format of Windows.
+/// Reads PE files as the loader does: from the sections and the data directories. The entry point
+/// is found by binary search, because the export table is sorted.
 #include "components/componentTools/libraryImage.h"
 
 #include <algorithm>
@@ -54,7 +55,7 @@ constexpr std::size_t exportDirectory = 0, importDirectory = 1, resourceDirector
                       certificateDirectory = 4;
 constexpr std::uint32_t pageSize = 0x1000, sectorSize = 0x200;
 
-/// Limits that no real library comes near; they bound the work that a hostile one can cause.
+/// Limits far above those of real libraries. They bound the time and memory for a malicious file.
 constexpr std::size_t maximumSections = 96;
 constexpr std::size_t maximumNeeded = 1024;
 constexpr std::size_t maximumResources = 4096;
@@ -93,8 +94,7 @@ class PeReader {
         const auto start = file.read<std::uint32_t>(0x3C);
         const auto signature = start ? file.read<std::uint32_t>(*start) : std::nullopt;
         if (!signature || *signature != 0x4550)
-            return false; // A program for a forerunner of the system, or a text that begins with
-                          // MZ.
+            return false; // A DOS program, or a text that begins with MZ.
         image.format = ImageFormat::pe;
         const auto whole = file.read<FileHeader>(*start);
         if (!whole)
@@ -121,7 +121,7 @@ class PeReader {
             return damaged(L"the table of sections makes no sense");
         const std::uint64_t table = optional + header.optionalSize;
         const std::uint32_t imageSize = file.read<std::uint32_t>(optional + 56).value_or(0);
-        std::uint64_t end = 0; // of what is mapped so far
+        std::uint64_t end = 0; // of the sections so far
         for (std::size_t index = 0; index < header.sectionCount; ++index) {
             const auto section = file.read<Section>(table + index * sizeof(Section));
             if (!section)
@@ -139,8 +139,8 @@ class PeReader {
         return hasAppendix();
     }
 
-    /// The symbols of the linker and the certificate stand behind the sections. The system loads
-    /// libraries without, but one that says it has them was cut off.
+    /// Checks the linker's symbols and the certificate, which follow the sections. The system does
+    /// not need them, but if they are announced and absent, the file is truncated.
     bool hasAppendix() {
         const std::uint64_t strings = header.symbols + header.symbolCount * 18ull;
         const bool hasSymbols = header.symbols && header.symbolCount;
@@ -164,7 +164,7 @@ class PeReader {
         return section.memorySize ? section.memorySize : section.fileSize;
     }
 
-    /// How much of the section is read from the file.
+    /// Returns the size of the section's content in the file.
     static std::uint32_t backedSize(const Section& section) {
         return std::min(section.fileSize, memorySize(section));
     }
@@ -234,7 +234,7 @@ class PeReader {
                 damaged(L"the table of exports makes no sense");
             return;
         }
-        // As the system searches: in names that are sorted. It finds nothing where they are not.
+        // The system uses binary search too: in unsorted names it does not find the symbol either.
         std::uint32_t first = 0;
         for (std::uint32_t count = exports->nameCount; count > 0;) {
             const std::uint32_t middle = first + (count - 1) / 2;
@@ -263,8 +263,8 @@ class PeReader {
             damaged(L"the table of exports makes no sense");
     }
 
-    /// Compares the name at `address` with the entry point's as `strcmp` does; nothing if it is cut
-    /// off before that is decided.
+    /// Compares the name at `address` with the entry point's name like `strcmp`; `std::nullopt` if
+    /// the name is truncated before the result is known.
     std::optional<int> compareWithEntryPoint(std::uint64_t address) {
         constexpr std::size_t length = std::string_view(entryPointName).size() + 1;
         char text[length] = {};
@@ -282,7 +282,7 @@ class PeReader {
         return std::strncmp(text, entryPointName, length);
     }
 
-    /// An address among the exports themselves is the name of another library's function.
+    /// An address inside the export table is a forwarder: the name of another library's function.
     void judge(std::uint32_t function, const Directory& exports) {
         const bool forwarded =
             function >= exports.address && function - exports.address < exports.size;
@@ -292,7 +292,7 @@ class PeReader {
                                               : LibraryImage::EntryPoint::noFunction;
     }
 
-    /// Whether there is a manifest for the library's own surroundings: resource 2 of type 24.
+    /// Returns whether there is a manifest that applies to the library: resource 2 of type 24.
     bool findManifest() {
         const Directory resources = directory(resourceDirectory);
         if (!resources.address)

@@ -1,3 +1,5 @@
+/// Derives the verdict from two sources: the report of the child process, and the way in which the
+/// process ended. A report is accepted only if it is complete and valid.
 #include "components/componentTools/probe.h"
 
 #include "components/componentTools/platform/system.h"
@@ -9,13 +11,14 @@ namespace Mz::Tools {
 
 namespace {
 
-/// The sum of all texts of a library; no real one comes near.
+/// The limit of a report, in bytes. Real libraries stay far below it.
 constexpr std::size_t longestAnswer = std::size_t{64} << 20;
 
 std::filesystem::path probeProgram(const ProbeOptions& options) {
     if (!options.program.empty())
         return options.program;
-    return System::ownFolder() / (std::string("mzcomponents-probe") + System::programExtension());
+    return System::moduleFolder() /
+           (std::string("mzcomponents-probe") + System::programExtension());
 }
 
 std::wstring seconds(std::chrono::milliseconds time) {
@@ -28,14 +31,14 @@ Finding memoryFinding(const ProbeAnswer& answer, const ProbeOptions& options) {
     return {Verdict::outOfMemory, nameOf(answer.stage), std::to_wstring(options.memoryLimit >> 20)};
 }
 
-/// What the process itself said, completed by what only we know.
+/// Returns the fault that the child process reported, completed by the stage and the memory use.
 Finding completed(const ProbeAnswer& answer, const System::ChildResult& child,
                   const ProbeOptions& options) {
     Finding fault = *answer.fault;
     if (fault.verdict == Verdict::outOfMemory) {
         if (child.memory >= options.memoryLimit / 2)
             return memoryFinding(answer, options);
-        // It asked for too much at once, or throws it without need.
+        // The process used little memory: it requested too much at once, or throws without need.
         fault = {Verdict::threw, {}, L"std::bad_alloc"};
     }
     if (fault.subject.empty())
@@ -43,11 +46,11 @@ Finding completed(const ProbeAnswer& answer, const System::ChildResult& child,
     return fault;
 }
 
-/// The process has ended without a fault and without a description.
+/// Returns the verdict if the process exited without reporting a fault or a description.
 Finding judgeMissingAnswer(const System::ChildResult& child, const ProbeAnswer& answer) {
     if (child.status != answeredStatus)
         return {Verdict::exited, nameOf(answer.stage), std::to_wstring(child.status)};
-    // It did answer, so the library has got at the pipe.
+    // The probe sent its report completely, so the library must have closed or used the pipe.
     if (answer.cutOff)
         return {Verdict::garbled, L"its last message is not whole", {}};
     return {Verdict::answerLost, nameOf(answer.stage), {}};
@@ -67,10 +70,10 @@ Finding judgeEnd(const System::ChildResult& child, const ProbeAnswer& answer,
     default: break;
     }
     if (answer.garbled)
-        return {Verdict::garbled, L"something else came between", {}};
+        return {Verdict::garbled, L"it contains bytes of another origin", {}};
     if (answer.fault)
         return completed(answer, child, options);
-    // With its whole answer, its end does not matter.
+    // If the report is complete, the exit status does not matter.
     if (child.end == End::unknown && !answer.description)
         return {Verdict::endUnknown, stage, {}};
     if (child.end == End::crashed)
@@ -105,7 +108,7 @@ void noteBuilders(const Description& description, std::vector<Finding>& notes) {
         notes.push_back({Verdict::uidTwice, textOf(*twice), {}});
 }
 
-/// Whether a library may get this verdict because it was refused memory.
+/// Returns whether a library may get this verdict only because the system limited its memory.
 bool mayLackMemory(Verdict verdict) {
     switch (verdict) {
     case Verdict::loadFailed:
@@ -119,7 +122,7 @@ bool mayLackMemory(Verdict verdict) {
     }
 }
 
-/// `refused` is how much memory the system refuses the process, in bytes; 0 for no such limit.
+/// \param refused  the memory limit that the system enforces, in bytes; 0 for none
 ProbeResult probeOnce(const std::filesystem::path& file, const ProbeOptions& options,
                       std::uint64_t refused) {
     const System::ChildLimits limits{options.timeLimit, options.memoryLimit, refused, longestAnswer,
@@ -143,7 +146,7 @@ ProbeResult probeOnce(const std::filesystem::path& file, const ProbeOptions& opt
 } // namespace
 
 ProbeResult probeLibrary(const std::filesystem::path& file, const ProbeOptions& options) {
-    // What is only reserved counts for the system as well, so it refuses no less than this.
+    // The system counts reserved addresses too, so its limit must be far above the real one.
     const std::uint64_t refused = options.memoryLimit * 2 + (std::uint64_t{1} << 30);
     ProbeResult result = probeOnce(file, options, refused);
     if (mayLackMemory(result.verdict.verdict))

@@ -1,3 +1,6 @@
+/// Messages are framed and checked, because the library in the probe can write into the same pipe.
+/// Payloads use the binary stream, but texts are sent as character codes, so that the two processes
+/// need not have the same locale.
 #include "components/componentTools/probeAnswer.h"
 
 #include "components/componentManager/binaryStream.h"
@@ -24,7 +27,7 @@ std::uint32_t sumOf(std::string_view bytes) {
     return sum;
 }
 
-/// Texts go as the codes of their characters, so that no locale has a say.
+/// Writes a text as character codes, independent of the locale.
 void writeText(QrStream& stream, const std::wstring& text) {
     stream << static_cast<unsigned int>(text.size());
     for (const wchar_t character : text)
@@ -39,7 +42,7 @@ std::wstring readText(QrStream& stream) {
         unsigned int code = 0;
         stream >> code;
         if (code > static_cast<std::uint32_t>(std::numeric_limits<wchar_t>::max()))
-            throw std::runtime_error("no character");
+            throw std::runtime_error("invalid character");
         text += static_cast<wchar_t>(code);
     }
     return text;
@@ -62,22 +65,22 @@ std::string message(Kind kind, Write write) {
     return framed.str();
 }
 
-/// Reads one payload, to its last byte.
+/// Reads one payload, which must not contain more than its message.
 class PayloadReader {
   public:
     explicit PayloadReader(std::string_view payload)
         : content(std::string(payload)), buffer(&content), stream(&buffer) {}
 
-    /// Throws `std::exception` when the payload makes no sense.
+    /// \throws std::exception if the payload is invalid
     void read(Kind kind, ProbeAnswer& answer) {
         switch (kind) {
         case Kind::stage: answer.stage = readStage(); break;
         case Kind::fault: answer.fault = readFault(); break;
         case Kind::description: answer.description = readDescription(); break;
-        default: throw std::runtime_error("no kind of message");
+        default: throw std::runtime_error("unknown kind of message");
         }
         if (buffer.read() != -1)
-            throw std::runtime_error("more than the message");
+            throw std::runtime_error("bytes after the message");
     }
 
   private:
@@ -85,7 +88,7 @@ class PayloadReader {
         unsigned char stage = 0;
         stream >> stage;
         if (stage > static_cast<unsigned char>(Stage::enumerating))
-            throw std::runtime_error("no stage");
+            throw std::runtime_error("unknown stage");
         return static_cast<Stage>(stage);
     }
 
@@ -93,7 +96,7 @@ class PayloadReader {
         const std::wstring name = readText(stream);
         const auto verdict = verdictNamed(std::string(name.begin(), name.end()));
         if (!verdict)
-            throw std::runtime_error("no verdict");
+            throw std::runtime_error("unknown verdict");
         Finding fault{*verdict, {}, {}};
         fault.subject = readText(stream);
         fault.words = readText(stream);
@@ -186,7 +189,7 @@ ProbeAnswer decodeAnswer(std::string_view bytes) {
         const std::string_view payload = bytes.substr(9, size);
         try {
             if (wordAt(bytes, 9 + size) != sumOf(payload))
-                throw std::runtime_error("another sum");
+                throw std::runtime_error("wrong checksum");
             PayloadReader(payload).read(static_cast<Kind>(bytes[4]), answer);
             answer.anything = true;
         } catch (const std::runtime_error&) {

@@ -1,8 +1,8 @@
-/// What the process that loads a library tells the one that started it.
+/// The protocol between `mzcomponents-probe` and the process that started it.
 ///
-/// A sequence of messages, each with a mark, its kind, its length and a sum over it. The process
-/// may end after any byte, and the library in it may have written anything: the reader takes
-/// nothing on trust.
+/// The probe writes a sequence of messages. Each has a magic number, a kind, a length and a
+/// checksum. The probe may end after any byte, and the library in it may write anything into the
+/// pipe, so the decoder trusts nothing.
 #pragma once
 
 #include "components/componentTools/probe.h"
@@ -13,39 +13,40 @@
 
 namespace Mz::Tools {
 
-/// How far the process has come.
+/// The stages of a probe, in order.
 enum class Stage : unsigned char { starting, loading, entryPoint, describing, enumerating };
 
-/// "its initialisers", …
+/// Returns the stage as part of a sentence, for example "its initialisers".
 const wchar_t* nameOf(Stage stage);
 
-/// What the library said of itself.
+/// The description of a library.
 struct Description {
     std::wstring label, text;
-    unsigned int announced = 0; ///< how many builders it says it has
+    unsigned int announced = 0; ///< the result of `getBuilderCount`
     std::vector<RecordedBuilder> builders;
 };
 
-/// The bytes of one message.
+/// Return the bytes of one message.
 std::string encodeStage(Stage stage);
 std::string encodeFault(Verdict verdict, const std::wstring& subject, const std::wstring& words);
 std::string encodeDescription(const Description& description);
 
-/// Everything that came.
+/// The decoded messages.
 struct ProbeAnswer {
     Stage stage = Stage::starting;
-    bool anything = false; ///< whether the process has said a word
-    bool garbled = false;  ///< there is something that is no message
-    bool cutOff = false;   ///< the last message is not whole, and counts as not sent
+    bool anything = false; ///< at least one valid message arrived
+    bool garbled = false;  ///< the bytes contain something that is not a valid message
+    bool cutOff = false;   ///< the last message is incomplete and was ignored
     std::optional<Finding> fault;
     std::optional<Description> description;
 };
 
-/// The status with which the process ends by itself, after its last message: one that no library is
-/// likely to exit with.
+/// The exit status of a probe that has sent its last message. A library is unlikely to exit with
+/// it.
 inline constexpr int answeredStatus = 217;
 
-/// Reads the messages up to the end, or up to the first thing that is none.
+/// Decodes the messages up to the end, or up to the first invalid byte. A later message of a kind
+/// replaces an earlier one.
 ProbeAnswer decodeAnswer(std::string_view bytes);
 
 } // namespace Mz::Tools

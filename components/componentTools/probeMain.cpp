@@ -1,5 +1,7 @@
-/// `mzcomponents-probe FILE MEMORY`: loads one library, asks it for its description, as the
-/// component manager does, and answers on standard output. Not meant to be started by people.
+/// The program `mzcomponents-probe FILE MEMORY`: loads one library, requests its description as the
+/// component manager does, and reports on standard output. libMZcomponentTools starts it. Before
+/// each stage it reports the stage, so that the parent process knows where a crash happened. It
+/// ends without running exit handlers, because the library's handlers and destructors may fail.
 #include "components/componentManager/componentImp.h"
 #include "components/componentManager/nativeText.h"
 #include "components/componentTools/platform/system.h"
@@ -17,7 +19,7 @@
 #include <typeinfo>
 
 #ifdef MZ_UNLIMITED_ADDRESSES
-/// Under the sanitizers: a crash is to end the process as it does without them.
+/// Lets a crash end the process by its signal under the sanitizers too.
 extern "C" MZ_EXPORT const char* __asan_default_options() {
     return "handle_segv=0:handle_sigbus=0:handle_sigill=0:handle_sigfpe=0:handle_abort=0:"
            "detect_leaks=0";
@@ -40,11 +42,11 @@ void sendFault(Verdict verdict, const std::wstring& subject = {}, const std::wst
     send(encodeFault(verdict, subject, words));
 }
 
-std::wstring widened(const char* text) {
+std::wstring toText(const char* text) {
     return System::displayName(System::pathOfArgument(text ? text : ""));
 }
 
-/// The class of the exception that is being handled, for those that say nothing else.
+/// Returns the class of the current exception, for exceptions without a text.
 std::wstring exceptionClass() {
     const std::type_info* type = abi::__cxa_current_exception_type();
     if (!type)
@@ -52,10 +54,11 @@ std::wstring exceptionClass() {
     int failure = 0;
     const std::unique_ptr<char, decltype(&std::free)> name(
         abi::__cxa_demangle(type->name(), nullptr, nullptr, &failure), &std::free);
-    return L"a value of type " + widened(name ? name.get() : type->name());
+    return L"a value of type " + toText(name ? name.get() : type->name());
 }
 
-/// What the exception that is being handled says. Lack of memory is a finding of its own.
+/// Returns the finding for the current exception. `std::bad_alloc` becomes `outOfMemory`, which the
+/// parent process checks against the memory that was really used.
 Finding exceptionFinding(Verdict verdict, const std::wstring& before) {
     try {
         throw;
@@ -64,7 +67,7 @@ Finding exceptionFinding(Verdict verdict, const std::wstring& before) {
     } catch (const ExBase& failure) {
         return {verdict, {}, before + displayText(failure.getReason())};
     } catch (const std::exception& failure) {
-        return {verdict, {}, before + widened(failure.what())};
+        return {verdict, {}, before + toText(failure.what())};
     } catch (...) {
         return {verdict, {}, before + exceptionClass()};
     }
@@ -78,12 +81,12 @@ void onAbort(int) {
 void onTerminate() {
     Finding finding{Verdict::aborted, {}, L" (std::terminate)"};
     if (std::current_exception())
-        finding = exceptionFinding(Verdict::aborted, L": nobody catches an exception: ");
+        finding = exceptionFinding(Verdict::aborted, L": uncaught exception: ");
     sendFault(finding.verdict, finding.subject, finding.words);
     System::endProcess(3);
 }
 
-/// Collects what the library offers as the manager does.
+/// Collects the builder descriptions, with the same calls and casts as the manager.
 class Collector final : public QrEnumerator<QrCPtr<QrBuilderDescription>> {
   public:
     explicit Collector(std::vector<RecordedBuilder>& target) : builders(target) {}
@@ -156,10 +159,10 @@ void probe(const System::NativePath& file) {
     send(encodeStage(Stage::loading));
     const platform::Module module = platform::loadLibrary(file.native());
     if (!module) {
-        const std::wstring fault = System::passedFault();
+        const std::wstring fault = System::caughtFault();
         if (!fault.empty())
             return sendFault(Verdict::crashed, {}, fault);
-        return sendFault(Verdict::loadFailed, {}, System::loaderWords(file));
+        return sendFault(Verdict::loadFailed, {}, System::loaderError(file));
     }
     send(encodeStage(Stage::entryPoint));
     const auto entryPoint = reinterpret_cast<QrGetComponentDescriptionFunction*>(

@@ -1,4 +1,4 @@
-/// The reasons of exceptions, for people.
+/// Formats the reasons of exceptions for people.
 #pragma once
 
 #include "components/componentTools/export.h"

@@ -1,3 +1,6 @@
+/// Reads the list with the same stream class as the manager, but checks everything that the manager
+/// trusts. Counts in the file are not used to allocate memory, because a damaged file may contain
+/// any number.
 #include "components/componentTools/recordedList.h"
 
 #include "components/componentManager/binaryStream.h"
@@ -18,18 +21,18 @@ namespace Mz::Tools {
 
 namespace {
 
-/// Reads a list and takes nothing on trust.
+/// Reads a list and validates every value.
 class ListReader {
   public:
     explicit ListReader(std::istream& input) : buffer(&input), stream(&buffer) {}
 
-    /// Throws `std::exception` where the list makes no sense.
+    /// \throws std::exception at the first invalid value
     RecordedLibraries read() {
         RecordedLibraries libraries;
         int count = 0;
         stream >> count;
         if (count < 0)
-            throw std::runtime_error("a count below zero");
+            throw std::runtime_error("a negative count");
         for (; count > 0; --count)
             libraries.push_back(readLibrary());
         if (buffer.read() != -1)
@@ -49,9 +52,9 @@ class ListReader {
         unsigned int count = 0;
         stream >> library.time >> size >> count;
         if (size < 0)
-            throw std::runtime_error("a size below zero");
+            throw std::runtime_error("a negative size");
         library.size = size;
-        // The count is only a claim, so builders come one by one. They stand last first.
+        // Read one by one: the count may be wrong. Builders are stored in reverse order.
         for (; count > 0; --count)
             library.builders.push_back(readBuilder());
         std::reverse(library.builders.begin(), library.builders.end());
@@ -81,8 +84,8 @@ class ListReader {
         return text;
     }
 
-    /// Names are recorded in their normal form. A file name may hold a back-slash: some systems
-    /// take it for a character like any other.
+    /// Reads a normalised name. It may contain a backslash, which is an ordinary character in file
+    /// names on Linux.
     std::wstring readName() {
         std::wstring name = readText();
         if (name.empty() || name.find(L'/') != std::wstring::npos ||
@@ -101,7 +104,7 @@ void write(QrStream& stream, const RecordedLibraries& libraries) {
         stream << library.directory << library.fileName << library.time
                << static_cast<int64>(library.size)
                << static_cast<unsigned int>(library.builders.size());
-        // Last first: so lists have always been written.
+        // In reverse order: this is the format of all existing lists.
         for (auto builder = library.builders.rbegin(); builder != library.builders.rend();
              ++builder) {
             stream << builder->uid;
@@ -159,7 +162,7 @@ std::filesystem::path verdictsFileOf(const std::filesystem::path& list) {
 
 bool isCarried(const std::wstring& text) {
     const std::optional<std::string> bytes = toNarrow(text);
-    // Some locales take a similar character instead.
+    // Compare after a round trip, because some locales substitute a similar character.
     return bytes && text.find(L'\0') == std::wstring::npos && toWide(*bytes) == text;
 }
 

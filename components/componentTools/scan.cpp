@@ -1,3 +1,6 @@
+/// Goes through the candidates in the host's order. A record of the old list is reused if the file
+/// is unchanged and a retry cannot help; otherwise the file is examined by `explainFile`. The list
+/// is written at the end, in one step, so that an interrupted scan loses no old record.
 #include "components/componentTools/scan.h"
 
 #include "components/componentManager/exceptions.h"
@@ -75,8 +78,8 @@ class Scanner {
         if (!result.notWritten.empty())
             return;
         writeGuarded([&] { writeRecordedList(options.list, result.libraries); });
-        // Verdicts are of no use beside a list that was not written. A list without them is: a
-        // little more is tried again.
+        // The list comes first: without verdicts it is still valid, and the next scan only retries
+        // more. Verdicts without their list are useless.
         if (result.notWritten.empty())
             writeGuarded([&] { writeVerdicts(verdictsFileOf(options.list), result.libraries); });
     }
@@ -94,7 +97,8 @@ class Scanner {
         result.notWritten = displayName(options.list) + L": " + why;
     }
 
-    /// What is no list may be somebody's work, named by mistake.
+    /// Saves a copy of the rejected file. The user may have named a valuable file by mistake.
+    /// \return false if the copy failed
     bool keepRejected() {
         std::error_code failure;
         if (std::filesystem::is_empty(options.list, failure) && !failure)
@@ -126,18 +130,18 @@ class Scanner {
         } else {
             look(file, *status);
         }
-        // What could not be tried keeps the record that it had.
+        // A library that could not be tried keeps its old record.
         if (known != old.end() && (file.verdict.verdict == Verdict::interrupted ||
                                    (unchanged && file.verdict.verdict == Verdict::probeFailed)))
             keep(file, known->second);
         result.files.push_back(std::move(file));
     }
 
-    /// Whether there is reason to believe that a library without builders does better now.
+    /// Returns whether an unchanged library may have another result now.
     bool isTriedAgain(const RecordedLibrary& library) const {
         if (!library.builders.empty())
             return false;
-        if (!library.kept) // Recorded by somebody else, who did not say why.
+        if (!library.kept) // Recorded by a host, or the verdicts were lost.
             return true;
         switch (library.kept->verdict) {
         case Verdict::dependencyMissing: // It does not change when its dependency arrives.
@@ -156,7 +160,7 @@ class Scanner {
         return library.kept.value_or(Finding{Verdict::recordedFailed, {}, {}});
     }
 
-    /// Takes a record of the old list over as it stands.
+    /// Copies a record of the old list.
     void keep(ScannedFile& file, const RecordedLibrary& library) {
         file.recorded = true;
         result.libraries.push_back(library);
@@ -175,7 +179,7 @@ class Scanner {
             return;
         }
         if (file.verdict.verdict == Verdict::probeFailed) {
-            ++unprobed; // No fault of the library's.
+            ++unprobed; // Not a fault of the library.
             return;
         }
         ++probed;
@@ -185,13 +189,13 @@ class Scanner {
         library.time = status.time;
         library.size = status.size;
         if (file.verdict.verdict == Verdict::needsHost) {
-            result.unjudged.push_back(std::move(library)); // The host alone can tell.
+            result.unjudged.push_back(std::move(library)); // Only the host can load it.
             return;
         }
         if (file.verdict.verdict == Verdict::works)
             library.builders = std::move(explanation.builders);
         if (const std::wstring* text = uncarriedText(library)) {
-            // Recorded without builders it would be lost to a host that can load it.
+            // A record without builders would keep hosts from loading it, though it works.
             file.verdict = {Verdict::textNotCarried, *text, {}};
             return;
         }
@@ -201,8 +205,8 @@ class Scanner {
         result.libraries.push_back(std::move(library));
     }
 
-    /// Says of each recorded library whose builders others take over, or it takes over. A library
-    /// that loses one is recorded all the same: so a host knows it.
+    /// Adds notes on uids that several recorded libraries have. A library that loses a builder is
+    /// recorded nevertheless, because hosts register it too.
     void compareUids() {
         const UidNotes uids(result.libraries);
         std::size_t position = 0;
@@ -213,7 +217,7 @@ class Scanner {
                 const bool first = file.verdict.verdict == Verdict::works;
                 if (first && note.verdict == Verdict::uidTaken)
                     file.verdict = note;
-                // Looking at the file has told some of them already.
+                // `explainFile` may have added the same note.
                 if (std::find(file.notes.begin(), file.notes.end(), note) == file.notes.end())
                     file.notes.push_back(std::move(note));
             }
@@ -240,7 +244,7 @@ class Scanner {
     ProbeOptions probeOptions;
     std::map<Name, RecordedLibrary> old;
     ScanResult result;
-    int probed = 0, unprobed = 0; ///< how often a library was tried, and could not be
+    int probed = 0, unprobed = 0; ///< libraries that were tried, and that could not be tried
 };
 
 } // namespace

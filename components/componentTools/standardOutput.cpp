@@ -1,3 +1,5 @@
+/// Standard output is redirected at the level of file descriptors, because components may write by
+/// any stream or system call. Results are collected and written in large blocks.
 #include "components/componentTools/standardOutput.h"
 
 #include "components/componentTools/platform/system.h"
@@ -10,11 +12,11 @@ namespace Mz::Tools {
 
 void prepareProgram() {
     std::setlocale(LC_ALL, "");
-    System::wantEndsOfChildren();
+    System::resetChildSignal();
 }
 
 ReservedOutput::ReservedOutput() : descriptor(-1) {
-    // What was written before belongs there.
+    // Earlier output belongs to the original standard output.
     std::cout.flush();
     std::fflush(stdout);
     descriptor = System::reserveOutput();

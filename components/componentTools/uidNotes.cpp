@@ -1,4 +1,5 @@
-// One pass over the list notes who offers what; each library is then looked up by its builders.
+/// One pass over the list builds the index. Then each library needs one look-up per builder, so the
+/// time is linear in the number of builders.
 #include "components/componentTools/uidNotes.h"
 
 namespace Mz::Tools {

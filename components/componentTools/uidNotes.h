@@ -1,4 +1,4 @@
-/// What is worth knowing of the identifiers of builders.
+/// Finds builders whose uids collide or are nil.
 #pragma once
 
 #include "components/componentTools/recordedList.h"
@@ -9,19 +9,19 @@
 
 namespace Mz::Tools {
 
-/// Which libraries of a list offer which builders. Of several that offer one identifier the last
-/// one wins, as in a host that has the list.
+/// An index from uids to the libraries of a list that have a builder with that uid. The last such
+/// library wins, as in a host that reads the list.
 class UidNotes {
   public:
-    /// The list must outlive this.
+    /// Builds the index. The list must outlive this object.
     explicit UidNotes(const RecordedLibraries& libraries);
 
-    /// The position of a library that is not in the list. It is taken to come last, as one does
-    /// that is new to a host's last folder.
+    /// The position of a library that is not in the list. It counts as the last one, like a new
+    /// library in the last folder of a host.
     static constexpr std::size_t behindAll = static_cast<std::size_t>(-1);
 
-    /// The notes `uidTaken`, with the winner, `uidWins`, with the last one that loses, and `uidNil`
-    /// on the builders of the library at that position.
+    /// Returns the notes on the builders of the library at `position`: `uidTaken` with the winner,
+    /// `uidWins` with the last library that loses, and `uidNil`.
     std::vector<Finding> notesOn(const std::vector<RecordedBuilder>& builders,
                                  std::size_t position) const;
 

@@ -1,3 +1,5 @@
+/// One table contains everything that is known of each verdict, so that a new verdict needs one
+/// entry. The table is searched linearly: it is short, and verdicts are only looked up for output.
 #include "components/componentTools/verdict.h"
 
 #include "components/componentTools/platform/system.h"
@@ -8,8 +10,8 @@ namespace Mz::Tools {
 
 namespace {
 
-/// In the texts, %1 stands for the finding's subject, %2 for its words, and %L for the variable
-/// that names the folders in which the system looks for libraries.
+/// The properties of a verdict. In the texts, %1 is replaced by the finding's subject, %2 by its
+/// words, and %L by the environment variable with the loader's search path.
 struct Entry {
     Verdict verdict;
     const char* name;
@@ -20,24 +22,23 @@ struct Entry {
 
 constexpr Entry entries[] = {
     {Verdict::component, "component", Severity::good,
-     L"it is a component library, as far as can be seen without running it", L""},
+     L"it is a component library, as far as reading the file can show", L""},
     {Verdict::works, "works", Severity::good, L"it loads and describes its builders (%1)", L""},
     {Verdict::offersNothing, "offersNothing", Severity::bystander,
-     L"it loads and describes itself, but offers no builder", L""},
+     L"it loads and describes itself, but has no builder", L""},
 
     {Verdict::directory, "directory", Severity::bystander,
-     L"it is a folder, and folders inside a search folder are not searched",
+     L"it is a folder, and sub-folders of a search folder are not searched",
      L"name the folder itself in the search path"},
-    {Verdict::hidden, "hidden", Severity::bystander, L"it is hidden, and hidden files are left out",
+    {Verdict::hidden, "hidden", Severity::bystander, L"it is hidden, and hidden files are skipped",
      L"make the file visible"},
     {Verdict::systemFile, "systemFile", Severity::bystander,
-     L"it has the attribute of a system file, and those are left out",
-     L"take the attribute from the file"},
+     L"it has the system attribute, and system files are skipped",
+     L"remove the attribute from the file"},
     {Verdict::notRegular, "notRegular", Severity::bystander,
-     L"it is no regular file, and those are left out", L""},
+     L"it is not a regular file, and only regular files are candidates", L""},
     {Verdict::notALibrary, "notALibrary", Severity::bystander, L"it is no library", L""},
-    {Verdict::program, "program", Severity::bystander,
-     L"it is a program, which is started and not loaded", L""},
+    {Verdict::program, "program", Severity::bystander, L"it is a program, not a library", L""},
     {Verdict::noEntryPoint, "noEntryPoint", Severity::bystander,
      L"it is a library, but does not export \"QrGetComponentDescription\" itself",
      L"if it is meant to be a component, define and export that function (MZ_COMPONENT does)"},
@@ -54,19 +55,18 @@ constexpr Entry entries[] = {
      L"its name has no form in the current locale, so it cannot be recorded",
      L"rename it, or choose a locale that has its characters"},
     {Verdict::notSearchable, "notSearchable", Severity::fault,
-     L"its name has a ';' in it, which separates the folders of a search path, so no host can "
-     L"search it",
-     L"rename it, or the folder above it that has the ';'"},
+     L"its name contains ';', the separator of search paths, so no host can search it",
+     L"rename it, or the folder above it whose name contains ';'"},
     {Verdict::sameName, "sameName", Severity::fault,
-     L"its name is that of %1 but for the case of letters, and a list holds only one of them",
+     L"its name differs from %1 only in case, and a list can contain only one of them",
      L"rename one of the two"},
     {Verdict::otherSystem, "otherSystem", Severity::fault,
      L"it is a library for another system: %1", L"get the library that was built for this system"},
     {Verdict::otherProcessor, "otherProcessor", Severity::fault,
      L"it is a library for another processor: %1",
      L"get the library that was built for this processor"},
-    {Verdict::damaged, "damaged", Severity::fault, L"it is damaged or was cut off: %1",
-     L"build it again, or copy it again"},
+    {Verdict::damaged, "damaged", Severity::fault, L"it is damaged or truncated: %1",
+     L"build or copy it again"},
     {Verdict::entryPointNoFunction, "entryPointNoFunction", Severity::fault,
      L"it exports \"QrGetComponentDescription\", but not as a function of its own",
      L"define the function in the library itself"},
@@ -81,21 +81,20 @@ constexpr Entry entries[] = {
      L"if the host has it, let the host load the library; to have it scanned as well, move what it "
      L"needs into a library that both link. If no host has it, link the library that defines it"},
     {Verdict::nullDescription, "nullDescription", Severity::fault,
-     L"its entry point returns null instead of a description", L"return the description"},
+     L"its entry point returns null instead of a description", L"return a description"},
     {Verdict::wrongInterface, "wrongInterface", Severity::fault,
-     L"what its entry point returns does not answer for QrComponentDescription",
+     L"the object that its entry point returns does not support QrComponentDescription",
      L"derive the description from QrComponentDescription through a cast template"},
     {Verdict::wrongItem, "wrongItem", Severity::fault,
      L"it offers %1 in the place of a builder description",
-     L"offer objects that answer for "
-     L"QrBuilderDescription"},
+     L"enumerate only objects that support QrBuilderDescription"},
     {Verdict::threw, "threw", Severity::fault, L"it throws in %1: %2", L""},
     {Verdict::crashed, "crashed", Severity::fault, L"it crashes in %1: %2", L""},
     {Verdict::aborted, "aborted", Severity::fault, L"it aborts the process in %1%2", L""},
     {Verdict::exited, "exited", Severity::fault, L"it ends the process in %1, with status %2", L""},
     {Verdict::timedOut, "timedOut", Severity::fault,
      L"it did not come to an end in %1 within %2 seconds; --time-limit allows more",
-     L"if it only needs longer, raise --time-limit (in a host: ProbeOptions::timeLimit)"},
+     L"if it only needs more time, raise --time-limit (in a host: ProbeOptions::timeLimit)"},
     {Verdict::outOfMemory, "outOfMemory", Severity::fault,
      L"it uses more memory in %1 than the %2 MiB allowed; --memory-limit allows more",
      L"if it really needs more, raise --memory-limit (in a host: ProbeOptions::memoryLimit)"},
@@ -103,7 +102,7 @@ constexpr Entry entries[] = {
      L"the text \"%1\" of a builder has no form in the current locale, so it cannot be recorded",
      L"choose a locale that has its characters"},
     {Verdict::garbled, "garbled", Severity::fault,
-     L"the process that loaded it did not answer as it should (%1)", L""},
+     L"the report of the process that loaded it is invalid: %1", L""},
     {Verdict::answerLost, "answerLost", Severity::fault,
      L"it closed files in %1 that it did not open, the connection to this process among them, so "
      L"what it offers is unknown",
@@ -111,10 +110,10 @@ constexpr Entry entries[] = {
     {Verdict::answerTooLong, "answerTooLong", Severity::fault,
      L"the process that loaded it answered with more than %1 MiB, the most that a description may "
      L"have",
-     L"offer fewer builders, or shorter texts"},
+     L"describe fewer builders, or shorten their texts"},
     {Verdict::probeFailed, "probeFailed", Severity::fault,
      L"the process to load it in could not be started: %1",
-     L"check that mzcomponents-probe stands beside libMZcomponentTools"},
+     L"check that mzcomponents-probe is in the folder of libMZcomponentTools"},
     {Verdict::endUnknown, "endUnknown", Severity::fault,
      L"it came as far as %1, and the system does not tell how the process that loaded it ended",
      L"do not ignore the ends of children (SIGCHLD) in the program that asks"},
@@ -130,7 +129,7 @@ constexpr Entry entries[] = {
     {Verdict::recordedFailed, "recordedFailed", Severity::note,
      L"the list has it without builders%2, and it has not changed: a host does not try it again "
      L"until its time or size changes",
-     L"mend the file, or scan again and have failures retried"},
+     L"repair the file, or scan again with --retry (in a host: ScanOptions::retry)"},
     {Verdict::recordedChanged, "recordedChanged", Severity::note,
      L"it changed in %1 since it was recorded, so a host loads it at its next start",
      L"scan again"},
@@ -140,18 +139,19 @@ constexpr Entry entries[] = {
      L"the search path does not lead to its folder, so a host with that path does not know it",
      L"add its folder to the host's search path"},
 
-    {Verdict::miscounted, "miscounted", Severity::note, L"it announces %1 builders and gives %2",
-     L"let getBuilderCount return what enumerateBuilders gives"},
+    {Verdict::miscounted, "miscounted", Severity::note,
+     L"it announces %1 builders and enumerates %2",
+     L"let getBuilderCount return the number of enumerated builders"},
     {Verdict::uidTaken, "uidTaken", Severity::note,
-     L"builder %1 is offered by %2 too, which comes later and wins", L"make a new identifier"},
+     L"builder %1 is offered by %2 too, which comes later and wins", L"generate a new uid"},
     {Verdict::uidWins, "uidWins", Severity::note,
      L"builder %1 is offered by %2 too, and this one, which comes later, wins",
-     L"make a new identifier"},
+     L"generate a new uid"},
     {Verdict::uidNil, "uidNil", Severity::note,
-     L"the identifier of its builder \"%2\" is nil, so every other nil one is the same",
-     L"make a new identifier"},
-    {Verdict::uidTwice, "uidTwice", Severity::note, L"it offers builder %1 twice",
-     L"make a new identifier"},
+     L"the uid of its builder \"%2\" is nil, so it collides with every other nil uid",
+     L"generate a new uid"},
+    {Verdict::uidTwice, "uidTwice", Severity::note, L"it has builder %1 twice",
+     L"generate a new uid"},
 };
 
 const Entry& entryOf(Verdict verdict) {

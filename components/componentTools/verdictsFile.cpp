@@ -1,3 +1,6 @@
+/// The verdicts are stored as JSON beside the list, because the format of the list is fixed. Each
+/// has the time and size of its library, so that it is ignored after the library has changed.
+/// Names, not numbers, identify verdicts, so that versions can exchange files.
 #include "components/componentTools/verdictsFile.h"
 
 #include "components/componentManager/files.h"
@@ -31,16 +34,16 @@ Verdicts verdictsOf(const Json& all) {
     return verdicts;
 }
 
-/// Whether a scan may have kept this of a library that it recorded without builders.
+/// Returns whether a scan can save this verdict for a library that it records without builders.
 bool isKept(Verdict verdict) {
     switch (verdict) {
-    case Verdict::component: // Loading it told more.
+    case Verdict::component: // Replaced by the verdict of the probe.
     case Verdict::works:
-    case Verdict::directory: // Those are no candidates,
+    case Verdict::directory: // Not candidates.
     case Verdict::hidden:
     case Verdict::systemFile:
     case Verdict::notRegular:
-    case Verdict::missing: // and these are not recorded.
+    case Verdict::missing: // Not recorded.
     case Verdict::unreachable:
     case Verdict::notAFolder:
     case Verdict::nameNotCarried:
@@ -80,7 +83,7 @@ void readVerdicts(const std::filesystem::path& file, RecordedLibraries& librarie
             if (library.builders.empty())
                 fillIn(library, verdicts);
     } catch (const nlohmann::json::exception&) {
-        return; // Only a memory of ours: without it a little more is tried again.
+        return; // Without verdicts the next scan only retries more.
     }
 }
 

@@ -1,4 +1,4 @@
-/// The verdicts that a scan keeps beside its list.
+/// Reads and writes the verdicts that a scan saves beside its list.
 #pragma once
 
 #include "components/componentTools/recordedList.h"
@@ -7,11 +7,11 @@
 
 namespace Mz::Tools {
 
-/// Fills in what is kept of the libraries, as far as it is of the same state of the file. Of a file
-/// that is not there or makes no sense, nothing is.
+/// Sets the saved verdicts of libraries without builders. Ignores a verdict if the library's time
+/// or size differs. Ignores a file that is missing or invalid.
 void readVerdicts(const std::filesystem::path& file, RecordedLibraries& libraries);
 
-/// Writes what is kept, as `replaceFile` does.
+/// Writes the saved verdicts atomically. Throws what `replaceFile` throws.
 void writeVerdicts(const std::filesystem::path& file, const RecordedLibraries& libraries);
 
 } // namespace Mz::Tools

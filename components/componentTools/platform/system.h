@@ -1,8 +1,8 @@
-/// What the tools need of the operating system beyond what the component manager's own layer gives:
-/// one description, and one implementation for each system (`windows/`, `posix/`), chosen by the
-/// build. No other file of the tools knows which system it is on.
+/// The operating system functions of the tools, in addition to the component manager's platform
+/// layer. Each system has an implementation (`windows/`, `posix/`), which the build selects. No
+/// other file of the tools depends on the system.
 ///
-/// No function throws anything but `std::bad_alloc`, where nothing else is said.
+/// Functions throw `std::bad_alloc` only, unless their comments name other exceptions.
 #pragma once
 
 #include "components/componentTools/libraryImage.h"
@@ -20,136 +20,141 @@ using NativePath = std::filesystem::path;
 
 // ---- Names ----------------------------------------------------------------------------------
 
-/// `path` for people: what has no form in the current locale is shown as `\xNN`.
+/// Returns `path` as text for people. Bytes that are invalid in the locale appear as `\xNN`.
 std::wstring displayName(const NativePath& path);
 
-/// `text` as bytes for standard output or standard error: in the terminal's encoding where `stream`
-/// (1 or 2) is one, else in that of the locale; '?' for what has no form there.
+/// Returns `text` as bytes for standard output (`stream` 1) or standard error (2). The encoding is
+/// the terminal's if the stream is one, else the locale's. A character that cannot be encoded
+/// becomes '?'.
 std::string encode(const std::wstring& text, int stream);
 
-/// The arguments of this process without its name, in bytes: those of the system where names are
-/// bytes, else UTF-8.
+/// Returns the arguments of this process without the program's name: the original bytes on Linux,
+/// UTF-8 on Windows.
 std::vector<std::string> arguments(int count, char** values);
 
-/// The path that such an argument names.
+/// Returns the path that an argument from `arguments` names.
 NativePath pathOfArgument(const std::string& argument);
 
 // ---- Files and libraries --------------------------------------------------------------------
 
-/// The format of this system's own libraries.
+/// Returns the format of this system's libraries.
 ImageFormat ownFormat();
 
 struct FileAttributes {
     bool hidden = false, system = false, directory = false;
 };
+/// Returns the attributes of a file. If there is none, only `hidden` may be set.
 FileAttributes fileAttributes(const NativePath& path);
 
-/// The environment variable that adds folders to those where the system looks for libraries.
+/// Returns the name of the environment variable that adds folders to the loader's search path.
 const wchar_t* loaderPathVariable();
 
-/// Where the system would find a library that another one needs.
+/// The result of `findDependency`.
 struct Located {
     bool found = false;
-    NativePath file; ///< empty when it is found without a file of its own
+    NativePath file; ///< empty if it was not found, or was found without a file
 };
 
-/// A library that needs others, and the one through which it was found to be needed itself.
+/// A library with dependencies, and the library that loads it.
 struct Needer {
     NativePath library;
     LibraryImage image;
-    const Needer* loader = nullptr; ///< null for the one that everything began with
+    const Needer* loader = nullptr; ///< null for the first library
 };
 
-/// Looks for the library `name` that `needer` needs, as the loader would in this process;
-/// `programFolder`, unless empty, stands for the folder of the host's program where that matters.
+/// Searches for the library `name` as the loader would in this process.
+/// \param needer         the library that needs it
+/// \param programFolder  the folder of the host's program; may be empty; unused on Linux
 Located findDependency(const std::string& name, const Needer& needer,
                        const NativePath& programFolder);
 
-/// What the loader says to `path`, which it has just failed to load.
-std::wstring loaderWords(const NativePath& path);
+/// Returns the loader's error for `path`, which has just failed to load. Tries to load it again.
+std::wstring loaderError(const NativePath& path);
 
-/// The folder of libMZcomponentTools itself; empty when the system does not tell.
-NativePath ownFolder();
+/// Returns the folder of libMZcomponentTools; empty if the system does not know it.
+NativePath moduleFolder();
 
-/// The program with that name, without its extension, along the PATH; empty when there is none.
+/// Returns the path of a program that is found in PATH; empty if there is none.
+/// \param name  the program's name without extension
 NativePath findProgram(const std::string& name);
 
-/// What the names of programs end in.
+/// Returns the extension of programs; empty on Linux.
 const char* programExtension();
 
 // ---- Child processes ------------------------------------------------------------------------
 
 struct ChildLimits {
     std::chrono::milliseconds time;
-    std::uint64_t memory;              ///< in bytes, of what it really uses
-    std::uint64_t refused;             ///< in bytes, of what the system lets it have; 0 for all
+    std::uint64_t memory;              ///< used memory, in bytes; polled
+    std::uint64_t refused;             ///< memory that the system enforces, in bytes; 0 for none
     std::size_t output;                ///< in bytes
-    std::function<bool()> interrupted; ///< asked now and then; true ends the child
+    std::function<bool()> interrupted; ///< polled; true kills the child; may be empty
 };
 
 struct ChildResult {
     enum class End {
         notStarted,
         exited,
-        crashed, ///< ended by the system
+        crashed, ///< ended by a signal (Linux) or a fault (Windows)
         timedOut,
         outOfMemory,
         tooMuchOutput,
         interrupted,
-        unknown, ///< the system does not tell, for this program does not want to know
+        unknown, ///< not available, because this process ignores SIGCHLD
     };
     End end = End::notStarted;
-    int status = 0;           ///< of one that exited
-    std::wstring words;       ///< what the system calls the crash; why it was not started
-    std::string output;       ///< what it wrote to its standard output
-    std::uint64_t memory = 0; ///< the most that it was seen to use, in bytes
+    int status = 0;           ///< the exit status, if it exited
+    std::wstring words;       ///< the name of the crash, or why the child was not started
+    std::string output;       ///< its standard output
+    std::uint64_t memory = 0; ///< the peak of its used memory, in bytes
 };
 
-/// Runs a program without standard input and standard error, and waits for its end. Kills it, and
-/// what it has started, at a limit.
-/// \throws what `limits.interrupted` throws, after the program was killed.
+/// Runs a program with empty standard input and discarded standard error, and waits for its end. If
+/// it exceeds a limit, kills it and the processes that it started.
+/// \throws whatever `limits.interrupted` throws, after it has killed the program
 ChildResult runChild(const NativePath& program, const std::vector<NativePath>& arguments,
                      const ChildLimits& limits);
 
-/// The calling thread's own pipe to the process that started this one.
+/// The pipe of a probe to the process that started it.
 ///
-/// Made of standard output, which from then on leads nowhere, as does standard error: what others
-/// write there does not get between our words. Other files that this process has inherited are
-/// closed.
+/// The constructor takes over standard output, and redirects standard output and standard error to
+/// the null device, so that other output cannot mix with the messages. On Linux it closes all other
+/// inherited files.
 class AnswerPipe {
   public:
     AnswerPipe();
-    /// May be called in a handler of a signal.
+    /// Writes all bytes; ignores failures. May be called from a signal handler.
     void write(const char* data, std::size_t size);
 
   private:
     std::intptr_t handle;
 };
 
-/// Takes standard output away from everybody else: what is written there from now on goes to
-/// standard error. Gives where it led before, for `writeReserved`; -1 when it led nowhere.
+/// Redirects standard output to standard error, for all other code in this process.
+/// \return a descriptor of the original standard output, for `writeReserved`; -1 if it was closed
 int reserveOutput();
 
-/// Writes all of it, with line ends as standard output has them; false when that fails.
+/// Writes all bytes, with the line ends of standard output. Returns false on failure.
 bool writeReserved(int descriptor, const char* data, std::size_t size);
 
-/// Undoes what the program that started this one may have wanted, so that the system tells how
-/// children end.
-void wantEndsOfChildren();
+/// Resets SIGCHLD to its default, so that the exit status of children is available. The parent
+/// process may have ignored it. No-op on Windows.
+void resetChildSignal();
 
-/// Sees to it that this process, which is to load libraries that may do anything, goes with the one
-/// that started it, opens no dialogs, leaves no dump, and is refused more than `refused` bytes of
-/// memory unless that is 0. Reserved addresses count where they may be written to.
+/// Prepares this process for loading faulty libraries: it ends with its parent, opens no dialogs,
+/// leaves no core dump, and gets at most `refused` bytes of memory, unless that is 0. Writable
+/// reserved addresses count. On Windows, `runChild` enforces the memory limit and the end with the
+/// parent, by a job.
 void confine(std::uint64_t refused);
 
-/// Ends this process at once; nothing of the libraries in it is run.
+/// Ends this process at once, without running exit handlers or destructors.
 [[noreturn]] void endProcess(int status);
 
-/// The fault that the system noticed, and let somebody pass over, in this process last: a crash in
-/// a library's initialisers, where the system catches such. Empty when there was none.
-std::wstring passedFault();
+/// Returns the name of the last fault that an exception handler in this process caught; empty if
+/// there was none. Windows catches crashes in the initialisers of libraries. Empty on Linux.
+std::wstring caughtFault();
 
-/// A number that no other process has now.
+/// Returns the id of this process.
 unsigned long processNumber();
 
 } // namespace Mz::Tools::System

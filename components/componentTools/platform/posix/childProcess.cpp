@@ -1,3 +1,6 @@
+/// The child runs in its own process group, so that the processes that it starts can be killed with
+/// it. The parent polls the used memory in /proc: limits of the system count reserved addresses
+/// too, which code generators and drivers reserve in large amounts.
 #include "components/componentTools/platform/system.h"
 
 #include <algorithm>
@@ -18,7 +21,7 @@ namespace {
 
 using Clock = std::chrono::steady_clock;
 
-/// How long the parent sleeps before it looks at the child's memory again, in milliseconds.
+/// The polling interval of the child's memory, in milliseconds.
 constexpr int pause = 10;
 
 class Descriptor {
@@ -38,7 +41,7 @@ class Descriptor {
     int value;
 };
 
-/// Starts the program in a process group of its own; 0, or the number of what went wrong.
+/// Starts the program in its own process group. Returns 0 or an error number.
 int start(const NativePath& program, const std::vector<NativePath>& arguments, int output,
           pid_t& child) {
     std::vector<char*> pointers{const_cast<char*>(program.c_str())};
@@ -68,7 +71,7 @@ int start(const NativePath& program, const std::vector<NativePath>& arguments, i
     return failure;
 }
 
-/// What the process really uses, in bytes; 0 when it has gone.
+/// Returns the memory that the process uses, in bytes; 0 if it has ended.
 std::uint64_t memoryOf(pid_t process) {
     std::ifstream file("/proc/" + std::to_string(process) + "/statm");
     std::uint64_t all = 0, resident = 0;
@@ -89,8 +92,8 @@ const wchar_t* signalName(int number) {
     }
 }
 
-/// One child from its start to its end. The destructor kills and reaps a child that still runs: the
-/// caller's question may throw, and so may the growth of the collected output.
+/// Watches one child until it ends. The destructor kills and reaps a child that still runs, because
+/// the caller's `interrupted` and the growth of the output may throw.
 class Watch {
   public:
     Watch(pid_t process, int pipe, const ChildLimits& allowed)
@@ -114,14 +117,14 @@ class Watch {
             judge();
         }
         readOutput();
-        // What the child has started goes as well.
+        // Kill the processes that the child started, too.
         ::kill(-child, SIGKILL);
         if (judged)
             return std::move(judgement);
         judgement.memory = std::max(judgement.memory, mostMemory(usage));
         if (unknown)
             judgement.end = ChildResult::End::unknown;
-        else if (judgement.memory >= limits.memory) // The end may have come between two looks.
+        else if (judgement.memory >= limits.memory) // It may have ended between two polls.
             judgement.end = ChildResult::End::outOfMemory;
         else if (WIFSIGNALED(status))
             noteSignal(WTERMSIG(status));
@@ -131,8 +134,8 @@ class Watch {
     }
 
   private:
-    /// What the system tells of a child that has ended counts the memory of this process as well,
-    /// as it was when the child was started: only what is more is the child's.
+    /// The system's peak for an ended child includes the memory of this process when it started the
+    /// child. Only a higher value is the child's own.
     static std::uint64_t mostMemory(const rusage& usage) {
         rusage own{};
         ::getrusage(RUSAGE_SELF, &own);
@@ -141,7 +144,7 @@ class Watch {
                                                : 0;
     }
 
-    /// Looks at what it uses now.
+    /// Polls the memory that the child uses.
     bool usesTooMuch() {
         judgement.memory = std::max(judgement.memory, memoryOf(child));
         return judgement.memory >= limits.memory;
@@ -149,7 +152,7 @@ class Watch {
 
     bool over(int& status, rusage& usage) {
         const pid_t ended = ::wait4(child, &status, judged ? 0 : WNOHANG, &usage);
-        // In a process that ignores the ends of its children, the system keeps none for it.
+        // If this process ignores SIGCHLD, the system does not store the child's exit status.
         unknown = ended < 0 && errno == ECHILD;
         reaped = ended == child || (ended < 0 && errno != EINTR);
         return reaped;
@@ -157,7 +160,7 @@ class Watch {
 
     void waitForOutput() {
         pollfd wanted{output, POLLIN, 0};
-        // A closed pipe is always ready, so wait for nothing then.
+        // A closed pipe is always ready, so do not poll it.
         ::poll(closed ? nullptr : &wanted, closed ? 0 : 1, pause);
     }
 

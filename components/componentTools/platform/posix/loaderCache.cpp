@@ -1,3 +1,5 @@
+/// Reads /etc/ld.so.cache once and indexes it. Running `ldconfig -p` or loading each dependency
+/// would be slower, and loading would run initialisers.
 #include "components/componentTools/platform/posix/loaderCache.h"
 
 #include <cstdint>
@@ -39,7 +41,7 @@ std::string textAt(const std::string& content, std::size_t offset) {
 Cache readCache() {
     std::ifstream stream("/etc/ld.so.cache", std::ios::binary);
     const std::string content(std::istreambuf_iterator<char>(stream), {});
-    // An older form of the list may stand before it.
+    // A cache in the old format may precede the new one.
     const std::size_t start = content.find(mark);
     Cache cache;
     if (start == std::string::npos || content.size() - start < sizeof(Header))

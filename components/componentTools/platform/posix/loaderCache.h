@@ -1,4 +1,4 @@
-/// The loader's own list of the libraries that it knows, and what depends on how we are built.
+/// Looks libraries up in the loader's cache; also a constant that depends on the build.
 #pragma once
 
 #include <optional>
@@ -6,11 +6,11 @@
 
 namespace Mz::Tools::System {
 
-/// The file that the loader's cache has for the library `name`.
+/// Returns the file of the library `name` in the loader's cache; `std::nullopt` if it has none.
 std::optional<std::string> findInLoaderCache(const std::string& name);
 
-/// Whether a limit on private memory leaves the process working: what the sanitizers reserve
-/// counts.
+/// Whether `RLIMIT_DATA` can be used. Under the sanitizers it cannot: it counts the addresses that
+/// they reserve.
 #ifdef MZ_UNLIMITED_ADDRESSES
 inline constexpr bool dataMayBeLimited = false;
 #else

@@ -1,3 +1,5 @@
+/// Repeats the search of the Linux loader for dependencies (DT_RPATH, LD_LIBRARY_PATH, DT_RUNPATH,
+/// the cache, the default folders), because the loader itself cannot search without loading.
 #include "components/componentTools/platform/system.h"
 
 #include "components/componentManager/nativeText.h"
@@ -34,7 +36,7 @@ bool isLoaded(const std::string& name) {
     return module != nullptr;
 }
 
-/// `folder` with the loader's own variables filled in.
+/// Returns `folder` with the loader's variables replaced.
 std::string expanded(std::string folder, const NativePath& library) {
     const std::pair<const char*, std::string> variables[] = {
         {"$ORIGIN", library.parent_path().string()},
@@ -97,9 +99,9 @@ const wchar_t* loaderPathVariable() {
 
 namespace {
 
-/// Where the loader looks before it asks its own list. What a library has as DT_RPATH serves all
-/// that is loaded through it, but for libraries that have a DT_RUNPATH; that serves its owner
-/// alone, and takes the place of its owner's DT_RPATH.
+/// Returns the folders that the loader searches before its cache. DT_RPATH applies to indirect
+/// dependencies too, except those of libraries that have a DT_RUNPATH. DT_RUNPATH applies to direct
+/// dependencies only, and replaces the library's DT_RPATH.
 std::vector<std::string> foldersFor(const Needer& needer) {
     std::vector<std::string> folders;
     if (needer.image.runpath.empty())
@@ -131,11 +133,11 @@ Located findDependency(const std::string& wanted, const Needer& needer, const Na
                                "/usr/lib64", "/lib", "/usr/lib"})
         if (isFile(NativePath(folder) / name))
             return {true, NativePath(folder) / name};
-    // What the host has loaded already serves as well, wherever it came from.
+    // The loader also uses a library of that name that this process has already loaded.
     return {isLoaded(name), {}};
 }
 
-std::wstring loaderWords(const NativePath& path) {
+std::wstring loaderError(const NativePath& path) {
     ::dlerror();
     if (::dlopen(path.c_str(), RTLD_NOW | RTLD_LOCAL))
         return L"it loads at the second attempt";
@@ -143,9 +145,9 @@ std::wstring loaderWords(const NativePath& path) {
     return displayName(words ? words : "");
 }
 
-NativePath ownFolder() {
+NativePath moduleFolder() {
     Dl_info info;
-    if (::dladdr(reinterpret_cast<const void*>(&ownFolder), &info) == 0 || !info.dli_fname)
+    if (::dladdr(reinterpret_cast<const void*>(&moduleFolder), &info) == 0 || !info.dli_fname)
         return {};
     std::error_code failure;
     const NativePath file = std::filesystem::canonical(info.dli_fname, failure);
@@ -186,9 +188,9 @@ bool writeAll(int descriptor, const char* data, std::size_t size) {
 } // namespace
 
 AnswerPipe::AnswerPipe() {
-    // What the host let its children inherit is no business of a library's.
+    // The library must not reach files that this process inherited from the host.
     ::syscall(SYS_close_range, STDERR_FILENO + 1, ~0u, 0);
-    // A high number, which nobody meets by counting.
+    // A high number, so that a loop that closes low descriptors does not close the pipe.
     handle = ::fcntl(STDOUT_FILENO, F_DUPFD_CLOEXEC, 500);
     const int nowhere = ::open("/dev/null", O_RDWR);
     if (nowhere >= 0) {
@@ -218,7 +220,7 @@ bool writeReserved(int descriptor, const char* data, std::size_t size) {
     return writeAll(descriptor, data, size);
 }
 
-void wantEndsOfChildren() {
+void resetChildSignal() {
     std::signal(SIGCHLD, SIG_DFL);
 }
 
@@ -227,9 +229,8 @@ void confine(std::uint64_t refused) {
     ::prctl(PR_SET_DUMPABLE, 0);
     const rlimit noDump{0, 0};
     ::setrlimit(RLIMIT_CORE, &noDump);
-    // The parent watches what is really used. This is for what is taken faster than it looks. A
-    // limit on addresses would hit generators of code and drivers, which reserve many times what
-    // they use.
+    // The parent polls the used memory. This limit is for memory that is taken faster than that.
+    // RLIMIT_AS would break code generators and drivers, which reserve far more than they use.
     if (refused && dataMayBeLimited) {
         const rlimit data{static_cast<rlim_t>(refused), static_cast<rlim_t>(refused)};
         ::setrlimit(RLIMIT_DATA, &data);
@@ -240,7 +241,7 @@ void endProcess(int status) {
     ::_exit(status);
 }
 
-std::wstring passedFault() {
+std::wstring caughtFault() {
     return {};
 }
 

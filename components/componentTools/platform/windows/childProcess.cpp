@@ -1,3 +1,6 @@
+/// A job kills the child, and the processes that it starts, when `runChild` returns or the parent
+/// ends. The parent polls time, output and memory. The job's memory limit is only for memory that is
+/// taken faster than that, and Wine does not enforce it.
 #include "components/componentTools/platform/system.h"
 
 #include "components/platform/platform.h"
@@ -15,7 +18,7 @@ namespace {
 
 using Clock = std::chrono::steady_clock;
 
-/// How long the parent sleeps before it looks at the child again, in milliseconds.
+/// The polling interval of the child, in milliseconds.
 constexpr DWORD pause = 10;
 
 class Handle {
@@ -37,7 +40,7 @@ class Handle {
     HANDLE value;
 };
 
-/// `argument` as programs take it out of a command line again.
+/// Returns `argument` quoted, so that programs parse it back from a command line.
 std::wstring quoted(const std::wstring& argument) {
     std::wstring result = L"\"";
     std::size_t slashes = 0;
@@ -51,7 +54,7 @@ std::wstring quoted(const std::wstring& argument) {
     return result + L'"';
 }
 
-/// The list of handles that a child is to inherit, and no others.
+/// The list of the only handles that a child inherits.
 class Inherited {
   public:
     explicit Inherited(std::vector<HANDLE> wanted) : handles(std::move(wanted)) {
@@ -74,8 +77,8 @@ class Inherited {
     LPPROC_THREAD_ATTRIBUTE_LIST list;
 };
 
-/// A job that takes what is in it along when it ends. Unless `refused` is 0, the system refuses to
-/// commit more memory in it; the parent watches what is really used.
+/// Returns a new job, which kills its processes when its handle is closed. Unless `refused` is 0,
+/// the system limits the memory that each of its processes can commit, in bytes.
 HANDLE newJob(std::uint64_t refused) {
     const HANDLE job = ::CreateJobObjectW(nullptr, nullptr);
     JOBOBJECT_EXTENDED_LIMIT_INFORMATION limit{};
@@ -108,7 +111,7 @@ bool start(const NativePath& program, const std::vector<NativePath>& arguments, 
     startup.lpAttributeList = inherited.get();
     constexpr DWORD flags = CREATE_SUSPENDED | CREATE_NO_WINDOW | CREATE_NEW_PROCESS_GROUP |
                             EXTENDED_STARTUPINFO_PRESENT;
-    const platform::QuietErrors quiet; // The child has our error mode from its first moment on.
+    const platform::QuietErrors quiet; // The child inherits the error mode.
     if (!::CreateProcessW(program.c_str(), commandLine.data(), nullptr, nullptr, TRUE, flags,
                           nullptr, nullptr, &startup.StartupInfo, &process))
         return false;
@@ -117,8 +120,8 @@ bool start(const NativePath& program, const std::vector<NativePath>& arguments, 
     return true;
 }
 
-/// One child from its start to its end. The destructor ends a child that still runs and waits for
-/// that: the caller's question may throw, and so may the growth of the collected output.
+/// Watches one child until it ends. The destructor kills a child that still runs and waits for its
+/// end, because the caller's `interrupted` and the growth of the output may throw.
 class Watch {
   public:
     Watch(HANDLE process, HANDLE pipe, const ChildLimits& allowed)
@@ -140,7 +143,7 @@ class Watch {
             return std::move(judgement);
         DWORD status = 0;
         ::GetExitCodeProcess(child, &status);
-        // Programs end with small numbers, the system ends them with those of faults.
+        // Exit statuses of programs are small; the system uses the codes of faults.
         constexpr DWORD firstFault = 0x80000000;
         if (mostMemory() >= limits.memory) {
             judgement.end = ChildResult::End::outOfMemory;
@@ -155,7 +158,7 @@ class Watch {
     }
 
   private:
-    /// Takes what there is; whether there was anything.
+    /// Reads the available output. Returns whether there was any.
     bool readOutput() {
         bool any = false;
         char block[65536];

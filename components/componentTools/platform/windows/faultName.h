@@ -1,11 +1,11 @@
-/// What Windows calls the ways in which a program can crash.
+/// Names the faults of Windows programs.
 #pragma once
 
 #include <string>
 
 namespace Mz::Tools::System {
 
-/// The fault with that number, as a person may know it.
+/// Returns the name of the fault with that code, for people.
 std::wstring faultName(unsigned long code);
 
 } // namespace Mz::Tools::System

@@ -1,3 +1,6 @@
+/// Dependencies are searched with `SearchPathW`, which uses the order of the loader but loads
+/// nothing. A vectored handler records faults, because the loader catches crashes in initialisers
+/// and reports only an error.
 #include "components/componentTools/platform/system.h"
 
 #include "components/componentManager/nativeText.h"
@@ -34,7 +37,7 @@ std::wstring toCharacters(const std::string& bytes, UINT encoding) {
     return text;
 }
 
-/// Names of interfaces between the system's own libraries, which have no files.
+/// Returns whether the name is an API set. The system resolves these names without files.
 bool isVirtual(const std::wstring& name) {
     const std::wstring lower = platform::lowerCase(name);
     return lower.starts_with(L"api-ms-") || lower.starts_with(L"ext-ms-");
@@ -45,7 +48,7 @@ bool isFile(const NativePath& path) {
     return attributes != INVALID_FILE_ATTRIBUTES && !(attributes & FILE_ATTRIBUTE_DIRECTORY);
 }
 
-/// The last fault in this process that can only be a mistake.
+/// The code of the last fault in this process that `isFault` accepts.
 std::atomic<DWORD> lastFault{0};
 
 bool isFault(DWORD code) {
@@ -60,7 +63,7 @@ bool isFault(DWORD code) {
     }
 }
 
-/// Where standard output led before it was reserved.
+/// The original standard output; null before `reserveOutput`.
 HANDLE reservedOutput = nullptr;
 
 LONG WINAPI noteFault(EXCEPTION_POINTERS* fault) {
@@ -135,7 +138,7 @@ Located findDependency(const std::string& name, const Needer&, const NativePath&
 namespace {
 
 std::wstring textOfError(DWORD number) {
-    // The loader passes on what its own guard caught: here, the number of a C++ exception.
+    // The loader returns the code of the exception that it caught; this is GCC's for C++.
     constexpr DWORD exceptionOfCpp = 0x20474343;
     if (number == exceptionOfCpp)
         return L"its initialisers let an exception out";
@@ -149,18 +152,18 @@ std::wstring textOfError(DWORD number) {
 
 } // namespace
 
-std::wstring loaderWords(const NativePath& path) {
+std::wstring loaderError(const NativePath& path) {
     const std::wstring name = path.native() + (path.has_extension() ? L"" : L".");
     if (::LoadLibraryW(name.c_str()))
         return L"it loads at the second attempt";
     return textOfError(::GetLastError());
 }
 
-NativePath ownFolder() {
+NativePath moduleFolder() {
     HMODULE module = nullptr;
     constexpr DWORD flags =
         GET_MODULE_HANDLE_EX_FLAG_FROM_ADDRESS | GET_MODULE_HANDLE_EX_FLAG_UNCHANGED_REFCOUNT;
-    if (!::GetModuleHandleExW(flags, reinterpret_cast<const wchar_t*>(&ownFolder), &module))
+    if (!::GetModuleHandleExW(flags, reinterpret_cast<const wchar_t*>(&moduleFolder), &module))
         return {};
     wchar_t path[32768];
     const DWORD length = ::GetModuleFileNameW(module, path, 32768);
@@ -230,7 +233,7 @@ bool writeReserved(int descriptor, const char* data, std::size_t size) {
     return true;
 }
 
-void wantEndsOfChildren() {}
+void resetChildSignal() {}
 
 void confine(std::uint64_t) {
     ::SetErrorMode(SEM_FAILCRITICALERRORS | SEM_NOGPFAULTERRORBOX | SEM_NOOPENFILEERRORBOX);
@@ -244,7 +247,7 @@ void endProcess(int status) {
         ::Sleep(INFINITE);
 }
 
-std::wstring passedFault() {
+std::wstring caughtFault() {
     const DWORD code = lastFault;
     return code ? faultName(code) : std::wstring();
 }
