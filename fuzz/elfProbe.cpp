@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: BSL-1.0
 // Files as the component manager looks at them before it loads one. Two readers of the same format,
 // written apart, see to each other.
-#include "components/componentTools/libraryImage.h"
+#include "components/componentTools/images/libraryImage.h"
 #include "components/platform/platform.h"
 #include "fuzz/fuzz.h"
 

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
 // Files as `explain` looks at them, in the formats of both systems.
-#include "components/componentTools/libraryImage.h"
+#include "components/componentTools/images/libraryImage.h"
 #include "fuzz/fuzz.h"
 
 #include <set>

@@ -3,7 +3,7 @@
 // same format, written independently, check each other.
 #include "components/platform/windows/peProbe.h"
 
-#include "components/componentTools/libraryImage.h"
+#include "components/componentTools/images/libraryImage.h"
 #include "fuzz/fuzz.h"
 
 #include <algorithm>

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
 // What a process that loads a component library answers: the library may have written it.
-#include "components/componentTools/probeAnswer.h"
+#include "components/componentTools/probing/probeAnswer.h"
 #include "fuzz/fuzz.h"
 
 namespace {

@@ -5,6 +5,7 @@
 /// use happen in one enumeration, without a list of candidates: a builder's library is loaded only
 /// when the enumeration reaches it, and no library after the deciding one is loaded.
 #include "components/componentManager/importer.h"
+#include "components/componentManager/nativeText.h"
 
 #include "components/componentManager/componentImp.h"
 #include "components/componentManager/importing/inputFile.h"
@@ -24,10 +25,6 @@ QrRef<QrCastable> QrImporter::import(const wchar_t* path, const wchar_t* search,
 
 namespace {
 
-const wchar_t* textOf(const wchar_t* text) {
-    return text ? text : L"";
-}
-
 QrPtr<QrComponentManager> componentManager() {
     return QrPtr<QrComponentManager>::adopt(safeCast<QrComponentManager>(QrGetComponentManager()));
 }
@@ -36,14 +33,14 @@ QrPtr<QrComponentManager> componentManager() {
 class BaseImportEnumerator : public QrEnumerator<const QrImportBuilder*>,
                              public QrEnumerator<QrCPtr<QrBuilderDescription>> {
   public:
-    explicit BaseImportEnumerator(const wchar_t* name) : builderName(textOf(name)) {}
+    explicit BaseImportEnumerator(const wchar_t* name) : builderName(textOrEmpty(name)) {}
 
     using QrEnumerator<const QrImportBuilder*>::process;
 
     Action process(QrCPtr<QrBuilderDescription> item) override {
         const auto description =
             QrCPtr<QrBuilderDescription>::adopt(safeCast<QrBuilderDescription>(item.get()));
-        if (textOf(description->getName()) != builderName)
+        if (textOrEmpty(description->getName()) != builderName)
             return Continue;
         const QrCRefPtr<QrComponentBuilder> builder = description->getBuilder();
         const QrCPtr<QrImportBuilder> importBuilder = queryCast<QrImportBuilder>(builder.get());
@@ -80,7 +77,7 @@ class FiletypesEnumerator final : public BaseImportEnumerator {
     Action process(const QrImportBuilder* builder) override {
         const auto description =
             QrCPtr<QrBuilderDescription>::adopt(safeCast<QrBuilderDescription>(builder));
-        fileTypes.append(textOf(description->getLabel())).append(L"|");
+        fileTypes.append(textOrEmpty(description->getLabel())).append(L"|");
         ExtensionsEnumerator extensions(fileTypes);
         builder->enumerateExtensions(extensions);
         fileTypes.append(L"|");
@@ -93,7 +90,7 @@ class FiletypesEnumerator final : public BaseImportEnumerator {
         explicit ExtensionsEnumerator(std::wstring& fileTypes) : fileTypes(fileTypes) {}
 
         Action process(const wchar_t* extension) override {
-            fileTypes.append(first ? L"*." : L";*.").append(textOf(extension));
+            fileTypes.append(first ? L"*." : L";*.").append(textOrEmpty(extension));
             first = false;
             return Continue;
         }
@@ -140,7 +137,7 @@ class ImportEnumerator final : public BaseImportEnumerator {
       public:
         explicit ExtensionsEnumerator(std::wstring wanted) : wanted(std::move(wanted)) {}
         Action process(const wchar_t* extension) override {
-            return textOf(extension) == wanted ? Stop : Continue;
+            return textOrEmpty(extension) == wanted ? Stop : Continue;
         }
 
       private:
@@ -226,7 +223,7 @@ QrRef<QrCastable> QrBaseImporter::import(QrPtr<QrBufferedIO> source, const wchar
                                          const wchar_t* search) const {
     const QrPtr<QrComponentManager> manager = componentManager();
     const auto io = QrPtr<QrBufferedIO>::adopt(safeCast<QrBufferedIO>(source.get()));
-    const wchar_t* pathText = textOf(path);
+    const wchar_t* pathText = textOrEmpty(path);
     const wchar_t* hint = search ? pathText : L"";
     if (path) {
         ImportEnumerator byExtension(getBuilderName(), *io, pathText, hint, true);

@@ -24,6 +24,12 @@
 
 namespace Mz {
 
+/// Returns `text`, or an empty text if it is null. Component libraries may pass null for an empty
+/// text.
+inline const wchar_t* textOrEmpty(const wchar_t* text) {
+    return text ? text : L"";
+}
+
 /// Returns `bytes` as wide text; `std::nullopt` if they are invalid in the locale's encoding. A NUL
 /// stays a NUL.
 MZ_COMPONENT_MANAGER_API std::optional<std::wstring> toWide(std::string_view bytes);

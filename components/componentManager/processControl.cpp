@@ -5,6 +5,7 @@
 /// and after all other static objects. The wide texts appear on the narrow error stream as
 /// addresses. This is deliberate: it shows every host that it needs its own controller.
 #include "components/componentManager/processControl.h"
+#include "components/componentManager/nativeText.h"
 
 #include "components/base/assertions.h"
 #include "components/componentManager/control/systemController.h"
@@ -23,10 +24,6 @@ QrProcessControl::~QrProcessControl() = default;
 void QrProcessControl::forceVtblInstantiation() {}
 
 namespace {
-
-std::wstring_view textOf(const wchar_t* text) {
-    return text ? std::wstring_view(text) : std::wstring_view();
-}
 
 bool isRegularFile(std::wstring_view name) {
     const std::optional<platform::NativePath> path = platform::toNative(name);
@@ -102,9 +99,9 @@ class DefaultSystemController final
 
     std::wstring findFile(const wchar_t* fileName, const wchar_t* searchPath,
                           const wchar_t* fallbackSearchPath) override {
-        const std::wstring_view name = textOf(fileName);
+        const std::wstring_view name = textOrEmpty(fileName);
         if (!ignoresSearchPath(name)) {
-            std::wstring found = findAlong(textOf(searchPath), name);
+            std::wstring found = findAlong(textOrEmpty(searchPath), name);
             if (!found.empty())
                 return found;
         }

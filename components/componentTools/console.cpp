@@ -1,9 +1,12 @@
+// SPDX-License-Identifier: BSL-1.0
 /// All controllers share one flag, which the SIGINT handler sets: a signal handler has no object to
 /// address. The first controller installs the handler, and the last one restores the old handler.
 /// On a terminal, output is cut to 79 columns, because a wrapped line could not be erased.
 #include "components/componentTools/console.h"
 
 #include "components/base/assertions.h"
+#include "components/componentManager/nativeText.h"
+#include "components/componentTools/consoleText.h"
 #include "components/componentTools/platform/system.h"
 
 #include <algorithm>
@@ -38,28 +41,8 @@ void onInterrupt(int) {
     std::signal(SIGINT, SIG_DFL);
 }
 
-bool isControl(wchar_t character) {
-    return character < L' ' || (character >= 0x7F && character < 0xA0);
-}
-
-/// Returns `text` with its control characters escaped, except those in `left`.
-std::wstring escaped(const std::wstring& text, std::wstring_view left) {
-    constexpr const wchar_t* digits = L"0123456789ABCDEF";
-    std::wstring result;
-    for (const wchar_t character : text) {
-        if (!isControl(character) || left.find(character) != std::wstring_view::npos) {
-            result += character;
-        } else {
-            result += L"\\x";
-            result += digits[character >> 4];
-            result += digits[character & 15];
-        }
-    }
-    return result;
-}
-
 std::string errorText(const wchar_t* text) {
-    return System::encode(escaped(text ? text : L"", L"\n\t"), 2);
+    return System::encode(withoutControls(textOrEmpty(text), L"\n\t"), 2);
 }
 
 /// Returns the maximum number of terminal columns of a character.
@@ -139,9 +122,10 @@ bool ConsoleController::progress(float fraction, const wchar_t* text) {
         char bar[64];
         std::snprintf(bar, sizeof bar, "[%-*s] %3d%% ", static_cast<int>(width),
                       std::string(filled, '#').c_str(), percent);
-        showOnLine(std::wstring(bar, bar + std::strlen(bar)) + (text ? text : L""));
+        showOnLine(std::wstring(bar, bar + std::strlen(bar)) + textOrEmpty(text));
     } else if (percent / 10 != lastTenth) {
-        out << percent << "% " << System::encode(escaped(text ? text : L"", {}), 2) << std::endl;
+        out << percent << "% " << System::encode(withoutControls(textOrEmpty(text), {}), 2)
+            << std::endl;
     }
     lastTenth = percent / 10;
     return !interrupted;
@@ -153,7 +137,7 @@ bool ConsoleController::isStatusShown() {
 
 void ConsoleController::status(const wchar_t* text) {
     if (onTerminal)
-        showOnLine(text ? text : L"");
+        showOnLine(textOrEmpty(text));
     else
         line(nullptr, text);
 }
@@ -195,7 +179,7 @@ void ConsoleController::line(const char* kind, const wchar_t* text) {
 
 void ConsoleController::showOnLine(const std::wstring& text) {
     constexpr std::size_t widest = 79;
-    const auto [fitting, width] = fitted(escaped(text, {}), widest);
+    const auto [fitting, width] = fitted(withoutControls(text, {}), widest);
     out << '\r' << System::encode(fitting, 2)
         << std::string(shownWidth - std::min(shownWidth, width), ' ') << std::flush;
     shownWidth = width;
@@ -205,22 +189,6 @@ void ConsoleController::clearLine() {
     if (shownWidth > 0)
         out << '\r' << std::string(shownWidth, ' ') << '\r' << std::flush;
     shownWidth = 0;
-}
-
-std::wstring withoutControls(const std::wstring& text) {
-    return escaped(text, {});
-}
-
-std::string forOutput(const std::wstring& text) {
-    return System::encode(text, 1);
-}
-
-std::vector<std::string> argumentsOfProcess(int count, char** values) {
-    return System::arguments(count, values);
-}
-
-std::filesystem::path pathOf(const std::string& argument) {
-    return System::pathOfArgument(argument);
 }
 
 } // namespace Mz::Tools

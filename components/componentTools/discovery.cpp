@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Repeats the manager's own rules, with the manager's functions: normalised names, one record for
 /// each file, and all folders listed in one call. In addition, reports what the manager skips
 /// silently, because its name cannot be encoded or recorded.
@@ -5,7 +6,7 @@
 
 #include "components/componentManager/files.h"
 #include "components/componentManager/nativeText.h"
-#include "components/componentTools/inspection.h"
+#include "components/componentTools/inspecting/inspection.h"
 #include "components/componentTools/platform/system.h"
 #include "components/componentTools/recordedList.h"
 #include "components/platform/pathNormaliser.h"

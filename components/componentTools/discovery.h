@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Lists the files of a search path that a component manager examines.
 #pragma once
 

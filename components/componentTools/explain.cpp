@@ -1,12 +1,13 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Examines a file in stages, from cheap to expensive: its path and content, its dependencies, its
 /// record, and then, on request, a probe. A later stage replaces the verdict of an earlier one only
 /// if it explains more.
 #include "components/componentTools/explain.h"
 
 #include "components/componentTools/discovery.h"
-#include "components/componentTools/hostNeeds.h"
-#include "components/componentTools/inspection.h"
-#include "components/componentTools/uidNotes.h"
+#include "components/componentTools/inspecting/hostNeeds.h"
+#include "components/componentTools/inspecting/inspection.h"
+#include "components/componentTools/inspecting/uidNotes.h"
 #include "components/platform/platform.h"
 
 #include <algorithm>

@@ -1,9 +1,12 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Explains why a file is, or is not, a component library for the component manager.
 ///
 /// The manager skips files silently. `explainFile` reports the reason, in two depths: by reading
 /// the file, and by loading it in a child process, which may crash or hang without harm.
 #pragma once
 
+#include "components/componentTools/dependency.h"
+#include "components/componentTools/export.h"
 #include "components/componentTools/probe.h"
 #include "components/componentTools/recordedList.h"
 #include "components/componentTools/verdict.h"
@@ -13,14 +16,6 @@
 #include <vector>
 
 namespace Mz::Tools {
-
-/// A library that the file needs, directly or indirectly.
-struct Dependency {
-    std::wstring name;     ///< the name in the file that needs it
-    std::wstring neededBy; ///< the file that needs it
-    std::wstring path;     ///< its file; empty if it was not found or the system has no file for it
-    bool found = false;
-};
 
 /// The result of `explainFile`.
 struct Explanation {

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The export macro of libMZcomponentTools: `MZ_COMPONENT_TOOLS_API` marks its public names.
 #pragma once
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The DOT text has one cluster for each library. Nodes are numbered in the order of the list, so
 /// that equal input results in equal text. Graphviz reads the text from a temporary file beside the
 /// result, because child processes have no standard input here.
@@ -6,6 +7,7 @@
 #include "components/componentManager/files.h"
 #include "components/componentManager/utf8.h"
 #include "components/componentTools/platform/system.h"
+#include "components/componentTools/uidText.h"
 
 #include <system_error>
 

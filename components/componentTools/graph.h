@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Draws a graph of component libraries, their builders, and the importers that use them.
 #pragma once
 

@@ -1,9 +1,11 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Derives the verdict from two sources: the report of the child process, and the way in which the
 /// process ended. A report is accepted only if it is complete and valid.
 #include "components/componentTools/probe.h"
 
 #include "components/componentTools/platform/system.h"
-#include "components/componentTools/probeAnswer.h"
+#include "components/componentTools/probing/probeAnswer.h"
+#include "components/componentTools/uidText.h"
 
 #include <algorithm>
 

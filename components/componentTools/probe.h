@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Loads a component library in a child process, which may crash or hang without harm.
 ///
 /// The child process runs `mzcomponents-probe`, a program in the folder of libMZcomponentTools. It

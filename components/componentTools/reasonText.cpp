@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Only the reasons of failed openings have a second line, which follows a fixed text. The line end
 /// is recognised by that text, so that line ends in file names and other reasons are kept.
 #include "components/componentTools/reasonText.h"

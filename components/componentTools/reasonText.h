@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Formats the reasons of exceptions for people.
 #pragma once
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Reads the list with the same stream class as the manager, but checks everything that the manager
 /// trusts. Counts in the file are not used to allocate memory, because a damaged file may contain
 /// any number.
@@ -7,8 +8,8 @@
 #include "components/componentManager/bufferio.h"
 #include "components/componentManager/files.h"
 #include "components/componentManager/nativeText.h"
-#include "components/componentTools/openPatiently.h"
-#include "components/componentTools/verdictsFile.h"
+#include "components/componentTools/records/openPatiently.h"
+#include "components/componentTools/records/verdictsFile.h"
 #include "components/platform/characters.h"
 #include "components/platform/platform.h"
 
@@ -164,25 +165,6 @@ bool isCarried(const std::wstring& text) {
     const std::optional<std::string> bytes = toNarrow(text);
     // Compare after a round trip, because some locales substitute a similar character.
     return bytes && text.find(L'\0') == std::wstring::npos && toWide(*bytes) == text;
-}
-
-const RecordedLibrary* findRecord(const RecordedLibraries& libraries, const std::wstring& directory,
-                                  const std::wstring& fileName) {
-    for (const RecordedLibrary& library : libraries)
-        if (library.fileName == fileName && library.directory == directory)
-            return &library;
-    return nullptr;
-}
-
-std::wstring textOf(const QrUid& uid) {
-    std::wstring text;
-    for (const std::uint32_t word : {uid.w0, uid.w1, uid.w2, uid.w3}) {
-        if (!text.empty())
-            text += L'-';
-        for (int shift = 28; shift >= 0; shift -= 4)
-            text += L"0123456789ABCDEF"[word >> shift & 15];
-    }
-    return text;
 }
 
 } // namespace Mz::Tools

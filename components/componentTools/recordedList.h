@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Reads and writes recorded lists: the component libraries that a host saves between two starts.
 ///
 /// The format is the one that the component manager reads and writes on a `QrBinaryStream` through
@@ -8,41 +9,14 @@
 /// these functions.
 #pragma once
 
-#include "components/componentTools/verdict.h"
+#include "components/componentTools/export.h"
+#include "components/componentTools/recordedLibrary.h"
 
-#include "components/componentManager/uid.h"
-
-#include <cstdint>
 #include <filesystem>
 #include <iosfwd>
-#include <optional>
 #include <string>
-#include <vector>
 
 namespace Mz::Tools {
-
-/// The record of one builder.
-struct RecordedBuilder {
-    QrUid uid{};
-    std::wstring name, label, text;
-    unsigned int number = 0;
-    bool flag = false;
-    std::int64_t position = -1; ///< its offset in the list file, in bytes; -1 if it was not read
-};
-
-/// The record of one file: a component library, or a file without builders.
-struct RecordedLibrary {
-    std::wstring directory;                ///< normalised as by the manager
-    std::wstring fileName;                 ///< normalised as by the manager
-    std::uint32_t time = 0;                ///< last modification, in seconds, truncated to 32 bits
-    std::int64_t size = 0;                 ///< in bytes
-    std::vector<RecordedBuilder> builders; ///< empty if the file is no component or failed
-    std::int64_t position = -1; ///< its offset in the list file, in bytes; -1 if it was not read
-    /// The saved verdict on a file without builders. It is stored beside the list, not in it.
-    std::optional<Finding> kept = std::nullopt;
-};
-
-using RecordedLibraries = std::vector<RecordedLibrary>;
 
 /// The result of `readRecordedList`.
 struct ListReading {
@@ -82,13 +56,5 @@ MZ_COMPONENT_TOOLS_API std::filesystem::path verdictsFileOf(const std::filesyste
 /// Returns whether a list under the current locale can store the text without loss. A text that
 /// contains NUL cannot be stored.
 MZ_COMPONENT_TOOLS_API bool isCarried(const std::wstring& text);
-
-/// Returns the record with these normalised names, or null. The list owns it.
-MZ_COMPONENT_TOOLS_API const RecordedLibrary* findRecord(const RecordedLibraries& libraries,
-                                                         const std::wstring& directory,
-                                                         const std::wstring& fileName);
-
-/// Returns a uid as text: four words of eight hexadecimal digits, joined by '-'.
-MZ_COMPONENT_TOOLS_API std::wstring textOf(const QrUid& uid);
 
 } // namespace Mz::Tools

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Goes through the candidates in the host's order. A record of the old list is reused if the file
 /// is unchanged and a retry cannot help; otherwise the file is examined by `explainFile`. The list
 /// is written at the end, in one step, so that an interrupted scan loses no old record.
@@ -5,10 +6,10 @@
 
 #include "components/componentManager/exceptions.h"
 #include "components/componentTools/explain.h"
-#include "components/componentTools/inspection.h"
+#include "components/componentTools/inspecting/inspection.h"
+#include "components/componentTools/inspecting/uidNotes.h"
 #include "components/componentTools/reasonText.h"
-#include "components/componentTools/uidNotes.h"
-#include "components/componentTools/verdictsFile.h"
+#include "components/componentTools/records/verdictsFile.h"
 #include "components/platform/platform.h"
 
 #include <algorithm>

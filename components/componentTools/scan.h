@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Fills a recorded list in child processes, so that a faulty library cannot harm the host.
 #pragma once
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Standard output is redirected at the level of file descriptors, because components may write by
 /// any stream or system call. Results are collected and written in large blocks.
 #include "components/componentTools/standardOutput.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Protects the standard output of a program from the components that run in it.
 #pragma once
 

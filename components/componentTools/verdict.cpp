@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// One table contains everything that is known of each verdict, so that a new verdict needs one
 /// entry. The table is searched linearly: it is short, and verdicts are only looked up for output.
 #include "components/componentTools/verdict.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The verdicts on a file that is, or should be, a component library. Each has a sentence for
 /// people and, where possible, a hint how to solve the problem.
 #pragma once

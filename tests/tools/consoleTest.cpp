@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: BSL-1.0
 #include "components/componentTools/console.h"
 #include "components/base/assertions.h"
+#include "components/componentTools/consoleText.h"
 #include "tests/support/temporaryDirectory.h"
 
 #include <gtest/gtest.h>

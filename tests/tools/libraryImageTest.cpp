@@ -2,7 +2,7 @@
 /// Both formats, on every system, whole and damaged.
 #include "tests/tools/images.h"
 
-#include "components/componentTools/libraryImage.h"
+#include "components/componentTools/images/libraryImage.h"
 #include "tests/support/temporaryDirectory.h"
 #include "tests/tools/toolsFixture.h"
 

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-#include "components/componentTools/probeAnswer.h"
+#include "components/componentTools/probing/probeAnswer.h"
 
 #include <gtest/gtest.h>
 

@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+#include "components/componentTools/uidText.h"
 #include "tests/tools/toolsFixture.h"
 
 #include "components/componentManager/exceptions.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The commands of mzcomponents. Each writes its result to standard output, says what went wrong on
 /// standard error, and returns the exit status.
 #pragma once

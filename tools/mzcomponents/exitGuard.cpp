@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The guard is an exit handler, so it needs no cooperation of the component. It runs after the
 /// destructors of the components' static objects, which were made later, and ends the process
 /// itself because a handler cannot change the status that `exit` was given.

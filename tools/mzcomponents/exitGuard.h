@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Components that end the program.
 ///
 /// A component may call `exit` where it should return. Its status, often 0, must not pass for the

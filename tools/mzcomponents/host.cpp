@@ -1,4 +1,7 @@
+// SPDX-License-Identifier: BSL-1.0
 #include "tools/mzcomponents/host.h"
+#include "components/componentManager/nativeText.h"
+#include "components/componentTools/consoleText.h"
 #include "tools/mzcomponents/exitGuard.h"
 #include "tools/mzcomponents/output.h"
 
@@ -27,7 +30,7 @@ class BuilderCollector final : public QrEnumerator<QrCPtr<QrBuilderDescription>>
 class ExtensionCollector final : public QrEnumerator<const wchar_t*> {
   public:
     Action process(const wchar_t* extension) override {
-        extensions.emplace_back(extension ? extension : L"");
+        extensions.emplace_back(textOrEmpty(extension));
         return Continue;
     }
     std::vector<std::wstring> extensions;

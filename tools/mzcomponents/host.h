@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The component manager of this process, started without risk.
 #pragma once
 

@@ -1,4 +1,7 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The commands that use components: types, import, graph.
+#include "components/componentTools/consoleText.h"
+#include "components/componentTools/uidText.h"
 #include "tools/mzcomponents/exitGuard.h"
 #include "tools/mzcomponents/host.h"
 #include "tools/mzcomponents/inputFile.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The files that commands read.
 #pragma once
 

@@ -1,4 +1,7 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The commands that look at files: list, explain, scan.
+#include "components/componentTools/consoleText.h"
+#include "components/componentTools/uidText.h"
 #include "tools/mzcomponents/commands.h"
 #include "tools/mzcomponents/output.h"
 

@@ -1,4 +1,6 @@
+// SPDX-License-Identifier: BSL-1.0
 /// mzcomponents: looks at component libraries, and uses them, from the command line.
+#include "components/componentTools/consoleText.h"
 #include "tools/mzcomponents/commands.h"
 #include "tools/mzcomponents/exitGuard.h"
 #include "tools/mzcomponents/output.h"

@@ -1,3 +1,4 @@
+# SPDX-License-Identifier: BSL-1.0
 # Completion of mzcomponents for bash.
 _mzcomponents() {
   local current=${COMP_WORDS[COMP_CWORD]} previous=${COMP_WORDS[COMP_CWORD - 1]}

@@ -1,4 +1,7 @@
+// SPDX-License-Identifier: BSL-1.0
 #include "tools/mzcomponents/output.h"
+#include "components/componentTools/consoleText.h"
+#include "components/componentTools/uidText.h"
 
 #include "components/base/exBase.h"
 #include "components/componentManager/utf8.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// How results look: lines of text, or JSON.
 #pragma once
 

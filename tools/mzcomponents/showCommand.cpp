@@ -1,4 +1,7 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The command that shows what is in a file: show.
+#include "components/componentTools/consoleText.h"
+#include "components/componentTools/uidText.h"
 #include "tools/mzcomponents/exitGuard.h"
 #include "tools/mzcomponents/host.h"
 #include "tools/mzcomponents/inputFile.h"

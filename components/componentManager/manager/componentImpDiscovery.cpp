@@ -6,6 +6,7 @@
 /// where letter case matters. The merge keeps the restored record and discards the new one, because
 /// builder records point to their library record.
 #include "components/componentManager/manager/componentImpPrivate.h"
+#include "components/componentManager/nativeText.h"
 
 #include "components/platform/pathNormaliser.h"
 
@@ -34,7 +35,7 @@ std::optional<std::wstring> programDirectory() {
 /// Returns the directories to search, as the caller spells them.
 std::vector<std::wstring> directoriesOf(const wchar_t* searchPath) {
     std::vector<std::wstring> directories;
-    std::wstring_view rest(searchPath ? searchPath : L"");
+    std::wstring_view rest(textOrEmpty(searchPath));
     while (true) {
         rest.remove_prefix(std::min(rest.find_first_not_of(L';'), rest.size()));
         if (rest.empty())

@@ -6,6 +6,7 @@
 /// exception may be in the library itself. Therefore each reference is released explicitly, and a
 /// library is unloaded only after the exception is destroyed.
 #include "components/componentManager/manager/componentImpPrivate.h"
+#include "components/componentManager/nativeText.h"
 
 #include <cxxabi.h>
 #include <type_traits>
@@ -16,10 +17,6 @@ namespace Mz {
 namespace {
 
 constexpr const char* entryPointName = "QrGetComponentDescription";
-
-const wchar_t* nonNull(const wchar_t* text) {
-    return text ? text : L"";
-}
 
 /// A reference to an object of a component library, which is released explicitly. The object's
 /// `release` may throw; in the destructor of a smart reference that calls `std::terminate`.
@@ -71,9 +68,9 @@ class AddBuilders final : public QrEnumerator<QrCPtr<QrBuilderDescription>> {
         ComponentManager::Builder record;
         record.library = &library;
         record.uid = description.getUid();
-        record.name = nonNull(description.getName());
-        record.label = nonNull(description.getLabel());
-        record.text = nonNull(description.getText());
+        record.name = textOrEmpty(description.getName());
+        record.label = textOrEmpty(description.getLabel());
+        record.text = textOrEmpty(description.getText());
         record.number = description.getNumber();
         record.flag = description.getFlag();
         return record;
@@ -169,8 +166,8 @@ ComponentManager::registerLibrary(ComponentLibrary& library, const platform::Fil
 void ComponentManager::readDescription(ComponentLibrary& library,
                                        QrComponentDescription& description) {
     library.descriptionValue = description.getComponentValue();
-    library.componentText2 = nonNull(description.getComponentText());
-    library.componentText1 = nonNull(description.getComponentLabel());
+    library.componentText2 = textOrEmpty(description.getComponentText());
+    library.componentText1 = textOrEmpty(description.getComponentLabel());
     // The count may be wrong, so nothing is reserved. Records are allocated one by one and never
     // move. The call is part of the fixed sequence.
     static_cast<void>(description.getBuilderCount());

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The operating system functions of the tools, in addition to the component manager's platform
 /// layer. Each system has an implementation (`windows/`, `posix/`), which the build selects. No
 /// other file of the tools depends on the system.
@@ -5,7 +6,7 @@
 /// Functions throw `std::bad_alloc` only, unless their comments name other exceptions.
 #pragma once
 
-#include "components/componentTools/libraryImage.h"
+#include "components/componentTools/images/libraryImage.h"
 
 #include <chrono>
 #include <cstdint>

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The child runs in its own process group, so that the processes that it starts can be killed with
 /// it. The parent polls the used memory in /proc: limits of the system count reserved addresses
 /// too, which code generators and drivers reserve in large amounts.

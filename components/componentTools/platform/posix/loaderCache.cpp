@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Reads /etc/ld.so.cache once and indexes it. Running `ldconfig -p` or loading each dependency
 /// would be slower, and loading would run initialisers.
 #include "components/componentTools/platform/posix/loaderCache.h"

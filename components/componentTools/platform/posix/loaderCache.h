@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Looks libraries up in the loader's cache; also a constant that depends on the build.
 #pragma once
 

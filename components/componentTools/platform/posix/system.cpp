@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Repeats the search of the Linux loader for dependencies (DT_RPATH, LD_LIBRARY_PATH, DT_RUNPATH,
 /// the cache, the default folders), because the loader itself cannot search without loading.
 #include "components/componentTools/platform/system.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Names the faults of Windows programs.
 #pragma once
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Dependencies are searched with `SearchPathW`, which uses the order of the loader but loads
 /// nothing. A vectored handler records faults, because the loader catches crashes in initialisers
 /// and reports only an error.

@@ -1,7 +1,8 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Finds builders whose uids collide or are nil.
 #pragma once
 
-#include "components/componentTools/recordedList.h"
+#include "components/componentTools/recordedLibrary.h"
 
 #include <cstddef>
 #include <unordered_map>

@@ -1,7 +1,8 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Reads and writes the verdicts that a scan saves beside its list.
 #pragma once
 
-#include "components/componentTools/recordedList.h"
+#include "components/componentTools/recordedLibrary.h"
 
 #include <filesystem>
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The protocol between `mzcomponents-probe` and the process that started it.
 ///
 /// The probe writes a sequence of messages. Each has a magic number, a kind, a length and a

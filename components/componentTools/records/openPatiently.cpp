@@ -1,6 +1,7 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Windows denies access to a file during a replacement, so a failure may be temporary. Each
 /// attempt queries the status again, because the file may disappear or become something else.
-#include "components/componentTools/openPatiently.h"
+#include "components/componentTools/records/openPatiently.h"
 
 #include "components/platform/platform.h"
 

@@ -1,8 +1,10 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Examines a file without running any of its code.
 #pragma once
 
-#include "components/componentTools/explain.h"
-#include "components/componentTools/libraryImage.h"
+#include "components/componentTools/dependency.h"
+#include "components/componentTools/images/libraryImage.h"
+#include "components/componentTools/verdict.h"
 
 namespace Mz::Tools {
 

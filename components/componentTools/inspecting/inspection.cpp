@@ -1,11 +1,13 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Checks the cheapest properties first: attributes, then the content, then the encoding of the
 /// name. Dependencies are followed like the loader does, breadth first, because the order decides
 /// which file a name leads to.
-#include "components/componentTools/inspection.h"
+#include "components/componentTools/inspecting/inspection.h"
 
 #include "components/componentManager/nativeText.h"
 #include "components/componentTools/discovery.h"
 #include "components/componentTools/platform/system.h"
+#include "components/componentTools/recordedList.h"
 #include "components/platform/platform.h"
 
 #include <deque>

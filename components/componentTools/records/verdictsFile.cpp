@@ -1,11 +1,12 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The verdicts are stored as JSON beside the list, because the format of the list is fixed. Each
 /// has the time and size of its library, so that it is ignored after the library has changed.
 /// Names, not numbers, identify verdicts, so that versions can exchange files.
-#include "components/componentTools/verdictsFile.h"
+#include "components/componentTools/records/verdictsFile.h"
 
 #include "components/componentManager/files.h"
 #include "components/componentManager/utf8.h"
-#include "components/componentTools/openPatiently.h"
+#include "components/componentTools/records/openPatiently.h"
 
 #include <fstream>
 #include <map>

@@ -1,11 +1,13 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Detects libraries that need the program of their host.
 ///
 /// A host may export functions from its program for its components. Such a component can be loaded
 /// by that host only. It fails in a probe, and that failure is no fault of the component.
 #pragma once
 
-#include "components/componentTools/explain.h"
-#include "components/componentTools/libraryImage.h"
+#include "components/componentTools/dependency.h"
+#include "components/componentTools/images/libraryImage.h"
+#include "components/componentTools/verdict.h"
 
 #include <filesystem>
 #include <optional>

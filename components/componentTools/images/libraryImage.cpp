@@ -1,6 +1,7 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Files are read through two cached blocks, because the readers alternate between a table and the
 /// names that it refers to. A foreign library then costs few reads, whatever its size.
-#include "components/componentTools/libraryImage.h"
+#include "components/componentTools/images/libraryImage.h"
 
 #include "components/platform/platform.h"
 

@@ -1,7 +1,8 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Messages are framed and checked, because the library in the probe can write into the same pipe.
 /// Payloads use the binary stream, but texts are sent as character codes, so that the two processes
 /// need not have the same locale.
-#include "components/componentTools/probeAnswer.h"
+#include "components/componentTools/probing/probeAnswer.h"
 
 #include "components/componentManager/binaryStream.h"
 #include "components/componentManager/bufferio.h"

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Opens a file that other processes may replace.
 #pragma once
 

@@ -1,7 +1,8 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Reads ELF files as the loader does: from the segments and the dynamic section, not from the
 /// sections, which may be stripped. The entry point is looked up through the hash tables, so the
 /// time does not depend on the number of symbols.
-#include "components/componentTools/libraryImage.h"
+#include "components/componentTools/images/libraryImage.h"
 
 #include <algorithm>
 #include <string_view>

@@ -1,6 +1,8 @@
+// SPDX-License-Identifier: BSL-1.0
 /// One pass over the list builds the index. Then each library needs one look-up per builder, so the
 /// time is linear in the number of builders.
-#include "components/componentTools/uidNotes.h"
+#include "components/componentTools/inspecting/uidNotes.h"
+#include "components/componentTools/uidText.h"
 
 namespace Mz::Tools {
 

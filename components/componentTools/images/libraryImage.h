@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Reads ELF and PE libraries and programs without running any of their code.
 ///
 /// Both formats are read on every system, so that a library for the wrong system is recognised. The

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The program `mzcomponents-probe FILE MEMORY`: loads one library, requests its description as the
 /// component manager does, and reports on standard output. libMZcomponentTools starts it. Before
 /// each stage it reports the stage, so that the parent process knows where a crash happened. It
@@ -5,7 +6,7 @@
 #include "components/componentManager/componentImp.h"
 #include "components/componentManager/nativeText.h"
 #include "components/componentTools/platform/system.h"
-#include "components/componentTools/probeAnswer.h"
+#include "components/componentTools/probing/probeAnswer.h"
 #include "components/platform/platform.h"
 
 #include <clocale>
@@ -98,15 +99,13 @@ class Collector final : public QrEnumerator<QrCPtr<QrBuilderDescription>> {
         wrongItem = nullptr;
         RecordedBuilder& builder = builders.emplace_back();
         builder.uid = description->getUid();
-        builder.name = textOf(description->getName());
-        builder.label = textOf(description->getLabel());
-        builder.text = textOf(description->getText());
+        builder.name = textOrEmpty(description->getName());
+        builder.label = textOrEmpty(description->getLabel());
+        builder.text = textOrEmpty(description->getText());
         builder.number = description->getNumber();
         builder.flag = description->getFlag();
         return Continue;
     }
-
-    static std::wstring textOf(const wchar_t* text) { return text ? text : L""; }
 
     const wchar_t* wrongItem = nullptr;
 
@@ -124,8 +123,8 @@ void describe(QrGetComponentDescriptionFunction* entryPoint, const wchar_t*& wro
     send(encodeStage(Stage::describing));
     Description answer;
     static_cast<void>(description->getComponentValue());
-    answer.text = Collector::textOf(description->getComponentText());
-    answer.label = Collector::textOf(description->getComponentLabel());
+    answer.text = textOrEmpty(description->getComponentText());
+    answer.label = textOrEmpty(description->getComponentLabel());
     answer.announced = description->getBuilderCount();
     send(encodeStage(Stage::enumerating));
     Collector collector(answer.builders);

@@ -1,7 +1,8 @@
+// SPDX-License-Identifier: BSL-1.0
 /// A Windows library names the program from which it imports. A Linux library only has an undefined
 /// symbol, which is detected by searching all dependencies for it. That takes a look-up for each
 /// symbol and library, so it is done only after a load has failed, not for each file of a folder.
-#include "components/componentTools/hostNeeds.h"
+#include "components/componentTools/inspecting/hostNeeds.h"
 
 #include "components/componentTools/platform/system.h"
 #include "components/platform/platform.h"

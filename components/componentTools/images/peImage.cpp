@@ -1,6 +1,7 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Reads PE files as the loader does: from the sections and the data directories. The entry point
 /// is found by binary search, because the export table is sorted.
-#include "components/componentTools/libraryImage.h"
+#include "components/componentTools/images/libraryImage.h"
 
 #include <algorithm>
 #include <cstring>

@@ -1,0 +1,14 @@
+/// Uids as text for people.
+#pragma once
+
+#include "components/componentManager/uid.h"
+#include "components/componentTools/export.h"
+
+#include <string>
+
+namespace Mz::Tools {
+
+/// Returns a uid as text: four words of eight hexadecimal digits, joined by '-'.
+MZ_COMPONENT_TOOLS_API std::wstring textOf(const QrUid& uid);
+
+} // namespace Mz::Tools
