@@ -5,7 +5,6 @@
 #include "components/componentTools/inspecting/inspection.h"
 
 #include "components/componentManager/nativeText.h"
-#include "components/componentTools/discovery.h"
 #include "components/componentTools/platform/system.h"
 #include "components/componentTools/recordedList.h"
 #include "components/platform/platform.h"
