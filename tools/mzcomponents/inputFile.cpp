@@ -1,3 +1,5 @@
+/// Queries the status before it opens the file, because opening a pipe would block, and opening a
+/// folder fails with different errors on each system.
 #include "tools/mzcomponents/inputFile.h"
 
 #include <fstream>
