@@ -11,7 +11,7 @@ std::wstring obstacleTo(const std::filesystem::path& file) {
     std::error_code failure;
     const std::filesystem::file_status status = std::filesystem::status(file, failure);
     if (failure == std::errc::permission_denied)
-        return L"a folder above the file may not be entered";
+        return L"a folder above the file denies access";
     if (failure || !std::filesystem::exists(status))
         return L"there is no such file";
     if (std::filesystem::is_directory(status))

@@ -1,6 +1,5 @@
 /// Results have their own stream, whose buffer is exchanged when components may start to print.
-/// JSON is written in ASCII and lines in the terminal's encoding, both without control characters
-/// from names.
+/// JSON is ASCII. Lines use the terminal's encoding, with control characters escaped.
 #include "tools/mzcomponents/output.h"
 
 #include "components/base/exBase.h"

@@ -1,6 +1,6 @@
 /// A job kills the child, and the processes that it starts, when `runChild` returns or the parent
-/// ends. The parent polls time, output and memory. The job's memory limit is only for memory that is
-/// taken faster than that, and Wine does not enforce it.
+/// ends. The parent polls time, output and memory. The job's memory limit is only for memory that
+/// is taken faster than that, and Wine does not enforce it.
 #include "components/componentTools/platform/system.h"
 
 #include "components/platform/platform.h"
