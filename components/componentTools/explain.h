@@ -18,7 +18,7 @@ namespace Mz::Tools {
 struct Dependency {
     std::wstring name;     ///< the name in the file that needs it
     std::wstring neededBy; ///< the file that needs it
-    std::wstring path;     ///< its file; empty if it was not found or the system has no file for it
+    std::wstring path;     ///< its file, if it was found and has one; valid only if `found`
     bool found = false;
 };
 

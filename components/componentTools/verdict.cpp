@@ -159,7 +159,7 @@ const Entry& entryOf(Verdict verdict) {
     return entries[0];
 }
 
-std::wstring filledIn(const wchar_t* text, const Finding& finding) {
+std::wstring substituted(const wchar_t* text, const Finding& finding) {
     std::wstring result;
     for (; *text; ++text) {
         if (*text != L'%') {
@@ -193,11 +193,11 @@ Severity severityOf(Verdict verdict) {
 }
 
 std::wstring sentenceOf(const Finding& finding) {
-    return filledIn(entryOf(finding.verdict).sentence, finding);
+    return substituted(entryOf(finding.verdict).sentence, finding);
 }
 
 std::wstring cureOf(const Finding& finding) {
-    return filledIn(entryOf(finding.verdict).cure, finding);
+    return substituted(entryOf(finding.verdict).cure, finding);
 }
 
 } // namespace Mz::Tools
