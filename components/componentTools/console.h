@@ -44,7 +44,7 @@ class MZ_COMPONENT_TOOLS_API ConsoleController final
     /// Returns null.
     void* getContext() override;
     void message(int code, const wchar_t* text) override;
-    /// Returns whether Ctrl-C was pressed since the first of the existing controllers was made.
+    /// Returns whether Ctrl-C was pressed since the first of the existing controllers was created.
     bool isInterrupted() override;
     /// Returns false after Ctrl-C, else true.
     bool warning(int code, const wchar_t* text) override;

@@ -5,11 +5,11 @@
 
 namespace Mz::Tools {
 
-/// A library that the file needs, directly or indirectly.
+/// A library that a file needs, directly or indirectly.
 struct Dependency {
     std::wstring name;     ///< the name in the file that needs it
     std::wstring neededBy; ///< the file that needs it
-    std::wstring path;     ///< its file; empty if it was not found or the system has no file for it
+    std::wstring path;     ///< its file, if it was found and has one; valid only if `found`
     bool found = false;
 };
 

@@ -42,15 +42,15 @@ MZ_COMPONENT_TOOLS_API std::wstring searchPathOf(const std::vector<std::filesyst
 
 /// Lists the candidates of the folders without reading them.
 ///
-/// A file that several folders contain is listed once. A folder that does not exist, cannot be
-/// listed, or cannot be part of a search path is returned in `leftOut`.
+/// A file to which several folders or names lead is listed once. A folder that does not exist,
+/// cannot be listed, or cannot be part of a search path is returned in `leftOut`.
 MZ_COMPONENT_TOOLS_API Discovery discover(const std::vector<std::filesystem::path>& folders);
 
 /// Returns the full path of `file` and the names under which it is recorded. A name that has no
 /// form as text is empty. The file need not exist.
 MZ_COMPONENT_TOOLS_API Candidate candidateOf(const std::filesystem::path& file);
 
-/// Returns `path` as text for people. What has no form as text is escaped.
+/// Returns `path` as text for people. Bytes that are invalid in the locale appear as `\xNN`.
 MZ_COMPONENT_TOOLS_API std::wstring displayName(const std::filesystem::path& path);
 
 } // namespace Mz::Tools

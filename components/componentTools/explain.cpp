@@ -42,7 +42,7 @@ Finding judgeRecord(const RecordedLibrary* record, const std::filesystem::path& 
 void compareUids(Explanation& explanation, const RecordedLibraries& recorded,
                  const RecordedLibrary* own) {
     const std::size_t position =
-        own ? static_cast<std::size_t>(own - recorded.data()) : UidNotes::behindAll;
+        own ? static_cast<std::size_t>(own - recorded.data()) : UidNotes::afterAll;
     for (Finding& note : UidNotes(recorded).notesOn(explanation.builders, position))
         explanation.notes.push_back(std::move(note));
 }

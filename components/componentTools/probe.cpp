@@ -63,7 +63,7 @@ Finding judgeEnd(const System::ChildResult& child, const ProbeAnswer& answer,
     using End = System::ChildResult::End;
     const std::wstring stage = nameOf(answer.stage);
     switch (child.end) {
-    case End::notStarted: return {Verdict::probeFailed, child.words, {}};
+    case End::notStarted: return {Verdict::probeFailed, child.detail, {}};
     case End::interrupted: return {Verdict::interrupted, {}, {}};
     case End::timedOut: return {Verdict::timedOut, stage, seconds(options.timeLimit)};
     case End::outOfMemory: return memoryFinding(answer, options);
@@ -79,7 +79,7 @@ Finding judgeEnd(const System::ChildResult& child, const ProbeAnswer& answer,
     if (child.end == End::unknown && !answer.description)
         return {Verdict::endUnknown, stage, {}};
     if (child.end == End::crashed)
-        return {Verdict::crashed, stage, child.words};
+        return {Verdict::crashed, stage, child.detail};
     if (!answer.anything)
         return {Verdict::probeFailed,
                 L"it ended at once, with status " + std::to_wstring(child.status),

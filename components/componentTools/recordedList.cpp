@@ -37,7 +37,7 @@ class ListReader {
         for (; count > 0; --count)
             libraries.push_back(readLibrary());
         if (buffer.read() != -1)
-            throw std::runtime_error("something behind the end");
+            throw std::runtime_error("bytes after the end");
         return libraries;
     }
 

@@ -46,10 +46,10 @@ constexpr Entry entries[] = {
 
     {Verdict::missing, "missing", Severity::fault, L"there is no such file", L"check the path"},
     {Verdict::unreachable, "unreachable", Severity::fault,
-     L"it cannot be looked at: a folder above it may not be entered",
+     L"it cannot be examined, because a folder above it denies access",
      L"check the permissions of the folders above it"},
     {Verdict::notAFolder, "notAFolder", Severity::fault,
-     L"it is a file, and a search path consists of folders", L"name the folder that it is in"},
+     L"it is a file, and a search path consists of folders", L"name the folder that contains it"},
     {Verdict::unreadable, "unreadable", Severity::fault, L"it cannot be read",
      L"check the permissions of the file and of its folders"},
     {Verdict::nameNotCarried, "nameNotCarried", Severity::fault,
@@ -69,7 +69,7 @@ constexpr Entry entries[] = {
     {Verdict::damaged, "damaged", Severity::fault, L"it is damaged or truncated: %1",
      L"build or copy it again"},
     {Verdict::entryPointNoFunction, "entryPointNoFunction", Severity::fault,
-     L"it exports \"QrGetComponentDescription\", but not as a function of its own",
+     L"it exports \"QrGetComponentDescription\", but not for a function of this library",
      L"define the function in the library itself"},
     {Verdict::dependencyMissing, "dependencyMissing", Severity::fault,
      L"it needs %1, which cannot be found%2",
@@ -87,7 +87,7 @@ constexpr Entry entries[] = {
      L"the object that its entry point returns does not support QrComponentDescription",
      L"derive the description from QrComponentDescription through a cast template"},
     {Verdict::wrongItem, "wrongItem", Severity::fault,
-     L"it offers %1 in the place of a builder description",
+     L"it enumerates %1 instead of a builder description",
      L"enumerate only objects that support QrBuilderDescription"},
     {Verdict::threw, "threw", Severity::fault, L"it throws in %1: %2", L""},
     {Verdict::crashed, "crashed", Severity::fault, L"it crashes in %1: %2", L""},
@@ -106,26 +106,24 @@ constexpr Entry entries[] = {
      L"the report of the process that loaded it is invalid: %1", L""},
     {Verdict::answerLost, "answerLost", Severity::fault,
      L"it closed files in %1 that it did not open, the connection to this process among them, so "
-     L"what it offers is unknown",
-     L"close only what the library itself has opened"},
+     L"its builders are unknown",
+     L"close only files that the library itself opened"},
     {Verdict::answerTooLong, "answerTooLong", Severity::fault,
-     L"the process that loaded it answered with more than %1 MiB, the most that a description may "
-     L"have",
+     L"the report of the process that loaded it exceeds %1 MiB, the limit of a description",
      L"describe fewer builders, or shorten their texts"},
     {Verdict::probeFailed, "probeFailed", Severity::fault,
      L"the process to load it in could not be started: %1",
      L"check that mzcomponents-probe is in the folder of libMZcomponentTools"},
     {Verdict::endUnknown, "endUnknown", Severity::fault,
-     L"it came as far as %1, and the system does not tell how the process that loaded it ended",
-     L"do not ignore the ends of children (SIGCHLD) in the program that asks"},
-    {Verdict::interrupted, "interrupted", Severity::fault, L"it was not looked at to the end", L""},
+     L"it reached %1, and the exit status of the process that loaded it is not available",
+     L"do not ignore SIGCHLD in the program that checks it"},
+    {Verdict::interrupted, "interrupted", Severity::fault, L"the check was interrupted", L""},
 
     {Verdict::notRecorded, "notRecorded", Severity::note,
      L"the list does not have it, so a host loads it at its next start", L""},
     {Verdict::recordedUnchanged, "recordedUnchanged", Severity::note,
      L"the list has it (builders: %1), and it has not changed: a host whose search path leads to "
-     L"the "
-     L"recorded names does not load it at start",
+     L"the recorded names does not load it at start",
      L""},
     {Verdict::recordedFailed, "recordedFailed", Severity::note,
      L"the list has it without builders%2, and it has not changed: a host does not try it again "
@@ -162,7 +160,7 @@ const Entry& entryOf(Verdict verdict) {
     return entries[0];
 }
 
-std::wstring filledIn(const wchar_t* text, const Finding& finding) {
+std::wstring substituted(const wchar_t* text, const Finding& finding) {
     std::wstring result;
     for (; *text; ++text) {
         if (*text != L'%') {
@@ -196,11 +194,11 @@ Severity severityOf(Verdict verdict) {
 }
 
 std::wstring sentenceOf(const Finding& finding) {
-    return filledIn(entryOf(finding.verdict).sentence, finding);
+    return substituted(entryOf(finding.verdict).sentence, finding);
 }
 
 std::wstring cureOf(const Finding& finding) {
-    return filledIn(entryOf(finding.verdict).cure, finding);
+    return substituted(entryOf(finding.verdict).cure, finding);
 }
 
 } // namespace Mz::Tools

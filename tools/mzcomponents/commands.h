@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
-/// The commands of mzcomponents. Each writes its result to standard output, says what went wrong on
-/// standard error, and returns the exit status.
+/// The commands of mzcomponents. Each writes its result to standard output and errors to standard
+/// error, and returns the exit status.
 #pragma once
 
 #include "components/componentTools/console.h"
@@ -14,21 +14,21 @@
 
 namespace Mz::Commands {
 
-/// Exit statuses.
-inline constexpr int good = 0;
-inline constexpr int subjectIsWrong = 1; ///< a library, a file or a folder
-inline constexpr int wrongUse = 2;
+// The exit statuses.
+inline constexpr int exitSuccess = 0;
+inline constexpr int exitFailure = 1; ///< a library, file or folder is faulty, or output failed
+inline constexpr int exitUsage = 2;
 
-/// What every command takes.
+/// The options of every command.
 struct Common {
-    std::string path = "."; ///< as given: folders, separated by ';'
+    std::string path = "."; ///< folders as in the argument, separated by ';'
     std::string cache;      ///< the recorded list; empty for none
     bool json = false;
 };
 
 struct ExplainArguments {
     std::vector<std::string> files;
-    std::string path; ///< of a host, as given; empty if none was
+    std::string path; ///< the search path of a host; empty for none
     bool load = false;
 };
 

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: BSL-1.0
-/// The guard is an exit handler, so it needs no cooperation of the component. It runs after the
-/// destructors of the components' static objects, which were made later, and ends the process
-/// itself because a handler cannot change the status that `exit` was given.
+/// The guard is an exit handler, so it works without cooperation of the component. It runs after
+/// the destructors of the components' static objects, which were constructed later. It ends the
+/// process itself, because a handler cannot change the status that was passed to `exit`.
 #include "tools/mzcomponents/exitGuard.h"
 #include "tools/mzcomponents/commands.h"
 #include "tools/mzcomponents/output.h"
@@ -14,7 +14,8 @@ namespace Mz::Commands {
 
 namespace {
 
-/// A component's own thread may call `exit` as well. Never destroyed: exit handlers use it.
+/// The state of the guard. The mutex is needed because a component's thread may call `exit`. Never
+/// destroyed, because exit handlers use it.
 struct State {
     std::mutex mutex;
     std::wstring activity;
@@ -41,8 +42,8 @@ void onExit() {
             text += L" while " + state().activity;
     }
     flushResults();
-    complain(text);
-    std::_Exit(subjectIsWrong);
+    printError(text);
+    std::_Exit(exitFailure);
 }
 
 } // namespace

@@ -1,28 +1,29 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Components that end the program.
+/// Detects components that call `exit`.
 ///
-/// A component may call `exit` where it should return. Its status, often 0, must not pass for the
-/// result of the command.
+/// A component may call `exit` where it should return. Its status, often 0, must not become the
+/// exit status of the command.
 #pragma once
 
 #include <string>
 
 namespace Mz::Commands {
 
-/// From the first call on, `exit` ends the program with status 1 and a message on standard error,
-/// unless `commandIsDone` was called before. What the command has printed so far is written first.
-/// Call it after the streams that the results go to were made, and before any component runs.
+/// Installs the guard: `exit` then ends the program with status 1 and a message on standard error,
+/// unless `commandIsDone` was called before. The results so far are flushed first. Call it after
+/// the streams for results were constructed, and before any component runs. Further calls are
+/// no-ops.
 ///
-/// `quick_exit`, `_exit`, and a process that the system ends are out of its reach.
+/// The guard does not detect `quick_exit`, `_exit`, or an end by the system.
 void guardExit();
 
-/// Ends the guard: the program is about to return its own status.
+/// Disables the guard. Call it before the program returns its own status.
 void commandIsDone();
 
-/// What components are asked to do while this object lives, for the message; nests.
+/// Scope of an activity of components, for the guard's message. Scopes can be nested.
 class Activity {
   public:
-    /// \param what completes the sentence "a component ended the program while …".
+    /// \param what  completes the sentence "a component ended the program while …"
     explicit Activity(std::wstring what);
     ~Activity();
     Activity(const Activity&) = delete;

@@ -1,4 +1,7 @@
 // SPDX-License-Identifier: BSL-1.0
+/// Loads only libraries that a probe has loaded before. The manager searches whole folders, so a
+/// folder is used only if each of its files is recorded, was tried, or is skipped by the manager.
+/// All others would be loaded into this process untried.
 #include "tools/mzcomponents/host.h"
 #include "components/componentManager/nativeText.h"
 #include "components/componentTools/consoleText.h"
@@ -36,7 +39,7 @@ class ExtensionCollector final : public QrEnumerator<const wchar_t*> {
     std::vector<std::wstring> extensions;
 };
 
-void giveToManager(const Tools::RecordedLibraries& libraries) {
+void loadIntoManager(const Tools::RecordedLibraries& libraries) {
     std::stringstream bytes;
     Tools::writeRecordedList(bytes, libraries);
     QrInBuffer buffer(&bytes);
@@ -46,12 +49,12 @@ void giveToManager(const Tools::RecordedLibraries& libraries) {
     companion->read(stream);
 }
 
-/// The normalised name of a folder.
+/// Returns the normalised name of a folder.
 std::wstring directoryOf(const std::filesystem::path& folder) {
     return Tools::candidateOf(folder / "file").directory;
 }
 
-/// The files that the manager may meet: it does not load them, or they have shown that it may.
+/// The files that are safe for the manager: it does not load them, or a probe has loaded them.
 class Judged {
   public:
     explicit Judged(const Tools::ScanResult& scanned) {
@@ -68,13 +71,14 @@ class Judged {
     std::set<std::pair<std::wstring, std::wstring>> names;
 };
 
-/// By the names of folders, a file in each that the manager would load unseen.
+/// Maps the normalised names of folders to a file in each that the manager would load untried. The
+/// file is empty if the folder itself is faulty.
 using Doubts = std::map<std::wstring, std::filesystem::path>;
 
-/// Whether the manager would load a file that cannot be recorded.
-bool isLoadedUnseen(const std::filesystem::path& file) {
+/// Returns whether the manager would load a file that cannot be recorded.
+bool isLoadedUntried(const std::filesystem::path& file) {
     if (Tools::candidateOf(file).fileName.empty())
-        return false; // Nor does the manager see such a name.
+        return false; // The manager does not see such a name either.
     Tools::ExplainOptions fromOutside;
     fromOutside.followDependencies = false;
     const Tools::Finding seen = Tools::explainFile(file, fromOutside).verdict;
@@ -90,19 +94,19 @@ Doubts doubtsAbout(const std::vector<std::filesystem::path>& folders, const Judg
     for (const Tools::Discovery::LeftOut& left : discovery.leftOut) {
         if (left.folder)
             doubts.emplace(directoryOf(left.path), std::filesystem::path());
-        else if (isLoadedUnseen(left.path))
+        else if (isLoadedUntried(left.path))
             doubts.emplace(Tools::candidateOf(left.path).directory, left.path);
     }
     return doubts;
 }
 
-/// Folders that are wrong themselves have been told of.
-void tellOfDoubt(Tools::ConsoleController& controller, const std::filesystem::path& folder,
-                 const std::filesystem::path& file) {
+/// Reports a skipped folder. A faulty folder, without a file, was already reported by the scan.
+void reportSkippedFolder(Tools::ConsoleController& controller, const std::filesystem::path& folder,
+                         const std::filesystem::path& file) {
     if (!file.empty())
-        controller.error(0, (shown(folder) + L": nothing of this folder is used, for " +
+        controller.error(0, (shown(folder) + L": this folder is skipped, because " +
                              shown(file.filename()) +
-                             L" is not in the record, and would be loaded without a trial")
+                             L" is not recorded and would be loaded without a trial")
                                 .c_str());
 }
 
@@ -118,27 +122,27 @@ Host::Host(const Common& common, const ProbeArguments& probe) {
     options.probe = probe.options();
     options.probe.interrupted = [this] { return controller.isInterrupted(); };
     scanned = Tools::scan(options);
-    tellFaults(common.cache);
+    reportFaults(common.cache);
     if (!scanned.interrupted)
-        start(safeOnes(options.folders));
+        start(safeFolders(options.folders));
 }
 
-void Host::tellFaults(const std::string& cache) {
-    tellOfList(controller, widened(cache), scanned);
+void Host::reportFaults(const std::string& cache) {
+    reportList(controller, toWide(cache), scanned);
     complete = scanned.notWritten.empty();
     for (const Tools::ScannedFile& file : scanned.files) {
         if (!isFault(file.verdict))
             continue;
         controller.error(0, (shown(file.path) + L": " + Tools::sentenceOf(file.verdict)).c_str());
-        // It is passed over, as in any host, but an error is never a success.
+        // The file is skipped, as in any host, but every reported error causes status 1.
         complete = false;
     }
 }
 
-/// The folders in which the manager meets nothing but what the scan has recorded, or seen to work.
-std::vector<std::filesystem::path> Host::safeOnes(std::vector<std::filesystem::path> folders) {
+/// Returns the folders in which every file is safe for the manager.
+std::vector<std::filesystem::path> Host::safeFolders(std::vector<std::filesystem::path> folders) {
     const Judged judged(scanned);
-    // Without one folder the manager may meet a file in another one, under another name.
+    // Repeat: without one folder, the manager finds a file in another one, under another name.
     for (;;) {
         const Doubts doubts = doubtsAbout(folders, judged);
         if (doubts.empty())
@@ -147,11 +151,11 @@ std::vector<std::filesystem::path> Host::safeOnes(std::vector<std::filesystem::p
         const auto count = std::erase_if(folders, [&](const std::filesystem::path& folder) {
             const auto doubt = doubts.find(directoryOf(folder));
             if (doubt != doubts.end())
-                tellOfDoubt(controller, folder, doubt->second);
+                reportSkippedFolder(controller, folder, doubt->second);
             return doubt != doubts.end();
         });
         if (count == 0)
-            return {}; // Of none of them, as far as names tell; then none is sure.
+            return {}; // The folder in doubt cannot be identified, so no folder is safe.
     }
 }
 
@@ -161,16 +165,16 @@ void Host::start(const std::vector<std::filesystem::path>& folders) {
     QrSetSystemProcessController(&controller);
     const std::wstring searchPath = Tools::searchPathOf(folders);
     if (searchPath.empty())
-        return; // The manager would take the folder of this program instead.
+        return; // For an empty path the manager would search the program's folder.
     Tools::RecordedLibraries known = scanned.libraries;
     known.insert(known.end(), scanned.unjudged.begin(), scanned.unjudged.end());
-    giveToManager(known);
+    loadIntoManager(known);
     const Activity activity(L"the component manager started");
     QrGetComponentManager()->initialize(searchPath.c_str());
 }
 
 Host::~Host() {
-    // Libraries may ask for a controller while they are unloaded, long after this one is gone.
+    // Libraries may use the process's controller while they are unloaded, after this object's end.
     if (installed)
         QrSetSystemProcessController(previous);
 }
@@ -187,7 +191,7 @@ QrCPtr<QrImportBuilder> importBuilder(const QrBuilderDescription& description) {
         return builder ? queryCast<QrImportBuilder>(const_cast<QrComponentBuilder*>(builder.get()))
                        : QrPtr<QrImportBuilder>();
     } catch (...) {
-        return {}; // What another library throws when asked for its builder.
+        return {}; // The library's `getBuilder` threw.
     }
 }
 
@@ -196,7 +200,7 @@ std::vector<std::wstring> extensionsOf(const QrImportBuilder& builder) {
     try {
         builder.enumerateExtensions(collector);
     } catch (...) {
-        return {}; // What another library throws when asked what it reads.
+        return {}; // The library's `enumerateExtensions` threw.
     }
     return collector.extensions;
 }

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// The component manager of this process, started without risk.
+/// Starts the component manager of this process with safe libraries only.
 #pragma once
 
 #include "tools/mzcomponents/commands.h"
@@ -14,12 +14,14 @@
 
 namespace Mz::Commands {
 
-/// Scans the search path in processes of their own, brings the list up to date where there is one,
-/// and initialises the manager with the result: libraries that failed are not loaded, and neither
-/// is what could not be looked at in such a process. Faults are said on standard error.
+/// The component manager for one command.
 ///
-/// From then on standard output belongs to the results. Lasts as long as the command; there can be
-/// only one.
+/// The constructor scans the search path in child processes, updates the recorded list, if there is
+/// one, and initialises the manager with the result. Libraries that failed, or that could not be
+/// tried, are not loaded. Faults are reported on standard error.
+///
+/// From the construction on, standard output is reserved for results. Only one object may be
+/// created in a process; it lives as long as the command.
 class Host {
   public:
     Host(const Common& common, const ProbeArguments& probe);
@@ -27,19 +29,19 @@ class Host {
     Host(const Host&) = delete;
     Host& operator=(const Host&) = delete;
 
-    /// Whether the user stopped it.
+    /// Returns whether the user stopped the scan. The manager is then not initialised.
     bool interrupted() const { return scanned.interrupted; }
-    /// The exit status where nothing else is wrong: whether all that should be here is.
-    int status() const { return complete ? good : subjectIsWrong; }
+    /// Returns `exitSuccess` if no fault was reported, else `exitFailure`.
+    int status() const { return complete ? exitSuccess : exitFailure; }
     const Tools::RecordedLibraries& libraries() const { return scanned.libraries; }
     Tools::ConsoleController& console() { return controller; }
 
-    /// Every builder known.
+    /// Returns the descriptions of all registered builders.
     std::vector<QrCPtr<QrBuilderDescription>> builders() const;
 
   private:
-    void tellFaults(const std::string& cache);
-    std::vector<std::filesystem::path> safeOnes(std::vector<std::filesystem::path> folders);
+    void reportFaults(const std::string& cache);
+    std::vector<std::filesystem::path> safeFolders(std::vector<std::filesystem::path> folders);
     void start(const std::vector<std::filesystem::path>& folders);
 
     Tools::ConsoleController controller;
@@ -49,10 +51,10 @@ class Host {
     bool complete = true;
 };
 
-/// The builder as an import builder; null when it is none or cannot be had.
+/// Returns the builder as an import builder; null if it is not one, or getting it throws.
 QrCPtr<QrImportBuilder> importBuilder(const QrBuilderDescription& builder);
 
-/// The extensions that it reads; none when it throws.
+/// Returns the file extensions of an import builder; empty if it throws.
 std::vector<std::wstring> extensionsOf(const QrImportBuilder& builder);
 
 } // namespace Mz::Commands

@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
-/// The commands that use components: types, import, graph.
+/// The commands that use components: types, import, graph. Each creates a `Host` first. An
+/// exception from one component does not stop the work with the others.
 #include "components/componentTools/consoleText.h"
 #include "components/componentTools/uidText.h"
 #include "tools/mzcomponents/exitGuard.h"
@@ -24,7 +25,7 @@ namespace Mz::Commands {
 
 namespace {
 
-/// An importer for whatever builders carry a name.
+/// An importer through the builders with a given name.
 class FamilyImporter final : public QrCastImpl<FamilyImporter, QrBaseImporter> {
   public:
     explicit FamilyImporter(std::wstring builderName) : name(std::move(builderName)) {}
@@ -34,12 +35,13 @@ class FamilyImporter final : public QrCastImpl<FamilyImporter, QrBaseImporter> {
     std::wstring name;
 };
 
-/// For messages.
+/// Returns a name in quotes, for messages.
 std::wstring quoted(const wchar_t* name) {
     return L"\"" + std::wstring(name) + L"\"";
 }
 
-/// The names of all builders that import files, those first that read the file's extension.
+/// Returns the distinct names of all import builders. Those that read the file's extension come
+/// first.
 std::vector<std::wstring> familiesFor(const Host& host, const std::filesystem::path& file) {
     std::vector<std::wstring> reading, others;
     const std::wstring name = Tools::displayName(file);
@@ -64,12 +66,11 @@ std::vector<std::wstring> familiesFor(const Host& host, const std::filesystem::p
 
 struct Imported {
     QrRef<QrCastable> object;
-    std::wstring family; ///< the name of the builders through which it came
+    std::wstring family; ///< the name of the builders that imported it
     std::wstring reason; ///< why there is no object
 };
 
-/// Tries one family after the other, whatever the one before has thrown; the first that throws is
-/// the reason when none succeeds.
+/// Tries the families in order until one succeeds. If none does, the reason is the first exception.
 Imported importThrough(const std::vector<std::wstring>& families, const std::wstring& name) {
     Imported imported;
     for (const std::wstring& family : families) {
@@ -79,7 +80,7 @@ Imported importThrough(const std::vector<std::wstring>& families, const std::wst
             imported.object = FamilyImporter(family).import(name.c_str(), nullptr, found);
         } catch (...) {
             if (imported.reason.empty())
-                imported.reason = wordsOfException();
+                imported.reason = exceptionText();
         }
         if (imported.object) {
             imported.family = family;
@@ -113,7 +114,7 @@ std::wstring describe(const QrCastable* object) {
         return L"class " + Tools::textOf(*persistant->getClassUid()) + L", version " +
                std::to_wstring(persistant->getVersion());
     } catch (...) {
-        return L"an object that throws when it is asked for its class";
+        return L"an object whose class is unknown, because it throws";
     }
 }
 
@@ -125,7 +126,7 @@ Json jsonOf(const std::filesystem::path& file, const Imported& imported) {
             {"object", utf8(good ? describe(imported.object.get()) : imported.reason)}};
 }
 
-/// Failures go to standard error, and successes to standard output unless something else does.
+/// Writes a failure to standard error. Writes a success to standard output, if `success` is set.
 void tell(Host& host, const std::filesystem::path& file, const Imported& imported, bool success) {
     const std::wstring name = shown(file);
     if (!imported.object)
@@ -135,7 +136,7 @@ void tell(Host& host, const std::filesystem::path& file, const Imported& importe
                   describe(imported.object.get()));
 }
 
-/// Writes the objects one after the other; they are complete or not written at all.
+/// Stores the objects one after the other. The file is written completely or not at all.
 void save(const std::vector<QrRef<QrCastable>>& objects, const std::filesystem::path& file) {
     const Activity activity(L"its objects were stored");
     std::ostringstream content;
@@ -149,7 +150,7 @@ void save(const std::vector<QrRef<QrCastable>>& objects, const std::filesystem::
     replaceFile(file, content.view());
 }
 
-/// Whether the result would take the place of what it comes from.
+/// Returns whether the file is one of the others, under any name.
 bool isOneOf(const std::filesystem::path& file, const std::vector<std::string>& others) {
     std::error_code ignored;
     return std::any_of(others.begin(), others.end(), [&](const std::string& other) {
@@ -157,7 +158,7 @@ bool isOneOf(const std::filesystem::path& file, const std::vector<std::string>& 
     });
 }
 
-/// Which builders make importers, and of what.
+/// Returns the builders whose objects are importers, and their import builders.
 std::vector<Tools::GraphImporter> importersOf(const Host& host) {
     std::vector<Tools::GraphImporter> importers;
     for (const QrCPtr<QrBuilderDescription>& builder : host.builders()) {
@@ -168,7 +169,7 @@ std::vector<Tools::GraphImporter> importersOf(const Host& host) {
             if (const auto importer = queryCast<QrImporter>(object.get()))
                 importers.push_back({builder->getUid(), importer->getBuilderName()});
         } catch (...) {
-            continue; // What another library throws when it should make an object.
+            continue; // The library threw instead of creating an object.
         }
     }
     return importers;
@@ -180,7 +181,7 @@ Json jsonOf(const Host& host, const std::vector<Tools::GraphImporter>& importers
         if (library.builders.empty())
             continue;
         libraries.push_back(Commands::jsonOf(library));
-        // Positions are of the file that a list was read from.
+        // Offsets apply only to the file from which a list was read.
         libraries.back().erase("position");
         for (Json& builder : libraries.back()["builders"])
             builder.erase("position");
@@ -196,7 +197,7 @@ Json jsonOf(const Host& host, const std::vector<Tools::GraphImporter>& importers
 int types(const Common& common, const ProbeArguments& probe) {
     Host host(common, probe);
     if (host.interrupted())
-        return subjectIsWrong;
+        return exitFailure;
     Json all = Json::array();
     for (const QrCPtr<QrBuilderDescription>& builder : host.builders()) {
         const Activity activity(quoted(builder->getName()) + L" was asked what it imports");
@@ -226,12 +227,13 @@ int types(const Common& common, const ProbeArguments& probe) {
 int importFiles(const Common& common, const ImportArguments& arguments,
                 const ProbeArguments& probe) {
     if (!arguments.save.empty() && isOneOf(Tools::pathOf(arguments.save), arguments.files)) {
-        complain(widened(arguments.save) + L": this file is to be imported, not overwritten");
-        return wrongUse;
+        printError(toWide(arguments.save) +
+                   L": this file is one of those to import. Choose another name for the result");
+        return exitUsage;
     }
     Host host(common, probe);
     if (host.interrupted())
-        return subjectIsWrong;
+        return exitFailure;
     std::vector<QrRef<QrCastable>> objects;
     Json files = Json::array();
     for (const std::string& argument : arguments.files) {
@@ -247,7 +249,7 @@ int importFiles(const Common& common, const ImportArguments& arguments,
     if (common.json)
         printJson({{"files", files}});
     if (objects.size() < arguments.files.size())
-        return subjectIsWrong;
+        return exitFailure;
     if (!arguments.save.empty())
         save(objects, Tools::pathOf(arguments.save));
     return host.status();
@@ -256,7 +258,7 @@ int importFiles(const Common& common, const ImportArguments& arguments,
 int graph(const Common& common, const GraphArguments& arguments, const ProbeArguments& probe) {
     Host host(common, probe);
     if (host.interrupted())
-        return subjectIsWrong;
+        return exitFailure;
     const std::vector<Tools::GraphImporter> importers = importersOf(host);
     const std::string dot = Tools::dotOf(host.libraries(), importers);
     if (common.json) {
@@ -269,7 +271,7 @@ int graph(const Common& common, const GraphArguments& arguments, const ProbeArgu
     std::wstring why;
     if (!arguments.svg.empty() && !Tools::drawSvg(dot, Tools::pathOf(arguments.svg), why)) {
         host.console().error(0, why.c_str());
-        return subjectIsWrong;
+        return exitFailure;
     }
     return host.status();
 }

@@ -1,4 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
+/// Queries the status before it opens the file, because opening a pipe would block, and opening a
+/// folder fails with different errors on each system.
 #include "tools/mzcomponents/inputFile.h"
 
 #include <fstream>
@@ -10,7 +12,7 @@ std::wstring obstacleTo(const std::filesystem::path& file) {
     std::error_code failure;
     const std::filesystem::file_status status = std::filesystem::status(file, failure);
     if (failure == std::errc::permission_denied)
-        return L"a folder above the file may not be entered";
+        return L"a folder above the file denies access";
     if (failure || !std::filesystem::exists(status))
         return L"there is no such file";
     if (std::filesystem::is_directory(status))

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// The files that commands read.
+/// Checks the files that commands read.
 #pragma once
 
 #include <filesystem>
@@ -7,8 +7,8 @@
 
 namespace Mz::Commands {
 
-/// Returns why the file cannot be read; nothing if it can. Opens nothing but a regular file: a pipe
-/// would block.
+/// Returns why the file cannot be read; empty if it can. Opens regular files only, because opening
+/// a pipe would block.
 std::wstring obstacleTo(const std::filesystem::path& file);
 
 } // namespace Mz::Commands

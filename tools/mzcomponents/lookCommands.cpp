@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
-/// The commands that look at files: list, explain, scan.
+/// The commands that examine files: list, explain, scan. They load no library into this process, so
+/// they need no `Host`.
 #include "components/componentTools/consoleText.h"
 #include "components/componentTools/uidText.h"
 #include "tools/mzcomponents/commands.h"
@@ -16,7 +17,7 @@ namespace {
 
 constexpr std::size_t nameWidth = 20;
 
-/// The list that was asked for; a rejected one is told of and counts as empty.
+/// The list from the command line. A missing or rejected list is reported and counts as empty.
 struct Recorded {
     explicit Recorded(const Common& common) {
         if (common.cache.empty())
@@ -25,9 +26,9 @@ struct Recorded {
         wanted = true;
         sound = reading.state == Tools::ListReading::State::good;
         if (!sound)
-            complain(widened(common.cache) + (reading.state == Tools::ListReading::State::missing
-                                                  ? L": there is no such list"
-                                                  : L": no recorded list: " + reading.reason));
+            printError(toWide(common.cache) + (reading.state == Tools::ListReading::State::missing
+                                                   ? L": there is no such list"
+                                                   : L": no recorded list: " + reading.reason));
         libraries = std::move(reading.libraries);
     }
 
@@ -41,7 +42,7 @@ void printSentence(const Tools::Finding& finding) {
     printLine(std::wstring(nameWidth + 2, L' ') + Tools::sentenceOf(finding));
 }
 
-/// The verdict on a component, or, if another library takes one of its builders over, that.
+/// Returns the verdict; for a component that loses a builder to another library, `uidTaken`.
 Tools::Finding withUidTaken(const Tools::Explanation& explanation) {
     if (explanation.verdict.verdict == Tools::Verdict::component)
         for (const Tools::Finding& note : explanation.notes)
@@ -82,7 +83,7 @@ void printExplanation(const Tools::Explanation& explanation) {
     for (const Tools::Finding& note : explanation.notes)
         tell(note);
     if (!explanation.label.empty() || !explanation.text.empty())
-        printLine(L"  says of itself: " + explanation.label + L"; " + explanation.text);
+        printLine(L"  description: " + explanation.label + L"; " + explanation.text);
     for (const Tools::RecordedBuilder& builder : explanation.builders)
         printLine(L"  builder " + Tools::textOf(builder.uid) + L"  " + builder.name + L"  " +
                   builder.label);
@@ -109,13 +110,13 @@ Json jsonOfExplanation(const Tools::Explanation& explanation) {
     return entry;
 }
 
-/// A component that failed when it was scanned shows no fault from the outside.
+/// Returns whether reading the file shows no fault, but its record has no builders.
 bool failedEarlier(const Tools::Explanation& explanation) {
     return explanation.verdict.verdict == Tools::Verdict::component && !explanation.notes.empty() &&
            explanation.notes.front().verdict == Tools::Verdict::recordedFailed;
 }
 
-/// Whether the search path that was given does not lead to the file.
+/// Returns whether the search path does not lead to the file.
 bool isPassedBy(const Tools::Explanation& explanation) {
     return std::any_of(
         explanation.notes.begin(), explanation.notes.end(),
@@ -154,7 +155,7 @@ int list(const Common& common) {
             printFile(file, finding, notes);
     };
     for (const Tools::Candidate& candidate : discovery.candidates) {
-        // What is no component library need not be asked what it needs.
+        // Only the dependencies of component libraries matter; searching them takes time.
         options.followDependencies = false;
         Tools::Explanation explanation = Tools::explainFile(candidate.path, options);
         options.followDependencies = true;
@@ -167,7 +168,7 @@ int list(const Common& common) {
         tell(left.path, left.finding, {});
     if (common.json)
         printJson({{"files", files}});
-    return faults ? subjectIsWrong : good;
+    return faults ? exitFailure : exitSuccess;
 }
 
 int explain(const Common& common, const ExplainArguments& arguments, const ProbeArguments& probe) {
@@ -184,7 +185,7 @@ int explain(const Common& common, const ExplainArguments& arguments, const Probe
     bool faults = !recorded.sound;
     for (const std::string& file : arguments.files) {
         const Tools::Explanation explanation = Tools::explainFile(Tools::pathOf(file), options);
-        // Asked why a file is no component, anything but a component is an answer of that kind.
+        // The user expects a component, so every other file is a failure, not only a fault.
         faults = faults || failedEarlier(explanation) || isPassedBy(explanation) ||
                  Tools::severityOf(explanation.verdict.verdict) != Tools::Severity::good;
         if (common.json)
@@ -194,7 +195,7 @@ int explain(const Common& common, const ExplainArguments& arguments, const Probe
     }
     if (common.json)
         printJson({{"files", files}});
-    return faults ? subjectIsWrong : good;
+    return faults ? exitFailure : exitSuccess;
 }
 
 int scan(const Common& common, const ProbeArguments& probe) {
@@ -207,7 +208,7 @@ int scan(const Common& common, const ProbeArguments& probe) {
     options.controller = &controller;
     const Tools::ScanResult result = Tools::scan(options);
     controller.clearLine();
-    tellOfList(controller, Tools::displayName(options.list), result);
+    reportList(controller, Tools::displayName(options.list), result);
     bool faults = result.interrupted || !result.notWritten.empty();
     Json files = Json::array();
     for (const Tools::ScannedFile& file : result.files) {
@@ -230,7 +231,7 @@ int scan(const Common& common, const ProbeArguments& probe) {
                    {"interrupted", result.interrupted}});
     else
         printSummary(result);
-    return faults ? subjectIsWrong : good;
+    return faults ? exitFailure : exitSuccess;
 }
 
 } // namespace Mz::Commands

@@ -1,5 +1,8 @@
 // SPDX-License-Identifier: BSL-1.0
-/// mzcomponents: looks at component libraries, and uses them, from the command line.
+/// The program mzcomponents: inspects, scans and uses component libraries.
+///
+/// The parser only fills in `Arguments` and selects a command, which runs after parsing, so that a
+/// usage error has no side effects. Exceptions end here.
 #include "components/componentTools/consoleText.h"
 #include "tools/mzcomponents/commands.h"
 #include "tools/mzcomponents/exitGuard.h"
@@ -18,11 +21,11 @@ using namespace Mz::Commands;
 namespace {
 
 constexpr const char* about =
-    "Tells which component libraries there are, why a file is none, and what they can do.\n\n"
-    "Exit status: 0 all is well; 1 something is wrong with a library, a file or a folder, or the "
-    "output could not be written; 2 wrong use.";
+    "Lists component libraries, explains why a file is not one, and uses them.\n\n"
+    "Exit status: 0 success; 1 a library, a file or a folder is faulty, or the output could not be "
+    "written; 2 usage error.";
 
-/// Everything that the command line can say.
+/// The parsed command line.
 struct Arguments {
     Common common;
     ExplainArguments explain;
@@ -33,7 +36,7 @@ struct Arguments {
     std::function<int()> command;
 };
 
-/// Checks of values: what is wrong, or nothing.
+// Validators of values. Each returns an error message; empty if the value is valid.
 std::string namesAFolder(const std::string& path) {
     return path.find_first_not_of(';') == std::string::npos ? "it names no folder" : "";
 }
@@ -44,10 +47,11 @@ std::string namesAFile(const std::string& path) {
 
 std::string isFinite(const std::string& number) {
     double value = 0;
-    return CLI::detail::lexical_cast(number, value) && std::isfinite(value) ? "" : "no number";
+    return CLI::detail::lexical_cast(number, value) && std::isfinite(value) ? ""
+                                                                            : "not a finite number";
 }
 
-/// The parser would take `[a,b]` for two names.
+/// Returns a word that the parser takes for one name. It would split `[a,b]`.
 std::string asOneName(const std::string& word) {
     return word.starts_with('[') && word.ends_with(']') ? "./" + word : word;
 }
@@ -57,10 +61,11 @@ CLI::App* addCommand(CLI::App& app, Arguments& arguments, const char* name, cons
     CLI::App* command = app.add_subcommand(name, text);
     command
         ->add_option("--path", hostPath ? *hostPath : arguments.common.path,
-                     hostPath ? "The search path of a host, folders separated by ';', to say "
-                                "whether it leads to the files"
-                              : "The folders to search, separated by ';'; the current one if not "
-                                "given")
+                     hostPath
+                         ? "The search path of a host, folders separated by ';': report whether "
+                           "it leads to the files"
+                         : "The folders to search, separated by ';'. The default is the "
+                           "current folder")
         ->check(namesAFolder);
     command->add_flag("--json", arguments.common.json, "Write the result as JSON");
     command->footer(std::string("Example:\n  ") + example);
@@ -86,13 +91,13 @@ void addLimits(CLI::App* command, Arguments& arguments) {
 }
 
 constexpr const char* readCache = "A recorded list to look files up in";
-constexpr const char* updatedCache = "A recorded list to bring up to date and use";
+constexpr const char* updatedCache = "A recorded list to update and use";
 
 void addLookCommands(CLI::App& app, Arguments& arguments) {
     CLI::App* list =
         addCommand(app, arguments, "list",
-                   "Lists the candidate files of the search path, each with its verdict. Runs "
-                   "nothing of them.",
+                   "Lists the candidates of the search path with their verdicts. Runs none of "
+                   "their code.",
                    "mzcomponents list --path /opt/app/components");
     addCache(list, arguments, readCache);
     list->callback(
@@ -104,7 +109,7 @@ void addLookCommands(CLI::App& app, Arguments& arguments) {
         "mzcomponents explain --load /opt/app/components/mesh.so", &arguments.explain.path);
     explain->add_option("FILE", arguments.explain.files, "The files")->required();
     explain->add_flag("--load", arguments.explain.load,
-                      "Load each file, in a process of its own, and say how that went");
+                      "Load each file in a child process and report the result");
     addCache(explain, arguments, readCache);
     addLimits(explain, arguments);
     explain->callback([&] {
@@ -115,13 +120,13 @@ void addLookCommands(CLI::App& app, Arguments& arguments) {
 
     CLI::App* scan = addCommand(
         app, arguments, "scan",
-        "Loads what is new in processes of their own and brings the recorded list up to date: a "
-        "host that reads it loads none of these libraries at start.",
+        "Loads new and changed libraries in child processes and updates the recorded list: a host "
+        "that reads it loads none of these libraries at start.",
         "mzcomponents scan --cache ~/.cache/app/components.list --path /opt/app/components");
-    scan->add_option("--cache", arguments.common.cache, "The recorded list to bring up to date")
+    scan->add_option("--cache", arguments.common.cache, "The recorded list to update")
         ->required()
         ->check(namesAFile);
-    scan->add_flag("--retry", arguments.probe.retry, "Try libraries that failed earlier again");
+    scan->add_flag("--retry", arguments.probe.retry, "Retry libraries that failed earlier");
     addLimits(scan, arguments);
     scan->callback([&] {
         arguments.command = [&] { return Mz::Commands::scan(arguments.common, arguments.probe); };
@@ -139,7 +144,7 @@ void addUseCommands(CLI::App& app, Arguments& arguments) {
     });
 
     CLI::App* importer = addCommand(app, arguments, "import",
-                                    "Imports files through whichever component can read them.",
+                                    "Imports files through the first component that can read them.",
                                     "mzcomponents import part.obj --path /opt/app/components");
     importer->add_option("FILE", arguments.import.files, "The files")->required();
     importer
@@ -156,7 +161,7 @@ void addUseCommands(CLI::App& app, Arguments& arguments) {
 
     CLI::App* show = addCommand(
         app, arguments, "show",
-        "Shows a recorded list, or the objects stored in a file, with their positions in bytes.",
+        "Shows a recorded list, or the objects stored in a file, with their offsets in bytes.",
         "mzcomponents show ~/.cache/app/components.list");
     show->add_option("FILE", arguments.shown, "The file")->required();
     addCache(show, arguments, updatedCache);
@@ -173,11 +178,11 @@ void addUseCommands(CLI::App& app, Arguments& arguments) {
                    "mzcomponents graph --path /opt/app/components --svg components.svg");
     graph
         ->add_option("--output", arguments.graph.output,
-                     "Write the DOT text to this file and not to standard output")
+                     "Write the DOT text to this file instead of standard output")
         ->check(namesAFile);
     graph
         ->add_option("--svg", arguments.graph.svg,
-                     "Have Graphviz, which must be installed, draw it to this file")
+                     "Draw it to this file with Graphviz, which must be installed")
         ->check(namesAFile);
     addCache(graph, arguments, updatedCache);
     addLimits(graph, arguments);
@@ -198,21 +203,21 @@ int run(std::vector<std::string> words) {
     addUseCommands(app, arguments);
     try {
         std::transform(words.begin(), words.end(), words.begin(), asOneName);
-        std::reverse(words.begin(), words.end()); // So the parser wants them.
+        std::reverse(words.begin(), words.end()); // The parser expects reverse order.
         app.parse(words);
     } catch (const CLI::ParseError& failure) {
-        return app.exit(failure) == 0 ? good : wrongUse;
+        return app.exit(failure) == 0 ? exitSuccess : exitUsage;
     }
     return arguments.command();
 }
 
-/// Whatever comes out of a command, or out of a component in it, is said.
+/// Runs a command. Reports every exception that it, or a component, throws.
 int runGuarded(const std::vector<std::string>& words) {
     try {
         return run(words);
     } catch (...) {
-        complain(wordsOfException());
-        return subjectIsWrong;
+        printError(exceptionText());
+        return exitFailure;
     }
 }
 
@@ -224,6 +229,6 @@ int main(int argc, char** argv) {
     commandIsDone();
     if (flushResults())
         return status;
-    complain(L"the output could not be written");
-    return status == good ? subjectIsWrong : status;
+    printError(L"the output could not be written");
+    return status == exitSuccess ? exitFailure : status;
 }

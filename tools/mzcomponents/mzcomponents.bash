@@ -1,5 +1,5 @@
 # SPDX-License-Identifier: BSL-1.0
-# Completion of mzcomponents for bash.
+# Bash completion for mzcomponents: commands, options and file names.
 _mzcomponents() {
   local current=${COMP_WORDS[COMP_CWORD]} previous=${COMP_WORDS[COMP_CWORD - 1]}
   local common="--path --cache --json --help" limits="--time-limit --memory-limit"

@@ -1,4 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
+/// Results have their own stream, whose buffer is exchanged when components may start to print.
+/// JSON is ASCII. Lines use the terminal's encoding, with control characters escaped.
 #include "tools/mzcomponents/output.h"
 #include "components/componentTools/consoleText.h"
 #include "components/componentTools/uidText.h"
@@ -31,26 +33,26 @@ void reserveResults() {
 }
 
 bool flushResults() {
-    // The parser of the command line writes its help to the stream that everybody knows.
+    // The command line parser writes its help to `std::cout`.
     const bool helped = static_cast<bool>(std::cout.flush());
     return static_cast<bool>(results().flush()) && helped;
 }
 
-void complain(const std::wstring& text) {
+void printError(const std::wstring& text) {
     std::cerr << "mzcomponents: " << Tools::forOutput(Tools::withoutControls(text)) << std::endl;
 }
 
-std::wstring widened(const std::string& bytes) {
+std::wstring toWide(const std::string& bytes) {
     return Tools::displayName(Tools::pathOf(bytes));
 }
 
-std::wstring wordsOfException() {
+std::wstring exceptionText() {
     try {
         throw;
     } catch (const ExBase& failure) {
         return Tools::reasonText(failure.getReason());
     } catch (const std::exception& failure) {
-        return widened(failure.what());
+        return toWide(failure.what());
     } catch (...) {
         return L"a component threw what is no exception of any known kind";
     }
@@ -60,7 +62,7 @@ std::wstring shown(const std::filesystem::path& path) {
     return Tools::withoutControls(Tools::displayName(path));
 }
 
-void tellOfList(Tools::ConsoleController& controller, const std::wstring& list,
+void reportList(Tools::ConsoleController& controller, const std::wstring& list,
                 const Tools::ScanResult& result) {
     const std::wstring name = Tools::withoutControls(list);
     if (!result.rejected.empty())

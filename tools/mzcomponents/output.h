@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// How results look: lines of text, or JSON.
+/// Writes results, as lines of text or as JSON, and error messages.
 #pragma once
 
 #include "components/componentTools/console.h"
@@ -15,51 +15,53 @@ namespace Mz::Commands {
 
 using Json = nlohmann::ordered_json;
 
-/// Texts in JSON are UTF-8, whatever the locale.
+/// Returns `text` in UTF-8, the encoding of JSON, in every locale.
 std::string utf8(const std::wstring& text);
 
-/// Where results go, and nothing else does: standard output.
+/// Returns the stream for results. Components cannot write to it after `reserveResults`.
 std::ostream& results();
 
-/// From now on components may print what they like: it goes to standard error.
+/// Reserves standard output for results: everything that components print from now on goes to
+/// standard error.
 void reserveResults();
 
-/// Brings everything out; false when any of it was lost.
+/// Flushes the results. Returns false if any output was lost.
 bool flushResults();
 
-/// Says on standard error what is wrong.
-void complain(const std::wstring& text);
+/// Writes an error message to standard error.
+void printError(const std::wstring& text);
 
-/// What an exception or an argument says, in characters.
-std::wstring widened(const std::string& bytes);
+/// Returns an argument, or the text of an exception, as wide text for people.
+std::wstring toWide(const std::string& bytes);
 
-/// What the exception that is being handled says.
-std::wstring wordsOfException();
+/// Returns the text of the current exception. Call it in a `catch` block only.
+std::wstring exceptionText();
 
-/// A name as it may be printed: control characters are not left to the terminal.
+/// Returns a path for output, with control characters escaped.
 std::wstring shown(const std::filesystem::path& path);
 
-/// Says what became of the old list, and why the new one could not be written.
-void tellOfList(Tools::ConsoleController& controller, const std::wstring& list,
+/// Reports a rejected old list, its copy, and a list that could not be written.
+void reportList(Tools::ConsoleController& controller, const std::wstring& list,
                 const Tools::ScanResult& result);
 
-/// Prints one line.
+/// Writes one line to the results, with control characters escaped.
 void printLine(const std::wstring& text);
 
-/// Prints a value and a line end. Everything beyond ASCII is escaped, so that no encoding matters.
+/// Writes a value and a line end to the results. Non-ASCII characters are escaped, so that the
+/// result is independent of encodings.
 void printJson(const Json& value);
 
 Json jsonOf(const Tools::Finding& finding);
 Json jsonOf(const Tools::RecordedBuilder& builder);
 Json jsonOf(const Tools::RecordedLibrary& library);
 
-/// `text`, with blanks behind it up to `width`.
+/// Returns `text`, padded with trailing blanks to `width` characters.
 std::wstring padded(std::wstring text, std::size_t width);
 
-/// The verdict's name.
+/// Returns the verdict's name as wide text.
 std::wstring nameOf(const Tools::Finding& finding);
 
-/// Whether it is a fault of the file.
+/// Returns whether the verdict is a fault.
 bool isFault(const Tools::Finding& finding);
 
 } // namespace Mz::Commands

@@ -1,5 +1,7 @@
 // SPDX-License-Identifier: BSL-1.0
-/// The command that shows what is in a file: show.
+/// The command that shows the content of a file: show. It first tries to read the file as a
+/// recorded list, which needs no component. Otherwise the components read the objects, and a
+/// forwarding IO records where each begins and ends.
 #include "components/componentTools/consoleText.h"
 #include "components/componentTools/uidText.h"
 #include "tools/mzcomponents/exitGuard.h"
@@ -21,14 +23,14 @@ namespace Mz::Commands {
 
 namespace {
 
-/// One object of a stream.
+/// The position of one object in a stream, and its description.
 struct Frame {
     int64 begin = -1, end = -1;
     int depth = 0;
     std::wstring what;
 };
 
-/// Notes where each object begins and ends while it is read.
+/// An IO that records where each object begins and ends while it is read.
 class FrameNotes final : public QrCastImpl<FrameNotes, QrForwardingIO, const FrameNotes&> {
   public:
     explicit FrameNotes(QrCastable* io) : QrCastImpl(io) {}
@@ -56,7 +58,7 @@ class FrameNotes final : public QrCastImpl<FrameNotes, QrForwardingIO, const Fra
             persistant ? L"class " + Tools::textOf(*persistant->getClassUid()) + L", version " +
                              std::to_wstring(persistant->getVersion())
                        : std::wstring(L"an object");
-        // A number alone stands for an object that was stored before.
+        // Four bytes are a number alone: a reference to an object that was stored before.
         return frame.end - frame.begin == 4 ? L"again: " + name : name;
     }
 
@@ -103,7 +105,7 @@ void showFrames(const Common& common, const std::vector<Frame>& frames) {
 
 struct Objects {
     std::vector<Frame> frames;
-    std::wstring failure; ///< why the rest could not be read; empty when all was
+    std::wstring failure; ///< why the rest could not be read; empty if all was read
 };
 
 Objects readObjects(std::istream& input) {
@@ -117,7 +119,7 @@ Objects readObjects(std::istream& input) {
             while (input.peek() != std::istream::traits_type::eof())
                 stream.readObject(nullptr, nullptr, nullptr);
         } catch (...) {
-            result.failure = wordsOfException();
+            result.failure = exceptionText();
         }
     }
     if (result.failure.empty() && input.bad())
@@ -126,7 +128,7 @@ Objects readObjects(std::istream& input) {
     return result;
 }
 
-/// Whether the file may hold objects: they are numbered from 1, and null is 0.
+/// Returns whether the file may contain objects: they are numbered from 1, and null is 0.
 bool beginsWithAnObject(std::istream& input) {
     QrInBuffer bytes(&input);
     QrBinaryStream stream(&bytes);
@@ -141,12 +143,12 @@ bool beginsWithAnObject(std::istream& input) {
     return number <= 1;
 }
 
-/// Only components know what their objects hold, so the stream is read through them.
+/// Shows the objects of a stream. The components must read them, because only they know the format.
 int showObjects(const Common& common, const std::filesystem::path& file, std::istream& input,
                 const std::wstring& whyNoList, const ProbeArguments& probe) {
     Host host(common, probe);
     if (host.interrupted())
-        return subjectIsWrong;
+        return exitFailure;
     const Activity activity(L"the objects of " + Tools::displayName(file) + L" were read");
     Objects objects = readObjects(input);
     const bool nothing = !objects.failure.empty() && objects.frames.size() <= 1;
@@ -160,10 +162,10 @@ int showObjects(const Common& common, const std::filesystem::path& file, std::is
         failure = L"neither a recorded list (" + whyNoList +
                   L") nor objects that these components know (" + failure + L")";
     host.console().error(0, (shown(file) + L": " + failure).c_str());
-    return subjectIsWrong;
+    return exitFailure;
 }
 
-/// What keeps the file from being read as objects, or nothing; `input` is open then.
+/// Opens `input` and returns an empty text; or returns why the file cannot be read as objects.
 std::wstring obstacle(const std::filesystem::path& file, std::ifstream& input,
                       const std::wstring& whyNoList) {
     std::wstring wrong = obstacleTo(file);
@@ -187,14 +189,14 @@ int show(const Common& common, const std::string& argument, const ProbeArguments
     const Tools::ListReading reading = Tools::readRecordedList(file);
     if (reading.state == Tools::ListReading::State::good) {
         showList(common, reading.libraries);
-        return good;
+        return exitSuccess;
     }
     std::ifstream input;
     const std::wstring wrong = obstacle(file, input, reading.reason);
     if (wrong.empty())
         return showObjects(common, file, input, reading.reason, probe);
-    complain(widened(argument) + L": " + wrong);
-    return subjectIsWrong;
+    printError(toWide(argument) + L": " + wrong);
+    return exitFailure;
 }
 
 } // namespace Mz::Commands

@@ -41,7 +41,7 @@ class FileBytes {
         return value;
     }
 
-    /// Reads `length` bytes, at most the size of a block. Returns false if it cannot read all.
+    /// Reads `length` bytes, at most 8192. Returns false if it cannot read all of them.
     bool read(std::uint64_t offset, void* data, std::size_t length);
 
     /// Returns the NUL-terminated text at `offset`; `std::nullopt` if it is not terminated or has

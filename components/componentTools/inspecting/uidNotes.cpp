@@ -29,7 +29,7 @@ std::vector<Finding> UidNotes::notesOn(const std::vector<RecordedBuilder>& build
         if (found == offers.end())
             continue;
         const std::vector<std::size_t>& positions = found->second;
-        if (position != behindAll && positions.back() > position)
+        if (position != afterAll && positions.back() > position)
             note(Verdict::uidTaken, builder, positions.back());
         else if (positions.back() != position)
             note(Verdict::uidWins, builder, positions.back());

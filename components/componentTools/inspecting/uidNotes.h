@@ -19,7 +19,7 @@ class UidNotes {
 
     /// The position of a library that is not in the list. It counts as the last one, like a new
     /// library in the last folder of a host.
-    static constexpr std::size_t behindAll = static_cast<std::size_t>(-1);
+    static constexpr std::size_t afterAll = static_cast<std::size_t>(-1);
 
     /// Returns the notes on the builders of the library at `position`: `uidTaken` with the winner,
     /// `uidWins` with the last library that loses, and `uidNil`.

@@ -53,7 +53,7 @@ const wchar_t* loaderPathVariable();
 /// The result of `findDependency`.
 struct Located {
     bool found = false;
-    NativePath file; ///< empty if it was not found, or was found without a file
+    NativePath file; ///< valid only if `found`; empty if the library has no file
 };
 
 /// A library with dependencies, and the library that loads it.
@@ -105,7 +105,7 @@ struct ChildResult {
     };
     End end = End::notStarted;
     int status = 0;           ///< the exit status, if it exited
-    std::wstring words;       ///< the name of the crash, or why the child was not started
+    std::wstring detail;      ///< the name of the crash, or why the child was not started
     std::string output;       ///< its standard output
     std::uint64_t memory = 0; ///< the peak of its used memory, in bytes
 };

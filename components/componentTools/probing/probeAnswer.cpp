@@ -141,7 +141,7 @@ const wchar_t* nameOf(Stage stage) {
     case Stage::entryPoint: return L"its entry point";
     case Stage::describing: return L"its description";
     case Stage::enumerating: return L"enumerateBuilders";
-    default: return L"nothing of its own yet";
+    default: return L"the start of its process";
     }
 }
 

@@ -93,7 +93,7 @@ class Collector final : public QrEnumerator<QrCPtr<QrBuilderDescription>> {
     explicit Collector(std::vector<RecordedBuilder>& target) : builders(target) {}
 
     Action process(QrCPtr<QrBuilderDescription> item) override {
-        wrongItem = item ? L"an object that does not answer for it" : L"null";
+        wrongItem = item ? L"an object of another interface" : L"null";
         const auto description =
             QrCPtr<QrBuilderDescription>::adopt(safeCast<QrBuilderDescription>(item.get()));
         wrongItem = nullptr;

@@ -200,7 +200,7 @@ class Watch {
     void noteSignal(int number) {
         judgement.end = ChildResult::End::crashed;
         const wchar_t* name = signalName(number);
-        judgement.words = name ? name : L"signal " + std::to_wstring(number);
+        judgement.detail = name ? name : L"signal " + std::to_wstring(number);
     }
 
     void noteExit(int status) {
@@ -226,7 +226,7 @@ ChildResult runChild(const NativePath& program, const std::vector<NativePath>& a
     ChildResult failed;
     int ends[2];
     if (::pipe2(ends, O_CLOEXEC) != 0) {
-        failed.words = displayName(std::strerror(errno));
+        failed.detail = displayName(std::strerror(errno));
         return failed;
     }
     const Descriptor output(ends[0]);
@@ -236,7 +236,7 @@ ChildResult runChild(const NativePath& program, const std::vector<NativePath>& a
     const int failure = start(program, arguments, input.get(), child);
     input.close();
     if (failure) {
-        failed.words = displayName(program) + L": " + displayName(std::strerror(failure));
+        failed.detail = displayName(program) + L": " + displayName(std::strerror(failure));
         return failed;
     }
     return Watch(child, output.get(), limits).result();

@@ -150,7 +150,7 @@ class Watch {
             judgement.end = ChildResult::End::outOfMemory;
         } else if (status >= firstFault) {
             judgement.end = ChildResult::End::crashed;
-            judgement.words = faultName(status);
+            judgement.detail = faultName(status);
         } else {
             judgement.end = ChildResult::End::exited;
             judgement.status = static_cast<int>(status);
@@ -235,14 +235,14 @@ ChildResult runChild(const NativePath& program, const std::vector<NativePath>& a
     SECURITY_ATTRIBUTES inheritable{sizeof inheritable, nullptr, TRUE};
     Handle output, input;
     if (!::CreatePipe(output.out(), input.out(), &inheritable, 65536)) {
-        failed.words = L"no pipe";
+        failed.detail = L"no pipe";
         return failed;
     }
     ::SetHandleInformation(output.get(), HANDLE_FLAG_INHERIT, 0);
     const Handle job(newJob(limits.refused));
     PROCESS_INFORMATION process{};
     if (!start(program, arguments, input.get(), job.get(), process)) {
-        failed.words = displayName(program) + L": error " + std::to_wstring(::GetLastError());
+        failed.detail = displayName(program) + L": error " + std::to_wstring(::GetLastError());
         return failed;
     }
     const Handle child(process.hProcess), thread(process.hThread);
