@@ -17,7 +17,8 @@ if(WIN32)
   set(mzStripped)
   foreach(file IN LISTS MZ_RUNTIME_FILES)
     cmake_path(GET file FILENAME name)
-    execute_process(COMMAND ${CMAKE_STRIP} -o ${mzPackageFiles}/${name} ${file}
+    # With the times of the original: otherwise strip writes the present time into the file.
+    execute_process(COMMAND ${CMAKE_STRIP} --preserve-dates -o ${mzPackageFiles}/${name} ${file}
       COMMAND_ERROR_IS_FATAL ANY)
     list(APPEND mzStripped ${mzPackageFiles}/${name})
   endforeach()
@@ -46,7 +47,6 @@ set(CPACK_PACKAGE_FILE_NAME libMZcomponentManager-${PROJECT_VERSION}-windows-x86
 set(CPACK_PACKAGE_VENDOR "libMZcomponentManager authors")
 set(CPACK_RESOURCE_FILE_LICENSE ${PROJECT_SOURCE_DIR}/LICENSE)
 set(CPACK_MONOLITHIC_INSTALL ON)
-set(CPACK_STRIP_FILES ON)
 # CPack's script makes a program of 32 bits unless it names another target; where the system has no
 # 32-bit part, that program ends without a word and without having installed anything.
 set(CPACK_NSIS_DEFINES "Target amd64-unicode\n  SetDateSave off")

@@ -20,11 +20,11 @@ windows=$top/build/package-windows
 # compile PRESET
 compile() { (cd "$top" && cmake --preset "$1" && cmake --build --preset "$1"); }
 
-# stage BUILD NAME: installs into BUILD/stage/NAME, the content of an archive.
+# stage BUILD NAME [OPTION]: installs into BUILD/stage/NAME, the content of an archive.
 stage() {
   local folder=$1/stage/$2
   rm -rf "$1/stage"
-  cmake --install "$1" --strip --prefix "$folder"
+  cmake --install "$1" --prefix "$folder" "${@:3}"
   find "$folder" -exec touch --no-dereference --date="@$SOURCE_DATE_EPOCH" {} +
 }
 
@@ -48,7 +48,7 @@ make_debian() {
 make_linux_archive() {
   local name=libMZcomponentManager-$version-linux-x86_64
   compile package-linux
-  stage "$linux" "$name"
+  stage "$linux" "$name" --strip
   tar --sort=name --owner=0 --group=0 --numeric-owner --format=gnu -C "$linux/stage" -cf - "$name" |
     gzip -9n >"$output/$name.tar.gz"
 }
@@ -56,6 +56,7 @@ make_linux_archive() {
 make_windows() {
   local name=libMZcomponentManager-$version-windows-x86_64
   compile package-windows
+  # The linker has stripped already: strip would write the present time into each file.
   stage "$windows" "$name"
   rm -f "$output/$name.zip"
   (cd "$windows/stage" && find "$name" | sort | zip -X -9 -q -@ "$output/$name.zip")
