@@ -107,8 +107,8 @@ void ObjectTextOutput::begin(QrBufferedIO& io, TextKind kind, ObjectForm form,
 
 void ObjectTextOutput::beginData(QrBufferedIO& io, ObjectForm form) {
     if (form == ObjectForm::Mixed && last == Last::FormattedAndBlank)
-        refuse(__LINE__, "formatted text that ends in white space stands before binary data, whose "
-                         "beginning could not be found: leave the white space out");
+        refuse(__LINE__, "formatted text before binary data ends in white space, and the beginning "
+                         "of the data could not be found: leave the white space out");
     if (form == ObjectForm::Mixed && last != Last::LineEndOrData)
         io.writeEol();
     last = Last::LineEndOrData;
