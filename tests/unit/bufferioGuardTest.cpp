@@ -24,7 +24,7 @@ enum class Sync { Works, Fails, Throws };
 
 using Calls = std::vector<std::string>;
 
-/// Accepts and gives bytes, and notes each virtual call, whose flush does as it is told to.
+/// Accepts and gives bytes, and notes each virtual call. Its flush works, fails or throws.
 class NotingBuffer : public std::streambuf {
   public:
     NotingBuffer(Calls& calls, std::string name, Sync flushing, std::string input = {})
