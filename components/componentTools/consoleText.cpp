@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Escapes control characters by itself; the encoding of the terminal and the arguments are left to
 /// the platform layer.
 #include "components/componentTools/consoleText.h"

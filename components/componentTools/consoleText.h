@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Text and arguments of command lines: conversion between wide text and what a terminal shows.
 #pragma once
 

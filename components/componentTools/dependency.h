@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// A library that another one needs, as plain data.
 #pragma once
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// A linear search: lists have some thousand records at most, and callers look up one file.
 #include "components/componentTools/recordedLibrary.h"
 

@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// The records of a recorded list, as plain data.
 #pragma once
 

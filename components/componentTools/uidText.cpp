@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Writes the digits itself: the standard streams would use the locale's grouping.
 #include "components/componentTools/uidText.h"
 

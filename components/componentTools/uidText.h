@@ -1,3 +1,4 @@
+// SPDX-License-Identifier: BSL-1.0
 /// Uids as text for people.
 #pragma once
 
