@@ -112,6 +112,12 @@ moduleOrder)
     lower 'componentImp*' 'import.*|processControl' |
         complain "the manager stands below the importers"
     ;;
+licence)
+    # Each source names its licence in one of its first two lines.
+    for file in $(sources components examples tests tools benchmarks fuzz | grep -v '\.in$'); do
+        head -n 2 "$file" | grep -q 'SPDX-License-Identifier: BSL-1.0' || echo "$file"
+    done | complain "sources without a licence"
+    ;;
 headerCircles)
     # Every header after those that it includes, or there is a circle.
     for header in $(sources components | grep '\.h$'); do

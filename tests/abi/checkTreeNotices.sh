@@ -67,6 +67,8 @@ breaks moduleOrder $manager/bufferioInput.cpp '#include "components/componentMan
 breaks moduleOrder $manager/processControl.h '#include "components/componentManager/bufferio.h"'
 breaks moduleOrder $manager/componentImp.cpp '#include "components/componentManager/importer.h"'
 keeps moduleOrder $manager/importer.h '#include "components/componentManager/bufferio.h"'
+breaks licence $manager/a.cpp '#include <string>'
+keeps licence $manager/a.cpp '// SPDX-License-Identifier: BSL-1.0'
 keeps headerCircles $manager/a.h '#include "components/componentManager/b.h"'
 
 printf '#include "%s/b.h"\n' $manager >"$tree/$manager/a.h"
