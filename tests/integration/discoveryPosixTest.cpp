@@ -2,8 +2,9 @@
 /// What files are on Linux alone: pipes, links, and names that differ in letter case only.
 #include "components/componentKit/hostKit.h"
 #include "tests/integration/managerFixture.h"
-#include "tests/support/noMoreFiles.h"
+#include "tests/support/failingOpen.h"
 
+#include <cerrno>
 #include <clocale>
 #include <fcntl.h>
 #include <fstream>
@@ -308,7 +309,7 @@ TEST_F(PosixDiscovery, PassesOverATruncatedLibraryAtEveryPage) {
 }
 
 /// Holds back files while libraries are recorded, from the first that describes itself on.
-std::optional<NoMoreFiles> shortage;
+std::optional<FailingOpen> shortage;
 
 TEST_F(PosixDiscovery, NotesNothingOfAFileThatItCannotOpenForWantOfDescriptors) {
     add(L"goodByHand", "a.so");
@@ -320,7 +321,7 @@ TEST_F(PosixDiscovery, NotesNothingOfAFileThatItCannotOpenForWantOfDescriptors) 
     const std::uint32_t oldTime = recorded.fileTime;
     setHook([](const char* event) {
         if (std::string_view(event) == "enumerate")
-            shortage.emplace();
+            shortage.emplace(EMFILE);
     });
     initialize();
     setHook(nullptr);
@@ -354,7 +355,7 @@ TEST_F(PosixDiscovery, KeepsNoNoteOfARecordedFileThatItCannotOpenForWantOfDescri
     const QrBuilderDescription* const held = indexed(kitUid);
     ASSERT_TRUE(held);
     {
-        const NoMoreFiles none;
+        const FailingOpen none(ENOMEM);
         EXPECT_FALSE(manager->getBuilder(kitUid));
     }
     EXPECT_THAT(names(), IsEmpty());

@@ -4,8 +4,9 @@
 #include "components/platform/platform.h"
 #include "components/platform/upperCase.h"
 #include "tests/integration/managerFixture.h"
-#include "tests/support/noMoreFiles.h"
+#include "tests/support/failingOpen.h"
 
+#include <cerrno>
 #include <clocale>
 #include <dirent.h>
 #include <dlfcn.h>
@@ -34,6 +35,8 @@ extern "C" dirent* readdir(DIR* directory) {
 }
 
 namespace {
+
+constexpr const char* entryPoint = "QrGetComponentDescription";
 
 class PosixPlatform : public ::testing::Test {
   protected:
@@ -213,25 +216,30 @@ TEST_F(PosixPlatform, UsesWhatIsMappedThoughItsFileIsReplaced) {
     EXPECT_FALSE(findLoadedLibrary(file));
 }
 
-TEST_F(PosixPlatform, DoesNotKnowAFileThatItCannotOpenForWantOfDescriptors) {
-    TemporaryDirectory folder;
+TEST_F(PosixPlatform, DoesNotKnowAFileThatItCannotOpenForWantOfResources) {
     const std::filesystem::path file = builtComponent(L"goodByHand");
     const std::filesystem::path other = builtComponent(L"goodWithKit");
     const Module mapped = loadLibrary(other);
-    {
-        const Mz::Test::NoMoreFiles none;
-        EXPECT_EQ(queryExport(file, "QrGetComponentDescription"), ExportState::unknown);
-        EXPECT_FALSE(exportsFunction(file, "QrGetComponentDescription"));
-        const UsedLibrary used = useLibrary(file, "QrGetComponentDescription");
-        EXPECT_FALSE(used.module);
-        EXPECT_TRUE(used.unknown);
-        EXPECT_EQ(useLibrary(other, "QrGetComponentDescription").module, mapped);
+    for (const int error : {EMFILE, ENFILE, ENOMEM}) {
+        const Mz::Test::FailingOpen fails(error);
+        EXPECT_EQ(queryExport(file, entryPoint), ExportState::unknown) << error;
+        EXPECT_FALSE(exportsFunction(file, entryPoint)) << error;
+        const UsedLibrary used = useLibrary(file, entryPoint);
+        EXPECT_FALSE(used.module) << error;
+        EXPECT_TRUE(used.unknown) << error;
+        EXPECT_EQ(useLibrary(other, entryPoint).module, mapped) << error;
     }
     unloadLibrary(mapped);
-    EXPECT_EQ(queryExport(file, "QrGetComponentDescription"), ExportState::exported);
-    EXPECT_EQ(queryExport(folder.path() / "nothing", "QrGetComponentDescription"),
-              ExportState::absent);
-    EXPECT_FALSE(useLibrary(folder.path() / "nothing", "QrGetComponentDescription").unknown);
+    EXPECT_EQ(queryExport(file, entryPoint), ExportState::exported);
+}
+
+TEST_F(PosixPlatform, KnowsThatAFileItMayNotOrCannotOpenIsNoLibrary) {
+    const std::filesystem::path file = builtComponent(L"goodByHand");
+    for (const int error : {EACCES, ENOENT, ELOOP, EIO}) {
+        const Mz::Test::FailingOpen fails(error);
+        EXPECT_EQ(queryExport(file, entryPoint), ExportState::absent) << error;
+        EXPECT_FALSE(useLibrary(file, entryPoint).unknown) << error;
+    }
 }
 
 TEST_F(PosixPlatform, DoesNotWaitForAPipeItIsToLookInto) {
