@@ -26,5 +26,6 @@ class SomePart final : public QrCastRef<QrCastHeap<QrCastImpl<SomePart, Part>>> 
 } // namespace Mz::Benchmarks
 
 MZ_COMPONENT(L"Generated", L"One of many component libraries",
-             Mz::Kit::builderOf<Mz::Benchmarks::SomePart>({.uid = Mz::Benchmarks::ownUid,
-                                                           .name = L"generated part"}))
+             Mz::Kit::builderOf<Mz::Benchmarks::SomePart>(
+                 {.uid = Mz::Kit::BuilderUid::atRunTime(Mz::Benchmarks::ownUid),
+                  .name = L"generated part"}))
