@@ -204,8 +204,8 @@ class QrCastRef : public Base {
 /// The base of a companion: a counted object that implements an interface for its owner. It owns a
 /// reference to the owner. `Base` supplies the interface and the reference count.
 ///
-/// The companion supports the uid of its own interface and passes all other uids to the owner.
-/// `hasInterface` returns the owner's result. The principal object is that of the owner.
+/// The companion answers for the uid of the companion's interface and passes other uids to the
+/// owner. `hasInterface` returns the owner's result. The principal object is that of the owner.
 ///
 /// `destroy` deletes the companion, then calls `destroy` of the owner, then releases the owner. Do
 /// not call it if the owner's `destroy` deletes the owner: the release would follow the deletion.

@@ -48,7 +48,7 @@ class Form : public ObjectsOn<Stream> {
         }
     }
 
-    /// Whether each piece of formatted text can be told from what is next to it.
+    /// Whether each piece of formatted text is distinguishable from what is next to it.
     static bool isSeparated(const std::wstring& name) {
         for (std::size_t at = 1; at < name.size(); ++at) {
             const bool open = name[at - 1] == L'f' || name[at - 1] == L'l';
@@ -64,7 +64,7 @@ class Form : public ObjectsOn<Stream> {
 TYPED_TEST_SUITE(Form, StreamKinds);
 
 TYPED_TEST(Form, OfEveryValueNextToEveryOtherComesBackOrIsRefused) {
-    // In binary data formatted text has no end of its own.
+    // In binary data nothing marks the end of formatted text.
     const std::wstring letters = this->isBinary ? L"idbeoICBWS"
                                  : this->isText ? L"idbeofglICB"
                                                 : L"idbeofglICBWS";

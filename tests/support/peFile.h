@@ -42,7 +42,7 @@ constexpr std::size_t functionCount = 20, nameCount = 24, functions = 28, names 
 
 } // namespace PeField
 
-/// The headers of a library, whoever linked it.
+/// The headers of a library, from any linker.
 inline std::size_t headerOf(const std::string& content) {
     return getAt<std::uint32_t>(content, 0x3C);
 }

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Writes to what it did not open more than anybody wants to read.
+/// Writes 100 MiB to descriptors that it did not open.
 #include "tests/support/testSystem.h"
 #include "tests/tools/components/enumerates.h"
 
