@@ -28,6 +28,16 @@ foreach(target gtest gtest_main gmock gmock_main)
   endif()
 endforeach()
 
+# GoogleTest's headers are parsed once for all test programs: they were a third of the time that it
+# takes to compile the tests. Nothing else is in here, so that each source names what it uses; the
+# Clang build compiles without it and notices a source that does not.
+add_library(mzTestHeaders OBJECT ${PROJECT_SOURCE_DIR}/tests/support/testHeaders.cpp)
+target_link_libraries(mzTestHeaders PRIVATE mzCompile mzTestCode GTest::gmock)
+target_precompile_headers(mzTestHeaders PRIVATE <gmock/gmock.h> <gtest/gtest.h>)
+# With the options of a program, or a program cannot use what this target precompiles.
+set_target_properties(mzTestHeaders PROPERTIES POSITION_INDEPENDENT_CODE OFF)
+target_compile_options(mzTestHeaders PRIVATE ${CMAKE_CXX_COMPILE_OPTIONS_PIE})
+
 # The build's name stands before the name of each test: one summary counts all builds.
 get_filename_component(MZ_BUILD_NAME ${PROJECT_BINARY_DIR} NAME)
 
@@ -46,6 +56,12 @@ function(mz_add_test_program name)
   add_executable(${name} ${arg_UNPARSED_ARGUMENTS})
   mz_link_manager(${name} ${arg_INTERNALS})
   target_link_libraries(${name} PRIVATE mzCompile mzTestCode mzTestSupport GTest::gmock)
+  target_precompile_headers(${name} REUSE_FROM mzTestHeaders)
+  # In precompiled headers GCC 12 forgets which ones are the system's, and warns of the library's own
+  # strings.
+  if(CMAKE_CXX_COMPILER_ID STREQUAL "GNU")
+    target_compile_options(${name} PRIVATE -Wno-array-bounds -Wno-restrict -Wno-stringop-overflow)
+  endif()
 endfunction()
 
 # mz_link_manager(PROGRAM INTERNALS): links libMZcomponentManager as it is shipped, or, if INTERNALS,

@@ -85,5 +85,5 @@ make_packages() {
     "$top/packaging/checkArchives.sh" "$packages" "$checks/archives"
   say "made, the same twice, and used; in ${packages#"$PWD"/}:"
   (cd "$packages" && du -h --apparent-size -- *.deb *.tar.gz *.zip *.exe)
-  say "with an SPDX list beside each and SHA256SUMS"
+  finish "package: made twice alike, and tried; each with an SPDX list, all in SHA256SUMS"
 }

@@ -11,8 +11,8 @@
 #include "components/componentManager/control/systemController.h"
 #include "components/componentManager/support/noDestructor.h"
 #include "components/platform/platform.h"
+#include "components/platform/searchPath.h"
 
-#include <algorithm>
 #include <iostream>
 #include <limits>
 #include <string_view>
@@ -43,11 +43,9 @@ bool ignoresSearchPath(std::wstring_view name) {
 /// Returns the first regular file "directory/name" along `searchPath`, or an empty string.
 std::wstring findAlong(std::wstring_view searchPath, std::wstring_view name) {
     while (true) {
-        searchPath.remove_prefix(std::min(searchPath.find_first_not_of(L';'), searchPath.size()));
-        if (searchPath.empty())
+        std::wstring_view directory = platform::takeDirectory(searchPath);
+        if (directory.empty())
             return {};
-        std::wstring_view directory = searchPath.substr(0, searchPath.find(L';'));
-        searchPath.remove_prefix(directory.size());
         while (!directory.empty() && isSlash(directory.back()))
             directory.remove_suffix(1);
         std::wstring candidate(directory);

@@ -6,24 +6,18 @@
 /// sequence, so that a valid sequence after it is not lost.
 #include "components/componentManager/utf8.h"
 
+#include "components/base/surrogates.h"
+
 #include <cstdint>
 
 namespace Mz {
 
+using namespace detail;
+
 namespace {
 
-constexpr bool usesSurrogates = sizeof(wchar_t) == 2;
-
-bool isHigh(std::uint32_t unit) {
-    return unit >= 0xD800 && unit < 0xDC00;
-}
-
-bool isLow(std::uint32_t unit) {
-    return unit >= 0xDC00 && unit < 0xE000;
-}
-
 void append(std::string& result, std::uint32_t code) {
-    if (code > 0x10FFFF || isHigh(code) || isLow(code))
+    if (code > lastCodePoint || isHighSurrogate(code) || isLowSurrogate(code))
         code = 0xFFFD;
     const auto byte = [&](std::uint32_t value) { result += static_cast<char>(value); };
     const auto rest = [&](int shift) { byte(0x80 | (code >> shift & 0x3F)); };
@@ -41,15 +35,6 @@ void append(std::string& result, std::uint32_t code) {
         rest(12);
         rest(6);
         rest(0);
-    }
-}
-
-void append(std::wstring& result, std::uint32_t code) {
-    if (usesSurrogates && code > 0xFFFF) {
-        result += static_cast<wchar_t>(0xD800 + ((code - 0x10000) >> 10));
-        result += static_cast<wchar_t>(0xDC00 + ((code - 0x10000) & 0x3FF));
-    } else {
-        result += static_cast<wchar_t>(code);
     }
 }
 
@@ -78,8 +63,8 @@ std::uint32_t take(std::string_view& bytes) {
     }
     // A sequence that is longer than necessary is invalid.
     constexpr std::uint32_t minimum[] = {0, 0, 0x80, 0x800, 0x10000};
-    const bool valid =
-        length > 0 && code >= minimum[length] && code <= 0x10FFFF && !isHigh(code) && !isLow(code);
+    const bool valid = length > 0 && code >= minimum[length] && code <= lastCodePoint &&
+                       !isHighSurrogate(code) && !isLowSurrogate(code);
     bytes.remove_prefix(valid ? length : 1);
     return valid ? code : invalid;
 }
@@ -90,10 +75,9 @@ std::string toUtf8(std::wstring_view text) {
     std::string result;
     for (std::size_t index = 0; index < text.size(); ++index) {
         const auto unit = static_cast<std::uint32_t>(text[index]);
-        if (isHigh(unit) && index + 1 < text.size() &&
-            isLow(static_cast<std::uint32_t>(text[index + 1]))) {
-            const auto low = static_cast<std::uint32_t>(text[++index]);
-            append(result, 0x10000 + ((unit - 0xD800) << 10) + (low - 0xDC00));
+        if (isHighSurrogate(unit) && index + 1 < text.size() &&
+            isLowSurrogate(static_cast<std::uint32_t>(text[index + 1]))) {
+            append(result, joinSurrogates(unit, static_cast<std::uint32_t>(text[++index])));
         } else {
             append(result, unit);
         }
@@ -105,7 +89,7 @@ std::wstring fromUtf8(std::string_view bytes) {
     std::wstring result;
     while (!bytes.empty()) {
         const std::uint32_t code = take(bytes);
-        append(result, code == invalid ? 0xFFFD : code);
+        appendCodePoint(result, code == invalid ? 0xFFFD : code);
     }
     return result;
 }

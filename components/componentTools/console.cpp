@@ -5,6 +5,7 @@
 #include "components/componentTools/console.h"
 
 #include "components/base/assertions.h"
+#include "components/base/surrogates.h"
 #include "components/componentManager/nativeText.h"
 #include "components/componentTools/consoleText.h"
 #include "components/componentTools/platform/system.h"
@@ -68,7 +69,8 @@ std::pair<std::wstring, std::size_t> fitted(const std::wstring& text, std::size_
         taken += columns;
     }
     // Do not split a surrogate pair.
-    if (length > 0 && length < text.size() && (text[length - 1] & ~wchar_t{0x3FF}) == 0xD800)
+    if (length > 0 && length < text.size() &&
+        detail::isHighSurrogate(std::char_traits<wchar_t>::to_int_type(text[length - 1])))
         --length, --taken;
     return {text.substr(0, length), taken};
 }
@@ -110,10 +112,12 @@ bool ConsoleController::warning(int, const wchar_t* text) {
 }
 
 bool ConsoleController::isProgressShown() {
-    return true;
+    return progressShown;
 }
 
 bool ConsoleController::progress(float fraction, const wchar_t* text) {
+    if (!progressShown)
+        return !interrupted;
     const float part = std::isnan(fraction) ? 0.0f : std::clamp(fraction, 0.0f, 1.0f);
     const int percent = static_cast<int>(static_cast<double>(part) * 100.0 + 0.001);
     if (onTerminal) {
@@ -164,6 +168,10 @@ void ConsoleController::abort(int, const wchar_t* text) {
 std::wstring ConsoleController::findFile(const wchar_t* fileName, const wchar_t* searchPath,
                                          const wchar_t* fallbackSearchPath) {
     return previous ? previous->findFile(fileName, searchPath, fallbackSearchPath) : std::wstring();
+}
+
+void ConsoleController::showProgress(bool show) {
+    progressShown = show;
 }
 
 int ConsoleController::errorCount() const {

@@ -48,8 +48,9 @@ class MZ_COMPONENT_TOOLS_API ConsoleController final
     bool isInterrupted() override;
     /// Returns false after Ctrl-C, else true.
     bool warning(int code, const wchar_t* text) override;
+    /// Returns true, unless progress is hidden.
     bool isProgressShown() override;
-    /// Shows progress.
+    /// Shows progress, unless it is hidden.
     /// \param fraction  is clamped to 0 … 1; NaN counts as 0
     /// \param text      may be null
     /// \return false after Ctrl-C, else true
@@ -67,6 +68,9 @@ class MZ_COMPONENT_TOOLS_API ConsoleController final
     std::wstring findFile(const wchar_t* fileName, const wchar_t* searchPath,
                           const wchar_t* fallbackSearchPath) override;
 
+    /// Shows progress, the default, or hides it.
+    void showProgress(bool show);
+
     /// Returns the number of errors that were reported.
     int errorCount() const;
 
@@ -79,6 +83,7 @@ class MZ_COMPONENT_TOOLS_API ConsoleController final
 
     std::ostream& out;
     bool onTerminal;
+    bool progressShown = true;
     QrProcessControl* previous;
     std::size_t shownWidth = 0;
     int lastTenth = -1;

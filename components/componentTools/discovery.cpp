@@ -11,6 +11,7 @@
 #include "components/componentTools/recordedList.h"
 #include "components/platform/pathNormaliser.h"
 #include "components/platform/platform.h"
+#include "components/platform/searchPath.h"
 
 #include <map>
 #include <system_error>
@@ -28,7 +29,7 @@ std::filesystem::path fullPathOf(const std::filesystem::path& path) {
 
 /// Returns whether a search path can contain the folder.
 bool isSearchable(const std::wstring& folder) {
-    return folder.find(L';') == std::wstring::npos;
+    return folder.find(platform::searchPathSeparator<wchar_t>) == std::wstring::npos;
 }
 
 class Discoverer {
@@ -112,24 +113,21 @@ class Discoverer {
 } // namespace
 
 std::vector<std::filesystem::path> foldersOf(const std::filesystem::path& searchPath) {
-    using Text = std::filesystem::path::string_type;
+    using Text = std::basic_string_view<std::filesystem::path::value_type>;
     std::vector<std::filesystem::path> folders;
-    const Text& text = searchPath.native();
-    for (std::size_t start = 0; start <= text.size();) {
-        const std::size_t end = std::min(text.find(Text::value_type(';'), start), text.size());
-        if (end > start)
-            folders.push_back(fullPathOf(text.substr(start, end - start)));
-        start = end + 1;
-    }
+    Text rest = searchPath.native();
+    for (Text folder; !(folder = platform::takeDirectory(rest)).empty();)
+        folders.push_back(fullPathOf(folder));
     return folders;
 }
 
 std::wstring searchPathOf(const std::vector<std::filesystem::path>& folders) {
+    constexpr wchar_t separator[] = {platform::searchPathSeparator<wchar_t>, L'\0'};
     std::wstring searchPath;
     for (const std::filesystem::path& folder : folders) {
         const std::optional<std::wstring> name = toWideName(folder);
         if (name && isCarried(*name) && isSearchable(*name))
-            searchPath += (searchPath.empty() ? L"" : L";") + *name;
+            searchPath += (searchPath.empty() ? L"" : separator) + *name;
     }
     return searchPath;
 }

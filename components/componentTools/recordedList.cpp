@@ -1,13 +1,14 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Reads the list with the same stream class as the manager, but checks everything that the manager
-/// trusts. Counts in the file are not used to allocate memory, because a damaged file may contain
-/// any number.
+/// Reads the list in the manager's format (`recordFormat.h`) and with its stream class, but checks
+/// everything that the manager trusts. Counts in the file are not used to allocate memory, because
+/// a damaged file may contain any number.
 #include "components/componentTools/recordedList.h"
 
 #include "components/componentManager/binaryStream.h"
 #include "components/componentManager/bufferio.h"
 #include "components/componentManager/files.h"
 #include "components/componentManager/nativeText.h"
+#include "components/componentManager/recordFormat.h"
 #include "components/componentTools/records/openPatiently.h"
 #include "components/componentTools/records/verdictsFile.h"
 #include "components/platform/characters.h"
@@ -22,7 +23,7 @@ namespace Mz::Tools {
 
 namespace {
 
-/// Reads a list and validates every value.
+/// Reads a list and validates every value. The functions for fields are those of a codec.
 class ListReader {
   public:
     explicit ListReader(std::istream& input) : buffer(&input), stream(&buffer) {}
@@ -43,56 +44,57 @@ class ListReader {
 
     std::int64_t position() { return buffer.tell(); }
 
-  private:
-    RecordedLibrary readLibrary() {
-        RecordedLibrary library;
-        library.position = position();
-        library.directory = readName();
-        library.fileName = readName();
-        int64 size = 0;
-        unsigned int count = 0;
-        stream >> library.time >> size >> count;
-        if (size < 0)
+    template <class Value>
+    void value(Value& field) {
+        stream >> field;
+    }
+
+    /// The only value with a sign is the size.
+    void value(int64& field) {
+        stream >> field;
+        if (field < 0)
             throw std::runtime_error("a negative size");
-        library.size = size;
-        // Read one by one: the count may be wrong. Builders are stored in reverse order.
-        for (; count > 0; --count)
-            library.builders.push_back(readBuilder());
-        std::reverse(library.builders.begin(), library.builders.end());
-        return library;
     }
 
-    RecordedBuilder readBuilder() {
-        RecordedBuilder builder;
-        builder.position = position();
-        stream >> builder.uid;
-        builder.name = readText();
-        builder.label = readText();
-        builder.text = readText();
-        unsigned char flag = 0;
-        stream >> flag >> builder.number;
-        if (flag > 1)
-            throw std::runtime_error("a flag that is neither true nor false");
-        builder.flag = flag != 0;
-        return builder;
-    }
-
-    std::wstring readText() {
-        std::wstring text;
-        stream >> text;
-        if (text.find(L'\0') != std::wstring::npos)
+    void text(std::wstring& field) {
+        stream >> field;
+        if (field.find(L'\0') != std::wstring::npos)
             throw std::runtime_error("a text with a NUL");
-        return text;
     }
 
     /// Reads a normalised name. It may contain a backslash, which is an ordinary character in file
     /// names on Linux.
-    std::wstring readName() {
-        std::wstring name = readText();
-        if (name.empty() || name.find(L'/') != std::wstring::npos ||
-            platform::lowerCase(name) != name)
+    void name(std::wstring& field) {
+        text(field);
+        if (field.empty() || field.find(L'/') != std::wstring::npos ||
+            platform::lowerCase(field) != field)
             throw std::runtime_error("a name that is not in its normal form");
-        return name;
+    }
+
+    void flag(bool& field) {
+        unsigned char stored = 0;
+        stream >> stored;
+        if (stored > 1)
+            throw std::runtime_error("a flag that is neither true nor false");
+        field = stored != 0;
+    }
+
+  private:
+    RecordedLibrary readLibrary() {
+        RecordedLibrary library;
+        library.position = position();
+        int64 size = 0;
+        unsigned int count = 0;
+        detail::codeLibrary(*this, library.directory, library.fileName, library.time, size, count);
+        library.size = size;
+        // Read one by one: the count may be wrong.
+        for (; count > 0; --count) {
+            RecordedBuilder& builder = library.builders.emplace_back();
+            builder.position = position();
+            detail::codeBuilder(*this, builder);
+        }
+        std::reverse(library.builders.begin(), library.builders.end());
+        return library;
     }
 
     QrInBuffer buffer;
@@ -101,18 +103,9 @@ class ListReader {
 
 void write(QrStream& stream, const RecordedLibraries& libraries) {
     stream.write(static_cast<int>(libraries.size()), 1);
-    for (const RecordedLibrary& library : libraries) {
-        stream << library.directory << library.fileName << library.time
-               << static_cast<int64>(library.size)
-               << static_cast<unsigned int>(library.builders.size());
-        // In reverse order: this is the format of all existing lists.
-        for (auto builder = library.builders.rbegin(); builder != library.builders.rend();
-             ++builder) {
-            stream << builder->uid;
-            stream << builder->name << builder->label << builder->text << builder->flag
-                   << builder->number;
-        }
-    }
+    for (const RecordedLibrary& library : libraries)
+        detail::writeRecord(stream, library.directory, library.fileName, library.time, library.size,
+                            library.builders);
 }
 
 } // namespace

@@ -4,48 +4,31 @@
 /// joined when written and split when read where `wchar_t` has 16 bits, so files are portable.
 #include "components/objectIO/objectIO.h"
 
+#include "components/base/surrogates.h"
+
 #include <cstdint>
 #include <vector>
 
 namespace Mz {
 
+using namespace detail;
+
 namespace {
 
 constexpr const char* source = "components/objectIO/exactText";
-
-/// Whether characters beyond 16 bits are surrogate pairs. On streams each is one code.
-constexpr bool wideCharactersArePairs = sizeof(wchar_t) == 2;
-
-bool isHighHalf(std::uint32_t code) {
-    return code >= 0xD800 && code < 0xDC00;
-}
-
-bool isLowHalf(std::uint32_t code) {
-    return code >= 0xDC00 && code < 0xE000;
-}
 
 std::vector<std::uint32_t> codesOf(const std::wstring& text) {
     std::vector<std::uint32_t> codes;
     codes.reserve(text.size());
     for (const wchar_t character : text) {
         const auto code = static_cast<std::uint32_t>(character);
-        if (wideCharactersArePairs && !codes.empty() && isHighHalf(codes.back()) && isLowHalf(code))
-            codes.back() = 0x10000 + ((codes.back() - 0xD800) << 10) + (code - 0xDC00);
+        if (wideTextHasSurrogates && !codes.empty() && isHighSurrogate(codes.back()) &&
+            isLowSurrogate(code))
+            codes.back() = joinSurrogates(codes.back(), code);
         else
             codes.push_back(code);
     }
     return codes;
-}
-
-void append(std::wstring& text, std::uint32_t code) {
-    if (!wideCharactersArePairs || code < 0x10000) {
-        text += static_cast<wchar_t>(code);
-        return;
-    }
-    if (code > 0x10FFFF)
-        throw QrStreamEx::ExReadError(source, __LINE__, "the code of a character is above 10FFFF");
-    text += static_cast<wchar_t>(0xD800 + ((code - 0x10000) >> 10));
-    text += static_cast<wchar_t>(0xDC00 + ((code - 0x10000) & 0x3FF));
 }
 
 } // namespace
@@ -66,7 +49,10 @@ std::wstring QrReadExactText(QrStream& stream) {
     for (; count > 0; --count) {
         std::uint32_t code = 0;
         stream >> code;
-        append(text, code);
+        if (wideTextHasSurrogates && code > lastCodePoint)
+            throw QrStreamEx::ExReadError(source, __LINE__,
+                                          "the code of a character is above 10FFFF");
+        appendCodePoint(text, code);
     }
     return text;
 }

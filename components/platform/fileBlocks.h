@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Small reads from a file that may be damaged or hostile, for the readers of library formats.
-/// Private to the platform layer.
+/// Small reads from a file that may be damaged or hostile, for the readers of library formats:
+/// those of this layer and those of libMZcomponentTools.
 #pragma once
 
 #include <array>

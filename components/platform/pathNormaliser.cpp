@@ -7,9 +7,11 @@
 #include "components/platform/pathNormaliser.h"
 
 #include "components/platform/platform.h"
+#include "components/platform/searchPath.h"
 
 #include <algorithm>
 #include <string_view>
+#include <utility>
 
 namespace Mz {
 
@@ -81,14 +83,11 @@ std::wstring normalisePath(const wchar_t* path, bool listMode) {
     if (!listMode) {
         appendEntry(rest, result);
     } else {
-        const auto isSemicolon = [](wchar_t c) { return c == L';'; };
-        const auto isOther = [](wchar_t c) { return c != L';'; };
-        takeWhile(rest, isSemicolon);
-        while (!rest.empty()) {
-            appendEntry(takeWhile(rest, isOther), result);
-            takeWhile(rest, isSemicolon);
-            if (!rest.empty())
-                result += L';';
+        bool isFirst = true;
+        for (std::wstring_view next; !(next = platform::takeDirectory(rest)).empty();) {
+            if (!std::exchange(isFirst, false))
+                result += platform::searchPathSeparator<wchar_t>;
+            appendEntry(next, result);
         }
     }
     return platform::lowerCase(result.empty() ? std::wstring(L".") : std::move(result));

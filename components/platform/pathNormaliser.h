@@ -20,9 +20,8 @@ namespace Mz {
 /// The recorded lists of users contain these forms. They must never change.
 ///
 /// \param path  the path; for null the result is an empty string
-/// \param listMode  whether `path` is a list, separated by ';'. Then each element is normalised,
-/// runs
-///     of ';' become one, and those at the ends are removed.
+/// \param listMode  whether `path` is a search path (`searchPath.h`). Then each element is
+///     normalised, runs of ';' become one, and those at the ends are removed.
 std::wstring normalisePath(const wchar_t* path, bool listMode);
 
 } // namespace Mz

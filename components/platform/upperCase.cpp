@@ -7,6 +7,8 @@
 /// and the long s, for example, are not mapped.
 #include "components/platform/upperCase.h"
 
+#include "components/base/surrogates.h"
+
 #include <algorithm>
 #include <cstdint>
 #include <iterator>
@@ -103,8 +105,8 @@ std::u16string sortKey(std::wstring_view name) {
         if (code < 0x10000) {
             key += upperCase(static_cast<char16_t>(code));
         } else { // Surrogates have no case.
-            key += static_cast<char16_t>(0xD800 + ((code - 0x10000) >> 10 & 0x3FF));
-            key += static_cast<char16_t>(0xDC00 + (code & 0x3FF));
+            key += detail::highSurrogate(code);
+            key += detail::lowSurrogate(code);
         }
     }
     return key;

@@ -15,7 +15,6 @@
 ///
 /// The exit status is 0 if every file was imported, saved and loaded, else 1.
 #include "console/console.h"
-#include "console/consoleController.h"
 #include "host/description.h"
 #include "host/savedFiles.h"
 #include "mesh.h"
@@ -24,6 +23,8 @@
 
 #include "components/componentKit/hostKit.h"
 #include "components/componentManager/componentImp.h"
+#include "components/componentTools/console.h"
+#include "components/componentTools/consoleText.h"
 
 #include <algorithm>
 #include <exception>
@@ -33,6 +34,7 @@
 
 using namespace Mz;
 using namespace Meshes;
+using Tools::ConsoleController;
 
 namespace {
 
@@ -45,7 +47,7 @@ struct Options {
     std::vector<std::filesystem::path> files;
 };
 
-Options parseOptions(const std::vector<std::filesystem::path>& arguments) {
+Options parseOptions(const std::vector<std::string>& arguments) {
     Options options;
     const std::pair<const char*, std::filesystem::path*> paths[] = {
         {"--components", &options.components},
@@ -58,9 +60,9 @@ Options parseOptions(const std::vector<std::filesystem::path>& arguments) {
         if (arguments[index] == "--progress")
             options.showProgress = true;
         else if (named != std::end(paths) && index + 1 < arguments.size())
-            *named->second = arguments[++index];
+            *named->second = Tools::pathOf(arguments[++index]);
         else
-            options.files.push_back(arguments[index]);
+            options.files.push_back(Tools::pathOf(arguments[index]));
     }
     if (options.components.empty())
         options.components = Kit::programFolder() / ".." / "components" / "mesh";
@@ -183,10 +185,14 @@ void run(const Options& options, ConsoleController& controller) {
 
 int main(int argc, char** argv) {
     console::useBinaryOutput();
-    const Options options = parseOptions(console::arguments(argc, argv));
-    ConsoleController controller(options.showProgress);
+    const Options options = parseOptions(Tools::argumentsOfProcess(argc, argv));
+    ConsoleController controller;
+    controller.showProgress(options.showProgress);
+    QrProcessControl* const previous = QrGetSystemProcessController();
+    QrSetSystemProcessController(&controller);
     attempt(controller, options.components, [&] { run(options, controller); });
     if (!std::cout.flush())
         controller.error(0, L"the output could not be written");
+    QrSetSystemProcessController(previous);
     return controller.errorCount() == 0 ? 0 : 1;
 }

@@ -9,6 +9,7 @@
 #include "components/componentManager/nativeText.h"
 
 #include "components/platform/pathNormaliser.h"
+#include "components/platform/searchPath.h"
 
 #include <functional>
 #include <iterator>
@@ -37,12 +38,10 @@ std::vector<std::wstring> directoriesOf(const wchar_t* searchPath) {
     std::vector<std::wstring> directories;
     std::wstring_view rest(textOrEmpty(searchPath));
     while (true) {
-        rest.remove_prefix(std::min(rest.find_first_not_of(L';'), rest.size()));
-        if (rest.empty())
+        const std::wstring_view directory = platform::takeDirectory(rest);
+        if (directory.empty())
             break;
-        const std::wstring_view directory = rest.substr(0, rest.find(L';'));
         directories.emplace_back(directory);
-        rest.remove_prefix(directory.size());
     }
     if (directories.empty())
         if (std::optional<std::wstring> directory = programDirectory())

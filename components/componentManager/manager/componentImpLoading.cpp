@@ -6,7 +6,7 @@
 /// exception may be in the library itself. Therefore each reference is released explicitly, and a
 /// library is unloaded only after the exception is destroyed.
 #include "components/componentManager/manager/componentImpPrivate.h"
-#include "components/componentManager/nativeText.h"
+#include "components/componentManager/recordFormat.h"
 
 #include <cxxabi.h>
 #include <type_traits>
@@ -67,12 +67,7 @@ class AddBuilders final : public QrEnumerator<QrCPtr<QrBuilderDescription>> {
     ComponentManager::Builder recordOf(const QrBuilderDescription& description) const {
         ComponentManager::Builder record;
         record.library = &library;
-        record.uid = description.getUid();
-        record.name = textOrEmpty(description.getName());
-        record.label = textOrEmpty(description.getLabel());
-        record.text = textOrEmpty(description.getText());
-        record.number = description.getNumber();
-        record.flag = description.getFlag();
+        detail::copyDescription(description, record);
         return record;
     }
 
@@ -165,12 +160,10 @@ ComponentManager::registerLibrary(ComponentLibrary& library, const platform::Fil
 
 void ComponentManager::readDescription(ComponentLibrary& library,
                                        QrComponentDescription& description) {
-    library.descriptionValue = description.getComponentValue();
-    library.componentText2 = textOrEmpty(description.getComponentText());
-    library.componentText1 = textOrEmpty(description.getComponentLabel());
-    // The count may be wrong, so nothing is reserved. Records are allocated one by one and never
-    // move. The call is part of the fixed sequence.
-    static_cast<void>(description.getBuilderCount());
+    // The announced count may be wrong, so nothing is reserved. Records are allocated one by one
+    // and never move.
+    static_cast<void>(detail::copyDescription(description, library.descriptionValue,
+                                              library.componentText2, library.componentText1));
     AddBuilders adder(*this, library);
     description.enumerateBuilders(adder);
 }

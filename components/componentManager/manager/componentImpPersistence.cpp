@@ -1,11 +1,10 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Writes and reads the recorded list.
-///
-/// The order of the fields is the stored format and must not change. A list may come from a damaged
-/// file, so counts in it only end loops: records are created one by one as they are read, and a
-/// record that cannot be read completely is reset, so that its file is recorded anew.
+/// Writes and reads the recorded list, in the format of `recordFormat.h`. A list may come from a
+/// damaged file, so counts in it only end loops: records are created one by one as they are read,
+/// and a record that cannot be read completely is reset, so that its file is recorded anew.
 #include "components/componentManager/manager/componentImpPrivate.h"
 
+#include "components/componentManager/recordFormat.h"
 #include "components/componentManager/stream.h"
 
 namespace Mz {
@@ -16,46 +15,36 @@ constexpr const char* source = "components/componentManager/componentImp";
 
 constexpr QrUid classUid{0x0C3F6A00, 0xADC511D1, 0x988AFC24, 0x07C10E27};
 
-void writeBuilder(QrStream& stream, const ComponentManager::Builder& builder) {
-    stream << builder.uid;
-    stream << builder.name << builder.label << builder.text << builder.flag << builder.number;
-}
+/// Reads the fields of records.
+struct RecordReader {
+    QrStream& stream;
 
-void writeLibrary(QrStream& stream, const ComponentLibrary& library) {
-    stream << library.directory << library.fileName << library.fileTime << library.fileSize
-           << static_cast<unsigned int>(library.builders.size());
-    // Last to first: this order is part of the stored format.
-    for (std::size_t index = library.builders.size(); index-- > 0;)
-        writeBuilder(stream, library.builders[index]);
-}
-
-/// Reads a text of a record, and throws if it contains a NUL. No name or path contains one. A NUL
-/// that is read as a character is not consumed, so it would fill a text of any claimed length, and
-/// a small file could claim many long texts.
-void readText(QrStream& stream, std::wstring& text) {
-    stream >> text;
-    if (text.find(L'\0') != std::wstring::npos)
-        throw QrStreamEx::ExReadError(source, __LINE__);
-}
-
-void readBuilder(QrStream& stream, ComponentManager::Builder& builder) {
-    stream >> builder.uid;
-    readText(stream, builder.name);
-    readText(stream, builder.label);
-    readText(stream, builder.text);
-    stream >> builder.flag >> builder.number;
-}
+    template <class Value>
+    void value(Value& field) {
+        stream >> field;
+    }
+    void flag(bool& field) { stream >> field; }
+    void name(std::wstring& field) { text(field); }
+    /// Throws if the text contains a NUL. No name or path contains one. A NUL that is read as a
+    /// character is not consumed, so it would fill a text of any claimed length, and a small file
+    /// could claim many long texts.
+    void text(std::wstring& field) {
+        stream >> field;
+        if (field.find(L'\0') != std::wstring::npos)
+            throw QrStreamEx::ExReadError(source, __LINE__);
+    }
+};
 
 void readLibrary(QrStream& stream, ComponentLibrary& library) {
+    RecordReader reader{stream};
     unsigned int count = 0;
-    readText(stream, library.directory);
-    readText(stream, library.fileName);
-    stream >> library.fileTime >> library.fileSize >> count;
+    detail::codeLibrary(reader, library.directory, library.fileName, library.fileTime,
+                        library.fileSize, count);
     // The count may be wrong, so nothing is reserved.
     for (; count > 0; --count) {
         ComponentManager::Builder& builder = library.builders.emplace_back();
         builder.library = &library;
-        readBuilder(stream, builder);
+        detail::codeBuilder(reader, builder);
     }
     library.builders.reverse();
 }
@@ -67,7 +56,8 @@ void ComponentManager::writeRecords(QrStream& stream) {
         return;
     stream.write(static_cast<int>(libraries.size()), 1);
     for (const ComponentLibrary& library : libraries)
-        writeLibrary(stream, library);
+        detail::writeRecord(stream, library.directory, library.fileName, library.fileTime,
+                            library.fileSize, library.builders);
 }
 
 void ComponentManager::readRecords(QrStream& stream) {

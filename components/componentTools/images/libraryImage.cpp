@@ -1,49 +1,30 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Files are read through two cached blocks, because the readers alternate between a table and the
-/// names that it refers to. A foreign library then costs few reads, whatever its size.
+/// Opens a file, and selects the reader of its format by its magic number.
 #include "components/componentTools/images/libraryImage.h"
 
 #include "components/platform/platform.h"
 
 #include <algorithm>
+#include <array>
+#include <cstring>
 
 namespace Mz::Tools {
 
-FileBytes::FileBytes(const std::filesystem::path& path) {
+FileBytes::Source::Source(const std::filesystem::path& path) {
     opened = platform::openForReading(stream, path.native());
     if (!opened)
         return;
     stream.seekg(0, std::ios::end);
     const auto end = static_cast<std::streamoff>(stream.tellg());
-    fileSize = end > 0 ? static_cast<std::uint64_t>(end) : 0;
+    bytes = end > 0 ? static_cast<std::uint64_t>(end) : 0;
 }
 
-bool FileBytes::read(std::uint64_t offset, void* data, std::size_t length) {
-    if (!reaches(offset, length))
-        return false;
-    const auto holds = [&](const Block& block) {
-        return offset >= block.offset && offset - block.offset <= block.size &&
-               length <= block.size - (offset - block.offset);
-    };
-    auto block = std::find_if(blocks.begin(), blocks.end(), holds);
-    if (block == blocks.end()) {
-        block = blocks.begin() + static_cast<std::ptrdiff_t>(older);
-        if (!load(*block, offset) || !holds(*block))
-            return false;
-    }
-    older = block == blocks.begin() ? 1 : 0;
-    std::memcpy(data, block->bytes.data() + (offset - block->offset), length);
-    return true;
-}
-
-bool FileBytes::load(Block& block, std::uint64_t offset) {
-    block.size = 0;
-    block.offset = offset;
+std::size_t FileBytes::Source::read(std::uint64_t offset, void* data, std::size_t length) {
     stream.clear();
     stream.seekg(static_cast<std::streamoff>(offset));
-    stream.read(block.bytes.data(), static_cast<std::streamsize>(block.bytes.size()));
-    block.size = static_cast<std::size_t>(std::max<std::streamsize>(stream.gcount(), 0));
-    return !stream.bad();
+    stream.read(static_cast<char*>(data), static_cast<std::streamsize>(length));
+    const std::streamsize count = stream.bad() ? 0 : stream.gcount();
+    return static_cast<std::size_t>(std::max<std::streamsize>(count, 0));
 }
 
 std::optional<std::string> FileBytes::text(std::uint64_t offset) {
@@ -52,7 +33,7 @@ std::optional<std::string> FileBytes::text(std::uint64_t offset) {
     while (result.size() < longest) {
         char piece[64];
         const std::size_t length = static_cast<std::size_t>(
-            std::min<std::uint64_t>(sizeof piece, fileSize - std::min(fileSize, offset)));
+            std::min<std::uint64_t>(sizeof piece, size() - std::min(size(), offset)));
         if (length == 0 || !read(offset, piece, length))
             return std::nullopt;
         const char* end = static_cast<const char*>(std::memchr(piece, 0, length));

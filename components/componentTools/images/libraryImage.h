@@ -5,62 +5,60 @@
 /// readers do not trust the file: every offset, size and count is checked.
 #pragma once
 
-#include <array>
+#include "components/platform/fileBlocks.h"
+
 #include <cstdint>
-#include <cstring>
 #include <filesystem>
 #include <fstream>
 #include <optional>
 #include <set>
 #include <string>
-#include <type_traits>
 #include <vector>
 
 namespace Mz::Tools {
 
-/// Reads pieces of a file through two cached blocks.
+/// A file and its bytes, for small reads at any offset.
 class FileBytes {
   public:
-    explicit FileBytes(const std::filesystem::path& path);
+    explicit FileBytes(const std::filesystem::path& path) : source(path), blocks(source) {}
 
-    bool isOpen() const { return opened; }
-    std::uint64_t size() const { return fileSize; }
+    bool isOpen() const { return source.opened; }
+    std::uint64_t size() const { return source.bytes; }
 
     /// Returns whether the file contains all of these bytes.
     bool reaches(std::uint64_t offset, std::uint64_t length) const {
-        return length <= fileSize && offset <= fileSize - length;
+        return blocks.reaches(offset, length);
     }
 
     /// Returns the `T` at `offset`; `std::nullopt` if the file ends before its end.
     template <class T>
     std::optional<T> read(std::uint64_t offset) {
-        static_assert(std::is_trivially_copyable_v<T>);
-        T value;
-        if (!read(offset, &value, sizeof value))
-            return std::nullopt;
-        return value;
+        return blocks.read<T>(offset);
     }
 
-    /// Reads `length` bytes, at most 8192. Returns false if it cannot read all of them.
-    bool read(std::uint64_t offset, void* data, std::size_t length);
+    /// Reads `length` bytes, at most `platform::FileBlocks::blockSize`. Returns false if it cannot
+    /// read all of them.
+    bool read(std::uint64_t offset, void* data, std::size_t length) {
+        return blocks.read(offset, data, length);
+    }
 
     /// Returns the NUL-terminated text at `offset`; `std::nullopt` if it is not terminated or has
     /// 4096 bytes or more.
     std::optional<std::string> text(std::uint64_t offset);
 
   private:
-    struct Block {
-        std::uint64_t offset = 0;
-        std::size_t size = 0;
-        std::array<char, 8192> bytes;
-    };
-    bool load(Block& block, std::uint64_t offset);
+    struct Source final : platform::ByteSource {
+        explicit Source(const std::filesystem::path& path);
+        std::uint64_t size() const override { return bytes; }
+        std::size_t read(std::uint64_t offset, void* data, std::size_t length) override;
 
-    std::ifstream stream;
-    bool opened = false;
-    std::uint64_t fileSize = 0;
-    std::array<Block, 2> blocks;
-    std::size_t older = 0; ///< the block to fill next
+        std::ifstream stream;
+        bool opened = false;
+        std::uint64_t bytes = 0;
+    };
+
+    Source source;
+    platform::FileBlocks blocks;
 };
 
 enum class ImageFormat { none, elf, pe };

@@ -5,6 +5,7 @@
 /// ends without running exit handlers, because the library's handlers and destructors may fail.
 #include "components/componentManager/componentImp.h"
 #include "components/componentManager/nativeText.h"
+#include "components/componentManager/recordFormat.h"
 #include "components/componentTools/platform/system.h"
 #include "components/componentTools/probing/probeAnswer.h"
 #include "components/platform/platform.h"
@@ -87,7 +88,8 @@ void onTerminate() {
     System::endProcess(3);
 }
 
-/// Collects the builder descriptions, with the same calls and casts as the manager.
+/// Copies the builder descriptions, with the same calls as the manager. Reports an item that is no
+/// builder description, which the manager cannot.
 class Collector final : public QrEnumerator<QrCPtr<QrBuilderDescription>> {
   public:
     explicit Collector(std::vector<RecordedBuilder>& target) : builders(target) {}
@@ -97,13 +99,7 @@ class Collector final : public QrEnumerator<QrCPtr<QrBuilderDescription>> {
         const auto description =
             QrCPtr<QrBuilderDescription>::adopt(safeCast<QrBuilderDescription>(item.get()));
         wrongItem = nullptr;
-        RecordedBuilder& builder = builders.emplace_back();
-        builder.uid = description->getUid();
-        builder.name = textOrEmpty(description->getName());
-        builder.label = textOrEmpty(description->getLabel());
-        builder.text = textOrEmpty(description->getText());
-        builder.number = description->getNumber();
-        builder.flag = description->getFlag();
+        detail::copyDescription(*description, builders.emplace_back());
         return Continue;
     }
 
@@ -122,10 +118,8 @@ void describe(QrGetComponentDescriptionFunction* entryPoint, const wchar_t*& wro
         return sendFault(Verdict::wrongInterface);
     send(encodeStage(Stage::describing));
     Description answer;
-    static_cast<void>(description->getComponentValue());
-    answer.text = textOrEmpty(description->getComponentText());
-    answer.label = textOrEmpty(description->getComponentLabel());
-    answer.announced = description->getBuilderCount();
+    int64 unused = 0;
+    answer.announced = detail::copyDescription(*description, unused, answer.text, answer.label);
     send(encodeStage(Stage::enumerating));
     Collector collector(answer.builders);
     try {

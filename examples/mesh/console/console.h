@@ -3,19 +3,14 @@
 /// system, selected by the build.
 #pragma once
 
-#include <filesystem>
 #include <string>
 #include <string_view>
-#include <vector>
 
 namespace Meshes::console {
 
 /// Makes the standard output and error write bytes unchanged, line ends included, so that the
 /// output is the same on every system. Call it before anything is written.
 void useBinaryOutput();
-
-/// Returns the arguments of the program, without its name and without loss of characters.
-std::vector<std::filesystem::path> arguments(int argc, char** argv);
 
 /// Returns text as it is written to the standard output; the reverse of `Kit::wideName`. On Linux
 /// the bytes of a name are unchanged, on Windows the output is UTF-8.

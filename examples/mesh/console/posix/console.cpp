@@ -9,10 +9,6 @@ namespace Meshes::console {
 
 void useBinaryOutput() {}
 
-std::vector<std::filesystem::path> arguments(int argc, char** argv) {
-    return {argv + (argc > 0 ? 1 : 0), argv + argc};
-}
-
 std::string outputText(std::wstring_view text) {
     return Mz::toNarrow(text, '?');
 }

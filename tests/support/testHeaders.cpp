@@ -1,0 +1,3 @@
+// SPDX-License-Identifier: BSL-1.0
+/// Nothing but the headers that `mzTestHeaders` precompiles: CMake precompiles for a target with a
+/// source.
