@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
-// Tests the normalised form of paths: with known results, and with random paths against a second,
-// simpler implementation.
+/// Tests the normalised form of paths: with known results, and with random paths against a second,
+/// simpler implementation.
 #include "components/componentManager/manager/componentImpPrivate.h"
 
 #include <gtest/gtest.h>

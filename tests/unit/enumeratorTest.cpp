@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Tests the enumerator interface, and the protocol in which the manager calls it.
 #include "components/componentManager/enumerator.h"
 #include "components/componentManager/manager/componentImpPrivate.h"
 
@@ -54,10 +55,10 @@ TEST(Enumerator, MayServeTwoSequencesWithOneSetOfVerdicts) {
     Both both;
     EXPECT_EQ(static_cast<QrEnumerator<int>&>(both).process(1), QrEnum::Stop);
     EXPECT_EQ(static_cast<QrEnumerator<const wchar_t*>&>(both).process(L""), QrEnum::Fail);
-    static_assert(std::is_convertible_v<Both*, QrEnum*>, "one QrEnum, not two");
+    static_assert(std::is_convertible_v<Both*, QrEnum*>, "QrEnum must be an unambiguous base");
 }
 
-// ---- The protocol, driven by the library's own enumeration ----------------------------------
+// ---- The protocol, tested with the manager's enumeration ------------------------------------
 
 class Descriptions : public QrEnumerator<QrCPtr<QrBuilderDescription>> {
   public:
