@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Tests that a faulty component library does no harm to the manager or to other libraries, and what
-/// the manager records of it. The faulty libraries are in tests/components; they report events to
-/// the test journal.
+/// Tests that a faulty component library does no harm to the manager or to other libraries, and
+/// what the manager records of it. The faulty libraries are in tests/components; they report events
+/// to the test journal.
 #include "tests/integration/managerFixture.h"
 
 #include <stdexcept>

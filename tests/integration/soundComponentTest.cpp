@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Tests component libraries without faults: written by hand and with the kit, loaded by the manager
-/// and by the host, from the first record to the unload.
+/// Tests component libraries without faults: written by hand and with the kit, loaded by the
+/// manager and by the host, from the first record to the unload.
 #include "tests/integration/managerFixture.h"
 
 using namespace Mz;

@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Tests every conversion of formattedWrite, with the expected text written down.
 #include "tests/streams/support.h"
 
 #include <gmock/gmock.h>
