@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Tests the OBJ format: every statement that is read, those that are skipped, and every error.
 #include "meshTestSupport.h"
 
 using namespace Mz;
