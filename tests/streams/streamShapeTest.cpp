@@ -177,7 +177,7 @@ TEST(StreamShape, ANullOrUnsuitableObjectIsABadCast) {
     }
 }
 
-/// An object that counts its references and knows an IO.
+/// A counted object that supplies an IO.
 struct CountedIO final : Mz::QrCastImpl<CountedIO, QrPersistant, const CountedIO&> {
     const Mz::QrUid* getClassUid() const override { return &QrPersistant::uid; }
     unsigned int getVersion() const override { return 0; }

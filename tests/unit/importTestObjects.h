@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Import builders that behave as a test tells them, registered in the process-wide manager.
+/// Import builders that a test controls, registered in the process-wide manager.
 #pragma once
 
 #include "components/componentKit/componentKit.h"

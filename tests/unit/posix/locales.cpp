@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// The UTF-8 locale of the system, and a single-byte locale that the build makes.
 #include "tests/unit/locales.h"
 
 #include <cstdlib>
