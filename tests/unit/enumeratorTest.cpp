@@ -55,7 +55,7 @@ TEST(Enumerator, MayServeTwoSequencesWithOneSetOfVerdicts) {
     Both both;
     EXPECT_EQ(static_cast<QrEnumerator<int>&>(both).process(1), QrEnum::Stop);
     EXPECT_EQ(static_cast<QrEnumerator<const wchar_t*>&>(both).process(L""), QrEnum::Fail);
-    static_assert(std::is_convertible_v<Both*, QrEnum*>, "QrEnum must be an unambiguous base");
+    static_assert(std::is_convertible_v<Both*, QrEnum*>, "one QrEnum, not two");
 }
 
 // ---- The protocol, tested with the manager's enumeration ------------------------------------

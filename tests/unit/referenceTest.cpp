@@ -123,7 +123,7 @@ TYPED_TEST(Reference, ConvertsToAReferenceToABase) {
     copied = again;
     EXPECT_EQ(this->probe.references, 4);
     EXPECT_EQ(copied->value(), 7);
-    static_assert(!std::is_convertible_v<AsGauge, Probed>, "no conversion from base to derived");
+    static_assert(!std::is_convertible_v<AsGauge, Probed>, "a base is no derived");
 }
 
 TYPED_TEST(Reference, AssignmentReplacesTheReference) {
