@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-// Tests the PLY format in text and in binary of both byte orders, and every error.
+// Tests the PLY format in text and in binary of both byte orders, and errors.
 #include "meshTestSupport.h"
 
 #include <bit>

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-// Tests the STL format in text and in binary: how points are merged, and every error.
+// Tests the STL format in text and in binary: how points are merged, and errors.
 #include "meshTestSupport.h"
 
 #include <bit>

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-// Tests every conversion of formattedRead: the value, the width of the store, and the unread input.
+// Tests the conversions of formattedRead: the value, the width of the store, and the unread input.
 #include "tests/streams/support.h"
 
 #include <gtest/gtest.h>

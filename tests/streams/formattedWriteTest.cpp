@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-// Tests every conversion of formattedWrite, with the expected text written down.
+// Tests the conversions of formattedWrite against the expected texts.
 #include "tests/streams/support.h"
 
 #include <gmock/gmock.h>

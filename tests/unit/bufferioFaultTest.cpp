@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: BSL-1.0
 // Tests the buffers on a medium that fails or throws. Every operation runs with every exception
-// mask and with the fault beginning at every call; it must throw the documented exception or none.
+// mask and with the fault beginning at each of the first calls; it must throw the documented
+// exception or none.
 #include "components/componentManager/bufferio.h"
 #include "tests/unit/faultyBuffer.h"
 
