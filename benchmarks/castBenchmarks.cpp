@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Casts to an interface, compared with virtual calls and with std::dynamic_pointer_cast.
 #include "comparisons.h"
 #include "measure.h"
 #include "peer.h"

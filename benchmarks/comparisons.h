@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// The comparisons, by subject. Each function adds its lines to the table.
+/// The comparisons by subject. Each function adds its lines to the table.
 #pragma once
 
 #include "ratioTable.h"

@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// The look-up of the thread's process controller, compared with one call into a library.
 #include "comparisons.h"
 #include "measure.h"
 #include "peer.h"
@@ -14,7 +15,7 @@ void getController(benchmark::State& state) {
 }
 
 void getOwnController(benchmark::State& state) {
-    // Any controller will do; nothing is asked of it.
+    // Any controller serves: no function of it is called.
     QrSetThreadProcessController(QrGetSystemProcessController());
     getController(state);
     QrSetThreadProcessController(nullptr);

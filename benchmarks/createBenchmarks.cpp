@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// createObject through the manager, compared with a virtual factory function.
 #include "comparisons.h"
 #include "libraryFolder.h"
 #include "measure.h"
@@ -16,7 +17,7 @@ namespace {
 
 constexpr unsigned int builderCount = 1000;
 
-/// The manager of this process, which knows `builderCount` builders, each in a library of its own.
+/// Returns the process-wide manager, initialised with `builderCount` builders in as many libraries.
 QrComponentManager* initializedManager() {
     static const LibraryFolder folder(MZ_BENCHMARK_COMPONENT, builderCount);
     QrComponentManager* const manager = QrGetComponentManager();

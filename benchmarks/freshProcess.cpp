@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Starts mzBenchmarkStart and reads its result from a pipe.
 #include "freshProcess.h"
 
 #include <cerrno>
@@ -12,7 +13,7 @@ namespace Mz::Benchmarks {
 
 namespace {
 
-/// Everything that comes out of the pipe, up to its end.
+/// Reads the pipe up to its end.
 std::string readAll(int descriptor) {
     std::string text;
     char block[256];
@@ -25,7 +26,7 @@ std::string readAll(int descriptor) {
     }
 }
 
-/// Runs the program and returns what it writes to its standard output.
+/// Runs the program and returns its standard output.
 std::string outputOf(const std::string& program, const std::string& work,
                      const std::string& folder) {
     int ends[2];

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Work that can be measured only once in a process.
+/// Work that a process can measure only once.
 #pragma once
 
 #include <filesystem>
@@ -7,14 +7,13 @@
 
 namespace Mz::Benchmarks {
 
-/// What a fresh process measured.
+/// The result of a measurement in a new process.
 struct FreshResult {
-    double seconds = 0; ///< of processor time, in user and system mode, for the work alone
-    long count = 0;     ///< how many libraries the work found
+    double seconds = 0; ///< processor time of the work alone, in user and system mode
+    long count = 0;     ///< the number of libraries that the work found
 };
 
-/// Runs `work` (see `start.cpp`) on `folder` in a new process. Throws `std::exception` when that
-/// fails.
+/// Runs `work` (see start.cpp) on `folder` in a new process. Throws `std::exception` on failure.
 FreshResult inFreshProcess(const std::string& work, const std::filesystem::path& folder);
 
 } // namespace Mz::Benchmarks

@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Writes copies of a library. If the library contains the marked uid, each copy gets another one.
 #include "libraryFolder.h"
 
 #include "generated/identity.h"
@@ -26,7 +27,7 @@ std::string contentOf(const std::filesystem::path& file) {
     return content;
 }
 
-/// Where the identity stands in the file, or `npos` when it has none.
+/// Returns the offset of the uid in the file, or `npos`. Throws if the file contains it twice.
 std::size_t identityIn(const std::string& content) {
     char mark[sizeof(QrUid)];
     std::memcpy(mark, &identityMark, sizeof mark);

@@ -1,17 +1,17 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Folders full of libraries to search through.
+/// Folders with many copies of a library.
 #pragma once
 
 #include <filesystem>
 
 namespace Mz::Benchmarks {
 
-/// A new temporary folder with copies of one library, removed at the end. Each copy is a file of
-/// its own; where the library is the generated component, copy number n has the builder
+/// A new temporary folder with copies of one library, removed by the destructor. Each copy is a
+/// separate file. If the library is the generated component, copy number n has the builder
 /// `generatedUid(n)`.
 class LibraryFolder {
   public:
-    /// Throws `std::exception` when the files cannot be made.
+    /// Throws `std::exception` if the files cannot be written.
     LibraryFolder(const std::filesystem::path& library, unsigned int count);
     ~LibraryFolder();
     LibraryFolder(const LibraryFolder&) = delete;

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Measures the library, each piece of work beside its limit, and prints a table of ratios.
+/// Measures the library, each work together with its limit, and prints a table of ratios.
 #include "comparisons.h"
 
 #include <condition_variable>
@@ -19,8 +19,8 @@ namespace {
 
 constexpr std::string_view ratiosOption = "--ratios_out=";
 
-/// Stays for as long as it lives what most programs are, one with a second thread. It does nothing,
-/// but the runtime's counters only become atomic where there is one.
+/// An idle second thread while it lives. The standard library's reference counts are atomic only in
+/// programs with several threads, as most programs are.
 class SecondThread {
   public:
     SecondThread() : thread([this] { waitForEnd(); }) {}
@@ -45,7 +45,7 @@ class SecondThread {
     std::thread thread;
 };
 
-/// Keeps this process, and those that it starts, on the core it is running on.
+/// Binds this process, and those that it starts, to the current core.
 void stayOnOneCore() {
     cpu_set_t cores;
     CPU_ZERO(&cores);
@@ -54,8 +54,8 @@ void stayOnOneCore() {
         std::cerr << "could not stay on one core\n";
 }
 
-/// The options of the command line behind ours, which they override, without `--ratios_out`, whose
-/// value goes to `ratiosFile`.
+/// Returns the default options followed by those of the command line, which override them.
+/// `--ratios_out` is removed; its value goes to `ratiosFile`.
 std::vector<std::string> optionsOf(int argc, char** argv, std::string& ratiosFile) {
     std::vector<std::string> options{argv[0], "--benchmark_repetitions=25",
                                      "--benchmark_enable_random_interleaving=true",

@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Defines the objects of peer.h in a separate library.
 #include "peer.h"
 
 namespace Mz::Benchmarks {
@@ -30,7 +31,7 @@ class SomeSharedGauge final : public SharedGauge {
     long value() const override { return 1; }
 };
 
-/// As large as a counted object.
+/// Has the size of a counted object.
 class SomeProduct final : public Product {
   public:
     long value() const override { return count; }

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
-/// The other side of a library's border: objects made elsewhere, of which the measuring program
-/// knows the interface only. Nothing here can be inlined or resolved at compile time.
+/// Objects of another library, of which the measuring program knows only the interface. No call can
+/// be inlined or resolved at compile time.
 #pragma once
 
 #include "components/base/export.h"
@@ -10,7 +10,7 @@
 
 namespace Mz::Benchmarks {
 
-/// The interface that the cast benchmarks ask for.
+/// The interface to which the benchmarks cast.
 class Gauge : public QrCastable {
   public:
     using Self = Gauge;
@@ -26,7 +26,7 @@ class Absent : public QrCastable {
     static constexpr QrUid uid{0x7B3C1E02, 0x53A011EF, 0x8D4E20C9, 0x6F10B277};
 };
 
-/// The limit of every cast: virtual calls and nothing else.
+/// The limit of the casts: virtual calls.
 class Calls {
   public:
     virtual ~Calls() = default;
@@ -35,7 +35,7 @@ class Calls {
     virtual long third() = 0;
 };
 
-/// The standard library's way: a root, an interface under it, and shared ownership.
+/// The standard library's alternative: a root, a derived interface, and shared ownership.
 class MZ_SHARED_TYPE SharedRoot {
   public:
     virtual ~SharedRoot();
@@ -57,17 +57,17 @@ class Product {
 class Factory {
   public:
     virtual ~Factory() = default;
-    /// A new object, which the caller deletes.
+    /// Returns a new object. The caller owns it.
     virtual Product* make() = 0;
 };
 
 MZ_EXPORT QrCastable* uncountedGauge();
-/// A new object without a reference.
+/// Returns a new object without a reference.
 MZ_EXPORT QrCastable* newCountedGauge();
 MZ_EXPORT Calls* calls();
 MZ_EXPORT std::shared_ptr<SharedRoot> newSharedGauge();
 MZ_EXPORT Factory* factory();
-/// One call into a library.
+/// A function whose call costs no more than the call.
 MZ_EXPORT void* trivialCall();
 
 } // namespace Mz::Benchmarks

@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Writes the table with a JSON library, which escapes the texts.
 #include "ratioJson.h"
 
 #include <cmath>
@@ -9,7 +10,7 @@ namespace Mz::Benchmarks {
 
 namespace {
 
-/// No more digits than were measured.
+/// Keeps only the digits that the measurement supports.
 double rounded(double value, double steps) {
     return std::round(value * steps) / steps;
 }

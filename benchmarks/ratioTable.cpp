@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Collects the repetitions of each benchmark and prints medians and their ratios.
 #include "ratioTable.h"
 
 #include "ratioJson.h"
@@ -46,7 +47,7 @@ void printCells(std::ostream& out, const std::vector<Cells>& rows) {
     for (const Cells& row : rows) {
         for (std::size_t column = 0; column < row.size(); ++column) {
             const std::string padding(widths[column] - row[column].size(), ' ');
-            // Words to the left, figures to the right.
+            // Texts are left-aligned, numbers right-aligned.
             const bool figure = column > 1;
             out << (column ? " | " : "| ") << (figure ? padding : "") << row[column]
                 << (figure ? "" : padding);

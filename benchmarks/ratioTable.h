@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Each piece of work beside its limit.
+/// The table that compares each work with its limit.
 #pragma once
 
 #include <benchmark/benchmark.h>
@@ -13,30 +13,32 @@
 
 namespace Mz::Benchmarks {
 
-/// One line of the table: a piece of work, and what it is measured against.
+/// A line of the table: a work and the limit with which it is compared.
 struct Comparison {
     std::string name;            ///< the benchmarks are `name/work` and `name/limit`
-    std::string work;            ///< what is measured, for people
-    std::string limit;           ///< what it is measured against, for people
-    std::optional<double> reach; ///< the ratio to stay within, if there is one
+    std::string work;            ///< what is measured, as a text
+    std::string limit;           ///< what it is compared with, as a text
+    std::optional<double> reach; ///< the target of the ratio, if there is one
 };
 
-/// The comparisons, in the order of the table.
+/// The comparisons in the order of the table.
 class RatioTable {
   public:
     using Body = std::function<void(benchmark::State&)>;
 
-    /// Adds a line, and a benchmark for either side of it.
+    /// Adds a line, and a benchmark for each of the two bodies.
     void add(const Comparison& comparison, Body work, Body limit);
 
-    /// The same for bodies that report their own time (`SetIterationTime`), one piece of work each.
+    /// The same for bodies that set their time (`SetIterationTime`) and do their work once per
+    /// iteration.
     void addSelfTimed(const Comparison& comparison, Body work, Body limit);
 
-    /// Notes one repetition of the benchmark `name`.
+    /// Adds the time of one repetition of the benchmark `name`.
     void note(const std::string& name, double nanoseconds);
     void noteError(const std::string& name, const std::string& message);
 
-    /// A line for each comparison of which both sides were measured, and a line for each error.
+    /// Prints a line for each comparison of which both sides were measured, and a line for each
+    /// error.
     void print(std::ostream& out) const;
     void printJson(std::ostream& out) const;
 
@@ -59,7 +61,7 @@ class RatioTable {
     std::map<std::string, std::string> errors;
 };
 
-/// Hands the results of all repetitions to a table.
+/// Passes the results of all repetitions to a table.
 class RatioReporter final : public benchmark::BenchmarkReporter {
   public:
     explicit RatioReporter(RatioTable& table) : table(table) {}

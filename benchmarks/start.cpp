@@ -1,18 +1,18 @@
 // SPDX-License-Identifier: BSL-1.0
-/// What can be measured only once in a process: mzBenchmarkStart WORK FOLDER
+/// Does work that a process can measure only once: mzBenchmarkStart WORK FOLDER
 ///
-/// Does the work on the libraries of the folder and writes the processor time that it took, in
-/// seconds, and how many libraries it found. The works:
-///   initialize   starts the component manager; counts builders
-///   load         the limit: opens each library, looks its entry point up and calls it
-///   readTables   the limit for libraries without entry point: lists the folder, asks for the
-///                status of each file and reads its symbol table
+/// Runs the work on the libraries of the folder and prints the processor time in seconds and the
+/// number of libraries found. The works:
+///   initialize   initialises the component manager; counts builders
+///   load         the limit: loads each library, looks up its entry point and calls it
+///   readTables   the limit for libraries without entry point: lists the folder, gets the status of
+///                each file and reads its symbol table
 ///   record       writes the manager's records to a hidden file in the folder; counts builders
 ///   initializeRecorded
-///                reads that file and starts the component manager; counts builders, and fails
-///                when a library was loaded
-///   readList     the limit for that: lists the folder, asks for the status of each file, reads the
-///                file and enters every builder in a map
+///                reads that file and initialises the component manager; counts builders; fails if
+///                a library was loaded
+///   readList     the limit for that: lists the folder, gets the status of each file, reads
+///                that file and adds every builder to a map
 #include "components/componentManager/binaryStream.h"
 #include "components/componentManager/componentImp.h"
 
@@ -39,7 +39,7 @@ using namespace Mz;
 
 namespace {
 
-/// The processor time of this process. Unlike the time of day it leaves out what others take.
+/// Returns the processor time of this process, which other processes do not affect.
 double processorTime() {
     timespec time{};
     ::clock_gettime(CLOCK_PROCESS_CPUTIME_ID, &time);
@@ -75,7 +75,7 @@ int initialize(const std::filesystem::path& folder) {
     return report(begin, end, countBuilders());
 }
 
-/// The files of the folder in the order in which the manager loads them.
+/// Returns the files of the folder in the order in which the manager loads them.
 std::vector<std::string> filesOf(const std::filesystem::path& folder) {
     std::vector<std::string> files;
     for (const auto& entry : std::filesystem::directory_iterator(folder))
@@ -99,7 +99,7 @@ int load(const std::filesystem::path& folder) {
     return report(begin, processorTime(), count);
 }
 
-/// Where the symbol table of a library stands in its file.
+/// The position of a library's symbol table in its file.
 struct TablePlace {
     off_t offset = 0;
     std::size_t size = 0;
@@ -125,7 +125,8 @@ TablePlace symbolTableOf(const std::string& file) {
 }
 
 int readTables(const std::filesystem::path& folder) {
-    // The files are copies of one, so the place is the same in all and known beforehand.
+    // All files are copies of one file, so the position is the same. It is determined before the
+    // measurement.
     const std::vector<std::string> known = filesOf(folder);
     const TablePlace place = known.empty() ? TablePlace() : symbolTableOf(known.front());
     std::vector<char> table(place.size);
@@ -148,7 +149,7 @@ int readTables(const std::filesystem::path& folder) {
 }
 
 std::filesystem::path listIn(const std::filesystem::path& folder) {
-    return folder / ".recorded"; // Hidden, so no candidate.
+    return folder / ".recorded"; // Hidden, so not a candidate.
 }
 
 QrPtr<QrPersistant> records() {
@@ -164,7 +165,7 @@ int record(const std::filesystem::path& folder) {
     return file.flush() ? report(0, 0, countBuilders()) : 1;
 }
 
-/// Whether this process has mapped anything of the folder.
+/// Returns whether this process has mapped a file of the folder.
 bool loadedFrom(const std::filesystem::path& folder) {
     std::ifstream maps("/proc/self/maps");
     const std::string content(std::istreambuf_iterator<char>(maps), {});
@@ -185,7 +186,7 @@ int initializeRecorded(const std::filesystem::path& folder) {
     return loadedFrom(folder) ? 1 : report(begin, end, countBuilders());
 }
 
-/// The recorded list, read by hand.
+/// Reads a recorded list without the library.
 class ListReader {
   public:
     explicit ListReader(const std::filesystem::path& file) {

@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// The start of the manager in new processes, compared with the calls that it cannot avoid.
 #include "comparisons.h"
 #include "freshProcess.h"
 #include "libraryFolder.h"
@@ -12,10 +13,10 @@ namespace Mz::Benchmarks {
 
 namespace {
 
-/// A folder that is made when the first benchmark wants it, and shared by all that do.
+/// A folder that is made when the first benchmark needs it, and shared with others.
 class LazyFolder {
   public:
-    /// `preparation` is a work that is done once on the new folder.
+    /// `preparation` is the work that is done once on the new folder.
     LazyFolder(std::string libraryFile, unsigned int libraryCount,
                std::string preparation = "initialize")
         : library(std::move(libraryFile)), count(libraryCount), firstWork(std::move(preparation)) {}
@@ -36,7 +37,7 @@ class LazyFolder {
     std::unique_ptr<LibraryFolder> folder;
 };
 
-/// A benchmark of `work` in fresh processes, which must find `expected` libraries each time.
+/// Returns a benchmark of `work` in new processes. Each must find `expected` libraries.
 RatioTable::Body freshly(std::string work, std::shared_ptr<LazyFolder> folder, long expected) {
     return [=](benchmark::State& state) {
         for (auto iteration : state) {

@@ -1,4 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
+// Values through streams in binary and text form, compared with the same work by hand on standard
+// streams.
 #include "comparisons.h"
 #include "measure.h"
 
@@ -19,10 +21,11 @@ namespace Mz::Benchmarks {
 
 namespace {
 
-/// Values in one benchmark: enough to leave the fixed costs behind, few enough for the cache.
+/// The number of single values: large enough to make fixed costs negligible, small enough for the
+/// cache.
 constexpr int valueCount = 20'000;
 
-/// Values in an array, which are more than fit a small cache, as those of a mesh are.
+/// The number of values in an array: larger than a small cache, as the arrays of a mesh are.
 constexpr int arrayCount = 1'000'000;
 
 template <class T>
@@ -63,7 +66,7 @@ void unswap(T& value) {
     std::memcpy(&value, &bits, sizeof value);
 }
 
-/// What `write` makes of a standard stream.
+/// Returns what `write` writes to a standard stream.
 template <class Write>
 std::string written(const Write& write) {
     std::ostringstream out;
@@ -82,8 +85,8 @@ std::string valuesIn(int count = valueCount) {
     });
 }
 
-/// Repeats `work` on one and the same output, from its beginning each time, so that no memory is
-/// asked for, and checks at the end that `expected` stands there.
+/// Repeats `work` on the same output from its beginning, so that no memory is allocated. At the end
+/// checks that the output is `expected`.
 template <class Work>
 void writeRepeatedly(benchmark::State& state, const std::string& expected, const Work& work) {
     std::ostringstream out;
@@ -96,7 +99,7 @@ void writeRepeatedly(benchmark::State& state, const std::string& expected, const
         state.SkipWithError("something else was written");
 }
 
-/// The same for input; `work` returns what it read, to be compared with `expected` at the end.
+/// The same for input. At the end checks that the values that `work` read are `expected`.
 template <class T, class Work>
 void readRepeatedly(benchmark::State& state, const std::string& content,
                     const std::vector<T>& expected, const Work& work) {
@@ -258,7 +261,8 @@ void readTextByHand(benchmark::State& state) {
     readRepeatedly(state, content, expected, parse);
 }
 
-/// What the text gives back: 16 digits do not hold every `double`.
+/// Returns the values that are read back from text: 16 digits do not represent every `double`
+/// exactly.
 template <class T>
 std::vector<T> textValues() {
     std::istringstream in(valuesIn<T, QrTextStream>());
@@ -280,7 +284,7 @@ void readTextValues(benchmark::State& state) {
                    });
 }
 
-/// Runs `body` while the process's locale writes a comma before decimals.
+/// Runs `body` in a locale with a decimal comma.
 RatioTable::Body underDecimalComma(RatioTable::Body body) {
     return [body = std::move(body)](benchmark::State& state) {
         setenv("LOCPATH", MZ_LOCALE_FOLDER, 1);

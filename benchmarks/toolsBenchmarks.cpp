@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// `explain` on libraries that are not components, compared with one read of each file.
 #include "comparisons.h"
 
 #include "components/componentTools/discovery.h"
@@ -17,7 +18,7 @@ namespace {
 
 using Files = std::vector<std::filesystem::path>;
 
-/// The files of a folder full of libraries that are nobody's components.
+/// Returns the candidates of a folder with libraries that are not components.
 std::shared_ptr<Files> foreignFiles(const std::filesystem::path& folder) {
     auto files = std::make_shared<Files>();
     for (const Tools::Candidate& candidate : Tools::discover({folder}).candidates)
@@ -25,7 +26,7 @@ std::shared_ptr<Files> foreignFiles(const std::filesystem::path& folder) {
     return files;
 }
 
-/// A benchmark whose time is that of one file: `look` at each in turn.
+/// Returns a benchmark that calls `look` for each file in turn. Its time is that of one file.
 template <class Look>
 RatioTable::Body eachFile(std::shared_ptr<Files> files, Look look) {
     return [=](benchmark::State& state) {

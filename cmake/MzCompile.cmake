@@ -1,5 +1,5 @@
 # SPDX-License-Identifier: BSL-1.0
-# How everything of this project is compiled, and where it is put.
+# Sets how this project is compiled and where its files are written.
 include_guard()
 
 set(CMAKE_CXX_STANDARD 20)
@@ -14,13 +14,14 @@ set(CMAKE_RUNTIME_OUTPUT_DIRECTORY ${PROJECT_BINARY_DIR}/bin)
 set(CMAKE_LIBRARY_OUTPUT_DIRECTORY ${PROJECT_BINARY_DIR}/lib)
 set(CMAKE_ARCHIVE_OUTPUT_DIRECTORY ${PROJECT_BINARY_DIR}/lib)
 
-# Tests of what libMZcomponentManager hides, and the form of the library that they link.
+# The folder for tests that use hidden symbols of libMZcomponentManager, and for the variant of the
+# library that exports these.
 set(MZ_INTERNALS_FOLDER ${PROJECT_BINARY_DIR}/internals)
 
 include(MzRuntime)
 if(WIN32)
   enable_language(RC)
-  # Beside the programs, or they do not start.
+  # Programs find the DLLs in their own folder.
   mz_find_runtime(MZ_RUNTIME_FILES)
   file(COPY ${MZ_RUNTIME_FILES} DESTINATION ${PROJECT_BINARY_DIR}/bin)
 endif()
@@ -30,7 +31,7 @@ check_cxx_compiler_flag(-fno-gnu-unique MZ_HAS_NO_GNU_UNIQUE)
 check_cxx_compiler_flag(-fno-semantic-interposition MZ_HAS_NO_SEMANTIC_INTERPOSITION)
 check_cxx_compiler_flag(-Wshadow=local MZ_HAS_SHADOW_LOCAL)
 
-# What our own code is compiled with; not passed on to users of the libraries.
+# Options for this project's code. They are not passed on to users of the libraries.
 add_library(mzCompile INTERFACE)
 target_compile_options(mzCompile INTERFACE -Wall -Wextra -Wpedantic -Wconversion
   -Wnon-virtual-dtor -Wold-style-cast -Wundef $<$<BOOL:${MZ_HAS_SHADOW_LOCAL}>:-Wshadow=local>)
@@ -38,30 +39,31 @@ if(MZ_WARNINGS_AS_ERRORS)
   target_compile_options(mzCompile INTERFACE -Werror)
 endif()
 if(MZ_HAS_NO_GNU_UNIQUE)
-  # A library that defines a unique symbol can never be unmapped.
+  # A library that defines a unique symbol cannot be unmapped.
   target_compile_options(mzCompile INTERFACE -fno-gnu-unique)
 endif()
 if(MZ_HAS_NO_SEMANTIC_INTERPOSITION AND NOT WIN32)
-  # Nobody replaces single functions of a library from outside; so it may call and inline its own.
+  # Replacing single functions of a library is not supported, so the library can call and inline its
+  # own directly.
   target_compile_options(mzCompile INTERFACE -fno-semantic-interposition)
   target_link_options(mzCompile INTERFACE -Wl,-Bsymbolic-functions)
 endif()
 if(MZ_SANITIZE)
-  # With the checks between them, GCC loses track of what the standard library initialises.
+  # With the checks of the sanitizers, GCC warns wrongly of uninitialised values in the standard
+  # library.
   target_compile_options(mzCompile INTERFACE -fsanitize=address,undefined -fno-sanitize-recover=all
     -fno-omit-frame-pointer $<$<CXX_COMPILER_ID:GNU>:-Wno-maybe-uninitialized>)
   target_link_options(mzCompile INTERFACE -fsanitize=address,undefined)
 endif()
 
-# mz_copy_file(TARGET FILE FOLDER): copies FILE whenever TARGET has been built.
+# mz_copy_file(TARGET FILE FOLDER): copies FILE to FOLDER whenever TARGET has been built.
 function(mz_copy_file target file folder)
   add_custom_command(TARGET ${target} POST_BUILD
     COMMAND ${CMAKE_COMMAND} -E make_directory ${folder}
     COMMAND ${CMAKE_COMMAND} -E copy_if_different ${file} ${folder})
 endfunction()
 
-# mz_describe_file(TARGET): gives the file a version resource on Windows, where its name has no
-# version.
+# mz_describe_file(TARGET): adds a version resource on Windows, where file names contain no version.
 function(mz_describe_file target)
   if(NOT WIN32)
     return()
@@ -73,8 +75,8 @@ function(mz_describe_file target)
   target_sources(${target} PRIVATE ${resource})
 endfunction()
 
-# mz_make_library(NAME MACRO FOLDER sources...): a shared library in FOLDER, lib<NAME> on every
-# platform.
+# mz_make_library(NAME MACRO FOLDER sources...): adds a shared library in FOLDER, with the file name
+# lib<NAME> on every platform. MACRO is defined while it is compiled.
 function(mz_make_library name macro folder)
   add_library(${name} SHARED ${ARGN})
   target_compile_features(${name} PUBLIC cxx_std_20)
@@ -90,19 +92,19 @@ function(mz_make_library name macro folder)
   mz_describe_file(${name})
 endfunction()
 
-# mz_add_library(NAME MACRO sources...): a shared library of the family.
+# mz_add_library(NAME MACRO sources...): adds a shared library of this project.
 function(mz_add_library name macro)
   mz_make_library(${name} ${macro} ${PROJECT_BINARY_DIR}/lib ${ARGN})
   add_library(Mz::${name} ALIAS ${name})
-  # The libraries of the family find one another wherever they are installed together.
+  # The libraries find one another in the folder in which they are installed.
   set_target_properties(${name} PROPERTIES INSTALL_RPATH "$ORIGIN")
   if(WIN32)
-    # Programs find a library beside themselves.
+    # Programs find the libraries in their own folder.
     mz_copy_file(${name} $<TARGET_FILE:${name}> ${PROJECT_BINARY_DIR}/bin)
   endif()
 endfunction()
 
-# mz_public_headers(NAME headers...): what is installed with a library.
+# mz_public_headers(NAME headers...): the headers that are installed with a library.
 function(mz_public_headers name)
   get_target_property(type ${name} TYPE)
   set(scope PUBLIC)

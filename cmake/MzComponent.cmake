@@ -1,9 +1,9 @@
 # SPDX-License-Identifier: BSL-1.0
-# mz_add_component(NAME [FOLDER folder] sources...): a component library, which hosts find by
-# scanning the folder it stands in; by default that is components/ in the build folder.
+# mz_add_component(NAME [FOLDER folder] sources...): adds a component library. Hosts find it in its
+# folder, which is components/ in the build folder by default.
 #
-# On every platform its file is NAME plus the platform's extension, without a prefix, so that a
-# folder of components reads, and sorts, the same everywhere.
+# Its file is NAME plus the platform's extension, without a prefix, so that a folder of components
+# has the same names in the same order on every platform.
 include_guard()
 
 function(mz_add_component name)
@@ -20,7 +20,7 @@ function(mz_add_component name)
     LIBRARY_OUTPUT_DIRECTORY ${arg_FOLDER}
     RUNTIME_OUTPUT_DIRECTORY ${arg_FOLDER})
   if(CMAKE_CXX_COMPILER_ID STREQUAL "GNU")
-    # A library that defines a unique symbol can never be unmapped.
+    # A library that defines a unique symbol cannot be unmapped.
     target_compile_options(${name} PRIVATE -fno-gnu-unique)
   endif()
 endfunction()

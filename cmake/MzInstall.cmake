@@ -1,6 +1,6 @@
 # SPDX-License-Identifier: BSL-1.0
-# Installation: the libraries, their public headers, the command line, and what finds them again
-# (a CMake package and pkg-config files).
+# Installs the libraries, their public headers, the command line, and what build systems use to find
+# them: a CMake package and pkg-config files.
 include_guard()
 include(CMakePackageConfigHelpers)
 include(GNUInstallDirs)
@@ -21,7 +21,7 @@ if(WIN32)
   install(FILES ${MZ_RUNTIME_FILES} DESTINATION ${CMAKE_INSTALL_BINDIR} COMPONENT runtime)
 endif()
 
-# The probe is beside the library that starts it.
+# The probe is installed in the folder of the library that starts it.
 if(TARGET MZcomponentTools)
   set(mzProbeFolder ${CMAKE_INSTALL_LIBDIR})
   if(WIN32)
@@ -61,7 +61,8 @@ install(FILES
 set(mzPkgConfigFolder ${CMAKE_INSTALL_LIBDIR}/pkgconfig)
 file(RELATIVE_PATH mzPrefixFromHere /prefix/${mzPkgConfigFolder} /prefix)
 
-# mz_install_pc(LIBRARY DESCRIPTION [REQUIRED-LIBRARIES...])
+# mz_install_pc(LIBRARY DESCRIPTION [REQUIRED-LIBRARIES...]): installs the library's pkg-config
+# file.
 function(mz_install_pc mzLibrary mzDescription)
   list(JOIN ARGN ", " mzRequires)
   string(REPLACE "," " = ${PROJECT_VERSION}," mzRequires "${mzRequires}")

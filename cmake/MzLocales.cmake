@@ -1,10 +1,10 @@
 # SPDX-License-Identifier: BSL-1.0
-# Locales for tests and measurements: a minimal system has none but "C". The C library reads them
-# from any folder that LOCPATH names, so they are made in the build folder.
+# Makes locales for tests and benchmarks: a minimal system has only "C". The C library reads locales
+# from the folder that LOCPATH names, so the build folder can contain them.
 include_guard(GLOBAL)
 
-# mz_use_locales(TARGET): makes the locales before TARGET, which gets their folder as
-# MZ_LOCALE_FOLDER. The tools that make them (Debian: locales) may be absent; then the folder is too.
+# mz_use_locales(TARGET): makes the locales before TARGET and defines MZ_LOCALE_FOLDER, their
+# folder. If the tools are missing (Debian: locales), the folder does not exist.
 find_program(MZ_LOCALEDEF localedef)
 
 function(mz_make_locale name charmap)

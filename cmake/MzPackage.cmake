@@ -1,7 +1,7 @@
 # SPDX-License-Identifier: BSL-1.0
-# What packages contain besides what is installed otherwise: licences and the list of changes, as the
-# component `documents`; and what CPack needs to make the installer for Windows. Included before
-# MzInstall. packaging/package.sh makes the packages.
+# Installs what only packages contain: licences and the list of changes, as the component
+# `documents`. Configures CPack for the Windows installer. Must be included before MzInstall.
+# packaging/package.sh makes the packages.
 include_guard()
 include(GNUInstallDirs)
 
@@ -12,12 +12,12 @@ file(MAKE_DIRECTORY ${mzPackageFiles})
 
 set(mzCopyright ${mzPackaging}/copyright)
 if(WIN32)
-  # The compiler's runtime DLLs are installed, too: without the symbols that only a debugger reads,
-  # which are nine tenths of them; with their licences and the versions of their sources.
+  # The compiler's runtime DLLs are installed with their licences and the versions of their sources,
+  # but without debug symbols, which are nine tenths of their size.
   set(mzStripped)
   foreach(file IN LISTS MZ_RUNTIME_FILES)
     cmake_path(GET file FILENAME name)
-    # With the times of the original: otherwise strip writes the present time into the file.
+    # Keep the file's time: otherwise strip writes the present time into the file.
     execute_process(COMMAND ${CMAKE_STRIP} --preserve-dates -o ${mzPackageFiles}/${name} ${file}
       COMMAND_ERROR_IS_FATAL ANY)
     list(APPEND mzStripped ${mzPackageFiles}/${name})
@@ -47,8 +47,8 @@ set(CPACK_PACKAGE_FILE_NAME libMZcomponentManager-${PROJECT_VERSION}-windows-x86
 set(CPACK_PACKAGE_VENDOR "libMZcomponentManager authors")
 set(CPACK_RESOURCE_FILE_LICENSE ${PROJECT_SOURCE_DIR}/LICENSE)
 set(CPACK_MONOLITHIC_INSTALL ON)
-# CPack's script makes a program of 32 bits unless it names another target; where the system has no
-# 32-bit part, that program ends without a word and without having installed anything.
+# By default CPack's script makes a 32-bit installer. On a system without 32-bit support that
+# program ends without a message and without installing anything.
 set(CPACK_NSIS_DEFINES "Target amd64-unicode\n  SetDateSave off")
 set(CPACK_NSIS_PACKAGE_NAME "libMZcomponentManager ${PROJECT_VERSION}")
 set(CPACK_NSIS_DISPLAY_NAME "libMZcomponentManager ${PROJECT_VERSION}")

@@ -1,8 +1,8 @@
 # SPDX-License-Identifier: BSL-1.0
-# The DLLs that programs need beside themselves on Windows. Installed, for users of the package.
+# Finds and copies the DLLs that programs need on Windows. It is installed with the package.
 include_guard()
 
-# mz_find_runtime(VARIABLE): the compiler's runtime libraries that MinGW programs of C++ need.
+# mz_find_runtime(VARIABLE): finds the compiler's runtime libraries that MinGW C++ programs need.
 function(mz_find_runtime variable)
   set(files)
   if(WIN32 AND MINGW)
@@ -10,7 +10,7 @@ function(mz_find_runtime variable)
       execute_process(COMMAND ${CMAKE_CXX_COMPILER} -print-file-name=${name}
         OUTPUT_VARIABLE file OUTPUT_STRIP_TRAILING_WHITESPACE)
       if(NOT IS_ABSOLUTE "${file}")
-        # The compiler knows its own folders; threads come from the system's libraries.
+        # The compiler knows only its own folders. The thread library is in the system's.
         find_file(mzFile ${name} PATH_SUFFIXES lib bin NO_CACHE REQUIRED)
         set(file ${mzFile})
       endif()
@@ -20,8 +20,8 @@ function(mz_find_runtime variable)
   set(${variable} ${files} PARENT_SCOPE)
 endfunction()
 
-# mz_copy_runtime(PROGRAM): copies the DLLs that PROGRAM needs, the compiler's included, beside it
-# whenever it has been built. Does nothing on other systems, where the run path names the folders.
+# mz_copy_runtime(PROGRAM): copies the DLLs that PROGRAM needs, with those of the compiler, to its
+# folder whenever it has been built. A no-op on other systems, where the run path names the folders.
 function(mz_copy_runtime program)
   if(NOT WIN32)
     return()

@@ -1,5 +1,5 @@
 # SPDX-License-Identifier: BSL-1.0
-# GoogleTest from the sources of Debian's package, and how test programs are made.
+# Builds GoogleTest from the sources of Debian's package, and adds test programs.
 include_guard()
 
 set(MZ_GOOGLETEST_SOURCES /usr/src/googletest CACHE PATH "The sources of GoogleTest")
@@ -10,9 +10,9 @@ set(gtest_force_shared_crt ON)
 add_subdirectory(${MZ_GOOGLETEST_SOURCES} ${PROJECT_BINARY_DIR}/googletest EXCLUDE_FROM_ALL SYSTEM)
 include(GoogleTest)
 
-# The code of the tests runs once and is compiled for each build: most of the time of a build went
-# into optimising it and describing it to a debugger. What is tested keeps the build's own options;
-# the templates of its headers are still optimised here, except under the sanitizers.
+# The test code runs once per build, so it is hardly optimised and has few debug symbols: both took
+# most of the build time. The tested libraries keep the build's options. Header templates are
+# optimised here as well, except under the sanitizers.
 add_library(mzTestCode INTERFACE)
 if(MZ_SANITIZE)
   target_compile_options(mzTestCode INTERFACE -O0 -g1)
@@ -28,20 +28,20 @@ foreach(target gtest gtest_main gmock gmock_main)
   endif()
 endforeach()
 
-# GoogleTest's headers are parsed once for all test programs: they were a third of the time that it
-# takes to compile the tests. Nothing else is in here, so that each source names what it uses; the
-# Clang build compiles without it and notices a source that does not.
+# Precompiles GoogleTest's headers for all test programs: parsing them took a third of the time to
+# compile the tests. Only these headers, so that each source includes what it uses: the Clang build
+# compiles without them and fails where an include is missing.
 add_library(mzTestHeaders OBJECT ${PROJECT_SOURCE_DIR}/tests/support/testHeaders.cpp)
 target_link_libraries(mzTestHeaders PRIVATE mzCompile mzTestCode GTest::gmock)
 target_precompile_headers(mzTestHeaders PRIVATE <gmock/gmock.h> <gtest/gtest.h>)
-# With the options of a program, or a program cannot use what this target precompiles.
+# A program can use the precompiled headers only if both are compiled with the same options.
 set_target_properties(mzTestHeaders PROPERTIES POSITION_INDEPENDENT_CODE OFF)
 target_compile_options(mzTestHeaders PRIVATE ${CMAKE_CXX_COMPILE_OPTIONS_PIE})
 
-# The build's name stands before the name of each test: one summary counts all builds.
+# Each test has the name of its build as a prefix, so that one summary covers all builds.
 get_filename_component(MZ_BUILD_NAME ${PROJECT_BINARY_DIR} NAME)
 
-# The build folder as the tested programs name it; Wine shows the whole file system as drive Z.
+# The build folder as tested programs see it. Wine maps the whole file system to drive Z.
 set(MZ_BUILD_PATH ${PROJECT_BINARY_DIR})
 set(MZ_SOURCE_PATH ${PROJECT_SOURCE_DIR})
 if(WIN32)
@@ -49,23 +49,24 @@ if(WIN32)
   set(MZ_SOURCE_PATH Z:${PROJECT_SOURCE_DIR})
 endif()
 
-# mz_add_test_program(NAME [INTERNALS] sources...): a program of tests, without entries for ctest.
-# With INTERNALS it reaches the classes that libMZcomponentManager hides.
+# mz_add_test_program(NAME [INTERNALS] sources...): adds a program with tests but no ctest entries.
+# INTERNALS makes the hidden classes of libMZcomponentManager available.
 function(mz_add_test_program name)
   cmake_parse_arguments(PARSE_ARGV 1 arg "INTERNALS" "" "")
   add_executable(${name} ${arg_UNPARSED_ARGUMENTS})
   mz_link_manager(${name} ${arg_INTERNALS})
   target_link_libraries(${name} PRIVATE mzCompile mzTestCode mzTestSupport GTest::gmock)
   target_precompile_headers(${name} REUSE_FROM mzTestHeaders)
-  # In precompiled headers GCC 12 forgets which ones are the system's, and warns of the library's own
-  # strings.
+  # GCC 12 does not know which precompiled headers are the system's, and reports its known false
+  # warnings on std::string.
   if(CMAKE_CXX_COMPILER_ID STREQUAL "GNU")
     target_compile_options(${name} PRIVATE -Wno-array-bounds -Wno-restrict -Wno-stringop-overflow)
   endif()
 endfunction()
 
-# mz_link_manager(PROGRAM INTERNALS): links libMZcomponentManager as it is shipped, or, if INTERNALS,
-# the form that hides nothing. A program must not link both: they have one file name.
+# mz_link_manager(PROGRAM INTERNALS): links libMZcomponentManager as it is installed, or with
+# INTERNALS the variant that exports everything. A program must not link both: their file names are
+# equal.
 function(mz_link_manager program internals)
   if(NOT internals)
     target_link_libraries(${program} PRIVATE Mz::MZcomponentManager)
@@ -74,15 +75,15 @@ function(mz_link_manager program internals)
   target_link_libraries(${program} PRIVATE mzManagerForTests)
   set_target_properties(${program} PROPERTIES RUNTIME_OUTPUT_DIRECTORY ${MZ_INTERNALS_FOLDER})
   if(WIN32)
-    # The program finds the libraries beside itself.
+    # Programs find the libraries in their own folder.
     add_custom_command(TARGET ${program} PRE_LINK
       COMMAND ${CMAKE_COMMAND} -D from=${PROJECT_BINARY_DIR}/bin -D to=${MZ_INTERNALS_FOLDER}
         -P ${PROJECT_SOURCE_DIR}/cmake/copyLibraries.cmake)
   endif()
 endfunction()
 
-# mz_add_tests(NAME [INTERNALS] sources...): a program of tests, each of which is an entry for ctest
-# and runs in a process of its own.
+# mz_add_tests(NAME [INTERNALS] sources...): adds a test program. Each test is a ctest entry and
+# runs in a process of its own.
 function(mz_add_tests name)
   mz_add_test_program(${name} ${ARGN})
   target_link_libraries(${name} PRIVATE GTest::gtest_main)
@@ -94,8 +95,8 @@ function(mz_discover_tests name)
     DISCOVERY_TIMEOUT 120 PROPERTIES TIMEOUT 120)
 endfunction()
 
-# mz_add_test_component(NAME [FOLDER folder] sources...): a component library in
-# <build>/components/<folder>, by default a folder of its own.
+# mz_add_test_component(NAME [FOLDER folder] sources...): adds a component library in
+# <build>/components/<folder>. The default folder is NAME.
 function(mz_add_test_component name)
   cmake_parse_arguments(PARSE_ARGV 1 arg "" "FOLDER" "")
   if(NOT arg_FOLDER)

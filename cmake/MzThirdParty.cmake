@@ -1,11 +1,10 @@
 # SPDX-License-Identifier: BSL-1.0
-# The header-only libraries of others that the tools use. Each is seen through a folder of the build
-# tree that holds its headers and nothing else: a compiler for another system must not see the rest
-# of where they are installed.
+# The header-only libraries that the tools use. Each is included through a folder of the build tree
+# that contains only its headers: a cross compiler must not see the other headers of the system.
 include_guard(GLOBAL)
 
-# mz_third_party(NAME HEADER LINK): the interface library NAME, with the header or folder LINK of the
-# folder in which HEADER is found.
+# mz_third_party(NAME HEADER LINK): adds the interface library NAME. It finds the folder that
+# contains HEADER and makes the header or folder LINK of it available.
 function(mz_third_party name header link)
   find_path(MZ_${name}_FOLDER ${header} PATHS /usr/include /usr/local/include
     NO_CMAKE_FIND_ROOT_PATH REQUIRED)

@@ -1,6 +1,6 @@
 # SPDX-License-Identifier: BSL-1.0
-# The version's home is components/componentManager/version.h. Sets MZ_VERSION, and MZ_SOVERSION,
-# which grows when binary compatibility breaks (see CONTRIBUTING.md).
+# Reads the version from components/componentManager/version.h. Sets MZ_VERSION, and MZ_SOVERSION,
+# which is incremented when binary compatibility breaks (see CONTRIBUTING.md).
 include_guard()
 
 set(MZ_SOVERSION 0)

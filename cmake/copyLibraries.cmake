@@ -1,6 +1,6 @@
 # SPDX-License-Identifier: BSL-1.0
-# Copies the DLLs of the folder `from` to the folder `to`, apart from the one that `to` has in a form
-# of its own.
+# Copies the DLLs of the folder `from` to the folder `to`, except libMZcomponentManager, of which
+# `to` contains another variant.
 file(GLOB libraries RELATIVE ${from} ${from}/*.dll)
 list(REMOVE_ITEM libraries libMZcomponentManager.dll)
 foreach(library IN LISTS libraries)

@@ -1,5 +1,5 @@
 # SPDX-License-Identifier: BSL-1.0
-# Windows x86-64 with MinGW-w64 (posix threads), run under Wine.
+# The toolchain for Windows x86-64: MinGW-w64 with posix threads. Programs run under Wine.
 set(CMAKE_SYSTEM_NAME Windows)
 set(CMAKE_SYSTEM_PROCESSOR x86_64)
 
@@ -11,7 +11,7 @@ set(CMAKE_FIND_ROOT_PATH /usr/x86_64-w64-mingw32)
 set(CMAKE_FIND_ROOT_PATH_MODE_PROGRAM NEVER)
 set(CMAKE_FIND_ROOT_PATH_MODE_LIBRARY ONLY)
 set(CMAKE_FIND_ROOT_PATH_MODE_INCLUDE ONLY)
-# CMAKE_PREFIX_PATH names packages for Windows anywhere.
+# Packages for Windows can be anywhere; CMAKE_PREFIX_PATH names them.
 set(CMAKE_FIND_ROOT_PATH_MODE_PACKAGE BOTH)
 
 set(CMAKE_CROSSCOMPILING_EMULATOR ${CMAKE_CURRENT_LIST_DIR}/wine-run)

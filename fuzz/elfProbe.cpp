@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
-// Files as the component manager looks at them before it loads one. Two readers of the same format,
-// written apart, see to each other.
+// Probes a file as the component manager does before it loads one. Two readers of the ELF format,
+// written independently, check each other.
 #include "components/componentTools/images/libraryImage.h"
 #include "components/platform/platform.h"
 #include "fuzz/fuzz.h"

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-// Any format on any content.
+// Reads any content with any format.
 //
 // Input: the length of the format, the format, the content.
 #include "fuzz/reading.h"
@@ -14,7 +14,7 @@ using namespace Mz;
 
 constexpr std::size_t maximumDirectives = 8;
 
-/// What a directive stores: any value, or a text as long as the content.
+/// The target of a directive. It has room for any value, and for a text of the content's length.
 using Place = std::vector<unsigned char>;
 
 } // namespace
@@ -27,7 +27,7 @@ int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
     std::ranges::transform(characters, format.begin(),
                            [](char c) { return static_cast<unsigned char>(c); });
     if (std::ranges::count(format, L'%') > static_cast<std::ptrdiff_t>(maximumDirectives))
-        return 0; // More than there are places for.
+        return 0; // More directives than targets.
 
     Fuzz::expectSameReading<Fuzz::BaseStream>(content, [&](QrStream& stream, QrBufferedIO&,
                                                            std::string& told) {

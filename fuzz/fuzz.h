@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: BSL-1.0
-/// What the fuzz targets share. A target is one source: a function that takes any bytes, gives them
-/// to a reader of the library, and stops the program where something does not hold. What a reader
-/// refuses in the stated way holds.
+/// Common parts of the fuzz targets. A target is one source with a function that takes any bytes,
+/// passes them to a reader of the library, and aborts the program if a property does not hold. A
+/// reader may reject its input with a documented exception.
 #pragma once
 
 #include "components/base/exBase.h"
@@ -15,12 +15,12 @@
 #include <string>
 #include <string_view>
 
-/// The target. Always returns 0: the input was used.
+/// The target. Returns 0: the input was used.
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size);
 
 namespace Mz::Fuzz {
 
-/// Ends the program, as the fuzzer wants it, unless `holds`.
+/// Aborts the program, which the fuzzer reports, unless `holds`.
 inline void expect(bool holds, const char* what) {
     if (holds)
         return;
@@ -28,15 +28,15 @@ inline void expect(bool holds, const char* what) {
     std::abort();
 }
 
-/// Ends the program unless the two, however they were come by, are the same.
+/// Aborts the program unless both texts are equal.
 inline void expectSame(const std::string& a, const std::string& b, const char* what) {
     if (a != b)
         std::fprintf(stderr, "one: %s\ntwo: %s\n", a.c_str(), b.c_str());
     expect(a == b, what);
 }
 
-/// What `work` tells, or the reason of the failure that it ends in. Exceptions that are not the
-/// library's own end the program.
+/// Returns the result of `work`, or the reason of the library's exception that it throws. Other
+/// exceptions end the program.
 template <class Work>
 std::string outcomeOf(const Work& work) {
     try {
@@ -46,13 +46,13 @@ std::string outcomeOf(const Work& work) {
     }
 }
 
-/// The input, taken from its front.
+/// The input, consumed from its beginning.
 class Input {
   public:
     Input(const std::uint8_t* data, std::size_t size)
         : bytes(reinterpret_cast<const char*>(data), size) {}
 
-    /// The next byte; 0 at the end.
+    /// Returns the next byte, 0 at the end.
     unsigned int byte() {
         if (bytes.empty())
             return 0;
@@ -61,7 +61,7 @@ class Input {
         return result;
     }
 
-    /// The next `count` bytes, or as many as there are.
+    /// Returns the next `count` bytes, or fewer at the end.
     std::string_view take(std::size_t count) {
         const std::string_view result = bytes.substr(0, count);
         bytes.remove_prefix(result.size());
@@ -74,7 +74,7 @@ class Input {
     std::string_view bytes;
 };
 
-/// A file that holds an input, for readers that take nothing but files.
+/// A file that contains an input, for readers of files.
 class InputFile {
   public:
     explicit InputFile(std::string_view content);

@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Writes inputs to files of one temporary folder.
 #include "fuzz/fuzz.h"
 #include "tests/support/temporaryDirectory.h"
 
@@ -7,7 +8,7 @@
 namespace Mz::Fuzz {
 
 InputFile::InputFile(std::string_view content) {
-    // One for the process: making a folder for each input would take most of the time.
+    // One folder for the process: creating one for each input would take most of the time.
     static const Test::TemporaryDirectory folder;
     static int count = 0;
     name = folder.write("input" + std::to_string(++count), content);

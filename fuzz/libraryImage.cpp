@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-// Files as `explain` looks at them, in the formats of both systems.
+// Reads a file as `explain` does, in the formats of both systems.
 #include "components/componentTools/images/libraryImage.h"
 #include "fuzz/fuzz.h"
 
@@ -10,10 +10,10 @@ int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
     const Fuzz::InputFile file(Fuzz::Input(data, size).rest());
     const Tools::LibraryImage image = Tools::readLibraryImage(file.path());
     Fuzz::expect(image.readable, "the file can be read");
-    // No more than the file has room for.
+    // Not more texts than the file has room for.
     std::size_t texts = image.needed.size() + image.rpath.size() + image.runpath.size();
     Fuzz::expect(texts <= size, "as many names as bytes at most");
-    // Symbols are looked at where loading failed, and what failed may be damaged.
+    // The tools read symbols after a load has failed, so the file may be damaged.
     std::set<std::string> names;
     for (std::string& name : Tools::wantedSymbols(file.path()))
         names.insert(std::move(name));

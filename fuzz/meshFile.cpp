@@ -1,7 +1,8 @@
 // SPDX-License-Identifier: BSL-1.0
-// Mesh files of every format, by content alone; and every mesh through a store and back.
+// Imports mesh files of every format by their content alone, and stores and loads every mesh. Also
+// loads any bytes as a stored mesh.
 //
-// Input: which format, the file.
+// Input: the format, the file.
 #include "components/componentManager/binaryStream.h"
 #include "components/componentManager/processControl.h"
 #include "components/componentManager/textStream.h"
@@ -24,7 +25,7 @@ QrRef<QrCastable> importBy(const MeshFormat& format, std::string_view content) {
     std::istringstream source{std::string(content)};
     QrInBuffer io(&source);
     recognisesMesh(format, io, L"", L"");
-    io.read(); // Clears the end, where it was reached.
+    io.read(); // Clears the end of input, if it was reached.
     io.seek(0, 0);
     return importMesh(format, io, L"", L"format");
 }
@@ -58,7 +59,7 @@ void expectStored(MeshObject& mesh) {
     Fuzz::expect(areEqual(mesh, again), "what was stored comes back");
 }
 
-/// Any bytes as a stored mesh.
+/// Reads any bytes as a stored mesh.
 void readStored(std::string_view content) {
     std::istringstream source{std::string(content)};
     QrInBuffer io(&source);
@@ -79,7 +80,7 @@ int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
     static const PlyFormat ply;
     static const StlFormat stl;
     static const MeshFormat* const formats[] = {&obj, &off, &ply, &stl};
-    QrSetSystemProcessController(nullptr); // Nobody wants to hear of what is damaged here.
+    QrSetSystemProcessController(nullptr); // Errors are not reported.
 
     Fuzz::Input input(data, size);
     const unsigned int which = input.byte() % 5;

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-// Stored objects: of classes that do what is asked of them, and of classes that do not.
+// Loads stored objects of the test classes, with and without faults, and stores them again.
 //
 // Input: the kind of stream, the stored objects.
 #include "fuzz/fuzz.h"
@@ -15,8 +15,8 @@ namespace {
 using namespace Mz;
 using namespace Mz::Test;
 
-/// Whether a class may be in it that lets go of objects it has read, and does not write them again.
-/// If such an object is part of a circle, nobody can undo that any more.
+/// Returns whether `bytes` may contain a class that drops objects which it has read. If such an
+/// object is part of a cycle, its memory leaks, and the target could not tell that from a fault.
 bool mayForget(std::string_view bytes) {
     for (const std::uint32_t word : {carelessUid.w0, misleadingUid.w0}) {
         const char binary[] = {static_cast<char>(word >> 24), static_cast<char>(word >> 16),
@@ -28,7 +28,7 @@ bool mayForget(std::string_view bytes) {
     return false;
 }
 
-/// The objects in `bytes`, stored again; nothing when they cannot be loaded, or stored as they are.
+/// Loads the objects in `bytes` and returns them stored again; nothing if either of it fails.
 template <class Stream>
 std::optional<std::string> storedAgain(std::string_view bytes) {
     QrPtr<Node> node;
@@ -40,7 +40,7 @@ std::optional<std::string> storedAgain(std::string_view bytes) {
         in.finish();
         node = queryCast<Node>(object.get());
         std::string result = saved<Stream>(object.get());
-        unlink(node); // Circles of references never end by themselves.
+        unlink(node); // Otherwise cycles of references leak.
         return result;
     } catch (const ExBase&) {
     } catch (const std::runtime_error& failure) {
@@ -64,7 +64,7 @@ void load(std::string_view content) {
 
 int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
     QrGetComponentManager()->initialize(MZ_BUILD_PATH L"/components/objects");
-    forgetNotes(); // The classes take notes of what they go through, for other tests.
+    forgetNotes(); // The classes report events, for other tests.
     Fuzz::Input input(data, size);
     switch (input.byte() % 4) {
     case 0: load<QrBinaryStream>(input.rest()); break;

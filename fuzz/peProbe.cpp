@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
-// Windows libraries as the component manager looks at them before it maps one. Two readers of the
-// same format, written independently, check each other.
+// Probes a Windows library as the component manager does before it maps one. Two readers of the PE
+// format, written independently, check each other.
 #include "components/platform/windows/peProbe.h"
 
 #include "components/componentTools/images/libraryImage.h"
@@ -10,7 +10,7 @@
 
 namespace {
 
-/// The input as a file. The readers' work is bounded by its size.
+/// The input as a source of bytes. The readers' work is bounded by its size.
 class InputSource final : public Mz::platform::ByteSource {
   public:
     explicit InputSource(std::string_view content) : content(content) {}
@@ -36,8 +36,8 @@ int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
     const std::string_view content = Fuzz::Input(data, size).rest();
     InputSource source(content);
     const bool exported = platform::peExportsFunction(source, Tools::entryPointName);
-    // The headers, a few for each section and each library needed, and two at each step of the
-    // search.
+    // The reads: the headers, a few for each section and for each needed library, and two for each
+    // step of the search.
     Fuzz::expect(source.reads < 3000, "a file is read in a few pieces");
     if (!exported)
         return 0;

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-// What a process that loads a component library answers: the library may have written it.
+// Reads the answer of a probing child process: the component library may have written it.
 #include "components/componentTools/probing/probeAnswer.h"
 #include "fuzz/fuzz.h"
 
@@ -7,7 +7,7 @@ namespace {
 
 using namespace Mz::Tools;
 
-/// The answer in the words of an honest process.
+/// Returns the answer as a correct child process writes it.
 std::string encoded(const ProbeAnswer& answer) {
     std::string bytes = encodeStage(answer.stage);
     if (answer.fault)

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
-/// One content, read past the standard stream where the library can, and through every call where
-/// it cannot know who watches: both must come to the same.
+/// Reads one content through the library's short cuts, and through all calls of a standard stream,
+/// where the library cannot take them. Both must have the same result.
 #pragma once
 
 #include "fuzz/fuzz.h"
@@ -15,7 +15,7 @@ using Test::BaseStream;
 using Test::ForeignInput;
 using Test::WatchedBuffer;
 
-/// All that can be seen of `work` on a stream: what it tells, what is left unread, and the state.
+/// Returns all observable results of `work`: its texts, the stream's state, and the unread bytes.
 template <class Stream, class Buffer, class IO, class Work>
 std::string readingBy(std::string_view content, const Work& work) {
     Buffer buffer(std::string(content), std::ios::in | std::ios::out);
@@ -30,8 +30,8 @@ std::string readingBy(std::string_view content, const Work& work) {
     return told + "|" + state + "|" + std::string(std::istreambuf_iterator<char>(&buffer), {});
 }
 
-/// `work` takes the stream, its IO, and a text to which it adds what it sees while it goes; what it
-/// returns comes last.
+/// `work` gets the stream, its IO, and a text to which it appends its results. What it returns is
+/// appended last.
 template <class Stream, class Work>
 void expectSameReading(std::string_view content, const Work& work) {
     const auto direct = readingBy<Stream, std::stringbuf, QrInBuffer>(content, work);

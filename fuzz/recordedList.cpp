@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-// The recorded list, as the tools read it from a file and as a manager reads it from a stream.
+// Reads a recorded list as the tools read it from a file, and as a manager reads it from a stream.
 #include "components/componentTools/recordedList.h"
 #include "components/componentManager/binaryStream.h"
 #include "components/componentManager/manager/componentImpPrivate.h"
@@ -12,7 +12,7 @@ namespace {
 
 using namespace Mz;
 
-/// Reads the list into a manager of its own; whether it was whole.
+/// Reads the list into `manager`. Returns whether it is complete.
 template <class Stream>
 bool readInto(ComponentManager& manager, std::string_view content) {
     std::istringstream source{std::string(content)};

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-// Gives a target, once each, the inputs that are kept: for builds without a fuzzer.
+// Passes each stored input to a target once, in builds without a fuzzer.
 #include "fuzz/fuzz.h"
 
 #include <algorithm>
@@ -11,7 +11,7 @@ namespace {
 
 namespace fs = std::filesystem;
 
-/// The files named, and those in the folders named, in order.
+/// Returns the named files and the files of the named folders, sorted.
 std::vector<fs::path> inputsOf(int count, char** names) {
     std::vector<fs::path> inputs;
     for (int index = 1; index < count; ++index) {
@@ -45,7 +45,7 @@ int main(int argumentCount, char** arguments) {
     }
     for (const fs::path& input : inputs) {
         std::printf("%s\n", input.filename().string().c_str());
-        std::fflush(stdout); // So that the last line names the input that ends the program.
+        std::fflush(stdout); // The last line then names an input that ends the program.
         const std::vector<std::uint8_t> content = contentOf(input);
         LLVMFuzzerTestOneInput(content.data(), content.size());
     }

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-// Values of all types, single and counted, in all kinds of stream.
+// Reads values of all types, single and in arrays, from all kinds of stream.
 //
 // Input: the kind of stream, the number of steps, the steps, the content.
 #include "components/componentManager/binaryStream.h"
@@ -52,7 +52,7 @@ void readCounted<std::wstring>(QrStream& stream, std::string& told, int count) {
         told += narrow(text) + ";";
 }
 
-/// Either way of reading, as bit 4 of `step` has it; of counted values up to 19.
+/// Reads one value, or with bit 4 of `step` an array of up to 18 values.
 template <class T>
 void readValues(QrStream& stream, std::string& told, unsigned int step) {
     if (step & 0x10)
@@ -61,7 +61,7 @@ void readValues(QrStream& stream, std::string& told, unsigned int step) {
         readSingle<T>(stream, told);
 }
 
-/// What other users of the IO may do between two values.
+/// Uses the IO as other code may do between two values.
 void disturb(QrBufferedIO& io, QrStream& stream, std::string& told, unsigned int step) {
     switch (step >> 4 & 7) {
     case 0: told += std::to_string(io.read()); break;
@@ -105,7 +105,7 @@ int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
     const std::string_view content = input.rest();
     const auto work = [&](QrStream& stream, QrBufferedIO& io, std::string& told) {
         for (const char step : steps) {
-            // A step that fails is told of, and the next one goes on behind it.
+            // After a step that fails, the next step continues.
             told += Fuzz::outcomeOf([&] {
                 take(stream, io, told, static_cast<unsigned char>(step));
                 return std::string("; ");

@@ -1,10 +1,10 @@
 #!/usr/bin/env bash
 # SPDX-License-Identifier: BSL-1.0
-# Builds the packages of the source tree that this script is in:
+# Builds the packages of the source tree that contains this script.
 #   buildPackages.sh OUTPUT
-# They depend on the sources, the compilers and SOURCE_DATE_EPOCH, and on nothing else: not on the
-# folder, the user, the time or the order of files in a folder. Everything that makes them so is here
-# and in the package presets.
+# The packages depend only on the sources, the compilers and SOURCE_DATE_EPOCH: not on the folder,
+# the user, the time or the order of files in a folder. This script and the package presets ensure
+# that.
 set -euo pipefail
 top=$(cd "$(dirname "${BASH_SOURCE[0]}")/.." && pwd)
 output=$1
@@ -17,10 +17,10 @@ version=$(sed -n 's/^#define MZ_VERSION_[A-Z]* \([0-9]*\)$/\1/p' \
 linux=$top/build/package-linux
 windows=$top/build/package-windows
 
-# compile PRESET
+# compile PRESET: configures and builds.
 compile() { (cd "$top" && cmake --preset "$1" && cmake --build --preset "$1"); }
 
-# stage BUILD NAME [OPTION]: installs into BUILD/stage/NAME, the content of an archive.
+# stage BUILD NAME [OPTION]: installs to BUILD/stage/NAME, the content of an archive.
 stage() {
   local folder=$1/stage/$2
   rm -rf "$1/stage"
@@ -28,8 +28,8 @@ stage() {
   find "$folder" -exec touch --no-dereference --date="@$SOURCE_DATE_EPOCH" {} +
 }
 
-# For the Debian packages and the archive one folder is enough: they differ in how programs are
-# linked, not in how sources are compiled.
+# The Debian packages and the archive share a build folder: their programs are linked differently,
+# but the sources are compiled alike.
 make_debian() {
   compile package-debian
   local folder=$linux/debian
@@ -56,7 +56,7 @@ make_linux_archive() {
 make_windows() {
   local name=libMZcomponentManager-$version-windows-x86_64
   compile package-windows
-  # The linker has stripped already: strip would write the present time into each file.
+  # The linker has stripped the files already. strip would write the present time into each of them.
   stage "$windows" "$name"
   rm -f "$output/$name.zip"
   (cd "$windows/stage" && find "$name" | sort | zip -X -9 -q -@ "$output/$name.zip")

@@ -1,9 +1,9 @@
 #!/usr/bin/env bash
 # SPDX-License-Identifier: BSL-1.0
-# Uses the archives and the installer as somebody who downloads them does:
+# Uses the archives and the installer as a user does who downloads them.
 #   checkArchives.sh PACKAGES WORK
-# Builds a host and a component against each archive, and runs them and the archive's mzcomponents.
-# The installer must install what the archive contains, and remove it. Wine must be started.
+# Builds a host and a component with each archive, and runs them and the archive's mzcomponents. The
+# installer must install what the archive contains, and remove it. Wine must be running.
 set -euo pipefail
 top=$(cd "$(dirname "${BASH_SOURCE[0]}")/.." && pwd)
 # shellcheck source=packaging/contents.sh
@@ -15,7 +15,7 @@ fail() {
   exit 1
 }
 
-# On Linux directly, on Windows under Wine.
+# Runs a program directly, or under Wine if it is a Windows program.
 run_program() {
   case $1 in
   *.exe) "$top/cmake/wine-run" "$@" | tr -d '\r' ;;
@@ -23,7 +23,7 @@ run_program() {
   esac
 }
 
-# shows PATTERN COMMAND…: a line of what it writes matches.
+# shows PATTERN COMMAND…: fails unless a line of the command's output matches.
 shows() {
   local pattern=$1 said
   shift
@@ -31,7 +31,7 @@ shows() {
   grep -Eq "$pattern" <<<"$said" || fail "$* said: $said"
 }
 
-# use PREFIX WORK SUFFIX MODULE OPTIONS…
+# use PREFIX WORK SUFFIX MODULE OPTIONS…: builds and runs a host and a component.
 use() {
   local prefix=$1 folder=$2 suffix=$3 module=$4
   shift 4
@@ -69,7 +69,7 @@ installed=$work/installed
 "$top/cmake/wine-run" "$packages"/*.exe /S "/D=Z:${installed//\//\\}"
 diff -r --exclude=Uninstall.exe "$archive" "$installed" || fail "installed is not what is in the archive"
 use_tool "$installed" "$work/windows" .exe .dll
-# It removes everything but itself, which it cannot while it runs from where it is.
+# It cannot remove itself, because it runs from its own folder.
 "$top/cmake/wine-run" "$installed/Uninstall.exe" /S "_?=Z:${installed//\//\\}"
 left=$(find "$installed" -type f ! -name Uninstall.exe)
 [ -z "$left" ] || fail "the installer's removal leaves $left"

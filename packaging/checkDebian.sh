@@ -1,7 +1,7 @@
 #!/usr/bin/env bash
 # SPDX-License-Identifier: BSL-1.0
-# Installs, uses and removes the Debian packages. Run on a fresh system, in a folder that contains
-# packages/ and hello/.
+# Installs, uses and removes the Debian packages. Must run on a fresh system, in a folder that
+# contains packages/ and hello/.
 set -euo pipefail
 install() { apt-get install -y -qq --no-install-recommends "$@"; }
 
@@ -10,7 +10,7 @@ fail() {
   exit 1
 }
 
-# says EXPECTED COMMAND…
+# says EXPECTED COMMAND…: fails unless the command prints exactly that.
 says() {
   local expected=$1 said
   shift
@@ -18,7 +18,7 @@ says() {
   [ "$said" = "$expected" ] || fail "$* said: $said"
 }
 
-# All files of the system, apart from what apt and dpkg note about what was ever installed.
+# Lists all files of the system, except mounted folders, /tmp, and the records of apt and dpkg.
 list_files() {
   find / -xdev \( -path /proc -o -path /sys -o -path /dev -o -path /input -o -path /tmp \
     -o -path /var/lib/apt -o -path /var/lib/dpkg -o -path /var/cache -o -path /var/log \) -prune -o \
@@ -51,13 +51,13 @@ g++ -std=c++20 -shared -fPIC -fvisibility=hidden -fno-gnu-unique hello/helloComp
   -o /tmp/byHand/components/hello.so "${flags[@]}"
 says "Hello, world!" /tmp/byHand/helloHost /tmp/byHand/components
 
-# The probe is found: a scan loads the component in a process of its own.
+# A scan works only if the probe is found: it loads the component in a separate process.
 mzcomponents list --path /tmp/byHand/components | grep -Eq '^component +/tmp/byHand/components/hello\.so$' ||
   fail "mzcomponents list does not show the component"
 mzcomponents scan --path /tmp/byHand/components --cache /tmp/byHand/list |
   grep -Eq '^works +/tmp/byHand/components/hello\.so$' || fail "mzcomponents scan does not load it"
 
-# Debuggers find the symbols by the identity of each binary.
+# Debuggers find the symbols by the build ID of each binary.
 for file in /usr/bin/mzcomponents /usr/lib/*/libMZ*.so.0 /usr/lib/*/mzcomponents-probe; do
   id=$(readelf -n "$file" | sed -n 's/.*Build ID: //p')
   [ -s "/usr/lib/debug/.build-id/${id:0:2}/${id:2}.debug" ] || fail "no debug symbols for $file"

@@ -1,8 +1,8 @@
 # SPDX-License-Identifier: BSL-1.0
 # shellcheck shell=bash
-# Functions of the scripts that look into packages; to be sourced.
+# Functions for scripts that read packages. To be sourced.
 
-# unpack PACKAGE FOLDER
+# unpack PACKAGE FOLDER: unpacks any of the packages to a new folder.
 unpack() {
   rm -rf "$2"
   mkdir -p "$2"

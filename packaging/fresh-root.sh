@@ -1,9 +1,9 @@
 #!/usr/bin/env bash
 # SPDX-License-Identifier: BSL-1.0
-# Runs a script in a fresh minimal Debian system, which is gone afterwards:
+# Runs a script in a fresh minimal Debian system and removes the system afterwards.
 #   fresh-root.sh CACHE FOLDER SCRIPT [ARGUMENTS…]
-# FOLDER is copied to /input there, and is the working folder. Needs root: for debootstrap, which
-# makes the system once in the folder CACHE, and for chroot. What apt downloads stays in CACHE, too.
+# FOLDER is copied to /input there, which is the working folder. Needs root for chroot, and for
+# debootstrap, which makes the system once in the folder CACHE. CACHE also keeps what apt downloads.
 set -euo pipefail
 cache=$1 input=$2
 shift 2
@@ -13,7 +13,7 @@ if [ "$(id -u)" != 0 ]; then
 fi
 suite=bookworm
 
-# The mirror that this machine uses.
+# Prints the mirror that this machine uses.
 mirror() {
   # shellcheck disable=SC2016 # apt replaces these
   apt-get indextargets --format '$(REPO_URI) $(RELEASE)' 'Created-By: Packages' |
@@ -43,7 +43,7 @@ mount --bind /dev "$root/dev"
 mount --bind /dev/pts "$root/dev/pts"
 mount -t tmpfs shm "$root/dev/shm"
 
-# How this machine reaches the mirror.
+# Copy the network and proxy settings of this machine.
 cp /etc/resolv.conf /etc/hosts "$root/etc"
 apt-config dump | grep -E '^Acquire::(https?|Check)' >"$root/etc/apt/apt.conf.d/90host" || true
 

@@ -1,7 +1,7 @@
 # SPDX-License-Identifier: BSL-1.0
 # shellcheck shell=bash disable=SC2154
-# `./run package`: makes the packages twice, compares them, describes what is inside, and uses them.
-# Sourced by run, whose functions it uses.
+# `./run package`: makes the packages twice, compares them, lists their content, and uses them. run
+# sources this script, which uses its functions.
 
 packages=$build/package
 again=$build/package-again
@@ -17,15 +17,14 @@ need_packaging() {
   fi
 }
 
-# A copy of the sources in a folder of another name and depth, as they are here and now.
+# Copies the sources, including changes that are not committed.
 copy_sources() {
   mkdir -p "$1"
   (cd "$top" && git ls-files -z --cached --others --exclude-standard |
     xargs -0 tar --ignore-failed-read -cf - | tar -C "$1" -xf -)
 }
 
-# build_again: for the comparison everything is compiled again, without what a compiler cache knows
-# of the first time.
+# Builds everything again in a folder of another name and depth, without the compiler cache.
 build_again() {
   rm -rf "$again"
   copy_sources "$again/in-another-folder"
@@ -43,7 +42,7 @@ same_packages() {
   done
 }
 
-# The installer has its files in the order in which the file system lists them.
+# The order of the files in the installer depends on the file system, so compare their content.
 same_content() {
   unpack "$1" "$again/first" && unpack "$2" "$again/second" &&
     diff -r "$again/first" "$again/second"
@@ -64,7 +63,7 @@ check_debian() {
     as_root "$top/packaging/fresh-root.sh" "$build/fresh-root" "$input" checkDebian.sh
 }
 
-# lintian looks at packages as any user; as root it wants to be asked for it.
+# As root, lintian must be allowed explicitly to run.
 check_lintian() { lintian --allow-root --fail-on error "$packages"/*.deb; }
 
 make_packages() {

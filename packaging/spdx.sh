@@ -1,6 +1,6 @@
 #!/usr/bin/env bash
 # SPDX-License-Identifier: BSL-1.0
-# Writes what is inside a package, with checksums and licences, in SPDX 2.3 as tags and values:
+# Writes an SPDX 2.3 document (tag-value) that lists a package's files with checksums and licences.
 #   spdx.sh PACKAGE >PACKAGE.spdx
 set -euo pipefail
 here=$(cd "$(dirname "${BASH_SOURCE[0]}")" && pwd)
@@ -8,7 +8,8 @@ here=$(cd "$(dirname "${BASH_SOURCE[0]}")" && pwd)
 source "$here/contents.sh"
 export LC_ALL=C.UTF-8
 
-# license FILE: what its content is under. Binaries contain code of others; see `copyright`.
+# license FILE: prints the licences of its content. Binaries contain third-party code; see
+# `copyright`.
 license() {
   local startup=
   case $1 in

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
-/// An ordinary shared library that stands among components without being one: it exports functions
-/// of its own, and no entry point.
+/// An ordinary shared library without the entry point. It exports other functions and lies in a
+/// folder of candidates.
 #include "components/base/export.h"
 
 #include <string>

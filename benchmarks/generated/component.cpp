@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// An ordinary small component library, of which the benchmarks make many.
+/// An ordinary small component library. The benchmarks make many copies of it.
 #include "identity.h"
 
 #include "components/componentKit/componentKit.h"

@@ -1,21 +1,21 @@
 // SPDX-License-Identifier: BSL-1.0
-/// The identity of a generated component library. It stands in the file as plain bytes, which each
-/// copy of the file has replaced by its own.
+/// The uid of the builder in a generated component library. The file contains it as plain bytes,
+/// which are replaced in each copy.
 #pragma once
 
 #include "components/componentManager/cast.h"
 
 namespace Mz::Benchmarks {
 
-/// What the compiled file holds; `w1` to `w3` occur nowhere else in it.
+/// The uid in the compiled file. `w1` to `w3` occur nowhere else in the file.
 inline constexpr QrUid identityMark{0x3D000000, 0x91E7C46A, 0x2B58F0D3, 0xC60F8E75};
 
-/// The identity of the builder in the copy with this number.
+/// Returns the uid of the builder in the copy with this number.
 constexpr QrUid generatedUid(unsigned int number) {
     return {identityMark.w0 + number, identityMark.w1, identityMark.w2, identityMark.w3};
 }
 
-/// The identity of this copy, from a source of its own, so that no compiler folds it away.
+/// The uid of this copy. It is defined in a separate source, so that the compiler cannot fold it.
 extern const QrUid ownUid;
 
 } // namespace Mz::Benchmarks

@@ -1,14 +1,14 @@
 #!/usr/bin/env bash
 # SPDX-License-Identifier: BSL-1.0
-# Compares the names that a built library exports with the list that is kept here.
+# Compares the names that a built library exports with the list in this folder.
 #   checkExports.sh LIBRARY LIST SYMBOL_TOOL DEMANGLER [--write]
-# LIST ends in .linux.txt or .windows.txt; SYMBOL_TOOL is nm for the one, objdump for the other.
-# With --write the list is written anew: look at the difference before you commit it.
+# LIST ends in .linux.txt or .windows.txt; SYMBOL_TOOL is nm for the first and objdump for the
+# second. --write writes the list. Review the difference before you commit it.
 set -euo pipefail
 library=$1 list=$2 tool=$3 demangler=$4
 
-# Inline functions (W) come and go with the optimiser and are everybody's own, so they are no
-# promise; everything else of ours is.
+# Inline functions (W) are not part of the ABI: every library has its own copy, depending on the
+# optimiser. All other names of this project are.
 exported() {
     case $list in
     *.linux.txt) "$tool" -D --defined-only "$library" | awk '$2 ~ /^[TDBRV]$/ {print $3}' ;;

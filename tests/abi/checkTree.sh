@@ -1,13 +1,13 @@
 #!/usr/bin/env bash
 # SPDX-License-Identifier: BSL-1.0
-# The rules of the house that a search through the tree can check.
+# Checks one rule of the source tree by a search.
 #   checkTree.sh SOURCE_DIRECTORY RULE
 set -u
 shopt -s lastpipe # so that a pipe that ends in "complain" can set the status
 cd "$1" || exit 2
 status=0
 
-# complain TEXT, with the offending lines on standard input; silent when there are none.
+# complain TEXT reports the lines on standard input as violations. A no-op if there are none.
 complain() {
     local lines
     lines=$(cat)
@@ -20,21 +20,21 @@ sources() {
     find "$@" -type f \( -name '*.h' -o -name '*.cpp' -o -name '*.in' \) 2>/dev/null | sort
 }
 
-# search PATTERN FILES...: the lines that match, none being no failure.
+# search PATTERN FILES... prints the lines that match. No match is not a failure.
 search() {
     local pattern=$1
     shift
     [ $# -eq 0 ] || grep -nE "$pattern" "$@" /dev/null || true
 }
 
-# included DIRECTORY NAMES: the lines of a directory that include one of the directories.
+# included DIRECTORY NAMES prints the lines in a directory that include one of the directories.
 included() {
     search "#[[:space:]]*include[[:space:]]*[\"<]($2)/" $(sources "$1")
 }
 
 case $2 in
 platformConditions)
-    # What differs by system stands in files of its own, chosen by the build.
+    # Code that depends on the system is in separate files, which the build selects.
     search '^[[:space:]]*#[[:space:]]*(if|ifdef|ifndef|elif|elifdef|elifndef)\b.*(WIN32|WIN64|_MSC_VER|MINGW|CYGWIN|linux|unix|APPLE|BSD|__GLIBC__)' \
         $(sources components examples tests tools benchmarks fuzz |
             grep -vE '^components/(platform|componentTools/platform)/|^components/base/export\.h$') |
@@ -46,8 +46,8 @@ platformHeaders)
         complain "headers of a system outside the platform layer"
     ;;
 sourcePositions)
-    # The first argument of every exception that the library makes names one of its own sources,
-    # without extension. The name stays when the source moves into a room of its library.
+    # Every exception of the library names one of its own sources, without extension, as its first
+    # argument. The name does not change when the source moves to a subfolder.
     grep -rnoE '"components/[^"]*"' --include='*.cpp' components |
         grep -vE '\.cpp:[0-9]+:"components/.*\.h"$' |
         while IFS=: read -r file _ name; do
@@ -60,7 +60,7 @@ sourcePositions)
         complain "exceptions without a source position"
     ;;
 layers)
-    # Each library, and the libraries that it must not include.
+    # For each library, the libraries that it must not include.
     up='examples|tests|tools|benchmarks|fuzz'
     included components "$up" | complain "a library that needs what is above it"
     above() { # above LIBRARY "LIBRARIES"
@@ -78,8 +78,8 @@ layers)
         complain "includes that climb"
     ;;
 privateHeaders)
-    # What is public is at the top of its library; the rooms below are the library's own. Only tests
-    # and fuzz targets look into them.
+    # The public headers are at the top of a library's folder. The subfolders are private; only
+    # tests and fuzz targets include them.
     for file in $(sources components examples tools benchmarks); do
         search '#[[:space:]]*include[[:space:]]*"components/[a-zA-Z]+/[a-zA-Z]+/' "$file" |
             while IFS= read -r line; do
@@ -91,12 +91,13 @@ privateHeaders)
     included tools 'components/platform' | complain "the platform layer is not for clients"
     ;;
 sourcesOnce)
-    # A source that two libraries compile has its state twice.
+    # If two libraries compile one source, its state exists twice.
     search '\.\./' $(find components tools -name CMakeLists.txt 2>/dev/null) | grep -E '\.\./[a-zA-Z/]+\.cpp' |
         complain "a source of another library"
     ;;
 moduleOrder)
-    # Inside the component manager: the object model, the buffers, and the importers on top.
+    # The layers inside the component manager: the object model, the buffers, the streams, the
+    # manager, the importers.
     directory=components/componentManager
     lower() { # lower "FILES" "HEADERS that they must not include"
         search "#[[:space:]]*include[[:space:]]*\"$directory/([a-z]+/)?($2)\.h\"" \
@@ -119,7 +120,7 @@ licence)
     done | complain "sources without a licence"
     ;;
 headerCircles)
-    # Every header after those that it includes, or there is a circle.
+    # Sorts the headers topologically, which fails if includes form a cycle.
     for header in $(sources components | grep '\.h$'); do
         echo "$header $header"
         grep -oE '#include "components/[^"]+"' "$header" | cut -d'"' -f2 |

@@ -1,13 +1,13 @@
 #!/usr/bin/env bash
 # SPDX-License-Identifier: BSL-1.0
-# Proves that each rule of checkTree.sh notices what it is there for, in a tree that breaks it.
+# Tests that each rule of checkTree.sh reports a tree that violates it.
 set -u
 here=$(cd "$(dirname "$0")" && pwd)
 tree=$(mktemp -d)
 trap 'rm -rf "$tree"' EXIT
 status=0
 
-# breaks RULE FILE LINE: with that line in that file, and nothing else, the rule must complain.
+# breaks RULE FILE LINE: the rule must fail for a tree that contains only that line.
 breaks() {
     rm -rf "${tree:?}"/*
     mkdir -p "$tree/$(dirname "$2")"
@@ -18,7 +18,7 @@ breaks() {
     fi
 }
 
-# keeps RULE FILE LINE: and here it must not.
+# keeps RULE FILE LINE: the rule must pass for such a tree.
 keeps() {
     rm -rf "${tree:?}"/*
     mkdir -p "$tree/$(dirname "$2")"

@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
-/// A client that casts to every interface, and so needs the identity of each from the library.
+/// A client that uses the uid of every interface, so that it fails to link if the library lacks
+/// one.
 #include "components/componentManager/componentImp.h"
 #include "components/componentManager/importer.h"
 #include "components/componentManager/processControl.h"

@@ -1,4 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
+// Tests what compiled components rely on: the size of the public types, the uids, and the
+// signatures of the exported functions. Most of it is checked at compile time.
 #include "components/base/assertions.h"
 #include "components/componentManager/componentImp.h"
 #include "components/componentManager/importer.h"
@@ -28,7 +30,7 @@ static_assert(sizeof(QrRef<QrCastable>) == pointer);
 static_assert(sizeof(QrCPtr<QrBufferedIO>) == pointer);
 static_assert(sizeof(QrEnum::Action) == 4);
 
-// Interfaces are a table each, and nothing else.
+// An interface has no data but its vtable pointer.
 static_assert(sizeof(QrCastable) == pointer);
 static_assert(sizeof(QrBufferedIO) == pointer);
 static_assert(sizeof(QrEnumerator<const wchar_t*>) == pointer);
@@ -54,7 +56,7 @@ TEST(Layout, OfUidsIsFourLittleEndianWords) {
     EXPECT_EQ(std::memcmp(bytes, expected, sizeof bytes), 0);
 }
 
-// The identities that components were built with. `clientUids.cpp` proves that they can be linked.
+// The uids with which existing components were built. clientUids.cpp tests that they can be linked.
 static_assert(QrBufferedIO::uid == QrUid{0x81C8DF23, 0xA78111D1, 0x988A4445, 0x53540000});
 static_assert(QrBuilderDescription::uid == QrUid{0xAD148680, 0x719A11D1, 0xA3BB0060, 0x9707609D});
 static_assert(QrComponentBuilder::uid == QrUid{0xAD148681, 0x719A11D1, 0xA3BB0060, 0x9707609D});

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Pieces of code that must not compile, one at a time.
+/// Code that must not compile. The tests define one REFUSAL_ macro at a time.
 #include "components/componentKit/componentKit.h"
 #include "components/componentManager/cast.h"
 

@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Tests the vtable slot of every virtual function, since components were compiled with these slots.
 #include "components/base/assertions.h"
 #include "components/componentManager/componentImp.h"
 #include "components/componentManager/importer.h"
@@ -15,12 +16,12 @@ namespace {
 using Builders = QrEnumerator<QrCPtr<QrBuilderDescription>>;
 using Texts = QrEnumerator<const wchar_t*>;
 
-/// The first slot that an interface has to itself, behind the nine of the root.
+/// The first slot of an interface's own functions, after the nine of the root.
 constexpr std::ptrdiff_t first = 9;
 
 } // namespace
 
-// The private operations at the ends of the tables.
+// The private functions at the end of each vtable.
 namespace Mz::Test {
 
 std::ptrdiff_t endSlot(const QrBufferedIO*);
@@ -50,7 +51,7 @@ TEST(Slots, OfQrCastable) {
     EXPECT_EQ(slotOf(&C::destroy), 4);
     EXPECT_EQ(slotOf(&C::newReference), 5);
     EXPECT_EQ(slotOf(&C::release), 6);
-    EXPECT_EQ(slotCount<C>(), first) << "the destructor has the two behind release";
+    EXPECT_EQ(slotCount<C>(), first) << "the destructors have two slots after release";
 }
 
 TEST(Slots, OfQrBufferedIO) {
@@ -82,12 +83,12 @@ TEST(Slots, OfQrBufferedIO) {
     EXPECT_EQ(endSlot(static_cast<const B*>(nullptr)), next++);
     EXPECT_EQ(next - first, 24);
     EXPECT_EQ(slotCount<B>(), next);
-    EXPECT_EQ(slotCount<QrInBuffer>(), next) << "a buffer adds no operation";
+    EXPECT_EQ(slotCount<QrInBuffer>(), next) << "a buffer adds no virtual function";
     EXPECT_EQ(slotCount<QrOutBuffer>(), next);
 }
 
 TEST(Slots, OfQrEnumerator) {
-    EXPECT_EQ(slotOf(&Texts::process), 2) << "behind the two of the destructor";
+    EXPECT_EQ(slotOf(&Texts::process), 2) << "after the two slots of the destructors";
     EXPECT_EQ(slotOf(&Texts::finished), 3);
     EXPECT_EQ(endSlot(static_cast<const Texts*>(nullptr)), 4);
     EXPECT_EQ(slotCount<Texts>(), 5);
@@ -203,13 +204,13 @@ TEST(Slots, OfQrProcessControl) {
 TEST(Slots, OfExBase) {
     EXPECT_EQ(slotOf(&ExBase::getReason), 0);
     EXPECT_EQ(slotOf(&ExBase::getDetailedReason), 1);
-    EXPECT_EQ(slotOf(&ExBase::clone), 4) << "behind the two of the destructor";
+    EXPECT_EQ(slotOf(&ExBase::clone), 4) << "after the two slots of the destructors";
     EXPECT_EQ(slotCount<ExBase>(), 5);
     EXPECT_EQ(slotCount<QrStreamEx>(), 5);
     EXPECT_EQ(slotCount<QrComponentManagerEx>(), 5);
 }
 
-/// What the other tests rely on.
+/// The other tests rely on this.
 TEST(SlotOf, KnowsAnOperationThatIsNotVirtual) {
     struct Plain {
         void operation() {}

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Where virtual operations stand in the tables of classes.
+/// Finds the vtable slots of virtual functions.
 #pragma once
 
 #include <cstddef>
@@ -8,8 +8,9 @@
 
 namespace Mz::Test {
 
-/// The slot of a virtual operation. On the C++ ABI of both our platforms a pointer to a virtual
-/// member is one more than the offset of its slot in the table, and an adjustment of `this`.
+/// Returns the vtable slot of a virtual function, -1 if it is not virtual. In the C++ ABI of both
+/// platforms, a pointer to a virtual member has two parts: the offset of its slot plus one, and an
+/// adjustment of `this`.
 template <class Member>
 std::ptrdiff_t slotOf(Member member) {
     struct {
@@ -24,14 +25,15 @@ std::ptrdiff_t slotOf(Member member) {
     return parts.tableOffset / static_cast<std::ptrdiff_t>(sizeof(void*));
 }
 
-/// Tells the slot of a private operation, `template struct RevealEnd<Class, &Class::operation>;`:
-/// an explicit instantiation may name what it likes. It defines the friend, which must be declared.
+/// Gives access to the slot of a private function: `template struct RevealEnd<Class,
+/// &Class::operation>;`. An explicit instantiation may name private members. It defines the friend
+/// function, which must be declared before.
 template <class Class, void (Class::*operation)()>
 struct RevealEnd {
     friend std::ptrdiff_t endSlot(const Class*) { return slotOf(operation); }
 };
 
-/// How many slots the table of `Interface` has: the slot of the first operation behind them.
+/// Returns the number of slots of `Interface`: the slot of a function that is added after them.
 template <class Interface>
 std::ptrdiff_t slotCount() {
     struct Longer : Interface {

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
-// A client that makes something of every template that the headers offer, to be compiled with all
-// the warnings that people ask for. Headers that are found by `-I` have to stand those, too.
+// A client that instantiates every template of the headers. The test compiles it with many
+// warnings: headers found through `-I` must compile without any.
 #include "components/componentKit/componentKit.h"
 #include "components/componentKit/hostKit.h"
 #include "components/componentManager/binaryStream.h"
@@ -29,7 +29,7 @@ class Static final : public QrCastImpl<Static, Gauge> {
     int value() const override { return 1; }
 };
 
-/// Counts by itself, and lets nobody else.
+/// Has private functions for counting.
 class Private : public QrCastImpl<Private, Gauge> {
   public:
     int value() const override { return count; }
@@ -56,7 +56,7 @@ class Companion final
     }
 };
 
-/// Without `QrCastHeap`: it has companions, whose `destroy` reaches it.
+/// Does not use `QrCastHeap`: its companions would delete it with their `destroy`.
 class Owner final : public QrCastRef<QrCastImpl2<Owner, Gauge, QrTempIface<Owner, Companion>>> {
   public:
     int value() const override { return 3; }

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Written with the kit. A static object asks for the library's own description in its destructor.
+/// Written with the kit. The destructor of a static object calls the library's own entry point.
 #include "components/componentKit/componentKit.h"
 #include "tests/components/testUids.h"
 
@@ -15,7 +15,7 @@ class Object final : public QrCastRef<QrCastHeap<QrCastImpl<Object, PlainObject>
     const char* maker() const override { return "asks"; }
 };
 
-/// Counted; owns memory on the heap.
+/// A counted builder that owns heap memory.
 class CountedBuilder final : public Kit::ImportBuilder<CountedBuilder> {
   public:
     CountedBuilder()

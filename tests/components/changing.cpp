@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// One of two versions of a library, MZ_TEST_VERSION; the second has another builder besides.
+/// A library in the version MZ_TEST_VERSION, 1 or 2. Version 2 has a second builder.
 #include "tests/components/testUids.h"
 
 using namespace Mz::Test;

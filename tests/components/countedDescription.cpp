@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Returns a new counted description each time, without any reference on it.
+/// Returns a new counted description from each call, with no reference taken.
 #include "tests/components/testUids.h"
 
 using namespace Mz;

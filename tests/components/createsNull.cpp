@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Returns null instead of a builder.
 #include "tests/components/testUids.h"
 
 using namespace Mz;

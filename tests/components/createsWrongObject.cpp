@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// What it gives as a builder is a counted object of another kind.
+/// Returns a counted object of another kind instead of a builder.
 #include "tests/components/testUids.h"
 
 using namespace Mz;

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// What it exports under the entry point's name is no function.
+/// Exports data under the name of the entry point.
 #include "components/base/export.h"
 
 extern "C" {

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Two builders with one identifier.
+/// Has two builders with the same uid.
 #include "tests/components/testUids.h"
 
 using namespace Mz::Test;

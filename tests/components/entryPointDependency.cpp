@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Exports the entry point for `entryPointInDependency`, which does not.
+/// The dependency of `entryPointInDependency`. It exports the entry point, the dependent does not.
 #include "tests/components/testUids.h"
 
 MZ_PLAIN_ENTRY_POINT(Mz::Test::PlainDescription, "dependency", {{Mz::Test::faultyUid, L"faulty"}})

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Exports no entry point, but needs a library that does.
+/// Does not export the entry point, but needs a library that does.
 #include "components/base/export.h"
 
 extern "C" MZ_IMPORT int dependencyIsNeeded();

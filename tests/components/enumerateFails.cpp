@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Ends its enumeration with a failure, which says nothing about the builders it offered.
+/// Returns Fail from its enumeration, after it has offered all builders.
 #include "tests/components/testUids.h"
 
 using namespace Mz;

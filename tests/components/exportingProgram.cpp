@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// A program that exports the entry point. It is no library for all that.
+/// A program that exports the entry point. It is not a component library.
 #include "components/base/export.h"
 
 extern "C" MZ_EXPORT void* QrGetComponentDescription() {

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Its entry point, see the .def file, is another library's.
+/// Forwards its entry point to another library, see the .def file.
 extern "C" int somethingOfItsOwn() {
     return 1;
 }

@@ -1,11 +1,12 @@
 // SPDX-License-Identifier: BSL-1.0
+// A component library without faults, written without the kit.
 #include "tests/components/testUids.h"
 
 using namespace Mz::Test;
 
 namespace {
 
-/// Tells when the library comes and goes.
+/// Reports when the library is loaded and unloaded.
 struct Presence {
     Presence() { note("goodLoaded"); }
     ~Presence() { note("goodUnloaded"); }
@@ -13,7 +14,8 @@ struct Presence {
 
 } // namespace
 
-/// Compiled without care, this would keep the library mapped for good.
+/// Without -fno-gnu-unique this static member is a unique symbol, which keeps the library mapped
+/// for ever on Linux.
 template <class T>
 struct MZ_SHARED_TYPE Unique {
     static inline int counter = 0;

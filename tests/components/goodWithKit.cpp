@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// A component library without faults, written with the kit.
 #include "components/componentKit/componentKit.h"
 #include "tests/components/testUids.h"
 

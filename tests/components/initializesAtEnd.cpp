@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Initialises the manager while it is being unloaded.
+/// Initialises the manager while it is unloaded.
 #include "tests/components/testUids.h"
 
 using namespace Mz;

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// A program that is built like a component, and exports what a component exports.
+/// A program that is built like a component, needs libraries, and exports the entry point.
 #include "components/componentKit/componentKit.h"
 #include "tests/components/testUids.h"
 

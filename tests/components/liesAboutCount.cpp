@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Says MZ_TEST_COUNT, and offers another number of builders.
+/// States MZ_TEST_COUNT builders but offers another number.
 #include "tests/components/testUids.h"
 
 using namespace Mz::Test;

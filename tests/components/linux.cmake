@@ -1,14 +1,14 @@
 # SPDX-License-Identifier: BSL-1.0
-# What ends a process here.
+# Components that terminate a process on Linux.
 mz_add_fault(endsThreadInInitialiser endsThreadInInitialiser.cpp)
 mz_add_fault(throwsInFinaliser throwsInFinaliser.cpp)
 
-# One that wants to stand at an address of its own choice, and gets it in a program that does too.
+# A library linked for a fixed address. It gets that address in a position-dependent program too.
 mz_add_fault(ownAddress goodWithKit.cpp)
 target_link_options(ownAddress PRIVATE -Wl,-Ttext-segment=0x70000000)
 
-# The smallest libraries, for the probe: one for each kind of symbol table. Without the sanitizers,
-# which would make them large.
+# Minimal libraries for the probe, one for each style of hash table. Without the sanitizers, which
+# would make them large.
 foreach(style gnu sysv)
   set(name tiny-${style})
   add_library(${name} MODULE tiny.cpp)
@@ -18,8 +18,8 @@ foreach(style gnu sysv)
     LIBRARY_OUTPUT_DIRECTORY ${PROJECT_BINARY_DIR}/components/${name})
 endforeach()
 
-# Libraries that need one another, in neededTop -> neededMiddle -> neededLeaf, with the folders for
-# that in one or the other way. Those that load have to be found, and the others not.
+# Libraries in a chain of dependencies: the component needs neededMiddle, which needs neededLeaf.
+# Each component uses other folders and tags, so that the loader finds all of the chain or not.
 #   mz_add_needed(NAME FUNCTION function [NEXT function LIBRARY library] [FOLDER folder] [TAGS tags]
 #     [RPATH folders...] [SONAME name])
 function(mz_add_needed name)
@@ -35,7 +35,7 @@ function(mz_add_needed name)
   endif()
   if(arg_SONAME)
     set_target_properties(${name} PROPERTIES NO_SONAME ON)
-    # In a file, where neither the build tool nor the shell sees the variable.
+    # In a response file, so that neither the build tool nor the shell expands the variable.
     file(CONFIGURE OUTPUT ${CMAKE_CURRENT_BINARY_DIR}/${name}.options @ONLY
       CONTENT "-Wl,-soname,@arg_SONAME@\n")
     target_link_options(${name} PRIVATE @${CMAKE_CURRENT_BINARY_DIR}/${name}.options)

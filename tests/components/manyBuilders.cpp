@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Has thousands of builders but states one.
 #include "tests/components/testUids.h"
 
 using namespace Mz;

@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Needs a library that the loader does not find.
 #include "tests/components/testUids.h"
 
 extern "C" MZ_IMPORT int absentFunction();

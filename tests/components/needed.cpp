@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Libraries that need one another, for the rules by which the loader finds them. Each calls the
-/// next one, so that the linker keeps the need.
+/// The source of libraries that need one another, for tests of the loader's search rules. Each
+/// calls a function of the next one, so that the linker keeps the dependency.
 #if defined(MZ_TEST_NEXT)
 extern "C" __attribute__((visibility("default"))) int MZ_TEST_NEXT();
 #endif

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Exports something, but not the entry point. Its initialiser must never run; if it does, it
-/// leaves the file that the environment names.
+/// Exports a function but not the entry point. Its initialiser must not run: it writes the file
+/// that the variable MZ_TEST_MARK names.
 #include "components/base/export.h"
 
 #include <cstdlib>

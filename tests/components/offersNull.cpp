@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Offers null after its builders.
 #include "tests/components/testUids.h"
 
 using namespace Mz;

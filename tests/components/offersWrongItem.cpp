@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Its item has the class of a builder description, but does not answer for that interface.
+/// Offers an item that derives from QrBuilderDescription, but whose cast to it fails.
 #include "tests/components/testUids.h"
 
 using namespace Mz;

@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Needs a library that only its own manifest lets the loader find.
 #include "tests/components/testUids.h"
 
 extern "C" MZ_IMPORT unsigned int sideBySideNumber();

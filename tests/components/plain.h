@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Component libraries written by hand, without the component kit, down to the few classes that
-/// each of them needs. A library with a fault derives from one of them and gets one thing wrong.
+/// Base classes for component libraries that are written without the kit. A library with a fault
+/// overrides one function of them.
 #pragma once
 
 #include "components/componentManager/componentImp.h"
@@ -11,7 +11,7 @@
 
 namespace Mz::Test {
 
-/// What a builder says of itself.
+/// The data of a builder description.
 struct PlainInfo {
     QrUid uid{};
     const wchar_t* name = L"";
@@ -21,12 +21,12 @@ struct PlainInfo {
     bool flag = false;
 };
 
-/// A uid of the test components' own family.
+/// Returns a uid of the family that the test components use.
 constexpr QrUid testUid(std::uint32_t number) {
     return {number, 0x3C5A11EF, 0x8D1B2C00, 0x6F40A9D7};
 }
 
-/// What the builders of test components make: an object that says who made it.
+/// The interface of the objects of test components: returns the name of their maker.
 class PlainObject : public QrCastable {
   public:
     using Self = PlainObject;
@@ -45,7 +45,7 @@ class NamedObject final : public QrCastRef<QrCastHeap<QrCastImpl<NamedObject, Pl
     const char* name;
 };
 
-/// A builder that makes such objects.
+/// A builder of such objects.
 class PlainBuilder final
     : public QrCastRef<QrCastHeap<QrCastImpl<PlainBuilder, QrComponentBuilder>>> {
   public:
@@ -61,7 +61,7 @@ class PlainBuilder final
     const char* maker;
 };
 
-/// The description of one builder; not the builder itself.
+/// The description of one builder; it is not the builder itself.
 class PlainBuilderDescription final
     : public QrCastRef<QrCastHeap<QrCastImpl<PlainBuilderDescription, QrBuilderDescription>>> {
   public:
@@ -75,7 +75,7 @@ class PlainBuilderDescription final
     const wchar_t* getText() const override { return info.text; }
     bool getFlag() const override { return info.flag; }
 
-    // The manager has no need to ask an item for any of these.
+    // The manager does not need these of an item.
     const wchar_t* getComponentLabel() const override { return surprise(); }
     const wchar_t* getComponentText() const override { return surprise(); }
     QrRefPtr<QrComponentBuilder> getBuilder() override { return surprise(), nullptr; }
@@ -90,7 +90,7 @@ class PlainBuilderDescription final
     PlainInfo info;
 };
 
-/// A library's description of itself, with any number of builders.
+/// The description of a library with any number of builders.
 template <class Base = QrCastImpl<QrComponentDescription, QrComponentDescription>>
 class PlainDescriptionOver : public Base {
   public:
@@ -123,12 +123,12 @@ class PlainDescriptionOver : public Base {
     std::vector<PlainInfo> builders;
 };
 
-/// One that does not count, for a static object.
+/// A description that does not count, for static objects.
 using PlainDescription = PlainDescriptionOver<>;
 
 } // namespace Mz::Test
 
-/// Defines the entry point of a library that always returns one static `Description`, made with the
+/// Defines an entry point that always returns one static `Description`, constructed from the
 /// arguments.
 #define MZ_PLAIN_ENTRY_POINT(Description, ...)                                                     \
     extern "C" MZ_EXPORT Mz::QrCastable* QrGetComponentDescription() {                             \

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Uses the manager from within everything that the manager calls.
+/// Calls the manager from its entry point and from its enumeration.
 #include "tests/components/testUids.h"
 
 using namespace Mz;

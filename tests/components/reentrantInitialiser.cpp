@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Asks for its own builder while it is being loaded.
+/// Asks the manager for its own builder while it is loaded.
 #include "tests/components/testUids.h"
 
 using namespace Mz;

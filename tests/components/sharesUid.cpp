@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// One of two libraries with a builder of the same identifier; MZ_TEST_SHARER says which.
+/// One of two libraries that have a builder with the same uid. MZ_TEST_SHARER is its number.
 #include "tests/components/testUids.h"
 
 using namespace Mz::Test;

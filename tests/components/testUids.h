@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// The builders of the test components.
+/// The uids of the builders of the test components.
 #pragma once
 
 #include "tests/components/plain.h"
@@ -25,7 +25,7 @@ inline constexpr QrUid reentrantUid = testUid(16);
 inline constexpr QrUid reentrantInitialiserUid = testUid(17);
 inline constexpr QrUid finaliserUid = testUid(18);
 inline constexpr QrUid manifestUid = testUid(19);
-inline constexpr QrUid faultyUid = testUid(20); ///< of libraries whose builders must not stay
+inline constexpr QrUid faultyUid = testUid(20); ///< for libraries whose builders must be dropped
 inline constexpr QrUid changingSecondUid = testUid(21);
 inline constexpr QrUid exitsUid = testUid(22);
 inline constexpr QrUid asksUid = testUid(23);

@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Throws when it creates a builder.
 #include "tests/components/testUids.h"
 
 #include <stdexcept>

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Offers some builders, then throws an exception of a type that nobody else knows.
+/// Offers builders, then throws an exception of a type that only this library defines.
 #include "tests/components/testUids.h"
 
 #include <string>

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Has no description, and throws while it is unloaded for that.
+/// Returns no description, and throws when it is unloaded.
 #include "tests/components/testUids.h"
 
 #include <stdexcept>

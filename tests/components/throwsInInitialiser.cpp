@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Throws in the initialiser of a static object.
 #include "tests/components/testUids.h"
 
 #include <stdexcept>

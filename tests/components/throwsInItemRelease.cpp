@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// One of its items throws from the first `release`.
+/// Offers an item that throws in its first `release`.
 #include "tests/components/testUids.h"
 
 #include <stdexcept>

@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Throws in getComponentLabel.
 #include "tests/components/testUids.h"
 
 #include <stdexcept>

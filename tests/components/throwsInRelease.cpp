@@ -1,8 +1,8 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Its description throws from `release`, from the MZ_TEST_RELEASE-th call on.
+/// Its description throws in `release`, from the MZ_TEST_RELEASE-th call on.
 ///
-/// A registration releases twice: the pointer of the entry point, and the interface cast from it.
-/// So does each request for a builder.
+/// A registration releases twice: the reference of the entry point, and that of the cast. So does
+/// each request for a builder.
 #include "tests/components/testUids.h"
 
 #include <stdexcept>
@@ -13,7 +13,7 @@ using namespace Mz::Test;
 
 namespace {
 
-/// Its code lives in this library, which must stay loaded while it exists.
+/// The code of this class is in this library, which must stay loaded while an exception exists.
 class OwnException final : public std::runtime_error {
   public:
     OwnException() : std::runtime_error("in release") { note("exceptionMade"); }

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// One of its items throws when asked for its text.
+/// Offers an item that throws in getText.
 #include "tests/components/testUids.h"
 
 using namespace Mz;

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// The smallest library with the entry point; it needs no other library.
+/// A minimal library with the entry point, which needs no other library.
 #include "components/base/export.h"
 
 extern "C" {

@@ -1,6 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Neither what the entry point returns nor its item nor its builder answers for its interface;
-/// translators do for each.
+/// Only translators answer the casts of its description, its item and its builder.
 #include "tests/components/testUids.h"
 
 using namespace Mz;
@@ -12,7 +11,7 @@ bool all(const QrUid&) {
     return true;
 }
 
-/// Answers for nothing.
+/// Answers no cast.
 template <class Iface>
 class Mute : public QrCastImpl<Mute<Iface>, Iface> {
   public:

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// What it returns is no description, and counted.
+/// Returns a counted object that is not a description.
 #include "tests/components/testUids.h"
 
 extern "C" MZ_EXPORT Mz::QrCastable* QrGetComponentDescription() {

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// What discovery leaves in the map of the libraries' names.
+/// Tests the map from names to library records that discovery fills.
 #include "tests/integration/managerFixture.h"
 
 using namespace Mz;
@@ -25,7 +25,7 @@ TEST_F(DiscoveryMap, KeepsTheFirstOfTwoRecordsOfOneNameInTheMap) {
     EXPECT_FALSE(found.front().module);
     EXPECT_EQ(found.front().fileTime, 0u);
     EXPECT_EQ(found.front().fileSize, 0);
-    // A second walk adds records, and leaves the map's entries as they are.
+    // A second walk appends records but keeps the entries of the map.
     manager->discover(searchPathOf(folder.path()).c_str(), found, byName);
     EXPECT_EQ(byName.size(), 2u);
     EXPECT_EQ(&**byName.find({found.front().directory, L"a"}), &found.front());

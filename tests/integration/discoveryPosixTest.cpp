@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
-/// What files are on Linux alone: pipes, links, and names that differ in letter case only.
+/// Tests discovery with files that only Linux has: pipes, symlinks, and names that differ in letter
+/// case alone.
 #include "components/componentKit/hostKit.h"
 #include "tests/integration/managerFixture.h"
 #include "tests/support/failingOpen.h"
@@ -26,7 +27,7 @@ namespace {
 class PosixDiscovery : public ManagerTest {};
 
 TEST_F(PosixDiscovery, DoesNotOpenAPipe) {
-    // Whoever opened it for reading would wait for a writer, for ever.
+    // Opening a pipe for reading blocks until it has a writer. This one never has one.
     ASSERT_EQ(::mkfifo((folder.path() / "pipe.so").c_str(), 0600), 0);
     add(L"goodWithKit");
     initialize();
@@ -41,7 +42,7 @@ TEST_F(PosixDiscovery, DoesNotOpenAPipeThatTookTheFilesPlaceLater) {
     initialize();
     std::filesystem::remove(file);
     ASSERT_EQ(::mkfifo(file.c_str(), 0600), 0);
-    // Open for both, so that a reader is not kept waiting, and full enough for a whole header.
+    // Open both ends so that a reader does not block. Write enough for a whole ELF header.
     const int pipe = ::open(file.c_str(), O_RDWR | O_NONBLOCK);
     const std::string garbage(8192, 'x');
     ASSERT_EQ(::write(pipe, garbage.data(), garbage.size()), 8192);
@@ -100,7 +101,7 @@ TEST_F(PosixDiscovery, KeepsOneRecordEachOfNamesThatDifferInLetterCaseOnly) {
         EXPECT_EQ(library.fileName, L"lib.so");
     EXPECT_EQ(maker(goodUid), "good");
     EXPECT_EQ(maker(kitUid), "kit");
-    EXPECT_EQ(names(), (Names{L"kit", L"Name", L"name", L"third"})); // By their bytes.
+    EXPECT_EQ(names(), (Names{L"kit", L"Name", L"name", L"third"})); // In byte order.
 }
 
 TEST_F(PosixDiscovery, KeepsBothRecordsOfSuchNamesFromAnEarlierStart) {
@@ -133,7 +134,7 @@ TEST_F(PosixDiscovery, KeepsTheRecordsOfSuchFoldersToo) {
 TEST_F(PosixDiscovery, ReadsSuchFilesAfreshWhenNobodyCanSayWhoseTheRecordsAre) {
     const auto lower = add(L"goodByHand", "lib.so");
     recordBuilder(record(lower), goodUid, L"recorded good");
-    add(L"goodWithKit", "LIB.so"); // Comes before it.
+    add(L"goodWithKit", "LIB.so"); // Sorts before lib.so.
     initialize();
     EXPECT_EQ(names(), (Names{L"kit", L"Name", L"name", L"third"}));
     EXPECT_EQ(maker(goodUid), "good");
@@ -143,7 +144,7 @@ TEST_F(PosixDiscovery, ReadsSuchFilesAfreshWhenNobodyCanSayWhoseTheRecordsAre) {
 TEST_F(PosixDiscovery, ReadsSuchAFileAfreshWhenItsNamesakeIsGone) {
     const auto lower = add(L"goodByHand", "lib.so");
     const auto upper = add(L"goodByHand", "LIB.so");
-    // Two builds of one moment and one size.
+    // Both files have the same time and size, so these cannot tell the records apart.
     std::filesystem::last_write_time(upper, std::filesystem::last_write_time(lower));
     recordBuilder(record(upper), kitUid, L"the upper one's");
     recordBuilder(record(lower), countedUid, L"the lower one's");
@@ -308,7 +309,7 @@ TEST_F(PosixDiscovery, PassesOverATruncatedLibraryAtEveryPage) {
     EXPECT_EQ(names(), (Names{L"kit"}));
 }
 
-/// Holds back files while libraries are recorded, from the first that describes itself on.
+/// Lets `open` fail as soon as the first library enumerates its builders.
 std::optional<FailingOpen> shortage;
 
 TEST_F(PosixDiscovery, NotesNothingOfAFileThatItCannotOpenForWantOfDescriptors) {
@@ -334,7 +335,7 @@ TEST_F(PosixDiscovery, NotesNothingOfAFileThatItCannotOpenForWantOfDescriptors) 
     EXPECT_FALSE(find(changed)->module);
     EXPECT_EQ(find(changed)->fileTime, oldTime);
     EXPECT_FALSE(indexed(countedUid));
-    // The next start, with what this one would have stored, finds both.
+    // The next start reads the record that this start would store. It must find both libraries.
     const std::uint32_t time = find(later)->fileTime;
     const int64 size = find(later)->fileSize;
     restart();
@@ -360,7 +361,7 @@ TEST_F(PosixDiscovery, KeepsNoNoteOfARecordedFileThatItCannotOpenForWantOfDescri
     }
     EXPECT_THAT(names(), IsEmpty());
     EXPECT_FALSE(library.module);
-    // Time and size without builders would keep the library from ever being read again.
+    // A record with time and size but without builders would never be read again.
     EXPECT_EQ(library.fileTime, 0u);
     EXPECT_EQ(library.fileSize, 0);
     EXPECT_TRUE(held->getBuilder());
@@ -371,7 +372,7 @@ TEST_F(PosixDiscovery, PassesOverFilesThatMayNotBeRead) {
     const auto file = add(L"goodByHand");
     std::filesystem::permissions(file, std::filesystem::perms::none);
     add(L"goodWithKit", "zz");
-    // The superuser may read everything, so be somebody else for the while.
+    // The superuser can read every file. Switch to another user for this test.
     const uid_t before = ::geteuid();
     if (before == 0) {
         ASSERT_EQ(::seteuid(65534), 0);

@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Which files of which folders become records, and what becomes of those that are no libraries.
+/// Tests which files of which folders become library records, and what the records of other files
+/// contain.
 #include "tests/integration/managerFixture.h"
 
 #include <fstream>
@@ -25,7 +26,8 @@ class Discovery : public ManagerTest {
         return std::string(std::istreambuf_iterator<char>(stream), {});
     }
 
-    /// The file is looked at once, found to be nothing, and not looked at again.
+    /// Expects that the file was checked, has no builders, and has its time and size recorded. A
+    /// later start then skips it.
     void expectNothing(const std::filesystem::path& file) {
         ComponentLibrary* library = find(file);
         ASSERT_TRUE(library);
@@ -165,7 +167,7 @@ TEST_F(Discovery, PassesOverALibraryTruncatedAtManyLengths) {
 
 TEST_F(Discovery, PassesOverALibraryForAnotherProcessor) {
     std::string content = contentOf(builtComponent(L"goodByHand"));
-    // Where the file says what it is for: behind the ELF identification, or behind "PE".
+    // The offset of the machine type: 18 in an ELF header, 4 after the "PE" signature.
     const bool elf = content.substr(0, 4) == "\177ELF";
     const std::size_t position =
         elf ? 18
@@ -191,7 +193,7 @@ TEST_F(Discovery, PassesOverAProgramThatExportsTheEntryPoint) {
 }
 
 TEST_F(Discovery, PassesOverTwoProgramsThatExportTheEntryPointAndNeedLibraries) {
-    // The first gets the address that both were linked for, and the second another one.
+    // Both programs are linked for the same address. The first gets it, the second is relocated.
     const auto program =
         buildFolder / "components" / "kitProgram" / L"kitProgram" MZ_PROGRAM_EXTENSION;
     const auto first = folder.path() / L"first" MZ_PROGRAM_EXTENSION;
@@ -213,7 +215,7 @@ TEST_F(Discovery, NotesAFailedFileSoThatALaterStartDoesNotTryIt) {
     const std::uint32_t time = find(file)->fileTime;
     const int64 size = find(file)->fileSize;
     restart();
-    // The same file, of the same time and size, would load now; nobody looks.
+    // A library of the same time and size replaces the text file. The manager must not read it.
     const auto stamp = std::filesystem::last_write_time(file);
     add(L"goodByHand", "text");
     std::filesystem::last_write_time(file, stamp);

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// What files and libraries are on Windows alone: attributes, manifests, forwarded exports.
+/// Tests discovery with what only Windows has: file attributes, manifests and forwarded exports.
 #include "tests/integration/managerFixture.h"
 #include "tests/support/peFile.h"
 
@@ -48,7 +48,8 @@ TEST_F(WindowsDiscovery, TakesReadOnlyFiles) {
 }
 
 TEST_F(WindowsDiscovery, LoadsALibraryInTheSurroundingsOfItsOwnManifest) {
-    // The library beside it without the manifest shows that nothing else would find what it needs.
+    // noManifest.dll, the same library without a manifest, shows that its dependency is not found
+    // otherwise.
     manager->initialize(searchPathOf(buildFolder / "components" / "ownManifest").c_str());
     EXPECT_EQ(names(), (Names{L"manifest"}));
     ASSERT_TRUE(find("ownManifest.dll"));
@@ -146,7 +147,7 @@ TEST_F(WindowsDiscovery, PassesOverALibraryOf32Bits) {
 }
 
 TEST_F(WindowsDiscovery, UsesTheProgramOfTheHostWhereItLiesInTheSearchPath) {
-    // A module that is mapped is used as it is, and not read: this one exports no entry point.
+    // A mapped module is used without a check of its exports: the program exports no entry point.
     std::wstring name(MAX_PATH, L'\0');
     name.resize(::GetModuleFileNameW(nullptr, name.data(), MAX_PATH));
     const std::filesystem::path program(name);

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// The reader of ELF symbol tables, on sound libraries and on everything else.
+/// Tests the reader of ELF symbol tables with valid, damaged and random files.
 #include "components/platform/posix/elfProbe.h"
 #include "tests/integration/managerFixture.h"
 
@@ -20,7 +20,7 @@ namespace {
 
 constexpr const char* entryPoint = "QrGetComponentDescription";
 
-/// A file without a name.
+/// A file in memory, readable through a descriptor.
 class MemoryFile {
   public:
     explicit MemoryFile(const std::string& content) : descriptor(::memfd_create("elf", 0)) {
@@ -68,7 +68,7 @@ void put(std::string& content, std::size_t offset, const T& value) {
     std::memcpy(content.data() + offset, &value, sizeof value);
 }
 
-/// One kind of symbol table after the other.
+/// Each test runs with both kinds of hash table: GNU and System V.
 class ElfProbe : public ::testing::TestWithParam<const wchar_t*> {
   protected:
     ElfProbe() : whole(contentOf(builtComponent(GetParam()))) {}
@@ -77,7 +77,7 @@ class ElfProbe : public ::testing::TestWithParam<const wchar_t*> {
 
     Elf64_Ehdr header() const { return get<Elf64_Ehdr>(whole, 0); }
 
-    /// The content with a changed header.
+    /// Returns the content with `change` applied to its ELF header.
     template <class Change>
     std::string withHeader(Change change) const {
         std::string content = whole;
@@ -87,7 +87,7 @@ class ElfProbe : public ::testing::TestWithParam<const wchar_t*> {
         return content;
     }
 
-    /// The offset of the first program header of that type.
+    /// Returns the offset of the first program header of that type.
     std::size_t segment(std::uint32_t type) const {
         for (std::size_t index = 0; index < header().e_phnum; ++index) {
             const std::size_t offset = header().e_phoff + index * sizeof(Elf64_Phdr);
@@ -98,7 +98,7 @@ class ElfProbe : public ::testing::TestWithParam<const wchar_t*> {
         return 0;
     }
 
-    /// The offset of the dynamic entry with that tag.
+    /// Returns the offset of the dynamic entry with that tag.
     std::size_t dynamicEntry(std::int64_t tag) const {
         const auto dynamic = get<Elf64_Phdr>(whole, segment(PT_DYNAMIC));
         for (std::size_t offset = dynamic.p_offset;; offset += sizeof(Elf64_Dyn)) {
@@ -112,7 +112,8 @@ class ElfProbe : public ::testing::TestWithParam<const wchar_t*> {
         return 0;
     }
 
-    /// Where the hash table stands in the file; the library maps its first segment at address 0.
+    /// Returns the file offset of the hash table. The library maps its first segment at address 0,
+    /// so offsets equal addresses.
     std::size_t hashTable() const {
         return get<Elf64_Dyn>(whole, dynamicEntry(usesGnuHash() ? DT_GNU_HASH : DT_HASH))
             .d_un.d_ptr;
@@ -152,7 +153,7 @@ TEST_P(ElfProbe, FindsNothingInALibraryCutAtAnyLength) {
         if (file.exports())
             found.push_back(length);
     }
-    EXPECT_TRUE(found.empty()) << "taken for a library at " << found.size() << " lengths from "
+    EXPECT_TRUE(found.empty()) << "accepted as a library at " << found.size() << " lengths from "
                                << found.back() << " to " << found.front() << " of " << whole.size();
 }
 
@@ -176,7 +177,7 @@ TEST_P(ElfProbe, SurvivesRandomDamage) {
     for (int round = 0; round < rounds; ++round) {
         std::string content = whole;
         for (auto count = 1 + random() % 8; count > 0; --count) {
-            // Half of it where the tables are.
+            // Half of the damage hits the tables at the beginning.
             const std::size_t range = random() % 2 ? content.size() : 1024;
             content[random() % range] = static_cast<char>(random());
         }
@@ -249,7 +250,8 @@ TEST_P(ElfProbe, RefusesNamesThatLeadOutOfTheTableOfStrings) {
     for (const std::int64_t tag : {DT_NEEDED, DT_SONAME, DT_RPATH, DT_RUNPATH}) {
         const auto withName = [&](std::uint64_t position) {
             std::string content = whole;
-            // The loader takes no notice of the size of symbols: its entry has room.
+            // The loader ignores the entry for the size of symbols, so the test puts its entry
+            // there.
             Elf64_Dyn entry{};
             entry.d_tag = tag;
             entry.d_un.d_val = position;
@@ -270,7 +272,7 @@ TEST_P(ElfProbe, RefusesATableOfStringsThatHasNoEnd) {
     content[strings + size - 1] = 'x';
     EXPECT_FALSE(exports(content));
     EXPECT_FALSE(exports(withDynamic(DT_STRSZ, whole.size())));
-    EXPECT_FALSE(exports(withDynamic(DT_STRSZ, ~std::uint64_t{0}))); // "Ends" before it begins.
+    EXPECT_FALSE(exports(withDynamic(DT_STRSZ, ~std::uint64_t{0}))); // Its end overflows.
 }
 
 TEST_P(ElfProbe, RefusesSegmentsWithOffsetsNearTheEndOfAllNumbers) {
@@ -284,7 +286,7 @@ TEST_P(ElfProbe, RefusesSegmentsWithOffsetsNearTheEndOfAllNumbers) {
         EXPECT_FALSE(exports(content));
     }
     changed = get<Elf64_Phdr>(whole, dynamic);
-    changed.p_filesz = ~std::uint64_t{0}; // Its end is marked by an entry, not by the size.
+    changed.p_filesz = ~std::uint64_t{0}; // Must not crash. An entry marks the end, not the size.
     put(content, dynamic, changed);
     static_cast<void>(exports(content));
     content = whole;
@@ -313,7 +315,7 @@ TEST_P(ElfProbe, EndsOnAChainThatNeverEnds) {
     const std::size_t table = hashTable();
     const auto buckets = get<std::uint32_t>(content, table);
     if (usesGnuHash()) {
-        // The filter lets everything pass, and no entry of the chains is the last one.
+        // The filter passes every name, and no entry ends its chain.
         const auto filter = get<std::uint32_t>(content, table + 8);
         for (std::size_t word = 0; word < filter; ++word)
             put(content, table + 16 + word * 8, ~std::uint64_t{0});
@@ -322,7 +324,7 @@ TEST_P(ElfProbe, EndsOnAChainThatNeverEnds) {
             put(content, chains + entry * 4,
                 get<std::uint32_t>(content, chains + entry * 4) & ~std::uint32_t{1});
     } else {
-        // Every entry leads to itself.
+        // Every entry points to itself.
         const auto entries = get<std::uint32_t>(content, table + 4);
         for (std::uint32_t entry = 0; entry < entries; ++entry)
             put(content, table + 8 + buckets * 4 + entry * 4, entry);
@@ -332,7 +334,7 @@ TEST_P(ElfProbe, EndsOnAChainThatNeverEnds) {
 }
 
 TEST_P(ElfProbe, RefusesSymbolsThatAreNotForOthersToSee) {
-    // Each symbol is told by its type and visibility; what is changed here is all of them.
+    // Changes all symbols that a lookup could find.
     const std::size_t symbols = get<Elf64_Dyn>(whole, dynamicEntry(DT_SYMTAB)).d_un.d_ptr;
     const auto changed = [&](auto change) {
         std::string content = whole;

@@ -1,4 +1,7 @@
 // SPDX-License-Identifier: BSL-1.0
+/// Tests that a faulty component library does no harm to the manager or to other libraries, and
+/// what the manager records of it. The faulty libraries are in tests/components; they report events
+/// to the test journal.
 #include "tests/integration/managerFixture.h"
 
 #include <stdexcept>
@@ -8,7 +11,8 @@ using namespace Mz::Test;
 
 namespace {
 
-/// Every test stands a sound library on both sides of the faulty one: neither may suffer.
+/// Places a working library before and one after the faulty library in the search order. Both must
+/// keep their builders.
 class FaultyComponent : public ManagerTest {
   protected:
     FaultyComponent() {
@@ -16,7 +20,7 @@ class FaultyComponent : public ManagerTest {
         add(L"goodWithKit", L"zz" MZ_LIBRARY_EXTENSION);
     }
 
-    /// Starts with the faulty component; it must end unloaded and without builders.
+    /// Initialises with the faulty component and expects it to be unloaded and without builders.
     ComponentLibrary& expectDropped(const std::wstring& component) {
         file = add(component);
         initialize();
@@ -36,7 +40,8 @@ class FaultyComponent : public ManagerTest {
         return library;
     }
 
-    /// The file's state was noted, and therefore it is not tried again before it changes.
+    /// Expects that the record has the file's time and size: the library is not tried again until
+    /// the file changes.
     void expectNotTriedAgain(ComponentLibrary& library) {
         const std::optional<platform::FileStatus> status = platform::queryFile(file);
         EXPECT_EQ(library.fileTime, status->time);
@@ -48,7 +53,8 @@ class FaultyComponent : public ManagerTest {
         EXPECT_FALSE(isMapped(file));
     }
 
-    /// What failed with an exception is not noted and is tried again.
+    /// Expects that the record has neither time nor size, as after an exception: the library is
+    /// tried again.
     void expectTriedAgain(ComponentLibrary& library) {
         EXPECT_EQ(library.fileTime, 0u);
         EXPECT_EQ(library.fileSize, 0);
@@ -65,7 +71,7 @@ TEST_F(FaultyComponent, WithoutEntryPointIsNeverLoadedAndItsInitialiserNeverRuns
     setEnvironment("MZ_TEST_MARK", mark.string());
     expectNotTriedAgain(expectDropped(L"noEntryPoint"));
     EXPECT_FALSE(std::filesystem::exists(mark));
-    // The mark works: whoever loads the library runs the initialiser.
+    // Control: loading the library runs its initialiser, which writes the mark.
     void* const host = loadAsHost(file);
     ASSERT_TRUE(host);
     EXPECT_TRUE(std::filesystem::exists(mark));
@@ -126,7 +132,8 @@ TEST_F(FaultyComponent, ThrowingInEnumerateIsUnloadedOnlyAfterItsExceptionIsGone
 }
 
 TEST_F(FaultyComponent, ThrowingTakesAnotherLibrarysIdentifierWithItFromTheIndex) {
-    // It registers a builder of the other's identifier before it throws, and is dropped by it.
+    // It registers a builder with the uid of the other library. Dropping it removes that uid from
+    // the index.
     const auto good = add(L"goodByHand", L"b" MZ_LIBRARY_EXTENSION);
     file = add(L"throwsInEnumerate");
     initialize();
@@ -149,10 +156,11 @@ TEST_F(FaultyComponent, ThrowingInTheTextOfAnItemIsUnloaded) {
 
 TEST_F(FaultyComponent, ThrowingInTheReleaseOfTheEntryPointsReferenceIsUnloaded) {
     ComponentLibrary& library = expectDropped(L"throwsInFirstRelease");
-    // Both references were given back, and no exception outlived the library.
+    // Both references were released, and the exception was destroyed before the library was
+    // unloaded.
     EXPECT_EQ(noted("taken"), 2);
     EXPECT_EQ(noted("released"), 2);
-    EXPECT_EQ(noted("enumerate"), 1); // By the sound library before it.
+    EXPECT_EQ(noted("enumerate"), 1); // The working library before it.
     EXPECT_EQ(noted("exceptionMade"), noted("exceptionGone"));
     const std::string events = allNotes();
     EXPECT_LT(events.rfind("exceptionGone"), events.rfind("throwerUnloaded"));
@@ -310,7 +318,7 @@ TEST_F(FaultyComponent, ThatThrowsInReleaseForABuilderPassesThatToTheClientAndSt
     EXPECT_EQ(names(), (Names{L"counted", L"release throws", L"kit"}));
     forgetNotes();
     EXPECT_THROW(manager->getBuilder(faultyUid), std::runtime_error);
-    EXPECT_EQ(noted("builderMade"), 0); // Thrown before the builder was asked for.
+    EXPECT_EQ(noted("builderMade"), 0); // It throws before it creates the builder.
     EXPECT_EQ(noted("taken"), 2);
     EXPECT_EQ(noted("released"), 2);
     EXPECT_THROW(manager->createObject(faultyUid), std::runtime_error);
@@ -359,7 +367,7 @@ TEST_F(FaultyComponent, ThatInitialisesTheManagerWhileUnloadedFindsItGone) {
     manager.reset();
     setManagerUnderTest(nullptr);
     EXPECT_EQ(noted("ended"), 1);
-    EXPECT_EQ(noted("enumerate"), 0); // Nothing was scanned again.
+    EXPECT_EQ(noted("enumerate"), 0); // No library was enumerated again.
     EXPECT_FALSE(isMapped(file));
 }
 

@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
-/// What ends a process on Linux, shown in a process of its own.
+/// Tests host programs on Linux: which faults of a component terminate the process, and how a
+/// program is affected by its own address and the locale. Each test runs the program testHost.
 #include "tests/integration/managerFixture.h"
 
 using namespace Mz::Test;
@@ -15,7 +16,7 @@ class EndingHost : public ManagerTest {
         return runProgram(buildFolder / "bin" / "testHost", "testHost", options, folder.path());
     }
 
-    /// The initialiser of `component` must reach std::terminate, whatever handlers the host has.
+    /// Expects that `component` causes a call of std::terminate, whatever handlers the host has.
     void expectTerminated(const std::wstring& component, const std::vector<std::string>& options) {
         const ProgramResult result = runOn(component, options);
         EXPECT_TRUE(result.finished);
@@ -54,7 +55,7 @@ TEST_F(EndingHost, IsNotEndedByAnEntryPointThatThrows) {
 
 class Host : public ManagerTest {
   protected:
-    /// Runs `program`, called `name`, on the search path `arguments`.
+    /// Runs `program` with `name` as its argv[0], and returns its output.
     std::string outputOf(const std::filesystem::path& program, const std::string& name,
                          const std::vector<std::string>& arguments) {
         const ProgramResult result = runProgram(program, name, arguments, folder.path());
@@ -72,7 +73,7 @@ TEST_F(Host, UsesALibraryThatStandsAtTheAddressItWants) {
 }
 
 TEST_F(Host, SearchesNothingWhenTheLocaleHasNoFormForItsOwnFolder) {
-    add(L"goodWithKit"); // In the current folder.
+    add(L"goodWithKit"); // The current folder of the program.
     const std::filesystem::path own = folder.path() / "lat\xE9";
     std::filesystem::create_directory(own);
     std::filesystem::copy_file(builtComponent(L"offersNothing"), own / "nothing.so");

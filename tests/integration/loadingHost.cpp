@@ -1,19 +1,18 @@
 // SPDX-License-Identifier: BSL-1.0
-/// A host that loads the component manager while it runs and unloads it again.
+/// A host program that loads and unloads the component manager at run time.
 ///
 ///     loadingHost LIBRARY FUNCTION MODE PATH...
 ///
-/// LIBRARY is libMZcomponentManager itself or a plug-in that uses it, and FUNCTION what gives its
-/// manager. Each PATH is a file whose presence in the process is printed at the end.
+/// LIBRARY is libMZcomponentManager or a plug-in that uses it. FUNCTION is its function that
+/// returns the manager. At the end the program prints for each PATH whether that file is mapped.
 ///
-///     cycles      300 times: loads, initialises without a path that holds anything, unloads
-///     growth      1,000 times the same, with entries left in the registries; prints "grew" or not
-///     threads     four threads at once, 75 cycles each
-///     component   300 times: loads, initialises with the folder of the first PATH, makes an
-///     object,
-///                 unloads
+///     cycles      300 times: loads, initialises with a folder that does not exist, unloads
+///     growth      1,000 times the same, with entries in the registries; prints whether memory grew
+///     threads     loads and unloads on four threads at once, 75 cycles each
+///     component   300 times: loads, initialises with the folder of the first PATH, creates an
+///                 object, unloads
 ///     thread      the same once, on a thread that ends before the library is unloaded
-///     copy        the same once; then a copy of the process ends before the process does
+///     copy        the same once; then a forked copy of the process ends before the process
 #include "tests/components/testUids.h"
 #include "tests/support/testSystem.h"
 
@@ -62,7 +61,7 @@ void useWithoutComponents() {
     unloadAsHost(module);
 }
 
-/// The registries never look at what they are given.
+/// Leaves entries in the registries. They never dereference these pointers.
 void leaveEntries() {
     void* const module = load();
     static char anything[3];
@@ -78,7 +77,7 @@ void leaveEntries() {
 }
 
 void measureGrowth() {
-    // A plug-in leaves entries by itself.
+    // A plug-in leaves its entries itself.
     const auto cycle = [] {
         std::string_view(function) == "QrGetComponentManager" ? leaveEntries()
                                                               : useWithoutComponents();
@@ -90,7 +89,7 @@ void measureGrowth() {
     const std::size_t before = allocatedBytes();
     for (std::size_t count = 0; count < cycles; ++count)
         cycle();
-    // Less than a byte for each cycle: what the loader and the heap keep varies a little.
+    // Allow less than one byte per cycle: the memory of the loader and the heap varies a little.
     const std::size_t after = allocatedBytes();
     if (after < before + cycles)
         std::puts("did not grow");

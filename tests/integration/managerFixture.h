@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// A component manager of the test's own, and a folder for the libraries that it is to find.
+/// Fixture with a component manager of its own and a temporary folder for its component libraries.
 #pragma once
 
 #include "components/componentManager/manager/componentImpPrivate.h"
@@ -18,12 +18,12 @@ namespace Mz::Test {
 
 inline const std::filesystem::path buildFolder = MZ_BUILD_PATH;
 
-/// The file of a component library that was built for the tests.
+/// Returns the path of a component library that the build made for the tests.
 inline std::filesystem::path builtComponent(const std::wstring& name) {
     return buildFolder / "components" / name / (name + MZ_LIBRARY_EXTENSION);
 }
 
-/// Writes down which builders it is offered.
+/// Collects the names of the builders that it is offered.
 class Collector final : public QrEnumerator<QrCPtr<QrBuilderDescription>> {
   public:
     Action process(QrCPtr<QrBuilderDescription> item) override {
@@ -71,20 +71,20 @@ class ManagerTest : public ::testing::Test {
 
     void initialize() { manager->initialize(searchPathOf(folder.path()).c_str()); }
 
-    /// A new, empty manager; the old one is gone, and so are the libraries that it loaded.
+    /// Replaces the manager with a new one. This unloads the libraries that the old one loaded.
     void restart() {
         manager.reset();
         manager = std::make_unique<ComponentManager>();
     }
 
-    /// The names of all builders, in the order of the enumeration.
+    /// Returns the names of all builders in the order of the enumeration.
     Names names() {
         Collector collector;
         manager->enumerateBuilders(collector);
         return collector.names;
     }
 
-    /// The record of a file of the folder; null when there is none.
+    /// Returns the record of a file of the folder, or null.
     ComponentLibrary* find(const std::filesystem::path& file) {
         const std::wstring wanted =
             ComponentManager::normalisePath(file.filename().wstring().c_str(), false);
@@ -94,7 +94,8 @@ class ManagerTest : public ::testing::Test {
         return nullptr;
     }
 
-    /// Appends the record that an earlier start would have left of the file.
+    /// Appends a record such as an earlier start stores. `asItIs` gives it the file's time and
+    /// size.
     ComponentLibrary& record(const std::filesystem::path& file, bool asItIs = true) {
         ComponentLibrary& library = manager->libraries.emplace_back(*manager);
         library.directory =
@@ -117,13 +118,13 @@ class ManagerTest : public ::testing::Test {
         return builder;
     }
 
-    /// The builder that the manager knows for the identifier; null when it knows none.
+    /// Returns the builder that the index has for `uid`, or null.
     ComponentManager::Builder* indexed(const QrUid& uid) {
         ComponentManager::Builder** found = manager->builderIndex.find(uid);
         return found ? *found : nullptr;
     }
 
-    /// Who made the object that the manager creates for the identifier; empty without an object.
+    /// Creates an object for `uid` and returns the name of its maker, or "" if there is no object.
     std::string maker(const QrUid& uid) {
         const QrRef<QrCastable> object = manager->createObject(uid);
         const QrPtr<PlainObject> plain = queryCast<PlainObject>(object.get());

@@ -1,4 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
+/// Tests the normalised form of paths: with known results, and with random paths against a second,
+/// simpler implementation.
 #include "components/componentManager/manager/componentImpPrivate.h"
 
 #include <gtest/gtest.h>
@@ -42,7 +44,7 @@ TEST(NormalisePath, KeepsRoots) {
     EXPECT_EQ(normalised(L"\\\\server\\share"), L"\\\\server\\share");
     EXPECT_EQ(normalised(L"\\\\server\\share\\"), L"\\\\server\\share\\");
     EXPECT_EQ(normalised(L"\\\\server\\share\\\\//x"), L"\\\\server\\share\\x");
-    EXPECT_EQ(normalised(L"1:/a"), L"1:\\a"); // No drive, yet a name like any other.
+    EXPECT_EQ(normalised(L"1:/a"), L"1:\\a"); // Not a drive; an ordinary name.
 }
 
 TEST(NormalisePath, TreatsDotsAsTheRulesSay) {
@@ -90,7 +92,7 @@ TEST(NormalisePath, InListModeTreatsEachEntryByItself) {
     EXPECT_EQ(normalisedList(L"\\\\S\\T\\;/"), L"\\\\s\\t\\;\\");
 }
 
-/// The rules once more, slowly and step by step, on a list of names and separators.
+/// A second implementation of the rules that works step by step on names and separators.
 class NaiveNormaliser {
   public:
     static std::wstring entry(const std::wstring& path) {

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
-/// The reader of Windows libraries, on sound libraries and on everything else. It is the same on
-/// every system.
+/// Tests the reader of Windows libraries with valid, damaged and random files. The reader is
+/// portable, so the test runs on every system.
 #include "components/platform/windows/peProbe.h"
 #include "tests/support/peFile.h"
 
@@ -15,7 +15,7 @@ namespace {
 
 constexpr const char* entryPoint = "QrGetComponentDescription";
 
-/// A file in memory, which counts what is asked of it.
+/// A file in memory that counts the reads.
 class MemorySource final : public Mz::platform::ByteSource {
   public:
     explicit MemorySource(const std::string& content) : content(content) {}
@@ -41,7 +41,7 @@ bool exports(const std::string& content, const char* symbol = entryPoint) {
 
 class PeProbe : public ::testing::Test {
   protected:
-    /// The content with the 32-bit field of the export directory changed.
+    /// Returns the content with a 32-bit field of the export directory changed.
     std::string withExports(std::size_t field, std::uint32_t value) const {
         return changedAt(whole, exportsOf(whole) + field, value);
     }
@@ -128,11 +128,11 @@ TEST_F(PeProbe, RefusesSectionsThatTheLoaderWouldMapOtherwise) {
     }
     EXPECT_FALSE(exports(withSection(1, PeField::address, peCode)));    // Two at one address.
     EXPECT_FALSE(exports(withSection(0, PeField::flags, 0x40000020u))); // Code that cannot run.
-    // Less in memory than in the file, and the other way round.
+    // Sections whose size in memory is smaller or larger than their size in the file.
     EXPECT_TRUE(exports(withSection(0, PeField::memorySize, 1)));
     EXPECT_FALSE(exports(withSection(2, PeField::memorySize, 40)));
     EXPECT_FALSE(exports(withSection(2, PeField::fileSize, 0)));
-    EXPECT_TRUE(exports(withSection(2, PeField::memorySize, 0))); // As old linkers write it.
+    EXPECT_TRUE(exports(withSection(2, PeField::memorySize, 0))); // Old linkers write 0.
 }
 
 TEST_F(PeProbe, RefusesExportDirectoriesThatLeadNowhere) {
@@ -160,7 +160,7 @@ TEST_F(PeProbe, RefusesNamesAndOrdinalsThatLeadNowhere) {
         placeOf(whole, getAt<std::uint32_t>(whole, exportsOf(whole) + PeField::names));
     const std::size_t ordinals =
         placeOf(whole, getAt<std::uint32_t>(whole, exportsOf(whole) + PeField::ordinals));
-    // The last name that the search compares.
+    // `names` is the entry that the binary search compares last.
     for (const std::uint32_t address : {0u, 0x9000u, peExports + 0x1FFu, 0xFFFFFFFFu})
         EXPECT_FALSE(exports(changedAt(whole, names, address))) << address;
     EXPECT_TRUE(exports(changedAt(whole, ordinals, std::uint16_t{1})));
@@ -171,7 +171,7 @@ TEST_F(PeProbe, RefusesNamesAndOrdinalsThatLeadNowhere) {
 }
 
 TEST_F(PeProbe, RefusesImportsThatLeadNowhere) {
-    // A list of one library, and its end, where the export table leaves room.
+    // An import list with one library and its end mark, in the free space of the export section.
     constexpr std::uint32_t list = peExports + 0x180, name = peExports + 0x1F8;
     std::string content = withSection(2, PeField::memorySize, 0x200);
     const auto changed = [&](std::uint32_t listAddress, std::uint32_t nameAddress) {
@@ -186,13 +186,13 @@ TEST_F(PeProbe, RefusesImportsThatLeadNowhere) {
         EXPECT_FALSE(changed(address, name)) << address;
     for (const std::uint32_t address : {1u, 0x9000u, peExports + 0x1FF, 0xFFFFFFFFu})
         EXPECT_FALSE(changed(list, address)) << address;
-    putAt(content, placeOf(content, list) + 20 + 12, name); // No end.
+    putAt(content, placeOf(content, list) + 20 + 12, name); // No end mark.
     content.replace(placeOf(content, list) + 40, 0x1F8 - 0x180 - 40, 0x1F8 - 0x180 - 40, 'x');
     EXPECT_FALSE(changed(list, name));
 }
 
 TEST_F(PeProbe, ComparesNamesToTheEndOfTheirSection) {
-    // The name ends with the section, with its terminator and without.
+    // The name ends at the end of the section, with and without its terminator.
     std::string content = madeLibrary({{entryPoint, peCode}});
     const std::size_t name = content.find(entryPoint);
     const auto length = static_cast<std::uint32_t>(std::strlen(entryPoint));
@@ -202,7 +202,7 @@ TEST_F(PeProbe, ComparesNamesToTheEndOfTheirSection) {
         changed.replace(name, length, length, 'x');
         changed.replace(changed.size() - size, size, std::string(entryPoint, size));
         putAt(changed, names, peExports + 0x200 - size);
-        // As much in memory as in the file.
+        // Makes the size in memory equal to the size in the file.
         putAt(changed, sectionsOf(changed) + 2 * PeField::sectionEntry + PeField::memorySize,
               std::uint32_t{0x200});
         return changed;
@@ -226,12 +226,12 @@ TEST_F(PeProbe, SearchesAsTheLoaderDoes) {
         EXPECT_FALSE(exports(library, "f"));
         EXPECT_FALSE(exports(library, "f12000"));
     }
-    // What a search in sorted names does not find, the system does not find either.
+    // A binary search misses names that are not sorted, in the system as here.
     EXPECT_FALSE(exports(madeLibrary({{"b", peCode}, {"c", peCode}, {"a", peCode}}), "a"));
 }
 
 TEST_F(PeProbe, AsksForFewPiecesHoweverManyNamesThereAre) {
-    // 16 million names, all of which are there, and all the same.
+    // 16 million names, all present and all the same.
     constexpr std::uint32_t count = 0x1000000;
     std::string content = whole;
     const std::uint32_t table = peExports + 0x1000;
@@ -249,7 +249,7 @@ TEST_F(PeProbe, AsksForFewPiecesHoweverManyNamesThereAre) {
     MemorySource source(content);
     EXPECT_FALSE(Mz::platform::peExportsFunction(source, entryPoint));
     EXPECT_LT(source.reads, 100);
-    EXPECT_GT(source.reads, 10); // The search took place.
+    EXPECT_GT(source.reads, 10); // The search did run.
 }
 
 TEST_F(PeProbe, SurvivesRandomDamage) {
@@ -259,7 +259,7 @@ TEST_F(PeProbe, SurvivesRandomDamage) {
     for (int round = 0; round < rounds; ++round) {
         std::string content = whole;
         for (auto count = 1 + random() % 8; count > 0; --count) {
-            // Half of it where the headers are.
+            // Half of the damage hits the headers.
             const std::size_t range = random() % 2 ? content.size() : 0x200;
             content[random() % range] = static_cast<char>(random());
         }

@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
-/// The platform layer on Linux, where it has something of its own.
+/// Tests what only the Linux platform layer has: the locale's encoding, upper case without the
+/// system, symlinks, pipes, and a shortage of descriptors.
 #include "components/platform/characters.h"
 #include "components/platform/platform.h"
 #include "components/platform/upperCase.h"
@@ -19,12 +20,12 @@ using Mz::Test::TemporaryDirectory;
 
 namespace {
 
-/// What is added to the number of each file that is listed.
+/// This program's `readdir` adds this to each inode number.
 ino_t listingOffset = 0;
 
 } // namespace
 
-/// The C library's function, for this program alone.
+/// Replaces the C library's function in this program.
 extern "C" dirent* readdir(DIR* directory) {
     using Function = dirent*(DIR*);
     static const auto next = reinterpret_cast<Function*>(::dlsym(RTLD_NEXT, "readdir"));
@@ -154,7 +155,8 @@ TEST_F(PosixPlatform, TakesLettersAsUpperCaseOneByOneOnly) {
     EXPECT_EQ(upperCase(u'\u01C6'), u'\u01C4');
     EXPECT_EQ(upperCase(u'\u1F80'), u'\u1F88');
     EXPECT_EQ(upperCase(u'\uFF5A'), u'\uFF3A');
-    // Those that come from no lower case, or would become two letters, or an ASCII one.
+    // Letters that are not the lower case of one other letter, or whose upper case is two letters
+    // or ASCII.
     for (const char16_t unit : {u'\u00DF', u'\u0131', u'\u017F', u'\u00B5', u'\u03C2', u'\u01C5',
                                 u'\u0100', u'[', u'{', u'`', u'@', u'\0', u'\uFFFF'})
         EXPECT_EQ(upperCase(unit), unit) << static_cast<unsigned int>(unit);
@@ -162,7 +164,7 @@ TEST_F(PosixPlatform, TakesLettersAsUpperCaseOneByOneOnly) {
 }
 
 TEST_F(PosixPlatform, KnowsOneFileByItsNamesThoughListingsNumberFilesOtherwise) {
-    // As an overlay file system does, and a file that is mounted over another one.
+    // Overlay file systems and bind-mounted files give listings other inode numbers than `stat`.
     const TemporaryDirectory folder;
     const TemporaryDirectory other;
     folder.write("file", "x");

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// What every system's platform layer must do. The same tests everywhere.
+/// Tests the platform layer with the same expectations on every system.
 #include "components/platform/platform.h"
 
 #include "components/platform/characters.h"
@@ -46,7 +46,7 @@ TEST_F(Platform, ConvertsAsciiNamesToNativeOnes) {
     EXPECT_EQ(*toNative(L"Some/Name.x"), std::filesystem::path("Some/Name.x").native());
     ASSERT_TRUE(toNative(L""));
     EXPECT_TRUE(toNative(L"")->empty());
-    // A part of a longer text, without a terminator of its own.
+    // A part of a longer text has no terminator.
     EXPECT_EQ(toNative(std::wstring_view(L"abcdef").substr(1, 3)),
               std::filesystem::path("bcd").native());
 }
@@ -93,7 +93,7 @@ TEST_F(Platform, TellsTimesInSeconds) {
 TEST_F(Platform, TellsSizesAboveFourGigabytes) {
     const auto file = folder.write("file", "");
     std::error_code error;
-    std::filesystem::resize_file(file, 0x100000005, error); // Sparse.
+    std::filesystem::resize_file(file, 0x100000005, error); // A sparse file.
     ASSERT_FALSE(error) << error.message();
     EXPECT_EQ(queryFile(file)->size, 0x100000005);
     EXPECT_FALSE(exportsFunction(file, entryPoint));
@@ -138,8 +138,9 @@ TEST_F(Platform, ListsInAFixedOrderWithPathsThatOpen) {
 }
 
 TEST_F(Platform, ListsInOneOrderOnEverySystem) {
-    // By UTF-16 code units in upper case: letters come before the signs between Z and a, and a
-    // character beyond U+FFFF before the last ones below it. Windows needs no locale for this.
+    // The order is by UTF-16 code units in upper case. Letters sort before the signs between Z and
+    // a, and characters above U+FFFF sort before the last ones below it. Windows needs no locale
+    // for this.
     static_cast<void>(std::setlocale(LC_ALL, "C.UTF-8"));
     const std::vector<std::wstring> ordered{
         L"-",       L"0",        L"A1",           L"a2",          L"mesh",   L"mesh.x",
@@ -192,7 +193,7 @@ TEST_F(Platform, OpensFilesForReadingInBinary) {
     stream.read(content.data(), 10);
     EXPECT_EQ(stream.gcount(), 6);
     EXPECT_EQ(content.substr(0, 6), std::string("a\r\n\x1A\0b", 6));
-    // Others may open it meanwhile.
+    // Other streams can open the file at the same time.
     std::ifstream another;
     EXPECT_TRUE(openForReading(another, file));
 }
@@ -234,7 +235,7 @@ TEST_F(Platform, LoadsFindsAndUnloadsALibrary) {
     ASSERT_TRUE(module);
     EXPECT_TRUE(isMapped(file));
     EXPECT_EQ(findLoadedLibrary(file), module);
-    EXPECT_EQ(findLoadedLibrary(file), module); // No reference is taken by looking.
+    EXPECT_EQ(findLoadedLibrary(file), module); // A lookup takes no reference.
     EXPECT_TRUE(findSymbol(module, entryPoint));
     EXPECT_FALSE(findSymbol(module, "noSuchFunction"));
     unloadLibrary(module);
@@ -277,7 +278,7 @@ TEST_F(Platform, UsesAMappedLibraryWithoutTakingAReference) {
     const UsedLibrary used = useLibrary(file, entryPoint);
     EXPECT_EQ(used.module, module);
     EXPECT_FALSE(used.loaded);
-    // Whatever it exports: it is mapped.
+    // A mapped library is used whatever it exports.
     EXPECT_EQ(useLibrary(file, "noSuchFunction").module, module);
     EXPECT_FALSE(useLibrary(file, "noSuchFunction").loaded);
     unloadLibrary(module);

@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
-/// The platform layer on Windows, where it has something of its own.
+/// Tests what only the Windows platform layer has: the export reader compared with the system's
+/// loader, error modes, and the system's table of upper-case letters.
 #include "components/platform/platform.h"
 #include "components/platform/upperCase.h"
 #include "components/platform/windows/exportReader.h"
@@ -13,7 +14,7 @@
 using namespace Mz::platform;
 using namespace Mz::Test;
 
-/// The program's own entry for the function.
+/// This program's import table entry for the function.
 extern "C" decltype(&::LoadLibraryExW) __imp_LoadLibraryExW;
 
 namespace {
@@ -90,7 +91,7 @@ TEST(WindowsPlatform, FindsNothingInALibraryCutAtAnyLength) {
     }
 }
 
-/// What the system itself says of the file.
+/// Returns whether the system itself finds the entry point in the file.
 bool systemFinds(const std::filesystem::path& file) {
     const HMODULE module = ::LoadLibraryExW(file.c_str(), nullptr, DONT_RESOLVE_DLL_REFERENCES);
     const bool found = findSymbol(module, entryPoint) != nullptr;
@@ -126,7 +127,7 @@ TEST(WindowsPlatform, AgreesWithTheSystemOnLibrariesMadeByHand) {
         {{"Q", peCode},
          {"QrGetComponentDescriptio", peCode},
          {"QrGetComponentDescriptions", peCode}},
-        {{"z", peCode}, {"y", peCode}, {entryPoint, peCode}}, // not sorted
+        {{"z", peCode}, {"y", peCode}, {entryPoint, peCode}}, // Not sorted.
         {{entryPoint, peCode}, {"b", peCode}, {"a", peCode}}};
     int number = 0;
     for (const std::vector<PeExport>& table : tables) {
@@ -138,8 +139,8 @@ TEST(WindowsPlatform, AgreesWithTheSystemOnLibrariesMadeByHand) {
     }
 }
 
-/// Counts the calls of this program that map a library. The system tells of them only once it has
-/// resolved what a library needs, so the program's table of imports is changed for the while.
+/// Counts this program's calls that map a library. The system reports a mapping only after it has
+/// resolved the dependencies, so this class replaces an entry of the program's import table.
 class MappingCounter {
   public:
     MappingCounter() : original(__imp_LoadLibraryExW) {
@@ -191,7 +192,7 @@ TEST(WindowsPlatform, MapsNothingThatDoesNotExportTheFunction) {
 }
 
 TEST(WindowsPlatform, HasTheSystemsTableOfUpperCaseLetters) {
-    // So that Linux sorts by the table that this system sorts by.
+    // Linux uses a copy of the system's table. It must be equal, so that both systems sort alike.
     using Upcase = wchar_t __stdcall(wchar_t);
     const auto upcase = reinterpret_cast<Upcase*>(reinterpret_cast<void*>(
         ::GetProcAddress(::GetModuleHandleW(L"ntdll.dll"), "RtlUpcaseUnicodeChar")));

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
-/// A plug-in of a host: a library that uses the component manager, and its registries before and
-/// after everything else.
+/// A plug-in for loadingHost. A static object uses the component manager's registries and streams
+/// when the plug-in is loaded, and checks its entries when the plug-in is unloaded.
 #include "components/componentManager/processControl.h"
 #include "components/componentManager/textStream.h"
 #include "tests/components/plain.h"
@@ -28,7 +28,7 @@ class Translator final : public QrCastImpl<Translator, PlainObject> {
     const char* maker() const override { return "translator"; }
 };
 
-/// A buffer that the library does not recognise as its own.
+/// A buffer class from outside the library: the library cannot take its short cut for it.
 class ForeignBuffer final : public QrOutBuffer {
   public:
     using QrOutBuffer::QrOutBuffer;

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
-/// The manager that a process has from the start. It initialises once, so each of these tests needs
-/// a process of its own, which it has as an entry of ctest.
+/// Tests the process-wide manager. It initialises only once, so ctest runs each test in a process
+/// of its own.
 #include "tests/integration/managerFixture.h"
 
 using namespace Mz;
@@ -90,7 +90,7 @@ TEST_F(ProcessManager, WhenALibraryInitialisesItStaysWithTheFirstPath) {
     setManagerUnderTest(nullptr);
 }
 
-/// A host program in the folder, which is run as a process of its own.
+/// Runs a copy of testHost in the folder as a separate process.
 class HostProgram : public ManagerTest {
   protected:
     HostProgram() {
@@ -162,7 +162,8 @@ TEST_F(HostProgram, GetsTheSameAnswersInTheDestructorOfAStaticObject) {
 }
 
 TEST_F(HostProgram, EndsWellThoughALibraryInitialisesTheManagerAtTheEnd) {
-    // The child's library calls nothing by itself; the point is the order of the process's end.
+    // The library in the child does not call the manager: the child sets none. The test is about
+    // the order in which the process ends.
     add(L"initializesAtEnd");
     add(L"goodByHand");
     const ProgramResult result = run({});

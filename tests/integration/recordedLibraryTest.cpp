@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
-/// What a start makes of the records of an earlier one. The records are put in by hand.
+/// Tests what a start does with the library records of an earlier start. The tests write the
+/// records themselves.
 #include "tests/integration/managerFixture.h"
 
 #include <chrono>
@@ -13,7 +14,7 @@ namespace {
 
 class RecordedLibrary : public ManagerTest {
   protected:
-    /// Gives the file another time than it has.
+    /// Changes the file's modification time.
     static void touch(const std::filesystem::path& file) {
         std::filesystem::last_write_time(file, std::filesystem::last_write_time(file) -
                                                    std::chrono::hours(1));
@@ -42,11 +43,11 @@ TEST_F(RecordedLibrary, UnchangedIsLoadedOnFirstUseAndStaysLoaded) {
     EXPECT_EQ(maker(goodUid), "good");
     EXPECT_TRUE(isMapped(file));
     EXPECT_TRUE(library.loadedByManager);
-    // Its builders are the recorded ones still; it was not asked to enumerate.
+    // Its builders are still the recorded ones: the library was not enumerated.
     EXPECT_EQ(noted("enumerate"), 0);
     EXPECT_EQ(indexed(goodUid), &builder);
     EXPECT_EQ(names(), (Names{L"as recorded"}));
-    // The texts of the library are not read by a lazy load.
+    // A lazy load does not read the library's texts.
     EXPECT_STREQ(builder.getComponentLabel(), L"");
     EXPECT_STREQ(builder.getComponentText(), L"");
     EXPECT_EQ(library.descriptionValue, 0);
@@ -90,7 +91,7 @@ TEST_F(RecordedLibrary, UnchangedThatIsNoLibraryIsDroppedOnUse) {
     EXPECT_FALSE(manager->getBuilder(faultyUid));
     EXPECT_THAT(names(), IsEmpty());
     EXPECT_FALSE(indexed(faultyUid));
-    EXPECT_STREQ(builder.getName(), L"faulty"); // Readable by those who still hold it.
+    EXPECT_STREQ(builder.getName(), L"faulty"); // A held record stays readable.
     EXPECT_EQ(library.fileTime, platform::queryFile(file)->time);
     EXPECT_EQ(library.fileSize, 17);
 }
@@ -120,7 +121,7 @@ TEST_F(RecordedLibrary, ChangedInSizeAloneIsReadAfresh) {
     const auto file = add(L"changingTwo", "changing");
     ComponentLibrary& library = record(file);
     recordBuilder(library, changingUid, L"as recorded");
-    library.fileSize += 0x100000000; // The same in the low 32 bits.
+    library.fileSize += 0x100000000; // The low 32 bits stay equal.
     initialize();
     EXPECT_EQ(names(), (Names{L"version two", L"new in two"}));
     EXPECT_EQ(library.fileSize, static_cast<int64>(std::filesystem::file_size(file)));
@@ -155,7 +156,7 @@ TEST_F(RecordedLibrary, ChangedBetweenInitializeAndFirstUseIsReadAfreshThen) {
     EXPECT_EQ(maker(changingUid), "changing");
     EXPECT_EQ(names(), (Names{L"version two", L"new in two"}));
     EXPECT_STREQ(held.getName(), L"as recorded");
-    EXPECT_STREQ(held.getComponentLabel(), L"Label two"); // It reads its library's.
+    EXPECT_STREQ(held.getComponentLabel(), L"Label two"); // Read from the library's record.
 }
 
 TEST_F(RecordedLibrary, ChangedUnderARecordsOwnCallLeavesTheRecordReadable) {
@@ -200,7 +201,7 @@ TEST_F(RecordedLibrary, ChangedUnderAnEnumerationLeavesItsItemsReadable) {
     EXPECT_EQ(dropper.names.back(), L"three");
     EXPECT_STREQ(dropper.items.front()->getName(), L"one");
     EXPECT_STREQ(dropper.items.front()->getComponentLabel(), L"");
-    // Only the other library's is left for anybody who comes later.
+    // Later enumerations see only the builder of the other library.
     EXPECT_EQ(names(), (Names{L"three"}));
     EXPECT_FALSE(indexed(changingSecondUid));
 }
@@ -251,12 +252,12 @@ TEST_F(RecordedLibrary, FoundAgainUnderAnotherLetterCaseKeepsItsBuilders) {
     const auto file = add(L"goodByHand", "GoOd");
     ComponentLibrary& library = record(file);
     EXPECT_EQ(library.fileName, L"good");
-    library.foundPath.clear(); // Never stored, so not known of a record that was read.
+    library.foundPath.clear(); // Not stored, so empty in a record that was read.
     recordBuilder(library, goodUid, L"as recorded");
     initialize();
     EXPECT_EQ(names(), (Names{L"as recorded"}));
     EXPECT_FALSE(isMapped(file));
-    // It is opened by the name that the system knows.
+    // The manager opens the file by its real name.
     EXPECT_EQ(maker(goodUid), "good");
 }
 
@@ -265,7 +266,7 @@ TEST_F(RecordedLibrary, TakesThePlaceOfTheNewRecordInTheOrderOfTheFiles) {
     const auto b = add(L"goodWithKit", "b");
     const auto c = add(L"countedDescription", "c");
     const auto d = add(L"changingOne", "d");
-    // Recorded in another order, by an earlier start with another search path.
+    // An earlier start with another search path recorded them in another order.
     ComponentLibrary& third = record(c);
     recordBuilder(third, countedUid, L"from c");
     ComponentLibrary& gone = record(folder.path() / "gone", false);
@@ -301,7 +302,7 @@ TEST_F(RecordedLibrary, ReindexesSoThatTheLaterLibraryWinsAcrossTwo) {
     initialize();
     EXPECT_EQ(indexed(sharedUid), &later);
     EXPECT_EQ(maker(sharedUid), "second");
-    // Indexed again, the earlier one takes over: the last to be registered wins.
+    // Indexing the first library again gives it the uid: the last registration wins.
     manager->reindexBuilders(one);
     EXPECT_EQ(indexed(sharedUid), &one.builders.front());
 }
@@ -322,7 +323,7 @@ TEST_F(RecordedLibrary, DroppedTakesItsIdentifiersOutOfTheIndexWhoeverWonThem) {
     recordBuilder(two, sharedUid, L"second");
     recordBuilder(two, secondSharerUid, L"own");
     initialize();
-    manager->dropBuilders(one); // Two has won the shared one.
+    manager->dropBuilders(one); // `two` owns the shared uid.
     EXPECT_FALSE(indexed(sharedUid));
     EXPECT_FALSE(indexed(firstSharerUid));
     EXPECT_TRUE(indexed(secondSharerUid));
@@ -378,8 +379,8 @@ TEST_F(RecordedLibrary, UnloadGivesBackWhatTheManagerLoadedAndLeavesTheRest) {
     EXPECT_FALSE(isMapped(file));
     EXPECT_FALSE(library.module);
     EXPECT_FALSE(library.loadedByManager);
-    manager->unload(library); // Nothing is left to do.
-    // Its builders are recorded still, so it comes back when it is wanted.
+    manager->unload(library); // A no-op.
+    // Its builders are still recorded, so it is loaded again when it is needed.
     EXPECT_EQ(maker(goodUid), "good");
     EXPECT_TRUE(isMapped(file));
 }
@@ -419,7 +420,7 @@ TEST_F(RecordedLibrary, ThatAsksForItselfWhileItIsLoadedIsLoadedOnce) {
 
 ComponentManager::Builder* heldRecord = nullptr;
 
-/// Uses the held record while the library is being loaded.
+/// Calls `getBuilder` on the held record while its library is being loaded.
 void useHeldRecord(const char* event) {
     if (std::string(event) == "asked" && heldRecord->getBuilder())
         note("answeredThroughRecord");
@@ -451,7 +452,7 @@ TEST_F(RecordedLibrary, ChangedThatUsesAHeldRecordWhileItIsLoadedIsRegisteredOnc
 std::vector<const ComponentManager::Builder*>* seenWhileGrowing = nullptr;
 ComponentManager* growing = nullptr;
 
-/// Looks up what the index says of the first builder, each time that another one is offered.
+/// Looks up the first builder in the index each time that another builder is offered.
 void lookAtFirst(const char* event) {
     if (std::string(event) != "itemMade" || !growing)
         return;

@@ -1,4 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
+/// Tests component libraries without faults: written by hand and with the kit, loaded by the
+/// manager and by the host, from the first record to the unload.
 #include "tests/integration/managerFixture.h"
 
 using namespace Mz;
@@ -24,7 +26,7 @@ TEST_F(SoundComponent, WrittenByHandHasEveryFieldRecordedAsItSaid) {
     ASSERT_EQ(library->builders.size(), 3u);
     const ComponentManager::Builder& first = library->builders[0];
     EXPECT_EQ(first.getUid(), goodUid);
-    EXPECT_STREQ(first.getName(), L"Name"); // Letter case stays.
+    EXPECT_STREQ(first.getName(), L"Name"); // Keeps its letter case.
     EXPECT_STREQ(first.getLabel(), L"Label");
     EXPECT_STREQ(first.getText(), L"Text");
     EXPECT_EQ(first.getNumber(), 4000000000u);
@@ -119,7 +121,7 @@ TEST_F(SoundComponent, WrittenWithTheKitLeavesNoMemoryBehindWhenItIsUnloaded) {
     const std::size_t before = allocatedBytes();
     for (std::size_t count = 0; count < cycles; ++count)
         cycle();
-    // Less than a byte for each cycle: what the loader and the heap keep varies a little.
+    // Allow less than one byte per cycle: the memory of the loader and the heap varies a little.
     EXPECT_LT(allocatedBytes(), before + cycles);
 }
 
@@ -182,7 +184,7 @@ TEST_F(SoundComponent, IsNotFoundByAnUnknownIdentifier) {
     add(L"goodByHand");
     initialize();
     QrUid almost = goodUid;
-    almost.w3 ^= 1; // The same hash.
+    almost.w3 ^= 1; // Another uid with the same hash.
     EXPECT_FALSE(manager->getBuilder(almost));
     EXPECT_FALSE(manager->createObject(almost));
     EXPECT_EQ(noted("entry"), 1);
@@ -226,7 +228,7 @@ TEST_F(SoundComponent, ThatTheHostLoadedIsUsedAsItIsAndNeverFreed) {
     restart();
     EXPECT_TRUE(isMapped(file));
     EXPECT_EQ(noted("goodUnloaded"), 0);
-    // The manager holds no reference either: the host's was the only one.
+    // The manager holds no reference, so releasing the host's unloads the library.
     unloadAsHost(host);
     EXPECT_FALSE(isMapped(file));
     EXPECT_EQ(noted("goodUnloaded"), 1);

@@ -1,15 +1,15 @@
 // SPDX-License-Identifier: BSL-1.0
-/// A host to be run by tests: initialises the manager and prints what it found.
+/// A host program for tests: initialises the manager and prints the builders that it finds.
 ///
-///     testHost [OPTION...] [PATH]   initialises with that search path, by default with null
+///     testHost [OPTION...] [PATH]   initialises with that search path; without PATH, with null
 ///
 ///     --locale NAME    sets the process's locale first
-///     --catching       catches what `initialize` throws, and reports a call of std::terminate
-///     --in-thread      initialises on a thread that ends before the rest
+///     --catching       catches exceptions of `initialize`, and reports a call of std::terminate
+///     --in-thread      initialises on a thread that ends before the builders are printed
 ///     --again-at-end   prints the builders again in the destructor of a static object
 ///
-/// One line for each builder, then "done"; a line "made NAME" instead where an object could be
-/// made.
+/// Prints one line for each builder, then "done". The line is "made NAME" if the builder's object
+/// could be created, else "NAME".
 #include "tests/components/testUids.h"
 
 #include <clocale>
@@ -44,7 +44,7 @@ void printBuilders() {
     QrGetComponentManager()->enumerateBuilders(printer);
 }
 
-/// Made before the first component is loaded.
+/// Constructed before the first component is loaded, so destroyed after its static objects.
 struct AtEnd {
     ~AtEnd() {
         if (wanted)

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
-/// What happens when a host unloads the component manager, or a plug-in that uses it, before it
-/// ends.
+/// Tests what happens when a host unloads the component manager, or a plug-in that uses it, before
+/// the process ends. Each test runs the program loadingHost.
 #include "tests/integration/managerFixture.h"
 
 using namespace Mz::Test;
@@ -18,12 +18,12 @@ class UnloadedManager : public ManagerTest {
         return buildFolder / MZ_LIBRARY_FOLDER / (L"plugIn" MZ_LIBRARY_EXTENSION);
     }
 
-    /// What a host prints that loads the library itself. It must end by itself.
+    /// Returns the output of a host that loads the manager's library. Expects exit code 0.
     std::string outputWithLibrary(const std::string& mode) {
         return outputOf({library().string(), "QrGetComponentManager", mode});
     }
 
-    /// The same with a host that loads a plug-in only.
+    /// Returns the output of a host that loads only a plug-in, which needs the manager's library.
     std::string outputWithPlugIn(const std::string& mode) {
         return outputOf({plugIn().string(), "managerOfPlugIn", mode});
     }
@@ -69,7 +69,7 @@ TEST_F(UnloadedManager, StaysOnceItLoadedAComponentAndTheProcessEndsWell) {
 }
 
 TEST_F(UnloadedManager, StaysOnceAPlugInLoadedAComponentAndTheProcessEndsWell) {
-    // Inline functions that both have may bind to the plug-in, which then stays as well.
+    // Inline functions that both contain may bind to the plug-in, which then stays mapped too.
     const std::string output = outputWithPlugIn("component");
     EXPECT_THAT(output, ::testing::StartsWith("mapped goodWithKit\n"));
     EXPECT_THAT(output, ::testing::HasSubstr("\nmapped libMZcomponentManager\n"));

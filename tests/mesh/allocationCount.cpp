@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
-// The program's own allocation functions. They have a file to themselves, where no compiler inlines
-// one half of a pair and misses the other.
+// Counts the bytes that operator new allocates. The operators are in a file of their own, so that a
+// compiler cannot inline one of a pair without the other.
 
 #include "allocationCount.h"
 

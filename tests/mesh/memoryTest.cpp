@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-// The formats by themselves, in a program that counts what they allocate.
+// Tests how much memory the formats allocate, with valid and with false sizes and with long words.
 
 #include "allocationCount.h"
 
@@ -36,7 +36,7 @@ Measured measure(const MeshFormat& format, const std::string& data) {
     return {accepted, imported, allocatedBytes() - before};
 }
 
-/// What two readers and a few words take.
+/// The memory of two readers and a few words.
 constexpr std::size_t little = 0x40000;
 
 void expectRefusedWithLittleMemory(const MeshFormat& format, const std::string& data) {
@@ -99,7 +99,7 @@ TEST(MeshMemory, GrowsWithTheData) {
         data += " 1";
     const Measured measured = measure(ObjFormat(), data + "\n");
     EXPECT_TRUE(measured.imported);
-    // A corner takes 12 bytes, and a list that grows is copied a few times.
+    // A corner takes 12 bytes. A growing list is copied a few times.
     EXPECT_GT(measured.memory, 100000 * 12);
     EXPECT_LT(measured.memory, 100000 * 12 * 6);
 }

@@ -1,6 +1,6 @@
 # SPDX-License-Identifier: BSL-1.0
-# Runs the host over the samples and compares what it writes, byte for byte, with what is written
-# here for every platform.
+# Runs the mesh host on the samples. Compares its output, which is the same on every platform, byte
+# for byte with the expected files.
 #   cmake -DHOST=command -DSAMPLES=folder -DEXPECTED=folder -DOUTPUT=folder -P meshHostTest.cmake
 file(MAKE_DIRECTORY ${OUTPUT})
 set(folder ${SAMPLES})
@@ -28,7 +28,7 @@ run_host(failures 1 missing.obj makeSamples.py icosahedron.off ../CMakeLists.txt
 run_host(progress 0 --progress ./icosahedron.off)
 run_host(nothing 0)
 
-# What it saves, and a second start with the recorded list.
+# Saves objects and the recorded list, and starts again with that list.
 set(folder ${OUTPUT}/saved)
 file(REMOVE_RECURSE ${folder})
 file(MAKE_DIRECTORY ${folder})
@@ -49,7 +49,7 @@ run_host(damaged 0 --list "damaged list")
 file(WRITE ${folder}/meshes/damaged.text "1 2 3")
 run_host(unloadable 1 --load meshes)
 
-# Where the list cannot be written, everything else goes on; the message names the list, once.
+# If the list cannot be written, the host does everything else. Its message names the list once.
 execute_process(COMMAND ${HOST} --list "no folder/list" icosahedron.off WORKING_DIRECTORY ${folder}
   RESULT_VARIABLE result OUTPUT_VARIABLE output ERROR_VARIABLE error)
 if(NOT result EQUAL 1 OR NOT output MATCHES "icosahedron.off: "
@@ -57,7 +57,7 @@ if(NOT result EQUAL 1 OR NOT output MATCHES "icosahedron.off: "
   message(FATAL_ERROR "a list that cannot be written ended with ${result}: ${output}${error}")
 endif()
 
-# Where nothing can be saved; the system's own words differ.
+# If nothing can be saved, the message continues with the system's text, which differs.
 execute_process(COMMAND ${HOST} --save icosahedron.off icosahedron.off WORKING_DIRECTORY ${folder}
   RESULT_VARIABLE result OUTPUT_QUIET ERROR_VARIABLE error)
 if(NOT result EQUAL 1 OR NOT error MATCHES "^error: icosahedron.off: ")

@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Tests the mesh importer: its builder, its formats and file types, and what it imports.
 #include "meshTestSupport.h"
 
 #include "components/componentManager/componentImp.h"

@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Tests how an import reports progress, and how it stops or fails in the middle.
 #include "meshTestSupport.h"
 
 #include <algorithm>
@@ -11,7 +12,7 @@ namespace {
 
 constexpr std::size_t block = 0x10000;
 
-/// An OBJ file of many blocks.
+/// Returns an OBJ file of many blocks.
 std::string largeFile() {
     std::string data;
     for (int count = 0; count < 40000; ++count)
@@ -19,7 +20,7 @@ std::string largeFile() {
     return data + "f 1 2 3\n";
 }
 
-/// Data whose medium fails behind the first bytes.
+/// A medium that throws after the first `readable` bytes.
 class FailingBuffer final : public std::streambuf {
   public:
     FailingBuffer(std::string text, std::size_t readable)

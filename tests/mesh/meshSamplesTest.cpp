@@ -1,4 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
+// Tests every sample file: the same mesh in each format, recognised under any name, and cut at
+// every byte.
 #include "meshTestSupport.h"
 
 #include "components/componentManager/componentImp.h"
@@ -116,7 +118,7 @@ TEST(MeshSamples, CutAnywhereGiveNoMeshOrASoundOne) {
                 continue;
             ASSERT_TRUE(imported.errors.empty());
             expectSound(*imported.mesh);
-            // All that can be missing unnoticed is a name or a line end behind the last number.
+            // Only a name or a line end after the last number can be missing without an error.
             if (sample.tellsItsEnd) {
                 ASSERT_TRUE(haveSameGeometry(*whole, *imported.mesh)) << size;
             }

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-// Meshes and scenes that are stored and loaded.
+// Tests meshes and scenes that are stored and loaded.
 #include "meshTestSupport.h"
 
 #include "components/componentManager/binaryStream.h"
@@ -48,7 +48,7 @@ QrPtr<Scene> newScene() {
     return QrPtr<Scene>::adopt(safeCast<Scene>(object.get()));
 }
 
-/// Two meshes, one of them in three places.
+/// Returns a scene with two meshes, one of them in three instances.
 QrPtr<Scene> sampleScene() {
     const QrPtr<Mesh> corners = sampleMesh(samples[1]);
     const QrPtr<Mesh> plain = sampleMesh(samples[2]);
@@ -73,7 +73,7 @@ TYPED_TEST(StoredMesh, ComesBackEqual) {
         EXPECT_TRUE(areEqual(*mesh, *read));
         EXPECT_EQ(mesh->bounds(), read->bounds());
         expectSound(*read);
-        // And is stored again as the same bytes.
+        // It is stored as the same bytes again.
         EXPECT_EQ(saved<TypeParam>(read.get()), saved<TypeParam>(mesh.get()));
     }
 }
@@ -147,7 +147,7 @@ TYPED_TEST(StoredMesh, ChangedAnywhereIsNoMeshOrASoundOne) {
     EXPECT_GT(refused, 100);
 }
 
-/// A scene that was stored and loaded shares its meshes as the first one does.
+/// A loaded scene shares its meshes as the stored one did.
 TYPED_TEST(StoredMesh, InASceneIsStoredOnceAndSharedAgain) {
     const QrPtr<Scene> scene = sampleScene();
     const std::string bytes = saved<TypeParam>(scene.get());
@@ -162,7 +162,7 @@ TYPED_TEST(StoredMesh, InASceneIsStoredOnceAndSharedAgain) {
         EXPECT_TRUE(areEqual(*a.mesh, *b.mesh));
         EXPECT_EQ(b.mesh == read->instance(0).mesh, index != 1);
     }
-    // Each instance is dearer than nothing, but the shared mesh is there once.
+    // Each instance has a size, but the shared mesh is stored once.
     const std::size_t meshes = saved<TypeParam>(scene->instance(0).mesh.get()).size() +
                                saved<TypeParam>(scene->instance(1).mesh.get()).size();
     EXPECT_LT(bytes.size(), meshes + 600);
@@ -181,7 +181,7 @@ TEST(Scene, RefusesToHoldNothing) {
     EXPECT_EQ(scene->instanceCount(), 0U);
 }
 
-/// What a stored mesh of one vertex would be, with `edit` in the place of its faces and normals.
+/// Returns the reason why a stored mesh with the content of `edit` cannot be loaded, or "none".
 template <class Edit>
 std::string reasonOf(Edit&& edit) {
     meshImporter();

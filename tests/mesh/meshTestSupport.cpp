@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Imports test data through the mesh components and checks the meshes.
 #include "meshTestSupport.h"
 
 #include "components/componentManager/componentImp.h"

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Importing test data through the mesh components, and hearing what is said about it.
+/// Imports test data through the mesh components and records what the import reports.
 #pragma once
 
 #include "components/componentManager/processControl.h"
@@ -13,11 +13,10 @@
 
 namespace Meshes {
 
-/// The importer, made by its builder. The components of this build are loaded at the first call of
-/// the process.
+/// Returns a new importer from its builder. The first call in a process loads the mesh components.
 Mz::QrPtr<MeshImporter> meshImporter();
 
-/// Keeps what it is told; this thread's controller for as long as it lives.
+/// Records the reports of an import. It is this thread's controller while it lives.
 class RecordingController final : public Mz::QrCastImpl<RecordingController, Mz::QrProcessControl> {
   public:
     RecordingController() { QrSetThreadProcessController(this); }
@@ -25,10 +24,10 @@ class RecordingController final : public Mz::QrCastImpl<RecordingController, Mz:
 
     std::vector<std::wstring> errors;
     std::vector<float> fractions;
-    int questions = 0; ///< how often `isInterrupted` was asked
+    int questions = 0; ///< the calls of `isInterrupted`
     bool progressShown = true;
-    int interruptAfter = -1;     ///< `isInterrupted` says yes from then on
-    std::size_t refuseAfter = 0; ///< the number of the report that `progress` answers with false
+    int interruptAfter = -1;     ///< `isInterrupted` returns true after this many calls; -1: never
+    std::size_t refuseAfter = 0; ///< the number of the call in which `progress` returns false
 
     void* getContext() override { return nullptr; }
     void message(int, const wchar_t*) override {}
@@ -59,34 +58,34 @@ struct Imported {
     std::vector<std::wstring> errors;
 };
 
-/// What becomes of `data` in a file of that name.
+/// Imports `data` as a file of that name.
 Imported importData(std::string_view data, const wchar_t* path);
 
-/// The mesh in `data`, which must be faultless.
+/// Returns the mesh in `data`, which must be valid.
 Mz::QrPtr<Mesh> meshOf(std::string_view data, const wchar_t* path);
 
-/// Expects that `data` gives no mesh, and this one error.
+/// Expects that `data` gives no mesh and exactly this error.
 void expectError(std::string_view data, const wchar_t* path, const std::wstring& error);
 
-/// Expects that a mesh keeps what its interface promises.
+/// Expects that the mesh satisfies its interface.
 void expectSound(const Mesh& mesh);
 
-/// The vertices that a face refers to.
+/// Returns the indices of the vertices of a face.
 std::vector<std::uint32_t> faceOf(const Mesh& mesh, std::size_t index);
 
 struct Sample {
     const wchar_t* name;
     const wchar_t* label; ///< of the builder that reads it
-    bool tellsItsEnd;     ///< whether every shorter file is known to be damaged
+    bool tellsItsEnd;     ///< whether a file that is cut is seen to be incomplete
 };
 
-/// All sample files.
+/// The sample files.
 extern const std::vector<Sample> samples;
 
 std::wstring samplePath(const std::wstring& name);
 std::string contentOf(const std::wstring& path);
 
-/// `bytes` with the NULs in it.
+/// Returns `bytes` with the NULs that it contains.
 template <std::size_t size>
 std::string_view withNuls(const char (&bytes)[size]) {
     return {bytes, size - 1};

@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Tests the numbers in mesh files: rounding, limits, invalid words, and independence of the locale.
 #include "examples/mesh/reading/number.h"
 
 #include <gtest/gtest.h>

@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Tests the OBJ format: the statements that are read, those that are skipped, and errors.
 #include "meshTestSupport.h"
 
 using namespace Mz;

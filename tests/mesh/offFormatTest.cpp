@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Tests the OFF format: the forms that are read, and errors.
 #include "meshTestSupport.h"
 
 using namespace Mz;

@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Tests the PLY format in text and in binary of both byte orders, and errors.
 #include "meshTestSupport.h"
 
 #include <bit>
@@ -19,7 +20,7 @@ const std::string points = "0 0 0\n1 0 0\n1 1 0\n0 1 0\n";
 const std::string square =
     head + "element vertex 4\n" + xyz + "element face 1\n" + indices + "end_header\n" + points;
 
-/// Numbers as bytes of either order.
+/// Writes numbers as bytes in either order.
 class Bytes {
   public:
     explicit Bytes(bool bigEndian) : bigEndian(bigEndian) {}
@@ -59,7 +60,7 @@ TEST(PlyFormat, ReadsHeadersOfAnyLineEnd) {
         for (std::size_t at = header.find('\n'); at != header.npos;
              at = header.find('\n', at + end.size()))
             header.replace(at, 1, end);
-        // The first byte of the data is a line feed.
+        // The first byte of the data is a line feed, as if it belonged to the header.
         const Bytes data = Bytes(false).add(0x3F80000A, 4).addFloat(2).addFloat(3);
         const QrPtr<Mesh> mesh = meshOf(header + data.text, L"unnamed");
         EXPECT_EQ(mesh->vertices()[0], (Mesh::Point{std::bit_cast<float>(0x3F80000AU), 2, 3}));

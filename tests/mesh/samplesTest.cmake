@@ -1,5 +1,5 @@
 # SPDX-License-Identifier: BSL-1.0
-# Makes the samples anew and compares them with those of the repository.
+# Runs the script that makes the samples and compares its files with those of the repository.
 #   cmake -DPYTHON=program -DSAMPLES=folder -DOUTPUT=folder -P samplesTest.cmake
 file(REMOVE_RECURSE ${OUTPUT})
 file(MAKE_DIRECTORY ${OUTPUT})

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-// Saving that never loses the file that was there.
+// Tests that saving never loses the existing file.
 #include "examples/mesh/saving/objectFile.h"
 #include "examples/mesh/saving/recordedList.h"
 #include "examples/mesh/system/system.h"
@@ -54,7 +54,7 @@ TEST_F(SavedFile, OfTheRecordedListIsWrittenAndReadByTheManager) {
     EXPECT_EQ(system::mappedLibraries(components), 6U);
     writeRecordedList(file);
     EXPECT_GT(content().size(), 500U);
-    // A manager that is initialised reads nothing more.
+    // An initialised manager reads no list.
     EXPECT_TRUE(readRecordedList(file));
     put(file, "");
     EXPECT_TRUE(readRecordedList(file));

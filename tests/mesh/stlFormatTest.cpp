@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Tests the STL format in text and in binary: how points are merged, and errors.
 #include "meshTestSupport.h"
 
 #include <bit>
@@ -24,7 +25,7 @@ void append(std::string& data, std::uint32_t number) {
         data.push_back(static_cast<char>(number >> shift));
 }
 
-/// A binary file of so many equal facets, whose header counts `count`.
+/// Returns a binary file with that many equal facets, whose header states `count`.
 std::string binary(std::size_t facets, std::uint32_t count, const std::string& title = "solid",
                    float last = 1) {
     std::string data = title;

@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
-// Chains of objects that are longer than the stack is deep.
+// Tests that the library frees long chains of objects in a loop: recursion would overflow the
+// stack.
 #include "tests/objects/support.h"
 
 #include <utility>
@@ -11,7 +12,7 @@ using namespace Mz::Test;
 
 class Chain : public Objects {
   protected:
-    /// Far more than could be freed from inside one another.
+    /// Long enough to overflow the stack if each object freed the next one.
     static constexpr int length = 200'000;
 
     static QrPtr<Node> holder(int number, std::vector<QrPtr<Node>> links = {}) {
@@ -21,7 +22,7 @@ class Chain : public Objects {
         return result;
     }
 
-    /// Siblings, each of which holds the one before.
+    /// Returns objects each of which owns the one before it.
     static std::vector<QrPtr<Node>> siblings() {
         std::vector<QrPtr<Node>> all{holder(0)};
         all.reserve(length);
@@ -30,7 +31,7 @@ class Chain : public Objects {
         return all;
     }
 
-    /// Drops the last first, so that each is freed by itself.
+    /// Releases the last object first, so that no release frees more than one object.
     static void dropFromTheEnd(std::vector<QrPtr<Node>> all) {
         while (!all.empty())
             all.pop_back();

@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
-// Files that were cut or changed anywhere: an exception, in bounded memory, and nothing half done.
+// Tests files that were cut or changed at any place: an exception, bounded memory, and no partial
+// objects.
 #include "tests/objects/support.h"
 
 #include "tests/mesh/allocationCount.h"
@@ -11,7 +12,7 @@ namespace {
 using namespace Mz;
 using namespace Mz::Test;
 
-/// What reading `size` bytes may allocate in all. (On Windows, what this program itself allocates.)
+/// The memory that reading `size` bytes may allocate in total. On Windows, only this program's own.
 std::size_t allowance(std::size_t size) {
     return 64 * 1024 + 400 * size;
 }
@@ -19,8 +20,8 @@ std::size_t allowance(std::size_t size) {
 template <class Stream>
 class Damaged : public ObjectsOn<Stream> {
   protected:
-    /// Several graphs on one stream, with circles, sharing and null, and between them all that can
-    /// stand there. The last one is known already.
+    /// Returns several graphs on one stream, with cycles, shared objects and null. The last graph
+    /// is an object that the stream already knows.
     static std::string graphs() {
         const QrPtr<Node> shared = Objects::node(12);
         std::vector<QrPtr<Node>> links{shared};
@@ -37,9 +38,9 @@ class Damaged : public ObjectsOn<Stream> {
 
     static constexpr int graphCount = 4;
 
-    /// Reads all graphs; how many came before the failure.
+    /// Reads the graphs and returns how many were read before the failure.
     static int readAll(std::string_view bytes, std::string& reason) {
-        forgetNotes(); // They take memory, too.
+        forgetNotes(); // The journal allocates memory too.
         Loading<Stream> in(bytes);
         std::vector<QrPtr<Node>> read;
         int count = 0;
@@ -71,7 +72,7 @@ TYPED_TEST(Damaged, FilesCutAnywhereAreNoticed) {
         reason.clear();
         const int whole = this->readAll(std::string_view(bytes).substr(0, length), reason);
         EXPECT_LT(whole, this->graphCount);
-        EXPECT_GE(whole, most); // More bytes never make fewer objects.
+        EXPECT_GE(whole, most); // More bytes must not give fewer objects.
         most = whole;
         EXPECT_TRUE(reason.starts_with("byte ") || reason.starts_with("unknown position: "))
             << reason;

@@ -1,5 +1,5 @@
 # SPDX-License-Identifier: BSL-1.0
-# The examples of docs/objects.md, in files of their own: they are compiled as they stand there.
+# Extracts the examples of docs/objects.md to files, so that the tests compile them unchanged.
 set(page ${PROJECT_SOURCE_DIR}/docs/objects.md)
 set_property(DIRECTORY APPEND PROPERTY CMAKE_CONFIGURE_DEPENDS ${page})
 file(READ ${page} text)

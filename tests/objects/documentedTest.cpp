@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-// What the documentation shows, compiled from there.
+// Tests the examples of docs/objects.md, which documented.cmake extracts.
 #include "documentedHost.h"
 
 #include "components/componentManager/componentImp.h"

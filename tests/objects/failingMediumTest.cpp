@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-// Media that fail at the n-th call, for every n, under objects.
+// Tests objects on media that fail at the n-th call, for every n.
 #include "tests/support/failingMedium.h"
 #include "tests/objects/support.h"
 
@@ -43,7 +43,7 @@ TYPED_TEST(FailingMediumUnder, AWriterRaisesWriteErrorAndNothingFollows) {
                 const std::string accepted = medium.accepted;
                 EXPECT_THROW(stream << root.get(), QrStreamEx::ExWriteObject);
                 EXPECT_EQ(medium.accepted, accepted);
-                // What did arrive is no whole object.
+                // The bytes that were accepted are not a complete object.
                 Loading<TypeParam> in(accepted);
                 readFailure([&] { in.object(); });
             }

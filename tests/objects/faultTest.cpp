@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-// What is wrong with an object, its class or its file, and what is said about it.
+// Tests faults in objects, classes and files, and the reason that the exception states.
 #include "tests/objects/support.h"
 
 namespace {
@@ -16,8 +16,8 @@ constexpr const char* unknownText = "3A5D1CA9-7E2B4F19-B1C60A2D-55AA1201";
 template <class Stream>
 class Faulty : public ObjectsOn<Stream> {
   protected:
-    /// Expects that an object of that class and version with this content cannot be read, and gives
-    /// what is said about it.
+    /// Expects that an object of that class and version with this content cannot be read. Returns
+    /// the reason.
     static std::string failureOf(
         const QrUid& uid, unsigned int version,
         std::function<void(QrStream&)> content = [](QrStream&) {}) {
@@ -26,12 +26,12 @@ class Faulty : public ObjectsOn<Stream> {
         const std::string reason = readFailure([&] { in.object(); });
         EXPECT_THAT(reason, StartsWith("byte "));
         EXPECT_THAT(reason, EndsWith(": Error loading object."));
-        // It stays so.
+        // Later reads fail too.
         EXPECT_THAT(readFailure([&] { in.object(); }), HasSubstr("an earlier object failed"));
         return reason;
     }
 
-    /// What a node of number 1 writes, by hand.
+    /// Writes what a node with the number 1 writes.
     static void writeNode(QrStream& s) {
         s << 1;
         QrWriteExactText(s, L"n");
@@ -87,7 +87,7 @@ TYPED_TEST(Faulty, ObjectThatReadsLessThanWasWrittenIsNoticed) {
 TYPED_TEST(Faulty, ObjectThatReadsMoreThanWasWrittenIsNoticed) {
     this->failureOf(nodeUid, 3, [](QrStream& s) { s << 1; });
     this->failureOf(nodeUid, 3, [](QrStream&) {});
-    // There is more behind it that could be taken for it.
+    // Data follows that the object could read by mistake.
     Scripted object(viewedUid, 1, [](QrStream&) {});
     Saving<TypeParam> out;
     out.stream << &object << 1 << 2 << 3;
@@ -221,7 +221,7 @@ TYPED_TEST(Faulty, ObjectRefusedInsideAnotherMayBeLeftOut) {
     EXPECT_TRUE(in.node());
 }
 
-/// Nodes in one another, `depth` of them.
+/// Returns a chain of `depth` nodes, each of which contains the next one.
 QrPtr<Node> chain(const std::function<QrPtr<Node>()>& make, int depth) {
     QrPtr<Node> first = make();
     QrPtr<Node> last = first;
@@ -255,7 +255,7 @@ TYPED_TEST(Faulty, NestingIsAllowedToTheStatedDepthOnly) {
 
 TYPED_TEST(Faulty, NestingBeyondTheStatedDepthIsNoticedWhenItIsRead) {
     for (const unsigned int depth : {500U, 501U, 100000U}) {
-        Saving<TypeParam> out; // Objects by hand, as no writer would nest them.
+        Saving<TypeParam> out; // Written by hand: a writer refuses this depth.
         for (unsigned int number = 1; number <= depth; ++number) {
             out.stream << number << nodeUid << 3U << 1;
             QrWriteExactText(out.stream, L"");
@@ -319,7 +319,8 @@ TEST_F(Objects, AreNotReadFromOutputNorWrittenToInput) {
     QrObjectOutBuffer wrongOut(&in);
     QrBinaryStream writing(&wrongOut);
     EXPECT_THROW(writing << node(1).get(), QrStreamEx::ExWrite);
-    // Each refuses the other half as its own buffer does.
+    // An object input rejects writing in the same way as its buffer does, and an object output
+    // reading.
     QrObjectInBuffer rightIn(&in);
     QrBinaryStream other(&rightIn);
     EXPECT_THROW(other << node(1).get(), QrStreamEx::ExWriteObjectImp);

@@ -1,6 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-// The forms that values have inside objects: what comes back exactly, and what is refused when it
-// is written.
+// Tests the forms of values inside objects: each is read back exactly, or writing it throws.
 #include "tests/objects/support.h"
 
 namespace {
@@ -21,7 +20,7 @@ class Form : public ObjectsOn<Stream> {
         return result;
     }
 
-    /// The reason for which it is not written; empty when it is.
+    /// Returns the reason why the object cannot be written, or "".
     static std::string refusal(const std::wstring& name) {
         try {
             saved<Stream>(spelled(name).get());
@@ -48,7 +47,7 @@ class Form : public ObjectsOn<Stream> {
         }
     }
 
-    /// Whether each piece of formatted text is distinguishable from what is next to it.
+    /// Returns whether each piece of formatted text can be told from its neighbours.
     static bool isSeparated(const std::wstring& name) {
         for (std::size_t at = 1; at < name.size(); ++at) {
             const bool open = name[at - 1] == L'f' || name[at - 1] == L'l';
@@ -64,7 +63,7 @@ class Form : public ObjectsOn<Stream> {
 TYPED_TEST_SUITE(Form, StreamKinds);
 
 TYPED_TEST(Form, OfEveryValueNextToEveryOtherComesBackOrIsRefused) {
-    // In binary data nothing marks the end of formatted text.
+    // Binary data does not mark the end of formatted text.
     const std::wstring letters = this->isBinary ? L"idbeoICBWS"
                                  : this->isText ? L"idbeofglICB"
                                                 : L"idbeofglICBWS";

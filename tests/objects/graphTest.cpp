@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-// Graphs of objects that are written and come back.
+// Tests that graphs of objects are read back as they were written.
 #include "tests/objects/support.h"
 
 #include "tests/streams/support.h"
@@ -41,7 +41,7 @@ TYPED_TEST(Graph, SharesWhatWasShared) {
     EXPECT_EQ(read->links[0], read->links[2]);
     EXPECT_EQ(read->links[0], read->links[1]->links[0]);
     EXPECT_EQ(read->links[0], read->links[1]->links[1]);
-    // Equal is not the same.
+    // An equal object is still another object.
     EXPECT_FALSE(read->links[0] == read->links[3]);
     this->expectEqual(*read->links[0], *read->links[3]);
 }
@@ -90,7 +90,7 @@ TYPED_TEST(Graph, OfNothingIsNull) {
     Loading<TypeParam> in(saved<TypeParam>(nullptr));
     EXPECT_FALSE(in.object());
     EXPECT_EQ(in.source.peek(), std::istringstream::traits_type::eof());
-    // Whatever interface is wanted, null has it.
+    // A null object is returned for any interface.
     Loading<TypeParam> again(saved<TypeParam>(nullptr));
     EXPECT_FALSE(again.object(&Stranger::uid));
 }
@@ -190,7 +190,7 @@ TYPED_TEST(Graph, RemembersTheObjectAndNotTheCompanionThatReadsIt) {
     const QrPtr<Node> again = in.node();
     in.finish();
     EXPECT_EQ(read->number, 5);
-    EXPECT_TRUE(read->flag) << "the object inside it should have been it";
+    EXPECT_TRUE(read->flag) << "the object that the companion read must be its owner";
     EXPECT_EQ(read, again);
 }
 

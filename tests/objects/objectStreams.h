@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Whole objects on streams over bytes in memory.
+/// Streams of whole objects in memory.
 #pragma once
 
 #include "components/componentManager/binaryStream.h"
@@ -48,7 +48,7 @@ struct Loading {
     Stream stream{&objects};
 };
 
-/// What one object is as bytes.
+/// Returns the bytes of one object.
 template <class Stream>
 std::string saved(const QrCastable* object) {
     Saving<Stream> out;
@@ -56,7 +56,7 @@ std::string saved(const QrCastable* object) {
     return out.bytes();
 }
 
-/// Undoes the links among all nodes that can be reached: circles never end by themselves.
+/// Clears the links of all nodes that can be reached, so that cycles are freed.
 inline void unlink(const QrPtr<Node>& start) {
     std::vector<QrPtr<Node>> found{start};
     while (!found.empty()) {

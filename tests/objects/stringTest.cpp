@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-// Strings inside objects: exact, or refused.
+// Tests strings inside objects: they are read back exactly, or writing them throws.
 #include "tests/objects/support.h"
 
 #include "tests/streams/support.h"
@@ -93,7 +93,7 @@ TEST_F(Strings, NumbersThatTextCannotCarryAreRefusedLikewise) {
 
 TEST_F(Strings, ThatLookLikeNumbersAreRefusedInTextAsWell) {
     EXPECT_THAT(refusal<QrTextStream>(L"123"), HasSubstr("exactly"));
-    // No writer writes it, but a file may have it.
+    // No writer writes this, but a file can contain it.
     Scripted byHand(stringUid, 1, [](QrStream& s) { s << 6 << 3 << 123 << 6; });
     Loading<QrTextStream> in(saved<QrTextStream>(&byHand));
     EXPECT_THAT(readFailure([&] { in.object(); }),
@@ -101,7 +101,7 @@ TEST_F(Strings, ThatLookLikeNumbersAreRefusedInTextAsWell) {
 }
 
 TEST_F(Strings, OutsideTheLocaleAreRefused) {
-    // In the "C" locale characters are bytes.
+    // In the "C" locale a character is one byte.
     EXPECT_THAT(refusal<QrBinaryStream>(L"a\x100"), HasSubstr("Error writing stream."));
     EXPECT_THAT(refusal<QrBinaryStream>(L"\x20AC"), HasSubstr("Error writing stream."));
 }
@@ -118,7 +118,7 @@ TEST_F(Strings, OfOtherLocalesAreExactInThem) {
     }
 }
 
-/// Some locales write a character that looks similar.
+/// Some locales replace a character by a similar one. Such a character must be refused.
 TEST_F(Strings, WithCharactersThatTheLocaleChangesAreRefused) {
     std::vector<std::string> names{"C"};
     for (const MultibyteLocale& locale : multibyteLocales())
@@ -147,7 +147,7 @@ TEST_F(Strings, ArraysOfCharactersAreExactInBinaryAndRefusedInText) {
         EXPECT_EQ(binary.node()->name, object->name);
         Saving<QrTextStream> out;
         EXPECT_THROW(out.stream << object.get(), QrStreamEx::ExWriteError);
-        // No writer writes it, but a file may have it.
+        // No writer writes this, but a file can contain it.
         Scripted byHand(wideUid, 1, [&](QrStream& s) { s << static_cast<int>(character) << 8; });
         Loading<QrTextStream> text(saved<QrTextStream>(&byHand));
         EXPECT_THAT(readFailure([&] { text.object(); }),
@@ -227,7 +227,7 @@ TYPED_TEST(ExactText, OfRandomCharactersComesBack) {
         std::wstring text(random() % 40, L'\0');
         for (wchar_t& c : text)
             c = static_cast<wchar_t>(random() >> random() % 32);
-        // Two halves of a pair are one character where characters are pairs, so they are left out.
+        // Leave out surrogates: where wchar_t has 16 bits, two of them are one character.
         for (wchar_t& c : text)
             if ((static_cast<std::uint32_t>(c) & 0xF800U) == 0xD800)
                 c = L'x';

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// What the tests of whole objects share: nodes, and objects whose stored form is made up.
+/// The fixture for the tests of whole objects, and objects with made-up content.
 #pragma once
 
 #include "tests/objects/objectStreams.h"
@@ -14,7 +14,7 @@
 
 namespace Mz::Test {
 
-/// An object that claims to be of any class and writes whatever it is told to. Not counted.
+/// An object that claims any class and writes any content. Not counted.
 class Scripted final : public QrCastImpl<Scripted, QrPersistant> {
   public:
     Scripted(const QrUid& claimed, unsigned int version, std::function<void(QrStream&)> content)
@@ -31,7 +31,7 @@ class Scripted final : public QrCastImpl<Scripted, QrPersistant> {
     std::function<void(QrStream&)> writeContent;
 };
 
-/// The reason of the `ExReadObject` that `work` ends in.
+/// Returns the reason of the `ExReadObject` that `work` throws.
 template <class Work>
 std::string readFailure(Work&& work) {
     try {
@@ -39,11 +39,11 @@ std::string readFailure(Work&& work) {
     } catch (const QrStreamEx::ExReadObject& failure) {
         return failure.getReason();
     }
-    ADD_FAILURE() << "there was no failure";
+    ADD_FAILURE() << "ExReadObject was not thrown";
     return {};
 }
 
-/// The component manager with the test's classes.
+/// Initialises the manager with the classes of the tests.
 class Objects : public testing::Test {
   protected:
     Objects() {
@@ -66,7 +66,7 @@ class Objects : public testing::Test {
         return result;
     }
 
-    /// Nodes of `nodeUid` that exist.
+    /// Returns the number of existing nodes that their classes count.
     static int alive() {
         const QrRef<QrCastable> census = QrGetComponentManager()->createObject(censusUid);
         return queryCast<Census>(census.get())->alive();
@@ -81,7 +81,7 @@ class Objects : public testing::Test {
     }
 };
 
-/// The same for each kind of stream.
+/// The same fixture for each class of stream.
 template <class Stream>
 class ObjectsOn : public Objects {};
 using StreamKinds = testing::Types<QrBinaryStream, QrTextStream, BaseStream>;

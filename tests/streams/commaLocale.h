@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// A locale whose decimal separator is a comma, from whatever the system has.
+/// A locale of the system whose decimal separator is a comma.
 #pragma once
 
 #include <clocale>
@@ -7,10 +7,10 @@
 
 namespace Mz::Test {
 
-/// Makes a comma-decimal locale that of the process, for all categories; false when there is none.
+/// Sets a comma-decimal locale for the process, in all categories. Returns false if there is none.
 bool setCommaLocale();
 
-/// The comma-decimal locale for as long as it lives.
+/// Sets the comma-decimal locale while it lives. Converts to false if there is none.
 class CommaLocale {
   public:
     CommaLocale() : previous(std::setlocale(LC_ALL, nullptr)), isSet(setCommaLocale()) {}

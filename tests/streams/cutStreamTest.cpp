@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-// Input that ends too early, or claims more than it has.
+// Tests input that ends too early or claims a greater length than it has.
 #include "tests/streams/support.h"
 
 #include <gtest/gtest.h>
@@ -22,7 +22,7 @@ T sample() {
 }
 template <>
 unsigned long sample<unsigned long>() {
-    return 4'000'000'017UL; // As large as it may be on every platform.
+    return 4'000'000'017UL; // Fits in 32 bits: the width of a long on the wire.
 }
 template <>
 std::wstring sample<std::wstring>() {
@@ -37,7 +37,7 @@ wchar_t sample<wchar_t>() {
     return L'w';
 }
 
-/// Cuts the binary form of one value, and of three, at every byte.
+/// Cuts the binary form of one value, and of an array of three, at every byte.
 template <class T>
 void cutBinary() {
     const T values[3] = {sample<T>(), sample<T>(), sample<T>()};
@@ -54,7 +54,7 @@ void cutBinary() {
         Reading<QrBinaryStream> in(three.substr(0, length));
         T read[3]{};
         const auto whole = static_cast<int>(length / one.size());
-        // Of a string, the length alone is nothing yet; once it is there, its characters must be.
+        // An incomplete length ends the array. After a complete length its characters are required.
         const bool startedString = std::is_same_v<T, std::wstring> && length % one.size() >= 4;
         if (startedString) {
             EXPECT_THROW(in.stream.read(read[0], 3), QrStreamEx::ExReadError) << length;
@@ -108,7 +108,7 @@ TEST(CutStream, AnErrorNamesTheStreamThatReads) {
     }
 }
 
-/// Cuts the text of one number at every character: digits that are there are a number.
+/// Cuts the text of one number at every character. A prefix that ends with a digit is a number.
 template <class T>
 void cutText() {
     const std::string text = written<QrTextStream>([](QrStream& stream) { stream << sample<T>(); });
@@ -145,7 +145,8 @@ TEST(CutStream, TextNumbersAreWhatDigitsAreThere) {
 TEST(CutStream, TextStringsRaise) {
     const std::string text =
         written<QrTextStream>([](QrStream& stream) { stream << sample<std::wstring>(); });
-    // The separator is read as a character, so the last character is never missed.
+    // The string's first character is the separator, so the last character of the text is never
+    // needed.
     for (std::size_t length = 0; length + 1 < text.size(); ++length) {
         Reading<QrTextStream> in(text.substr(0, length));
         std::wstring value;
@@ -184,7 +185,8 @@ TEST(CutStream, BoolsAndCharactersRaise) {
     EXPECT_EQ(Reading<QrTextStream>("").stream.read(flag, 1), 0);
 }
 
-/// Characters that a string may hold when it fails: those of the input, and what grows ahead.
+/// The allowed capacity of a string after a failure: the characters of the input, and what the
+/// string grows ahead of them.
 constexpr std::size_t ahead = 200'000;
 
 template <class Stream>
@@ -222,7 +224,7 @@ TEST(CutStream, ANulFillsNoMoreThanAMillionCharacters) {
         expectCheapFailure<QrBinaryStream>(fromHex(length) + "abc" + nul, 2'500'000);
     }
     expectCheapFailure<QrTextStream>("2147483647 " + nul, 2'500'000);
-    // A short one is filled, as the IO fills it, and the NUL stays.
+    // A short string is filled up with NULs. The NUL byte stays unread.
     Reading<QrBinaryStream> in(fromHex("00 00 00 04") + "a" + nul + "b");
     std::wstring value;
     in.stream >> value;

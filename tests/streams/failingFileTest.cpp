@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
-// Files of the system's that fail: reading one's own memory at no address, writing to a full
-// device.
+// Tests system files whose operations fail: reading /proc/self/mem at address 0, and writing to
+// /dev/full.
 #include "tests/streams/support.h"
 
 #include <gtest/gtest.h>
@@ -41,7 +41,7 @@ void expectWriteError() {
     ASSERT_TRUE(file.good());
     Mz::QrOutBuffer io(&file);
     Stream stream(&io);
-    // The file keeps what is written until there is a block of it.
+    // The file buffers its output: it fails only when the buffer is full.
     constexpr int moreThanABlock = 100'000;
     EXPECT_THROW(
         {

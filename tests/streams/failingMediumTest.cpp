@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-// Media that fail at the n-th call, for every n.
+// Tests streams on media that fail at the n-th call, for every n.
 #include "tests/support/failingMedium.h"
 #include "tests/streams/support.h"
 
@@ -112,8 +112,8 @@ void counted(QrStream& stream) {
     EXPECT_EQ(stream.read(values[0], 2), 2);
 }
 
-/// Every reader fails with `ExReadError` wherever the medium throws, and with nothing else where it
-/// merely ends.
+/// Expects that every reader throws `ExReadError` where the medium throws, and throws nothing else
+/// where the medium ends.
 void failReading(const std::string& input, bool binary, const Reader& read) {
     for (const bool throwing : {true, false}) {
         bool failed = true;
@@ -246,7 +246,7 @@ TEST(FailingMedium, ARecordedListRaisesReadErrorAndKeepsNothingHalfRead) {
 }
 
 TEST(FailingMedium, TheNumberIsStoredEvenIfTheLookAheadCannotBePutBack) {
-    // Two calls give "4" and "x", the third would take the "x" back.
+    // Two calls return "4" and "x". The third call, which puts the "x" back, fails.
     FailingMedium medium("4x", 2, false);
     std::istream source(&medium);
     Mz::QrInBuffer buffer(&source);

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-// Random formats and inputs, against the C library.
+// Compares random formats and inputs with the C library.
 #include "tests/streams/commaLocale.h"
 #include "tests/streams/oracle.h"
 #include "tests/streams/support.h"
@@ -27,7 +27,7 @@ class Random {
     unsigned int below(unsigned int limit) { return static_cast<unsigned int>(engine()) % limit; }
     bool chance() { return below(2) == 1; }
     std::uint64_t bits() { return std::uint64_t{engine()} << 32 | engine(); }
-    /// Numbers of all lengths, not only long ones.
+    /// Returns a number of a random length.
     std::uint64_t number() { return bits() >> below(64); }
     template <std::size_t Size>
     wchar_t oneOf(const wchar_t (&set)[Size]) {
@@ -46,7 +46,8 @@ class Random {
 
 constexpr int rounds = MZ_RANDOM_VALUES / 40;
 
-/// A random directive up to its size: flags from `flags`, width and precision.
+/// Returns a random directive without its size and conversion: flags from `flags`, width,
+/// precision.
 std::wstring directive(Random& random, std::wstring_view flags, unsigned int longestPrecision) {
     std::wstring result = L"%";
     const bool precise = longestPrecision > 0 && random.chance();
@@ -64,7 +65,7 @@ template <class... Arguments>
 void expectPrintedAlike(const std::wstring& format, Arguments... arguments) {
     Writing<QrTextStream> out;
     out.stream.formattedWrite(format.c_str(), arguments...);
-    // The oracle is asked under "C", whatever is set here.
+    // The C library formats in the "C" locale, whatever locale the test has set.
     const std::string previous = std::setlocale(LC_ALL, nullptr);
     std::setlocale(LC_ALL, "C");
     const std::wstring wanted = oraclePrint(format.c_str(), arguments...);
@@ -73,7 +74,7 @@ void expectPrintedAlike(const std::wstring& format, Arguments... arguments) {
 }
 
 void printAlike(unsigned int seed) {
-    // Zeros that fill a width or a precision make one C library write beyond its own buffer.
+    // One C library overflows its buffer when zeros fill a width or a precision.
     const unsigned int longest = oracleFollowsTheStandard ? 25 : 0;
     const std::wstring_view signedFlags = oracleFollowsTheStandard ? L"-+ 0" : L"-+ ";
     const std::wstring_view unsignedFlags = oracleFollowsTheStandard ? L"-#0" : L"-";
@@ -88,7 +89,7 @@ void printAlike(unsigned int seed) {
             expectPrintedAlike(L"a" + start + L"I64" + conversion + L"z",
                                static_cast<int64>(random.number()));
             break;
-        case 1: // The low half is what a short is.
+        case 1: // The library uses the low 16 bits.
             expectPrintedAlike(start + L"h" + conversion, static_cast<int>(random.number()));
             break;
         default: expectPrintedAlike(start + conversion, static_cast<int>(random.number()));
@@ -115,8 +116,8 @@ TEST(FormatOracle, TheyPrintTheSameUnderACommaLocale) {
     EXPECT_STREQ(std::localeconv()->decimal_point, ",");
 }
 
-/// Whether the C libraries disagree with the standard, and with one another, about the input: a
-/// "0x" or an exponent without digits behind it.
+/// Returns whether C libraries differ from the standard, and from each other, for the input: it has
+/// a "0x" or an exponent without digits.
 bool isContested(const std::string& input, bool limited) {
     for (std::size_t at = input.find_first_of("xXeE"); at != std::string::npos;
          at = input.find_first_of("xXeE", at + 1)) {
@@ -131,7 +132,7 @@ bool isContested(const std::string& input, bool limited) {
     return false;
 }
 
-/// Reads one value and what was consumed with both scanners.
+/// Reads a value with both scanners and compares the value and the number of characters used.
 template <class T>
 void expectScannedAlike(const std::string& input, const std::wstring& format) {
     T ours[40]{};
@@ -163,7 +164,7 @@ std::wstring width(Random& random, bool& limited) {
 void scanNumber(Random& random) {
     bool limited = false;
     const std::wstring taken = width(random, limited);
-    // Short enough to fit: the C libraries differ in what they do beyond.
+    // Short enough not to overflow: C libraries differ in what they do then.
     std::string input = random.text(" \n", 2) + random.text("+-", 1) +
                         (random.chance() ? "0x" : "") + random.text("0123456789abcdefABCDEF8", 7) +
                         random.text("gz-+. 0", 3);

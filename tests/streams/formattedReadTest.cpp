@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Tests the conversions of formattedRead: the value, the width of the store, and the unread input.
 #include "tests/streams/support.h"
 
 #include <gtest/gtest.h>
@@ -13,7 +14,7 @@ using namespace Mz::Test;
 using Mz::int64;
 using Mz::QrTextStream;
 
-/// A target between bytes that nothing may change, so that a store of a wrong width shows.
+/// A target between guard bytes, which show a store of the wrong width.
 template <class T, std::size_t Count = 1>
 class Guarded {
   public:
@@ -24,7 +25,7 @@ class Guarded {
         std::memcpy(&value, bytes + margin + index * sizeof(T), sizeof(T));
         return value;
     }
-    /// Whether all but the first `stored` values is untouched.
+    /// Returns whether all bytes after the first `stored` values are unchanged.
     bool intact(std::size_t stored = Count) const {
         for (std::size_t index = 0; index < sizeof bytes; ++index)
             if ((index < margin || index >= margin + stored * sizeof(T)) && bytes[index] != 0xA5)
@@ -48,7 +49,7 @@ struct Scan {
     std::string rest;
 };
 
-/// Reads one value of type `T` and expects what is stored, and what is left unread.
+/// Reads a value of type `T`. Expects the stored value and the unread rest.
 template <class T>
 void expect(std::string_view input, const wchar_t* format, T value, std::string_view rest = "") {
     SCOPED_TRACE(std::string(input));
@@ -60,7 +61,7 @@ void expect(std::string_view input, const wchar_t* format, T value, std::string_
     EXPECT_EQ(scan.rest, rest);
 }
 
-/// Expects that nothing is assigned, and what is left unread.
+/// Expects that nothing is stored, and the unread rest.
 void expectNone(std::string_view input, const wchar_t* format, std::string_view rest) {
     SCOPED_TRACE(std::string(input));
     Guarded<int64, 8> target;
@@ -102,14 +103,14 @@ TEST(FormattedRead, KnowsTheBasesOfNumbers) {
     expect("0", L"%x", 0);
     expect("0 ", L"%x", 0, " ");
     expect("1F", L"%p", 31);
-    // No prefix there: the zero is the number.
+    // These conversions have no prefix: the number is the zero.
     expect("0x1F", L"%p", 0, "x1F");
     expect("0x1F", L"%d", 0, "x1F");
     expectNone("8", L"%o", "8");
     expectNone("g", L"%x", "g");
     expectNone("0xg", L"%x", "g");
     expectNone("0x", L"%i", "");
-    // A width that ends behind the zero, or behind the prefix.
+    // The width ends after the zero or after the prefix.
     expect("0x1F", L"%1x", 0, "x1F");
     expect("0x1F", L"%3x", 1, "F");
     expect("-0x1F", L"%4x", -1, "F");
@@ -156,7 +157,7 @@ TEST(FormattedRead, NumbersAreTakenModuloTheirWidth) {
     expect<int64>("18446744073709551617", L"%I64d", 1);
     expect<int64>("9223372036854775808", L"%I64d", std::numeric_limits<int64>::min());
     expect<int>("18446744073709551617", L"%d", 1);
-    // 64-bit values in a long are 32 bits of the text, on every platform.
+    // A long takes the low 32 bits of the text, on every platform.
     expect<long>("4294967297", L"%ld", 1);
     expect<long>("2147483648", L"%ld", -2147483647L - 1);
     expect<unsigned long>("8589934593", L"%lu", 1);
@@ -217,7 +218,7 @@ TEST(FormattedRead, ARealNumberHasAtMost349Characters) {
     EXPECT_EQ(wide.rest.size(), 400U - 349U);
     const Scan narrow(digits, L"%348lg", static_cast<double*>(target));
     EXPECT_EQ(narrow.rest.size(), 400U - 348U);
-    // The sign is one of them.
+    // The sign counts too.
     EXPECT_EQ(Scan("-" + digits, L"%lg", static_cast<double*>(target)).rest.size(), 400U - 348U);
     expect("0." + std::string(346, '0') + "12", L"%lg", 0.0, "2");
     expect("0." + std::string(343, '0') + "1e344", L"%lg", 1e-310, "4");
@@ -343,7 +344,7 @@ TEST(FormattedRead, SetsAcceptTheirMembers) {
 }
 
 TEST(FormattedRead, AnUnfinishedFormatEndsAtItsTerminator) {
-    // A wrong step behind the terminator would find the conversion that stands there.
+    // A scanner that steps over the terminator would find the conversion after it.
     const wchar_t* const unfinished[] = {L"%\0%d",  L"%w\0%d",  L"%5\0%d", L"%*\0%d", L"%I64\0%d",
                                          L"%l\0%d", L"%hL\0%d", L"%F\0%d", L"%N\0%d"};
     for (const wchar_t* format : unfinished) {
@@ -364,7 +365,7 @@ TEST(FormattedRead, AnUnknownConversionIsALiteralBehindWhiteSpace) {
     EXPECT_EQ(Scan("  y5", L"%y%d", static_cast<int*>(target)).assigned, 1);
     EXPECT_EQ(Scan("Y5", L"%y%d", static_cast<int*>(target)).rest, "Y5");
     EXPECT_EQ(Scan("k5", L"%l3k%d", static_cast<int*>(target)).assigned, 1);
-    // "I" without "64" is a number that detects its base.
+    // "I" without "64" is the conversion %i, which detects the base.
     expect("0x10", L"%I32", 16, "");
     expect("0x10", L"%I6", 16, "");
 }

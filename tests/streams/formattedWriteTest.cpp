@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Tests the conversions of formattedWrite against the expected texts.
 #include "tests/streams/support.h"
 
 #include <gmock/gmock.h>

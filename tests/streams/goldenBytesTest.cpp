@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Tests the text and binary form of every type against golden bytes.
 #include "tests/streams/support.h"
 
 #include <gtest/gtest.h>
@@ -13,8 +14,8 @@ using Mz::QrBinaryStream;
 using Mz::QrStream;
 using Mz::QrTextStream;
 
-/// What three values of a type look like: the first by itself, and the three as an array. These
-/// bytes are those of files that exist; a test that fails here means that they can be read no more.
+/// The form of three values of a type: the first one alone, and all as an array. Existing files
+/// contain these bytes. If a test here fails, those files cannot be read any more.
 struct Golden {
     const char* type;
     const char* singleText;
@@ -47,7 +48,7 @@ constexpr Golden table[] = {
     {"double", "1", "1 0.1 -1.797693134862316e+308", "3F F0 00 00 00 00 00 00",
      "3F F0 00 00 00 00 00 00 3F B9 99 99 99 99 99 9A FF EF FF FF FF FF FF FF"},
     {"bool", "1", "101", "01", "01 00 01"},
-    // A single character is text even in a binary stream.
+    // A single character is text in a binary stream, too.
     {"wchar_t", "65", "65 8364 65535", "36 35", "00 41 20 AC FF FF"},
     {"string", "3 a b", "3 a b0 2 \xE9z", "00 00 00 03 61 20 62",
      "00 00 00 03 61 20 62 00 00 00 00 00 00 00 02 E9 7A"},
@@ -92,7 +93,8 @@ void expectWritesAndReads(const Golden& golden, const T (&values)[3]) {
     expectReads<BaseStream>(golden.singleText, fromHex(golden.countedBinary), values);
 }
 
-/// Codes are written and never read; arrays are read as binary data by every stream.
+/// A single character is written as its code and cannot be read. Every stream reads arrays as
+/// binary data.
 void expectCharacters(const Golden& golden) {
     const wchar_t values[3] = {L'A', L'\x20AC', L'\xFFFF'};
     expectWrites(golden, values);
@@ -109,7 +111,7 @@ void expectCharacters(const Golden& golden) {
     EXPECT_EQ(character, L'?');
 }
 
-/// Strings come back from binary data only: text gives them back shifted.
+/// Strings are read back from binary data only. Text returns them shifted by the separator.
 void expectStrings(const Golden& golden) {
     const std::wstring values[3] = {L"a b", L"", L"\xE9z"};
     expectWrites(golden, values);
@@ -146,7 +148,7 @@ void expectType(const Golden& golden) {
     else if (type == "float")
         expectWritesAndReads<float>(golden, {0.1F, -0.0F, 1e10F});
     else if (type == "double")
-        // The longest finite value needs a seventeenth digit to come back from text.
+        // The text of the largest double cannot be read back: that needs a seventeenth digit.
         expectWrites<double>(golden, {1.0, 0.1, -std::numeric_limits<double>::max()});
     else if (type == "bool")
         expectWritesAndReads<bool>(golden, {true, false, true});

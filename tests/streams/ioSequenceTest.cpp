@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Tests which calls, and in which order, a stream makes on its IO.
 #include "tests/streams/recordingIO.h"
 #include "tests/streams/support.h"
 
@@ -16,7 +17,7 @@ using Mz::QrTextStream;
 using testing::ElementsAre;
 using testing::IsEmpty;
 
-/// The calls that an IO sees while `work` uses a stream of the kind `Stream` on it.
+/// Returns the calls that the IO receives while `work` uses a stream of class `Stream` on it.
 template <class Stream, class Work>
 std::vector<std::string> calls(Work&& work, const std::string& input = {}) {
     RecordingIO io(input);
@@ -139,10 +140,10 @@ TEST(IOSequence, TheScannerLooksOneCharacterAheadAndGivesItBack) {
     EXPECT_THAT(calls<QrTextStream>([&](QrStream& s) { s >> number; }, " 42x"),
                 ElementsAre("readChar wide", "readChar wide", "readChar wide", "readChar wide",
                             "ungetc wide 120"));
-    // The end of input is met once, and nothing is given back.
+    // The end of input is read once. Nothing is put back.
     EXPECT_THAT(calls<QrTextStream>([&](QrStream& s) { s >> number; }, "7"),
                 ElementsAre("readChar wide", "readChar wide"));
-    // A width that is used up needs no look ahead.
+    // A number that uses its whole width needs no lookahead.
     EXPECT_THAT(calls<QrTextStream>([&](QrStream& s) { s.formattedRead(L"%1d", &number); }, "12"),
                 ElementsAre("readChar wide"));
 }

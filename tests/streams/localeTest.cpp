@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-// Streams under a locale whose decimal separator is a comma, and the locale after them.
+// Tests streams in a locale whose decimal separator is a comma, and that they restore the locale.
 #include "tests/streams/commaLocale.h"
 #include "tests/streams/recordingIO.h"
 #include "tests/streams/support.h"
@@ -73,7 +73,7 @@ TEST_F(UnderCommaLocale, AForeignIOSeesThePointDuringEveryCall) {
     EXPECT_EQ(commas, 0);
     EXPECT_EQ(value, 1.5);
     EXPECT_EQ(io.written(), "2.5 3");
-    // Outside formatted reading and writing the IO sees the locale as it is.
+    // Outside formatted reading and writing the IO sees the locale of the process.
     bool flag = false;
     stream >> flag;
     EXPECT_EQ(commas, 2) << "the skipped separator and the character";
@@ -97,7 +97,7 @@ TEST_F(UnderCommaLocale, TheLocaleComesBackAfterExceptions) {
 }
 
 TEST_F(UnderCommaLocale, FormattedTextIsThatOfTheCLocale) {
-    // A byte is a character there, whatever the locale makes of it.
+    // In the "C" locale every byte is a character.
     Reading<QrTextStream> in("\xE9\xFF ");
     wchar_t text[4]{};
     EXPECT_EQ(in.stream.formattedRead(L"%s", text), 1);
@@ -119,7 +119,8 @@ TEST_F(UnderCommaLocale, ForeignIOsNestInOneAnother) {
     EXPECT_EQ(inner.written(), "1.5");
 }
 
-/// Writes and reads numbers in several threads at once; returns how many went wrong.
+/// Runs `work`, which returns whether it succeeded, on several threads; returns the number of
+/// failures.
 template <class Work>
 int inThreads(Work&& work) {
     std::atomic<int> wrong = 0;
@@ -191,7 +192,7 @@ TEST_F(UnderCommaLocale, PlainBytesHoldForTheConverterAndOneThread) {
     EXPECT_STREQ(std::localeconv()->decimal_point, ",");
 }
 
-/// An IO that delivers any wide character.
+/// An IO that returns any wide character.
 class WideIO final : public Mz::QrCastImpl<WideIO, Mz::QrBufferedIO, const WideIO&> {
   public:
     explicit WideIO(std::wstring characters) : text(std::move(characters)) {}

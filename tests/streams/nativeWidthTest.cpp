@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
-// Values that the host's types can hold and the stream's widths cannot. Only where there are such.
+// Tests values that fit the platform's types but not the widths of a stream. Only where such types
+// exist.
 #include "tests/streams/support.h"
 
 #include <gtest/gtest.h>
@@ -18,7 +19,7 @@ static_assert(sizeof(long) == 8 && sizeof(wchar_t) == 4);
 constexpr long smallest = std::numeric_limits<int>::min();
 constexpr long largest = std::numeric_limits<int>::max();
 
-/// Writing `value` fails in every form, behind what came before it.
+/// Expects that no form of the stream can write `value`, and that what was written before is kept.
 template <class T>
 void expectRefused(T value) {
     {

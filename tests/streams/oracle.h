@@ -1,20 +1,20 @@
 // SPDX-License-Identifier: BSL-1.0
-/// The C library's own wide printer and scanner, with the conventions of our formats.
+/// The C library's wide printf and scanf, used as an oracle for this library's formats.
 #pragma once
 
 #include <string>
 
 namespace Mz::Test {
 
-/// What the C library makes of the format: that of the wide `printf`, with wide text.
+/// Formats with the C library's wide printf. Text is wide.
 std::wstring oraclePrint(const wchar_t* format, ...);
 
-/// What the C library's wide scanner assigns, through exactly two pointers; the end of input counts
-/// as nothing.
+/// Scans with the C library's wide scanner, with exactly two pointers. Returns the number of values
+/// assigned, 0 at the end of input.
 int oracleScan(const std::wstring& input, const wchar_t* format, ...);
 
-/// Whether the C library writes and reads as the standard has it throughout; else real numbers, and
-/// integers filled with zeros, are left out.
+/// Whether the C library follows the standard everywhere. If not, the tests omit real numbers and
+/// integers filled with zeros.
 extern const bool oracleFollowsTheStandard;
 
 } // namespace Mz::Test

@@ -1,4 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
+// Tests the post-load list: order, transfer, changes during the notifications, a million entries,
+// and the lists of streams.
 #include "tests/streams/recordingIO.h"
 #include "tests/streams/support.h"
 
@@ -19,10 +21,10 @@ using Mz::QrTextStream;
 using testing::ElementsAre;
 using testing::IsEmpty;
 
-/// Who was told, in order.
+/// The names of the objects in the order of their notification.
 using Journal = std::vector<int>;
 
-/// A counted object that writes down when it is told and when it goes.
+/// A counted object that records its notification and its destruction.
 class Told final
     : public Mz::QrCastRef<Mz::QrCastHeap<Mz::QrCastImpl<Told, QrPersistant, const Told&>>> {
   public:
@@ -53,7 +55,7 @@ class PostLoad : public testing::Test {
   protected:
     QrRef<Told> object(int name) { return new Told(journal, name); }
     void append(QrPostLoadList& list, int name) { list.postLoad(object(name).get()); }
-    void TearDown() override { EXPECT_EQ(Told::alive, 0) << "references are left"; }
+    void TearDown() override { EXPECT_EQ(Told::alive, 0) << "objects were leaked"; }
 
     Journal journal;
 };
@@ -177,7 +179,7 @@ TEST_F(PostLoad, AfterATransferTheNextObjectGoesBehindTheMovedOne) {
     QrPostLoadList third;
     append(third, 3);
     third.transfer(to);
-    // Right behind 1, and what followed it is kept.
+    // 2 goes directly after 1. The entry after 1 is kept.
     append(from, 2);
     from.loadFinished();
     EXPECT_THAT(journal, IsEmpty());
@@ -276,7 +278,7 @@ TEST_F(PostLoad, AnObjectThatThrowsAfterItsListWasMovedStaysInTheOther) {
     EXPECT_THAT(journal, ElementsAre(1, 1, 2));
 }
 
-/// One object, appended so often that dropping one entry inside another would exhaust any stack.
+/// The number of entries. Destroying them recursively would overflow any stack.
 constexpr int many = 1'000'000;
 
 TEST_F(PostLoad, AMillionEntriesAreDroppedOneByOne) {
@@ -317,10 +319,10 @@ TEST_F(PostLoad, AMillionEntriesMovedAwayWhileTheFirstIsToldAreDroppedOneByOne) 
 
 // ---- Through streams ------------------------------------------------------------------------
 
-/// A stream on an IO whose objects are what the test makes of them.
+/// A stream on an IO that creates objects for the test.
 class PostLoadOfStream : public PostLoad {
   protected:
-    /// The next `readObject` gives a new object, after `reading` has run as its reading code.
+    /// Lets `readObject` create an object and run `reading` in place of its `read`.
     QrRef<Mz::QrCastable> load(QrStream& stream, int name, std::function<void(Told&)> reading) {
         pending.push_back({name, std::move(reading)});
         return stream.readObject(nullptr, nullptr, nullptr);
@@ -370,7 +372,7 @@ TEST_F(PostLoadOfStream, ASecondRequestReplacesTheFirst) {
         const QrRef<Told> other = object(2);
         stream.postLoad(other.get());
     });
-    // The first object is gone: nobody holds it any more.
+    // The first object is destroyed: its last reference was released.
     EXPECT_EQ(Told::alive, 1);
     QrPostLoadList list;
     stream.transfer(list);
@@ -455,12 +457,12 @@ TEST_F(PostLoadOfStream, ADestroyedStreamTellsNobody) {
 TEST_F(PostLoadOfStream, ATransferEmptiesTheStreamAndLaterObjectsGoIntoTheTarget) {
     QrTextStream stream(&io);
     QrPostLoadList list;
-    stream.transfer(list); // Nothing yet.
+    stream.transfer(list); // Still empty.
     append(list, 1);
     load(stream, 2, [&](Told& read) { stream.postLoad(&read); });
     stream.transfer(list);
     load(stream, 3, [&](Told& read) { stream.postLoad(&read); });
-    // It stands behind 2 already, so there is nothing to move.
+    // 3 is already in `list`, after 2, so nothing moves.
     QrPostLoadList other;
     stream.transfer(other);
     other.loadFinished();

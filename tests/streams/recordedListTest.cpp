@@ -1,4 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
+// Tests the recorded list: its golden bytes, cut and damaged lists, and the companion that reads
+// and writes it.
 #include "tests/streams/support.h"
 
 #include "components/componentManager/manager/componentImpPrivate.h"
@@ -38,7 +40,7 @@ void addBuilder(ComponentLibrary& library, unsigned int name, const std::wstring
     builder.number = name * 0x01000000;
 }
 
-/// A manager that knows three libraries, without their files.
+/// A manager with the records of three libraries, without files.
 struct Known {
     Known() {
         ComponentLibrary& first = manager.libraries.emplace_back(manager);
@@ -72,7 +74,7 @@ void expectSame(const ComponentLibrary& read, const ComponentLibrary& kept) {
     EXPECT_EQ(read.fileName, kept.fileName);
     EXPECT_EQ(read.fileTime, kept.fileTime);
     EXPECT_EQ(read.fileSize, kept.fileSize);
-    // The stored form has no place for these.
+    // The list does not store these.
     EXPECT_EQ(read.descriptionValue, 0);
     EXPECT_EQ(read.componentText1, L"");
     EXPECT_EQ(read.componentText2, L"");
@@ -195,7 +197,7 @@ TEST(RecordedList, CannotBeReadFromText) {
     EXPECT_THROW(companionOf(manager)->read(in.stream), QrStreamEx::ExReadError);
 }
 
-/// How many bytes the first `count` libraries of the list take, its count included.
+/// Returns the size of a list of the first `count` libraries.
 std::size_t bytesOf(std::size_t count) {
     Known known;
     while (known.manager.libraries.size() > count)
@@ -227,7 +229,7 @@ TEST(RecordedList, CutAnywhereKeepsWholeLibrariesAndNothingOfTheHalfRead) {
         expectNoCount<QrBinaryStream>(whole.substr(0, length));
 }
 
-/// Reads a list that must fail, and returns how much of it was taken for true.
+/// Reads a list that must fail. `manager` then has what was accepted.
 struct Hostile {
     explicit Hostile(const std::string& bytes) : in(bytes) {
         EXPECT_THROW(companionOf(manager)->read(in.stream), QrStreamEx::ExReadError);
@@ -263,8 +265,8 @@ TEST(RecordedList, FalseLengthsCostNoMoreThanTheInputHas) {
 }
 
 TEST(RecordedList, ANulIsInNoTextOfAList) {
-    // A NUL byte is never consumed by a text, so it would fill as many characters as are claimed,
-    // again and again.
+    // A text never consumes a NUL byte. Each text of the list would be filled with as many NULs as
+    // it claims.
     const Hostile nul(fromHex("00 00 00 01 00 00 00 02 61 00 62"));
     ASSERT_EQ(nul.manager.libraries.size(), 1U);
     std::string flood = fromHex("00 00 03 E8");
@@ -289,7 +291,7 @@ TEST(RecordedList, EveryCastGivesACompanionOfItsOwn) {
         EXPECT_EQ(*first->getClassUid(),
                   (Mz::QrUid{0x0C3F6A00, 0xADC511D1, 0x988AFC24, 0x07C10E27}));
         EXPECT_EQ(first->getVersion(), 1U);
-        // It answers for itself, and for everything else through the manager.
+        // It answers casts to its own interface, and passes all others to the manager.
         const QrPtr<QrCastable> self =
             QrPtr<QrCastable>::adopt(first->getInterface(QrPersistant::uid));
         EXPECT_EQ(self.get(), first.get());

@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Tests a start that reads the recorded list of an earlier start: which libraries it loads.
 #include "tests/streams/support.h"
 
 #include "components/componentManager/manager/componentImpPrivate.h"
@@ -20,8 +21,7 @@ using Mz::QrPersistant;
 using Mz::QrPtr;
 using testing::ElementsAre;
 
-/// Two component libraries and a file that is none, in a folder of their own, and the list that a
-/// first start leaves behind.
+/// A folder with two component libraries and another file, and the recorded list of a first start.
 class RecordedStart : public testing::Test {
   protected:
     void SetUp() override {
@@ -42,7 +42,7 @@ class RecordedStart : public testing::Test {
             Mz::safeCast<QrPersistant>(static_cast<Mz::QrComponentManager*>(&manager)));
     }
 
-    /// Starts `manager` with the first `length` bytes of the list.
+    /// Reads the first `length` bytes of the list and initialises `manager`.
     void start(ComponentManager& manager, std::size_t length = std::string::npos) {
         Reading<QrBinaryStream> in(list.substr(0, length));
         if (length >= list.size())
@@ -59,7 +59,8 @@ class RecordedStart : public testing::Test {
         return count;
     }
 
-    /// The names of all builders, in the order in which they are enumerated.
+    /// Returns the names of all builders in the order of the enumeration, then the libraries' texts
+    /// if there are any.
     static std::vector<std::wstring> names(ComponentManager& manager) {
         struct Names final : Mz::QrEnumerator<Mz::QrCPtr<Mz::QrBuilderDescription>> {
             Action process(Mz::QrCPtr<Mz::QrBuilderDescription> item) override {
@@ -93,7 +94,7 @@ TEST_F(RecordedStart, OfUnchangedFilesLoadsNothing) {
     start(manager);
     EXPECT_EQ(manager.libraries.size(), 3U);
     EXPECT_EQ(loaded(manager), 0);
-    // The texts of the libraries are not stored, so nothing follows the names.
+    // The list does not store the libraries' texts, so only names follow.
     EXPECT_THAT(names(manager), ElementsAre(L"alpha", L"beta", L"gamma"));
     EXPECT_EQ(loaded(manager), 0);
     const ComponentManager::Builder& alpha = library(manager, L"recordedfirst").builders[0];
@@ -112,7 +113,7 @@ TEST_F(RecordedStart, FirstUseLoadsExactlyOneLibrary) {
     EXPECT_NE(library(manager, L"recordedsecond").module, nullptr);
     EXPECT_TRUE(manager.createObject(recordedGamma));
     EXPECT_EQ(loaded(manager), 1);
-    // Not even now do the texts come.
+    // A lazy load does not read the texts either.
     EXPECT_THAT(names(manager), ElementsAre(L"alpha", L"beta", L"gamma"));
 }
 
@@ -131,7 +132,7 @@ TEST_F(RecordedStart, ReadsAChangedLibraryAfresh) {
                 return entry.path();
         return std::filesystem::path();
     }();
-    // A byte behind the end does no library any harm.
+    // A byte after the end of the file changes its size but not the library.
     std::ofstream(changed, std::ios::binary | std::ios::app).put('\0');
     ComponentManager manager;
     start(manager);

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// A foreign IO: works like the library's own, writes down every call, and may look at the locale.
+/// A foreign IO that behaves like the library's buffers and records every call.
 #pragma once
 
 #include "components/componentManager/bufferio.h"
@@ -13,8 +13,8 @@
 
 namespace Mz::Test {
 
-/// Reads and writes one string stream. Every call is noted as text, "name arguments"; `onCall` runs
-/// at the beginning of each.
+/// Reads and writes string streams. `calls` has each call as text, "name arguments"; `onCall` runs
+/// at the start of each call.
 class RecordingIO final : public QrCastImpl<RecordingIO, QrBufferedIO, const RecordingIO&> {
   public:
     explicit RecordingIO(const std::string& bytes = {}) : source(bytes) {}

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-// Random values through streams and back, with fixed seeds.
+// Tests that random values, with fixed seeds, are read back as they were written.
 #include "tests/streams/support.h"
 
 #include <gtest/gtest.h>
@@ -17,10 +17,10 @@ using Mz::int64;
 using Mz::QrBinaryStream;
 using Mz::QrTextStream;
 
-/// How many values of each type; a constant of the build, smaller where programs run slowly.
+/// The number of values of each type. The build chooses it, smaller where programs run slowly.
 constexpr int count = MZ_RANDOM_VALUES / 4;
 
-/// Values of every bit pattern.
+/// Returns values with random bit patterns.
 template <class T>
 std::vector<T> randomValues(unsigned int seed) {
     std::mt19937_64 engine(seed);
@@ -37,7 +37,7 @@ bool sameBits(const T& a, const T& b) {
     return std::memcmp(&a, &b, sizeof a) == 0;
 }
 
-/// Every value by itself, and all of them as one array.
+/// Writes and reads every value alone, and all of them as one array.
 template <class T>
 void expectBinaryRoundTrip(unsigned int seed) {
     const std::vector<T> values = randomValues<T>(seed);
@@ -130,7 +130,7 @@ TEST(RoundTrip, NotANumberKeepsItsBitsInBinaryData) {
         "7F 80 00 01");
 }
 
-/// FNV-1a.
+/// The FNV-1a hash.
 std::uint64_t hashOf(const std::string& text) {
     std::uint64_t hash = 0xCBF29CE484222325ULL;
     for (const char c : text)
@@ -139,7 +139,7 @@ std::uint64_t hashOf(const std::string& text) {
 }
 
 TEST(RoundTrip, ACorpusOfTextIsTheSameOnEveryPlatform) {
-    // A fixed number of values, so that the text is the same in every build.
+    // The number of values is fixed, so that the text is the same in every build.
     std::mt19937_64 engine(9);
     const std::string text = written<QrTextStream>([&](Mz::QrStream& stream) {
         for (int round = 0; round < 5000; ++round) {

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
-// Where the library goes past a standard stream to its buffer, everything comes out as if it did
-// not.
+// Tests that the library's short cuts past a standard stream to its buffer give the same results as
+// the calls of that stream.
 #include "tests/streams/support.h"
 #include "tests/support/temporaryDirectory.h"
 
@@ -24,7 +24,7 @@ using Mz::QrBinaryStream;
 using Mz::QrStream;
 using Mz::QrTextStream;
 
-/// An output of which the library cannot know what it does.
+/// An output class from outside the library, for which it takes no short cut.
 class ForeignOutput final : public Mz::QrOutBuffer {
   public:
     using Mz::QrOutBuffer::QrOutBuffer;
@@ -50,7 +50,7 @@ struct Input {
     Stream stream{&io};
 };
 
-/// Does `work` on a stream over each kind of output, and expects the same from all.
+/// Runs `work` on a stream over each kind of output and expects equal results.
 template <class Stream, class Work>
 void expectSameOutput(const Work& work) {
     Output<std::stringbuf, Mz::QrOutBuffer, Stream> direct;
@@ -61,7 +61,7 @@ void expectSameOutput(const Work& work) {
     EXPECT_EQ(expected, work(foreign.stream) + foreign.outcome());
 }
 
-/// The same for input; besides what `work` tells, the unread bytes and the stream's state count.
+/// The same for input. Compares the result of `work`, the unread bytes and the stream's state.
 template <class Stream, class Work>
 void expectSameInput(const std::string& content, const Work& work) {
     Input<std::stringbuf, Mz::QrInBuffer, Stream> direct(content);
@@ -83,7 +83,7 @@ std::vector<T> valuesOf(unsigned int seed, std::size_t count) {
     std::mt19937_64 engine(seed);
     std::vector<T> values(count);
     for (T& value : values) {
-        // Of every length, not only long ones.
+        // Values of every length.
         const std::uint64_t bits = engine() >> (engine() % 64);
         std::memcpy(&value, &bits, sizeof value);
     }
@@ -137,7 +137,7 @@ TEST(ShortCuts, CountTheColumnAsTheWholeWayDoes) {
         });
 }
 
-/// Reads one value by `format` and tells result and value.
+/// Reads a value by `format` and returns the result and the value as text.
 template <class T>
 std::string readBy(QrStream& stream, const wchar_t* format) {
     T value{};
@@ -165,7 +165,7 @@ std::string readByFormat(QrStream& stream, std::size_t which) {
     }
 }
 
-/// Text that looks like numbers more often than chance would have it.
+/// Returns random text that often looks like a number.
 std::string randomText(std::mt19937& engine) {
     static const std::vector<std::string> pieces = {" ",
                                                     "\n",
@@ -256,7 +256,7 @@ TEST(ShortCuts, ReadAFileAcrossItsBlocks) {
         double real = 0;
         stream >> value >> real;
         wrong += value == ints[index] && real == static_cast<double>(value) / 8 ? 0 : 1;
-        if (index % 7 == 0) // What was put back is read again, wherever the file keeps it.
+        if (index % 7 == 0) // The next read returns what was put back.
             io.ungetc('8');
         if (index % 7 == 0)
             wrong += io.read() == '8' ? 0 : 1;
@@ -265,7 +265,8 @@ TEST(ShortCuts, ReadAFileAcrossItsBlocks) {
     EXPECT_EQ(io.read(), -1);
 }
 
-/// What is read alternately by format and by character from a file with a buffer of `size` bytes.
+/// Reads by format and by character in turn, from a file with a buffer of `size` bytes; returns the
+/// results.
 template <class IO>
 std::string readThroughBuffer(const std::filesystem::path& path, int size) {
     char memory[64];
@@ -350,8 +351,8 @@ TEST(ShortCuts, AreNotTakenPastATiedStreamOrAFlush) {
     int value = 0;
     stream >> value;
     EXPECT_EQ(value, 12);
-    // Nothing was written, so a standard stream may leave the tied one alone; with something in it,
-    // it must be flushed.
+    // A standard stream may skip the flush of a tied stream that has nothing to write. Write
+    // something, so that the flush is required.
     flushed << "x";
     const int before = watched.syncs;
     stream >> value;
@@ -368,7 +369,7 @@ TEST(ShortCuts, LeaveAStreamThatWasBrokenAlone) {
     EXPECT_EQ(sink.str(), "");
 }
 
-/// `%.16g` the whole way: the width changes nothing but the way.
+/// Formats as `%.16g` does. The width, which has no other effect, prevents the short cut.
 std::string wholeWay(double value) {
     return written<BaseStream>([&](QrStream& s) { s.formattedWrite(L"%1.16g", value); });
 }
@@ -390,7 +391,7 @@ TEST(ShortCuts, GiveADoubleTheDigitsOfTheWholeWay) {
     for (int round = 0; round < MZ_RANDOM_VALUES / 4; ++round) {
         compare(std::bit_cast<double>(engine()));
         compare(ordinary(engine));
-        // A few decimals, as people write them, and their neighbours.
+        // Decimals with few digits, and the doubles next to them.
         const double few = static_cast<double>(static_cast<int>(engine() % 2'000'000) - 1'000'000) /
                            std::pow(10.0, static_cast<double>(engine() % 12));
         compare(few);

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Streams whose every call might be watched, and one kind of stream more.
+/// Streams and buffers for which the library must not take a short cut, and the stream base class.
 #pragma once
 
 #include "components/componentManager/stream.h"
@@ -8,19 +8,19 @@
 
 namespace Mz::Test {
 
-/// The base by itself: single values are text, counted ones are binary.
+/// QrStream alone: single values are text, arrays are binary.
 class BaseStream final : public QrStream {
   public:
     explicit BaseStream(QrCastable* io) : QrStream(io) {}
 };
 
-/// A buffer that is none of the standard library's own: every call might be watched.
+/// A subclass of a standard buffer. It could override any call, so the library must make them all.
 class WatchedBuffer final : public std::stringbuf {
   public:
     using std::stringbuf::stringbuf;
 };
 
-/// An IO of which the library cannot know what it does.
+/// An input class from outside the library, for which it takes no short cut.
 class ForeignInput final : public QrInBuffer {
   public:
     using QrInBuffer::QrInBuffer;

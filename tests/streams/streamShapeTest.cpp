@@ -1,4 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
+// Tests what compiled code needs of the stream classes: vtable slots, overloads, and how a stream
+// finds its IO.
 #include "tests/streams/recordingIO.h"
 #include "tests/streams/support.h"
 
@@ -21,8 +23,8 @@ using Mz::QrStream;
 using Mz::QrTextStream;
 using UInt64 = unsigned long long;
 
-/// The place of a virtual operation in its class's table, by the ABI that both compilers follow: a
-/// pointer to it is the offset plus one.
+/// Returns the vtable slot of a virtual function. In the Itanium C++ ABI, which both compilers
+/// follow, its member pointer is the offset plus one.
 template <class Member>
 int slot(Member member) {
     std::ptrdiff_t words[2];
@@ -49,14 +51,15 @@ int extractSlot() {
     return slot(static_cast<QrStream& (QrStream::*)(T&)>(&QrStream::operator>>));
 }
 
-/// Slot by slot from `first`, for the types in the order in which they stand in each group.
+/// Expects the slots of the types to be consecutive from `first`, in the order of the types in a
+/// group.
 void expectGroup(int first, int (*const (&slots)[15])()) {
     for (int index = 0; index < 15; ++index)
         EXPECT_EQ(slots[index](), first + index) << "type " << index;
 }
 
 TEST(StreamShape, OperationsStandInTheOrderThatLibrariesWereBuiltWith) {
-    // The destructor takes the first two slots.
+    // The destructors have the first two slots.
     EXPECT_EQ(slot(&QrStream::isTextStream), 2);
     EXPECT_EQ(slot(&QrStream::isBinaryStream), 3);
     EXPECT_EQ(slot(&QrStream::postLoad), 4);
@@ -174,7 +177,7 @@ TEST(StreamShape, ANullOrUnsuitableObjectIsABadCast) {
     }
 }
 
-/// An object that counts its references and knows an IO.
+/// A counted object that supplies an IO.
 struct CountedIO final : Mz::QrCastImpl<CountedIO, QrPersistant, const CountedIO&> {
     const Mz::QrUid* getClassUid() const override { return &QrPersistant::uid; }
     unsigned int getVersion() const override { return 0; }

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// What the tests of the streams share: bytes to read from and to write to.
+/// Streams on strings, and hexadecimal bytes, for the tests of streams.
 #pragma once
 
 #include "components/componentManager/binaryStream.h"
@@ -15,12 +15,12 @@
 
 namespace Mz::Test {
 
-/// A stream of the kind `Stream` that reads the given bytes.
+/// A stream of class `Stream` that reads `bytes`.
 template <class Stream>
 struct Reading {
     explicit Reading(std::string_view bytes) : source(std::string(bytes)) {}
 
-    /// The bytes that were not read.
+    /// Reads the bytes that are left.
     std::string rest() { return {std::istreambuf_iterator<char>(source.rdbuf()), {}}; }
 
     std::istringstream source;
@@ -28,7 +28,7 @@ struct Reading {
     Stream stream{&buffer};
 };
 
-/// A stream of the kind `Stream` whose bytes are kept.
+/// A stream of class `Stream` that writes to a string.
 template <class Stream>
 struct Writing {
     std::string bytes() const { return sink.str(); }
@@ -38,7 +38,7 @@ struct Writing {
     Stream stream{&buffer};
 };
 
-/// What `write(stream)` writes to a new stream of the kind `Stream`.
+/// Returns what `write` writes to a new stream of class `Stream`.
 template <class Stream, class Work>
 std::string written(Work&& write) {
     Writing<Stream> out;
@@ -46,7 +46,7 @@ std::string written(Work&& write) {
     return out.bytes();
 }
 
-/// The bytes that "00 FF 41" names.
+/// Returns the bytes of a text such as "00 FF 41".
 inline std::string fromHex(std::string_view digits) {
     const auto value = [](char c) { return c <= '9' ? c - '0' : c - 'A' + 10; };
     std::string bytes;

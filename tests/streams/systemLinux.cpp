@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-// The C library's locale and formatting on Linux, for comparison.
+// The comma-decimal locale and the C library's formats on Linux.
 #include "tests/streams/commaLocale.h"
 #include "tests/streams/oracle.h"
 
@@ -18,7 +18,8 @@ const bool oracleFollowsTheStandard = true;
 
 namespace {
 
-/// The format in the conventions of this C library: text is narrow unless it is said to be wide.
+/// Converts a format to this C library's form: there, text is narrow unless it has the modifier
+/// "l".
 std::wstring translated(const wchar_t* format) {
     std::wstring result;
     for (bool directive = false; *format; ++format) {

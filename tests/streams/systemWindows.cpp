@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-// The C library's locale and formatting on Windows, for comparison.
+// The comma-decimal locale and the C library's formats on Windows.
 #include "tests/streams/commaLocale.h"
 #include "tests/streams/oracle.h"
 
@@ -13,7 +13,7 @@ bool setCommaLocale() {
     return std::setlocale(LC_ALL, "German") != nullptr;
 }
 
-// Exponents have three digits, and some versions fill with zeros in spite of a precision.
+// Exponents have three digits. Some versions fill with zeros although there is a precision.
 const bool oracleFollowsTheStandard = false;
 
 std::wstring oraclePrint(const wchar_t* format, ...) {
@@ -26,7 +26,7 @@ std::wstring oraclePrint(const wchar_t* format, ...) {
 }
 
 int oracleScan(const std::wstring& input, const wchar_t* format, ...) {
-    // There is no form with an argument list; three pointers are as many as any format here takes.
+    // The C library has no variant with a va_list. Pass the two pointers on.
     std::va_list arguments;
     va_start(arguments, format);
     void* const first = va_arg(arguments, void*);

@@ -1,4 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
+// Tests the layout of text: separators, lines, columns, bools and strings, what is read back, and
+// line numbers.
 #include "tests/streams/support.h"
 
 #include "components/componentManager/text/characterCount.h"
@@ -25,11 +27,11 @@ TEST(TextLayout, ValuesAreSeparatedByBlanksAndNothingFollowsTheLast) {
     EXPECT_EQ(text([](QrStream& s) { s << 1; }), "1");
 }
 
-/// A line of `length` characters, and what follows it.
+/// Returns the last two characters of a line of `length` characters, and what follows.
 std::string afterLineOf(int length) {
     return text([&](QrStream& s) {
                s.formattedWrite(L"%0*d", length - 2, 7);
-               s << false << 8; // The bool keeps the flag clear; the line is now full length.
+               s << false << 8; // No separator follows a bool. The line is now full.
                s << 9;
            })
         .substr(static_cast<std::size_t>(length - 2));
@@ -47,7 +49,7 @@ TEST(TextLayout, TheColumnStartsAgainAfterALineEnd) {
         for (int index = 0; index < 100; ++index)
             s << 1234567;
     });
-    // Nine values and eight blanks make 71 characters.
+    // A line has nine values and eight blanks: 71 characters.
     std::istringstream split(lines);
     std::string line;
     int count = 0;
@@ -64,7 +66,7 @@ TEST(TextLayout, TheBlankCountsAsACharacterOfTheLine) {
         for (int index = 0; index < 37; ++index)
             s << 1;
     });
-    // 36 digits and 35 blanks are 71 characters.
+    // A line has 36 digits and 35 blanks: 71 characters.
     EXPECT_EQ(lines.find('\n'), 71U);
     EXPECT_EQ(lines.size(), 73U);
 }
@@ -117,7 +119,7 @@ TEST(TextLayout, EveryCharacterButZeroReadsAsTrue) {
 }
 
 TEST(TextLayout, ABoolAfterANumberReadsTheBlankBetweenThem) {
-    // Reading never makes a separator due, so the blank is what is read.
+    // Reading a number leaves no separator to skip, so the bool reads the blank.
     Reading<QrTextStream> in("5 0");
     int number = 0;
     bool flag = false;
@@ -243,7 +245,7 @@ TEST(TextLayout, CountedReadsStopAtTheFirstValueThatIsNone) {
 TEST(TextLayout, CountedStringsStopWhereTheLengthIsMissing) {
     Reading<QrTextStream> in("1 a2 x");
     std::wstring strings[3];
-    // The separators are read as characters: " ", then "a" is no length.
+    // The separator is read as a character: the first string is " ". The "a" is not a length.
     EXPECT_EQ(in.stream.read(strings[0], 3), 1);
     EXPECT_EQ(strings[0], L" ");
     EXPECT_EQ(in.rest(), "a2 x");
@@ -305,7 +307,7 @@ void expectUnreadableCharacter() {
         wchar_t character = L'?';
         EXPECT_THROW(in.stream >> character, QrStreamEx::ExReadError);
         EXPECT_EQ(character, L'?');
-        // White space is skipped, what comes after it stays.
+        // White space is skipped. The rest stays unread.
         std::string left(bytes);
         left.erase(0, left.find_first_not_of(" \n\t"));
         EXPECT_EQ(in.rest(), left);
@@ -352,7 +354,7 @@ TEST(TextLayout, FormattedTextMakesNoSeparatorDue) {
               "a1b2 345");
 }
 
-/// An IO that reports any number of characters as written.
+/// An IO that reports a false number of written characters.
 class ClaimingOutput final : public Mz::QrOutBuffer {
   public:
     using Mz::QrOutBuffer::QrOutBuffer;
@@ -365,7 +367,7 @@ class ClaimingOutput final : public Mz::QrOutBuffer {
     int claim = 0;
 };
 
-/// Expects `wanted` after one to six values that each seem to have `claim` characters.
+/// Expects `wanted` after one to six values for each of which the IO reports `claim` characters.
 template <class Work>
 void expectAfterClaiming(int claim, const std::string& wanted, const Work& work) {
     for (int values = 1; values <= 6; ++values) {
@@ -388,7 +390,7 @@ TEST(TextLayout, ALineThatIsLongerThanAnIntCountsIsALongLine) {
     const auto formatted = [](QrStream& s) { s.formattedWrite(L"%s", L"x"); };
     const auto number = [](QrStream& s) { s.formattedWrite(L"%d", 1); };
     const auto flag = [](QrStream& s) { s << true; };
-    // Its length goes out as a number, and seems to be as long.
+    // Its length is written as a number, so the IO reports `claim` for it.
     const auto string = [](QrStream& s) { s << std::wstring(L"x"); };
     for (const int claim : {half, 0x7fffffff}) {
         expectAfterClaiming(claim, "15\n6", formatted);
@@ -396,7 +398,7 @@ TEST(TextLayout, ALineThatIsLongerThanAnIntCountsIsALongLine) {
         expectAfterClaiming(claim, "15\n6", flag);
         expectAfterClaiming(claim, "15\n6", string);
     }
-    // An IO that reports nonsense does no harm.
+    // A negative report has no effect.
     expectAfterClaiming(-half, "15 6", formatted);
 }
 
@@ -421,7 +423,7 @@ TEST(TextLayout, LinesAreCountedFromTheBeginning) {
     ASSERT_EQ(in.stream.read(numbers[0], 1), 1);
     EXPECT_EQ(numbers[0], 4);
     EXPECT_EQ(in.stream.computeLineNb(), 4);
-    // The position is as it was.
+    // The position is unchanged.
     ASSERT_EQ(in.stream.read(numbers[0], 1), 1);
     EXPECT_EQ(numbers[0], 5);
 }

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// A medium that fails at a call of one's choice, for every reader and writer.
+/// A medium that fails from a chosen call on.
 #pragma once
 
 #include <stdexcept>
@@ -9,8 +9,8 @@
 
 namespace Mz::Test {
 
-/// A medium without a buffer, so that each byte or block is a call. The call that is to fail throws
-/// or refuses, and so do all after it.
+/// A medium without a buffer, so that each byte or block is one call. After `callsThatWork` calls,
+/// every call throws or fails.
 class FailingMedium final : public std::streambuf {
   public:
     FailingMedium(std::string input, int callsThatWork, bool throwing)

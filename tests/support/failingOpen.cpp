@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-// Takes the place of the C library's function, as the program's own symbols do.
+// Defines `open` in the program, which takes precedence over that of the C library.
 #include "tests/support/failingOpen.h"
 
 #include <cerrno>

@@ -1,11 +1,11 @@
 // SPDX-License-Identifier: BSL-1.0
-/// A process that can open no further file (POSIX), whatever the reason.
+/// Makes opening a file fail on POSIX systems.
 #pragma once
 
 namespace Mz::Test {
 
-/// While one lives, `open` fails with `error` in the program that this is linked into, and in its
-/// libraries. Limiting the process's descriptors instead would also stop what the sanitizers open.
+/// While it lives, `open` fails with `error` in this program and its libraries. A limit on the
+/// process's descriptors would also affect the files of the sanitizers.
 class FailingOpen {
   public:
     explicit FailingOpen(int error);

@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Keeps the events in one object per process.
 #include "tests/support/journal.h"
 
 #include <string>
@@ -8,7 +9,7 @@ namespace Mz::Test {
 
 namespace {
 
-/// Never destroyed: components may write until the process ends.
+/// Never destroyed: components may add events until the process ends.
 struct Journal {
     std::vector<std::string> events;
     std::string text;

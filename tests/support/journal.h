@@ -1,8 +1,8 @@
 // SPDX-License-Identifier: BSL-1.0
-/// What component libraries made for the tests tell about themselves while they are used.
+/// The events that test components report while they are used.
 ///
-/// A shared library of its own, so that a test and the components that it loads write to the same
-/// journal. It stays mapped when they are not.
+/// It is a shared library, so that a test and the components that it loads use the same journal. It
+/// stays mapped when they are unloaded.
 #pragma once
 
 #include "components/base/export.h"
@@ -19,25 +19,25 @@ class QrComponentManager;
 
 namespace Mz::Test {
 
-/// Adds one event.
+/// Adds an event.
 MZ_TEST_JOURNAL_API void note(const char* event);
 
-/// Has `hook` called after each event with its text; null ends that.
+/// Sets a function that is called with each event, or none if `hook` is null.
 MZ_TEST_JOURNAL_API void setHook(void (*hook)(const char* event));
 
-/// How often that event was noted.
+/// Returns how often that event was reported.
 MZ_TEST_JOURNAL_API int noted(const char* event);
 
-/// All events in their order, each followed by a space. Valid until the next event.
+/// Returns all events in their order, each followed by a space. Valid until the next event.
 MZ_TEST_JOURNAL_API const char* allNotes();
 
 MZ_TEST_JOURNAL_API void forgetNotes();
 
-/// The manager that a component library calls back, if the test wants it to; else null.
+/// The manager that components call back, or null.
 MZ_TEST_JOURNAL_API QrComponentManager* managerUnderTest();
 MZ_TEST_JOURNAL_API void setManagerUnderTest(QrComponentManager* manager);
 
-/// The directory that a component library gives when it calls `initialize`.
+/// The search path that components pass to `initialize`.
 MZ_TEST_JOURNAL_API const wchar_t* searchPathUnderTest();
 MZ_TEST_JOURNAL_API void setSearchPathUnderTest(const wchar_t* path);
 

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Libraries in the format of Windows, made and damaged byte by byte on any system.
+/// Makes and changes Windows libraries byte by byte, on any system.
 #pragma once
 
 #include <cstddef>
@@ -23,10 +23,10 @@ void putAt(std::string& content, std::size_t offset, const T& value) {
     std::memcpy(content.data() + offset, &value, sizeof value);
 }
 
-/// The places of the fields that the tests change.
+/// The offsets of the fields that the tests change.
 namespace PeField {
 
-// In the header, from its signature on.
+// In the headers, from the signature on.
 constexpr std::size_t machine = 4, sectionCount = 6, symbolTable = 12, symbolCount = 16,
                       optionalSize = 20, characteristics = 22;
 // In the optional header.
@@ -34,7 +34,7 @@ constexpr std::size_t magic = 24, sectionAlignment = 24 + 32, imageSize = 24 + 5
                       directoryCount = 24 + 108, exportAddress = 24 + 112, exportSize = 24 + 116,
                       importAddress = 24 + 120, certificateOffset = 24 + 144,
                       certificateSize = 24 + 148;
-// In the entry of a section.
+// In a section's entry.
 constexpr std::size_t memorySize = 8, address = 12, fileSize = 16, offset = 20, flags = 36;
 constexpr std::size_t sectionEntry = 40;
 // In the export directory.
@@ -42,7 +42,7 @@ constexpr std::size_t functionCount = 20, nameCount = 24, functions = 28, names 
 
 } // namespace PeField
 
-/// The headers of a library, from any linker.
+/// Returns the offset of the headers.
 inline std::size_t headerOf(const std::string& content) {
     return getAt<std::uint32_t>(content, 0x3C);
 }
@@ -52,7 +52,7 @@ inline std::size_t sectionsOf(const std::string& content) {
     return header + 24 + getAt<std::uint16_t>(content, header + PeField::optionalSize);
 }
 
-/// The place in the file of what is mapped at `address`; 0 when there is none.
+/// Returns the file offset of `address` in the mapped image, or 0.
 inline std::size_t placeOf(const std::string& content, std::uint32_t address) {
     const std::size_t count =
         getAt<std::uint16_t>(content, headerOf(content) + PeField::sectionCount);
@@ -66,30 +66,30 @@ inline std::size_t placeOf(const std::string& content, std::uint32_t address) {
     return 0;
 }
 
-/// The place in the file of the export directory.
+/// Returns the file offset of the export directory.
 inline std::size_t exportsOf(const std::string& content) {
     return placeOf(content,
                    getAt<std::uint32_t>(content, headerOf(content) + PeField::exportAddress));
 }
 
-/// The content with one field changed.
+/// Returns the content with one field changed.
 template <class T>
 std::string changedAt(std::string content, std::size_t offset, T value) {
     putAt(content, offset, value);
     return content;
 }
 
-/// One name of an export table, and where it leads.
+/// A name of an export table and its address.
 struct PeExport {
     std::string name;
     std::uint32_t address;
 };
 
-/// Where the code and the data of `madeLibrary` are mapped, and its export table.
+/// The addresses of the code, the data and the export table of `madeLibrary`.
 constexpr std::uint32_t peCode = 0x1000, peData = 0x2000, peExports = 0x3000;
 
-/// A library that the system loads: one function that returns 0, a few bytes of data, and the
-/// exports in the given order.
+/// Returns a library that the system can load: a function that returns 0, a few bytes of data, and
+/// the exports in the given order.
 inline std::string madeLibrary(const std::vector<PeExport>& exports) {
     std::string table(40 + exports.size() * 10, '\0');
     const auto count = static_cast<std::uint32_t>(exports.size());

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// A folder of its own for each test.
+/// A temporary folder for a test.
 #pragma once
 
 #include <chrono>
@@ -10,8 +10,8 @@
 
 namespace Mz::Test {
 
-/// A new empty folder, removed with all its content at the end. Its full path is in lower case and
-/// has neither "." nor "..", so that it may be used as a search path on either platform.
+/// A new empty folder, removed with its content by the destructor. Its name is in lower case and
+/// its path has neither "." nor "..", as in a search path.
 class TemporaryDirectory {
   public:
     TemporaryDirectory() {

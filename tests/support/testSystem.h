@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// What the tests need of the operating system: one description, one source for each system.
+/// The functions of the operating system that tests need. Each system has one source.
 #pragma once
 
 #include <cstddef>
@@ -10,58 +10,57 @@
 
 namespace Mz::Test {
 
-/// Whether a library is mapped into this process from this very file.
+/// Returns whether this very file is mapped as a library into this process.
 bool isMapped(const std::filesystem::path& library);
 
-/// Loads a library as a host does that wants it for itself; null when that fails.
+/// Loads a library as a host does for its own use. Returns null on failure.
 void* loadAsHost(const std::filesystem::path& library);
 void unloadAsHost(void* module);
 
-/// The address of a function that the library exports; null when there is none.
+/// Returns the address of an exported function, or null.
 void* functionOf(void* module, const char* name);
 
-/// How much memory of the C library's heap is in use, in bytes. 0 where a sanitizer counts instead.
+/// Returns the used bytes of the C library's heap; 0 with the address sanitizer, which detects
+/// leaks.
 std::size_t allocatedBytes();
 
-/// Ends a copy of this process by `std::exit(0)` and returns its exit code, -1 when the system
-/// ended it. Returns 0 where processes make no copies of themselves.
+/// Forks, ends the child by `std::exit(0)` and returns its exit code, or -1 if the child did not
+/// exit. Returns 0 on systems without fork.
 int exitCodeOfCopy();
 
-/// Makes the system treat the file as hidden, by its name or its attributes, and returns its path.
+/// Makes the file hidden by its name or its attributes. Returns its path.
 std::filesystem::path hide(const std::filesystem::path& file);
 
-/// Whether a process that this one started still runs. Where ended processes wait to be asked for
-/// their status, one that was not asked counts as well.
+/// Returns whether a child process of this process exists. On POSIX systems a zombie counts too.
 bool hasChildProcess();
 
 void setEnvironment(const std::string& name, const std::string& value);
 
-/// `path` as a search path that works on this system: absolute, and in the system's spelling.
+/// Returns `path` as a search path: absolute, and in the system's spelling.
 std::wstring searchPathOf(const std::filesystem::path& path);
 
-/// Reserves so many bytes of addresses without using any memory, writable or not; false when the
-/// system refuses. They stay reserved.
+/// Reserves address space without using memory, writable or not, and keeps it. Returns false on
+/// failure.
 bool reserveAddresses(std::uint64_t size, bool writable);
 
-/// Takes so many bytes of memory that processes could share and writes to them; false when the
-/// system refuses. They stay taken.
+/// Allocates shared memory, writes to it, and keeps it. Returns false on failure.
 bool useSharedMemory(std::uint64_t size);
 
-/// Closes every pipe of this process that a library has no business with.
+/// Closes every pipe of this process except the standard streams.
 void closePipes();
 
 /// Writes to every such pipe.
 void writeToPipes(const std::string& bytes);
 
 struct ProgramResult {
-    bool finished = false; ///< ended by itself, not by the system
+    bool finished = false; ///< the program exited; the system did not end it
     int exitCode = -1;
     std::string output; ///< standard output, lines ending in "\n"
 };
 
-/// Runs a program in `workingDirectory`, the environment being that of this process, and waits.
-/// The shared libraries of the build are found from wherever the program stands.
-/// `firstArgument` is what the program is told to be its own name.
+/// Runs a program in `workingDirectory` with the environment of this process and waits for its end.
+/// The program finds the shared libraries of the build from any folder. `firstArgument` is its
+/// argv[0].
 ProgramResult runProgram(const std::filesystem::path& program, const std::string& firstArgument,
                          const std::vector<std::string>& arguments,
                          const std::filesystem::path& workingDirectory);

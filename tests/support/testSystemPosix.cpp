@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// The functions for POSIX systems.
 #include "tests/support/testSystem.h"
 
 #include <cstdlib>
@@ -12,7 +13,7 @@
 #include <sys/wait.h>
 #include <unistd.h>
 
-/// Of the address sanitizer.
+/// Defined by the address sanitizer; null without it.
 extern "C" __attribute__((weak)) std::size_t __sanitizer_get_current_allocated_bytes();
 
 namespace Mz::Test {
@@ -39,8 +40,8 @@ void* functionOf(void* module, const char* name) {
 }
 
 std::size_t allocatedBytes() {
-    // What the sanitizer keeps grows with each load of a library that has static objects. It looks
-    // for lost memory itself when the process ends.
+    // The sanitizer's own memory grows whenever a library with static objects is loaded. The
+    // sanitizer detects leaks itself at the end of the process.
     if (__sanitizer_get_current_allocated_bytes)
         return 0;
     const struct mallinfo2 heap = ::mallinfo2();
@@ -91,7 +92,7 @@ bool useSharedMemory(std::uint64_t size) {
 
 namespace {
 
-/// Calls `action` with each descriptor of a pipe but the standard ones.
+/// Calls `action` with the descriptor of each pipe except the standard streams.
 template <class Action>
 void forEachPipe(Action action) {
     struct stat status;

@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// The functions for Windows.
 #include "tests/support/testSystem.h"
 
 #include <algorithm>
@@ -25,7 +26,7 @@ std::wstring fullName(const std::filesystem::path& path) {
     return name;
 }
 
-/// The dot says that a name without an extension has none.
+/// Without the final dot, the loader would append ".dll" to a name without an extension.
 std::wstring loaderName(const std::filesystem::path& path) {
     return fullName(path) + (path.has_extension() ? L"" : L".");
 }
@@ -83,7 +84,7 @@ bool hasChildProcess() {
 }
 
 void setEnvironment(const std::string& name, const std::string& value) {
-    // Both the system's and the C runtime's.
+    // Sets the variable for the system and for the C runtime.
     ::_wputenv((widened(name) + L"=" + widened(value)).c_str());
 }
 
@@ -109,7 +110,7 @@ bool useSharedMemory(std::uint64_t size) {
 
 namespace {
 
-/// Calls `action` with each handle of a pipe.
+/// Calls `action` with the handle of each pipe.
 template <class Action>
 void forEachPipe(Action action) {
     for (std::uintptr_t number = 4; number < 0x1000; number += 4) {
@@ -143,7 +144,7 @@ ProgramResult runProgram(const std::filesystem::path& program, const std::string
     std::wstring commandLine = quoted(firstArgument);
     for (const std::string& argument : arguments)
         commandLine += L" " + quoted(argument);
-    // The shared libraries stand beside the running test.
+    // The shared libraries are in the folder of the running test.
     wchar_t own[MAX_PATH];
     ::GetModuleFileNameW(nullptr, own, MAX_PATH);
     ::SetEnvironmentVariableW(L"PATH", std::filesystem::path(own).parent_path().c_str());
@@ -169,7 +170,8 @@ ProgramResult runProgram(const std::filesystem::path& program, const std::string
         ::WaitForSingleObject(process.hProcess, INFINITE);
         DWORD code = 0;
         ::GetExitCodeProcess(process.hProcess, &code);
-        // What the system or the runtime ends a process with lies above what programs return.
+        // Programs return codes below 256. The system uses greater codes; `abort` of the C runtime
+        // uses 3.
         result.finished = code < 256 && code != 3;
         result.exitCode = static_cast<int>(code);
         ::CloseHandle(process.hThread);

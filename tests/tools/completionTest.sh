@@ -1,13 +1,13 @@
 #!/usr/bin/env bash
 # SPDX-License-Identifier: BSL-1.0
-# The completion offers what the program has: every command and every option in its help.
+# Tests that the completion offers every command and every option in the program's help.
 #   completionTest.sh COMPLETION PROGRAM...
 set -euo pipefail
 source "$1"
 shift
 status=0
 
-complete_for() { # complete_for WORDS...: what is offered for the last of them
+complete_for() { # complete_for WORDS...: prints the completions of the last word
     COMP_WORDS=("$@")
     COMP_CWORD=$(($# - 1))
     COMPREPLY=()
@@ -15,7 +15,7 @@ complete_for() { # complete_for WORDS...: what is offered for the last of them
     printf '%s\n' "${COMPREPLY[@]}"
 }
 
-expect() { # expect WORD among the lines of standard input
+expect() { # expect WORD CONTEXT: expects WORD as a line of standard input
     if ! grep -qxF -- "$1"; then
         echo "not offered: $2 $1" >&2
         status=1

@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Tests the console controller: messages, progress on a terminal and in a file, and interrupts.
 #include "components/componentTools/console.h"
 #include "components/base/assertions.h"
 #include "components/componentTools/consoleText.h"
@@ -72,7 +73,7 @@ TEST_F(Console, CutsABarThatWouldNotFitItsLine) {
 
 TEST_F(Console, CountsColumnsAndKeepsToOneLine) {
     ConsoleController controller(stream, true);
-    controller.status(std::wstring(60, L'\u4E2D').c_str()); // Each takes two.
+    controller.status(std::wstring(60, L'\u4E2D').c_str()); // Each takes two columns.
     stream.str("");
     controller.clearLine();
     EXPECT_EQ(stream.str(), "\r" + std::string(78, ' ') + "\r");

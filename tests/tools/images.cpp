@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Writes the headers and tables of minimal ELF and PE libraries field by field.
 #include "tests/tools/images.h"
 
 #include <cstdint>
@@ -9,7 +10,7 @@ namespace Mz::Test {
 
 namespace {
 
-/// Bytes that are put at their places in any order.
+/// Bytes that can be written at any offset.
 class Bytes {
   public:
     explicit Bytes(std::size_t size) : content(size, '\0') {}
@@ -53,20 +54,21 @@ std::string elfLibrary(const ImageTraits& traits) {
     bytes.row<Half>(16, {3, static_cast<Half>(traits.arm ? 183 : 62)});
     bytes.row<Long>(32, {segments, sections});
     bytes.row<Half>(52, {64, 56, 2, 64, 1, 0});
-    // Everything is loaded at its own offset; the second segment is the dynamic section.
+    // The first segment maps the whole file at its own offsets. The second one is the dynamic
+    // section.
     bytes.row<Word>(segments, {1, 5});
     bytes.row<Long>(segments + 8, {0, 0, 0, size, size, 4096});
     bytes.row<Word>(segments + 56, {2, 4});
     bytes.row<Long>(segments + 56 + 8, {dynamic, dynamic, dynamic, 0xA0, 0xA0, 8});
     const std::string text = std::string("\0first.lib\0second.lib\0", 22) + traits.entryPoint;
     bytes.put(strings, text);
-    // Symbol 1 is the entry point: a global function, or object, in section 1.
+    // Symbol 1 is the entry point: a global function or a global object, in section 1.
     bytes.put<Word>(symbols + 24, 22);
     bytes.put<unsigned char>(symbols + 28,
                              static_cast<unsigned char>(traits.function ? 0x12 : 0x11));
     bytes.put<Half>(symbols + 30, 1);
     bytes.put<Long>(symbols + 32, 0x100);
-    // One bucket, which begins with symbol 1, and a filter that lets everything through.
+    // One bucket, which begins with symbol 1, and a filter that passes every name.
     bytes.row<Word>(hash, {1, 1, 1, 0});
     bytes.put<Long>(hash + 16, ~Long{0});
     bytes.row<Word>(hash + 24, {1, gnuHash(traits.entryPoint) | 1});
@@ -96,7 +98,7 @@ std::string peLibrary(const ImageTraits& traits) {
     bytes.put(table + 40, std::string(".data"));
     bytes.row<Word>(table + 48, {0x200, dataAddress, 0x200, data});
     bytes.put<Word>(table + 76, 0xC0000040);
-    // One export: its function, its name and its ordinal.
+    // One export: its address, its name and its ordinal.
     bytes.row<Word>(data, {0, 0, 0, dataAddress + 0x60, 1, 1, 1, dataAddress + 0x28,
                            dataAddress + 0x2C, dataAddress + 0x30});
     bytes.row<Word>(data + 0x28,

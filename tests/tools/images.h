@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// The smallest libraries in either system's format, made byte by byte.
+/// Makes minimal libraries in ELF and PE format.
 #pragma once
 
 #include <string>
@@ -8,12 +8,12 @@ namespace Mz::Test {
 
 struct ImageTraits {
     const char* entryPoint = "QrGetComponentDescription";
-    bool function = true; ///< whether that is code
+    bool function = true; ///< whether the entry point is a function
     bool arm = false;
     bool program = false;
 };
 
-/// Each exports the entry point, and needs "first.lib" and "second.lib".
+/// Each returns a library that exports the entry point and needs "first.lib" and "second.lib".
 std::string elfLibrary(const ImageTraits& traits);
 std::string peLibrary(const ImageTraits& traits);
 

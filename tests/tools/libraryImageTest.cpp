@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Both formats, on every system, whole and damaged.
+/// Tests the readers of both formats on every system, with valid and with damaged files.
 #include "tests/tools/images.h"
 
 #include "components/componentTools/images/libraryImage.h"
@@ -85,7 +85,7 @@ TEST_P(Image, DamagedInAnyWayIsReadInBoundedTime) {
 TEST(ElfImage, WhoseNamesHaveNoEndIsDamaged) {
     const std::string name = "QrGetComponentDescription";
     std::string bytes = elfLibrary({});
-    const std::size_t end = bytes.find(name) + name.size(); // The last in the table of names.
+    const std::size_t end = bytes.find(name) + name.size(); // It is the last name of the table.
     EXPECT_EQ(bytes[end], '\0');
     bytes[end] = 'x';
     const TemporaryDirectory folder;
@@ -127,10 +127,10 @@ TEST(LibrarySymbols, AreThoseThatOthersMustDefine) {
         return;
     }
     EXPECT_TRUE(wanted.contains("mzTestHostNumber"));
-    // Those of the standard library have versions, and this one may be missing.
+    // Symbols of the standard library have versions. The second symbol is weak and may be missing.
     EXPECT_FALSE(wanted.contains("__gxx_personality_v0"));
     EXPECT_FALSE(wanted.contains("__gmon_start__"));
-    // Nor does it want what it defines.
+    // A library does not need what it defines.
     EXPECT_FALSE(wanted.contains(entryPointName));
 
     std::set<std::string> defined{entryPointName, "mzTestHostNumber"};

@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Tests the messages from the probing child process: valid, cut off and damaged.
 #include "components/componentTools/probing/probeAnswer.h"
 
 #include <gtest/gtest.h>

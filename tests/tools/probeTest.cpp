@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// The process in which a library is tried: how it ends, and what is taken for its answer.
+/// Tests the child process that loads a library: its limits, its end, and its answer.
 #include "tests/tools/toolsFixture.h"
 
 #include <new>

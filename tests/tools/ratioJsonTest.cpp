@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// The table of the benchmarks, as other programs read it.
+/// Tests the table of the benchmarks in JSON.
 #include "benchmarks/ratioJson.h"
 
 #include <gtest/gtest.h>

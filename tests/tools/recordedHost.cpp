@@ -1,10 +1,10 @@
 // SPDX-License-Identifier: BSL-1.0
-/// A host that starts with a recorded list, and tells what that cost it.
+/// A host program that starts with a recorded list and reports what it loaded.
 ///
 ///     recordedHost LIST PATH
 ///
-/// Prints how many builders it knows, how many of the candidate files were mapped for that, how
-/// many of the libraries said a word, and then whether each builder makes an object.
+/// Prints the number of builders, the number of candidate files that are mapped, the events of the
+/// libraries ("no word" if there are none), and then how many builders create an object.
 #include "tests/tools/recordedHost.h"
 #include "tests/components/testUids.h"
 #include "tests/support/testSystem.h"

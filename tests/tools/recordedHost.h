@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// What the test host's program has for its components.
+/// The function that the test host's program exports for its components.
 #pragma once
 
 #include "components/base/export.h"

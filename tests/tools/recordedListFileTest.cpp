@@ -1,4 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
+// Tests the tools' reader and writer of recorded lists: golden bytes, damage, and replacing the
+// file.
 #include "components/componentTools/uidText.h"
 #include "tests/tools/toolsFixture.h"
 
@@ -150,7 +152,7 @@ TEST_F(RecordedListFile, StaysBehindItsLinkWithItsPermissions) {
     EXPECT_TRUE(same(readRecordedList(file()).libraries, sample()));
     EXPECT_EQ(fs::status(file()).permissions(), before);
     EXPECT_EQ(fs::is_symlink(fs::symlink_status(link)), !failure);
-    // Nor does anything but a file give way.
+    // Only files are replaced.
     EXPECT_THROW(writeRecordedList(folder.path(), {}), QrStreamEx::ExWriteOpen);
 }
 

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Hosts that ignore the ends of their children, where the system knows such.
+/// Tests hosts that ignore SIGCHLD, on systems that have that signal.
 #include "tests/tools/toolsFixture.h"
 
 #include <csignal>

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// File names that only some systems allow.
+/// Tests file names that only some systems allow.
 #include "tests/tools/toolsFixture.h"
 
 using namespace Mz;

@@ -1,6 +1,7 @@
 #!/usr/bin/env bash
 # SPDX-License-Identifier: BSL-1.0
-# What the program says on standard error, and what it does when its output is lost.
+# Tests what the program writes to standard error, and what it does when its output cannot be
+# written.
 #   streamsTest.sh COMPONENTS PROGRAM...
 set -uo pipefail
 components=$1
@@ -16,7 +17,7 @@ copy() { # copy COMPONENT FOLDER
     cp "$components/$1/$1".* "$2/"
 }
 
-expect() { # expect STATUS PATTERN ARGUMENTS...: what it ends with, and says on standard error
+expect() { # expect STATUS PATTERN ARGUMENTS...: tests its status and its standard error
     local wanted=$1 pattern=$2 said got
     shift 2
     said=$("${program[@]}" "$@" 2>&1 >/dev/null)
@@ -27,7 +28,7 @@ expect() { # expect STATUS PATTERN ARGUMENTS...: what it ends with, and says on 
     fi
 }
 
-lost() { # lost ARGUMENTS...: it says so when its output cannot be written
+lost() { # lost ARGUMENTS...: it reports that its output cannot be written
     local said got
     said=$("${program[@]}" "$@" 2>&1 >/dev/full)
     got=$?
@@ -54,13 +55,13 @@ expect 1 'crashesInEntryPoint.*: it crashes in its entry point' types --path bad
 expect 0 'this is no result' types --path good
 expect 2 'names no folder' types --path ''
 
-# A component that ends the program shows by what it was asked for.
+# If a component ends the program, the message names the call.
 printf E >file.exit
 ended='a component ended the program while "exits"'
 expect 1 "$ended imported file.exit" import --path exits file.exit
 expect 1 "$ended made an object" graph --path exits
 
-# A file that cannot be written is named once.
+# The message names a file that cannot be written only once.
 expect 1 '^error: no/list: Error opening output stream: ' scan --path good --cache no/list
 said=$("${program[@]}" scan --path good --cache no/list 2>&1 >/dev/null)
 [ "$(grep -o 'no/list' <<<"$said" | wc -l)" = 1 ] || { echo "named twice: $said" >&2; status=1; }
@@ -73,7 +74,7 @@ echo 'some text of somebody' >text
 expect 0 'text: this is no recorded list' types --path good --cache text
 [ "$(cat text.rejected)" = 'some text of somebody' ] || { echo "the text is lost" >&2; status=1; }
 
-# Started by a program that does not want to know how its children end.
+# The program was started with SIGCHLD ignored.
 said=$(trap '' CHLD; "${program[@]}" explain --load bad/*)
 grep -q ': crashed' <<<"$said" || { echo "with SIGCHLD ignored: $said" >&2; status=1; }
 exit $status

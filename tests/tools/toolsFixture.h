@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// A folder of component libraries, sound ones and others, for the tools to look at.
+/// Fixture with a folder for component libraries and other files, for the tests of the tools.
 #pragma once
 
 #include "components/componentTools/explain.h"
@@ -39,7 +39,7 @@ inline std::string contentOf(const std::filesystem::path& file) {
     return std::string(std::istreambuf_iterator<char>(stream), {});
 }
 
-/// The file with another processor's number in its header, in the format of either system.
+/// Returns the file with another processor in its header, in either format.
 inline std::string forOtherProcessor(std::string content) {
     if (content.starts_with("\177ELF")) {
         content[18] = static_cast<char>(183);

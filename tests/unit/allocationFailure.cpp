@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Replaces the program's operator new by one that throws once a thread has used up its allocations.
 #include "tests/unit/allocationFailure.h"
 
 #include <cstdlib>

@@ -1,11 +1,11 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Running out of memory on request.
+/// Makes allocations fail on request.
 #pragma once
 
 namespace Mz::Test {
 
-/// While it lives, this thread's allocations fail after the first `allowed` ones. A Windows library
-/// allocates by itself; there it is only the program's own that fail.
+/// While it lives, this thread's allocations fail after the first `allowed` ones. On Windows,
+/// libraries have their own operator new, so only the program's own allocations fail.
 class FailingAllocations {
   public:
     explicit FailingAllocations(int allowed);

@@ -1,4 +1,7 @@
 // SPDX-License-Identifier: BSL-1.0
+// Tests the buffers on a medium that fails or throws. Every operation runs with every exception
+// mask and with the fault beginning at each of the first calls; it must throw the documented
+// exception or none.
 #include "components/componentManager/bufferio.h"
 #include "tests/unit/faultyBuffer.h"
 
@@ -15,7 +18,8 @@ using namespace Mz::Test;
 
 namespace {
 
-/// What an operation does about a broken medium.
+/// When an operation throws because of a broken medium: if the badbit is set (for `BadbitOfReads`
+/// except after a failed put-back), never, or if the position is lost.
 enum class Notices { Badbit, BadbitOfReads, Nothing, LostPosition };
 
 struct Operation {
@@ -66,7 +70,7 @@ const std::vector<Operation>& outputOperations() {
     return operations;
 }
 
-/// Every combination of exception mask, kind of fault and call at which it begins.
+/// A combination of exception mask, kind of fault and the call at which it begins.
 struct Circumstances {
     std::ios::iostate mask;
     Fault fault;
@@ -88,7 +92,7 @@ void underEveryCircumstance(Check&& check) {
     }
 }
 
-/// Runs the operation and demands that exactly the stated exception comes out of it.
+/// Runs the operation and expects exactly the exception that its `notices` states.
 template <class Ex>
 void runUnder(const Circumstances& circumstances, const Operation& operation, QrBufferedIO& io,
               const FaultyBuffer& medium, std::ios& stream) {
@@ -101,12 +105,12 @@ void runUnder(const Circumstances& circumstances, const Operation& operation, Qr
     } catch (const Ex&) {
         raised = true;
     } catch (...) {
-        FAIL() << "something else than the stated exception";
+        FAIL() << "another exception than the expected one";
     }
     switch (operation.notices) {
     case Notices::Badbit: EXPECT_EQ(raised, stream.bad()); break;
     case Notices::BadbitOfReads:
-        // A byte that cannot be put back goes unnoticed until the next read.
+        // A failed put-back is reported only by the next read.
         if (!raised && stream.bad()) {
             EXPECT_THROW(io.read(), Ex);
         } else {
@@ -116,7 +120,7 @@ void runUnder(const Circumstances& circumstances, const Operation& operation, Qr
     case Notices::Nothing: EXPECT_FALSE(raised); break;
     case Notices::LostPosition: EXPECT_EQ(raised, medium.wentWrong() || stream.fail()); break;
     }
-    EXPECT_EQ(stream.exceptions(), circumstances.mask) << "the mask is the caller's";
+    EXPECT_EQ(stream.exceptions(), circumstances.mask) << "the operation must restore the mask";
 }
 
 TEST(FaultyInput, RaisesTheStatedExceptionAndNothingElse) {
@@ -233,7 +237,7 @@ TEST(ThrowingInput, IsAReadErrorAndLeavesTheBadbit) {
 }
 
 TEST(ThrowingInput, WhilePuttingBackIsAReadError) {
-    // Three bytes are fetched up to the NUL, and the fourth call puts it back.
+    // The first three calls read up to the NUL. The fourth call puts it back.
     for (const Fault fault : {Fault::Fails, Fault::Throws}) {
         FaultyBuffer medium(std::string("ab\0c", 4), fault, 4);
         std::istream stream(&medium);

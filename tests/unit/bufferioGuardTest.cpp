@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
-// Standard streams that do more than one operation: they flush themselves or another stream, and
-// throw what a mask demands.
+// Tests the buffers on standard streams that flush themselves or a tied stream, and that throw
+// according to their exception mask.
 #include "components/componentManager/bufferio.h"
 
 #include <gmock/gmock.h>
@@ -24,7 +24,7 @@ enum class Sync { Works, Fails, Throws };
 
 using Calls = std::vector<std::string>;
 
-/// Accepts and gives bytes, and notes each virtual call. Its flush works, fails or throws.
+/// A medium that records each virtual call. Its flush works, fails or throws.
 class NotingBuffer : public std::streambuf {
   public:
     NotingBuffer(Calls& calls, std::string name, Sync flushing, std::string input = {})
@@ -141,7 +141,8 @@ TEST(FlushedOutput, ThatFailsAtALineEndOrSpaceIsNoticedByTheNextWrite) {
     });
 }
 
-/// What the standard library itself does with a stream, as calls of the buffers and flags.
+/// Returns the calls that `work` causes. With `bare` false the stream has unitbuf, a tied stream
+/// and a full exception mask.
 template <class Work>
 Calls callsOf(bool bare, const Work& work) {
     Calls calls;
@@ -225,7 +226,7 @@ TEST(FlushedOutput, IsNotFlushedWhileAnExceptionIsOnItsWay) {
     }
 }
 
-/// A stream whose flush fails in every way that there is, by itself or in what it is tied to.
+/// A tied stream that is tied to a further stream. The flush of both fails or throws.
 struct FailingTied {
     FailingTied(std::ios::iostate mask, Sync flushing, bool unitbuf)
         : medium(calls, "tied ", flushing), lastMedium(calls, "last ", flushing), mask(mask) {
@@ -276,7 +277,7 @@ TEST(TiedOutput, IsWrittenThoughTheOtherStreamFails) {
             EXPECT_NO_THROW(out.writeEol());
             EXPECT_NO_THROW(out.writeSpace());
             EXPECT_EQ(medium.accepted, "x\n ");
-            EXPECT_EQ(out.seek(1, 0), 0) << "its medium is always at 0";
+            EXPECT_EQ(out.seek(1, 0), 0) << "the medium's position is always 0";
             EXPECT_TRUE(stream.good());
             EXPECT_EQ(stream.tie(), &tied.stream);
             tied.expectItsOwnFailure();
@@ -303,7 +304,7 @@ TEST(TiedInput, IsReadThoughTheOtherStreamFails) {
         EXPECT_EQ(in.read(), 'Y');
         EXPECT_EQ(in.read(narrow, 2), 2);
         EXPECT_EQ(narrow[0], 'X');
-        EXPECT_EQ(in.tell(), 0) << "its medium is always at 0";
+        EXPECT_EQ(in.tell(), 0) << "the medium's position is always 0";
         EXPECT_TRUE(stream.good());
         EXPECT_EQ(stream.tie(), &tied.stream);
         tied.expectItsOwnFailure();

@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Tests reading, putting back, skipping and seeking with QrInBuffer in the "C" locale.
 #include "components/componentManager/bufferio.h"
 
 #include <gtest/gtest.h>
@@ -13,13 +14,13 @@ using namespace std::string_literals;
 
 namespace {
 
-/// Input over a text, in the "C" locale.
+/// A QrInBuffer on a text.
 class Input {
   public:
     explicit Input(const std::string& text) : stream(text), io(&stream) {}
     QrBufferedIO* operator->() { return &io; }
 
-    /// What is left to read, byte by byte.
+    /// Reads the rest, byte by byte.
     std::string rest() {
         std::string text;
         for (int byte = io.read(); byte != -1; byte = io.read())
@@ -291,7 +292,7 @@ TEST(Ungetc, PutsBackForTheNextRead) {
 TEST(Ungetc, BeforeTheBeginningIsNoticedByTheWideFormOnly) {
     Input input("abc");
     EXPECT_THROW(input->ungetc(L'x'), QrStreamEx::ExReadError);
-    EXPECT_TRUE(input.stream.bad()) << "the stream's state is left as it is";
+    EXPECT_TRUE(input.stream.bad()) << "the stream keeps its state";
     Input narrow("abc");
     EXPECT_NO_THROW(narrow->ungetc('x'));
     EXPECT_TRUE(narrow.stream.bad());
@@ -378,7 +379,7 @@ TEST(InputSeek, OutOfReachIsAReadErrorAndKeepsTheFailbit) {
     EXPECT_EQ(input->tell(), -1);
     EXPECT_EQ(input->seek(0, 1), -1);
     EXPECT_THROW(input->seek(0, 0), QrStreamEx::ExReadError);
-    EXPECT_EQ(input->read(), -1) << "counts as the end of input, and ends it";
+    EXPECT_EQ(input->read(), -1) << "a failed stream reads as the end of input once";
     EXPECT_EQ(input->read(), 'a');
     EXPECT_THROW(input->seek(-1, 0), QrStreamEx::ExReadError);
 }
@@ -391,7 +392,7 @@ TEST(InputSeek, ToAnotherOriginIsAReadErrorAndTouchesNothing) {
     EXPECT_EQ(input->tell(), 0);
 }
 
-// ---- States in which only the failbit is set ------------------------------------------------
+// ---- Streams whose failbit is set -----------------------------------------------------------
 
 class FailedSeek : public testing::Test {
   protected:
@@ -447,7 +448,7 @@ TEST(ShortBlockThenPutBack, NeverGivesAStaleByte) {
     Input input("abc");
     char block[10];
     EXPECT_EQ(input->read(block, 10), 3);
-    input->ungetc('c'); // Clears the eofbit, and cannot do more.
+    input->ungetc('c'); // Clears the eofbit but not the failbit.
     EXPECT_EQ(input.stream.rdstate(), std::ios::failbit);
     char c = 'x';
     EXPECT_EQ(input->readChar(c), 0);

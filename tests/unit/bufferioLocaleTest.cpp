@@ -1,4 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
+// Tests how the buffers convert characters in multibyte and single-byte locales, and the platform's
+// converter alone.
 #include "components/componentManager/bufferio.h"
 #include "components/platform/characters.h"
 #include "tests/unit/locales.h"
@@ -13,12 +15,12 @@ using namespace Mz::Test;
 
 namespace {
 
-/// Runs `check(locale)` in every multibyte locale there is.
+/// Runs `check` in every multibyte locale of the C runtime. Skips the test if it has none.
 template <class Check>
 void inEveryMultibyteLocale(Check&& check) {
     const std::vector<MultibyteLocale> locales = multibyteLocales();
     if (locales.empty())
-        GTEST_SKIP() << "the C runtime refuses every multibyte locale that is known here";
+        GTEST_SKIP() << "the C runtime has none of the multibyte locales of this test";
     for (const MultibyteLocale& locale : locales) {
         SCOPED_TRACE(std::string(locale.name) + ", character of " +
                      std::to_string(locale.character.size()) + " bytes");
@@ -92,7 +94,7 @@ TEST(MultibyteLocale, PutsBackACharacterThatTheEndCutsOff) {
             wchar_t wide[8] = {};
             EXPECT_EQ(in.readChar(wide, 8, 8), 1);
             EXPECT_EQ(wide[0], L'a');
-            EXPECT_EQ(rest(in), cut) << "in its order";
+            EXPECT_EQ(rest(in), cut) << "all bytes, in their order";
         }
     });
 }
@@ -224,7 +226,7 @@ TEST(MultibyteLocale, IsFollowedFromOneCallToTheNext) {
 TEST(SingleByteLocale, IsLeftToTheCLibrary) {
     const std::vector<SingleByteLocale> locales = singleByteLocales();
     if (locales.empty())
-        GTEST_SKIP() << "the C runtime has no single-byte locale here but C and POSIX";
+        GTEST_SKIP() << "the C runtime has no single-byte locale except C and POSIX";
     for (const SingleByteLocale& locale : locales) {
         const LocaleGuard guard(locale.name);
         std::istringstream stream(std::string{locale.byte});
@@ -239,7 +241,7 @@ TEST(SingleByteLocale, IsLeftToTheCLibrary) {
     }
 }
 
-// ---- The conversion by itself ---------------------------------------------------------------
+// ---- The converter alone --------------------------------------------------------------------
 
 TEST(CharacterConverter, IsPlainInTheCLocale) {
     const platform::CharacterConverter converter;

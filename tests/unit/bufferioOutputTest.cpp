@@ -1,4 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
+// Tests writing and seeking with QrOutBuffer in the "C" locale, media without positions, and
+// streams whose badbit is set.
 #include "components/componentManager/bufferio.h"
 
 #include <gtest/gtest.h>
@@ -94,7 +96,7 @@ TEST(WriteWide, OfALargerCodeIsAWriteErrorInTheCLocale) {
         const wchar_t text[] = {L'a', L'b', static_cast<wchar_t>(code), L'c'};
         EXPECT_THROW(output->writeChar(text, 4), QrStreamEx::ExWriteError);
     }
-    EXPECT_EQ(output.text(), "abababab") << "what stands before it is written";
+    EXPECT_EQ(output.text(), "abababab") << "the characters before it are written";
 }
 
 TEST(OutputPosition, IsToldAndSought) {
@@ -129,7 +131,7 @@ TEST(OutputSeek, ToAnotherOriginIsAWriteErrorAndTouchesNothing) {
     EXPECT_TRUE(output.stream.good());
 }
 
-/// A medium without positions.
+/// A medium that cannot seek.
 class Pipe : public std::streambuf {
   public:
     explicit Pipe(std::string text) : text(std::move(text)) {
@@ -193,7 +195,7 @@ TEST(BadInput, IsAReadErrorForAllButTheNarrowPutBack) {
     EXPECT_THROW(in.skipWhiteSpace(1), QrStreamEx::ExReadError);
     EXPECT_THROW(in.ungetc(L'x'), QrStreamEx::ExReadError);
     EXPECT_NO_THROW(in.ungetc('x'));
-    EXPECT_EQ(in.readChar(narrow, 2, 0), 0) << "a count of zero returns at once";
+    EXPECT_EQ(in.readChar(narrow, 2, 0), 0) << "a count of 0 is a no-op";
     EXPECT_EQ(in.readChar(wide, 0, 2), 0);
     EXPECT_NO_THROW(in.skipWhiteSpace(0));
     EXPECT_EQ(in.tell(), -1);

@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Compares the buffers with a simple model in long random sequences of operations.
 #include "components/componentManager/bufferio.h"
 
 #include <gtest/gtest.h>
@@ -12,7 +13,7 @@ using namespace Mz;
 
 namespace {
 
-/// Input in the "C" locale, told again from its description, one byte at a time.
+/// A model of QrInBuffer in the "C" locale. It follows the documentation, one byte at a time.
 class Model {
   public:
     explicit Model(std::string text) : text(std::move(text)) {}
@@ -94,7 +95,7 @@ class Model {
 
     int64 tell() const { return failed ? -1 : static_cast<int64>(position); }
 
-    /// False when it raises.
+    /// Returns false where QrInBuffer throws.
     bool seek(int64 offset, int origin) {
         if (offset == 0 && origin == 1)
             return true;

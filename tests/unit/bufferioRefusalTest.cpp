@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Tests the operations that a buffer rejects: writing to input, reading from output, and objects.
 #include "components/componentManager/bufferio.h"
 
 #include <gtest/gtest.h>
@@ -9,7 +10,7 @@
 
 namespace Mz {
 
-/// The buffers hand a stream on without looking at it.
+/// The buffers pass a stream on without using it, so the tests need only a name.
 class QrStream {};
 
 } // namespace Mz
@@ -22,7 +23,7 @@ template <class Ex>
 void expectRefusal(const char* reason, const std::function<void()>& call) {
     try {
         call();
-        ADD_FAILURE() << "not refused";
+        ADD_FAILURE() << "nothing was thrown";
     } catch (const Ex& refusal) {
         EXPECT_STREQ(refusal.getReason(), reason);
         const std::string_view detail(refusal.getDetailedReason());

@@ -1,4 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
+// Tests the implementation templates: answers to casts, reference counts, destruction, companions,
+// chains, and objects with several interfaces.
 #include "tests/unit/testObjects.h"
 
 #include <gtest/gtest.h>
@@ -91,7 +93,8 @@ TEST(QrCastImpl, TakesExactlyOneReferenceForAnAnswerAndNoneOtherwise) {
     EXPECT_EQ(probe.references, 1);
 }
 
-/// Nobody can count what a final class does not count, and a final class that counts is asked to.
+/// A final class that does not count. The template can omit the call that takes a reference; the
+/// final classes below count, so there it must not.
 class FinalGauge final : public QrCastImpl<FinalGauge, Gauge> {
   public:
     int value() const override { return 1; }
@@ -134,8 +137,8 @@ TEST(FinalClass, TakesTheReferenceOfAnAnswerLikeAnyOther) {
     EXPECT_EQ(dial->release(), -1);
 }
 
-/// A class behind the one that the template was told of may count where that one does not.
-/// Counts, and lets nobody do so but through an interface.
+/// Counts, but only callers that know it by an interface can do so. The template cannot see this
+/// override and must call it virtually.
 class PrivateGauge : public QrCastImpl<PrivateGauge, Gauge> {
   public:
     int value() const override { return taken; }
@@ -157,7 +160,7 @@ class PrivateMulti final : public QrCastMulti<PrivateMulti, Gauge, Dial> {
     int taken = 0;
 };
 
-/// Has another operation of the name, which hides the one that counts.
+/// Has an overload of `newReference` that makes a direct call ambiguous.
 class AmbiguousGauge final : public QrCastImpl<AmbiguousGauge, Gauge> {
   public:
     int value() const override { return taken; }
@@ -264,7 +267,7 @@ TEST(QrCastRef, CountsExactlyUnderManyThreads) {
     std::atomic<bool> go = false;
     std::vector<std::thread> threads;
     for (long index = 0; index < threadCount; ++index) {
-        object->newReference(); // The one that the thread gives back last.
+        object->newReference(); // The thread releases it last.
         threads.emplace_back([&] {
             while (!go)
                 std::this_thread::yield();
@@ -325,7 +328,7 @@ TEST(LkCounter, IsThirtyTwoBitsWideAndReturnsTheNewValue) {
 
 class Owner;
 
-/// What `Owner` shows as its `Dial`.
+/// The companion of `Owner`: supplies its `Dial`.
 class Companion : public QrTempObject<Owner, QrCastRef<QrCastHeap<QrCastImpl<Companion, Dial>>>> {
   public:
     explicit Companion(Owner* owner);
@@ -336,7 +339,7 @@ class Companion : public QrTempObject<Owner, QrCastRef<QrCastHeap<QrCastImpl<Com
     Log& log;
 };
 
-/// Counts its references without being deleted by them, so that the tests see every step.
+/// Counts references but is not deleted by `release`, so that the tests can log every step.
 class Owner : public QrCastImpl2<Owner, Gauge, QrTempIface<Owner, Companion>> {
   public:
     int value() const override { return 6; }
@@ -370,7 +373,7 @@ TEST(QrCastImpl2, AnswersItsInterfaceItselfAndLeavesOthersToTheNextLink) {
     EXPECT_FALSE(owner.hasInterface(unknownUid));
     EXPECT_EQ(owner.getInterface(unknownUid), nullptr);
     EXPECT_EQ(owner.getCastable(), &owner);
-    EXPECT_EQ(owner.log, Log{"take"}) << "hasInterface takes and makes nothing";
+    EXPECT_EQ(owner.log, Log{"take"}) << "hasInterface takes no reference and makes no companion";
 }
 
 TEST(QrTempIface, MakesACompanionWithOneReferenceThatHoldsTheOwner) {
@@ -379,7 +382,7 @@ TEST(QrTempIface, MakesACompanionWithOneReferenceThatHoldsTheOwner) {
     ASSERT_NE(companion, nullptr);
     EXPECT_EQ(owner.log, (Log{"take", "new companion"}));
     EXPECT_EQ(static_cast<Dial*>(companion)->mark(), 11);
-    EXPECT_EQ(companion->newReference(), 1) << "the handed out reference was the first";
+    EXPECT_EQ(companion->newReference(), 1) << "the returned reference is the first";
     EXPECT_EQ(companion->release(), 0);
     EXPECT_EQ(owner.references, 1);
     EXPECT_EQ(companion->release(), -1);
@@ -407,7 +410,7 @@ TEST(QrTempObject, AnswersForItselfAndPassesEverythingElseToTheOwner) {
     const auto companion = QrPtr<Dial>::adopt(safeCast<Dial>(&owner));
     owner.log.clear();
     const auto itself = QrPtr<QrCastable>::adopt(companion->getInterface(Dial::uid));
-    EXPECT_EQ(itself.get(), companion.get()) << "no second companion";
+    EXPECT_EQ(itself.get(), companion.get()) << "returns itself, not another companion";
     EXPECT_EQ(owner.log, Log{});
     const auto gauge = QrPtr<QrCastable>::adopt(companion->getInterface(Gauge::uid));
     EXPECT_EQ(gauge.get(), &owner);
@@ -468,7 +471,7 @@ TEST(QrTempObject, DestroyLetsACountedOwnerGoWithItsLastReference) {
     EXPECT_EQ(alive, 0);
 }
 
-// ---- The chain's link by itself -------------------------------------------------------------
+// ---- A link of the chain alone --------------------------------------------------------------
 
 struct NextLink {
     static QrCastable* getInterface(Gauge* object, const QrUid& uid) {
@@ -500,7 +503,7 @@ TEST(QrCastHierarchy, AnswersItsInterfaceAndPassesTheOthersOn) {
     EXPECT_FALSE(link.hasInterface(Dial::uid));
 }
 
-// ---- Several interfaces at once -------------------------------------------------------------
+// ---- Several interfaces ---------------------------------------------------------------------
 
 class GaugeAndDial : public QrCastRef<QrCastHeap<QrCastMulti<GaugeAndDial, Gauge, Dial>>> {
   public:

@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Tests the registry of process controllers: the system's, each thread's, and many threads at once.
 #include "components/componentManager/processControl.h"
 #include "components/platform/platform.h"
 
@@ -13,7 +14,7 @@ using namespace Mz;
 
 namespace {
 
-/// Writes down whether anybody counts or disposes of it.
+/// Counts the calls that take, release or destroy it.
 class Controller : public QrCastImpl<Controller, QrProcessControl> {
   public:
     void* getContext() override { return nullptr; }
@@ -43,7 +44,7 @@ class ControllerRegistry : public testing::Test {
         QrSetThreadProcessController(nullptr);
         QrSetSystemProcessController(standard);
         for (const Controller* controller : {&a, &b})
-            EXPECT_EQ(controller->touched, 0) << "the registry only keeps pointers";
+            EXPECT_EQ(controller->touched, 0) << "the registry must not call its controllers";
     }
     QrProcessControl* const standard = QrGetSystemProcessController();
     Controller a;
@@ -92,7 +93,7 @@ TEST_F(ControllerRegistry, ReplacesAThreadsController) {
     QrSetThreadProcessController(&b);
     EXPECT_EQ(QrGetThreadProcessController(), &b);
     QrSetThreadProcessController(nullptr);
-    EXPECT_EQ(QrGetThreadProcessController(), nullptr) << "the first one does not come back";
+    EXPECT_EQ(QrGetThreadProcessController(), nullptr) << "an earlier controller is not restored";
 }
 
 TEST_F(ControllerRegistry, RemovalWithoutAnEntryChangesNothing) {
@@ -131,7 +132,8 @@ TEST_F(ControllerRegistry, NeverLooksAtWhatItIsGiven) {
     EXPECT_EQ(QrGetSystemProcessController(), dangling);
 }
 
-/// The system gives identifiers out again, and what a thread left behind goes with its identifier.
+/// The system reuses the identifiers of ended threads. A thread finds the entry that an ended
+/// thread with its identifier left.
 TEST_F(ControllerRegistry, LeavesTheEntryOfAnEndedThreadToTheNextWithItsIdentifier) {
     std::uint32_t first = 0;
     onAnotherThread([&] {
@@ -139,7 +141,7 @@ TEST_F(ControllerRegistry, LeavesTheEntryOfAnEndedThreadToTheNextWithItsIdentifi
         QrSetThreadProcessController(&a);
     });
     bool seenAgain = false;
-    // One whole round of the identifiers that the system has to give.
+    // Enough threads for the system to reuse every identifier.
     constexpr int largestRound = 70000;
     for (int attempt = 0; attempt < largestRound && !seenAgain; ++attempt)
         onAnotherThread([&] {
@@ -152,7 +154,7 @@ TEST_F(ControllerRegistry, LeavesTheEntryOfAnEndedThreadToTheNextWithItsIdentifi
             }
         });
     if (!seenAgain)
-        GTEST_SKIP() << "the system gave no identifier out twice";
+        GTEST_SKIP() << "the system did not reuse the identifier";
 }
 
 TEST_F(ControllerRegistry, ServesManyThreadsAtOnce) {

@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Tests the enumerator interface, and the protocol in which the manager calls it.
 #include "components/componentManager/enumerator.h"
 #include "components/componentManager/manager/componentImpPrivate.h"
 
@@ -57,7 +58,7 @@ TEST(Enumerator, MayServeTwoSequencesWithOneSetOfVerdicts) {
     static_assert(std::is_convertible_v<Both*, QrEnum*>, "one QrEnum, not two");
 }
 
-// ---- The protocol, driven by the library's own enumeration ----------------------------------
+// ---- The protocol, tested with the manager's enumeration ------------------------------------
 
 class Descriptions : public QrEnumerator<QrCPtr<QrBuilderDescription>> {
   public:

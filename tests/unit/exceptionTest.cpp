@@ -1,4 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
+// Tests every exception class: texts, positions, bases, clones, copies, and throwing across
+// libraries.
 #include "components/base/assertions.h"
 #include "components/componentManager/cast.h"
 #include "components/platform/platform.h"
@@ -22,7 +24,7 @@ constexpr const char* file = "components/test/file";
 constexpr int line = 321;
 const std::string position = "components/test/file(321): ";
 
-/// One way to make one exception, and what it must say.
+/// One exception class and constructor, with the expected reason.
 struct Case {
     std::string title;
     std::string reason;
@@ -148,7 +150,7 @@ TEST_P(Exception, ClonesItsDynamicTypeAndReasonDeeply) {
 INSTANTIATE_TEST_SUITE_P(All, Exception, testing::ValuesIn(cases()),
                          [](const auto& instance) { return instance.param.title; });
 
-// ---- Which constructors and bases there are -------------------------------------------------
+// ---- Constructors and bases -----------------------------------------------------------------
 
 template <class Ex, bool named, bool twice>
 constexpr bool hasConstructors =
@@ -186,7 +188,7 @@ TEST(ExceptionLayout, StartsWithTheRuntimeError) {
               static_cast<const void*>(&exception));
 }
 
-// ---- The base by itself ---------------------------------------------------------------------
+// ---- ExBase alone ---------------------------------------------------------------------------
 
 class Bare : public ExBase {
   public:
@@ -253,7 +255,8 @@ TEST(Assertions, ThrowProgramAbortedWithThePosition) {
 
 // ---- Without memory -------------------------------------------------------------------------
 
-/// Calls the template's own body, which is compiled into this program and so allocates here.
+/// Calls the template's `clone` directly: its body is compiled into this program, so that its
+/// allocations can fail.
 TEST(ExceptionClone, IsNullWithoutMemory) {
     const QrStreamEx::ExWriteOpen exception(file, line, "name", "second");
     using Clonable = QrConcreteException<QrStreamEx::ExWriteOpen, QrStreamEx>;

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// A medium that fails, or throws, at a call of one's choice.
+/// A medium that fails or throws from a chosen call on.
 #pragma once
 
 #include <ios>
@@ -10,11 +10,11 @@ namespace Mz::Test {
 
 enum class Fault { None, Fails, Throws };
 
-/// What a broken medium throws; nothing that the standard library knows.
+/// What a broken medium throws: a type that the standard library does not know.
 struct MediumFailure {};
 
-/// Reads from and appends to a text. Every virtual call is counted, and the `at`-th (from 1) and
-/// all after it go wrong.
+/// Reads from and appends to a text. Counts the virtual calls; the `at`-th (from 1) and all later
+/// ones fail or throw.
 class FaultyBuffer : public std::streambuf {
   public:
     FaultyBuffer(std::string text, Fault fault, int at)

@@ -1,4 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
+// Tests the hash map by its documented behaviour and against std::unordered_map, and the hash of
+// thread identifiers.
 #include "components/componentManager/support/hashMap.h"
 #include "components/componentManager/control/threadHash.h"
 

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-// Names of files on their way from a host to the library.
+// Tests how the host kit converts file names for the library.
 #include "components/componentKit/hostKit.h"
 #include "tests/unit/locales.h"
 

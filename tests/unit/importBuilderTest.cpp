@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Tests the file functions of QrImportBuilder: opening, closing and exceptions.
 #include "tests/support/temporaryDirectory.h"
 #include "tests/unit/importTestObjects.h"
 #include "tests/unit/openFiles.h"
@@ -123,7 +124,7 @@ TEST_F(ImportBuilder, StandsForItself) {
     EXPECT_EQ(component->QrComponentBuilder::getBuilder(), component);
     EXPECT_TRUE(queryCast<QrImportBuilder>(component.get()));
     EXPECT_TRUE(queryCast<QrBuilderDescription>(component.get()));
-    EXPECT_EQ(component->newReference(), 2) << "the two above and this one, less one";
+    EXPECT_EQ(component->newReference(), 2) << "three references; the count of the first is 0";
     EXPECT_EQ(component->release(), 1);
 }
 

@@ -1,11 +1,13 @@
 // SPDX-License-Identifier: BSL-1.0
+// Adds a library record without a file to the process-wide manager. Its entry point returns a
+// description that returns the tests' builders.
 #include "tests/unit/importTestObjects.h"
 
 namespace Mz::Test {
 
 namespace {
 
-/// Hands out the builders that the tests made.
+/// A description that returns the tests' builders.
 class TestDescription final : public QrCastImpl<TestDescription, QrComponentDescription> {
   public:
     QrRef<QrCastable> createBuilder(const QrUid& uid) override {
@@ -42,7 +44,7 @@ ComponentManager& TestLibrary::manager() {
 
 TestLibrary::TestLibrary() {
     library = manager().libraries.emplace(manager().libraries.end(), manager());
-    // Anything but null: a library that the manager found loaded and so leaves alone.
+    // A non-null module marks the library as loaded by the host: the manager does not unload it.
     library->module = this;
     library->entryPoint = describe;
     manager().initialised = true;

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Import builders that do what a test tells them, in the process's component manager.
+/// Import builders that a test controls, registered in the process-wide manager.
 #pragma once
 
 #include "components/componentKit/componentKit.h"
@@ -13,7 +13,7 @@
 
 namespace Mz::Test {
 
-/// What a test importer makes.
+/// The interface of the objects that a test import builder creates.
 class Imported : public QrCastable {
   public:
     using Self = Imported;
@@ -33,7 +33,7 @@ class ImportedObject final : public QrCastRef<QrCastHeap<QrCastImpl<ImportedObje
     std::wstring maker;
 };
 
-/// Who made `object`, or an empty text for null.
+/// Returns the label of the builder that made `object`, or "" for null.
 inline std::wstring makerOf(const QrRef<QrCastable>& object) {
     const QrPtr<Imported> imported = queryCast<Imported>(object.get());
     return imported ? imported->madeBy() : L"";
@@ -41,7 +41,7 @@ inline std::wstring makerOf(const QrRef<QrCastable>& object) {
 
 using Calls = std::vector<std::wstring>;
 
-/// Writes every question down and answers it as it was told.
+/// Records every call and answers with the test's callbacks.
 class TestImportBuilder final : public Kit::Builder<TestImportBuilder, QrImportBuilder> {
   public:
     TestImportBuilder(const Kit::BuilderInfo& info, std::vector<const wchar_t*> extensions,
@@ -91,14 +91,14 @@ class TestImportBuilder final : public Kit::Builder<TestImportBuilder, QrImportB
     Calls& calls;
 };
 
-/// A builder under an importer's name that imports nothing.
+/// A registered builder that is not an import builder.
 class PlainBuilder final : public Kit::Builder<PlainBuilder> {
   public:
     using Builder::Builder;
     QrRef<QrCastable> createObject() override { return nullptr; }
 };
 
-/// The builders of one library that was never a file, made known to the process's manager.
+/// A library record without a file in the process-wide manager, for the builders of a test.
 class TestLibrary {
   public:
     TestLibrary();
@@ -106,17 +106,17 @@ class TestLibrary {
     TestLibrary(const TestLibrary&) = delete;
     TestLibrary& operator=(const TestLibrary&) = delete;
 
-    /// The record of a builder whose object is `builder`, which may be null.
+    /// Adds a builder record for `builder`, which may be null.
     void add(const QrUid& uid, const wchar_t* name, const QrRef<QrCastable>& builder);
 
-    /// The manager of the process.
+    /// Returns the process-wide manager.
     static ComponentManager& manager();
 
   private:
     ComponentManager::LibraryList::iterator library;
 };
 
-/// An importer for the builders named "test".
+/// An importer for the builders named "test", unless the test changes `name`.
 class TestImporter : public QrCastImpl<TestImporter, QrBaseImporter> {
   public:
     const wchar_t* getBuilderName() const override { return name.c_str(); }

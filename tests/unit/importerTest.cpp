@@ -1,4 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
+// Tests the importer: file types, the enumeration of import builders, the choice of a builder for
+// data and for files, and importers that override parts of it.
 #include "components/componentManager/processControl.h"
 #include "tests/support/temporaryDirectory.h"
 #include "tests/unit/importTestObjects.h"
@@ -25,7 +27,7 @@ class Importer : public testing::Test {
         EXPECT_EQ(ImportedObject::alive, 0);
     }
 
-    /// A new import builder of the importer, the last in the manager's order.
+    /// Adds an import builder as the last one in the manager's order.
     TestImportBuilder& add(const wchar_t* label, std::vector<const wchar_t*> extensions,
                            const wchar_t* name = L"test") {
         const QrUid uid = uidOf(number++);
@@ -36,7 +38,7 @@ class Importer : public testing::Test {
         return *builder;
     }
 
-    /// The same, willing to import anything.
+    /// Adds an import builder that can import everything.
     TestImportBuilder& addWilling(const wchar_t* label, std::vector<const wchar_t*> extensions) {
         TestImportBuilder& builder = add(label, std::move(extensions));
         builder.onCanImport = [](QrBufferedIO&) { return true; };
@@ -66,7 +68,7 @@ class Importer : public testing::Test {
 
 std::wstring upToSecondNul(const wchar_t* text) {
     const std::wstring first(text);
-    EXPECT_EQ(text[first.size() + 1], L'\0') << "a NUL of the text's own, then its terminator";
+    EXPECT_EQ(text[first.size() + 1], L'\0') << "the list ends with two NULs";
     return first;
 }
 
@@ -93,7 +95,7 @@ TEST_F(Importer, ListsNothingButANulWithoutBuildersAndKeepsThat) {
     const wchar_t* const types = importer.getFileTypes();
     EXPECT_EQ(upToSecondNul(types), L"");
     add(L"A", {L"a"});
-    EXPECT_EQ(importer.getFileTypes(), types) << "not built again";
+    EXPECT_EQ(importer.getFileTypes(), types) << "the list is built once";
     EXPECT_EQ(upToSecondNul(importer.getFileTypes()), L"");
     EXPECT_EQ(calls, Calls{});
 }
@@ -143,7 +145,7 @@ TEST_F(Importer, ListsItsOwnImportBuildersOnly) {
     EXPECT_EQ(upToSecondNul(importer.getFileTypes()), L"A|*.a|B|*.b|");
 }
 
-/// An import builder that does not describe itself.
+/// An import builder without a builder description.
 class Undescribed final
     : public QrCastRef<QrCastHeap<QrCastMulti<Undescribed, QrComponentBuilder, QrImportBuilder>>> {
   public:
@@ -215,7 +217,7 @@ TEST_F(Importer, EnumeratesNothingOfAManagerThatIsNotInitialised) {
     EXPECT_FALSE(importText(L"x.a"));
 }
 
-// ---- Import from a buffer -------------------------------------------------------------------
+// ---- Imports from a buffer ------------------------------------------------------------------
 
 TEST_F(Importer, AsksByExtensionFirst) {
     addWilling(L"A", {L"a"});
@@ -253,10 +255,10 @@ TEST_F(Importer, ComparesExtensionsWithTheirCase) {
     addWilling(L"A", {L"obj"});
     EXPECT_EQ(makerOf(importText(L"model.OBJ")), L"A");
     EXPECT_EQ(calls, (Calls{L"A extensions", L"A can [model.OBJ] []", L"A import [model.OBJ] []"}))
-        << "by content";
+        << "chosen by the content";
     calls.clear();
     addWilling(L"B", {L"OBJ"});
-    EXPECT_EQ(makerOf(importText(L"model.OBJ")), L"B") << "by extension";
+    EXPECT_EQ(makerOf(importText(L"model.OBJ")), L"B") << "chosen by the extension";
 }
 
 struct ExtensionCase {
@@ -339,7 +341,7 @@ TEST_F(Importer, GoesOnToTheSecondRoundAfterAnyOtherResultOfAnExtensionWalk) {
     EXPECT_EQ(makerOf(importText(L"file.b")), L"B");
     EXPECT_EQ(calls, (Calls{L"A extensions", L"A can [file.b] []", L"B can [file.b] []",
                             L"B import [file.b] []"}))
-        << "the first round ended with A";
+        << "an unknown result ends the first round";
 }
 
 TEST_F(Importer, TakesStopFromAnExtensionWalkForAMatch) {
@@ -388,10 +390,10 @@ TEST_F(Importer, RestoresThePositionBetweenBuilders) {
     io.seek(2, 0);
     EXPECT_EQ(makerOf(importer.import(QrPtr<QrBufferedIO>(&io), nullptr, nullptr)), L"G");
     EXPECT_EQ(positions, (std::vector<int64>(7, 2)));
-    EXPECT_EQ(io.tell(), 3) << "not restored after the import";
+    EXPECT_EQ(io.tell(), 3) << "the import leaves the position";
 }
 
-/// Tells of what moves it, and refuses the first seeks to a position.
+/// Logs the calls that use its position, and throws in the first seeks to a position.
 class Positioned final : public QrInBuffer {
   public:
     Positioned(std::istream* stream, Calls& log, int refusals)
@@ -491,7 +493,7 @@ TEST_F(Importer, GivesTheObjectWithOneReference) {
     EXPECT_EQ(object->release(), 0);
 }
 
-// ---- Import of a named file -----------------------------------------------------------------
+// ---- Imports of a named file ----------------------------------------------------------------
 
 class FileImporter : public Importer {
   protected:
@@ -551,7 +553,8 @@ TEST_F(FileImporter, SearchesItsDefaultAfterTheCallersPath) {
     EXPECT_TRUE(importer.import(L"extra.a", nullptr, found));
     directory.write("more/data.a", "second");
     builder.onImport = [](QrBufferedIO& io) { return io.read() == 'f'; };
-    EXPECT_TRUE(importer.import(L"data.a", folder.c_str(), found)) << "the caller's comes first";
+    EXPECT_TRUE(importer.import(L"data.a", folder.c_str(), found))
+        << "the caller's search path comes first";
     EXPECT_FALSE(importer.import(L"missing.a", folder.c_str(), found));
     EXPECT_FALSE(found);
 }
@@ -598,7 +601,7 @@ TEST_F(FileImporter, DemandsAController) {
     EXPECT_EQ(calls, Calls{});
 }
 
-/// Finds what a test tells it, and may deny that it is a controller.
+/// A controller that finds what a test sets. With `isController` false its cast fails.
 class Finder : public QrCastImpl<Finder, QrProcessControl> {
   public:
     QrCastable* getInterface(const QrUid& uid) override {
@@ -640,7 +643,8 @@ TEST_F(FileImporter, AsksTheControllerOfItsThreadWithBothSearchPaths) {
     bool found = false;
     EXPECT_TRUE(importer.import(L"x.a", L"search", found));
     EXPECT_EQ(finder.asked, (Calls{L"x.a", L"search", L"default"}));
-    EXPECT_EQ(calls[1], L"A can [x.a] [x.a]") << "not the name under which it was found";
+    EXPECT_EQ(calls[1], L"A can [x.a] [x.a]")
+        << "the builder gets the caller's name, not the found path";
     importer.defaultSearch.clear();
     EXPECT_TRUE(importer.import(L"x.a", nullptr, found));
     EXPECT_EQ(finder.asked[4], L"(null)");
@@ -676,7 +680,7 @@ TEST_F(FileImporter, GivesTheControllerBackWhenABuilderThrows) {
     EXPECT_FALSE(isOpen(file));
 }
 
-// ---- Importers that build on the interfaces --------------------------------------------------
+// ---- Classes that derive from the importer's interfaces --------------------------------------
 
 class Overriding : public TestImporter {
   public:

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// The locales in which multibyte text is tested; each platform has its own.
+/// The locales for the tests of multibyte text. Each platform has its own list.
 #pragma once
 
 #include <clocale>
@@ -8,29 +8,29 @@
 
 namespace Mz::Test {
 
-/// One encoding, and texts in it.
+/// A multibyte encoding and test data for it.
 struct MultibyteLocale {
     const char* name;      ///< for `setlocale`
-    std::string character; ///< one character of two bytes or more, the first of which says so
-    wchar_t code;          ///< the same, wide
-    std::string noText;    ///< four bytes that form no character, however many of them are taken
+    std::string character; ///< one character of at least two bytes; the first is a lead byte
+    wchar_t code;          ///< the same character, wide
+    std::string noText;    ///< four bytes of which no prefix is a character
     wchar_t codeWithoutForm;
 };
 
-/// All of this platform's that the C runtime knows here; never empty where tests can run.
+/// Returns this platform's multibyte locales that the C runtime has; may be empty.
 std::vector<MultibyteLocale> multibyteLocales();
 
-/// A locale of single bytes that are not their own codes.
+/// A single-byte locale, and one byte with its character.
 struct SingleByteLocale {
     const char* name;
     char byte;
     wchar_t code;
 };
 
-/// Empty where the C runtime has none.
+/// Returns this platform's single-byte locales that the C runtime has; may be empty.
 std::vector<SingleByteLocale> singleByteLocales();
 
-/// While it lives, the process has another locale for characters.
+/// Sets the process's locale for characters while it lives.
 class LocaleGuard {
   public:
     explicit LocaleGuard(const char* name)

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-// Names and text between the system and the library.
+// Tests the conversion of names and text between the system and the library.
 #include "components/componentManager/nativeText.h"
 #include "components/componentManager/utf8.h"
 #include "tests/unit/locales.h"
@@ -44,7 +44,7 @@ TEST(NativeText, EscapesBytesThatAreNoUtf8) {
     EXPECT_EQ(escapeInvalidUtf8("a\xC3\xA9z"), "a\xC3\xA9z");
     EXPECT_EQ(escapeInvalidUtf8("caf\xE9.obj"), "caf\\xE9.obj");
     EXPECT_EQ(escapeInvalidUtf8("\xE6\x97"), "\\xE6\\x97");
-    // Longer than needed, a surrogate, beyond the last character; the last one that there is.
+    // Invalid: an overlong form, a surrogate, a code above the last one. Valid: the last code.
     EXPECT_EQ(escapeInvalidUtf8("\xC0\xAF"), "\\xC0\\xAF");
     EXPECT_EQ(escapeInvalidUtf8("\xED\xA0\x80"), "\\xED\\xA0\\x80");
     EXPECT_EQ(escapeInvalidUtf8("\xF4\x90\x80\x80"), "\\xF4\\x90\\x80\\x80");

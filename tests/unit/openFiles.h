@@ -1,12 +1,12 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Whether files are open.
+/// Queries which files are open.
 #pragma once
 
 #include <filesystem>
 
 namespace Mz::Test {
 
-/// Whether this process holds the file open.
+/// Returns whether this process has the file open.
 bool isOpen(const std::filesystem::path& file);
 
 } // namespace Mz::Test

@@ -1,4 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
+// Tests the manager's access to the path normaliser. tests/integration/normalisePathTest.cpp tests
+// its rules.
 #include "components/componentManager/manager/componentImpPrivate.h"
 
 #include <gtest/gtest.h>

@@ -1,4 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
+// Tests the default process controller: what it writes to the standard error stream, and how it
+// finds files.
 #include "components/componentManager/processControl.h"
 #include "components/base/assertions.h"
 #include "tests/support/temporaryDirectory.h"
@@ -94,7 +96,7 @@ TEST_F(DefaultController, WritesItsStatusWithoutFlushing) {
     EXPECT_TRUE(std::regex_match(carriageReturn, std::regex("0x[0-9a-f]+"))) << carriageReturn;
 }
 
-/// What `progress` writes before the address of "%: ".
+/// Returns the percentage that `progress` writes before the address of "%: ".
 std::string percentage(float fraction) {
     const StandardErrorCapture capture;
     EXPECT_TRUE(QrGetSystemProcessController()->progress(fraction, text));
@@ -240,7 +242,7 @@ TEST_F(FindFile, TakesNullTextsForEmptyOnes) {
     EXPECT_EQ(controller->findFile(nullptr, nullptr, nullptr), L"");
     EXPECT_EQ(controller->findFile(nullptr, one.c_str(), two.c_str()), L"");
     EXPECT_EQ(controller->findFile(L"", L"", L""), L"");
-    EXPECT_EQ(find(L"x", one), L"") << "a name of one character has no second one";
+    EXPECT_EQ(find(L"x", one), L"") << "a name of one character must not be read beyond its end";
 }
 
 TEST_F(FindFile, DoesNotFindANameThatTheLocaleCannotExpress) {

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-// The program's folder, and full paths.
+// Tests the program's folder and full paths.
 #include "components/componentKit/hostKit.h"
 #include "tests/support/temporaryDirectory.h"
 

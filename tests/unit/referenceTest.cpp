@@ -1,4 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
+// Tests the four reference classes: references taken and released by every operation, and
+// assignments that destroy the old object.
 #include "tests/unit/testObjects.h"
 
 #include <gtest/gtest.h>
@@ -220,7 +222,7 @@ TEST(ConstReference, GivesConstAccessOnlyAndComesFromTheOthers) {
     EXPECT_TRUE(constant == plain);
 }
 
-/// Holds the next object of a chain, and nobody else does.
+/// Owns the next object of a chain.
 class Chained : public QrCastRef<QrCastHeap<QrCastImpl<Chained, Gauge>>> {
   public:
     explicit Chained(int& alive) : alive(alive) { ++alive; }

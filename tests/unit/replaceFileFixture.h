@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// A folder to replace files in.
+/// A fixture with a folder in which tests replace a file.
 #pragma once
 
 #include "components/componentManager/files.h"

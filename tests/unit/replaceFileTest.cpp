@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-// Replacing a file such that the old one is never lost.
+// Tests that replacing a file never loses the old one.
 #include "components/componentManager/exceptions.h"
 #include "components/componentManager/files.h"
 #include "components/componentManager/nativeText.h"

@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Tests safeCast and queryCast: references, failures, translators, and the types that they accept.
 #include "tests/unit/testObjects.h"
 
 #include <gtest/gtest.h>
@@ -33,7 +34,7 @@ bool acceptsEverything(const QrUid&) {
     return true;
 }
 
-/// Translates for as long as it lives.
+/// Registers a translator while it lives.
 class Translation {
   public:
     Translation(QrCastable* object, QrCastable* translator, bool (*accepts)(const QrUid&))
@@ -52,7 +53,7 @@ class Translation {
 void expectBadCast(const std::function<void()>& cast) {
     try {
         cast();
-        ADD_FAILURE() << "no bad cast";
+        ADD_FAILURE() << "ExBadCast was not thrown";
     } catch (const QrComponentManagerEx::ExBadCast& badCast) {
         EXPECT_STREQ(badCast.getReason(), "Bad cast in QrCastable::safeCast");
         EXPECT_STREQ(badCast.what(), "Bad cast in QrCastable::safeCast");
@@ -142,7 +143,7 @@ TEST(SafeCast, AsksTheObjectFirstAndThenItsTranslators) {
     EXPECT_EQ(found, &dial);
     EXPECT_EQ(probe.asked, 1);
     EXPECT_EQ(dial.asked, 1);
-    EXPECT_EQ(dial.references, 1) << "the one of the result";
+    EXPECT_EQ(dial.references, 1) << "the reference of the result";
     EXPECT_EQ(probe.references, 0);
     found->release();
     EXPECT_EQ(queryCast<Dial>(&probe)->mark(), 5);
@@ -178,7 +179,7 @@ TEST(SafeCast, FailureLeavesACountedObjectToItsOwner) {
     EXPECT_EQ(object->release(), 0);
 }
 
-// ---- What may be cast to --------------------------------------------------------------------
+// ---- The types that a cast accepts ----------------------------------------------------------
 
 class InheritsItsUid : public Gauge {};
 class InheritsItsSelf : public Gauge {

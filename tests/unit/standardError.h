@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// What is written to the standard error stream.
+/// Captures the standard error stream.
 #pragma once
 
 #include <iostream>
@@ -8,8 +8,8 @@
 
 namespace Mz::Test {
 
-/// While it lives, `std::cerr` writes here. The stream's habit of flushing after every insertion is
-/// switched off, so that the flushes which the tested code asks for can be counted.
+/// Receives what is written to `std::cerr` while it lives. Clears unitbuf, so that only the flushes
+/// of the tested code are counted.
 class StandardErrorCapture : private std::streambuf {
   public:
     StandardErrorCapture() : previous(std::cerr.rdbuf(this)), flags(std::cerr.flags()) {

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Interfaces and objects that the tests of the object model share.
+/// Interfaces and objects for the tests of the object model.
 #pragma once
 
 #include "components/componentManager/cast.h"
@@ -23,7 +23,7 @@ class Dial : public QrCastable {
     virtual int mark() const = 0;
 };
 
-/// An interface above which stands another one.
+/// An interface that derives from another interface.
 class FineGauge : public Gauge {
   public:
     using Self = FineGauge;
@@ -32,10 +32,9 @@ class FineGauge : public Gauge {
 
 inline constexpr QrUid unknownUid{0x3C5A00FF, 0x51C24E0B, 0x8F3D6A70, 0x1B9E0C55};
 
-/// What happened, in order.
 using Log = std::vector<std::string>;
 
-/// Not counted, but writes down what is asked of it.
+/// Not counted. Records the casts and references that it is asked for.
 class Probe : public QrCastImpl<Probe, Gauge> {
   public:
     int value() const override { return 7; }
@@ -50,7 +49,7 @@ class Probe : public QrCastImpl<Probe, Gauge> {
     long references = 0;
 };
 
-/// Counted; tells when it is gone.
+/// A counted object. `alive` is the number of its instances.
 class Counted : public QrCastRef<QrCastHeap<QrCastImpl<Counted, Gauge>>> {
   public:
     explicit Counted(int& alive) : alive(alive) { ++alive; }

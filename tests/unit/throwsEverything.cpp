@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// A library that throws each exception class by number.
 #include "tests/unit/throwsEverything.h"
 
 #include "components/base/assertions.h"

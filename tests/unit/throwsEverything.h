@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// A library that throws each exception there is.
+/// The function of the library that throws each exception class.
 #pragma once
 
 namespace Mz::Test {

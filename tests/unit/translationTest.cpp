@@ -1,4 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
+// Tests the registry of translators: order, removal, changes during a lookup, exceptions, and
+// use before main and after it.
 #include "tests/unit/testObjects.h"
 
 #include <gtest/gtest.h>
@@ -24,7 +26,7 @@ bool acceptsNothing(const QrUid&) {
     return false;
 }
 
-/// Answers `Dial` when told so.
+/// Supplies `Dial` if `answers` is true.
 class Translator : public QrCastImpl<Translator, Dial> {
   public:
     explicit Translator(bool answers = true) : answers(answers) {}
@@ -52,7 +54,8 @@ class TranslationRegistry : public testing::Test {
     void add(Translator& translator) { QrAddTranslation(&object, &translator, acceptsEverything); }
     void remove(Translator& translator) { QrRemoveTranslation(&object, &translator); }
 
-    /// The translators of the object in order, found by letting each one decline in turn.
+    /// Returns the translators of the object in order. Each lookup lets one more translator
+    /// decline.
     std::string order() {
         std::string names;
         for (int position = 0; position < 10; ++position) {
@@ -94,7 +97,7 @@ TEST_F(TranslationRegistry, GivesTheTranslatorsAnswerWithItsOneReference) {
     QrCastable* const found = QrTranslateInterface(&object, Dial::uid);
     EXPECT_EQ(found, &a);
     EXPECT_EQ(a.references, 1);
-    EXPECT_EQ(object.asked, 0) << "the object itself is only an address";
+    EXPECT_EQ(object.asked, 0) << "the registry must not call the object";
 }
 
 TEST_F(TranslationRegistry, TakesNoReferencesOfItsOwn) {
@@ -193,7 +196,7 @@ TEST_F(TranslationRegistry, RemovalOfTheLastEntryEndsThere) {
     remove(b);
     EXPECT_EQ(order(), "");
     addProbed(c);
-    EXPECT_EQ(order(), "C") << "an emptied sequence is used again";
+    EXPECT_EQ(order(), "C") << "an emptied sequence must be reusable";
 }
 
 TEST_F(TranslationRegistry, NullArgumentsAddNothing) {
@@ -218,7 +221,7 @@ TEST_F(TranslationRegistry, HoldsManyObjects) {
         EXPECT_EQ(QrTranslateInterface(&objects[index], Dial::uid), nullptr);
 }
 
-// ---- Changes from within --------------------------------------------------------------------
+// ---- Changes during a lookup ----------------------------------------------------------------
 
 QrCastable* changedObject = nullptr;
 QrCastable* addedTranslator = nullptr;
@@ -264,7 +267,7 @@ TEST_F(TranslationRegistry, SurvivesAPredicateThatEmptiesTheSequence) {
     EXPECT_EQ(QrTranslateInterface(&object, Dial::uid), nullptr);
 }
 
-/// Asks the registry again, for another object, while it is asked itself.
+/// Uses the registry for other objects while the registry calls it.
 class Forwarder : public QrCastImpl<Forwarder, Dial> {
   public:
     explicit Forwarder(QrCastable* next) : next(next) {}
@@ -308,7 +311,7 @@ TEST_F(TranslationRegistry, LetsExceptionsOfPredicatesThrough) {
 Translator staticTranslator;
 Probe staticObject;
 
-/// Uses the registry in the construction and the destruction of a static object.
+/// Uses the registry in its constructor and its destructor, which run before and after main.
 struct EarlyAndLate {
     EarlyAndLate() {
         QrAddTranslation(&staticObject, &staticTranslator, acceptsEverything);

@@ -1,12 +1,12 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Where files cannot be written.
+/// A path at which no file can be created.
 #pragma once
 
 #include <filesystem>
 
 namespace Mz::Test {
 
-/// A folder in which nobody can make a file.
+/// Returns a folder in which no process can create a file.
 std::filesystem::path unwritableFolder();
 
 } // namespace Mz::Test

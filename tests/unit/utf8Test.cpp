@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Tests the conversion between wide text and UTF-8, and the replacement of invalid input.
 #include "components/componentManager/utf8.h"
 
 #include <gtest/gtest.h>

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// The persistent classes that the tests store and load, and the builders that make them.
+/// The persistent classes that the tests store and load, and the uids of their builders.
 #pragma once
 
 #include "components/componentManager/cast.h"
@@ -9,8 +9,8 @@
 
 namespace Mz::Test {
 
-/// A node of a graph, with all that the tests want to see of it. Links are stored as objects; those
-/// that were read are in `links` once the load is finished.
+/// A node of a graph. Links are stored as objects; `links` has those that were read when the load
+/// is finished.
 class Node : public QrCastable {
   public:
     using Self = Node;
@@ -23,7 +23,7 @@ class Node : public QrCastable {
     std::vector<QrPtr<Node>> links;
 };
 
-/// Knows how many nodes exist.
+/// Counts the existing nodes.
 class Census : public QrCastable {
   public:
     using Self = Census;
@@ -32,7 +32,7 @@ class Census : public QrCastable {
     virtual int alive() const = 0;
 };
 
-/// An interface that no object of these has by itself.
+/// An interface that no object of the tests has.
 class Stranger : public QrCastable {
   public:
     using Self = Stranger;
@@ -44,36 +44,37 @@ constexpr QrUid classUid(std::uint32_t which) {
 }
 
 inline constexpr QrUid censusUid = classUid(0);
-/// A node that writes its name exactly, and writes `weight` and `flag` in the middle of the rest.
+/// A node that writes its name exactly, and all other members.
 inline constexpr QrUid nodeUid = classUid(1);
-/// A node that stores its name as a plain string, and nothing else.
+/// A node that stores its number, and its name as a plain string.
 inline constexpr QrUid stringUid = classUid(2);
 inline constexpr QrUid wideUid = classUid(20);
-/// A node whose storing is the work of a companion.
+/// A node that a companion stores.
 inline constexpr QrUid companionUid = classUid(3);
-/// A node of the second library. Its builder gives it out as another interface than its first.
+/// A node whose builder returns it by another interface than its first.
 inline constexpr QrUid viewedUid = classUid(4);
-/// A node that asks to be told while nobody but the reader holds it.
+/// A node that requests its notification while only the reader owns it.
 inline constexpr QrUid selfishUid = classUid(5);
-/// A node that reads an object inside it and goes on whatever becomes of that.
+/// A node that reads an object and ignores its failure.
 inline constexpr QrUid carelessUid = classUid(6);
 
-/// Builders that do not give what they should.
+/// Builders with faults: another class, an object that is not persistent, null, an exception.
 inline constexpr QrUid otherClassUid = classUid(7);
 inline constexpr QrUid notPersistentUid = classUid(8);
 inline constexpr QrUid makesNullUid = classUid(9);
 inline constexpr QrUid throwingUid = classUid(10);
 
-/// A node that answers the failure of an object inside it with one of its own, without a place.
+/// A node that replaces the exception of an object in it by another one, without a position.
 inline constexpr QrUid misleadingUid = classUid(11);
 
-/// A node that stores its number and its links, and holds those as soon as it has read them.
+/// A node that stores its number and its links, and owns the links as soon as it has read them.
 inline constexpr QrUid holderUid = classUid(12);
 
-/// A node that writes a value for each letter of its name, and demands them back as they were.
+/// A node that writes a value for each letter of its name, and expects the same values when it is
+/// read.
 inline constexpr QrUid spelledUid = classUid(13);
 
-/// No builder has this one.
+/// No builder has this uid.
 inline constexpr QrUid unknownUid = classUid(0x99);
 
 } // namespace Mz::Test

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-// Persistent classes that do all that is asked of them.
+// Persistent classes without faults.
 #include "components/componentKit/componentKit.h"
 #include "components/objectIO/objectIO.h"
 #include "tests/objects/components/classes.h"
@@ -12,8 +12,8 @@ using namespace Mz::Test;
 
 int nodesAlive = 0;
 
-/// Links are resolved when all objects are whole: until then they are held by the reader, so that
-/// a load that fails leaves no circle of references behind.
+/// Resolves its links in `loadFinished`. Until then only the reader owns the nodes, so that a
+/// failed load leaves no cycle of references.
 class NodeObject final : public QrCastRef<QrCastHeap<QrCastMulti<NodeObject, Node, QrPersistant>>> {
   public:
     NodeObject() { ++nodesAlive; }
@@ -56,7 +56,7 @@ class NodeObject final : public QrCastRef<QrCastHeap<QrCastMulti<NodeObject, Nod
     std::vector<Node*> pending;
 };
 
-/// Does not hold what is still being read: a load that fails would leave a circle of references.
+/// Does not own a holder that is still being read: a failed load would leave a cycle of references.
 class HolderObject final
     : public QrCastRef<QrCastHeap<QrCastMulti<HolderObject, Node, QrPersistant>>> {
   public:
@@ -103,7 +103,7 @@ class StringObject final
     void read(QrStream& stream) override { stream >> number >> name >> number; }
 };
 
-/// Holds an array of characters, two of them, which only binary streams carry.
+/// Stores an array of two characters. Only binary streams can carry it.
 class WideObject final : public QrCastRef<QrCastHeap<QrCastMulti<WideObject, Node, QrPersistant>>> {
   public:
     const QrUid* getClassUid() const override { return &wideUid; }
@@ -129,7 +129,8 @@ class Companion final
     void read(QrStream& stream) override;
 };
 
-/// `destroy` does nothing to it: that of its companions would delete it under their reference.
+/// Does not define `destroy`: its companion's `destroy` would delete it while it is still
+/// referenced.
 class CompanionObject final
     : public QrCastRef<
           QrCastImpl2<CompanionObject, Node, QrTempIface<CompanionObject, Companion>>> {};
@@ -140,7 +141,7 @@ void Companion::write(QrStream& stream) {
 
 void Companion::read(QrStream& stream) {
     stream >> owner()->number;
-    // The owner holds itself: it is the object of this very number.
+    // The object that was written is the owner, which the stream already knows.
     const QrRef<QrCastable> same = stream.readObject(nullptr, nullptr, nullptr);
     owner()->flag = same == owner();
     stream.postLoad(this);

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-// Classes and builders with an edge or a fault each, in a library of their own.
+// Persistent classes and builders with one fault or unusual behaviour each.
 #include "components/componentKit/componentKit.h"
 #include "components/objectIO/objectIO.h"
 #include "tests/objects/components/classes.h"
@@ -39,7 +39,7 @@ class Selfish final : public Counted<Selfish> {
     unsigned int getVersion() const override { return 1; }
     void write(QrStream& stream) override { stream << number; }
     void read(QrStream& stream) override {
-        // Each of these takes a reference and gives it back.
+        // Each of these lines takes and releases a reference.
         { const QrPtr<Node> self(this); }
         stream.postLoad(this);
         stream.postLoad(nullptr);

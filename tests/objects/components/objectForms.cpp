@@ -12,7 +12,7 @@ namespace {
 using namespace Mz;
 using namespace Mz::Test;
 
-// Data that begins and ends with what separates text.
+// Data that begins and ends with white space, which separates values in text.
 constexpr int ints[] = {0x0A313233, -1, 0x20202020, 0x31320A0A};
 constexpr char chars[] = {'\n', '1', ' ', '\n'};
 constexpr bool bools[] = {true, false, true};

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-// A component library with two builders, whose records are written and read back.
+// A component library with two builders, for the tests of recorded lists.
 #include "components/componentKit/componentKit.h"
 #include "tests/streams/components/recordedUids.h"
 

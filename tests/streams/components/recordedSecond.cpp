@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-// A component library with one builder, to stand beside the first.
+// A component library with one builder, for the tests of recorded lists.
 #include "components/componentKit/componentKit.h"
 #include "tests/streams/components/recordedUids.h"
 

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// The builders of the component libraries whose records are tested.
+/// The uids of the builders in the libraries for the tests of recorded lists.
 #pragma once
 
 #include "components/componentManager/uid.h"

@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Calls std::abort when its builders are enumerated.
 #include "tests/tools/components/enumerates.h"
 
 #include <cstdlib>

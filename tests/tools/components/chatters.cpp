@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// A good library that talks on the standard streams while it is loaded and described.
+/// A good library that writes to the standard streams while it is loaded and described.
 #include "tests/components/testUids.h"
 
 #include <cstdio>

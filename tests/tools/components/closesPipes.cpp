@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Closes what it did not open.
+/// Closes pipes that it did not open.
 #include "tests/support/testSystem.h"
 #include "tests/tools/components/enumerates.h"
 

@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Crashes in its entry point.
 #include "components/componentManager/componentImp.h"
 #include "tests/tools/components/faults.h"
 

@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Allocates memory without a useful limit when its builders are enumerated.
 #include "tests/tools/components/enumerates.h"
 
 #include <cstring>

@@ -1,10 +1,10 @@
 // SPDX-License-Identifier: BSL-1.0
-/// A component library that does something else where it should offer its builders.
+/// A component library that runs other code before it enumerates its builders.
 #pragma once
 
 #include "tests/components/testUids.h"
 
-/// Defines the library; `action` is what it does first.
+/// Defines the library. The argument is the code that it runs first.
 #define MZ_TEST_ENUMERATES(...)                                                                    \
     namespace {                                                                                    \
     using Mz::Test::PlainDescription;                                                              \

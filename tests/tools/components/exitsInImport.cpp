@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Ends the process, with status 0, where it should import a file or make an object.
+/// Ends the process with status 0 when it imports a file or creates an object.
 #include "components/componentKit/componentKit.h"
 #include "tests/components/testUids.h"
 

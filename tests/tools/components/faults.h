@@ -1,12 +1,12 @@
 // SPDX-License-Identifier: BSL-1.0
-/// What a component library must not do to its host.
+/// Faults of component libraries.
 #pragma once
 
 #include <cstdint>
 
 namespace Mz::Test {
 
-/// Writes where no memory is.
+/// Writes to an address without memory.
 inline int crash() {
     static volatile std::uintptr_t nowhere = 64;
     *reinterpret_cast<volatile int*>(nowhere) = 1;

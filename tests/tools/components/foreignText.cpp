@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// A builder with a text that few locales can carry.
+/// A builder with a label that few locales can represent.
 #include "tests/components/testUids.h"
 
 MZ_PLAIN_ENTRY_POINT(Mz::Test::PlainDescription, "foreign",

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// An importer whose library still has something to say when it is unloaded.
+/// An importer whose library logs a message when it is unloaded.
 #include "components/componentKit/componentKit.h"
 #include "components/componentManager/processControl.h"
 #include "tests/components/testUids.h"

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Offers a builder whose identity was forgotten.
+/// Has a builder with the nil uid.
 #include "tests/components/plain.h"
 
 using namespace Mz::Test;

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Imports files with the extension "note" as objects that can be stored: a number, and a note
-/// inside, that stands in two places.
+/// Imports files with the extension "note" as persistent objects: a number, and an inner object
+/// that is stored twice.
 #include "components/componentKit/componentKit.h"
 #include "components/componentManager/bufferio.h"
 #include "components/componentManager/persistant.h"

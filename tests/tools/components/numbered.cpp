@@ -1,12 +1,12 @@
 // SPDX-License-Identifier: BSL-1.0
-/// One of many good libraries, each with a builder of its own.
+/// One of many good libraries. Each has a builder with another uid.
 #include "tests/components/testUids.h"
 
 extern const unsigned int mzTestNumber;
 
 namespace {
 
-/// Writes that the library was really loaded.
+/// Reports that the library was loaded.
 struct Presence {
     Presence() { Mz::Test::note("numberedLoaded"); }
 } presence;

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Offers builders without an end.
+/// Enumerates builders without an end.
 #include "tests/tools/components/enumerates.h"
 
 static volatile bool forever = true;

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Reserves far more addresses than it may use memory, as generators of code do, and works.
+/// Reserves much more address space than the memory limit, as code generators do, and works.
 #include "tests/support/testSystem.h"
 #include "tests/tools/components/enumerates.h"
 

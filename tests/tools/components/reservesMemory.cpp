@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// The same with addresses that could be written to.
+/// Reserves much more writable address space than the memory limit, and works.
 #include "tests/support/testSystem.h"
 #include "tests/tools/components/enumerates.h"
 

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Needs a function of its host's program.
+/// Needs a function that the host's program exports.
 #include "tests/tools/components/enumerates.h"
 #include "tests/tools/recordedHost.h"
 

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// An importer that talks on standard output when it is loaded and whenever it is asked something.
+/// An importer that writes to standard output when it is created and when it is queried.
 #include "components/componentKit/componentKit.h"
 #include "tests/components/testUids.h"
 

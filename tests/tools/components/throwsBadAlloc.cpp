@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Says that there is no memory, though it takes hardly any.
+/// Throws std::bad_alloc although it uses little memory.
 #include "tests/tools/components/enumerates.h"
 
 #include <new>

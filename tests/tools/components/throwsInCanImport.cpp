@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// An importer that throws what nobody knows, when it is asked whether it can import.
+/// An importer that throws an exception of an unknown type in canImport.
 #include "components/componentKit/componentKit.h"
 #include "tests/components/testUids.h"
 

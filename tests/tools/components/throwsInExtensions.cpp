@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
-/// An importer that throws what nobody knows, when it is asked what it reads. Its label does to a
-/// terminal what it likes.
+/// An importer that throws an exception of an unknown type in enumerateExtensions. Its label
+/// contains control characters for terminals.
 #include "components/componentKit/componentKit.h"
 #include "tests/components/testUids.h"
 

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Writes 100 MiB to descriptors that it did not open.
+/// Writes 100 MiB to pipes that it did not open.
 #include "tests/support/testSystem.h"
 #include "tests/tools/components/enumerates.h"
 

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Writes to what it did not open the beginning of a message that never ends.
+/// Writes the beginning of an incomplete message to pipes that it did not open.
 #include "tests/support/testSystem.h"
 #include "tests/tools/components/enumerates.h"
 

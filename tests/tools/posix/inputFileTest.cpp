@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// What `import` and `show` say of what they cannot read.
+/// Tests the messages of `import` and `show` about files that they cannot read.
 #include "tests/tools/toolsFixture.h"
 
 #include <nlohmann/json.hpp>

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Where dependencies are looked for, against what the loader itself does.
+/// Tests where the tools look for dependencies, by comparison with the system's loader.
 #include "tests/tools/toolsFixture.h"
 
 using namespace Mz;

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Files that cannot be looked at, and those that are none.
+/// Tests what the tools report of folders that the user may not enter.
 #include "tests/tools/toolsFixture.h"
 
 #include <clocale>
@@ -12,7 +12,7 @@ using namespace Mz::Test;
 
 namespace {
 
-/// While it lives, the process is no longer the superuser, to whom permissions mean nothing.
+/// While it lives, the process does not run as the superuser, whom permissions do not restrict.
 class OrdinaryUser {
   public:
     OrdinaryUser() : previous(::geteuid()) {
@@ -33,7 +33,7 @@ class OrdinaryUser {
 
 class Place : public ToolsTest {
   protected:
-    /// A folder that may not be entered, with a component in it.
+    /// Returns a folder that may not be entered, with a component in it.
     std::filesystem::path closedFolder() {
         const std::filesystem::path closed = folder.path() / "closed";
         std::filesystem::create_directory(closed);

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-// Exceptions without memory, where a program's operator new is that of the libraries too.
+// Tests exceptions without memory. On POSIX, the program's operator new also serves the libraries.
 #include "components/componentManager/exceptions.h"
 #include "tests/unit/allocationFailure.h"
 

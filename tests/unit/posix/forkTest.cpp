@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-// A process that is a copy of another one.
+// Tests the controller registry in a forked child.
 #include "components/componentManager/processControl.h"
 
 #include <gtest/gtest.h>
@@ -13,12 +13,12 @@ using namespace Mz;
 
 namespace {
 
-/// What `check` answers in a copy of this process.
+/// Forks and returns what `check` returns in the child.
 template <class Check>
 bool inCopy(Check&& check) {
     const pid_t child = ::fork();
     if (child == 0) {
-        ::alarm(10); // Ends a copy that waits for ever.
+        ::alarm(10); // Ends a child that deadlocks.
         ::_exit(check() ? 0 : 1);
     }
     int status = 0;
@@ -29,7 +29,7 @@ TEST(Fork, GivesTheThreadAnIdentifierWithoutController) {
     QrProcessControl* const standard = QrGetProcessController();
     QrProcessControl* const own = reinterpret_cast<QrProcessControl*>(0x1234);
     QrSetThreadProcessController(own);
-    EXPECT_EQ(QrGetProcessController(), own); // From now on it is remembered.
+    EXPECT_EQ(QrGetProcessController(), own); // Now it is cached.
     EXPECT_TRUE(inCopy([&] {
         return QrGetThreadProcessController() == nullptr && QrGetProcessController() == standard;
     }));

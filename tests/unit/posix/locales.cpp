@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// The UTF-8 locale of the system, and a single-byte locale that the build makes.
 #include "tests/unit/locales.h"
 
 #include <cstdlib>
@@ -20,7 +21,7 @@ std::vector<MultibyteLocale> multibyteLocales() {
 }
 
 std::vector<SingleByteLocale> singleByteLocales() {
-    // Few systems have one, so it was made for the tests, where the tools for that are there.
+    // Few systems install a single-byte locale. The build makes one if it finds the tools.
     setenv("LOCPATH", MZ_LOCALE_FOLDER, 1);
     constexpr const char* name = "de_DE.ISO-8859-15";
     if (!LocaleGuard(name))

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-// Names that are bytes, under the locales of threads.
+// Tests names that are bytes, with threads that have their own locale.
 #include "components/componentManager/nativeText.h"
 #include "components/componentKit/hostKit.h"
 #include "tests/unit/locales.h"
@@ -17,7 +17,7 @@ namespace {
 
 constexpr const char* utf8Locale = "C.UTF-8";
 
-/// Runs `work` in a thread that has this locale.
+/// Runs `work` on a thread with that locale.
 template <class Work>
 void withThreadLocale(const char* name, Work work) {
     std::thread([&] {

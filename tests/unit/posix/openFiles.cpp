@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// Compares the file with the targets of the process's descriptors in /proc/self/fd.
 #include "tests/unit/openFiles.h"
 
 namespace Mz::Test {

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-// Replacing files on systems that can be made to run full, and that know symlinks and permissions.
+// Tests the replacement of files with what only POSIX has: a full medium, symlinks and permissions.
 #include "components/componentManager/exceptions.h"
 #include "tests/unit/replaceFileFixture.h"
 
@@ -12,11 +12,11 @@ using namespace Mz::Test;
 
 namespace {
 
-/// While it lives, no file of this process grows beyond `size` bytes, as on a medium that is full.
+/// While it lives, files of this process cannot grow beyond `size` bytes, as on a full medium.
 class FullMedium {
   public:
     explicit FullMedium(rlim_t size) {
-        std::signal(SIGXFSZ, SIG_IGN); // Writing then fails instead.
+        std::signal(SIGXFSZ, SIG_IGN); // A write fails instead of ending the process.
         limitFiles(size);
     }
     ~FullMedium() { limitFiles(RLIM_INFINITY); }
@@ -42,7 +42,7 @@ TEST_F(ReplaceFile, KeepsTheOldOneWhenTheMediumIsFull) {
     const FullMedium full(1000);
     replaceFile(file, fill(1000));
     EXPECT_EQ(content().size(), 1000U);
-    // Whether it shows when the data is written or only at the end, when the rest of it is.
+    // The failure occurs in a write or only in the final flush, depending on the size.
     for (const std::size_t size : {1001U, 5000U, 100000U}) {
         EXPECT_THROW(replaceFile(file, fill(size)), QrStreamEx::ExWriteError) << size;
         EXPECT_EQ(content(), std::string(1000, 'x'));

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-// Threads that end inside a standard stream under a buffer.
+// Tests threads that end inside a standard stream below a buffer.
 #include "components/componentManager/bufferio.h"
 
 #include <gtest/gtest.h>
@@ -15,7 +15,7 @@ namespace {
 
 constexpr std::ios::iostate everyFlag = std::ios::badbit | std::ios::eofbit | std::ios::failbit;
 
-/// A medium in whose flush the thread ends, as one does that is cancelled while it waits.
+/// A medium whose flush ends the thread, as a cancellation during a blocking write does.
 class EndsThread final : public std::streambuf {
   protected:
     int_type overflow(int_type byte) override { return traits_type::not_eof(byte); }
@@ -24,7 +24,7 @@ class EndsThread final : public std::streambuf {
     int sync() override { ::pthread_exit(nullptr); }
 };
 
-/// Whether the thread that does `work` ends inside it, which unwinds its stack.
+/// Returns whether a thread that runs `work` ends inside it and unwinds its stack.
 template <class Work>
 bool endsInside(const Work& work) {
     bool unwound = false;

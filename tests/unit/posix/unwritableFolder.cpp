@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// No process can create files in /proc/self.
 #include "tests/unit/unwritableFolder.h"
 
 namespace Mz::Test {

@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+// The double-byte and single-byte code pages that the C runtime may have.
 #include "tests/unit/locales.h"
 
 namespace Mz::Test {

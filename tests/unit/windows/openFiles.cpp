@@ -6,7 +6,8 @@
 namespace Mz::Test {
 
 bool isOpen(const std::filesystem::path& file) {
-    // Nobody who opens a file through the C runtime lets others delete it meanwhile.
+    // The C runtime opens files without FILE_SHARE_DELETE, so a request to delete an open file
+    // fails.
     const HANDLE handle =
         ::CreateFileW(file.c_str(), DELETE, FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE,
                       nullptr, OPEN_EXISTING, FILE_ATTRIBUTE_NORMAL, nullptr);

@@ -4,7 +4,7 @@
 namespace Mz::Test {
 
 std::filesystem::path unwritableFolder() {
-    // No name in it can have this character.
+    // No file name can contain '?'.
     return L"C:\\a?b";
 }
 
