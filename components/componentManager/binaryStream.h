@@ -5,6 +5,8 @@
 #include "components/componentManager/export.h"
 #include "components/componentManager/stream.h"
 
+#include <string>
+
 namespace Mz {
 
 /// The binary stream: a `QrStream` that writes single values in binary form too.

@@ -6,6 +6,9 @@
 /// a lock. Its constructor loads nothing; only `initialize` does.
 #include "components/componentManager/manager/componentImpPrivate.h"
 
+#include <cstddef>
+#include <list>
+
 namespace Mz {
 
 QrComponentBuilder::~QrComponentBuilder() = default;

@@ -14,6 +14,8 @@
 #include <fstream>
 #include <optional>
 #include <random>
+#include <string>
+#include <system_error>
 
 namespace Mz {
 

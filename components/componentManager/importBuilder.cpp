@@ -7,6 +7,8 @@
 
 #include "components/componentManager/importing/inputFile.h"
 
+#include <iosfwd>
+
 namespace Mz {
 
 QrImportBuilder::~QrImportBuilder() = default;

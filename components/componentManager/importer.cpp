@@ -11,6 +11,10 @@
 #include "components/componentManager/importing/inputFile.h"
 #include "components/componentManager/processControl.h"
 
+#include <cstddef>
+#include <iosfwd>
+#include <utility>
+
 namespace Mz {
 
 QrImporter::~QrImporter() = default;

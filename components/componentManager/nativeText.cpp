@@ -10,6 +10,7 @@
 #include "components/platform/characters.h"
 #include "components/platform/platform.h"
 
+#include <cstddef>
 #include <type_traits>
 
 namespace Mz {

@@ -13,8 +13,10 @@
 #include "components/platform/platform.h"
 #include "components/platform/searchPath.h"
 
+#include <atomic>
 #include <iostream>
 #include <limits>
+#include <optional>
 #include <string_view>
 
 namespace Mz {

@@ -13,7 +13,10 @@
 #include "components/componentManager/text/scanText.h"
 
 #include <algorithm>
+#include <cstdarg>
+#include <cstddef>
 #include <cstdint>
+#include <iosfwd>
 #include <limits>
 
 namespace Mz {

@@ -5,6 +5,8 @@
 #include "components/componentManager/export.h"
 #include "components/componentManager/stream.h"
 
+#include <string>
+
 namespace Mz {
 
 /// The text stream: a `QrStream` that writes and reads arrays as text too.

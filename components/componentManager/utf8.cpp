@@ -8,6 +8,7 @@
 
 #include "components/base/surrogates.h"
 
+#include <cstddef>
 #include <cstdint>
 
 namespace Mz {

@@ -7,14 +7,18 @@
 #include "components/componentManager/files.h"
 #include "components/componentManager/nativeText.h"
 #include "components/componentTools/inspecting/inspection.h"
-#include "components/componentTools/platform/system.h"
 #include "components/componentTools/recordedList.h"
 #include "components/platform/pathNormaliser.h"
 #include "components/platform/platform.h"
 #include "components/platform/searchPath.h"
 
+#include <cstddef>
 #include <map>
+#include <memory>
+#include <optional>
+#include <string_view>
 #include <system_error>
+#include <utility>
 
 namespace Mz::Tools {
 

@@ -11,6 +11,8 @@
 #include "components/platform/platform.h"
 
 #include <algorithm>
+#include <cstddef>
+#include <optional>
 #include <system_error>
 #include <utility>
 

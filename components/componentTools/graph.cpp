@@ -9,6 +9,9 @@
 #include "components/componentTools/platform/system.h"
 #include "components/componentTools/uidText.h"
 
+#include <cstddef>
+#include <cstdint>
+#include <memory>
 #include <system_error>
 
 namespace Mz::Tools {

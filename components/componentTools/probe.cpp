@@ -8,6 +8,10 @@
 #include "components/componentTools/uidText.h"
 
 #include <algorithm>
+#include <cstddef>
+#include <optional>
+#include <tuple>
+#include <utility>
 
 namespace Mz::Tools {
 

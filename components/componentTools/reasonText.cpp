@@ -5,6 +5,8 @@
 
 #include "components/componentManager/nativeText.h"
 
+#include <cstddef>
+#include <initializer_list>
 #include <string_view>
 
 namespace Mz::Tools {

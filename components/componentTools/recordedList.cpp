@@ -11,13 +11,16 @@
 #include "components/componentManager/recordFormat.h"
 #include "components/componentTools/records/openPatiently.h"
 #include "components/componentTools/records/verdictsFile.h"
-#include "components/platform/characters.h"
 #include "components/platform/platform.h"
 
 #include <algorithm>
+#include <cstdint>
+#include <exception>
 #include <fstream>
+#include <optional>
 #include <sstream>
 #include <stdexcept>
+#include <vector>
 
 namespace Mz::Tools {
 

@@ -8,6 +8,7 @@
 #include <clocale>
 #include <cstdio>
 #include <iostream>
+#include <utility>
 
 namespace Mz::Tools {
 

@@ -3,6 +3,7 @@
 #include "components/componentTools/uidText.h"
 
 #include <cstdint>
+#include <initializer_list>
 
 namespace Mz::Tools {
 

@@ -7,6 +7,7 @@
 #include "components/base/surrogates.h"
 
 #include <cstdint>
+#include <string>
 #include <vector>
 
 namespace Mz {

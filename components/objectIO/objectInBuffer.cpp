@@ -11,6 +11,9 @@
 #include "components/objectIO/objectText.h"
 
 #include <algorithm>
+#include <cstdint>
+#include <memory>
+#include <string>
 #include <string_view>
 
 namespace Mz {

@@ -9,9 +9,14 @@
 #include "components/objectIO/objectText.h"
 
 #include <algorithm>
+#include <cstddef>
+#include <cstdint>
 #include <limits>
+#include <memory>
+#include <string>
 #include <string_view>
 #include <unordered_map>
+#include <utility>
 
 namespace Mz {
 

@@ -8,6 +8,7 @@
 #include "components/platform/platform.h"
 
 #include <climits>
+#include <cstdint>
 #include <cwchar>
 
 namespace Mz::platform {

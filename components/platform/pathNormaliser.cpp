@@ -10,6 +10,7 @@
 #include "components/platform/searchPath.h"
 
 #include <algorithm>
+#include <cstddef>
 #include <string_view>
 #include <utility>
 

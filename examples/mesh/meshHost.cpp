@@ -27,10 +27,15 @@
 #include "components/componentTools/consoleText.h"
 
 #include <algorithm>
+#include <cstddef>
 #include <exception>
+#include <filesystem>
 #include <iostream>
+#include <iterator>
 #include <optional>
+#include <string>
 #include <utility>
+#include <vector>
 
 using namespace Mz;
 using namespace Meshes;

@@ -5,6 +5,8 @@
 #include "formats/objFormat.h"
 #include "reading/meshImportBuilder.h"
 
+#include <vector>
+
 using namespace Meshes;
 
 MZ_COMPONENT(L"Wavefront OBJ files", L"Reads meshes from Wavefront OBJ files",

@@ -4,6 +4,8 @@
 #include "formats/offFormat.h"
 #include "reading/meshImportBuilder.h"
 
+#include <vector>
+
 using namespace Meshes;
 
 MZ_COMPONENT(L"OFF files", L"Reads meshes from OFF files",

@@ -4,6 +4,8 @@
 #include "formats/plyFormat.h"
 #include "reading/meshImportBuilder.h"
 
+#include <vector>
+
 using namespace Meshes;
 
 MZ_COMPONENT(L"PLY files", L"Reads meshes from PLY files",

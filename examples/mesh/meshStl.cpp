@@ -4,6 +4,8 @@
 #include "formats/stlFormat.h"
 #include "reading/meshImportBuilder.h"
 
+#include <vector>
+
 using namespace Meshes;
 
 MZ_COMPONENT(L"STL files", L"Reads meshes from STL files",

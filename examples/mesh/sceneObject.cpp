@@ -7,7 +7,9 @@
 
 #include "components/objectIO/objectIO.h"
 
+#include <algorithm>
 #include <limits>
+#include <string>
 #include <utility>
 
 using namespace Mz;

@@ -6,6 +6,7 @@
 
 #include "components/componentManager/persistant.h"
 
+#include <cstddef>
 #include <vector>
 
 namespace Meshes {

@@ -8,6 +8,7 @@
 
 #include <cstdlib>
 #include <mutex>
+#include <type_traits>
 #include <utility>
 
 namespace Mz::Commands {

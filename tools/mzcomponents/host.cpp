@@ -13,9 +13,11 @@
 #include "components/componentManager/persistant.h"
 #include "components/componentTools/discovery.h"
 
+#include <functional>
 #include <map>
 #include <set>
 #include <sstream>
+#include <utility>
 
 namespace Mz::Commands {
 

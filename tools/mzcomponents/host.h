@@ -9,6 +9,7 @@
 #include "components/componentManager/importer.h"
 #include "components/componentManager/processControl.h"
 
+#include <filesystem>
 #include <string>
 #include <vector>
 

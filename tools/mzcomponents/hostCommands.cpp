@@ -17,9 +17,13 @@
 #include "components/objectIO/objectIO.h"
 
 #include <algorithm>
+#include <filesystem>
 #include <optional>
 #include <sstream>
+#include <string>
 #include <system_error>
+#include <utility>
+#include <vector>
 
 namespace Mz::Commands {
 

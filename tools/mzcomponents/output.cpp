@@ -15,6 +15,7 @@
 #include <algorithm>
 #include <exception>
 #include <iostream>
+#include <vector>
 
 namespace Mz::Commands {
 

@@ -6,6 +6,7 @@
 #include "components/componentTools/explain.h"
 #include "components/componentTools/scan.h"
 
+#include <cstddef>
 #include <filesystem>
 #include <iosfwd>
 #include <nlohmann/json.hpp>

@@ -16,8 +16,15 @@
 #include "components/componentTools/discovery.h"
 #include "components/objectIO/objectIO.h"
 
+#include <cstddef>
+#include <cstdint>
+#include <filesystem>
 #include <fstream>
+#include <memory>
+#include <string>
 #include <system_error>
+#include <utility>
+#include <vector>
 
 namespace Mz::Commands {
 

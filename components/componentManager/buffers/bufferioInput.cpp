@@ -9,7 +9,10 @@
 #include "components/componentManager/text/plainBytes.h"
 
 #include <algorithm>
+#include <cstddef>
 #include <cwctype>
+#include <istream>
+#include <string>
 
 namespace Mz {
 

@@ -8,7 +8,10 @@
 #include "components/componentManager/text/plainBytes.h"
 
 #include <algorithm>
+#include <cstddef>
 #include <cstdint>
+#include <ostream>
+#include <string>
 #include <string_view>
 
 namespace Mz {

@@ -5,6 +5,8 @@
 
 #include "components/platform/platform.h"
 
+#include <optional>
+
 namespace Mz {
 
 bool openInputFile(std::ifstream& stream, const wchar_t* path) {

@@ -11,9 +11,17 @@
 #include "components/platform/pathNormaliser.h"
 #include "components/platform/searchPath.h"
 
+#include <algorithm>
+#include <cstddef>
 #include <functional>
 #include <iterator>
+#include <list>
+#include <memory>
+#include <optional>
+#include <string>
 #include <string_view>
+#include <utility>
+#include <vector>
 
 namespace Mz {
 

@@ -9,6 +9,7 @@
 #include "components/componentManager/recordFormat.h"
 
 #include <cxxabi.h>
+#include <optional>
 #include <type_traits>
 #include <utility>
 

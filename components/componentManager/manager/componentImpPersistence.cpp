@@ -7,6 +7,9 @@
 #include "components/componentManager/recordFormat.h"
 #include "components/componentManager/stream.h"
 
+#include <list>
+#include <string>
+
 namespace Mz {
 
 namespace {

@@ -7,6 +7,11 @@
 /// its uids, even if a builder of another library has replaced the entry.
 #include "components/componentManager/manager/componentImpPrivate.h"
 
+#include <cstddef>
+#include <list>
+#include <memory>
+#include <string>
+
 namespace Mz {
 
 using Builder = ComponentManager::Builder;

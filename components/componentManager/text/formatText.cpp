@@ -7,12 +7,14 @@
 
 #include "components/componentManager/uid.h"
 
+#include <algorithm>
 #include <charconv>
 #include <cmath>
 #include <cstdint>
 #include <cwchar>
 #include <limits>
 #include <string_view>
+#include <type_traits>
 #include <vector>
 
 namespace Mz {

@@ -11,7 +11,9 @@
 #include <algorithm>
 #include <array>
 #include <charconv>
+#include <cstddef>
 #include <cstdint>
+#include <system_error>
 
 namespace Mz {
 

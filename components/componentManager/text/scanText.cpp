@@ -12,11 +12,14 @@
 #include "components/componentManager/text/plainBytes.h"
 #include "components/componentManager/text/scanNumber.h"
 
+#include <algorithm>
 #include <bitset>
 #include <charconv>
 #include <cstdint>
+#include <iosfwd>
 #include <limits>
 #include <memory>
+#include <system_error>
 
 namespace Mz {
 

@@ -11,7 +11,9 @@
 #include <bit>
 #include <cstdint>
 #include <cstring>
+#include <iosfwd>
 #include <limits>
+#include <string>
 #include <type_traits>
 
 namespace Mz {

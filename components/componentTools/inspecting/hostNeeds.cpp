@@ -8,6 +8,8 @@
 #include "components/platform/platform.h"
 
 #include <set>
+#include <string>
+#include <utility>
 
 namespace Mz::Tools {
 

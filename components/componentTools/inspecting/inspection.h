@@ -6,6 +6,10 @@
 #include "components/componentTools/images/libraryImage.h"
 #include "components/componentTools/verdict.h"
 
+#include <filesystem>
+#include <optional>
+#include <vector>
+
 namespace Mz::Tools {
 
 /// Returns the verdict on a file from its path, attributes and content. Ignores its dependencies.

@@ -4,6 +4,10 @@
 #include "components/componentTools/inspecting/uidNotes.h"
 #include "components/componentTools/uidText.h"
 
+#include <memory>
+#include <string>
+#include <utility>
+
 namespace Mz::Tools {
 
 UidNotes::UidNotes(const RecordedLibraries& allLibraries) : libraries(allLibraries) {

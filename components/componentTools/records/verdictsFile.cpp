@@ -8,9 +8,15 @@
 #include "components/componentManager/utf8.h"
 #include "components/componentTools/records/openPatiently.h"
 
+#include <cstdint>
 #include <fstream>
+#include <initializer_list>
 #include <map>
 #include <nlohmann/json.hpp>
+#include <optional>
+#include <string>
+#include <utility>
+#include <vector>
 
 namespace Mz::Tools {
 

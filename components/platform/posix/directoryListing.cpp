@@ -18,8 +18,12 @@
 #include <dirent.h>
 #include <fcntl.h>
 #include <memory>
+#include <optional>
 #include <set>
+#include <string>
 #include <sys/stat.h>
+#include <utility>
+#include <vector>
 
 namespace Mz::platform {
 

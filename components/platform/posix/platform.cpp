@@ -20,6 +20,7 @@
 #include <pthread.h>
 #include <span>
 #include <sys/stat.h>
+#include <system_error>
 #include <type_traits>
 #include <unistd.h>
 

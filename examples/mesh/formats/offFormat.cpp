@@ -8,6 +8,10 @@
 #include "examples/mesh/reading/number.h"
 #include "examples/mesh/reading/textReader.h"
 
+#include <cstddef>
+#include <cstdint>
+#include <optional>
+#include <string>
 #include <string_view>
 
 namespace Meshes {

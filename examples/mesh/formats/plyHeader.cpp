@@ -9,6 +9,8 @@
 
 #include <algorithm>
 #include <array>
+#include <memory>
+#include <optional>
 #include <string_view>
 #include <utility>
 

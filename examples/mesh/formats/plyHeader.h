@@ -4,6 +4,8 @@
 
 #include "examples/mesh/reading/byteReader.h"
 
+#include <cstddef>
+#include <cstdint>
 #include <string>
 #include <vector>
 

@@ -14,6 +14,8 @@
 #include <bit>
 #include <cmath>
 #include <limits>
+#include <optional>
+#include <span>
 
 namespace Meshes {
 

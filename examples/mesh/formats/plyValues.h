@@ -4,7 +4,9 @@
 
 #include "plyHeader.h"
 
+#include <cstdint>
 #include <memory>
+#include <string>
 
 namespace Meshes {
 

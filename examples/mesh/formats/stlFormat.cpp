@@ -13,8 +13,16 @@
 #include <array>
 #include <bit>
 #include <cmath>
+#include <cstddef>
+#include <cstdint>
+#include <functional>
+#include <initializer_list>
+#include <optional>
+#include <span>
+#include <string>
 #include <string_view>
 #include <unordered_map>
+#include <utility>
 
 namespace Meshes {
 

@@ -9,6 +9,7 @@
 #include <charconv>
 #include <iostream>
 #include <set>
+#include <string_view>
 
 using namespace Mz;
 

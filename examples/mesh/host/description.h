@@ -4,6 +4,7 @@
 
 #include "components/componentManager/cast.h"
 
+#include <cstddef>
 #include <string>
 
 namespace Meshes {

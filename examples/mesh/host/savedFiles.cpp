@@ -13,9 +13,13 @@
 #include "examples/mesh/saving/objectFile.h"
 
 #include <algorithm>
+#include <array>
+#include <cstddef>
 #include <iostream>
 #include <map>
 #include <stdexcept>
+#include <string>
+#include <utility>
 
 using namespace Mz;
 

@@ -4,6 +4,7 @@
 
 #include "components/componentManager/bufferio.h"
 
+#include <cstddef>
 #include <cstdint>
 #include <memory>
 #include <optional>

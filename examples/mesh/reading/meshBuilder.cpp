@@ -6,6 +6,8 @@
 
 #include "failure.h"
 
+#include <algorithm>
+#include <string>
 #include <utility>
 
 namespace Meshes {

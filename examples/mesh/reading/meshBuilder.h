@@ -4,7 +4,11 @@
 
 #include "meshObject.h"
 
+#include <cstddef>
+#include <cstdint>
+#include <span>
 #include <string>
+#include <vector>
 
 namespace Meshes {
 

@@ -6,6 +6,9 @@
 
 #include "components/componentManager/persistant.h"
 
+#include <algorithm>
+#include <cstddef>
+#include <span>
 #include <string>
 #include <vector>
 

@@ -7,6 +7,8 @@
 #include "failure.h"
 #include "number.h"
 
+#include <optional>
+
 namespace Meshes {
 
 namespace {

@@ -4,6 +4,8 @@
 
 #include "byteReader.h"
 
+#include <cstddef>
+#include <cstdint>
 #include <string>
 #include <string_view>
 

@@ -12,6 +12,7 @@
 
 #include <fstream>
 #include <ostream>
+#include <string>
 
 using namespace Mz;
 

@@ -9,6 +9,7 @@
 #include <iterator>
 #include <string_view>
 #include <unordered_map>
+#include <utility>
 
 namespace Mz::Tools::System {
 

@@ -5,7 +5,6 @@
 
 #include "components/componentManager/nativeText.h"
 #include "components/componentTools/platform/posix/loaderCache.h"
-#include "components/platform/characters.h"
 
 #include <cerrno>
 #include <csignal>
@@ -13,11 +12,16 @@
 #include <cstring>
 #include <dlfcn.h>
 #include <fcntl.h>
+#include <initializer_list>
+#include <optional>
 #include <sys/prctl.h>
 #include <sys/resource.h>
 #include <sys/stat.h>
 #include <sys/syscall.h>
+#include <system_error>
+#include <type_traits>
 #include <unistd.h>
+#include <utility>
 
 namespace Mz::Tools::System {
 

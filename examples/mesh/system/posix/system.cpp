@@ -4,6 +4,8 @@
 
 #include <link.h>
 
+#include <system_error>
+
 namespace Meshes::system {
 
 std::size_t mappedLibraries(const std::filesystem::path& folder) {
