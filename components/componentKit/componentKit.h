@@ -10,6 +10,7 @@
 /// library with other needs implements those interfaces by hand. It can combine both.
 #pragma once
 
+#include "components/componentKit/stamp.h"
 #include "components/componentManager/componentImp.h"
 #include "components/componentManager/importBuilder.h"
 
@@ -273,6 +274,7 @@ class StaticDescription {
 /// are stored as pointers and must stay valid until the library is unloaded. Each builder is the
 /// result of `Mz::Kit::builderOf` or `Mz::Kit::builder`.
 #define MZ_COMPONENT(label, text, ...)                                                             \
+    MZ_COMPONENT_STAMP;                                                                            \
     static constinit Mz::Kit::StaticDescription mzComponentDescription;                            \
     static void mzDropComponentBuilders() {                                                        \
         mzComponentDescription.dropBuilders();                                                     \
