@@ -47,7 +47,8 @@ struct ComponentStamp {
     StringAbi stringAbi;         ///< must be the same
     std::uint8_t containerDebug; ///< 1 if the standard library's debug mode changes the layout of
                                  ///< containers (`_GLIBCXX_DEBUG`), else 0: must be the same
-    std::uint8_t reserved[3];    ///< 0
+    std::uint8_t wideCharSize;   ///< `sizeof(wchar_t)`: must be the same
+    std::uint8_t reserved[2];    ///< 0
 };
 static_assert(sizeof(ComponentStamp) == 28 && std::is_trivially_copyable_v<ComponentStamp>);
 
@@ -85,7 +86,7 @@ static_assert(sizeof(ComponentStamp) == 28 && std::is_trivially_copyable_v<Compo
     {                                                                                              \
         "MZstamp", 1, sizeof(Mz::ComponentStamp), MZ_SOVERSION,                                    \
             {MZ_VERSION_MAJOR, MZ_VERSION_MINOR, MZ_VERSION_PATCH}, MZ_CXX_ABI, MZ_STRING_ABI,     \
-            MZ_CONTAINER_DEBUG, {}                                                                 \
+            MZ_CONTAINER_DEBUG, sizeof(wchar_t), {}                                                \
     }
 
 } // namespace Mz

@@ -73,7 +73,7 @@ TEST_F(Explain, TellsALibraryWithoutTheEntryPointOrWithAnotherThingOfThatName) {
 TEST_F(Explain, TellsALibraryThatWasBuiltForAnotherAbi) {
     for (const wchar_t* name :
          {L"stampedOtherVersion", L"stampedOtherCxxAbi", L"stampedOtherStrings",
-          L"stampedOtherDebug", L"kitOldStrings", L"kitDebugContainers"}) {
+          L"stampedOtherDebug", L"stampedOtherWideChar", L"kitOldStrings", L"kitDebugContainers"}) {
         const Explanation explanation = loaded(add(name));
         EXPECT_EQ(explanation.verdict.verdict, Verdict::otherAbi) << nameOf(verdictOn(add(name)));
         EXPECT_EQ(explanation.verdict, explainFile(add(name)).verdict);

@@ -114,7 +114,7 @@ TEST_P(StampInFile, OfAnotherFormIsNone) {
     EXPECT_FALSE(isRead([](ComponentStamp& stamp) { --stamp.size; }));
     // One with more fields at its end.
     EXPECT_TRUE(isRead([](ComponentStamp& stamp) { stamp.size += 4; }));
-    EXPECT_TRUE(isRead([](ComponentStamp& stamp) { stamp.reserved[2] = 1; }));
+    EXPECT_TRUE(isRead([](ComponentStamp& stamp) { stamp.reserved[1] = 1; }));
 }
 
 INSTANTIATE_TEST_SUITE_P(Formats, StampInFile, ::testing::Values(ImageFormat::elf, ImageFormat::pe),
@@ -223,15 +223,20 @@ TEST(Stamp, OfAnotherAbiNamesOnlyWhatDiffers) {
     ASSERT_TRUE(debug);
     EXPECT_THAT(debug->subject, HasSubstr(L"debug mode"));
     EXPECT_NE(debug->subject, debug->words);
+    const auto wide = judged([](ComponentStamp& stamp) { stamp.wideCharSize ^= 6; });
+    ASSERT_TRUE(wide);
+    EXPECT_THAT(wide->subject, HasSubstr(L"wchar_t of "));
+    EXPECT_NE(wide->subject, wide->words);
     const auto all = judged([](ComponentStamp& stamp) {
         stamp.soVersion += 1;
+        stamp.wideCharSize ^= 6;
         stamp.cxxAbi = CxxAbi::microsoft;
         stamp.stringAbi = StringAbi::unknown;
         stamp.containerDebug ^= 1;
     });
     ASSERT_TRUE(all);
-    EXPECT_EQ(std::count(all->subject.begin(), all->subject.end(), L','), 3);
-    EXPECT_EQ(std::count(all->words.begin(), all->words.end(), L','), 3);
+    EXPECT_EQ(std::count(all->subject.begin(), all->subject.end(), L','), 4);
+    EXPECT_EQ(std::count(all->words.begin(), all->words.end(), L','), 4);
 }
 
 TEST(Stamp, WithAValueOfALaterVersionDoesNotFit) {

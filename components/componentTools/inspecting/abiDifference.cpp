@@ -51,6 +51,10 @@ std::wstring debugName(const ComponentStamp& stamp) {
     }
 }
 
+std::wstring wideCharName(const ComponentStamp& stamp) {
+    return L"wchar_t of " + std::to_wstring(stamp.wideCharSize) + L" bytes";
+}
+
 void append(std::wstring& list, const std::wstring& item) {
     list += (list.empty() ? L"" : L", ") + item;
 }
@@ -69,6 +73,7 @@ std::optional<Finding> abiDifference(const ComponentStamp& stamp) {
     compare(&ComponentStamp::cxxAbi, cxxAbiName);
     compare(&ComponentStamp::stringAbi, stringAbiName);
     compare(&ComponentStamp::containerDebug, debugName);
+    compare(&ComponentStamp::wideCharSize, wideCharName);
     return finding.subject.empty() ? std::nullopt : std::optional(std::move(finding));
 }
 
