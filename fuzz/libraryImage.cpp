@@ -1,18 +1,35 @@
 // SPDX-License-Identifier: BSL-1.0
 // Reads a file as `explain` does, in the formats of both systems.
 #include "components/componentTools/images/libraryImage.h"
+#include "components/componentTools/inspecting/abiDifference.h"
 #include "fuzz/fuzz.h"
 
 #include <set>
+#include <string_view>
+
+namespace {
+
+void judgeStamp(const Mz::ComponentStamp& stamp, std::string_view content) {
+    using namespace Mz;
+    const std::string_view bytes(reinterpret_cast<const char*>(&stamp), sizeof stamp);
+    Fuzz::expect(content.find(bytes) != content.npos, "a stamp is bytes of the file");
+    if (const auto difference = Tools::abiDifference(stamp))
+        Fuzz::expect(difference->subject != difference->words, "both sides of a difference differ");
+}
+
+} // namespace
 
 int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
     using namespace Mz;
-    const Fuzz::InputFile file(Fuzz::Input(data, size).rest());
+    const std::string_view content = Fuzz::Input(data, size).rest();
+    const Fuzz::InputFile file(content);
     const Tools::LibraryImage image = Tools::readLibraryImage(file.path());
     Fuzz::expect(image.readable, "the file can be read");
     // Not more texts than the file has room for.
     std::size_t texts = image.needed.size() + image.rpath.size() + image.runpath.size();
     Fuzz::expect(texts <= size, "as many names as bytes at most");
+    if (image.stamp)
+        judgeStamp(*image.stamp, content);
     // The tools read symbols after a load has failed, so the file may be damaged.
     std::set<std::string> names;
     for (std::string& name : Tools::wantedSymbols(file.path()))

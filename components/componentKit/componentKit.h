@@ -27,6 +27,7 @@
 #include "components/componentKit/importBuilder.h"
 #include "components/componentKit/importer.h"
 #include "components/componentKit/object.h"
+#include "components/componentKit/stamp.h"
 #include "components/componentKit/translation.h"
 #include "components/componentKit/uidLiteral.h"
 #include "components/componentManager/componentImp.h"
@@ -122,6 +123,7 @@ class StaticDescription {
 /// of a class that is passed as `Mz::Kit::builder<Class>()` takes part if the class has it as a
 /// constant named `builderUid`.
 #define MZ_COMPONENT(label, text, ...)                                                             \
+    MZ_COMPONENT_STAMP;                                                                            \
     static constinit Mz::Kit::StaticDescription mzComponentDescription;                            \
     static void mzDropComponentBuilders() {                                                        \
         mzComponentDescription.dropBuilders();                                                     \

@@ -2,8 +2,7 @@
 /// The version of the library, as numbers for the preprocessor.
 ///
 /// The build reads its own version from these lines. While the major number is 0, a new minor
-/// version may break source compatibility; the `SOVERSION` of the libraries (the number in
-/// `libMZcomponentManager.so.0`) changes when binary compatibility breaks.
+/// version may break source compatibility.
 #pragma once
 
 #define MZ_VERSION_MAJOR 0
@@ -12,3 +11,8 @@
 
 /// The version as one ascending number: 10,000 × major + 100 × minor + patch. Use it in `#if`.
 #define MZ_VERSION (MZ_VERSION_MAJOR * 10000 + MZ_VERSION_MINOR * 100 + MZ_VERSION_PATCH)
+
+/// The number of the binary interface: it grows when compiled users no longer work with the
+/// library. It is part of the library's name on Linux (`libMZcomponentManager.so.0`), and of the
+/// stamp of component libraries (`componentStamp.h`).
+#define MZ_SOVERSION 0

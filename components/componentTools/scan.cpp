@@ -6,6 +6,7 @@
 
 #include "components/componentManager/exceptions.h"
 #include "components/componentTools/explain.h"
+#include "components/componentTools/inspecting/abiDifference.h"
 #include "components/componentTools/inspecting/inspection.h"
 #include "components/componentTools/inspecting/uidNotes.h"
 #include "components/componentTools/reasonText.h"
@@ -123,7 +124,8 @@ class Scanner {
         if (!status) {
             file.verdict.verdict =
                 verdictOnAbsence(candidate.path); // Gone since the folder was listed.
-        } else if (unchanged && !isTriedAgain(known->second)) {
+        } else if (unchanged && !isTriedAgain(known->second) &&
+                   !isForOtherAbi(candidate, known->second)) {
             file.verdict = verdictOf(known->second);
             keep(file, known->second);
         } else if (result.interrupted) {
@@ -138,6 +140,13 @@ class Scanner {
         result.files.push_back(std::move(file));
     }
 
+    /// Returns whether the stamp of a library that worked earlier does not match. The library does
+    /// not change when libMZcomponentManager is replaced.
+    static bool isForOtherAbi(const Candidate& candidate, const RecordedLibrary& library) {
+        return !library.builders.empty() &&
+               abiDifference(readLibraryImage(candidate.path)).has_value();
+    }
+
     /// Returns whether an unchanged library may have another result now.
     bool isTriedAgain(const RecordedLibrary& library) const {
         if (!library.builders.empty())
@@ -147,6 +156,7 @@ class Scanner {
         switch (library.kept->verdict) {
         case Verdict::dependencyMissing: // It does not change when its dependency arrives.
         case Verdict::loadFailed:        // Nor when the dependency of a dependency does.
+        case Verdict::otherAbi:          // Nor when this library does.
         case Verdict::unreadable:
         case Verdict::probeFailed:
         case Verdict::endUnknown:

@@ -54,7 +54,8 @@ struct ScanResult {
 /// Scans the folders and writes the list. Blocks until the scan has ended.
 ///
 /// Each library is loaded in a child process if it is new, has changed, or failed for a reason that
-/// may have disappeared, such as a missing dependency. Other libraries keep their record.
+/// may have disappeared, such as a missing dependency. Other libraries keep their record. A library
+/// whose stamp names another ABI (`otherAbi`) is not loaded, and loses the builders of its record.
 ///
 /// A library that fails is recorded with its time and size and no builders. A host that reads the
 /// list does not load it until its file changes. The verdict is saved beside the list, in the file

@@ -66,6 +66,10 @@ constexpr Entry entries[] = {
     {Verdict::otherProcessor, "otherProcessor", Severity::fault,
      L"it is a library for another processor: %1",
      L"get the library that was built for this processor"},
+    {Verdict::otherAbi, "otherAbi", Severity::fault,
+     L"it was built for %1, and this libMZcomponentManager for %2, so neither can use objects of "
+     L"the other",
+     L"build it with the compiler, the options and the libMZcomponentManager of its host: %2"},
     {Verdict::damaged, "damaged", Severity::fault, L"it is damaged or truncated: %1",
      L"build or copy it again"},
     {Verdict::entryPointNoFunction, "entryPointNoFunction", Severity::fault,

@@ -38,6 +38,7 @@ enum class Verdict {
     sameName,       ///< its name equals that of another file except for case
     otherSystem,
     otherProcessor,
+    otherAbi, ///< its stamp names another ABI or SOVERSION than that of this library
     damaged,
     entryPointNoFunction, ///< the exported entry point is not a function of this library
     dependencyMissing,

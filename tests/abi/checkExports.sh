@@ -15,7 +15,7 @@ exported() {
     *.windows.txt) "$tool" -p "$library" |
         awk '/\[Ordinal\/Name Pointer\] Table/ {on=1; next} !NF {on=0}
              on && match($0, /\] */) {print $NF}' ;;
-    esac | "$demangler" | grep -E '^(Qr|(.* (for|to) )?Mz::)' | LC_ALL=C sort -u
+    esac | "$demangler" | grep -E '^(Qr|Mz[A-Z]|(.* (for|to) )?Mz::)' | LC_ALL=C sort -u
 }
 
 names=$(exported)

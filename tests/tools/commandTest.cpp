@@ -2,11 +2,14 @@
 /// The command line, as scripts use it.
 #include "tests/tools/toolsFixture.h"
 
+#include "components/componentManager/version.h"
+
 #include <nlohmann/json.hpp>
 
 using namespace Mz;
 using namespace Mz::Tools;
 using namespace Mz::Test;
+using ::testing::AllOf;
 using ::testing::EndsWith;
 using ::testing::HasSubstr;
 using ::testing::StartsWith;
@@ -118,6 +121,33 @@ TEST_F(Command, ListEndsWithOneWhereSomethingIsWrong) {
     EXPECT_EQ(run({"list", "--path", path()}).exitCode, 0);
     add(L"missesDependency", "a");
     EXPECT_EQ(json(1, {"list"}).at("files").at(0).at("verdict"), "dependencyMissing");
+}
+
+TEST_F(Command, NamesBothSidesOfALibraryForAnotherAbi) {
+    const std::string file = add(L"stampedOtherVersion", "a").string();
+    add(L"stampedNewer", "b");
+    const std::string theirs = "SOVERSION " + std::to_string(MZ_SOVERSION + 1) + " (version";
+    const std::string ours = "SOVERSION " + std::to_string(MZ_SOVERSION) + " (version";
+    const auto expect = [&](const Json& files) {
+        EXPECT_EQ(files.at(0).at("verdict"), "otherAbi");
+        EXPECT_THAT(files.at(0).at("sentence").get<std::string>(),
+                    AllOf(HasSubstr(theirs), HasSubstr(ours)));
+        EXPECT_THAT(files.at(0).at("cure").get<std::string>(), HasSubstr(ours));
+    };
+    expect(json(1, {"explain", file}).at("files"));
+    expect(json(1, {"explain", "--load", file}).at("files"));
+    for (const char* command : {"scan", "list"}) {
+        const Json files = json(1, {command, "--cache", inWork("list")}).at("files");
+        expect(files);
+        EXPECT_EQ(files.at(1).at("verdict"),
+                  std::string(command) == "scan" ? "works" : "component");
+        const std::string text = run({command, "--path", path(), "--cache", inWork("list")}).output;
+        EXPECT_THAT(text, StartsWith("otherAbi "));
+        EXPECT_THAT(text, AllOf(HasSubstr(theirs), HasSubstr(ours)));
+    }
+    const std::string text = run({"explain", file}).output;
+    EXPECT_THAT(text, AllOf(HasSubstr(": otherAbi\n"), HasSubstr(theirs), HasSubstr(ours),
+                            HasSubstr("\n    cure: build it with ")));
 }
 
 TEST_F(Command, ExplainTellsTheCureAndWhatIsNeeded) {

@@ -70,6 +70,30 @@ TEST_F(Explain, TellsALibraryWithoutTheEntryPointOrWithAnotherThingOfThatName) {
     EXPECT_EQ(verdictOn(add(L"entryPointInDependency")), Verdict::noEntryPoint);
 }
 
+TEST_F(Explain, TellsALibraryThatWasBuiltForAnotherAbi) {
+    for (const wchar_t* name :
+         {L"stampedOtherVersion", L"stampedOtherCxxAbi", L"stampedOtherStrings",
+          L"stampedOtherDebug", L"stampedOtherWideChar", L"kitOldStrings", L"kitDebugContainers"}) {
+        const Explanation explanation = loaded(add(name));
+        EXPECT_EQ(explanation.verdict.verdict, Verdict::otherAbi) << nameOf(verdictOn(add(name)));
+        EXPECT_EQ(explanation.verdict, explainFile(add(name)).verdict);
+        EXPECT_THAT(sentenceOf(explanation.verdict), HasSubstr(explanation.verdict.subject));
+        EXPECT_THAT(sentenceOf(explanation.verdict), HasSubstr(explanation.verdict.words));
+        EXPECT_THAT(explanation.builders, IsEmpty()) << "it is not loaded";
+        EXPECT_THAT(explanation.dependencies, Not(IsEmpty()));
+    }
+    EXPECT_EQ(explainFile(add(L"kitOldStrings")).verdict.subject,
+              L"libstdc++ with _GLIBCXX_USE_CXX11_ABI=0");
+    EXPECT_EQ(explainFile(add(L"kitDebugContainers")).verdict.subject,
+              L"containers in debug mode (_GLIBCXX_DEBUG)");
+}
+
+TEST_F(Explain, JudgesALibraryWithAFittingStampOrWithoutOneByLoadingIt) {
+    for (const wchar_t* name : {L"goodWithKit", L"stamped", L"stampedNewer", L"stampedOtherLayout",
+                                L"stampedNoMagic", L"goodByHand"})
+        EXPECT_EQ(loadedVerdict(name).verdict, Verdict::works) << std::filesystem::path(name);
+}
+
 TEST_F(Explain, TellsALibraryThatWasCutOff) {
     const std::string content = contentOf(builtComponent(L"goodByHand"));
     EXPECT_EQ(verdictOn(folder.write("cut", content.substr(0, content.size() / 2))),

@@ -47,8 +47,8 @@ Word gnuHash(const std::string& name) {
 } // namespace
 
 std::string elfLibrary(const ImageTraits& traits) {
-    constexpr std::size_t segments = 0x40, strings = 0x100, symbols = 0x180, hash = 0x1C0,
-                          dynamic = 0x200, sections = 0x2C0, size = 0x300;
+    constexpr std::size_t segments = 0x40, strings = 0x100, symbols = 0x150, hash = 0x1C0,
+                          dynamic = 0x200, sections = 0x2C0, size = elfPlaces.fileEnd;
     Bytes bytes(size);
     bytes.put(0, std::string("\177ELF\2\1\1", 7));
     bytes.row<Half>(16, {3, static_cast<Half>(traits.arm ? 183 : 62)});
@@ -57,13 +57,17 @@ std::string elfLibrary(const ImageTraits& traits) {
     // The first segment maps the whole file at its own offsets. The second one is the dynamic
     // section.
     bytes.row<Word>(segments, {1, 5});
-    bytes.row<Long>(segments + 8, {0, 0, 0, size, size, 4096});
+    bytes.row<Long>(segments + 8, {0, 0, 0, size, elfPlaces.memoryEnd, 4096});
     bytes.row<Word>(segments + 56, {2, 4});
     bytes.row<Long>(segments + 56 + 8, {dynamic, dynamic, dynamic, 0xA0, 0xA0, 8});
-    const std::string text = std::string("\0first.lib\0second.lib\0", 22) + traits.entryPoint;
+    std::string text("\0first.lib\0second.lib\0", 22);
+    if (traits.stamp)
+        text += traits.stampName + std::string(1, '\0');
+    const auto entryPointPlace = static_cast<Word>(text.size());
+    text += traits.entryPoint;
     bytes.put(strings, text);
     // Symbol 1 is the entry point: a global function or a global object, in section 1.
-    bytes.put<Word>(symbols + 24, 22);
+    bytes.put<Word>(symbols + 24, entryPointPlace);
     bytes.put<unsigned char>(symbols + 28,
                              static_cast<unsigned char>(traits.function ? 0x12 : 0x11));
     bytes.put<Half>(symbols + 30, 1);
@@ -72,6 +76,16 @@ std::string elfLibrary(const ImageTraits& traits) {
     bytes.row<Word>(hash, {1, 1, 1, 0});
     bytes.put<Long>(hash + 16, ~Long{0});
     bytes.row<Word>(hash + 24, {1, gnuHash(traits.entryPoint) | 1});
+    if (traits.stamp) {
+        // Symbol 2, at the end of the bucket.
+        bytes.put<Word>(symbols + 48, 22);
+        bytes.put(symbols + 52, traits.stampType);
+        bytes.put<Half>(symbols + 54, traits.stampSection);
+        bytes.put<Long>(symbols + 56, traits.stampAddress ? traits.stampAddress : elfPlaces.stamp);
+        bytes.row<Word>(hash + 28,
+                        {gnuHash(traits.entryPoint) & ~Word{1}, gnuHash(traits.stampName) | 1});
+        bytes.put(elfPlaces.stamp, *traits.stamp);
+    }
     bytes.row<Long>(dynamic, {1, 1, 1, 11, 5, strings, 10, text.size() + 1, 6, symbols, 0x6FFFFEF5,
                               hash, 0x6FFFFFFB, traits.program ? Long{0x08000000} : 0, 0, 0});
     return bytes.content;
@@ -96,13 +110,26 @@ std::string peLibrary(const ImageTraits& traits) {
     bytes.row<Word>(table + 8, {0x200, codeAddress, 0x200, code});
     bytes.put<Word>(table + 36, 0x60000020);
     bytes.put(table + 40, std::string(".data"));
-    bytes.row<Word>(table + 48, {0x200, dataAddress, 0x200, data});
+    bytes.row<Word>(table + 48, {static_cast<Word>(pePlaces.memoryEnd) - dataAddress, dataAddress,
+                                 0x200, data});
     bytes.put<Word>(table + 76, 0xC0000040);
     // One export: its address, its name and its ordinal.
     bytes.row<Word>(data, {0, 0, 0, dataAddress + 0x60, 1, 1, 1, dataAddress + 0x28,
                            dataAddress + 0x2C, dataAddress + 0x30});
     bytes.row<Word>(data + 0x28,
                     {traits.function ? codeAddress : dataAddress + 0x1F0, dataAddress + 0x38});
+    if (traits.stamp) {
+        // Two exports, whose tables are behind the library's name. The names are sorted.
+        bytes.row<Word>(data + 20,
+                        {2, 2, dataAddress + 0x6C, dataAddress + 0x74, dataAddress + 0x7C});
+        bytes.row<Word>(data + 0x6C, {static_cast<Word>(traits.stampAddress ? traits.stampAddress
+                                                                            : pePlaces.stamp),
+                                      traits.function ? codeAddress : dataAddress + 0x1F0,
+                                      dataAddress + 0x130, dataAddress + 0x38});
+        bytes.row<Half>(data + 0x7C, {0, 1});
+        bytes.put(data + 0x130, std::string(traits.stampName));
+        bytes.put(data + pePlaces.stamp - dataAddress, *traits.stamp);
+    }
     bytes.put(data + 0x38, std::string(traits.entryPoint));
     bytes.put(data + 0x60, std::string("image.dll"));
     bytes.row<Word>(data + 0x80, {0, 0, 0, dataAddress + 0x100, 0});

@@ -127,6 +127,40 @@ TEST_F(Scan, WritesWhatTheManagerItselfWouldWrite) {
     EXPECT_EQ(runHost(folder.path()), "1 builders, 0 mapped, no word\n1 made\n");
 }
 
+TEST_F(Scan, RecordsALibraryForAnotherAbiSoThatNoHostLoadsIt) {
+    const auto file = add(L"stampedOtherVersion");
+    add(L"goodWithKit");
+    // The second scan reads the stamp again: libMZcomponentManager may be another one then.
+    for (int round = 0; round < 2; ++round) {
+        const ScanResult result = scan(options());
+        EXPECT_EQ(verdicts(result)[file.filename().string()], Verdict::otherAbi);
+        EXPECT_EQ(looked(result), round == 0 ? 2 : 1);
+        const ListReading reading = readRecordedList(list());
+        ASSERT_EQ(reading.libraries.size(), 2u);
+        const RecordedLibrary& recorded = reading.libraries[1];
+        EXPECT_TRUE(recorded.builders.empty());
+        EXPECT_EQ(recorded.size, static_cast<std::int64_t>(std::filesystem::file_size(file)));
+        EXPECT_NE(recorded.time, 0u);
+        ASSERT_TRUE(recorded.kept);
+        EXPECT_EQ(recorded.kept->verdict, Verdict::otherAbi);
+    }
+    EXPECT_EQ(runHost(folder.path()), "1 builders, 0 mapped, no word\n1 made\n");
+}
+
+TEST_F(Scan, DropsTheBuildersOfALibraryThatWasRecordedUnderAnotherAbi) {
+    add(L"stampedOtherVersion");
+    ScanResult first = scan(options());
+    ASSERT_EQ(first.libraries.size(), 1u);
+    // As another version of libMZcomponentManager wrote it.
+    first.libraries[0].builders.push_back({goodUid, L"stamped", L"", L""});
+    first.libraries[0].kept.reset();
+    writeRecordedList(list(), first.libraries);
+    const ScanResult result = scan(options());
+    EXPECT_EQ(result.files[0].verdict.verdict, Verdict::otherAbi);
+    EXPECT_TRUE(result.libraries[0].builders.empty());
+    EXPECT_TRUE(readRecordedList(list()).libraries[0].builders.empty());
+}
+
 TEST_F(Scan, LeavesOutALibraryThatNeedsItsHostSoThatTheHostLoadsIt) {
     const auto file = add(L"takesFromHost");
     add(L"goodWithKit");

@@ -149,10 +149,13 @@ int list(const Common& common) {
     const auto tell = [&](const std::filesystem::path& file, const Tools::Finding& finding,
                           const std::vector<Tools::Finding>& notes) {
         faults = faults || isFault(finding);
-        if (common.json)
+        if (common.json) {
             files.push_back(jsonOfFile(file, finding, notes));
-        else
-            printFile(file, finding, notes);
+            return;
+        }
+        printFile(file, finding, notes);
+        if (finding.verdict == Tools::Verdict::otherAbi)
+            printSentence(finding); // It names both sides.
     };
     for (const Tools::Candidate& candidate : discovery.candidates) {
         // Only the dependencies of component libraries matter; searching them takes time.

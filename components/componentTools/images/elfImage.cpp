@@ -268,6 +268,16 @@ class ElfReader {
         const bool function = type == 0 || type == 2 || type == 10;
         image.entryPoint =
             function ? LibraryImage::EntryPoint::function : LibraryImage::EntryPoint::noFunction;
+        if (const auto stamp = find(stampName); stamp && isData(*stamp))
+            image.stamp = validStamp(readAt<ComponentStamp>(stamp->value));
+    }
+
+    /// Returns whether the symbol's value is the address of an object, or of something without
+    /// type.
+    static bool isData(const Symbol& symbol) {
+        constexpr std::uint16_t firstSpecialSection = 0xFF00;
+        const unsigned int type = symbol.info & 15;
+        return (type == 0 || type == 1) && symbol.section < firstSpecialSection;
     }
 
     /// Returns the exported symbol with that name.

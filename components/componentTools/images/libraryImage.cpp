@@ -45,6 +45,13 @@ std::optional<std::string> FileBytes::text(std::uint64_t offset) {
     return std::nullopt;
 }
 
+std::optional<ComponentStamp> validStamp(const std::optional<ComponentStamp>& stamp) {
+    static constexpr ComponentStamp known MZ_STAMP_VALUE;
+    const bool valid = stamp && std::memcmp(stamp->magic, known.magic, sizeof known.magic) == 0 &&
+                       stamp->layout == known.layout && stamp->size >= known.size;
+    return valid ? stamp : std::nullopt;
+}
+
 LibraryImage readLibraryImage(const std::filesystem::path& path) {
     LibraryImage image;
     FileBytes file(path);

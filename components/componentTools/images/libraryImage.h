@@ -5,6 +5,7 @@
 /// readers do not trust the file: every offset, size and count is checked.
 #pragma once
 
+#include "components/componentManager/componentStamp.h"
 #include "components/platform/fileBlocks.h"
 
 #include <cstdint>
@@ -78,6 +79,8 @@ struct LibraryImage {
     std::vector<std::string> rpath;  ///< DT_RPATH, unexpanded: applies to indirect dependencies too
     std::vector<std::string> runpath; ///< DT_RUNPATH, unexpanded: for direct dependencies
     bool hasManifest = false;         ///< has a manifest, which changes how dependencies are found
+    /// The stamp of a library with the entry point, if it exports a valid one.
+    std::optional<ComponentStamp> stamp;
 };
 
 /// Returns the image of a file, which must be a regular file: opening a pipe would block.
@@ -97,7 +100,11 @@ std::vector<std::string> wantedSymbols(const std::filesystem::path& path);
 /// \return false if the library cannot be read or is damaged
 bool removeDefined(const std::filesystem::path& path, std::set<std::string>& names);
 
-/// The name of the entry point of component libraries.
+/// Returns the stamp if it is one that can be judged: magic number, layout and size are known.
+std::optional<ComponentStamp> validStamp(const std::optional<ComponentStamp>& stamp);
+
+/// The names that component libraries export: the entry point, and the stamp.
 inline constexpr const char* entryPointName = "QrGetComponentDescription";
+inline constexpr const char* stampName = "MzComponentStamp";
 
 } // namespace Mz::Tools

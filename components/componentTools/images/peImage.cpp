@@ -217,58 +217,85 @@ class PeReader {
         return true;
     }
 
-    void findEntryPoint() {
-        const Directory directoryOfExports = directory(exportDirectory);
-        if (!directoryOfExports.address)
-            return;
-        const auto exports = readAt<Exports>(directoryOfExports.address);
+    /// The exports, if the file has any and their tables are in it. Tables that lead out of the
+    /// file are a fault, unless they are empty.
+    std::optional<Exports> readExports(const Directory& place) {
+        if (!place.address)
+            return std::nullopt;
+        const auto exports = readAt<Exports>(place.address);
         if (!exports) {
             damaged(L"the table of exports makes no sense");
-            return;
+            return std::nullopt;
         }
-        if (directoryOfExports.size < sizeof(Exports) ||
-            !offsetOf(directoryOfExports.address, directoryOfExports.size) ||
+        if (place.size < sizeof(Exports) || !offsetOf(place.address, place.size) ||
             !offsetOf(exports->functions, exports->functionCount * 4ull) ||
             !offsetOf(exports->names, exports->nameCount * 4ull) ||
             !offsetOf(exports->ordinals, exports->nameCount * 2ull)) {
             if (exports->nameCount)
                 damaged(L"the table of exports makes no sense");
-            return;
+            return std::nullopt;
         }
-        // The system uses binary search too: in unsorted names it does not find the symbol either.
+        return exports;
+    }
+
+    void findEntryPoint() {
+        const Directory place = directory(exportDirectory);
+        const auto exports = readExports(place);
+        if (!exports)
+            return;
+        const Found entryPoint = find(*exports, entryPointName);
+        if (!entryPoint.sound)
+            damaged(L"the table of exports makes no sense");
+        if (!entryPoint.address)
+            return;
+        judge(*entryPoint.address, place);
+        // The system does not look for this name, so a fault on the way to it is no damage.
+        if (const auto stamp = find(*exports, stampName).address;
+            stamp && !isForwarded(*stamp, place))
+            image.stamp = validStamp(readAt<ComponentStamp>(*stamp));
+    }
+
+    /// The result of a search for an exported name.
+    struct Found {
+        std::optional<std::uint32_t> address; ///< of the symbol; empty if the name is not exported
+        bool sound = true;                    ///< false if the search left the file
+    };
+
+    /// The system uses binary search too: in unsorted names it does not find the symbol either.
+    Found find(const Exports& exports, std::string_view wanted) {
         std::uint32_t first = 0;
-        for (std::uint32_t count = exports->nameCount; count > 0;) {
+        for (std::uint32_t count = exports.nameCount; count > 0;) {
             const std::uint32_t middle = first + (count - 1) / 2;
-            const auto name = readAt<std::uint32_t>(exports->names + middle * 4ull);
-            const auto order = name ? compareWithEntryPoint(*name) : std::nullopt;
-            if (!order) {
-                damaged(L"the table of exports makes no sense");
-                return;
+            const auto name = readAt<std::uint32_t>(exports.names + middle * 4ull);
+            const auto order = name ? compareName(*name, wanted) : std::nullopt;
+            if (!order)
+                return {std::nullopt, false};
+            if (*order == 0) {
+                const auto address = addressOf(exports, middle);
+                return {address, address.has_value()};
             }
-            if (*order == 0)
-                return judgeOrdinal(*exports, middle, directoryOfExports);
             const std::uint32_t before = middle - first;
             first = *order < 0 ? middle + 1 : first;
             count = *order < 0 ? count - before - 1 : before;
         }
+        return {};
     }
 
-    void judgeOrdinal(const Exports& exports, std::uint32_t index, const Directory& directory) {
+    /// Returns the address of the symbol with the name at `index`.
+    std::optional<std::uint32_t> addressOf(const Exports& exports, std::uint32_t index) {
         const auto ordinal = readAt<std::uint16_t>(exports.ordinals + index * 2ull);
-        const auto function = ordinal && *ordinal < exports.functionCount
-                                  ? readAt<std::uint32_t>(exports.functions + *ordinal * 4ull)
-                                  : std::nullopt;
-        if (function)
-            judge(*function, directory);
-        else
-            damaged(L"the table of exports makes no sense");
+        if (!ordinal || *ordinal >= exports.functionCount)
+            return std::nullopt;
+        return readAt<std::uint32_t>(exports.functions + *ordinal * 4ull);
     }
 
-    /// Compares the name at `address` with the entry point's name like `strcmp`; `std::nullopt` if
-    /// the name is truncated before the result is known.
-    std::optional<int> compareWithEntryPoint(std::uint64_t address) {
-        constexpr std::size_t length = std::string_view(entryPointName).size() + 1;
-        char text[length] = {};
+    /// Compares the name at `address` with `wanted` like `strcmp`; `std::nullopt` if the name is
+    /// truncated before the result is known.
+    std::optional<int> compareName(std::uint64_t address, std::string_view wanted) {
+        char text[64] = {};
+        const std::size_t length = wanted.size() + 1;
+        static_assert(std::string_view(entryPointName).size() < sizeof text &&
+                      std::string_view(stampName).size() < sizeof text);
         const Section* section = sectionOf(address);
         const auto offset = offsetOf(address, 1);
         if (!section || !offset)
@@ -278,19 +305,22 @@ class PeReader {
         if (!file.read(*offset, text, present))
             return std::nullopt;
         if (!std::memchr(text, 0, present) && present < length &&
-            std::memcmp(text, entryPointName, present) == 0)
+            std::memcmp(text, wanted.data(), present) == 0)
             return std::nullopt;
-        return std::strncmp(text, entryPointName, length);
+        return std::strncmp(text, wanted.data(), length);
     }
 
     /// An address inside the export table is a forwarder: the name of another library's function.
+    static bool isForwarded(std::uint32_t address, const Directory& exports) {
+        return address >= exports.address && address - exports.address < exports.size;
+    }
+
     void judge(std::uint32_t function, const Directory& exports) {
-        const bool forwarded =
-            function >= exports.address && function - exports.address < exports.size;
         const Section* section = sectionOf(function);
         const bool code = section && (section->flags & executableFlag);
-        image.entryPoint = code && !forwarded ? LibraryImage::EntryPoint::function
-                                              : LibraryImage::EntryPoint::noFunction;
+        image.entryPoint = code && !isForwarded(function, exports)
+                               ? LibraryImage::EntryPoint::function
+                               : LibraryImage::EntryPoint::noFunction;
     }
 
     /// Returns whether there is a manifest that applies to the library: resource 2 of type 24.

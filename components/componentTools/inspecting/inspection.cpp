@@ -5,6 +5,7 @@
 #include "components/componentTools/inspecting/inspection.h"
 
 #include "components/componentManager/nativeText.h"
+#include "components/componentTools/inspecting/abiDifference.h"
 #include "components/componentTools/platform/system.h"
 #include "components/componentTools/recordedList.h"
 #include "components/platform/platform.h"
@@ -56,7 +57,7 @@ Finding judgeImage(const LibraryImage& image) {
     switch (image.entryPoint) {
     case LibraryImage::EntryPoint::absent: return {Verdict::noEntryPoint, {}, {}};
     case LibraryImage::EntryPoint::noFunction: return {Verdict::entryPointNoFunction, {}, {}};
-    default: return {Verdict::component, {}, {}};
+    default: return abiDifference(image).value_or(Finding{Verdict::component, {}, {}});
     }
 }
 
