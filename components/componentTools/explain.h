@@ -49,8 +49,8 @@ struct ExplainOptions {
 /// Explains one file.
 ///
 /// No code of the file runs in this process. Code of the file runs in the child process only if
-/// `options.load` is set, reading the file found a component library, its stamp does not name another
-/// ABI (see `otherAbi`), and it does not import from a program (see `needsHost`).
+/// `options.load` is set, reading the file found a component library, its stamp does not name
+/// another ABI (see `otherAbi`), and it does not import from a program (see `needsHost`).
 ///
 /// Dependencies are searched as the loader would search them in this process. If a library has a
 /// manifest, which changes the loader's rules, none of its dependencies counts as missing.
