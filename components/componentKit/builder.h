@@ -87,12 +87,17 @@ class SelfDescribing : public Casts {
 ///
 /// `Impl` implements `createObject` and the functions of `Ifaces`. Create it with
 /// `Mz::Kit::builder`: the release of the last reference deletes it.
+///
+/// Not made with `Object`: its name would then be found before a class `Object` of the component.
 template <class Impl, class... Ifaces>
 class Builder
-    : public SelfDescribing<Object<Impl, QrBuilderDescription, QrComponentBuilder, Ifaces...>> {
+    : public SelfDescribing<QrCastRef<
+          QrCastHeap<QrCastMulti<Impl, QrBuilderDescription, QrComponentBuilder, Ifaces...>>>> {
+    static_assert(detail::checkInterfaces<Ifaces...>());
+
   public:
-    using SelfDescribing<
-        Object<Impl, QrBuilderDescription, QrComponentBuilder, Ifaces...>>::SelfDescribing;
+    using SelfDescribing<QrCastRef<QrCastHeap<
+        QrCastMulti<Impl, QrBuilderDescription, QrComponentBuilder, Ifaces...>>>>::SelfDescribing;
 };
 
 namespace detail {
