@@ -88,7 +88,9 @@ LibraryImage readLibraryImage(const std::filesystem::path& path);
 /// The parts of `readLibraryImage`. Each fills `image` from a file with the magic number of its
 /// format, and stops at the first fault.
 void readElfImage(FileBytes& file, LibraryImage& image);
+std::vector<std::string> exportedElfNames(FileBytes& file);
 void readPeImage(FileBytes& file, LibraryImage& image);
+std::vector<std::string> exportedPeNames(FileBytes& file);
 
 /// Returns the symbols that other files must define before the ELF library at `path` can be loaded.
 /// Skips weak symbols, which may be undefined, and symbols with a version, which can only come from
@@ -98,6 +100,13 @@ std::vector<std::string> wantedSymbols(const std::filesystem::path& path);
 /// Removes from `names` the symbols that the ELF library at `path` exports.
 /// \return false if the library cannot be read or is damaged
 bool removeDefined(const std::filesystem::path& path, std::set<std::string>& names);
+
+/// Returns the names that the library at `path` exports. Of an ELF library, those of weak symbols
+/// are left out: templates and inline functions of its headers. Empty if it cannot be read.
+std::vector<std::string> exportedNames(const std::filesystem::path& path);
+
+/// Returns whether every component library may export this name.
+bool isComponentExport(const std::string& name);
 
 /// The name of the entry point of component libraries.
 inline constexpr const char* entryPointName = "QrGetComponentDescription";
