@@ -216,6 +216,9 @@ class CheckRun {
             else if (isWanted(finding.rule->id) || fatal)
                 add(finding);
         }
+        for (const std::string& id : report.skipped)
+            if (const CheckRule* rule = findCheckRule(id))
+                result.notRun.push_back(rule);
         if (!report.builders.empty())
             result.builders = report.builders;
         if (child.end == End::interrupted) {

@@ -85,7 +85,7 @@ struct CheckedBuilder {
 struct CheckResult {
     std::filesystem::path file;
     std::vector<CheckFinding> findings;   ///< in the order of `checkRules`
-    std::vector<const CheckRule*> notRun; ///< rules that could not be checked
+    std::vector<const CheckRule*> notRun; ///< rules that were not checked
     std::vector<CheckedBuilder> builders; ///< the builders of the library
     bool interrupted = false;             ///< `options.process.interrupted` stopped the check
 };

@@ -71,6 +71,8 @@ void readMessage(const Json& value, CheckReport& report) {
         readBuilder(value, report);
     } else if (kind == "answer") {
         report.answers[wideAt(value, "key")] = value.at("value").get<std::string>();
+    } else if (kind == "skipped") {
+        report.skipped.push_back(report.rule);
     } else if (kind == "fault") {
         report.fault = wideAt(value, "text");
     } else if (kind == "done") {
@@ -146,6 +148,10 @@ void CheckSender::builder(const CheckedBuilder& builder) {
 
 void CheckSender::answer(const std::wstring& key, const std::string& value) {
     output(messageOf({{"kind", "answer"}, {"key", toUtf8(key)}, {"value", hexOf(value)}}));
+}
+
+void CheckSender::skipped() {
+    output(messageOf({{"kind", "skipped"}}));
 }
 
 void CheckSender::done() {

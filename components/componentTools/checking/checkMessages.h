@@ -60,6 +60,8 @@ class CheckSender {
     void builder(const CheckedBuilder& builder);
     /// Sends one answer of a survey. Keys must differ.
     void answer(const std::wstring& key, const std::string& value);
+    /// Says that the rule that was begun last cannot be checked here.
+    void skipped();
     void done();
 
     /// Returns the message that says how the process is about to end.
@@ -79,6 +81,7 @@ struct CheckReport {
     std::wstring fault; ///< how the process ended, if it knew
     std::vector<CheckFinding> findings;
     std::vector<CheckedBuilder> builders;
+    std::vector<std::string> skipped; ///< rules that cannot be checked
     std::map<std::wstring, std::string> answers;
 };
 

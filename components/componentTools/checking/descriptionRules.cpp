@@ -120,17 +120,17 @@ void answers(CheckContext& context) {
         context.messages().builder({builder.uid, builder.name});
 }
 
-void descriptionCounted(CheckContext& context) {
-    QrGetComponentDescriptionFunction* const entry = context.entryPoint();
-    if (!entry)
-        return;
+namespace {
+
+/// Calls the entry point a few times, as several hosts would. Returns whether references stay.
+bool leavesReferences(CheckContext& context, QrGetComponentDescriptionFunction* entry) {
     long first = 0;
     for (int round = 0; round < 3; ++round) {
         QrCastable* object = nullptr;
         ReferenceCount count;
         bool same = false;
         if (!context.attempt(L"the entry point", {}, [&] { object = entry(); }) || !object)
-            return;
+            return false;
         context.attempt(L"the release of the description", {}, [&] {
             const QrPtr<QrCastable> kept(object);
             const QrPtr<QrCastable> again(entry());
@@ -140,13 +140,25 @@ void descriptionCounted(CheckContext& context) {
         });
         if (round == 0)
             first = count.value;
-        if (count.counted && count.value > (same ? first : 0)) {
-            context.report({}, L"each call of the entry point leaves a reference that nobody "
-                               L"releases. Return a new object without a reference, or one that "
-                               L"the library owns, without taking a reference for the caller.");
-            return;
-        }
+        if (count.counted && count.value > (same ? first : 0))
+            return true;
     }
+    return false;
+}
+
+} // namespace
+
+void descriptionCounted(CheckContext& context) {
+    // Not held: the rules after this one unload the library.
+    std::wstring loaderError;
+    const platform::Module module = context.load(loaderError);
+    QrGetComponentDescriptionFunction* const entry =
+        module ? CheckContext::entryPointOf(module) : nullptr;
+    if (entry && leavesReferences(context, entry))
+        context.report({}, L"each call of the entry point leaves a reference that nobody "
+                           L"releases. Return a new object without a reference, or one that the "
+                           L"library owns, without taking a reference for the caller.");
+    context.attempt(L"unloading the library", {}, [&] { platform::unloadLibrary(module); });
 }
 
 void descriptionStable(CheckContext& context) {

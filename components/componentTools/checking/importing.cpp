@@ -102,6 +102,13 @@ bool ImportTry::import(CheckContext& context) {
     return static_cast<bool>(imported);
 }
 
+void ImportTry::importUnguarded() {
+    if (!importing.builder->canImport(io, path.c_str(), L""))
+        return;
+    restore();
+    static_cast<void>(importing.builder->import(io, path.c_str(), L""));
+}
+
 bool ImportTry::isKept() const {
     return countOf(*io).value > 1;
 }

@@ -45,6 +45,9 @@ class ImportTry {
     /// Calls `import` with the position restored. Returns whether it returned an object.
     bool import(CheckContext& context);
 
+    /// Calls `canImport` and, if it accepts the input, `import`, without the guard of a context.
+    void importUnguarded();
+
     const QrRef<QrCastable>& object() const { return imported; }
     /// Returns whether the builder took references to the input and kept them.
     bool isKept() const;

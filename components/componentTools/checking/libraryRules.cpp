@@ -2,6 +2,7 @@
 /// The rules of the library as a file that is loaded and unloaded.
 #include "components/componentTools/checking/rules.h"
 
+#include "components/componentManager/nativeText.h"
 #include "components/componentTools/checking/growth.h"
 #include "components/componentTools/images/libraryImage.h"
 #include "components/componentTools/platform/resources.h"
@@ -13,15 +14,9 @@ namespace Mz::Tools::Rules {
 
 namespace {
 
-/// Loads the library, uses its description and its builders once, and unloads it. Returns whether
+/// Describes the library and, if wanted, makes an object of each builder. Returns whether
 /// everything could be called.
-bool useOnce(CheckContext& context) {
-    std::wstring loaderError;
-    const platform::Module module = context.load(loaderError);
-    QrGetComponentDescriptionFunction* const entry =
-        module ? CheckContext::entryPointOf(module) : nullptr;
-    if (!entry)
-        return false;
+bool describeOnce(CheckContext& context, QrGetComponentDescriptionFunction* entry, bool objects) {
     DescriptionCollector collector;
     QrPtr<QrComponentDescription> description;
     bool called = context.attempt(L"the entry point", {}, [&] {
@@ -33,17 +28,30 @@ bool useOnce(CheckContext& context) {
     });
     for (const auto& item : collector.items) {
         QrRef<QrCastable> object;
-        called = called && context.attempt(L"createObject", {}, [&] {
+        if (!called || !objects)
+            break;
+        const std::wstring place = placeOf(textOrEmpty(item->getName()), item->getUid());
+        called = context.attempt(L"createObject", place, [&] {
             const QrRef<QrCastable> made = description->createBuilder(item->getUid());
             if (const auto builder = queryCast<QrComponentBuilder>(made.get()))
                 object = builder->createObject();
         });
     }
     collector.items.clear();
-    called = context.attempt(L"the release of the description", {}, [&] { description.reset(); }) &&
-             called;
+    const bool released =
+        context.attempt(L"the release of the description", {}, [&] { description.reset(); });
     if (description)
         static_cast<void>(description.detach()); // Releasing it ended an earlier process.
+    return called && released;
+}
+
+/// Loads the library, describes it, and unloads it. Returns whether everything could be called.
+bool useOnce(CheckContext& context, bool objects) {
+    std::wstring loaderError;
+    const platform::Module module = context.load(loaderError);
+    QrGetComponentDescriptionFunction* const entry =
+        module ? CheckContext::entryPointOf(module) : nullptr;
+    const bool called = entry && describeOnce(context, entry, objects);
     context.attempt(L"unloading the library", {}, [&] { platform::unloadLibrary(module); });
     return called;
 }
@@ -96,21 +104,26 @@ void exports(CheckContext& context) {
 }
 
 void reloads(CheckContext& context) {
-    if (!useOnce(context) || isLoaded(context))
+    if (!useOnce(context, false) || isLoaded(context))
         return;
-    const std::size_t growth = growthOf([&] { static_cast<void>(useOnce(context)); }, 30);
-    if (growth)
+    constexpr int count = 30;
+    const std::size_t growth = growthOf([&] { static_cast<void>(useOnce(context, false)); }, count);
+    if (!growth)
+        return;
+    // A description that leaves memory behind at each call is another fault.
+    QrGetComponentDescriptionFunction* const entry = context.entryPoint();
+    if (entry && !growthOf([&] { describeOnce(context, entry, false); }, count))
         context.report({}, L"each loading and unloading leaves about " + std::to_wstring(growth) +
                                L" bytes behind. Free what static objects and initialisers "
                                L"allocate; MZ_AT_UNLOAD helps.");
 }
 
 void leavesNothing(CheckContext& context) {
-    useOnce(context); // What the system loads once is no business of the library.
+    useOnce(context, true); // What the system loads once is no business of the library.
     const std::size_t threads = System::threadCount(), files = System::openFileCount();
     constexpr int rounds = 3;
     for (int round = 0; round < rounds; ++round)
-        useOnce(context);
+        useOnce(context, true);
     // Threads that are about to end may.
     for (int wait = 0; wait < 50 && System::threadCount() > threads; ++wait)
         std::this_thread::sleep_for(std::chrono::milliseconds(10));

@@ -157,14 +157,16 @@ void roundTrip(CheckContext& context) {
 
 void inPieces(CheckContext& context) {
     forEachStored(context, [&](const StoredObject& stored, const std::string& bytes) {
+        const QrPtr<QrPersistant> whole = newObject(context, stored);
         const QrPtr<QrPersistant> copy = newObject(context, stored);
-        if (!copy || !readsWhole(context, stored, bytes))
+        if (!whole || !copy || !readBytes(context, stored.place, *whole, StoredForm::binary, bytes))
             return;
+        const auto expected = writtenBytes(context, stored.place, *whole, StoredForm::binary);
         const bool read = readBytes(context, stored.place, *copy, StoredForm::binary, bytes,
                                     Supply::pieces, L"in pieces of three bytes");
         const auto again =
             read ? writtenBytes(context, stored.place, *copy, StoredForm::binary) : std::nullopt;
-        if (!read || (again && *again != bytes))
+        if (!read || again != expected)
             context.report(stored.place, L"read fails on input that comes in pieces and has no "
                                          L"positions, like a pipe. Read values in their order, "
                                          L"and do not seek.");

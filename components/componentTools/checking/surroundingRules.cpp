@@ -11,6 +11,7 @@
 #include <array>
 #include <atomic>
 #include <mutex>
+#include <optional>
 #include <thread>
 
 namespace Mz::Tools {
@@ -35,12 +36,15 @@ namespace {
 
 /// Calls the library again and again, each time with one more allocation before the failure.
 /// Whether the call returns or throws is up to the library; it must only survive.
-void callWithLimits(CheckContext& context, const std::wstring& what, const std::wstring& place,
-                    const std::function<void()>& call) {
+/// \param prepare  runs before each call, without the limit
+void callWithLimits(
+    CheckContext& context, const std::wstring& what, const std::wstring& place,
+    const std::function<void()>& call, const std::function<void()>& prepare = [] {}) {
     const AllocationLimit& limit = *allocationLimit();
     constexpr int most = 300;
     for (int allowed = 0; allowed < most; ++allowed) {
         bool reached = false;
+        prepare();
         context.attempt(
             what, place,
             [&] {
@@ -65,7 +69,9 @@ void callWithLimits(CheckContext& context, const std::wstring& what, const std::
 
 void failingAllocations(CheckContext& context) {
     QrComponentDescription* const description = context.description();
-    if (!description || !allocationLimit())
+    if (!allocationLimit())
+        return context.messages().skipped();
+    if (!description)
         return;
     for (const DescribedBuilder& described : context.builders()) {
         const QrPtr<QrComponentBuilder> builder = context.builder(described);
@@ -78,25 +84,20 @@ void failingAllocations(CheckContext& context) {
     }
     const CheckInputs inputs(context.task().seed, context.task().samples);
     for (const ImportingBuilder& importing : importBuilders(context)) {
-        std::istringstream text(inputs.at(0).bytes);
-        callWithLimits(context, L"import without memory", importing.described->place, [&] {
-            CheckController controller;
-            text.clear();
-            text.seekg(0);
-            QrInBuffer input(&text);
-            const std::wstring path = L"check." + importing.extension;
-            if (importing.builder->canImport(&input, path.c_str(), L"")) {
-                text.clear();
-                text.seekg(0);
-                static_cast<void>(importing.builder->import(&input, path.c_str(), L""));
-            }
-        });
+        CheckController controller;
+        std::optional<ImportTry> attempt;
+        callWithLimits(
+            context, L"import without memory", importing.described->place,
+            [&] { attempt->importUnguarded(); },
+            [&] { attempt.emplace(importing, inputs.at(0), 0); });
     }
 }
 
 void fromThreads(CheckContext& context) {
     QrComponentDescription* const description = context.description();
-    if (!description || !context.task().threadSafe)
+    if (!context.task().threadSafe)
+        return context.messages().skipped();
+    if (!description)
         return;
     for (const DescribedBuilder& described : context.builders()) {
         const QrPtr<QrComponentBuilder> builder = context.builder(described);
