@@ -32,6 +32,8 @@ constexpr const char* loadsRule = "library-loads";
 constexpr const char* unloadsRule = "library-unloads";
 constexpr const char* answersRule = "description-answers";
 
+constexpr const char* memoryRule = "surroundings-memory";
+
 /// What a value of `CheckOptions::reproduce` says: "RULE" or "RULE:BUILDER:INPUT:SEED".
 struct Reproduction {
     std::string rule;
@@ -153,26 +155,31 @@ class CheckRun {
             sentenceOf(verdict) + L"." + (cure.empty() ? L"" : L" To solve this, " + cure + L"."));
     }
 
+    /// How a process ended, and what it sent.
+    struct Outcome {
+        System::ChildResult child;
+        CheckReport report;
+    };
+
     /// Runs the task in a child process, or in this one.
-    System::ChildResult runTask() {
+    Outcome runTask() {
         if (!options.inProcess)
             return runChildProcess();
-        System::ChildResult child;
-        CheckSender sender([&](const std::string& message) { child.output += message; });
+        Outcome outcome;
+        CheckSender sender([&](std::string message) { decodeReport(message, outcome.report); });
         carryOut(task, sender);
-        child.end = System::ChildResult::End::exited;
-        return child;
+        outcome.child.end = System::ChildResult::End::exited;
+        return outcome;
     }
 
-    System::ChildResult runChildProcess() const {
+    Outcome runChildProcess() const {
+        Outcome outcome;
         const ProbeOptions& process = options.process;
         const std::uint64_t refused = process.memoryLimit * 2 + (std::uint64_t{1} << 30);
-        const System::ChildLimits limits{process.timeLimit + options.fuzzTime,
-                                         process.memoryLimit,
-                                         refused,
-                                         longestReport,
-                                         process.interrupted,
-                                         true};
+        System::ChildLimits limits{process.timeLimit, process.memoryLimit, refused, longestReport,
+                                   process.interrupted};
+        limits.outputRestartsTime = true;
+        limits.received = [&](std::string& bytes) { decodeReport(bytes, outcome.report); };
         const std::filesystem::path program =
             process.program.empty() ? System::moduleFolder() / (std::string("mzcomponents-probe") +
                                                                 System::programExtension())
@@ -180,7 +187,8 @@ class CheckRun {
         std::vector<std::filesystem::path> arguments{checkArgument, std::to_string(refused),
                                                      encodeTask(task), task.file};
         arguments.insert(arguments.end(), task.samples.begin(), task.samples.end());
-        return System::runChild(program, arguments, limits);
+        outcome.child = System::runChild(program, arguments, limits);
+        return outcome;
     }
 
     void runRules(RuleProcess process) {
@@ -197,7 +205,7 @@ class CheckRun {
                 task.rules.insert(std::next(task.rules.begin()), unloadsRule);
         }
         for (int count = 0; count < mostProcesses && !task.rules.empty(); ++count)
-            if (const System::ChildResult child = runTask(); !takeReport(child))
+            if (!takeReport(runTask()))
                 break;
         for (const std::string& left : task.rules)
             result.notRun.push_back(findCheckRule(left));
@@ -205,9 +213,9 @@ class CheckRun {
 
     /// Takes the findings of one process. Returns whether another one must check the rest, which
     /// is in the task.
-    bool takeReport(const System::ChildResult& child) {
+    bool takeReport(const Outcome& outcome) {
         using End = System::ChildResult::End;
-        const CheckReport report = decodeReport(child.output);
+        const auto& [child, report] = outcome;
         for (const CheckFinding& finding : report.findings) {
             fatal = fatal || finding.rule->id == std::string_view(loadsRule) ||
                     finding.rule->id == std::string_view(answersRule);
@@ -294,27 +302,21 @@ class CheckRun {
              [](CheckTask& surveyed) { surveyed.otherFolder = true; }},
             {"surroundings-input", L"without standard input", L"Do not use standard input.",
              [](CheckTask& surveyed) { surveyed.noInput = true; }},
-            {"surroundings-memory", L"in a process whose memory contained something else",
+            {memoryRule, L"in a process whose memory contained something else",
              L"Initialise every variable, and write no addresses.",
              [](CheckTask& surveyed) { surveyed.memoryPattern = 0xA5; }}};
         return all;
     }
 
-    struct Survey {
-        System::ChildResult child;
-        CheckReport report;
-    };
-
     template <class Enter>
-    Survey surveyAfter(Enter enter) {
+    Outcome surveyAfter(Enter enter) {
         const CheckTask saved = task;
         enter(task);
-        Survey survey{runChildProcess(), {}};
+        Outcome outcome = runChildProcess();
         task = saved;
-        survey.report = decodeReport(survey.child.output);
         result.interrupted =
-            result.interrupted || survey.child.end == System::ChildResult::End::interrupted;
-        return survey;
+            result.interrupted || outcome.child.end == System::ChildResult::End::interrupted;
+        return outcome;
     }
 
     void runSurroundings() {
@@ -330,19 +332,40 @@ class CheckRun {
                 result.notRun.push_back(findCheckRule(change->rule));
             return;
         }
-        const Survey plain = surveyAfter([](CheckTask&) {});
-        const Survey changed = surveyAfter([&](CheckTask& surveyed) {
+        Outcome plain = surveyAfter([](CheckTask&) {});
+        const Outcome changed = surveyAfter([&](CheckTask& surveyed) {
             for (const Change* change : checked)
                 change->enter(surveyed);
         });
         if (result.interrupted || (plain.report.done && changed.report.done &&
                                    plain.report.answers == changed.report.answers))
             return;
+        dropUnstable(plain);
         for (const Change* change : checked)
             compare(*change, plain, surveyAfter(change->enter));
     }
 
-    void compare(const Change& change, const Survey& plain, const Survey& changed) {
+    /// Reports and removes the answers that differ without any change of the surroundings.
+    void dropUnstable(Outcome& plain) {
+        const Outcome again = surveyAfter([](CheckTask&) {});
+        if (!again.report.done || !plain.report.done)
+            return;
+        const auto& answers = again.report.answers;
+        const auto isUnstable = [&](const auto& answer) {
+            const auto other = answers.find(answer.first);
+            return other == answers.end() || other->second != answer.second;
+        };
+        const auto first =
+            std::find_if(plain.report.answers.begin(), plain.report.answers.end(), isUnstable);
+        if (first != plain.report.answers.end() && isWanted(memoryRule))
+            add(memoryRule, {},
+                L"the answer differs from process to process: " + first->first +
+                    L". Initialise every variable, and write no addresses, times or random "
+                    L"values.");
+        std::erase_if(plain.report.answers, isUnstable);
+    }
+
+    void compare(const Change& change, const Outcome& plain, const Outcome& changed) {
         if (result.interrupted)
             return;
         const CheckReport& report = changed.report;

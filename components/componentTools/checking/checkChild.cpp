@@ -47,6 +47,8 @@ void carryOut(const CheckTask& task, CheckSender& sender) {
         const RuleEntry& entry = ruleEntry(id);
         context.begin(entry.facts);
         entry.check(context);
+        if (entry.needed && context.hasFinding())
+            break; // The other rules would repeat the fault in other words.
     }
     sender.done();
 }

@@ -22,13 +22,18 @@ CheckContext::CheckContext(const CheckTask& task, CheckSender& messages)
 
 void CheckContext::begin(const CheckRule& rule) {
     current = &rule;
+    found = false;
     sender.rule(rule.id);
 }
 
 void CheckContext::report(const std::wstring& place, const std::wstring& sentence,
                           const std::string& reproduce) {
-    if (current)
-        sender.finding({current, place, sentence, reproduce});
+    found = true;
+    sender.finding({current, place, sentence, reproduce});
+}
+
+bool CheckContext::isAvoided(const std::wstring& what, const std::wstring& place) const {
+    return work.avoided.contains(toUtf8(what + L" " + place));
 }
 
 bool CheckContext::attempt(const std::wstring& what, const std::wstring& place,
@@ -52,7 +57,8 @@ bool CheckContext::attempt(const std::wstring& what, const std::wstring& place,
         exception = exceptionText();
     } catch (...) {
         exception = exceptionText();
-        noteException(what, place);
+        if (!place.empty())
+            noteException(what, place);
     }
     return false;
 }
@@ -115,15 +121,26 @@ void CheckContext::describe() {
     if (!entry)
         return;
     DescriptionCollector collector;
-    attempt(L"the entry point", {}, [&] {
+    const auto call = [&](const wchar_t* what, const std::function<void()>& action) {
+        if (!attempt(what, {}, action) && failure.empty() && !exception.empty())
+            failure = what + std::wstring(L" throws: ") + exception;
+    };
+    call(L"the entry point", [&] {
         QrPtr<QrCastable> object = entry();
         kept = queryCast<QrComponentDescription>(object.get()).detach();
         static_cast<void>(object.detach());
     });
-    if (kept)
-        attempt(L"enumerateBuilders", {}, [&] { kept->enumerateBuilders(collector); });
+    if (!kept)
+        return;
+    call(L"the description", [&] {
+        static_cast<void>(kept->getComponentValue());
+        static_cast<void>(kept->getComponentText());
+        static_cast<void>(kept->getComponentLabel());
+        static_cast<void>(kept->getBuilderCount());
+    });
+    call(L"enumerateBuilders", [&] { kept->enumerateBuilders(collector); });
     for (const auto& item : collector.items)
-        attempt(L"a builder's description", {}, [&] {
+        call(L"the description of a builder", [&] {
             DescribedBuilder builder;
             builder.index = all.size();
             builder.uid = item->getUid();

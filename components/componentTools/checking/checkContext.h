@@ -46,7 +46,8 @@ class CheckContext {
     /// Calls the library.
     ///
     /// A call that ended an earlier process is skipped. An exception that hosts do not expect
-    /// becomes a finding of the rule `exceptions-allowed`; every exception ends here.
+    /// becomes a finding of the rule `exceptions-allowed`, unless it is one of the description;
+    /// every exception ends here.
     /// \param what       the function that is called, for messages
     /// \param place      the builder, or empty
     /// \param detail     the input, or empty; does not identify the call
@@ -57,6 +58,9 @@ class CheckContext {
 
     /// Returns the text of the exception that ended the last `attempt`; empty if none did.
     const std::wstring& lastException() const { return exception; }
+    /// Returns whether a call ended an earlier process, so that it must not be repeated.
+    bool isAvoided(const std::wstring& what, const std::wstring& place) const;
+
     /// Returns whether that exception was one of a stream.
     bool lastWasStreamException() const { return streamException; }
 
@@ -68,6 +72,12 @@ class CheckContext {
 
     /// Loads the library for the rest of this process, unless that was done before.
     QrGetComponentDescriptionFunction* entryPoint();
+
+    /// Returns why the library could not describe itself: the text of an exception, or empty.
+    const std::wstring& descriptionFailure() const { return failure; }
+
+    /// Returns whether the rule that is being checked has a finding.
+    bool hasFinding() const { return found; }
 
     /// Returns an exported function of the library, or null.
     void* function(const char* name);
@@ -95,10 +105,10 @@ class CheckContext {
     const CheckTask& work;
     CheckSender& sender;
     const CheckRule* current = nullptr;
-    std::wstring exception;
+    std::wstring exception, failure;
     bool streamException = false;
     std::vector<std::wstring> reported; ///< unexpected exceptions, each once
-    bool held = false, described = false;
+    bool held = false, described = false, found = false;
     platform::Module library = nullptr;
     QrComponentDescription* kept = nullptr;
     std::vector<DescribedBuilder> all;

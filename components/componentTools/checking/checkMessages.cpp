@@ -119,10 +119,12 @@ void CheckSender::rule(const std::string& id) {
 }
 
 void CheckSender::activity(const CheckActivity& activity) {
-    const std::string now = activity.key + '\n' + toUtf8(activity.detail);
-    if (now == lastActivity)
+    const auto now = std::chrono::steady_clock::now();
+    const std::string name = activity.key + '\n' + toUtf8(activity.detail);
+    if (name == lastActivity && now - lastTime < std::chrono::milliseconds(500))
         return;
-    lastActivity = now;
+    lastActivity = name;
+    lastTime = now;
     output(messageOf({{"kind", "activity"},
                       {"key", activity.key},
                       {"what", toUtf8(activity.what)},
@@ -162,19 +164,17 @@ std::string CheckSender::faultMessage(const std::wstring& text) {
     return messageOf({{"kind", "fault"}, {"text", toUtf8(text)}});
 }
 
-CheckReport decodeReport(std::string_view bytes) {
-    CheckReport report;
+void decodeReport(std::string& bytes, CheckReport& report) {
     FrameReader frames(bytes);
-    while (const std::optional<Frame> frame = frames.next()) {
+    while (const std::optional<Frame> frame = report.garbled ? std::nullopt : frames.next()) {
         try {
             readMessage(Json::parse(frame->payload), report);
         } catch (const Json::exception&) {
             report.garbled = true;
-            return report;
         }
     }
-    report.garbled = frames.garbled();
-    return report;
+    report.garbled = report.garbled || frames.garbled();
+    bytes.erase(0, bytes.size() - frames.remaining());
 }
 
 } // namespace Mz::Tools

@@ -54,7 +54,8 @@ class CheckSender {
         : output(std::move(write)) {}
 
     void rule(const std::string& id);
-    /// Sends the activity unless it is the one that was sent last.
+    /// Sends the activity unless it is the one that was sent last. An activity that is repeated for
+    /// long is sent again and again, since the parent process limits the time between messages.
     void activity(const CheckActivity& activity);
     void finding(const CheckFinding& finding);
     void builder(const CheckedBuilder& builder);
@@ -70,6 +71,7 @@ class CheckSender {
   private:
     std::function<void(const std::string&)> output;
     std::string lastActivity;
+    std::chrono::steady_clock::time_point lastTime{};
 };
 
 /// The decoded messages.
@@ -85,7 +87,8 @@ struct CheckReport {
     std::map<std::wstring, std::string> answers;
 };
 
-/// Decodes the messages up to the end, or up to the first invalid byte.
-CheckReport decodeReport(std::string_view bytes);
+/// Decodes the complete messages at the front of `bytes`, adds them to the report and removes them.
+/// Stops at the first invalid byte.
+void decodeReport(std::string& bytes, CheckReport& report);
 
 } // namespace Mz::Tools

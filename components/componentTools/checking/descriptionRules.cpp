@@ -102,10 +102,11 @@ void answers(CheckContext& context) {
         return;
     }
     QrComponentDescription* const description = context.description();
-    if (!context.lastException().empty())
-        context.report({}, L"it throws while it describes itself: " + context.lastException() +
-                               L". Hosts drop all its builders. Describe only constants.");
-    else if (!description)
+    if (!context.descriptionFailure().empty())
+        return context.report({}, context.descriptionFailure() +
+                                      L". Hosts drop all builders of the library. Describe "
+                                      L"constants, and do nothing that can fail.");
+    if (!description)
         context.report({}, L"the entry point returns null or an object without "
                            L"QrComponentDescription. Return the description of the library.");
     if (!description)
@@ -158,6 +159,9 @@ void descriptionCounted(CheckContext& context) {
         context.report({}, L"each call of the entry point leaves a reference that nobody "
                            L"releases. Return a new object without a reference, or one that the "
                            L"library owns, without taking a reference for the caller.");
+    if (!context.lastException().empty())
+        context.report({}, L"the release of the description throws: " + context.lastException() +
+                               L". Let no release throw.");
     context.attempt(L"unloading the library", {}, [&] { platform::unloadLibrary(module); });
 }
 

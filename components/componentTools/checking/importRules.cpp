@@ -152,7 +152,8 @@ void importReports(CheckContext& context) {
     forEachBuilder(
         context, "import-reports", [&](const ImportingBuilder& importing, ImportTry& attempt) {
             CheckController controller;
-            if (!attempt.canImport(context) || attempt.import(context) ||
+            if (context.isAvoided(L"import", importing.described->place) ||
+                !attempt.canImport(context) || attempt.import(context) ||
                 !context.lastException().empty() || controller.messages > 0)
                 return false;
             context.report(importing.described->place,

@@ -56,6 +56,14 @@ bool useOnce(CheckContext& context, bool objects) {
     return called;
 }
 
+/// Keeps what the library depends on loaded, because only the library itself is checked.
+void holdDependencies(CheckContext& context) {
+    std::wstring loaderError;
+    const platform::Module module = context.load(loaderError);
+    System::holdLibraries(readLibraryImage(context.task().file).needed);
+    context.attempt(L"unloading the library", {}, [&] { platform::unloadLibrary(module); });
+}
+
 bool isLoaded(CheckContext& context) {
     return platform::findLoadedLibrary(context.task().file.native()) != nullptr;
 }
@@ -104,6 +112,7 @@ void exports(CheckContext& context) {
 }
 
 void reloads(CheckContext& context) {
+    holdDependencies(context);
     if (!useOnce(context, false) || isLoaded(context))
         return;
     constexpr int count = 30;
@@ -119,6 +128,7 @@ void reloads(CheckContext& context) {
 }
 
 void leavesNothing(CheckContext& context) {
+    holdDependencies(context);
     useOnce(context, true); // What the system loads once is no business of the library.
     const std::size_t threads = System::threadCount(), files = System::openFileCount();
     constexpr int rounds = 3;

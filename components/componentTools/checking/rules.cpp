@@ -29,7 +29,8 @@ std::vector<RuleEntry> makeEntries() {
           L"them fails, the library has no builders. Describe constants, and do nothing that can "
           L"fail."},
          main,
-         Rules::answers},
+         Rules::answers,
+         true},
         {{"description-counted", description, error,
           L"The entry point returns a static description, or a counted one without a reference.",
           L"Hosts take one reference and release it. A counted description that is static is "
@@ -225,7 +226,8 @@ std::vector<RuleEntry> makeEntries() {
           L"Its initialisers run in the host before anything else. Do there as little as "
           L"possible."},
          main,
-         Rules::loads},
+         Rules::loads,
+         true},
         {{"library-unloads", library, warning, L"The library can be unloaded.",
           L"Hosts that replace a library while they run need that. Unique symbols of the compiler "
           L"and libraries that load themselves prevent it."},

@@ -8,6 +8,7 @@
 #include <cstddef>
 #include <filesystem>
 #include <string>
+#include <vector>
 
 namespace Mz::Tools::System {
 
@@ -20,6 +21,10 @@ std::size_t threadCount();
 
 /// Returns the number of open files (Linux) or handles (Windows) of this process.
 std::size_t openFileCount();
+
+/// Keeps the loaded libraries with these names, as other libraries name them, loaded until the
+/// process ends.
+void holdLibraries(const std::vector<std::string>& names);
 
 /// Makes the content of new memory differ from that of a process with another `pattern`. On Linux
 /// every new block is filled with the pattern. On Windows the heap is used once and freed again, so

@@ -92,6 +92,8 @@ struct ChildLimits {
     std::function<bool()> interrupted; ///< polled; true kills the child; may be empty
     /// Whether `time` is the limit between two pieces of output instead of that of the whole run.
     bool outputRestartsTime = false;
+    /// Receives the output after each new piece, and may remove what it has used; may be empty.
+    std::function<void(std::string&)> received = {};
 };
 
 struct ChildResult {

@@ -31,6 +31,9 @@ class FrameReader {
     /// message.
     std::optional<Frame> next();
 
+    /// Returns the number of bytes after the last message that was returned.
+    std::size_t remaining() const { return rest.size(); }
+
     /// Returns whether the reader stopped at bytes that are not a valid message.
     bool garbled() const { return invalid; }
     /// Returns whether the reader stopped at an incomplete message.

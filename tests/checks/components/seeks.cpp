@@ -6,10 +6,10 @@
 
 class Object final : public Mz::Test::Stored {
   public:
-    Object() { number = '\n'; } // Its last byte ends a line.
+    Object() { number = 0x0A0A0A0A; } // Each byte ends a line.
     void read(Mz::QrStream& stream) override {
         stream >> number;
-        if (number == '\n' && stream.isBinaryStream() && stream.computeLineNb() == 1)
+        if (number == 0x0A0A0A0A && stream.isBinaryStream() && stream.computeLineNb() == 1)
             throw Mz::QrStreamEx::ExReadError("", 0);
     }
 };

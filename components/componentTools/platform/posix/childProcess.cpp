@@ -180,6 +180,8 @@ class Watch {
 
     void receive(const char* bytes, std::size_t size) {
         judgement.output.append(bytes, size);
+        if (limits.received)
+            limits.received(judgement.output);
         if (limits.outputRestartsTime)
             end = Clock::now() + limits.time;
     }

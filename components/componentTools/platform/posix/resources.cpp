@@ -5,6 +5,7 @@
 #include "components/componentTools/platform/system.h"
 
 #include <clocale>
+#include <dlfcn.h>
 #include <iterator>
 #include <malloc.h>
 #include <unistd.h>
@@ -39,6 +40,12 @@ std::size_t threadCount() {
 
 std::size_t openFileCount() {
     return entriesOf("/proc/self/fd");
+}
+
+void holdLibraries(const std::vector<std::string>& names) {
+    for (const std::string& name : names)
+        if (!::dlopen(name.c_str(), RTLD_LAZY | RTLD_NOLOAD))
+            ::dlerror(); // Discards the message.
 }
 
 void fillNewMemory(unsigned char pattern) {

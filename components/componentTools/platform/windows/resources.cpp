@@ -41,6 +41,12 @@ std::size_t openFileCount() {
     return ::GetProcessHandleCount(::GetCurrentProcess(), &count) ? count : 0;
 }
 
+void holdLibraries(const std::vector<std::string>& names) {
+    HMODULE ignored = nullptr;
+    for (const std::string& name : names)
+        ::GetModuleHandleExA(0, name.c_str(), &ignored);
+}
+
 void fillNewMemory(unsigned char pattern) {
     std::vector<void*> blocks;
     for (std::size_t size = 16; size <= 8192; size += size < 512 ? 16 : 512)
