@@ -295,16 +295,17 @@ class CheckRun {
 
     static const std::vector<Change>& changes() {
         static const std::vector<Change> all{
+            // First, because what it finds changes with every other change, too.
+            {memoryRule, L"in a process whose memory contained something else",
+             L"Initialise every variable, and write no addresses.",
+             [](CheckTask& surveyed) { surveyed.memoryPattern = 0xA5; }},
             {"surroundings-locale", L"under a locale with a decimal comma",
              L"Do not use the locale of the process.",
              [](CheckTask& surveyed) { surveyed.otherLocale = true; }},
             {"surroundings-folder", L"in another working folder", L"Do not use the working folder.",
              [](CheckTask& surveyed) { surveyed.otherFolder = true; }},
             {"surroundings-input", L"without standard input", L"Do not use standard input.",
-             [](CheckTask& surveyed) { surveyed.noInput = true; }},
-            {memoryRule, L"in a process whose memory contained something else",
-             L"Initialise every variable, and write no addresses.",
-             [](CheckTask& surveyed) { surveyed.memoryPattern = 0xA5; }}};
+             [](CheckTask& surveyed) { surveyed.noInput = true; }}};
         return all;
     }
 
@@ -365,7 +366,9 @@ class CheckRun {
         std::erase_if(plain.report.answers, isUnstable);
     }
 
-    void compare(const Change& change, const Outcome& plain, const Outcome& changed) {
+    /// Reports the first answer that differs, and removes all that do from `plain`: one cause is
+    /// one finding.
+    void compare(const Change& change, Outcome& plain, const Outcome& changed) {
         if (result.interrupted)
             return;
         const CheckReport& report = changed.report;
@@ -376,14 +379,18 @@ class CheckRun {
                        what + L" " + endingOf(changed.child, report, options.process) + L", " +
                            change.where + L". " + change.remedy);
         }
-        for (const auto& [key, value] : plain.report.answers) {
-            const auto other = report.answers.find(key);
-            if (other != report.answers.end() && other->second == value)
-                continue;
-            return add(change.rule, {},
-                       L"the answer changes " + std::wstring(change.where) + L": " + key + L". " +
-                           change.remedy);
-        }
+        const auto differs = [&](const auto& answer) {
+            const auto other = report.answers.find(answer.first);
+            return other == report.answers.end() || other->second != answer.second;
+        };
+        auto& answers = plain.report.answers;
+        const auto first = std::find_if(answers.begin(), answers.end(), differs);
+        if (first == answers.end())
+            return;
+        add(change.rule, {},
+            L"the answer changes " + std::wstring(change.where) + L": " + first->first + L". " +
+                change.remedy);
+        std::erase_if(answers, differs);
     }
 
     void sortFindings() {

@@ -123,28 +123,36 @@ void answers(CheckContext& context) {
 
 namespace {
 
-/// Calls the entry point a few times, as several hosts would. Returns whether references stay.
-bool leavesReferences(CheckContext& context, QrGetComponentDescriptionFunction* entry) {
-    long first = 0;
+/// Calls the entry point a few times, as several hosts would. Returns what is wrong with the
+/// references; empty if nothing is.
+std::wstring referenceFault(CheckContext& context, QrGetComponentDescriptionFunction* entry) {
+    ReferenceCount first;
     for (int round = 0; round < 3; ++round) {
         QrCastable* object = nullptr;
         ReferenceCount count;
         bool same = false;
         if (!context.attempt(L"the entry point", {}, [&] { object = entry(); }) || !object)
-            return false;
-        context.attempt(L"the release of the description", {}, [&] {
-            const QrPtr<QrCastable> kept(object);
-            const QrPtr<QrCastable> again(entry());
-            count = countOf(*again);
-            same = again.get() == object;
-            count.value -= same ? 2 : 1; // Those of `kept` and `again`.
-        });
+            return {};
+        if (!context.attempt(L"the release of the description", {}, [&] {
+                const QrPtr<QrCastable> kept(object);
+                const QrPtr<QrCastable> again(entry());
+                count = countOf(*again);
+                same = again.get() == object;
+                count.value -= same ? 2 : 1; // Those of `kept` and `again`.
+            }))
+            return {};
         if (round == 0)
-            first = count.value;
-        if (count.counted && count.value > (same ? first : 0))
-            return true;
+            first = count;
+        // The classes from which the object is derived are all that is left of it.
+        if (count.counted != first.counted)
+            return L"the last release destroys the description, but the entry point returns it "
+                   L"again. Return an uncounted static object, or a new one at each call.";
+        if (count.counted && count.value > (same ? first.value : 0))
+            return L"each call of the entry point leaves a reference that nobody releases. Return "
+                   L"a new object without a reference, or one that the library owns, without "
+                   L"taking a reference for the caller.";
     }
-    return false;
+    return {};
 }
 
 } // namespace
@@ -155,10 +163,8 @@ void descriptionCounted(CheckContext& context) {
     const platform::Module module = context.load(loaderError);
     QrGetComponentDescriptionFunction* const entry =
         module ? CheckContext::entryPointOf(module) : nullptr;
-    if (entry && leavesReferences(context, entry))
-        context.report({}, L"each call of the entry point leaves a reference that nobody "
-                           L"releases. Return a new object without a reference, or one that the "
-                           L"library owns, without taking a reference for the caller.");
+    if (const std::wstring fault = entry ? referenceFault(context, entry) : L""; !fault.empty())
+        context.report({}, fault);
     if (!context.lastException().empty())
         context.report({}, L"the release of the description throws: " + context.lastException() +
                                L". Let no release throw.");
@@ -274,10 +280,13 @@ void uidsExact(CheckContext& context) {
         for (const auto word : words) {
             QrUid almost = builder.uid;
             almost.*word ^= 1;
-            QrRef<QrCastable> made;
+            QrPtr<QrComponentBuilder> made;
             if (known.contains(wordsOf(almost)) ||
                 !context.attempt(L"createBuilder", builder.place,
-                                 [&] { made = description->createBuilder(almost); }) ||
+                                 [&] {
+                                     const auto object = description->createBuilder(almost);
+                                     made = queryCast<QrComponentBuilder>(object.get());
+                                 }) ||
                 !made)
                 continue;
             context.report(builder.place, L"createBuilder returns a builder for the uid " +

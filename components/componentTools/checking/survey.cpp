@@ -31,6 +31,13 @@ class DecimalComma final : public std::numpunct<char> {
         byte = pattern;
 }
 
+/// Fills the memory that the next call uses, in the heap and on the stack.
+void fillMemory(CheckContext& context) {
+    const auto pattern = static_cast<unsigned char>(context.task().memoryPattern);
+    System::fillNewMemory(pattern);
+    fillStack(pattern);
+}
+
 void surveyDescription(CheckContext& context, QrComponentDescription& description) {
     context.attempt(L"the description", {}, [&] {
         CheckSender& answers = context.messages();
@@ -72,7 +79,7 @@ void surveyImports(CheckContext& context) {
         for (std::size_t number = 0; number < inputs.fixedCount(); ++number) {
             const CheckInput input = inputs.at(number);
             const std::wstring& place = importing.described->place;
-            fillStack(static_cast<unsigned char>(context.task().memoryPattern));
+            fillMemory(context);
             CheckController controller;
             ImportTry attempt(importing, input, number);
             const bool accepts = attempt.canImport(context);
@@ -108,7 +115,7 @@ void survey(CheckContext& context) {
         return;
     surveyDescription(context, *description);
     for (const DescribedBuilder& described : context.builders()) {
-        fillStack(static_cast<unsigned char>(context.task().memoryPattern));
+        fillMemory(context);
         surveyObject(context, L"createObject of the " + described.place, described.place,
                      context.object(described));
     }

@@ -1,10 +1,12 @@
 // SPDX-License-Identifier: BSL-1.0
-/// The heap is walked block by block, because the system has no statistics of it.
+/// The heap is walked block by block, because the system has no statistics of it. Handles are
+/// tried one by one, because Wine does not count them.
 #include "components/componentTools/platform/resources.h"
 
 #include "components/componentTools/platform/system.h"
 
 #include <clocale>
+#include <cstdint>
 #include <cstdlib>
 #include <cstring>
 #include <io.h>
@@ -37,8 +39,13 @@ std::size_t threadCount() {
 }
 
 std::size_t openFileCount() {
-    DWORD count = 0;
-    return ::GetProcessHandleCount(::GetCurrentProcess(), &count) ? count : 0;
+    // Handles are multiples of four, and the lowest free one is used.
+    constexpr std::uintptr_t step = 4, end = 16384;
+    std::size_t count = 0;
+    DWORD flags = 0;
+    for (std::uintptr_t handle = step; handle < end; handle += step)
+        count += ::GetHandleInformation(reinterpret_cast<HANDLE>(handle), &flags) != 0;
+    return count;
 }
 
 void holdLibraries(const std::vector<std::string>& names) {
