@@ -54,6 +54,7 @@ install(FILES
   ${CMAKE_CURRENT_BINARY_DIR}/MZcomponentManagerConfig.cmake
   ${CMAKE_CURRENT_BINARY_DIR}/MZcomponentManagerConfigVersion.cmake
   ${CMAKE_CURRENT_LIST_DIR}/MzComponent.cmake
+  ${CMAKE_CURRENT_LIST_DIR}/MzComponentCheck.cmake
   ${CMAKE_CURRENT_LIST_DIR}/MzRuntime.cmake
   DESTINATION ${mzPackageFolder} COMPONENT development)
 

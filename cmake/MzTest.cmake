@@ -60,7 +60,8 @@ function(mz_add_test_program name)
   # GCC 12 does not know which precompiled headers are the system's, and reports its known false
   # warnings on std::string.
   if(CMAKE_CXX_COMPILER_ID STREQUAL "GNU")
-    target_compile_options(${name} PRIVATE -Wno-array-bounds -Wno-restrict -Wno-stringop-overflow)
+    target_compile_options(${name} PRIVATE -Wno-array-bounds -Wno-restrict
+      -Wno-stringop-overflow -Wno-stringop-overread)
   endif()
 endfunction()
 

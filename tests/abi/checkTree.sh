@@ -72,7 +72,11 @@ layers)
     above componentManager 'componentKit|objectIO|componentTools'
     above componentKit 'platform|objectIO|componentTools'
     above objectIO 'platform|componentKit|componentTools'
-    above componentTools 'componentKit|objectIO'
+    above componentTools 'objectIO'
+    # The tools run the tests of components, and know nothing else of the kit.
+    included components/componentTools components/componentKit |
+        grep -v 'components/componentKit/componentTest\.h"' |
+        complain "componentTools needs what is above or beside it"
     included examples 'tests|benchmarks|fuzz' | complain "an example that needs the tests"
     search '#[[:space:]]*include[[:space:]]*"\.\./' $(sources components tests tools) |
         complain "includes that climb"

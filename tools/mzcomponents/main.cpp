@@ -4,6 +4,7 @@
 /// The parser only fills in `Arguments` and selects a command, which runs after parsing, so that a
 /// usage error has no side effects. Exceptions end here.
 #include "components/componentTools/consoleText.h"
+#include "tools/mzcomponents/checkCommand.h"
 #include "tools/mzcomponents/commands.h"
 #include "tools/mzcomponents/exitGuard.h"
 #include "tools/mzcomponents/output.h"
@@ -32,6 +33,7 @@ struct Arguments {
     ProbeArguments probe;
     ImportArguments import;
     GraphArguments graph;
+    CheckArguments check;
     std::string shown;
     std::function<int()> command;
 };
@@ -201,6 +203,7 @@ int run(std::vector<std::string> words) {
     app.set_version_flag("--version", MZ_VERSION);
     addLookCommands(app, arguments);
     addUseCommands(app, arguments);
+    addCheckCommand(app, arguments.check, arguments.probe, arguments.command);
     try {
         std::transform(words.begin(), words.end(), words.begin(), asOneName);
         std::reverse(words.begin(), words.end()); // The parser expects reverse order.

@@ -6,7 +6,7 @@ _mzcomponents() {
   local options word command=
   for word in "${COMP_WORDS[@]:1:COMP_CWORD-1}"; do
     case $word in
-    list | explain | scan | types | import | show | graph)
+    list | explain | scan | types | import | show | graph | check)
       command=$word
       break
       ;;
@@ -18,25 +18,33 @@ _mzcomponents() {
     mapfile -t COMPREPLY < <(compgen -d -- "$current")
     return
     ;;
-  --cache | --save | --output | --svg)
+  --cache | --save | --output | --svg | --sample | --suppress | --junit | --sarif)
     compopt -o filenames 2>/dev/null
     mapfile -t COMPREPLY < <(compgen -f -- "$current")
     return
     ;;
-  --time-limit | --memory-limit) return ;;
+  --fail-on)
+    mapfile -t COMPREPLY < <(compgen -W "error warning note" -- "$current")
+    return
+    ;;
+  --time-limit | --memory-limit | --seed | --fuzz | --jobs | --reproduce | --explain) return ;;
   esac
   case $command in
-  '') options="list explain scan types import show graph --help --version" ;;
+  '') options="list explain scan types import show graph check --help --version" ;;
   list) options=$common ;;
   explain) options="$common $limits --load" ;;
   scan) options="$common $limits --retry" ;;
   import) options="$common $limits --save" ;;
   graph) options="$common $limits --output --svg" ;;
+  check)
+    options="--path --sample --fail-on --suppress --seed --fuzz --reproduce --in-process"
+    options+=" --thread-safe --jobs --explain --json --junit --sarif --help $limits"
+    ;;
   *) options="$common $limits" ;;
   esac
   mapfile -t COMPREPLY < <(compgen -W "$options" -- "$current")
   case $command in
-  explain | import | show)
+  explain | import | show | check)
     if [[ $current != -* ]]; then
       compopt -o filenames 2>/dev/null
       mapfile -t COMPREPLY < <(compgen -f -- "$current")

@@ -101,6 +101,22 @@ class ElfReader {
         return names;
     }
 
+    /// Returns the names of the symbols that are exported and not weak.
+    std::vector<std::string> exportedNames() {
+        std::vector<std::string> names;
+        const std::uint64_t count = std::min<std::uint64_t>(symbolCount(), maximumSymbols);
+        for (std::uint64_t index = 1; index < count; ++index) {
+            const auto symbol = readAt<Symbol>(symbols + index * sizeof(Symbol));
+            const unsigned int visibility = symbol ? symbol->other & 3 : 0;
+            if (!symbol || symbol->section == 0 || symbol->info >> 4 != globalBinding ||
+                visibility == 1 || visibility == 2)
+                continue;
+            if (auto text = name(symbol->name))
+                names.push_back(std::move(*text));
+        }
+        return names;
+    }
+
     bool defines(std::string_view wanted) {
         return symbols && strings && (gnuHash || hash) && find(wanted);
     }
@@ -294,6 +310,32 @@ class ElfReader {
         return hash ? readAt<std::uint32_t>(hash + 4).value_or(0) : 0;
     }
 
+    /// Returns the number of symbols. The GNU hash table does not contain it, so this function
+    /// looks for the end of its last chain.
+    std::uint64_t symbolCount() {
+        if (!symbols || !strings || !gnuHash)
+            return unhashedSymbols();
+        const auto bucketCount = readAt<std::uint32_t>(gnuHash);
+        const auto first = readAt<std::uint32_t>(gnuHash + 4);
+        const auto bloomCount = readAt<std::uint32_t>(gnuHash + 8);
+        if (!bucketCount || !first || !bloomCount)
+            return 0;
+        const std::uint64_t buckets = gnuHash + 16 + *bloomCount * 8ull;
+        const std::uint64_t chains = buckets + *bucketCount * 4ull;
+        std::uint64_t last = 0;
+        for (std::uint64_t index = 0; index < std::min<std::uint64_t>(*bucketCount, maximumSymbols);
+             ++index)
+            last = std::max<std::uint64_t>(last,
+                                           readAt<std::uint32_t>(buckets + index * 4).value_or(0));
+        while (last >= *first && last < maximumSymbols) {
+            const auto entry = readAt<std::uint32_t>(chains + (last - *first) * 4);
+            ++last;
+            if (!entry || *entry & 1)
+                break;
+        }
+        return std::max<std::uint64_t>(last, *first);
+    }
+
     bool isVersioned(std::uint64_t index) {
         constexpr std::uint16_t hidden = 0x8000, firstVersion = 2;
         const auto version = versions ? readAt<std::uint16_t>(versions + index * 2) : std::nullopt;
@@ -387,6 +429,13 @@ bool isElf(FileBytes& file) {
 }
 
 } // namespace
+
+std::vector<std::string> exportedElfNames(FileBytes& file) {
+    LibraryImage image;
+    ElfReader reader(file, image);
+    reader.read();
+    return reader.exportedNames();
+}
 
 std::vector<std::string> wantedSymbols(const std::filesystem::path& path) {
     FileBytes file(path);

@@ -66,4 +66,23 @@ LibraryImage readLibraryImage(const std::filesystem::path& path) {
     return image;
 }
 
+std::vector<std::string> exportedNames(const std::filesystem::path& path) {
+    FileBytes file(path);
+    const auto magic = file.read<std::array<char, 4>>(0);
+    if (magic && std::memcmp(magic->data(), "\177ELF", 4) == 0)
+        return exportedElfNames(file);
+    if (magic && std::memcmp(magic->data(), "MZ", 2) == 0)
+        return exportedPeNames(file);
+    return {};
+}
+
+bool isComponentExport(const std::string& name) {
+    // The last ones are added by the linkers.
+    for (const char* known : {entryPointName, stampName, "MzRunComponentTest", "_init", "_fini",
+                              "_edata", "_end", "__bss_start"})
+        if (name == known)
+            return true;
+    return false;
+}
+
 } // namespace Mz::Tools

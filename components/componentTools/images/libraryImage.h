@@ -89,7 +89,9 @@ LibraryImage readLibraryImage(const std::filesystem::path& path);
 /// The parts of `readLibraryImage`. Each fills `image` from a file with the magic number of its
 /// format, and stops at the first fault.
 void readElfImage(FileBytes& file, LibraryImage& image);
+std::vector<std::string> exportedElfNames(FileBytes& file);
 void readPeImage(FileBytes& file, LibraryImage& image);
+std::vector<std::string> exportedPeNames(FileBytes& file);
 
 /// Returns the symbols that other files must define before the ELF library at `path` can be loaded.
 /// Skips weak symbols, which may be undefined, and symbols with a version, which can only come from
@@ -102,6 +104,13 @@ bool removeDefined(const std::filesystem::path& path, std::set<std::string>& nam
 
 /// Returns the stamp if it is one that can be judged: magic number, layout and size are known.
 std::optional<ComponentStamp> validStamp(const std::optional<ComponentStamp>& stamp);
+
+/// Returns the names that the library at `path` exports. Of an ELF library, those of weak symbols
+/// are left out: templates and inline functions of its headers. Empty if it cannot be read.
+std::vector<std::string> exportedNames(const std::filesystem::path& path);
+
+/// Returns whether every component library may export this name.
+bool isComponentExport(const std::string& name);
 
 /// The names that component libraries export: the entry point, and the stamp.
 inline constexpr const char* entryPointName = "QrGetComponentDescription";

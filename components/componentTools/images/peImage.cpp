@@ -60,6 +60,7 @@ constexpr std::uint32_t pageSize = 0x1000, sectorSize = 0x200;
 constexpr std::size_t maximumSections = 96;
 constexpr std::size_t maximumNeeded = 1024;
 constexpr std::size_t maximumResources = 4096;
+constexpr std::uint32_t maximumNames = 65536;
 
 std::wstring processorName(std::uint16_t machine) {
     switch (machine) {
@@ -83,6 +84,21 @@ class PeReader {
             findEntryPoint();
             image.hasManifest = findManifest();
         }
+    }
+
+    /// Returns the names of the export table.
+    std::vector<std::string> exportedNames() {
+        std::vector<std::string> names;
+        const Directory exportTable = directory(exportDirectory);
+        const auto exports =
+            exportTable.address ? readAt<Exports>(exportTable.address) : std::nullopt;
+        const std::uint32_t count = exports ? std::min(exports->nameCount, maximumNames) : 0;
+        for (std::uint32_t index = 0; index < count; ++index) {
+            const auto address = readAt<std::uint32_t>(exports->names + index * 4ull);
+            if (auto name = address ? textAt(*address) : std::nullopt)
+                names.push_back(std::move(*name));
+        }
+        return names;
     }
 
   private:
@@ -363,6 +379,13 @@ class PeReader {
 
 void readPeImage(FileBytes& file, LibraryImage& image) {
     PeReader(file, image).read();
+}
+
+std::vector<std::string> exportedPeNames(FileBytes& file) {
+    LibraryImage image;
+    PeReader reader(file, image);
+    reader.read();
+    return reader.exportedNames();
 }
 
 } // namespace Mz::Tools

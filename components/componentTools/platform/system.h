@@ -90,6 +90,10 @@ struct ChildLimits {
     std::uint64_t refused;             ///< memory that the system enforces, in bytes; 0 for none
     std::size_t output;                ///< in bytes
     std::function<bool()> interrupted; ///< polled; true kills the child; may be empty
+    /// Whether `time` is the limit between two pieces of output instead of that of the whole run.
+    bool outputRestartsTime = false;
+    /// Receives the output after each new piece, and may remove what it has used; may be empty.
+    std::function<void(std::string&)> received = {};
 };
 
 struct ChildResult {

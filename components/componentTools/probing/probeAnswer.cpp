@@ -1,13 +1,12 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Messages are framed and checked, because the library in the probe can write into the same pipe.
 /// Payloads use the binary stream, but texts are sent as character codes, so that the two processes
 /// need not have the same locale.
 #include "components/componentTools/probing/probeAnswer.h"
 
 #include "components/componentManager/binaryStream.h"
 #include "components/componentManager/bufferio.h"
+#include "components/componentTools/probing/frames.h"
 
-#include <algorithm>
 #include <limits>
 #include <sstream>
 #include <stdexcept>
@@ -16,17 +15,7 @@ namespace Mz::Tools {
 
 namespace {
 
-constexpr std::uint32_t mark = 0x4D5A5052;
-constexpr std::size_t frameSize = 4 + 1 + 4 + 4;
-
 enum class Kind : unsigned char { stage, fault, description };
-
-std::uint32_t sumOf(std::string_view bytes) {
-    std::uint32_t sum = 2166136261u;
-    for (const char byte : bytes)
-        sum = (sum ^ static_cast<unsigned char>(byte)) * 16777619u;
-    return sum;
-}
 
 /// Writes a text as character codes, independent of the locale.
 void writeText(QrStream& stream, const std::wstring& text) {
@@ -55,15 +44,7 @@ std::string message(Kind kind, Write write) {
     QrOutBuffer buffer(&content);
     QrBinaryStream body(&buffer);
     write(body);
-    const std::string payload = content.str();
-
-    std::ostringstream framed;
-    QrOutBuffer frameBuffer(&framed);
-    QrBinaryStream frame(&frameBuffer);
-    frame << mark << static_cast<unsigned char>(kind) << static_cast<unsigned int>(payload.size());
-    frameBuffer.write(payload.data(), static_cast<int>(payload.size()));
-    frame << sumOf(payload);
-    return framed.str();
+    return frameOf(static_cast<unsigned char>(kind), content.str());
 }
 
 /// Reads one payload, which must not contain more than its message.
@@ -126,13 +107,6 @@ class PayloadReader {
     QrBinaryStream stream;
 };
 
-std::uint32_t wordAt(std::string_view bytes, std::size_t offset) {
-    std::uint32_t word = 0;
-    for (std::size_t index = 0; index < 4; ++index)
-        word = word << 8 | static_cast<unsigned char>(bytes[offset + index]);
-    return word;
-}
-
 } // namespace
 
 const wchar_t* nameOf(Stage stage) {
@@ -176,28 +150,18 @@ std::string encodeDescription(const Description& description) {
 
 ProbeAnswer decodeAnswer(std::string_view bytes) {
     ProbeAnswer answer;
-    while (!bytes.empty() && !answer.garbled) {
-        const std::size_t known = std::min<std::size_t>(bytes.size(), 4);
-        const std::string expected = {0x4D, 0x5A, 0x50, 0x52};
-        if (bytes.substr(0, known) != std::string_view(expected).substr(0, known)) {
-            answer.garbled = true;
-            break;
-        }
-        answer.cutOff = bytes.size() < frameSize || wordAt(bytes, 5) > bytes.size() - frameSize;
-        if (answer.cutOff)
-            break;
-        const std::size_t size = wordAt(bytes, 5);
-        const std::string_view payload = bytes.substr(9, size);
+    FrameReader frames(bytes);
+    while (const std::optional<Frame> frame = frames.next()) {
         try {
-            if (wordAt(bytes, 9 + size) != sumOf(payload))
-                throw std::runtime_error("wrong checksum");
-            PayloadReader(payload).read(static_cast<Kind>(bytes[4]), answer);
+            PayloadReader(frame->payload).read(static_cast<Kind>(frame->kind), answer);
             answer.anything = true;
         } catch (const std::runtime_error&) {
             answer.garbled = true;
+            return answer;
         }
-        bytes.remove_prefix(size + frameSize);
     }
+    answer.garbled = frames.garbled();
+    answer.cutOff = frames.cutOff();
     return answer;
 }
 

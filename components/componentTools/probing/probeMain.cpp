@@ -1,12 +1,16 @@
 // SPDX-License-Identifier: BSL-1.0
-/// The program `mzcomponents-probe FILE MEMORY`: loads one library, requests its description as the
-/// component manager does, and reports on standard output. libMZcomponentTools starts it. Before
-/// each stage it reports the stage, so that the parent process knows where a crash happened. It
-/// ends without running exit handlers, because the library's handlers and destructors may fail.
+/// The program `mzcomponents-probe FILE MEMORY`, and with `--check` as its first argument the child
+/// process of a check (`checking/checkChild.h`). Without it the program loads one library, requests
+/// its description as the component manager does, and reports on standard output.
+/// libMZcomponentTools starts it. Before each stage it reports the stage, so that the parent
+/// process knows where a crash happened. It ends without running exit handlers, because the
+/// library's handlers and destructors may fail.
 #include "components/componentManager/componentImp.h"
 #include "components/componentManager/nativeText.h"
 #include "components/componentManager/recordFormat.h"
+#include "components/componentTools/checking/checkChild.h"
 #include "components/componentTools/platform/system.h"
+#include "components/componentTools/probing/exceptionText.h"
 #include "components/componentTools/probing/probeAnswer.h"
 #include "components/platform/platform.h"
 
@@ -14,11 +18,8 @@
 #include <csignal>
 #include <cstdio>
 #include <cstdlib>
-#include <cxxabi.h>
 #include <exception>
-#include <memory>
 #include <new>
-#include <typeinfo>
 
 #ifdef MZ_UNLIMITED_ADDRESSES
 /// Lets a crash end the process by its signal under the sanitizers too.
@@ -44,21 +45,6 @@ void sendFault(Verdict verdict, const std::wstring& subject = {}, const std::wst
     send(encodeFault(verdict, subject, words));
 }
 
-std::wstring toText(const char* text) {
-    return System::displayName(System::pathOfArgument(text ? text : ""));
-}
-
-/// Returns the class of the current exception, for exceptions without a text.
-std::wstring exceptionClass() {
-    const std::type_info* type = abi::__cxa_current_exception_type();
-    if (!type)
-        return L"an exception of another language";
-    int failure = 0;
-    const std::unique_ptr<char, decltype(&std::free)> name(
-        abi::__cxa_demangle(type->name(), nullptr, nullptr, &failure), &std::free);
-    return L"a value of type " + toText(name ? name.get() : type->name());
-}
-
 /// Returns the finding for the current exception. `std::bad_alloc` becomes `outOfMemory`, which the
 /// parent process checks against the memory that was really used.
 Finding exceptionFinding(Verdict verdict, const std::wstring& before) {
@@ -69,7 +55,7 @@ Finding exceptionFinding(Verdict verdict, const std::wstring& before) {
     } catch (const ExBase& failure) {
         return {verdict, {}, before + displayText(failure.getReason())};
     } catch (const std::exception& failure) {
-        return {verdict, {}, before + toText(failure.what())};
+        return {verdict, {}, before + foreignText(failure.what())};
     } catch (...) {
         return {verdict, {}, before + exceptionClass()};
     }
@@ -169,6 +155,8 @@ void probe(const System::NativePath& file) {
 
 int main(int argc, char** argv) {
     const std::vector<std::string> arguments = System::arguments(argc, argv);
+    if (!arguments.empty() && arguments[0] == checkArgument)
+        return runCheckChild(arguments);
     if (arguments.size() != 2) {
         std::fputs("mzcomponents-probe is started by libMZcomponentTools; see mzcomponents\n",
                    stderr);

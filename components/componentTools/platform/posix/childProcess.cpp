@@ -170,12 +170,20 @@ class Watch {
         while (!closed && judgement.output.size() <= limits.output) {
             const ssize_t got = ::read(output, block, sizeof block);
             if (got > 0)
-                judgement.output.append(block, static_cast<std::size_t>(got));
+                receive(block, static_cast<std::size_t>(got));
             else if (got == 0 || (errno != EINTR && errno != EAGAIN))
                 closed = true;
             else if (errno == EAGAIN)
                 return;
         }
+    }
+
+    void receive(const char* bytes, std::size_t size) {
+        judgement.output.append(bytes, size);
+        if (limits.received)
+            limits.received(judgement.output);
+        if (limits.outputRestartsTime)
+            end = Clock::now() + limits.time;
     }
 
     void judge() {

@@ -168,6 +168,10 @@ class Watch {
                ::PeekNamedPipe(output, nullptr, 0, nullptr, &waiting, nullptr) && waiting > 0 &&
                ::ReadFile(output, block, sizeof block, &got, nullptr) && got > 0) {
             judgement.output.append(block, got);
+            if (limits.received)
+                limits.received(judgement.output);
+            if (limits.outputRestartsTime)
+                end = Clock::now() + limits.time;
             any = true;
         }
         return any;

@@ -1,0 +1,73 @@
+// SPDX-License-Identifier: BSL-1.0
+/// Counts are read from /proc, and the heap is asked for its statistics.
+#include "components/componentTools/platform/resources.h"
+
+#include "components/componentTools/platform/system.h"
+
+#include <clocale>
+#include <dlfcn.h>
+#include <iterator>
+#include <malloc.h>
+#include <unistd.h>
+
+/// Defined by the sanitizers, which replace the heap.
+extern "C" __attribute__((weak)) std::size_t __sanitizer_get_current_allocated_bytes();
+
+namespace Mz::Tools::System {
+
+namespace {
+
+std::size_t entriesOf(const char* folder) {
+    std::error_code failure;
+    const std::filesystem::directory_iterator entries(folder, failure);
+    return failure ? 0
+                   : static_cast<std::size_t>(
+                         std::distance(begin(entries), std::filesystem::directory_iterator()));
+}
+
+} // namespace
+
+std::size_t heapInUse() {
+    if (__sanitizer_get_current_allocated_bytes)
+        return 0;
+    const struct mallinfo2 heap = ::mallinfo2();
+    return heap.uordblks + heap.hblkhd;
+}
+
+std::size_t threadCount() {
+    return entriesOf("/proc/self/task");
+}
+
+std::size_t openFileCount() {
+    return entriesOf("/proc/self/fd");
+}
+
+void holdLibraries(const std::vector<std::string>& names) {
+    for (const std::string& name : names)
+        if (!::dlopen(name.c_str(), RTLD_LAZY | RTLD_NOLOAD))
+            ::dlerror(); // Discards the message.
+}
+
+void fillNewMemory(unsigned char pattern) {
+    ::mallopt(M_PERTURB, pattern);
+}
+
+void closeStandardInput() {
+    ::close(STDIN_FILENO);
+}
+
+bool useDecimalComma() {
+    for (const char* name : {"de_DE.UTF-8", "de_DE.utf8", "fr_FR.UTF-8", "es_ES.UTF-8", "de_DE",
+                             "de_DE.ISO-8859-15", "pl_PL.UTF-8", "ru_RU.UTF-8"})
+        if (std::setlocale(LC_NUMERIC, name))
+            return true;
+    return false;
+}
+
+std::wstring processSettings() {
+    std::error_code failure;
+    return L"folder " + displayName(std::filesystem::current_path(failure)) + L", locale " +
+           displayName(std::setlocale(LC_ALL, nullptr));
+}
+
+} // namespace Mz::Tools::System

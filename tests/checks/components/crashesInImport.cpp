@@ -1,0 +1,16 @@
+// SPDX-License-Identifier: BSL-1.0
+/// Crashes in import on a count that is too large.
+#include "tests/checks/components/broken.h"
+
+class Builder final : public Mz::Test::Importing<Builder> {
+  public:
+    using QrImportBuilder::import;
+    Mz::QrRef<Mz::QrCastable> import(Mz::QrPtr<Mz::QrBufferedIO> io, const wchar_t*,
+                                     const wchar_t*) const override {
+        if (io->read() == 0xFF)
+            Mz::Test::crash();
+        return (new Mz::Test::Stored)->getCastable();
+    }
+};
+
+MZ_BROKEN_BUILDER(Builder)

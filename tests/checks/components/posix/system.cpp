@@ -1,0 +1,24 @@
+// SPDX-License-Identifier: BSL-1.0
+#include "tests/checks/components/system.h"
+
+#include <dlfcn.h>
+#include <fcntl.h>
+#include <unistd.h>
+
+namespace Mz::Test {
+
+bool holdThisLibrary() {
+    Dl_info info;
+    return ::dladdr(reinterpret_cast<const void*>(&holdThisLibrary), &info) != 0 &&
+           ::dlopen(info.dli_fname, RTLD_LAZY | RTLD_NOLOAD);
+}
+
+bool leaveFileOpen() {
+    return ::open("/dev/null", O_RDONLY | O_CLOEXEC) >= 0;
+}
+
+bool hasStandardInput() {
+    return ::fcntl(STDIN_FILENO, F_GETFD) >= 0;
+}
+
+} // namespace Mz::Test
