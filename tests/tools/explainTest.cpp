@@ -88,6 +88,12 @@ TEST_F(Explain, TellsALibraryThatWasBuiltForAnotherAbi) {
               L"containers in debug mode (_GLIBCXX_DEBUG)");
 }
 
+TEST_F(Explain, FindsTheStampInALibraryThatWasOptimisedAndStripped) {
+    if (!std::filesystem::exists(builtComponent(L"kitShrunk")))
+        GTEST_SKIP() << "it is built by GCC without sanitizers only";
+    EXPECT_EQ(verdictOn(add(L"kitShrunk")), Verdict::otherAbi);
+}
+
 TEST_F(Explain, JudgesALibraryWithAFittingStampOrWithoutOneByLoadingIt) {
     for (const wchar_t* name : {L"goodWithKit", L"stamped", L"stampedNewer", L"stampedOtherLayout",
                                 L"stampedNoMagic", L"goodByHand"})
