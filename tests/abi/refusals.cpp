@@ -1,6 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
 /// Pieces of code that must not compile, one at a time.
-#include "components/componentKit/componentKit.h"
 #include "components/componentManager/cast.h"
 
 using namespace Mz;
@@ -38,14 +37,6 @@ void compiles(QrCastable* object, const QrPtr<Gauge>& gauge) {
 #endif
 #ifdef REFUSAL_loseConst
     const QrPtr<QrCastable> lost = constant;
-#endif
-    static_cast<void>(Kit::BuilderInfo{.uid = Gauge::uid, .name = L"gauge"});
-    static_cast<void>(Kit::BuilderInfo{.uid = Kit::BuilderUid::atRunTime(Gauge::uid)});
-#ifdef REFUSAL_nilUid
-    static_cast<void>(Kit::BuilderInfo{.uid = QrUid{}, .name = L"gauge"});
-#endif
-#ifdef REFUSAL_noUid
-    static_cast<void>(Kit::BuilderInfo{.name = L"gauge"});
 #endif
 #ifdef REFUSAL_downConversion
     const QrPtr<Plain> down = gauge;
