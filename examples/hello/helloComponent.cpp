@@ -1,11 +1,10 @@
 // SPDX-License-Identifier: BSL-1.0
-#include "greeter.h"
-
 #include "components/componentKit/componentKit.h"
+#include "greeter.h"
 
 using namespace Mz;
 
-class WorldGreeter final : public QrCastRef<QrCastHeap<QrCastImpl<WorldGreeter, Greeter>>> {
+class WorldGreeter final : public Kit::Object<WorldGreeter, Greeter> {
   public:
     const char* greeting() const override { return "Hello, world!"; }
 };

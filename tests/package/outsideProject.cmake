@@ -8,15 +8,25 @@ run(${CMAKE_COMMAND} -S ${source} -B ${work}/build -G ${generator}
   -D CMAKE_PREFIX_PATH=${work}/prefix ${toolchainOptions})
 run(${CMAKE_COMMAND} --build ${work}/build)
 
-# Windows programs look for libraries along this path; elsewhere it means nothing.
-set(ENV{WINEPATH} "${work}/prefix/bin;${build}/bin")
-says("Hello, world!" ${emulator} ${work}/build/helloHost${suffix} ${work}/build/components)
+# On Windows the build has copied the libraries beside the program; here only Wine must find it.
+says("Hello, world!" ${emulator} ${work}/build/helloHost${suffix})
 
-# Wherever the components are, and whatever the locale, where arguments come as bytes.
-if(NOT suffix)
-  file(RENAME ${work}/build/components "${work}/build/ü 日")
+# It looks beside itself, however it was started, wherever that is and whatever the locale.
+file(RENAME ${work}/build "${work}/ü 日")
+if(suffix)
+  file(RENAME "${work}/ü 日" ${work}/moved)
+  says("Hello, world!" ${emulator} ${work}/moved/helloHost${suffix})
+  set(home ${work}/moved)
+else()
+  set(home "${work}/ü 日")
   foreach(locale C C.UTF-8)
     set(ENV{LC_ALL} ${locale})
-    says("Hello, world!" ${work}/build/helloHost "${work}/build/ü 日")
+    says("Hello, world!" "${home}/helloHost")
+    says("Hello, world!" sh -c "cd '${home}' && ./helloHost")
+    says("Hello, world!" sh -c "cd / && PATH='${home}':$PATH helloHost")
   endforeach()
 endif()
+
+# Without a component it says where it looked, and fails.
+file(RENAME "${home}/components" "${home}/elsewhere")
+refused("no greeter was found in .*components" ${emulator} "${home}/helloHost${suffix}")
