@@ -86,8 +86,7 @@ forEachBuilder(Visit&& visit) {
 ///         std::wcout << builder->getLabel() << L'\n';
 ///
 /// The list is a copy. Its entries refer to the manager's records, which live as long as the
-/// manager. `builder->getBuilder()` of a non-const record loads the library; here, use `create` or
-/// `QrComponentManager::getBuilder` with `builder->getUid()`.
+/// manager. To make an object, pass `builder->getUid()` to `create`.
 inline std::vector<QrCPtr<QrBuilderDescription>> builders() {
     std::vector<QrCPtr<QrBuilderDescription>> all;
     forEachBuilder([&](const QrBuilderDescription& builder) { all.emplace_back(&builder); });
