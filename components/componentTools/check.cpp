@@ -237,20 +237,10 @@ class CheckRun {
             throw std::runtime_error("the process of the check could not be started: " +
                                      std::string(child.detail.begin(), child.detail.end()));
         if (report.done) {
-            finishDone();
+            task.rules.clear();
             return false;
         }
         return takeEnd(child, report);
-    }
-
-    /// After a process that came to its end: nothing is left, or everything if it cannot be
-    /// checked.
-    void finishDone() {
-        const std::vector<std::string> rules = std::exchange(task.rules, {});
-        if (fatal)
-            std::copy_if(
-                rules.begin(), rules.end(), std::back_inserter(task.rules),
-                [](const std::string& id) { return id != loadsRule && id != answersRule; });
     }
 
     /// After a process that ended early: reports that, and removes from the task what was checked.

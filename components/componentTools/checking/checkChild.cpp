@@ -43,12 +43,16 @@ void carryOut(const CheckTask& task, CheckSender& sender) {
     CheckContext context(task, sender);
     if (task.rules.empty())
         survey(context);
+    bool usable = true;
     for (const std::string& id : task.rules) {
         const RuleEntry& entry = ruleEntry(id);
         context.begin(entry.facts);
-        entry.check(context);
-        if (entry.needed && context.hasFinding())
-            break; // The other rules would repeat the fault in other words.
+        if (usable)
+            entry.check(context);
+        else
+            sender.skipped();
+        // The other rules would repeat the fault in other words.
+        usable = usable && !(entry.needed && context.hasFinding());
     }
     sender.done();
 }

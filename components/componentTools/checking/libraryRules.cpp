@@ -18,30 +18,34 @@ namespace {
 /// everything could be called.
 bool describeOnce(CheckContext& context, QrGetComponentDescriptionFunction* entry, bool objects) {
     DescriptionCollector collector;
+    QrPtr<QrCastable> object;
     QrPtr<QrComponentDescription> description;
     bool called = context.attempt(L"the entry point", {}, [&] {
-        const QrPtr<QrCastable> object = entry();
+        object = entry();
         description = queryCast<QrComponentDescription>(object.get());
     });
     called = called && description && context.attempt(L"enumerateBuilders", {}, [&] {
         description->enumerateBuilders(collector);
     });
     for (const auto& item : collector.items) {
-        QrRef<QrCastable> object;
+        QrRef<QrCastable> unused;
         if (!called || !objects)
             break;
         const std::wstring place = placeOf(textOrEmpty(item->getName()), item->getUid());
         called = context.attempt(L"createObject", place, [&] {
             const QrRef<QrCastable> made = description->createBuilder(item->getUid());
             if (const auto builder = queryCast<QrComponentBuilder>(made.get()))
-                object = builder->createObject();
+                unused = builder->createObject();
         });
     }
     collector.items.clear();
-    const bool released =
-        context.attempt(L"the release of the description", {}, [&] { description.reset(); });
-    if (description)
-        static_cast<void>(description.detach()); // Releasing it ended an earlier process.
+    const bool released = context.attempt(L"the release of the description", {}, [&] {
+        description.reset();
+        object.reset();
+    });
+    // Releasing them ended an earlier process.
+    static_cast<void>(description.detach());
+    static_cast<void>(object.detach());
     return called && released;
 }
 

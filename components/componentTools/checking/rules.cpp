@@ -37,7 +37,8 @@ std::vector<RuleEntry> makeEntries() {
           L"destroyed by that release; one that is returned with a reference is never destroyed. "
           L"Use MZ_COMPONENT, or an uncounted static object."},
          apart,
-         Rules::descriptionCounted},
+         Rules::descriptionCounted,
+         true},
         {{"description-stable", description, error, L"The description says the same at every call.",
           L"Hosts store what the library says when they record it, and show that for years. Let "
           L"the texts and the list of builders be constant."},

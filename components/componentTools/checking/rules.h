@@ -20,7 +20,7 @@ struct RuleEntry {
     CheckRule facts;
     RuleProcess process;
     void (*check)(CheckContext&) = nullptr; ///< null unless the process is `main` or `apart`
-    bool needed = false;                    ///< without it no other rule can be checked
+    bool needed = false; ///< without it no later rule of the process can be checked
 };
 
 /// Returns all rules. Those of one process are checked in this order.

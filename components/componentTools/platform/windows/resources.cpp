@@ -55,14 +55,20 @@ void holdLibraries(const std::vector<std::string>& names) {
 }
 
 void fillNewMemory(unsigned char pattern) {
-    std::vector<void*> blocks;
-    for (std::size_t size = 16; size <= 8192; size += size < 512 ? 16 : 512)
+    // Every second block stays in use until the next call: free blocks side by side would become
+    // one large block, from whose other end the heap takes new ones.
+    static std::vector<void*>& kept = *new std::vector<void*>;
+    for (void* block : kept)
+        std::free(block);
+    kept.clear();
+    std::vector<void*> freed;
+    for (std::size_t size = 16; size <= 1024; size += 16)
         for (int copy = 0; copy < 64; ++copy)
             if (void* block = std::malloc(size)) {
                 std::memset(block, pattern, size);
-                blocks.push_back(block);
+                (copy % 2 ? freed : kept).push_back(block);
             }
-    for (void* block : blocks)
+    for (void* block : freed)
         std::free(block);
 }
 
