@@ -1,7 +1,9 @@
 // SPDX-License-Identifier: BSL-1.0
-// Keeps the events in one object per process.
+// Keeps the events in one object per process. Events may be added by several threads: components
+// whose objects add them are used by several threads, too.
 #include "tests/support/journal.h"
 
+#include <mutex>
 #include <string>
 #include <vector>
 
@@ -11,6 +13,7 @@ namespace {
 
 /// Never destroyed: components may add events until the process ends.
 struct Journal {
+    std::mutex eventsMutex;
     std::vector<std::string> events;
     std::string text;
     void (*hook)(const char* event) = nullptr;
@@ -26,7 +29,10 @@ Journal& journal() {
 } // namespace
 
 void note(const char* event) {
-    journal().events.emplace_back(event);
+    {
+        const std::lock_guard lock(journal().eventsMutex);
+        journal().events.emplace_back(event);
+    }
     if (journal().hook)
         journal().hook(event);
 }
@@ -36,6 +42,7 @@ void setHook(void (*hook)(const char* event)) {
 }
 
 int noted(const char* event) {
+    const std::lock_guard lock(journal().eventsMutex);
     int count = 0;
     for (const std::string& known : journal().events)
         count += known == event;
@@ -43,6 +50,7 @@ int noted(const char* event) {
 }
 
 const char* allNotes() {
+    const std::lock_guard lock(journal().eventsMutex);
     std::string& text = journal().text;
     text.clear();
     for (const std::string& event : journal().events)
@@ -51,6 +59,7 @@ const char* allNotes() {
 }
 
 void forgetNotes() {
+    const std::lock_guard lock(journal().eventsMutex);
     journal().events.clear();
 }
 
