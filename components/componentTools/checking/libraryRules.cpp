@@ -109,8 +109,7 @@ void exports(CheckContext& context) {
     }
     if (count)
         context.report({}, L"it exports " + std::to_wstring(count) +
-                               L" names besides its entry "
-                               L"point: " +
+                               (count == 1 ? L" name" : L" names") + L" besides its entry point: " +
                                names + (count > shown ? L", …" : L"") +
                                L". Compile it with hidden visibility; mz_add_component does.");
 }

@@ -82,7 +82,8 @@ bool isComponentExport(const std::string& name) {
                               "_edata", "_end", "__bss_start"})
         if (name == known)
             return true;
-    return false;
+    // The address sanitizer exports a mark for each variable that a library exports.
+    return name.starts_with("__odr_asan.");
 }
 
 } // namespace Mz::Tools
