@@ -1,6 +1,6 @@
 # SPDX-License-Identifier: BSL-1.0
-# Installs what only packages contain: licences and the list of changes, as the component
-# `documents`. Configures CPack for the Windows installer. Must be included before MzInstall.
+# Installs what only packages contain: licences, the list of changes, guides and examples, as the
+# component `documents`. Configures CPack for the Windows installer. Must be included before MzInstall.
 # packaging/package.sh makes the packages.
 include_guard()
 include(GNUInstallDirs)
@@ -38,7 +38,11 @@ if(WIN32)
     COMPONENT documents)
 endif()
 install(FILES ${PROJECT_SOURCE_DIR}/LICENSE ${PROJECT_SOURCE_DIR}/CHANGELOG.md ${mzCopyright}
-  DESTINATION ${mzDocuments} COMPONENT documents)
+  ${PROJECT_SOURCE_DIR}/README.md DESTINATION ${mzDocuments} COMPONENT documents)
+# The guides and examples, in the folders that README.md links.
+file(GLOB mzGuides CONFIGURE_DEPENDS ${PROJECT_SOURCE_DIR}/docs/*.md)
+install(FILES ${mzGuides} DESTINATION ${mzDocuments}/docs COMPONENT documents)
+install(DIRECTORY ${PROJECT_SOURCE_DIR}/examples DESTINATION ${mzDocuments} COMPONENT documents)
 
 # ---- The installer for Windows ----------------------------------------------------------------
 set(CPACK_GENERATOR NSIS)

@@ -1,7 +1,7 @@
 #!/usr/bin/env bash
 # SPDX-License-Identifier: BSL-1.0
 # Installs, uses and removes the Debian packages. Must run on a fresh system, in a folder that
-# contains packages/ and hello/.
+# contains packages/. What it builds is the example in the development package.
 set -euo pipefail
 install() { apt-get install -y -qq --no-install-recommends "$@"; }
 
@@ -40,14 +40,15 @@ install cmake g++ make pkg-config
 list_files >/tmp/before
 install ./packages/*.deb
 
-cmake -S hello -B /tmp/hello
+hello=/usr/share/doc/libmzcomponentmanager-dev/examples/hello
+cmake -S $hello -B /tmp/hello
 cmake --build /tmp/hello
 says "Hello, world!" /tmp/hello/helloHost /tmp/hello/components
 
 mkdir -p /tmp/byHand/components
 read -ra flags <<<"$(pkg-config --cflags --libs MZcomponentManager)"
-g++ -std=c++20 hello/helloHost.cpp -o /tmp/byHand/helloHost "${flags[@]}"
-g++ -std=c++20 -shared -fPIC -fvisibility=hidden -fno-gnu-unique hello/helloComponent.cpp \
+g++ -std=c++20 $hello/helloHost.cpp -o /tmp/byHand/helloHost "${flags[@]}"
+g++ -std=c++20 -shared -fPIC -fvisibility=hidden -fno-gnu-unique $hello/helloComponent.cpp \
   -o /tmp/byHand/components/hello.so "${flags[@]}"
 says "Hello, world!" /tmp/byHand/helloHost /tmp/byHand/components
 

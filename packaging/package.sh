@@ -59,7 +59,7 @@ describe_packages() {
 check_debian() {
   local input=$checks/debian
   rm -rf "$input" && mkdir -p "$input/packages" && cp "$packages"/*.deb "$input/packages" &&
-    cp -R "$top/examples/hello" "$top/packaging/checkDebian.sh" "$input" &&
+    cp "$top/packaging/checkDebian.sh" "$input" &&
     as_root "$top/packaging/fresh-root.sh" "$build/fresh-root" "$input" checkDebian.sh
 }
 
