@@ -28,7 +28,8 @@ function(mz_add_component_check name)
     add_test(NAME check-${name} COMMAND mzcomponents check $<TARGET_FILE:${name}> ${options})
     return()
   endif()
-  find_program(MZ_COMPONENTS_PROGRAM NAMES mzcomponents mzcomponents.exe
+  # The program of the system that the component is for: another system's ends well without a check.
+  find_program(MZ_COMPONENTS_PROGRAM NAMES mzcomponents${CMAKE_EXECUTABLE_SUFFIX}
     HINTS ${MZcomponentManager_PREFIX}/bin)
   if(MZ_COMPONENTS_PROGRAM)
     add_test(NAME check-${name} COMMAND ${CMAKE_CROSSCOMPILING_EMULATOR} ${MZ_COMPONENTS_PROGRAM}

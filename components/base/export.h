@@ -8,6 +8,10 @@
 /// component library needs it.
 #pragma once
 
+#if __cplusplus <= 201703L
+#error "libMZcomponentManager needs C++20: compile with -std=c++20 or later"
+#endif
+
 /// Registers a function that runs at unload: `MZ_AT_UNLOAD(function);`, at namespace scope.
 /// `void function()` runs when its library is unloaded, after the destructors of all static objects
 /// of that library.

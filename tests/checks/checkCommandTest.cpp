@@ -42,6 +42,14 @@ TEST_F(CheckCommand, EndsWithZeroForAGoodLibrary) {
     EXPECT_EQ(result.output, "1 library: 0 errors, 0 warnings, 0 notes\n");
 }
 
+TEST_F(CheckCommand, TakesOneSampleForEachOption) {
+    const std::string sample = write("sample.txt", "nothing");
+    const ProgramResult result =
+        run({"--sample", sample, "--sample", sample, library(L"goodWithKit", L"goodWithKit")});
+    EXPECT_EQ(result.exitCode, 0) << result.output;
+    EXPECT_EQ(result.output, "1 library: 0 errors, 0 warnings, 0 notes\n");
+}
+
 TEST_F(CheckCommand, NamesTheFileTheGradeThePlaceAndTheRule) {
     const ProgramResult result = run({library(L"dotInExtension")});
     EXPECT_EQ(result.exitCode, 1);

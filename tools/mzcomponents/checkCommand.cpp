@@ -36,7 +36,7 @@ Tools::Grade gradeNamed(const std::string& name) {
 int explainRule(const std::string& id) {
     if (id == "all") {
         for (const Tools::CheckRule* rule : Tools::checkRules())
-            printLine(padded(wide(rule->id), 22) + padded(wide(Tools::nameOf(rule->grade)), 9) +
+            printLine(padded(wide(rule->id), 24) + padded(wide(Tools::nameOf(rule->grade)), 9) +
                       rule->title);
         return exitSuccess;
     }
@@ -186,8 +186,10 @@ void addCheckCommand(CLI::App& app, CheckArguments& arguments, ProbeArguments& p
     check->add_option("FILE", arguments.files, "The libraries");
     check->add_option("--path", arguments.path,
                       "Check the component libraries of these folders, too, separated by ';'");
-    check->add_option("--sample", arguments.samples,
-                      "A file that import builders can read; may be repeated");
+    check
+        ->add_option("--sample", arguments.samples,
+                     "A file that import builders can read; may be repeated")
+        ->allow_extra_args(false); // What follows it is a library.
     check
         ->add_option("--fail-on", arguments.failOn,
                      "The least serious findings that cause status 1: error, warning or note")
