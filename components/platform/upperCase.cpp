@@ -98,16 +98,36 @@ char16_t upperCase(char16_t unit) {
     return static_cast<char16_t>(unit + range->distance);
 }
 
-std::u16string sortKey(std::wstring_view name) {
-    std::u16string key;
+namespace {
+
+/// Appends a code unit in the one to three bytes that UTF-8 has for a code point of that number.
+/// Bytes of UTF-8 compare as the numbers do.
+void append(std::string& key, char16_t unit) {
+    if (unit < 0x80) {
+        key += static_cast<char>(unit);
+        return;
+    }
+    if (unit < 0x800) {
+        key += static_cast<char>(0xC0 | unit >> 6);
+    } else {
+        key += static_cast<char>(0xE0 | unit >> 12);
+        key += static_cast<char>(0x80 | (unit >> 6 & 0x3F));
+    }
+    key += static_cast<char>(0x80 | (unit & 0x3F));
+}
+
+} // namespace
+
+std::string sortKey(std::wstring_view name) {
+    std::string key;
     key.reserve(name.size());
     for (const wchar_t character : name) {
         const auto code = static_cast<std::uint32_t>(character);
         if (code < 0x10000) {
-            key += upperCase(static_cast<char16_t>(code));
+            append(key, upperCase(static_cast<char16_t>(code)));
         } else { // Surrogates have no case.
-            key += detail::highSurrogate(code);
-            key += detail::lowSurrogate(code);
+            append(key, detail::highSurrogate(code));
+            append(key, detail::lowSurrogate(code));
         }
     }
     return key;

@@ -11,8 +11,9 @@ namespace Mz::platform {
 /// is a fixed table and does not depend on the locale.
 char16_t upperCase(char16_t unit);
 
-/// Returns the sort key of a file name: its UTF-16 code units, each in upper case. Keys are
-/// compared by code unit. `name` may be in UTF-16 or UTF-32.
-std::u16string sortKey(std::wstring_view name);
+/// Returns the sort key of a file name. Two keys compare, byte by byte, as the UTF-16 code units of
+/// the names in upper case do. `name` may be in UTF-16 or UTF-32. The key of a short ASCII name
+/// needs no memory: comparing and making keys takes most of the time of a large listing.
+std::string sortKey(std::wstring_view name);
 
 } // namespace Mz::platform

@@ -160,7 +160,20 @@ TEST_F(PosixPlatform, TakesLettersAsUpperCaseOneByOneOnly) {
     for (const char16_t unit : {u'\u00DF', u'\u0131', u'\u017F', u'\u00B5', u'\u03C2', u'\u01C5',
                                 u'\u0100', u'[', u'{', u'`', u'@', u'\0', u'\uFFFF'})
         EXPECT_EQ(upperCase(unit), unit) << static_cast<unsigned int>(unit);
-    EXPECT_EQ(sortKey(L"a\U0001F600\U0010FFFF\uFF41"), u"A\U0001F600\U0010FFFF\uFF21");
+}
+
+TEST_F(PosixPlatform, SortsByTheCodeUnitsInUpperCase) {
+    EXPECT_EQ(sortKey(L"aB_\u00E4"), sortKey(L"Ab_\u00C4"));
+    EXPECT_EQ(sortKey(L"\U0001F600\uFF41"), sortKey(L"\U0001F600\uFF21"));
+    // In this order: each is the last or the first of its number of bytes or of its kind of units.
+    std::string before;
+    for (const wchar_t* name :
+         {L"A", L"AA", L"\x7F", L"\x80", L"\u07FF", L"\u0800", L"\uD7FF", L"\U00010000",
+          L"\U00010001", L"\U0010FFFF", L"\uE000", L"\uFFFE", L"\uFFFF", L"\uFFFF\x01"}) {
+        const std::string key = sortKey(name);
+        EXPECT_LT(before, key) << static_cast<unsigned int>(*name);
+        before = key;
+    }
 }
 
 TEST_F(PosixPlatform, KnowsOneFileByItsNamesThoughListingsNumberFilesOtherwise) {

@@ -15,6 +15,7 @@
 #include "components/platform/upperCase.h"
 
 #include <algorithm>
+#include <cstddef>
 #include <dirent.h>
 #include <fcntl.h>
 #include <memory>
@@ -35,16 +36,11 @@ struct CloseDirectory {
 
 using Directory = std::unique_ptr<DIR, CloseDirectory>;
 
-/// The origin of a file's identity.
-enum class Source { listing, status };
-
-struct Listed {
-    DirectoryEntry entry;
-    Source source;
-    std::u16string key; ///< the sort key
+/// The candidates of a directory.
+struct Listing {
+    std::vector<DirectoryEntry> files;
+    std::vector<bool> byStatus; ///< which of them were identified by their status
 };
-
-using Listing = std::vector<Listed>;
 
 /// Returns whether an entry contains the number of its file. Some file systems use a placeholder.
 bool hasFileNumber(const dirent& entry) {
@@ -74,10 +70,8 @@ void addCandidate(Listing& listing, const NativePath& path, DIR* directory, dev_
     std::optional<std::wstring> name = toCharacters(item.d_name);
     if (!name)
         return;
-    std::u16string key = sortKey(*name);
-    listing.push_back({{std::move(*name), path + "/" + item.d_name, identity},
-                       listed ? Source::listing : Source::status,
-                       std::move(key)});
+    listing.files.push_back({std::move(*name), path + "/" + item.d_name, identity});
+    listing.byStatus.push_back(!listed);
 }
 
 Listing list(const NativePath& path) {
@@ -96,41 +90,56 @@ Listing list(const NativePath& path) {
 bool hasUnlistedTarget(const std::vector<Listing>& listings) {
     std::set<FileIdentity> targets;
     for (const Listing& listing : listings)
-        for (const Listed& file : listing)
-            if (file.source == Source::status)
-                targets.insert(*file.entry.identity);
+        for (std::size_t index = 0; index < listing.files.size(); ++index)
+            if (listing.byStatus[index])
+                targets.insert(*listing.files[index].identity);
     if (targets.empty())
         return false;
     for (const Listing& listing : listings)
-        for (const Listed& file : listing)
-            if (file.source == Source::listing)
-                targets.erase(*file.entry.identity);
+        for (std::size_t index = 0; index < listing.files.size(); ++index)
+            if (!listing.byStatus[index])
+                targets.erase(*listing.files[index].identity);
     return !targets.empty();
 }
 
 void identifyByStatus(Listing& listing) {
-    for (Listed& file : listing)
-        if (file.source == Source::listing)
-            if (const auto identity = identityByStatus(AT_FDCWD, file.entry.path.c_str()))
-                file.entry.identity = identity;
+    for (std::size_t index = 0; index < listing.files.size(); ++index)
+        if (!listing.byStatus[index])
+            if (const auto identity = identityByStatus(AT_FDCWD, listing.files[index].path.c_str()))
+                listing.files[index].identity = identity;
 }
 
-/// Returns the entries in the order of their keys; entries with equal keys in the order of the
-/// bytes of their paths.
-std::vector<DirectoryEntry> sorted(Listing listing) {
-    std::vector<Listed*> order;
-    order.reserve(listing.size());
-    for (Listed& file : listing)
-        order.push_back(&file);
-    std::sort(order.begin(), order.end(), [](const Listed* a, const Listed* b) {
-        const int difference = a->key.compare(b->key);
-        return difference ? difference < 0 : a->entry.path < b->entry.path;
+/// The sort key of a file, and the place of the file before it was sorted.
+struct Place {
+    std::string key;
+    std::size_t index;
+};
+
+/// Moves each file to its place: `places[0]` has the index of the file that comes first. It follows
+/// each cycle, so that it needs no second array; pages that are new cost as much as the sorting.
+void arrange(std::vector<DirectoryEntry>& files, std::vector<Place>& places) {
+    for (std::size_t first = 0; first < places.size(); ++first) {
+        std::size_t at = first;
+        while (places[at].index != first) {
+            const std::size_t from = std::exchange(places[at].index, at);
+            std::swap(files[at], files[from]);
+            at = from;
+        }
+        places[at].index = at;
+    }
+}
+
+/// Sorts by key; files with equal keys by the bytes of their paths.
+void sort(std::vector<DirectoryEntry>& files) {
+    std::vector<Place> places;
+    places.reserve(files.size());
+    for (const DirectoryEntry& file : files)
+        places.push_back({sortKey(file.name), places.size()});
+    std::sort(places.begin(), places.end(), [&](const Place& a, const Place& b) {
+        const int difference = a.key.compare(b.key);
+        return difference ? difference < 0 : files[a.index].path < files[b.index].path;
     });
-    std::vector<DirectoryEntry> entries;
-    entries.reserve(order.size());
-    for (Listed* file : order)
-        entries.push_back(std::move(file->entry));
-    return entries;
+    arrange(files, places);
 }
 
 } // namespace
@@ -146,8 +155,10 @@ listCandidates(const std::vector<NativePath>& directories) {
             identifyByStatus(listing);
     std::vector<std::vector<DirectoryEntry>> entries;
     entries.reserve(listings.size());
-    for (Listing& listing : listings)
-        entries.push_back(sorted(std::move(listing)));
+    for (Listing& listing : listings) {
+        sort(listing.files);
+        entries.push_back(std::move(listing.files));
+    }
     return entries;
 }
 
