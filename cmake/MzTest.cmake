@@ -11,11 +11,13 @@ add_subdirectory(${MZ_GOOGLETEST_SOURCES} ${PROJECT_BINARY_DIR}/googletest EXCLU
 include(GoogleTest)
 
 # The test code runs once per build, so it is hardly optimised and has few debug symbols: both took
-# most of the build time. The tested libraries keep the build's options. Header templates are
-# optimised here as well, except under the sanitizers.
+# most of the build time. The tested libraries and components keep the build's options. Header
+# templates are optimised here as well in the Linux build only.
 add_library(mzTestCode INTERFACE)
 if(MZ_SANITIZE)
   target_compile_options(mzTestCode INTERFACE -O0 -g1)
+elseif(WIN32)
+  target_compile_options(mzTestCode INTERFACE $<$<CONFIG:Release,RelWithDebInfo>:-O0>)
 else()
   target_compile_options(mzTestCode INTERFACE
     $<$<CONFIG:Release,RelWithDebInfo>:-O1> $<$<CONFIG:RelWithDebInfo>:-g1>)

@@ -11,6 +11,8 @@ output=$1
 : "${SOURCE_DATE_EPOCH:?}"
 umask 022
 export TZ=UTC LC_ALL=C.UTF-8
+# A compiler cache may write other paths into the debug symbols.
+export CCACHE_DISABLE=1
 
 version=$(sed -n 's/^#define MZ_VERSION_[A-Z]* \([0-9]*\)$/\1/p' \
   "$top/components/componentManager/version.h" | paste -sd.)

@@ -48,7 +48,8 @@ says "Hello, world!" /tmp/hello/helloHost /tmp/hello/components
 mkdir -p /tmp/byHand/components
 read -ra flags <<<"$(pkg-config --cflags --libs MZcomponentManager)"
 g++ -std=c++20 $hello/helloHost.cpp -o /tmp/byHand/helloHost "${flags[@]}"
-g++ -std=c++20 -shared -fPIC -fvisibility=hidden -fno-gnu-unique $hello/helloComponent.cpp \
+read -ra component_flags <<<"$(pkg-config --variable=component_flags MZcomponentManager)"
+g++ -std=c++20 "${component_flags[@]}" $hello/helloComponent.cpp \
   -o /tmp/byHand/components/hello.so "${flags[@]}"
 says "Hello, world!" /tmp/byHand/helloHost /tmp/byHand/components
 

@@ -24,11 +24,11 @@ copy_sources() {
     xargs -0 tar --ignore-failed-read -cf - | tar -C "$1" -xf -)
 }
 
-# Builds everything again in a folder of another name and depth, without the compiler cache.
+# Builds everything again in a folder of another name and depth.
 build_again() {
   rm -rf "$again"
   copy_sources "$again/in-another-folder"
-  CCACHE_DISABLE=1 "$again/in-another-folder/packaging/buildPackages.sh" "$again/out"
+  "$again/in-another-folder/packaging/buildPackages.sh" "$again/out"
 }
 
 same_packages() {

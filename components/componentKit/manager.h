@@ -38,7 +38,8 @@ inline std::filesystem::path initialize(const std::filesystem::path& folder) {
 /// The caller owns the reference. Release it before `main` returns.
 ///
 /// \return the object; null if the manager is not initialised, if no builder has this uid, if its
-///     library cannot be loaded, if it makes no object, or if the object does not support `Iface`
+///     library cannot be loaded, if it makes no object, or if the object does not support `Iface`.
+///     `mzcomponents explain --load FILE` tells which of them it is for a component library
 /// \throws whatever the library's own code throws
 template <class Iface>
 QrPtr<Iface> create(const QrUid& uid) {

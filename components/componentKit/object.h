@@ -1,9 +1,22 @@
 // SPDX-License-Identifier: BSL-1.0
 /// The base of the counted objects that components make.
 ///
+/// An interface, in a header that host and component share, and a class that has it:
+///
+///     class Greeter : public Mz::QrCastable {
+///       public:
+///         using Self = Greeter;
+///         static constexpr Mz::QrUid uid = "6E1B0A01-4D1F-11EF-9C2A-7B105D3E8F41"_uid;
+///
+///         virtual const char* greeting() const = 0;
+///     };
+///
 ///     class WorldGreeter final : public Mz::Kit::Object<WorldGreeter, Greeter> {
 ///         const char* greeting() const override { return "Hello, world!"; }
 ///     };
+///
+/// The interface declares no destructor: an object is destroyed by its last release. Each interface
+/// has a uid of its own (`mzcomponents uid` prints a new one), and a changed interface a new uid.
 ///
 /// `Object` combines three templates of `castImpl.h`: `QrCastRef` counts the references,
 /// `QrCastHeap` deletes the object at `destroy`, and `QrCastImpl` (for one interface) or

@@ -106,7 +106,8 @@ Explanation explainFile(const std::filesystem::path& file, const ExplainOptions&
         explanation.builders = record->builders;
     const RecordedLibraries nothing;
     compareUids(explanation, options.recorded ? *options.recorded : nothing, record);
-    if (options.folders)
+    // To move another file to the search path is no cure.
+    if (options.folders && explanation.verdict.verdict != Verdict::notALibrary)
         explanation.notes.push_back(judgePath(*options.folders, candidate.path));
     return explanation;
 }

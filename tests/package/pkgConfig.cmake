@@ -11,7 +11,8 @@ set(ENV{LD_LIBRARY_PATH} ${work}/prefix/${libraries})
 
 set(flags "$(${pkgConfig} --cflags --libs MZcomponentManager)")
 run(sh -ec "${compiler} -std=c++20 ${source}/helloHost.cpp -o ${work}/helloHost ${flags}")
-run(sh -ec "${compiler} -std=c++20 -shared -fPIC -fvisibility=hidden ${source}/helloComponent.cpp -o ${work}/components/hello.so ${flags}")
+set(componentFlags "$(${pkgConfig} --variable=component_flags MZcomponentManager)")
+run(sh -ec "${compiler} -std=c++20 ${componentFlags} ${source}/helloComponent.cpp -o ${work}/components/hello.so ${flags}")
 says("Hello, world!" ${work}/helloHost)
 
 # The libraries that a library's headers need come with it: here libMZbase.

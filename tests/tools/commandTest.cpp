@@ -468,6 +468,10 @@ TEST_F(Command, ExplainSaysWhetherASearchPathLeadsToTheFile) {
     EXPECT_EQ(without.exitCode, 0);
     EXPECT_TRUE(Json::parse(without.output).at("files").at(0).at("notes").empty());
     EXPECT_EQ(run({"explain", file, "--path", ";"}).exitCode, 2);
+    // A file that is no library belongs on no path.
+    const std::string text = work.write("notes.txt", "text").string();
+    const ProgramResult other = run({"explain", text, "--json", "--path", path()});
+    EXPECT_TRUE(Json::parse(other.output).at("files").at(0).at("notes").empty());
 }
 
 TEST_F(Command, AFileAsASearchPathIsCalledThat) {
