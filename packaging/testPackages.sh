@@ -45,7 +45,7 @@ for file in lib/mzcomponents-probe bin/mzcomponents bin/mzcomponents.exe bin/mzc
   "$build"/lib/libMZ*.so.*.*.* "$build"/bin/libMZ*.dll; do
   file=${file#"$build"/}
   if [ ! -f "$build/$file" ] || [ -L "$build/$file" ]; then continue; fi
-  new=$(find "$content" -type f -name "${file##*/}" ! -path '*/debug/*')
+  new=$(find "$content" -type f -name "${file##*/}" ! -path '*/debug/*' ! -path '*/share/*')
   if [ "$(wc -l <<<"$new")" != 1 ] || [ -z "$new" ]; then
     echo "the package has not one ${file##*/}: $new" >&2
     exit 1

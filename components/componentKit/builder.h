@@ -35,6 +35,7 @@ class BuilderUid {
     /// Takes an identity that is known at run time only, and must not be nil.
     static BuilderUid atRunTime(const QrUid& uid) { return {uid, RunTime()}; }
 
+    /// Returns the uid.
     constexpr operator const QrUid&() const { return value; }
 
   private:

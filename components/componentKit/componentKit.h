@@ -44,7 +44,7 @@ namespace Mz::Kit {
 /// object to all callers, from the first call until the library is unloaded.
 class Description final : public QrCastImpl<Description, QrComponentDescription> {
   public:
-    using Builders = std::vector<OwnedBuilder>;
+    using Builders = std::vector<OwnedBuilder>; ///< in the order in which they are enumerated
 
     Description(const wchar_t* componentLabel, const wchar_t* componentText, Builders allBuilders)
         : label(componentLabel), text(componentText), builders(std::move(allBuilders)) {

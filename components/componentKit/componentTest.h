@@ -39,8 +39,8 @@ class TestReport {
 
 /// One test. An exception that leaves `run` is a failure.
 struct ComponentTest {
-    const wchar_t* name;
-    void (*run)(TestReport& report);
+    const wchar_t* name;             ///< for the report; a literal
+    void (*run)(TestReport& report); ///< the test
 };
 
 /// The type of the function that `MZ_COMPONENT_TESTS` exports: runs the test with that number,

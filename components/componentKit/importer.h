@@ -25,6 +25,7 @@ template <std::size_t size>
 struct NameText {
     wchar_t text[size]; ///< the characters and a NUL
 
+    /// Copies the literal.
     consteval NameText(const wchar_t (&literal)[size]) : text() {
         std::copy_n(literal, size, text);
     }

@@ -112,12 +112,14 @@ class QrCastImpl2 : public QrCastImpl<Impl, QrCastHierarchy<Impl, Iface, Next, A
 template <class Owner, class Temp>
 class QrTempIface {
   public:
+    /// Returns a new companion, with one reference, if `wanted` is its uid; else null.
     static QrCastable* getInterface(Owner* owner, const QrUid& wanted) {
         if (!(wanted == Temp::uid))
             return nullptr;
         return QrPtr<Temp>(new Temp(owner)).detach();
     }
 
+    /// Returns whether `wanted` is the uid of the companion.
     static bool hasInterface(const Owner*, const QrUid& wanted) { return wanted == Temp::uid; }
 };
 

@@ -62,6 +62,8 @@ static_assert(sizeof(ComponentStamp) == 28 && std::is_trivially_copyable_v<Compo
 #define MZ_CXX_ABI Mz::CxxAbi::unknown
 #endif
 
+/// \def MZ_STRING_ABI
+/// The strings with which this is compiled, a `StringAbi`.
 #if defined(_LIBCPP_ABI_VERSION) && _LIBCPP_ABI_VERSION > 1
 #define MZ_STRING_ABI Mz::StringAbi::libcxxNext
 #elif defined(_LIBCPP_VERSION)

@@ -55,7 +55,7 @@ MZ_COMPONENT_MANAGER_API void replaceFile(const std::filesystem::path& file,
 /// \throws std::system_error if the system does not know it (on Linux, if /proc is not mounted)
 MZ_COMPONENT_MANAGER_API std::filesystem::path programFolder();
 
-/// Returns `path` as a full path without `.` and `..`, without a separator at its end, and with the
+/// Returns `path` as a full path without "." and "..", without a separator at its end, and with the
 /// system's preferred separators. Hosts pass folders to the component manager in this form.
 ///
 /// The result names the same file as `path`. On Linux a symlink before a `..` is therefore resolved

@@ -34,8 +34,10 @@ namespace Mz {
 template <class T>
 class MZ_SHARED_TYPE QrReference {
   public:
+    /// What is referenced, as standard smart pointers name it.
     using element_type = T;
 
+    /// Makes a null reference.
     constexpr QrReference() noexcept = default;
     constexpr QrReference(std::nullptr_t) noexcept {}
 
@@ -43,14 +45,17 @@ class MZ_SHARED_TYPE QrReference {
     QrReference(T* object) : held(object) { take(); }
 
     QrReference(const QrReference& other) : held(other.held) { take(); }
+    /// Takes over the reference of `other`, which becomes null.
     QrReference(QrReference&& other) noexcept : held(other.detach()) {}
 
+    /// Takes a new reference to the object of `other`.
     template <class U>
     requires std::is_convertible_v<U*, T*> QrReference(const QrReference<U>& other)
         : held(other.get()) {
         take();
     }
 
+    /// Takes over the reference of `other`, which becomes null.
     template <class U>
     requires std::is_convertible_v<U*, T*> QrReference(QrReference<U>&& other)
     noexcept : held(other.detach()) {}
@@ -63,24 +68,29 @@ class MZ_SHARED_TYPE QrReference {
         QrReference(other).swap(*this);
         return *this;
     }
+    /// Takes over the reference of `other`, which becomes null, and releases the old one.
     QrReference& operator=(QrReference&& other) noexcept {
         QrReference(std::move(other)).swap(*this);
         return *this;
     }
+    /// Takes a new reference to the object of `other` before it releases the old one.
     template <class U>
     requires std::is_convertible_v<U*, T*> QrReference& operator=(const QrReference<U>& other) {
         QrReference(other).swap(*this);
         return *this;
     }
+    /// Takes over the reference of `other`, which becomes null, and releases the old one.
     template <class U>
     requires std::is_convertible_v<U*, T*> QrReference& operator=(QrReference<U>&& other) noexcept {
         QrReference(std::move(other)).swap(*this);
         return *this;
     }
+    /// Takes a new reference to `other`, which may be null, before it releases the old one.
     QrReference& operator=(T* other) {
         QrReference(other).swap(*this);
         return *this;
     }
+    /// Releases the reference and becomes null.
     QrReference& operator=(std::nullptr_t) noexcept {
         reset();
         return *this;
@@ -94,9 +104,14 @@ class MZ_SHARED_TYPE QrReference {
         return result;
     }
 
+    /// Returns the pointer, without a reference of its own; may be null.
     T* get() const noexcept { return held; }
+
+    /// Accesses the object. This reference must not be null.
     T* operator->() const noexcept { return held; }
     T& operator*() const noexcept { return *held; }
+
+    /// Returns whether this reference is not null.
     explicit operator bool() const noexcept { return held != nullptr; }
 
     /// Releases the reference and becomes null. It becomes null first: code that runs inside the
@@ -110,6 +125,7 @@ class MZ_SHARED_TYPE QrReference {
     /// adopt it.
     [[nodiscard]] T* detach() noexcept { return std::exchange(held, nullptr); }
 
+    /// Exchanges the objects; counts nothing.
     void swap(QrReference& other) noexcept { std::swap(held, other.held); }
     friend void swap(QrReference& a, QrReference& b) noexcept { a.swap(b); }
 
@@ -118,7 +134,9 @@ class MZ_SHARED_TYPE QrReference {
     friend bool operator==(const QrReference& a, const QrReference<U>& b) noexcept {
         return a.get() == b.get();
     }
+    /// Returns whether the reference holds this pointer.
     friend bool operator==(const QrReference& a, const T* b) noexcept { return a.get() == b; }
+    /// Returns whether the reference is null.
     friend bool operator==(const QrReference& a, std::nullptr_t) noexcept { return !a.held; }
 
   private:

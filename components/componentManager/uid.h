@@ -25,11 +25,12 @@ using int64 = long long;
 /// A class that only inherits `uid` is not the interface that `uid` identifies. `Self` reveals such
 /// a class, and the casts reject it at compile time.
 struct QrUid {
-    std::uint32_t w0;
-    std::uint32_t w1;
-    std::uint32_t w2;
-    std::uint32_t w3;
+    std::uint32_t w0; ///< first word: in text, the first 8 digits
+    std::uint32_t w1; ///< second word
+    std::uint32_t w2; ///< third word
+    std::uint32_t w3; ///< fourth word
 
+    /// Returns whether all words are equal.
     friend constexpr bool operator==(const QrUid& a, const QrUid& b) noexcept = default;
 };
 

@@ -5,9 +5,9 @@
 /// version may break source compatibility.
 #pragma once
 
-#define MZ_VERSION_MAJOR 0
-#define MZ_VERSION_MINOR 2
-#define MZ_VERSION_PATCH 0
+#define MZ_VERSION_MAJOR 0 ///< grows with an incompatible change
+#define MZ_VERSION_MINOR 2 ///< grows with what is new
+#define MZ_VERSION_PATCH 0 ///< grows with corrections
 
 /// The version as one ascending number: 10,000 × major + 100 × minor + patch. Use it in `#if`.
 #define MZ_VERSION (MZ_VERSION_MAJOR * 10000 + MZ_VERSION_MINOR * 100 + MZ_VERSION_PATCH)

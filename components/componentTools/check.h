@@ -77,13 +77,13 @@ struct CheckOptions {
 
 /// A builder that a library describes.
 struct CheckedBuilder {
-    QrUid uid{};
-    std::wstring name;
+    QrUid uid{};       ///< its identity
+    std::wstring name; ///< as the library describes it
 };
 
 /// The result of `checkLibrary`.
 struct CheckResult {
-    std::filesystem::path file;
+    std::filesystem::path file;           ///< the library
     std::vector<CheckFinding> findings;   ///< in the order of `checkRules`
     std::vector<const CheckRule*> notRun; ///< rules that were not checked
     std::vector<CheckedBuilder> builders; ///< the builders of the library

@@ -11,7 +11,7 @@ struct Dependency {
     std::wstring name;     ///< the name in the file that needs it
     std::wstring neededBy; ///< the file that needs it
     std::wstring path;     ///< its file, if it was found and has one; valid only if `found`
-    bool found = false;
+    bool found = false;    ///< whether the loader would find it
 };
 
 } // namespace Mz::Tools

@@ -23,11 +23,11 @@ struct Discovery {
 
     /// A folder that cannot be searched, or a file whose name cannot be recorded.
     struct LeftOut {
-        std::filesystem::path path;
-        Finding finding;     ///< the reason
-        bool folder = false; ///< true for a search folder, false for a file in one
+        std::filesystem::path path; ///< of the folder or the file
+        Finding finding;            ///< the reason
+        bool folder = false;        ///< true for a search folder, false for a file in one
     };
-    std::vector<LeftOut> leftOut;
+    std::vector<LeftOut> leftOut; ///< what the manager cannot use
 };
 
 /// Returns the folders of a search path (separated by ';'), made absolute and without "." and "..".

@@ -24,7 +24,8 @@ struct Explanation {
     std::vector<Finding> notes;           ///< findings on its record, its builders and its folder
     std::vector<Dependency> dependencies; ///< each name once, in the loader's order
 
-    std::wstring label, text;              ///< of the component; empty unless it was loaded
+    std::wstring label;                    ///< of the component; empty unless it was loaded
+    std::wstring text;                     ///< of the component; empty unless it was loaded
     std::vector<RecordedBuilder> builders; ///< from the library if it was loaded, else its record
 };
 

@@ -37,7 +37,8 @@ struct ProbeOptions {
 struct ProbeResult {
     Finding verdict;                       ///< `works`, `offersNothing` or a fault
     std::vector<Finding> notes;            ///< findings on its builders
-    std::wstring label, text;              ///< of the component
+    std::wstring label;                    ///< of the component
+    std::wstring text;                     ///< of the component
     std::vector<RecordedBuilder> builders; ///< empty unless the verdict is `works`
 };
 

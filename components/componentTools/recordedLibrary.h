@@ -15,10 +15,12 @@ namespace Mz::Tools {
 
 /// The record of one builder.
 struct RecordedBuilder {
-    QrUid uid{};
-    std::wstring name, label, text;
-    unsigned int number = 0;
-    bool flag = false;
+    QrUid uid{};                ///< its identity
+    std::wstring name;          ///< as the builder describes itself, as all that follows
+    std::wstring label;         ///< for users
+    std::wstring text;          ///< for users
+    unsigned int number = 0;    ///< its meaning is up to host and component
+    bool flag = false;          ///< its meaning is up to host and component
     std::int64_t position = -1; ///< its offset in the list file, in bytes; -1 if it was not read
 };
 
@@ -34,6 +36,7 @@ struct RecordedLibrary {
     std::optional<Finding> kept = std::nullopt;
 };
 
+/// All records of a list, in its order.
 using RecordedLibraries = std::vector<RecordedLibrary>;
 
 /// Returns the record with these normalised names, or null. The list owns it.

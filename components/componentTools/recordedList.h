@@ -20,14 +20,15 @@ namespace Mz::Tools {
 
 /// The result of `readRecordedList`.
 struct ListReading {
+    /// What became of the file.
     enum class State {
         missing,  ///< there is no such file
         good,     ///< the list was read completely
         rejected, ///< damaged, unreadable or not a list: none of it is used
     };
-    State state = State::missing;
-    std::wstring reason; ///< why it was rejected, with the offset of the fault
-    RecordedLibraries libraries;
+    State state = State::missing; ///< what became of the file
+    std::wstring reason;          ///< why it was rejected, with the offset of the fault
+    RecordedLibraries libraries;  ///< empty unless the list is good
 };
 
 /// Reads a list and the verdicts beside it.

@@ -30,13 +30,14 @@ struct ScanOptions {
 
 /// The result for one file or folder.
 struct ScannedFile {
-    std::filesystem::path path;
-    std::wstring directory, fileName; ///< as recorded
-    Finding verdict;
-    std::vector<Finding> notes;
-    bool recorded = false; ///< whether `libraries` has it
-    bool looked = false;   ///< whether it was examined now; false if its old record was used
-    bool folder = false;   ///< true for a search folder that could not be searched
+    std::filesystem::path path; ///< in full
+    std::wstring directory;     ///< as recorded
+    std::wstring fileName;      ///< as recorded
+    Finding verdict;            ///< the most important finding
+    std::vector<Finding> notes; ///< findings on its builders
+    bool recorded = false;      ///< whether `libraries` has it
+    bool looked = false;        ///< whether it was examined now; false if its old record was used
+    bool folder = false;        ///< true for a search folder that could not be searched
 };
 
 /// The result of `scan`.

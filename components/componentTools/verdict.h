@@ -100,10 +100,11 @@ MZ_COMPONENT_TOOLS_API Severity severityOf(Verdict verdict);
 
 /// A verdict on one file, with the details for its sentence.
 struct Finding {
-    Verdict verdict = Verdict::component;
+    Verdict verdict = Verdict::component; ///< what was found
     std::wstring subject; ///< for example the name of a library, a stage or a number
     std::wstring words;   ///< for example the text of an exception or of the loader, or a file name
 
+    /// Returns whether all three are equal.
     friend bool operator==(const Finding&, const Finding&) = default;
 };
 

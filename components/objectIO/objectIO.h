@@ -141,6 +141,7 @@ class MZ_OBJECT_IO_API QrObjectOutBuffer
     /// \return `count`
     /// \throws QrStreamEx::ExWriteError if the text cannot be read back
     int writeChar(const wchar_t* s, int count) override;
+
     using QrForwardingIO::writeChar;
 
     /// Writes bytes. Inside an object, on a stream of both forms, writes a line end between text

@@ -1,0 +1,33 @@
+#!/usr/bin/env bash
+# SPDX-License-Identifier: BSL-1.0
+# Makes the site: buildSite.sh OUTPUT. Fails on any warning: a public name without a comment, a
+# link that leads nowhere.
+set -euo pipefail
+top=$(cd "$(dirname "${BASH_SOURCE[0]}")/../.." && pwd)
+output=$1
+cd "$top"
+rm -rf "$output"
+mkdir -p "$output"
+# The headers that are installed. What stands in rooms is private.
+inputs=(docs/README.md README.md docs/*.md examples/README.md examples/*/README.md)
+for header in components/*/*.h; do
+  case $header in
+  components/platform/* | components/objectIO/object[RT]*.h) ;;
+  *) inputs+=("$header") ;;
+  esac
+done
+version=$(sed -n 's/^#define MZ_VERSION_[A-Z]* \([0-9]*\)$/\1/p' \
+  components/componentManager/version.h | paste -sd.)
+{
+  cat docs/site/Doxyfile
+  printf 'OUTPUT_DIRECTORY = "%s"\nPROJECT_NUMBER = %s\nWARN_LOGFILE = "%s"\n' \
+    "$output" "$version" "$output/warnings.txt"
+  printf 'INPUT = %s\n' "${inputs[*]}"
+} | doxygen -
+# What needs no comment of its own: what overrides a documented function, copies, the constructors
+# of exceptions, the constants by which casts know an interface, and the macros of exports.
+undocumented='is not documented\.$'
+plain=' override \(function\)| override=|Member (Self|uid|CastChainLink) |Member (~?\w+|operator=)\((const (\w+(<.*>)? |char \*file)[^)]*)?\)'
+plain="$plain|Member MZ_\w+_API|Member MZ_IMPORT"
+if grep -vE "($plain).*$undocumented" "$output/warnings.txt" >&2; then exit 1; fi
+rm "$output/warnings.txt"
