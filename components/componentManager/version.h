@@ -5,9 +5,12 @@
 /// version may break source compatibility.
 #pragma once
 
-#define MZ_VERSION_MAJOR 0 ///< grows with an incompatible change
-#define MZ_VERSION_MINOR 2 ///< grows with what is new
-#define MZ_VERSION_PATCH 0 ///< grows with corrections
+/// Grows with an incompatible change.
+#define MZ_VERSION_MAJOR 0
+/// Grows with what is new.
+#define MZ_VERSION_MINOR 2
+/// Grows with corrections.
+#define MZ_VERSION_PATCH 0
 
 /// The version as one ascending number: 10,000 × major + 100 × minor + patch. Use it in `#if`.
 #define MZ_VERSION (MZ_VERSION_MAJOR * 10000 + MZ_VERSION_MINOR * 100 + MZ_VERSION_PATCH)

@@ -9,7 +9,17 @@ cd "$top"
 rm -rf "$output"
 mkdir -p "$output"
 # The headers that are installed. What stands in rooms is private.
-inputs=(docs/README.md README.md docs/*.md examples/README.md examples/*/README.md)
+inputs=(docs/README.md README.md)
+# The site shows the guides in the order in which the index names them.
+while IFS= read -r guide; do inputs+=("docs/$guide"); done \
+  < <(grep -o '](\w[^)/#]*\.md)' docs/README.md | tr -d ']()' | awk '!seen[$0]++')
+for guide in docs/*.md; do
+  if [[ " ${inputs[*]} " != *" $guide "* ]]; then
+    echo "docs/README.md does not name $guide" >&2
+    exit 1
+  fi
+done
+inputs+=(examples/README.md examples/*/README.md)
 for header in components/*/*.h; do
   case $header in
   components/platform/* | components/objectIO/object[RT]*.h) ;;

@@ -105,9 +105,6 @@ class Guide:
             return text
         if anchor:
             return f"[{text}](@ref {anchor_of(path, anchor)})"
-        # The index puts the pages into its order, by which the site's tree is sorted.
-        if self.path == "docs/README.md" and path != self.path:
-            return f"@subpage {page_of(path)} \"{text}\""
         return f"[{text}](@ref {'index' if path == 'docs/README.md' else page_of(path)})"
 
     def links(self, line: str) -> str:
