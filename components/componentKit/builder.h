@@ -33,13 +33,13 @@ class BuilderUid {
     }
 
     /// Takes an identity that is known at run time only, and must not be nil.
-    static BuilderUid atRunTime(const QrUid& uid) { return {uid, RunTime()}; }
+    static BuilderUid atRunTime(const QrUid& uid) { return {uid, RunTime::yes}; }
 
     /// Returns the uid.
     constexpr operator const QrUid&() const { return value; }
 
   private:
-    struct RunTime {};
+    enum class RunTime { yes };
     BuilderUid(const QrUid& uid, RunTime) : value(uid) {}
 
     QrUid value{};
