@@ -7,7 +7,9 @@
 #include "tools/mzcomponents/checkCommand.h"
 #include "tools/mzcomponents/commands.h"
 #include "tools/mzcomponents/exitGuard.h"
+#include "tools/mzcomponents/newCommand.h"
 #include "tools/mzcomponents/output.h"
+#include "tools/mzcomponents/uidCommand.h"
 
 #include "components/componentTools/standardOutput.h"
 
@@ -34,6 +36,8 @@ struct Arguments {
     ImportArguments import;
     GraphArguments graph;
     CheckArguments check;
+    NewArguments made;
+    UidArguments uid;
     std::string shown;
     std::function<int()> command;
 };
@@ -204,6 +208,8 @@ int run(std::vector<std::string> words) {
     addLookCommands(app, arguments);
     addUseCommands(app, arguments);
     addCheckCommand(app, arguments.check, arguments.probe, arguments.command);
+    addNewCommand(app, arguments.made, arguments.command);
+    addUidCommand(app, arguments.uid, arguments.command);
     try {
         std::transform(words.begin(), words.end(), words.begin(), asOneName);
         std::reverse(words.begin(), words.end()); // The parser expects reverse order.
