@@ -32,20 +32,23 @@ expect 2 'NAME: "2d" is not an identifier of C++: use letters, digits and _, and
     new component 2d
 expect 2 'NAME: "class" is a keyword of C++' new component class
 expect 2 'NAME: "a__b" is reserved' new host a__b
-expect 2 '--extension: ".gau" has a dot or a wildcard: write only "gau"' \
+expect 2 '--extension: ".gau" has a dot or a wildcard: write the letters after the dot' \
     new importer gauge --extension .gau
 expect 2 '--extension: "GAU" has capitals: write "gau"' new importer gauge --extension GAU
-expect 2 '--extension: "g/u"' new importer gauge --extension g/u
+expect 2 '--extension: "g/u" is not an extension' new importer gauge --extension g/u
+expect 2 '--extension: "g"u" is not an extension' new importer gauge --extension 'g"u'
 expect 2 '--extension: "gau" is given twice' new importer gauge --extension gau --extension gau
 expect 2 'a;b: the name contains a semicolon' new host gauge --directory 'a;b'
 mkdir full && touch full/something
 expect 1 'full: this folder is not empty' new component gauge --directory full
 expect 1 'something: this is a file, not a folder' new component gauge --directory full/something
-expect 1 'full/something' new component gauge --directory full/something/gauge
+expect 1 'something: this is a file, not a folder' new component gauge --directory full/something/gauge
 [ "$(find . | wc -l)" = 3 ] || complain "refused, but left $(find .)"
 
 # With a limit on the size of files some are written, and then one fails. Wine writes by other means.
 if [[ ${program[0]} != */wine-run ]]; then
+    ln -s nowhere dangling
+    expect 1 'dangling: this is a file, not a folder' new component gauge --directory dangling
     mkdir empty
     for directory in new a/b/c empty; do
         before=$(find . | sort)

@@ -95,10 +95,9 @@ std::string isName(const std::string& name) {
 }
 
 std::string isExtension(const std::string& extension) {
-    const std::size_t dot = extension.find_last_of(".*?");
-    if (dot != std::string::npos)
-        return inQuotes(extension) + " has a dot or a wildcard: write only " +
-               inQuotes(extension.substr(dot + 1));
+    if (extension.find_first_of(".*?") != std::string::npos)
+        return inQuotes(extension) + " has a dot or a wildcard: write the letters after the dot, "
+                                     "such as \"txt\"";
     if (std::any_of(extension.begin(), extension.end(), isUpper)) {
         std::string lower = extension;
         std::transform(lower.begin(), lower.end(), lower.begin(),
@@ -254,7 +253,7 @@ int newProject(const NewArguments& given) {
     }
     const std::wstring obstacle = obstacleToNew(folder);
     if (!obstacle.empty()) {
-        printError(shown(folder) + L": " + obstacle + L". Choose another one with --directory");
+        printError(obstacle + L". Choose another folder with --directory");
         return exitFailure;
     }
     return writeProject(arguments, folder);

@@ -3,6 +3,8 @@
 /// current one. A list of what was created, in order, is removed in the reverse order.
 #include "tools/mzcomponents/newFolder.h"
 
+#include "tools/mzcomponents/output.h"
+
 #include "components/componentManager/files.h"
 
 #include <system_error>
@@ -11,14 +13,16 @@
 namespace Mz::Commands {
 
 std::wstring obstacleToNew(const std::filesystem::path& folder) {
+    // The folders above it that are missing are created, too.
     std::error_code ignored;
-    const std::filesystem::file_status status = std::filesystem::status(folder, ignored);
-    if (!std::filesystem::exists(status))
-        return {};
-    if (!std::filesystem::is_directory(status))
-        return L"this is a file, not a folder";
-    if (!std::filesystem::is_empty(folder))
-        return L"this folder is not empty, and nothing in it is overwritten";
+    std::filesystem::path present = folder;
+    while (!std::filesystem::exists(std::filesystem::symlink_status(present, ignored)) &&
+           present.has_relative_path())
+        present = present.parent_path();
+    if (!std::filesystem::is_directory(present, ignored))
+        return shown(present) + L": this is a file, not a folder";
+    if (present == folder && !std::filesystem::is_empty(folder))
+        return shown(folder) + L": this folder is not empty, and nothing in it is overwritten";
     return {};
 }
 

@@ -1,0 +1,107 @@
+# SPDX-License-Identifier: BSL-1.0
+# Installs `build` below `work`, writes a new project by `mzcomponents new ARGUMENTS`, and runs the
+# commands that it prints and those of the project's README, whose output must be as shown there:
+#   cmake -D "arguments=component gauge" -D preset=linux … -P newProject.cmake
+#
+# "…" in the README stands for any text. On Windows only the printed commands are run: the README
+# shows those of Linux.
+include(${CMAKE_CURRENT_LIST_DIR}/common.cmake)
+
+file(REMOVE_RECURSE ${work})
+run(${CMAKE_COMMAND} --install ${build} --prefix ${work}/prefix)
+set(program ${emulator} ${work}/prefix/bin/mzcomponents${suffix})
+separate_arguments(arguments UNIX_COMMAND "${arguments}")
+list(GET arguments 1 name)
+set(project ${work}/${name})
+
+set(ENV{CMAKE_GENERATOR} ${generator})
+# A user's project may be compiled with more warnings than ours, and as an error.
+set(ENV{CXXFLAGS} "-Werror -Wall -Wextra -Wpedantic -Wconversion -Wshadow -Wold-style-cast -Wnon-virtual-dtor")
+if(NOT suffix)
+  set(ENV{CXX} ${compiler})
+endif()
+
+# runIn(FOLDER COMMAND...): the output is `output`.
+function(runIn folder)
+  execute_process(COMMAND ${ARGN} WORKING_DIRECTORY ${folder}
+    RESULT_VARIABLE result OUTPUT_VARIABLE text ERROR_VARIABLE text)
+  string(REPLACE "\r\n" "\n" text "${text}")
+  if(NOT result EQUAL 0)
+    message(FATAL_ERROR "${ARGN} ended with ${result}:\n${text}")
+  endif()
+  set(output "${text}" PARENT_SCOPE)
+endfunction()
+
+runIn(${work} ${program} new ${arguments})
+string(FIND "${output}" "cmake --workflow --preset ${preset}\n" position)
+if(position EQUAL -1)
+  message(FATAL_ERROR "new ${arguments} does not print the next command:\n${output}")
+endif()
+if(suffix)
+  set(ENV{CMAKE_PREFIX_PATH} ${work}/prefix)
+  runIn(${project} ${CMAKE_COMMAND} --workflow --preset ${preset})
+else() # The printed commands are those of a shell of this system.
+  string(REGEX MATCH "[^\n]*\n[^\n]*--workflow[^\n]*" commands "${output}")
+  runIn(${work} sh -ec "${commands}")
+endif()
+if(NOT output MATCHES "100% tests passed" OR output MATCHES "Skipped")
+  message(FATAL_ERROR "not all tests have passed:\n${output}")
+endif()
+if(suffix)
+  return()
+endif()
+set(ENV{CMAKE_PREFIX_PATH} ${work}/prefix)
+set(ENV{PATH} ${work}/prefix/bin:$ENV{PATH})
+
+# compare(COMMAND TEXT PATTERN): the text must be the pattern, where "…" stands for any text.
+function(compare command text pattern)
+  string(STRIP "${text}" rest)
+  string(STRIP "${pattern}" pattern)
+  # A list of the parts between "…"; a semicolon would part one.
+  string(REPLACE ";" "<semicolon>" parts "${pattern}")
+  string(REPLACE ";" "<semicolon>" rest "${rest}")
+  string(REPLACE "…" ";" parts "${parts}")
+  set(first TRUE)
+  foreach(part IN LISTS parts)
+    string(FIND "${rest}" "${part}" at)
+    if(at EQUAL -1 OR (first AND NOT at EQUAL 0))
+      message(FATAL_ERROR "${command} printed\n${text}\ninstead of\n${pattern}")
+    endif()
+    string(LENGTH "${part}" length)
+    math(EXPR at "${at} + ${length}")
+    string(SUBSTRING "${rest}" ${at} -1 rest)
+    set(first FALSE)
+  endforeach()
+  if(NOT rest STREQUAL "" AND NOT pattern MATCHES "…$")
+    message(FATAL_ERROR "${command} printed\n${text}\ninstead of\n${pattern}")
+  endif()
+endfunction()
+
+file(READ ${project}/README.md shown)
+if(NOT shown MATCHES "```console\n(.*)\n```")
+  message(FATAL_ERROR "the README shows no commands:\n${shown}")
+endif()
+set(shown "\n${CMAKE_MATCH_1}")
+set(count 0)
+while(shown MATCHES "^\n\\$ ([^\n]*)\n?")
+  set(command "${CMAKE_MATCH_1}")
+  string(LENGTH "\n$ ${command}" length)
+  string(SUBSTRING "${shown}" ${length} -1 shown)
+  string(FIND "${shown}" "\n$ " next)
+  string(SUBSTRING "${shown}" 0 ${next} expected)
+  if(next EQUAL -1)
+    set(shown)
+  else()
+    string(SUBSTRING "${shown}" ${next} -1 shown)
+  endif()
+  execute_process(COMMAND sh -c "${command}" WORKING_DIRECTORY ${project}
+    RESULT_VARIABLE result OUTPUT_VARIABLE output ERROR_VARIABLE output)
+  if(NOT result EQUAL 0)
+    message(FATAL_ERROR "${command} ended with ${result}:\n${output}")
+  endif()
+  compare("${command}" "${output}" "${expected}")
+  math(EXPR count "${count} + 1")
+endwhile()
+if(count LESS 3)
+  message(FATAL_ERROR "the README shows only ${count} commands")
+endif()
