@@ -210,7 +210,7 @@ int writeProject(const NewArguments& arguments, const std::filesystem::path& fol
         return reportFailure(written);
     }
     written.keep();
-    printLine(shown(folder) + L": " + std::to_wstring(files.size()) + L" files");
+    printLine(shown(folder) + L": " + counted(files.size(), L"file", L"files"));
     for (const ProjectFile& file : files)
         printLine(L"  " + toWide(file.path));
     printNextCommands(arguments);

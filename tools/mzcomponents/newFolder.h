@@ -9,9 +9,8 @@
 
 namespace Mz::Commands {
 
-/// Returns why new files cannot be written to the folder, with the name of what is in the way; empty
-/// if they can. The folder may be missing or empty.
-/// \param folder  a full path
+/// Returns why new files cannot be written to the folder, with the name of what is in the way;
+/// empty if they can. The folder may be missing or empty. \param folder  a full path
 std::wstring obstacleToNew(const std::filesystem::path& folder);
 
 /// Writes files to a new or empty folder, and creates the folders that are missing. Everything that

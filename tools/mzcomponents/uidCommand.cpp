@@ -38,7 +38,8 @@ void addUidCommand(CLI::App& app, UidArguments& arguments, std::function<int()>&
         ->type_name("")
         ->check(isCount);
     uid->add_flag("--words", arguments.words,
-                  "Write four words, {0x…, 0x…, 0x…, 0x…}, instead of the text of \"…\"_uid");
+                  "Write four words, {0x..., 0x..., 0x..., 0x...}, instead of the text of "
+                  "\"...\"_uid");
     uid->footer("Example:\n  mzcomponents uid 2");
     uid->callback([&] { command = [&] { return Mz::Commands::uid(arguments); }; });
 }
