@@ -87,7 +87,8 @@ TEST_F(Command, LeavesNoVerdictsBesideAFolderThatIsNamedAsTheList) {
 TEST_F(Command, HelpSaysWhatEachDoesWithAnExample) {
     const ProgramResult help = run({"--help"});
     EXPECT_EQ(help.exitCode, 0);
-    for (const char* command : {"list", "explain", "scan", "types", "import", "show", "graph"}) {
+    for (const char* command :
+         {"list", "explain", "scan", "profile", "types", "import", "show", "graph"}) {
         EXPECT_THAT(help.output, HasSubstr(command));
         const ProgramResult own = run({command, "--help"});
         EXPECT_EQ(own.exitCode, 0);

@@ -6,7 +6,7 @@ _mzcomponents() {
   local options word command=
   for word in "${COMP_WORDS[@]:1:COMP_CWORD-1}"; do
     case $word in
-    list | explain | scan | types | import | show | graph | check)
+    list | explain | scan | profile | types | import | show | graph | check)
       command=$word
       break
       ;;
@@ -27,13 +27,14 @@ _mzcomponents() {
     mapfile -t COMPREPLY < <(compgen -W "error warning note" -- "$current")
     return
     ;;
-  --time-limit | --memory-limit | --seed | --fuzz | --jobs | --reproduce | --explain) return ;;
+  --time-limit | --memory-limit | --seed | --fuzz | --jobs | --reproduce | --explain | --runs) return ;;
   esac
   case $command in
-  '') options="list explain scan types import show graph check --help --version" ;;
+  '') options="list explain scan profile types import show graph check --help --version" ;;
   list) options=$common ;;
   explain) options="$common $limits --load" ;;
   scan) options="$common $limits --retry" ;;
+  profile) options="$common $limits --runs --svg" ;;
   import) options="$common $limits --save" ;;
   graph) options="$common $limits --output --svg" ;;
   check)

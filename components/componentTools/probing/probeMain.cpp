@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: BSL-1.0
-/// The program `mzcomponents-probe FILE MEMORY`, and with `--check` as its first argument the child
-/// process of a check (`checking/checkChild.h`). Without it the program loads one library, requests
+/// The program `mzcomponents-probe FILE MEMORY`. With `--check` as its first argument it is the child
+/// process of a check (`checking/checkChild.h`), with `--profile` that of the measurement of a start
+/// (`profiling/profileChild.h`). Else the program loads one library, requests
 /// its description as the component manager does, and reports on standard output.
 /// libMZcomponentTools starts it. Before each stage it reports the stage, so that the parent
 /// process knows where a crash happened. It ends without running exit handlers, because the
@@ -11,6 +12,7 @@
 #include "components/componentTools/platform/system.h"
 #include "components/componentTools/probing/fatalFaults.h"
 #include "components/componentTools/probing/probeAnswer.h"
+#include "components/componentTools/profiling/profileChild.h"
 #include "components/platform/platform.h"
 
 #include <clocale>
@@ -123,6 +125,8 @@ int main(int argc, char** argv) {
     const std::vector<std::string> arguments = System::arguments(argc, argv);
     if (!arguments.empty() && arguments[0] == checkArgument)
         return runCheckChild(arguments);
+    if (!arguments.empty() && arguments[0] == profileArgument)
+        return runProfileChild(arguments);
     if (arguments.size() != 2) {
         std::fputs("mzcomponents-probe is started by libMZcomponentTools; see mzcomponents\n",
                    stderr);
