@@ -13,6 +13,7 @@
 
 #include <algorithm>
 #include <map>
+#include <set>
 #include <utility>
 
 namespace Mz::Tools {
@@ -47,7 +48,6 @@ class Profiler {
         const std::wstring searchPath = searchPathOf(options.folders);
         if (!searchPath.empty()) {
             files = listStartFiles(searchPath);
-            findRecords(files, recorded);
             while (!measure())
                 clearSamples();
         }
@@ -156,12 +156,12 @@ class Profiler {
     void exclude(const System::ChildResult& child, const ProfileReport& report) {
         const Finding finding = judgeEnd(child, answerOfReport(report), options.process);
         over = !report.current || excluded.size() >= mostExcluded;
-        if (over)
+        if (over) {
             result.problem = L"the process of the measurement ended early: " + sentenceOf(finding);
-        else
-            excluded.emplace(*report.current);
-        if (!over)
+        } else {
+            excluded.insert(*report.current);
             verdicts[*report.current] = finding;
+        }
     }
 
     /// Measures `initialize`. A library that only ends the process of the manager has no name here.
