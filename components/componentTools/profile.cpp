@@ -210,8 +210,8 @@ class Profiler {
         library.verdict = verdict;
         library.loaded = verdict.verdict != Verdict::recordedUnchanged;
         library.measured = !excluded.contains(index);
-        if (verdict.verdict == Verdict::loadFailed && !result.interrupted)
-            library.verdict = whyLoadFails(library.path, verdict);
+        if (!result.interrupted)
+            library.verdict = explained(library, verdict);
         if (!list.empty())
             library.record = library.loaded ? whyLoaded(library.path) : verdict;
         for (std::size_t phase = 0; phase < startPhaseCount; ++phase) {
@@ -223,14 +223,20 @@ class Profiler {
         return library;
     }
 
-    /// Returns the verdict that a scan would give.
-    Finding whyLoadFails(const std::filesystem::path& path, const Finding& seen) const {
+    /// Returns the verdict of a scan, where it explains more than what this process has seen: why
+    /// the system does not load the library, or that a library that crashes is for another ABI.
+    Finding explained(const ProfiledLibrary& library, const Finding& seen) const {
+        const bool loadFailed = seen.verdict == Verdict::loadFailed;
+        if (library.measured && !loadFailed)
+            return seen;
         ExplainOptions explaining;
-        explaining.load = true;
+        explaining.load = loadFailed;
         explaining.probe = options.process;
-        Finding finding = explainFile(path, explaining).verdict;
+        Finding finding = explainFile(library.path, explaining).verdict;
         if (severityOf(finding.verdict) == Severity::fault)
             return finding;
+        if (!loadFailed)
+            return seen;
         return {seen.verdict, {}, L"it loads alone, but not after the libraries before it"};
     }
 

@@ -82,7 +82,7 @@ TEST_F(Profile, NamesTheLibraryWithTheSlowInitialiserFirst) {
     add(L"goodWithKit", L"a");
     add(L"sleepsInInitialiser");
     add(L"notes", L"z");
-    const StartProfile profile = profileStart(options());
+    const StartProfile profile = profileStart(options(3));
     ASSERT_EQ(profile.libraries.size(), 3u);
     expectSlowIn(StartPhase::load, profile, L"sleepsInInitialiser");
     EXPECT_EQ(profile.problem, L"");
@@ -91,13 +91,13 @@ TEST_F(Profile, NamesTheLibraryWithTheSlowInitialiserFirst) {
 TEST_F(Profile, PutsASlowDescriptionIntoItsColumn) {
     add(L"goodWithKit");
     add(L"sleepsInDescription");
-    expectSlowIn(StartPhase::description, profileStart(options()), L"sleepsInDescription");
+    expectSlowIn(StartPhase::description, profileStart(options(3)), L"sleepsInDescription");
 }
 
 TEST_F(Profile, PutsASlowBuilderDescriptionIntoTheRegistration) {
     add(L"goodWithKit");
     add(L"sleepsInBuilder");
-    expectSlowIn(StartPhase::registration, profileStart(options()), L"sleepsInBuilder");
+    expectSlowIn(StartPhase::registration, profileStart(options(3)), L"sleepsInBuilder");
 }
 
 TEST_F(Profile, AddsUpToTheManagersOwnInitialize) {
@@ -151,6 +151,19 @@ TEST_F(Profile, NamesLibrariesThatEndTheProcessAndMeasuresTheOthers) {
     EXPECT_GE(*profile.initialize, slow);
     EXPECT_EQ(profile.problem, L"");
     EXPECT_EQ(profile.otherFiles, 0u);
+}
+
+TEST_F(Profile, TellsFilesApartWhoseNamesDifferOnlyInCase) {
+    add(L"goodWithKit", L"a");
+    if (std::filesystem::exists(folder.path() / "A"))
+        GTEST_SKIP() << "names ignore case here";
+    add(L"crashesInEntryPoint", L"A");
+    const StartProfile profile = profileStart(options());
+    ASSERT_EQ(profile.libraries.size(), 2u);
+    EXPECT_EQ(find(profile, L"a").verdict.verdict, Verdict::works);
+    EXPECT_EQ(find(profile, L"A").verdict.verdict, Verdict::crashed);
+    EXPECT_TRUE(profile.initialize);
+    EXPECT_EQ(profile.problem, L"");
 }
 
 TEST_F(Profile, ExcludesALibraryThatHangs) {
