@@ -11,6 +11,7 @@
 #include "components/componentTools/discovery.h"
 #include "components/componentTools/explain.h"
 #include "components/componentTools/platform/system.h"
+#include "components/componentTools/probing/probeProcess.h"
 
 #include <algorithm>
 #include <charconv>
@@ -19,9 +20,6 @@
 namespace Mz::Tools {
 
 namespace {
-
-/// The limit of the messages of one process, in bytes.
-constexpr std::size_t longestReport = std::size_t{64} << 20;
 
 /// The largest number of processes for the rules of one kind. A library that ends each of them is
 /// faulty enough.
@@ -176,19 +174,15 @@ class CheckRun {
     Outcome runChildProcess() const {
         Outcome outcome;
         const ProbeOptions& process = options.process;
-        const std::uint64_t refused = process.memoryLimit * 2 + (std::uint64_t{1} << 30);
-        System::ChildLimits limits{process.timeLimit, process.memoryLimit, refused, longestReport,
+        const std::uint64_t refused = refusedMemory(process);
+        System::ChildLimits limits{process.timeLimit, process.memoryLimit, refused, longestAnswer,
                                    process.interrupted};
         limits.outputRestartsTime = true;
         limits.received = [&](std::string& bytes) { decodeReport(bytes, outcome.report); };
-        const std::filesystem::path program =
-            process.program.empty() ? System::moduleFolder() / (std::string("mzcomponents-probe") +
-                                                                System::programExtension())
-                                    : process.program;
         std::vector<std::filesystem::path> arguments{checkArgument, std::to_string(refused),
                                                      encodeTask(task), task.file};
         arguments.insert(arguments.end(), task.samples.begin(), task.samples.end());
-        outcome.child = System::runChild(program, arguments, limits);
+        outcome.child = System::runChild(probeProgram(process), arguments, limits);
         return outcome;
     }
 

@@ -90,7 +90,8 @@ TEST_F(Command, HelpSaysWhatEachDoesWithAnExample) {
     for (const char* command : {"check", "new", "uid"})
         EXPECT_THAT(run({command, "--help"}).output,
                     HasSubstr("Example:\n  mzcomponents " + std::string(command)));
-    for (const char* command : {"list", "explain", "scan", "types", "import", "show", "graph"}) {
+    for (const char* command :
+         {"list", "explain", "scan", "profile", "types", "import", "show", "graph"}) {
         EXPECT_THAT(help.output, HasSubstr(command));
         const ProgramResult own = run({command, "--help"});
         EXPECT_EQ(own.exitCode, 0);

@@ -9,8 +9,6 @@
 #include "tools/mzcomponents/output.h"
 #include "tools/mzcomponents/suppressions.h"
 
-#include "components/componentManager/files.h"
-
 #include <CLI/CLI.hpp>
 #include <algorithm>
 #include <atomic>
@@ -154,16 +152,6 @@ std::vector<CheckedLibrary> judged(std::vector<Tools::CheckResult> results,
         library.result = std::move(result);
     }
     return libraries;
-}
-
-bool writeFile(const std::string& name, const std::string& content) {
-    try {
-        replaceFile(Tools::pathOf(name), content);
-        return true;
-    } catch (...) {
-        printError(toWide(name) + L": " + exceptionText());
-        return false;
-    }
 }
 
 bool writeReports(const std::vector<CheckedLibrary>& libraries, const CheckArguments& arguments,

@@ -9,6 +9,7 @@
 #include "tools/mzcomponents/exitGuard.h"
 #include "tools/mzcomponents/newCommand.h"
 #include "tools/mzcomponents/output.h"
+#include "tools/mzcomponents/profileCommand.h"
 #include "tools/mzcomponents/uidCommand.h"
 
 #include "components/componentTools/standardOutput.h"
@@ -38,6 +39,7 @@ struct Arguments {
     CheckArguments check;
     NewArguments made;
     UidArguments uid;
+    ProfileArguments profile;
     std::string shown;
     std::function<int()> command;
 };
@@ -140,6 +142,20 @@ void addLookCommands(CLI::App& app, Arguments& arguments) {
     addLimits(scan, arguments);
     scan->callback([&] {
         arguments.command = [&] { return Mz::Commands::scan(arguments.common, arguments.probe); };
+    });
+
+    CLI::App* profile = addCommand(
+        app, arguments, "profile",
+        "Measures in child processes where the time of a host's start goes: which library makes it "
+        "slow, and with what.",
+        "mzcomponents profile --path /opt/app/components --svg start.svg");
+    addCache(profile, arguments, "A recorded list: measure the start with it, too");
+    addProfileOptions(*profile, arguments.profile);
+    addLimits(profile, arguments);
+    profile->callback([&] {
+        arguments.command = [&] {
+            return Mz::Commands::profile(arguments.common, arguments.profile, arguments.probe);
+        };
     });
 }
 

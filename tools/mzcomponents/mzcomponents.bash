@@ -6,7 +6,7 @@ _mzcomponents() {
   local options word command= kind=
   for word in "${COMP_WORDS[@]:1:COMP_CWORD-1}"; do
     case $word in
-    list | explain | scan | types | import | show | graph | check | new | uid)
+    list | explain | scan | profile | types | import | show | graph | check | new | uid)
       command=${command:-$word}
       ;;
     component | importer | host) [ "$command" != new ] || kind=${kind:-$word} ;;
@@ -27,15 +27,16 @@ _mzcomponents() {
     mapfile -t COMPREPLY < <(compgen -W "error warning note" -- "$current")
     return
     ;;
-  --time-limit | --memory-limit | --seed | --fuzz | --jobs | --reproduce | --explain | --extension)
+  --time-limit | --memory-limit | --seed | --fuzz | --jobs | --reproduce | --explain | --extension | --runs)
     return
     ;;
   esac
   case $command in
-  '') options="list explain scan types import show graph check new uid --help --version" ;;
+  '') options="list explain scan profile types import show graph check new uid --help --version" ;;
   list) options=$common ;;
   explain) options="$common $limits --load" ;;
   scan) options="$common $limits --retry" ;;
+  profile) options="$common $limits --runs --svg" ;;
   import) options="$common $limits --save" ;;
   graph) options="$common $limits --output --svg" ;;
   check)

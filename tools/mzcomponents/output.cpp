@@ -6,6 +6,7 @@
 #include "components/componentTools/uidText.h"
 
 #include "components/base/exBase.h"
+#include "components/componentManager/files.h"
 #include "components/componentManager/utf8.h"
 #include "components/componentTools/console.h"
 #include "components/componentTools/discovery.h"
@@ -81,6 +82,16 @@ void printLine(const std::wstring& text) {
 
 void printJson(const Json& value) {
     results() << value.dump(2, ' ', true) << '\n';
+}
+
+bool writeFile(const std::string& name, const std::string& content) {
+    try {
+        replaceFile(Tools::pathOf(name), content);
+        return true;
+    } catch (...) {
+        printError(toWide(name) + L": " + exceptionText());
+        return false;
+    }
 }
 
 Json jsonOf(const Tools::Finding& finding) {

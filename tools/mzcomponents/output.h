@@ -52,6 +52,10 @@ void printLine(const std::wstring& text);
 /// result is independent of encodings.
 void printJson(const Json& value);
 
+/// Replaces the content of a file. Reports a failure, and returns whether there was none.
+/// \param name  the file's name, as in an argument
+bool writeFile(const std::string& name, const std::string& content);
+
 Json jsonOf(const Tools::Finding& finding);
 Json jsonOf(const Tools::RecordedBuilder& builder);
 Json jsonOf(const Tools::RecordedLibrary& library);

@@ -1,25 +1,23 @@
 // SPDX-License-Identifier: BSL-1.0
-/// The program `mzcomponents-probe FILE MEMORY`, and with `--check` as its first argument the child
-/// process of a check (`checking/checkChild.h`). Without it the program loads one library, requests
+/// The program `mzcomponents-probe FILE MEMORY`. With `--check` as its first argument it is the child
+/// process of a check (`checking/checkChild.h`), with `--profile` that of the measurement of a start
+/// (`profiling/profileChild.h`). Else the program loads one library, requests
 /// its description as the component manager does, and reports on standard output.
 /// libMZcomponentTools starts it. Before each stage it reports the stage, so that the parent
 /// process knows where a crash happened. It ends without running exit handlers, because the
 /// library's handlers and destructors may fail.
 #include "components/componentManager/componentImp.h"
-#include "components/componentManager/nativeText.h"
 #include "components/componentManager/recordFormat.h"
 #include "components/componentTools/checking/checkChild.h"
 #include "components/componentTools/platform/system.h"
-#include "components/componentTools/probing/exceptionText.h"
+#include "components/componentTools/probing/fatalFaults.h"
 #include "components/componentTools/probing/probeAnswer.h"
+#include "components/componentTools/profiling/profileChild.h"
 #include "components/platform/platform.h"
 
 #include <clocale>
-#include <csignal>
 #include <cstdio>
 #include <cstdlib>
-#include <exception>
-#include <new>
 
 #ifdef MZ_UNLIMITED_ADDRESSES
 /// Lets a crash end the process by its signal under the sanitizers too.
@@ -35,7 +33,6 @@ using namespace Mz::Tools;
 namespace {
 
 System::AnswerPipe* answers = nullptr;
-std::string abortedMessage;
 
 void send(const std::string& message) {
     answers->write(message.data(), message.size());
@@ -43,35 +40,6 @@ void send(const std::string& message) {
 
 void sendFault(Verdict verdict, const std::wstring& subject = {}, const std::wstring& words = {}) {
     send(encodeFault(verdict, subject, words));
-}
-
-/// Returns the finding for the current exception. `std::bad_alloc` becomes `outOfMemory`, which the
-/// parent process checks against the memory that was really used.
-Finding exceptionFinding(Verdict verdict, const std::wstring& before) {
-    try {
-        throw;
-    } catch (const std::bad_alloc&) {
-        return {Verdict::outOfMemory, {}, {}};
-    } catch (const ExBase& failure) {
-        return {verdict, {}, before + displayText(failure.getReason())};
-    } catch (const std::exception& failure) {
-        return {verdict, {}, before + foreignText(failure.what())};
-    } catch (...) {
-        return {verdict, {}, before + exceptionClass()};
-    }
-}
-
-void onAbort(int) {
-    answers->write(abortedMessage.data(), abortedMessage.size());
-    System::endProcess(3);
-}
-
-void onTerminate() {
-    Finding finding{Verdict::aborted, {}, L" (std::terminate)"};
-    if (std::current_exception())
-        finding = exceptionFinding(Verdict::aborted, L": uncaught exception: ");
-    sendFault(finding.verdict, finding.subject, finding.words);
-    System::endProcess(3);
 }
 
 /// Copies the builder descriptions, with the same calls as the manager. Reports an item that is no
@@ -157,6 +125,8 @@ int main(int argc, char** argv) {
     const std::vector<std::string> arguments = System::arguments(argc, argv);
     if (!arguments.empty() && arguments[0] == checkArgument)
         return runCheckChild(arguments);
+    if (!arguments.empty() && arguments[0] == profileArgument)
+        return runProfileChild(arguments);
     if (arguments.size() != 2) {
         std::fputs("mzcomponents-probe is started by libMZcomponentTools; see mzcomponents\n",
                    stderr);
@@ -164,11 +134,9 @@ int main(int argc, char** argv) {
     }
     System::AnswerPipe pipe;
     answers = &pipe;
-    abortedMessage = encodeFault(Verdict::aborted, {}, {});
     System::confine(std::strtoull(arguments[1].c_str(), nullptr, 10));
     std::setlocale(LC_ALL, "");
-    std::signal(SIGABRT, onAbort);
-    std::set_terminate(onTerminate);
+    reportFatalFaults(pipe, encodeFault);
     send(encodeStage(Stage::starting));
     probe(System::pathOfArgument(arguments[0]));
     System::endProcess(answeredStatus);
