@@ -10,12 +10,13 @@ own, `<!-- WORD -->` or `<!-- WORD: VALUE -->`, and does not show on the page:
   not run: WHY   the block cannot be run by a test
   diagram        a picture made of text (language "text")
 
-Two comments need no block. They are steps of the page, in its order:
+These comments need no block. They are steps of the page, in its order:
 
   copy: FROM as TO   copies a file or folder of the `build` or the `source` tree; "with OFFSET=BYTE"
                      changes one byte of the copy
   install            installs the build, for blocks that use CMake
   root: FOLDER       how the page names the folder in which its commands run
+  instead: A of B    commands use B, of the `build` or the `source` tree, where the page says A
 
 A block without a kind is an error: nothing on a page escapes the tests.
 """
@@ -52,7 +53,7 @@ class Step:
 
 
 BLOCK_NOTES = {"file", "Linux", "Windows", "tested", "not run", "diagram"}
-STEPS = {"copy", "install", "root"}
+STEPS = {"copy", "install", "root", "instead"}
 COMMENT = re.compile(r"^\s*<!-- ([A-Za-z][a-z]*(?: run)?)(?:: (.*?))? -->$")
 FENCE = re.compile(r"^(\s*)(```+|~~~+)(.*)$")
 
@@ -132,4 +133,4 @@ def kind_of(block, previous):
         if previous and previous.kind == "compiled" and re.search(r"^int main\(", previous.text, re.M):
             return "output"
         return ""
-    return {"cmake": "configured", "console": "console", "sh": "shell"}.get(block.language, "")
+    return {"cmake": "cmake", "console": "console", "sh": "shell"}.get(block.language, "")

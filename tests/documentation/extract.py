@@ -3,9 +3,8 @@
 
   extract.py OUTPUT SOURCES TESTS linux|windows PAGE…
 
-OUTPUT/blocks.cmake sets documentedSources (to compile), documentedPrograms (to build),
-documentedFolders (with a CMakeLists.txt made of a block) and documentedRuns (pages with commands or
-programs). SOURCES is the root of the source tree, for names in messages. TESTS is the folder in which
+OUTPUT/blocks.cmake sets documentedSources (to compile), documentedPrograms (to build) and
+documentedRuns (pages with something to run). SOURCES is the root of the source tree, for names in messages. TESTS is the folder in which
 the names of tests are looked up. Files whose content is the same are not touched.
 """
 import sys
@@ -39,7 +38,7 @@ def main():
     output, sources, tests = (Path(argument) for argument in sys.argv[1:4])
     windows = sys.argv[4] == "windows"
     known = tests_of(tests)
-    result = {"Sources": [], "Programs": [], "Folders": [], "Runs": []}
+    result = {"Sources": [], "Programs": [], "Runs": []}
     for page in (Path(argument) for argument in sys.argv[5:]):
         folder = output / page.stem
         runs, number = False, 0
@@ -47,7 +46,7 @@ def main():
             if not isinstance(item, Block) or not item.applies(windows):
                 continue
             number += 1
-            runs |= item.kind in ("program", "console", "shell")
+            runs |= item.kind in ("program", "console", "shell", "cmake")
             place = f"#line {item.line} \"{page.relative_to(sources)}\"\n"
             if item.kind == "tested":
                 check_test(item, known)
@@ -65,10 +64,6 @@ def main():
                 elif "file" not in item.notes:
                     write(file, place + item.text)
                 result["Sources"].append(file)
-            elif item.kind == "configured":
-                write(folder / f"cmake{number}" / "CMakeLists.txt",
-                      f"set(CMAKE_CURRENT_SOURCE_DIR {folder})\n" + item.text)
-                result["Folders"].append(folder / f"cmake{number}")
         if runs:
             result["Runs"].append(page)
     write(output / "blocks.cmake", "".join(

@@ -109,7 +109,7 @@ class Headings(Page):
     def headings(self, text):
         source = self.page.parent / "source"
         source.write_text('{"one"}, {"two"}')
-        return self.script("headings.py", self.write(text), source, r'"(\w+)"')[0]
+        return self.script("headings.py", self.write(text), r'"(\w+)"', source)[0]
 
     def test_each_name_needs_a_heading(self):
         self.assertEqual(self.headings("### `one`\n### two (Linux)\n"), 0)

@@ -4,9 +4,10 @@
   run.py PAGE --build FOLDER --source FOLDER --programs FOLDER --work FOLDER
          [--windows] [--emulator COMMAND] [--cmake NAME=VALUE]… [--update]
 
-All commands of a page run one after the other in one folder, the root, which is empty at first. The
-page names it /home/me, unless it says otherwise. In an expected output, "…" stands for any text, or on
-a line of its own for any lines. A comment "# ends with N" at the end of a command is its exit status.
+A block of CMake becomes a project with the files of the page, and is built. All commands of a page run
+one after the other in one folder, the root, which is empty at first. The page names it /home/me, unless
+it says otherwise. In an expected output, "…" stands for any text, or on a line of its own for any lines.
+A comment "# ends with N" at the end of a command is its exit status.
 
 Pages show what Linux prints. On Windows names of files are compared as if they were those of Linux.
 --update writes the real output and status of commands into the page, where they differ.
@@ -32,6 +33,7 @@ class Runner:
         self.root = self.work / "root"
         self.folder = self.root
         self.shown = "/home/me"
+        self.instead = []  # (what a page says, what is used)
         self.changes = []  # (first line, number of lines, new lines), from 1
         tools = self.work / "bin"
         for folder in (self.root, tools):
@@ -49,10 +51,33 @@ class Runner:
     def step(self, item):
         if item.kind == "root":
             self.shown = item.value
+        elif item.kind == "instead":
+            said, _, used = item.value.partition(" of ")
+            tree, _, rest = used.partition("/")
+            self.instead.append((said, f"{getattr(self.options, tree)}/{rest}"))
         elif item.kind == "install":
-            self.call(["cmake", "--install", self.options.build, "--prefix", self.work / "prefix"])
+            self.install()
         else:
             self.copy(item)
+
+    def install(self):
+        if not (self.work / "prefix").exists():
+            self.call(["cmake", "--install", self.options.build, "--prefix", self.work / "prefix"])
+
+    def cmake(self, block, files):
+        """Makes a project of the block and of the files of the page, and builds it."""
+        self.install()
+        source = self.work / "cmake" / str(block.line)
+        for name, text in files.items():
+            (source / name).parent.mkdir(parents=True, exist_ok=True)
+            (source / name).write_text(text, encoding="utf-8")
+        (source / "CMakeLists.txt").write_text(
+            f"cmake_minimum_required(VERSION 3.25)\nproject(block LANGUAGES CXX)\n{block.text}")
+        for arguments in (["-S", source, "-B", source / "build"], ["--build", source / "build"]):
+            done = subprocess.run(["cmake", *arguments], env=self.environment, text=True,
+                                  stdout=subprocess.PIPE, stderr=subprocess.STDOUT)
+            if done.returncode:
+                fail(block.page, block.line, f"cmake ended with {done.returncode}:\n{done.stdout}")
 
     def copy(self, item):
         origin, _, target = item.value.partition(" as ")
@@ -98,6 +123,8 @@ class Runner:
 
     def shell(self, command):
         """Runs one command; returns its status and its output."""
+        for said, used in self.instead:
+            command = command.replace(said, used)
         if self.options.windows:
             command = re.sub(r"(^|[;&|] *)([\w./-]+)", self.windows_program, self.native(command))
         place = self.work / "folder"
@@ -125,6 +152,9 @@ class Runner:
             command = split_status(command)[0] + (f"   # ends with {status}" if status else "")
             self.changes.append((line - 1, len(expected) + 1,
                                  [command] + (actual if actual != [""] else [])))
+            return
+        if self.options.update and block.kind == "output":
+            self.changes.append((line, len(expected), actual))
             return
         shown = "\n".join(expected)
         printed = "\n".join(actual)
@@ -158,7 +188,7 @@ class Runner:
         return done.returncode, done.stdout.decode("utf-8", "replace")
 
     def page(self, page):
-        items, number = parse(page), 0
+        items, number, files = parse(page), 0, {}
         ran = (0, "")
         for item in items:
             if not isinstance(item, Block):
@@ -168,11 +198,14 @@ class Runner:
                 continue
             number += 1
             if "file" in item.notes:
+                files[item.notes["file"]] = item.text
                 file = self.root / item.notes["file"]
                 file.parent.mkdir(parents=True, exist_ok=True)
                 file.write_text(item.text, encoding="utf-8")
             if item.kind == "console":
                 self.console(item)
+            elif item.kind == "cmake":
+                self.cmake(item, files)
             elif item.kind == "shell":
                 status, output = self.shell("set -e\n" + item.text)
                 self.compare(item, item.line, item.text, status, 0, output, ["…"])

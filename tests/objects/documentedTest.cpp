@@ -35,7 +35,8 @@ TEST(DocumentedGauges, AreSavedAndLoaded) {
 
 TEST(DocumentedGauges, AreNotLoadedFromAFileThatCannotBeOpened) {
     const Mz::Test::TemporaryDirectory folder;
-    EXPECT_THROW(loadGauge((folder.path() / "nothing").string().c_str()), Mz::QrStreamEx::ExReadOpen);
+    EXPECT_THROW(loadGauge((folder.path() / "nothing").string().c_str()),
+                 Mz::QrStreamEx::ExReadOpen);
 }
 
 } // namespace
