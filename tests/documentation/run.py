@@ -114,8 +114,8 @@ class Runner:
         text = text.replace("\r\n", "\n")
         if self.options.windows:
             root = str(self.root).replace("/", "\\")
-            text = re.sub(r"(?:[Zz]:)?" + re.escape(root) + r"[^\s:\"']*",
-                          lambda name: name[0][name[0].index("\\"):].replace("\\", "/"), text)
+            text = re.sub(r"(?:[Zz]:)?" + re.escape(root) + r"([^\s:\"']*)",
+                          lambda name: str(self.root) + name[1].replace("\\", "/"), text, flags=re.I)
             text = re.sub(r"[Zz]:(?=" + re.escape(str(self.root)) + ")", "", text)
             text = re.sub(r"\.dll\b", ".so", text)
         text = text.replace(str(self.root), self.shown)

@@ -77,10 +77,10 @@ TEST_F(RecordedLibrary, UnchangedThatTheHostLoadedIsUsedLazilyAndNotFreed) {
 TEST_F(RecordedLibrary, OfARelativeFolderIsDroppedOnUseIfTheCurrentFolderHasChanged) {
     const std::filesystem::path here = std::filesystem::current_path();
     std::filesystem::create_directory(folder.path() / "plugins");
-    std::filesystem::rename(add(L"goodByHand"), folder.path() / "plugins" / "good");
+    std::filesystem::rename(add(L"goodWithKit"), folder.path() / "plugins" / "kit");
     std::filesystem::current_path(folder.path());
     manager->initialize(L"plugins");
-    EXPECT_EQ(maker(goodUid), "good");
+    EXPECT_EQ(maker(kitUid), "kit");
     std::stringstream list;
     {
         QrOutBuffer bytes(&list);
@@ -94,9 +94,9 @@ TEST_F(RecordedLibrary, OfARelativeFolderIsDroppedOnUseIfTheCurrentFolderHasChan
         manager->readRecords(stream);
     }
     manager->initialize(L"plugins");
-    EXPECT_TRUE(indexed(goodUid));
+    EXPECT_TRUE(indexed(kitUid));
     std::filesystem::current_path(here);
-    EXPECT_FALSE(manager->createObject(goodUid));
+    EXPECT_FALSE(manager->createObject(kitUid));
     EXPECT_THAT(names(), IsEmpty());
 }
 
