@@ -72,7 +72,8 @@ Reproduction parseReproduction(const std::string& text) {
 }
 
 std::wstring seconds(std::chrono::milliseconds time) {
-    return std::to_wstring((time.count() + 999) / 1000);
+    const auto count = (time.count() + 999) / 1000;
+    return std::to_wstring(count) + (count == 1 ? L" second" : L" seconds");
 }
 
 /// Returns what happened to a process, as the end of a sentence.
@@ -80,7 +81,7 @@ std::wstring endingOf(const System::ChildResult& child, const CheckReport& repor
                       const ProbeOptions& limits) {
     using End = System::ChildResult::End;
     if (child.end == End::timedOut)
-        return L"does not return within " + seconds(limits.timeLimit) + L" seconds";
+        return L"does not return within " + seconds(limits.timeLimit);
     if (child.end == End::outOfMemory)
         return L"uses more than " + std::to_wstring(limits.memoryLimit >> 20) + L" MiB of memory";
     if (!report.fault.empty())

@@ -12,7 +12,8 @@ namespace Mz::Tools {
 namespace {
 
 /// The properties of a verdict. In the texts, %1 is replaced by the finding's subject, %2 by its
-/// words, and %L by the environment variable with the loader's search path.
+/// words, and %L by the environment variable with the loader's search path. A noun in braces after
+/// a number gets its plural where it needs one: %2{second}.
 struct Entry {
     Verdict verdict;
     const char* name;
@@ -98,7 +99,7 @@ constexpr Entry entries[] = {
     {Verdict::aborted, "aborted", Severity::fault, L"it aborts the process in %1%2", L""},
     {Verdict::exited, "exited", Severity::fault, L"it ends the process in %1, with status %2", L""},
     {Verdict::timedOut, "timedOut", Severity::fault,
-     L"it did not come to an end in %1 within %2 seconds; --time-limit allows more",
+     L"it did not come to an end in %1 within %2{second}; --time-limit allows more",
      L"if it only needs more time, raise --time-limit (in a host: ProbeOptions::timeLimit)"},
     {Verdict::outOfMemory, "outOfMemory", Severity::fault,
      L"it uses more memory in %1 than the %2 MiB allowed; --memory-limit allows more",
@@ -143,7 +144,7 @@ constexpr Entry entries[] = {
      L"add its folder to the host's search path"},
 
     {Verdict::miscounted, "miscounted", Severity::note,
-     L"it announces %1 builders and enumerates %2",
+     L"it announces %1{builder} and enumerates %2",
      L"let getBuilderCount return the number of enumerated builders"},
     {Verdict::uidTaken, "uidTaken", Severity::note,
      L"builder %1 is offered by %2 too, which comes later and wins", L"generate a new uid"},
@@ -164,6 +165,17 @@ const Entry& entryOf(Verdict verdict) {
     return entries[0];
 }
 
+/// Returns the value, and the noun in braces at `text`, if there is one. Sets `text` to its last
+/// character.
+std::wstring counted(const std::wstring& value, const wchar_t*& text) {
+    if (text[1] != L'{')
+        return value;
+    const std::wstring_view noun(text + 2);
+    text += 2 + noun.find(L'}');
+    return value + L" " + std::wstring(noun.substr(0, noun.find(L'}'))) +
+           (value == L"1" ? L"" : L"s");
+}
+
 std::wstring substituted(const wchar_t* text, const Finding& finding) {
     std::wstring result;
     for (; *text; ++text) {
@@ -172,8 +184,8 @@ std::wstring substituted(const wchar_t* text, const Finding& finding) {
             continue;
         }
         switch (*++text) {
-        case L'1': result += finding.subject; break;
-        case L'2': result += finding.words; break;
+        case L'1': result += counted(finding.subject, text); break;
+        case L'2': result += counted(finding.words, text); break;
         default: result += System::loaderPathVariable(); break;
         }
     }

@@ -63,6 +63,18 @@ class Kinds(Page):
         self.assertEqual([item.kind for item in items], ["program", "output"])
 
 
+class Tested(Page):
+    def extracted(self, name):
+        (self.page.parent / "CMakeLists.txt").write_text("add_test(NAME Known.Test)")
+        self.write(f"<!-- tested: {name} -->\n```sh\nls\n```\n")
+        return self.script("extract.py", self.page.parent / "out", self.page.parent,
+                           self.page.parent, "linux", self.page)[0]
+
+    def test_the_test_of_a_block_exists(self):
+        self.assertEqual(self.extracted("Known.Test"), 0)
+        self.assertEqual(self.extracted("Unknown.Test"), 1)
+
+
 class Commands(Page):
     def test_equal_output_passes(self):
         status, text = self.run_page("```console\n$ printf 'a\\nb\\n'\na\nb\n$ cd / && pwd\n/\n```\n")

@@ -87,6 +87,9 @@ TEST_F(Command, LeavesNoVerdictsBesideAFolderThatIsNamedAsTheList) {
 TEST_F(Command, HelpSaysWhatEachDoesWithAnExample) {
     const ProgramResult help = run({"--help"});
     EXPECT_EQ(help.exitCode, 0);
+    for (const char* command : {"check", "new", "uid"})
+        EXPECT_THAT(run({command, "--help"}).output,
+                    HasSubstr("Example:\n  mzcomponents " + std::string(command)));
     for (const char* command : {"list", "explain", "scan", "types", "import", "show", "graph"}) {
         EXPECT_THAT(help.output, HasSubstr(command));
         const ProgramResult own = run({command, "--help"});
@@ -95,6 +98,29 @@ TEST_F(Command, HelpSaysWhatEachDoesWithAnExample) {
         for (const char* option : {"--path", "--cache", "--json"})
             EXPECT_THAT(own.output, HasSubstr(option)) << command;
     }
+}
+
+TEST_F(Command, HelpNamesTheKindOfEachValue) {
+    for (const char* command :
+         {"list", "explain", "scan", "types", "import", "show", "graph", "check", "uid"})
+        EXPECT_THAT(run({command, "--help"}).output, ::testing::Not(HasSubstr("TEXT"))) << command;
+    for (const char* kind : {"component", "importer", "host"})
+        EXPECT_THAT(run({"new", kind, "--help"}).output,
+                    AllOf(::testing::Not(HasSubstr("TEXT")), HasSubstr("--directory PATH")));
+    EXPECT_THAT(run({"graph", "--help"}).output,
+                AllOf(HasSubstr("--path PATH "), HasSubstr("--cache FILE "),
+                      HasSubstr("--output FILE "), HasSubstr("--svg FILE ")));
+}
+
+TEST_F(Command, OneIsNotFollowedByAPlural) {
+    add(L"goodWithKit", "a");
+    EXPECT_THAT(run({"scan", "--path", path(), "--cache", inWork("list")}).output,
+                HasSubstr("1 file: 1 with builders, 0 with faults, 0 others; 1 looked at"));
+    EXPECT_THAT(run({"show", inWork("list")}).output, StartsWith("recorded list, 1 library\n"));
+    folder.write("b", "text");
+    EXPECT_THAT(run({"scan", "--path", path(), "--cache", inWork("list")}).output,
+                HasSubstr("2 files: 1 with builders, 0 with faults, 1 other; "));
+    EXPECT_THAT(run({"show", inWork("list")}).output, StartsWith("recorded list, 2 libraries\n"));
 }
 
 TEST_F(Command, ListGivesEachCandidateItsVerdictAndRunsNothing) {

@@ -23,11 +23,17 @@ expect() { # expect WORD CONTEXT: expects WORD as a line of standard input
 }
 
 commands=$("$@" --help | tr -d '\r' | sed -n '/^Subcommands:/,$s/^  \([a-z]*\) .*/\1/p')
-[ "$(wc -w <<<"$commands")" = 8 ] || { echo "eight commands expected: $commands" >&2; exit 1; }
+[ "$(wc -w <<<"$commands")" = 10 ] || { echo "ten commands expected: $commands" >&2; exit 1; }
 for command in $commands; do
     expect "$command" mzcomponents < <(complete_for mzcomponents '')
     for option in $("$@" "$command" --help | tr -d '\r' | grep -oE '^  (-h,)?--[a-z-]+' | grep -oE -- '--[a-z-]+'); do
         expect "$option" "mzcomponents $command" < <(complete_for mzcomponents "$command" --)
+    done
+done
+for kind in component importer host; do
+    expect "$kind" "mzcomponents new" < <(complete_for mzcomponents new '')
+    for option in $("$@" new "$kind" --help | tr -d '\r' | grep -oE '^  (-h,)?--[a-z-]+' | grep -oE -- '--[a-z-]+'); do
+        expect "$option" "mzcomponents new $kind" < <(complete_for mzcomponents new "$kind" --)
     done
 done
 exit $status

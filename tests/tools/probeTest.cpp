@@ -60,6 +60,14 @@ TEST_F(Probe, NamesTheLimitAndTheOptionThatRaisesIt) {
     EXPECT_EQ(sentenceOf(time), L"it did not come to an end in its entry point within 10 seconds; "
                                 L"--time-limit allows more");
     EXPECT_THAT(cureOf(time), HasSubstr(L"ProbeOptions::timeLimit"));
+    EXPECT_THAT(sentenceOf({Verdict::timedOut, L"its entry point", L"1"}),
+                HasSubstr(L"within 1 second; "));
+    EXPECT_THAT(sentenceOf({Verdict::timedOut, L"its entry point", L"0.1"}),
+                HasSubstr(L"within 0.1 seconds; "));
+    EXPECT_EQ(sentenceOf({Verdict::miscounted, L"1", L"2"}),
+              L"it announces 1 builder and enumerates 2");
+    EXPECT_EQ(sentenceOf({Verdict::miscounted, L"2", L"1"}),
+              L"it announces 2 builders and enumerates 1");
 }
 
 TEST_F(Probe, TellsALibraryThatClosesWhatItDidNotOpenFromOneThatExits) {

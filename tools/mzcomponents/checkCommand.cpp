@@ -183,28 +183,36 @@ void addCheckCommand(CLI::App& app, CheckArguments& arguments, ProbeArguments& p
     CLI::App* const check = app.add_subcommand(
         "check", "Checks component libraries in child processes, and tells what is wrong with "
                  "them and how to solve it.");
-    check->add_option("FILE", arguments.files, "The libraries");
-    check->add_option("--path", arguments.path,
-                      "Check the component libraries of these folders, too, separated by ';'");
+    check->add_option("FILE", arguments.files, "The libraries")->type_name("");
+    check
+        ->add_option("--path", arguments.path,
+                     "Check the component libraries of these folders, too, separated by ';'")
+        ->type_name("PATH");
     check
         ->add_option("--sample", arguments.samples,
                      "A file that import builders can read; may be repeated")
+        ->type_name("FILE")
         ->allow_extra_args(false); // What follows it is a library.
     check
         ->add_option("--fail-on", arguments.failOn,
                      "The least serious findings that cause status 1: error, warning or note")
+        ->type_name("GRADE")
         ->check(CLI::IsMember({"error", "warning", "note"}))
         ->capture_default_str();
-    check->add_option("--suppress", arguments.suppressions,
-                      "A file of findings to tolerate, each with its reason");
+    check
+        ->add_option("--suppress", arguments.suppressions,
+                     "A file of findings to tolerate, each with its reason")
+        ->type_name("FILE");
     check->add_option("--seed", arguments.seed, "The start of the sequence of random input")
         ->capture_default_str();
     check
         ->add_option("--fuzz", arguments.fuzzSeconds,
                      "Seconds that each rule which reads input goes on with random input")
         ->check(CLI::Range(0.0, 86400.0));
-    check->add_option("--reproduce", arguments.reproduce,
-                      "Check only this rule, or repeat this finding");
+    check
+        ->add_option("--reproduce", arguments.reproduce,
+                     "Check only this rule, or repeat this finding")
+        ->type_name("VALUE");
     check->add_flag("--in-process", arguments.inProcess,
                     "Check in this process, for a debugger; a crash ends it");
     check->add_flag("--thread-safe", arguments.threadSafe,
@@ -213,12 +221,15 @@ void addCheckCommand(CLI::App& app, CheckArguments& arguments, ProbeArguments& p
         ->add_option("--jobs", arguments.jobs,
                      "Libraries to check at a time; the default is the number of processors")
         ->check(CLI::Range(1u, 256u));
-    check->add_option("--explain", arguments.explained,
-                      "Explain a rule instead of a check; \"all\" lists the rules");
+    check
+        ->add_option("--explain", arguments.explained,
+                     "Explain a rule instead of a check; \"all\" lists the rules")
+        ->type_name("RULE");
     check->add_flag("--json", arguments.json, "Write the result as JSON");
-    check->add_option("--junit", arguments.junit,
-                      "Write the result to this file as JUnit XML, too");
-    check->add_option("--sarif", arguments.sarif, "Write the result to this file as SARIF, too");
+    check->add_option("--junit", arguments.junit, "Write the result to this file as JUnit XML, too")
+        ->type_name("FILE");
+    check->add_option("--sarif", arguments.sarif, "Write the result to this file as SARIF, too")
+        ->type_name("FILE");
     check->add_option("--time-limit", probe.seconds, "Seconds that a library may take for a call")
         ->check(CLI::Range(0.1, 86400.0))
         ->capture_default_str();

@@ -144,13 +144,10 @@ void printChecks(const std::vector<CheckedLibrary>& libraries) {
             if (finding.reproduce != finding.rule->id)
                 printLine(L"    repeat it: " + commandOf(library.result, finding));
         }
-    const auto counted = [](std::size_t count, const wchar_t* what) {
-        return std::to_wstring(count) + L" " + what + (count == 1 ? L"" : L"s");
-    };
-    printLine((libraries.size() == 1 ? std::wstring(L"1 library")
-                                     : std::to_wstring(libraries.size()) + L" libraries") +
-              L": " + counted(counts[2], L"error") + L", " + counted(counts[1], L"warning") +
-              L", " + counted(counts[0], L"note") +
+    printLine(counted(libraries.size(), L"library", L"libraries") + L": " +
+              counted(counts[2], L"error", L"errors") + L", " +
+              counted(counts[1], L"warning", L"warnings") + L", " +
+              counted(counts[0], L"note", L"notes") +
               (suppressed ? L"; " + std::to_wstring(suppressed) + L" suppressed" : L""));
 }
 

@@ -131,9 +131,11 @@ void printSummary(const Tools::ScanResult& result) {
         faults += isFault(file.verdict);
         looked += file.looked;
     }
-    results() << result.files.size() << " files: " << works << " with builders, " << faults
-              << " with faults, " << result.files.size() - works - faults << " others; " << looked
-              << " looked at, " << result.libraries.size() << " recorded\n";
+    const std::size_t others = result.files.size() - works - faults;
+    printLine(counted(result.files.size(), L"file", L"files") + L": " + std::to_wstring(works) +
+              L" with builders, " + std::to_wstring(faults) + L" with faults, " +
+              counted(others, L"other", L"others") + L"; " + std::to_wstring(looked) +
+              L" looked at, " + std::to_wstring(result.libraries.size()) + L" recorded");
 }
 
 } // namespace

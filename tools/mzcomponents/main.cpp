@@ -7,7 +7,9 @@
 #include "tools/mzcomponents/checkCommand.h"
 #include "tools/mzcomponents/commands.h"
 #include "tools/mzcomponents/exitGuard.h"
+#include "tools/mzcomponents/newCommand.h"
 #include "tools/mzcomponents/output.h"
+#include "tools/mzcomponents/uidCommand.h"
 
 #include "components/componentTools/standardOutput.h"
 
@@ -34,6 +36,8 @@ struct Arguments {
     ImportArguments import;
     GraphArguments graph;
     CheckArguments check;
+    NewArguments made;
+    UidArguments uid;
     std::string shown;
     std::function<int()> command;
 };
@@ -68,6 +72,7 @@ CLI::App* addCommand(CLI::App& app, Arguments& arguments, const char* name, cons
                            "it leads to the files"
                          : "The folders to search, separated by ';'. The default is the "
                            "current folder")
+        ->type_name("PATH")
         ->check(namesAFolder);
     command->add_flag("--json", arguments.common.json, "Write the result as JSON");
     command->footer(std::string("Example:\n  ") + example);
@@ -75,7 +80,9 @@ CLI::App* addCommand(CLI::App& app, Arguments& arguments, const char* name, cons
 }
 
 void addCache(CLI::App* command, Arguments& arguments, const char* text) {
-    command->add_option("--cache", arguments.common.cache, text)->check(namesAFile);
+    command->add_option("--cache", arguments.common.cache, text)
+        ->type_name("FILE")
+        ->check(namesAFile);
 }
 
 void addLimits(CLI::App* command, Arguments& arguments) {
@@ -109,7 +116,7 @@ void addLookCommands(CLI::App& app, Arguments& arguments) {
         app, arguments, "explain",
         "Explains why each file is, or is not, a component library, and what to do about it.",
         "mzcomponents explain --load /opt/app/components/mesh.so", &arguments.explain.path);
-    explain->add_option("FILE", arguments.explain.files, "The files")->required();
+    explain->add_option("FILE", arguments.explain.files, "The files")->type_name("")->required();
     explain->add_flag("--load", arguments.explain.load,
                       "Load each file in a child process and report the result");
     addCache(explain, arguments, readCache);
@@ -126,6 +133,7 @@ void addLookCommands(CLI::App& app, Arguments& arguments) {
         "that reads it loads none of these libraries at start.",
         "mzcomponents scan --cache ~/.cache/app/components.list --path /opt/app/components");
     scan->add_option("--cache", arguments.common.cache, "The recorded list to update")
+        ->type_name("FILE")
         ->required()
         ->check(namesAFile);
     scan->add_flag("--retry", arguments.probe.retry, "Retry libraries that failed earlier");
@@ -148,10 +156,11 @@ void addUseCommands(CLI::App& app, Arguments& arguments) {
     CLI::App* importer = addCommand(app, arguments, "import",
                                     "Imports files through the first component that can read them.",
                                     "mzcomponents import part.obj --path /opt/app/components");
-    importer->add_option("FILE", arguments.import.files, "The files")->required();
+    importer->add_option("FILE", arguments.import.files, "The files")->type_name("")->required();
     importer
         ->add_option("--save", arguments.import.save,
                      "Store the imported objects in this file, if all of them can be stored")
+        ->type_name("FILE")
         ->check(namesAFile);
     addCache(importer, arguments, updatedCache);
     addLimits(importer, arguments);
@@ -165,7 +174,7 @@ void addUseCommands(CLI::App& app, Arguments& arguments) {
         app, arguments, "show",
         "Shows a recorded list, or the objects stored in a file, with their offsets in bytes.",
         "mzcomponents show ~/.cache/app/components.list");
-    show->add_option("FILE", arguments.shown, "The file")->required();
+    show->add_option("FILE", arguments.shown, "The file")->type_name("")->required();
     addCache(show, arguments, updatedCache);
     addLimits(show, arguments);
     show->callback([&] {
@@ -181,10 +190,12 @@ void addUseCommands(CLI::App& app, Arguments& arguments) {
     graph
         ->add_option("--output", arguments.graph.output,
                      "Write the DOT text to this file instead of standard output")
+        ->type_name("FILE")
         ->check(namesAFile);
     graph
         ->add_option("--svg", arguments.graph.svg,
                      "Draw it to this file with Graphviz, which must be installed")
+        ->type_name("FILE")
         ->check(namesAFile);
     addCache(graph, arguments, updatedCache);
     addLimits(graph, arguments);
@@ -204,6 +215,8 @@ int run(std::vector<std::string> words) {
     addLookCommands(app, arguments);
     addUseCommands(app, arguments);
     addCheckCommand(app, arguments.check, arguments.probe, arguments.command);
+    addNewCommand(app, arguments.made, arguments.command);
+    addUidCommand(app, arguments.uid, arguments.command);
     try {
         std::transform(words.begin(), words.end(), words.begin(), asOneName);
         std::reverse(words.begin(), words.end()); // The parser expects reverse order.

@@ -3,17 +3,17 @@
 _mzcomponents() {
   local current=${COMP_WORDS[COMP_CWORD]} previous=${COMP_WORDS[COMP_CWORD - 1]}
   local common="--path --cache --json --help" limits="--time-limit --memory-limit"
-  local options word command=
+  local options word command= kind=
   for word in "${COMP_WORDS[@]:1:COMP_CWORD-1}"; do
     case $word in
-    list | explain | scan | types | import | show | graph | check)
-      command=$word
-      break
+    list | explain | scan | types | import | show | graph | check | new | uid)
+      command=${command:-$word}
       ;;
+    component | importer | host) [ "$command" != new ] || kind=${kind:-$word} ;;
     esac
   done
   case $previous in
-  --path)
+  --path | --directory)
     compopt -o filenames 2>/dev/null
     mapfile -t COMPREPLY < <(compgen -d -- "$current")
     return
@@ -27,10 +27,12 @@ _mzcomponents() {
     mapfile -t COMPREPLY < <(compgen -W "error warning note" -- "$current")
     return
     ;;
-  --time-limit | --memory-limit | --seed | --fuzz | --jobs | --reproduce | --explain) return ;;
+  --time-limit | --memory-limit | --seed | --fuzz | --jobs | --reproduce | --explain | --extension)
+    return
+    ;;
   esac
   case $command in
-  '') options="list explain scan types import show graph check --help --version" ;;
+  '') options="list explain scan types import show graph check new uid --help --version" ;;
   list) options=$common ;;
   explain) options="$common $limits --load" ;;
   scan) options="$common $limits --retry" ;;
@@ -40,6 +42,14 @@ _mzcomponents() {
     options="--path --sample --fail-on --suppress --seed --fuzz --reproduce --in-process"
     options+=" --thread-safe --jobs --explain --json --junit --sarif --help $limits"
     ;;
+  new)
+    case $kind in
+    '') options="component importer host --help" ;;
+    importer) options="--directory --extension --help" ;;
+    *) options="--directory --help" ;;
+    esac
+    ;;
+  uid) options="--words --help" ;;
   *) options="$common $limits" ;;
   esac
   mapfile -t COMPREPLY < <(compgen -W "$options" -- "$current")

@@ -112,6 +112,10 @@ Json jsonOf(const Tools::RecordedLibrary& library) {
             {"builders", builders}};
 }
 
+std::wstring counted(std::size_t count, const wchar_t* one, const wchar_t* several) {
+    return std::to_wstring(count) + L" " + (count == 1 ? one : several);
+}
+
 std::wstring padded(std::wstring text, std::size_t width) {
     text.resize(std::max(text.size(), width), L' ');
     return text;

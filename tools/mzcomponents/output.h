@@ -56,6 +56,9 @@ Json jsonOf(const Tools::Finding& finding);
 Json jsonOf(const Tools::RecordedBuilder& builder);
 Json jsonOf(const Tools::RecordedLibrary& library);
 
+/// Returns a number with its noun: "1 file", "2 files".
+std::wstring counted(std::size_t count, const wchar_t* one, const wchar_t* several);
+
 /// Returns `text`, padded with trailing blanks to `width` characters.
 std::wstring padded(std::wstring text, std::size_t width);
 

@@ -80,7 +80,7 @@ void showList(const Common& common, const Tools::RecordedLibraries& libraries) {
         printJson({{"kind", "recordedList"}, {"libraries", all}});
         return;
     }
-    printLine(L"recorded list, " + std::to_wstring(libraries.size()) + L" libraries");
+    printLine(L"recorded list, " + counted(libraries.size(), L"library", L"libraries"));
     for (const Tools::RecordedLibrary& library : libraries) {
         printLine(std::to_wstring(library.position) + L"  " + library.directory + L"\\" +
                   library.fileName + L"  time " + std::to_wstring(library.time) + L"  size " +

@@ -114,9 +114,11 @@ void answers(CheckContext& context) {
     DescriptionCollector collector;
     context.attempt(L"enumerateBuilders", {}, [&] { description->enumerateBuilders(collector); });
     if (collector.wrong)
-        context.report({}, L"enumerateBuilders passes " + std::to_wstring(collector.wrong) +
-                               L" elements that are null or without QrBuilderDescription. Hosts "
-                               L"drop all its builders. Pass one description for each builder.");
+        context.report({},
+                       L"enumerateBuilders passes " + std::to_wstring(collector.wrong) +
+                           (collector.wrong == 1 ? L" element that is" : L" elements that are") +
+                           L" null or without QrBuilderDescription. Hosts drop all its "
+                           L"builders. Pass one description for each builder.");
     for (const DescribedBuilder& builder : context.builders())
         context.messages().builder({builder.uid, builder.name});
 }
@@ -230,7 +232,8 @@ void countTrue(CheckContext& context) {
     if (announced != passed)
         context.report({}, L"getBuilderCount returns " + std::to_wstring(announced) +
                                L", but enumerateBuilders passes " + std::to_wstring(passed) +
-                               L" builders. Return the number of builders.");
+                               (passed == 1 ? L" builder" : L" builders") +
+                               L". Return the number of builders.");
 }
 
 void textsNotNull(CheckContext& context) {
