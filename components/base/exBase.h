@@ -15,8 +15,8 @@ namespace Mz {
 /// `ExBase` derived from `std::exception` too, that base would be ambiguous and
 /// `catch (std::exception&)` would miss the whole family.
 ///
-/// The object owns copies of all texts. It therefore stays valid after the library that threw it is
-/// unloaded, and after the caller's buffers are freed. Different threads can use different objects.
+/// The object owns copies of all texts. On Windows it must not outlive the library that threw it,
+/// which contains its destructor; a `clone()` may. Different threads can use different objects.
 class MZ_BASE_API ExBase {
   public:
     /// Records the source position of the throw; the reason is empty.

@@ -214,6 +214,17 @@ TEST_F(PosixDiscovery, LoadsAFileWhoseNameHasUpperCaseAndOthersNot) {
     EXPECT_EQ(manager->libraries.front().foundPath, file);
 }
 
+/// The loader expands some words in the path of a library.
+TEST_F(PosixDiscovery, PassesOverALibraryWhoseFolderHasAWordThatTheLoaderExpands) {
+    for (const char* name : {"a$LIB", "b$ORIGIN", "c${PLATFORM}", "d$OTHER"}) {
+        std::filesystem::create_directory(folder.path() / name);
+        std::filesystem::copy_file(builtComponent(L"goodWithKit"), folder.path() / name / "kit.so");
+        restart();
+        manager->initialize(searchPathOf(folder.path() / name).c_str());
+        EXPECT_EQ(names().size(), std::string(name) == "d$OTHER" ? 1U : 0U) << name;
+    }
+}
+
 TEST_F(PosixDiscovery, TakesNamesByteByByteInThePlainLocale) {
     ASSERT_STREQ(std::setlocale(LC_ALL, nullptr), "C");
     const auto file = add(L"goodByHand", "caf\xC3\xA9.so");

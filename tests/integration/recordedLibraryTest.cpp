@@ -1,10 +1,13 @@
 // SPDX-License-Identifier: BSL-1.0
 /// Tests what a start does with the library records of an earlier start. The tests write the
 /// records themselves.
+#include "components/componentManager/binaryStream.h"
+#include "components/componentManager/bufferio.h"
 #include "tests/integration/managerFixture.h"
 
 #include <chrono>
 #include <iterator>
+#include <sstream>
 
 using namespace Mz;
 using namespace Mz::Test;
@@ -69,6 +72,32 @@ TEST_F(RecordedLibrary, UnchangedThatTheHostLoadedIsUsedLazilyAndNotFreed) {
     restart();
     EXPECT_TRUE(isMapped(file));
     unloadAsHost(host);
+}
+
+TEST_F(RecordedLibrary, OfARelativeFolderIsDroppedOnUseIfTheCurrentFolderHasChanged) {
+    const std::filesystem::path here = std::filesystem::current_path();
+    std::filesystem::create_directory(folder.path() / "plugins");
+    std::filesystem::rename(add(L"goodWithKit"), folder.path() / "plugins" / "kit");
+    std::filesystem::current_path(folder.path());
+    manager->initialize(L"plugins");
+    EXPECT_EQ(maker(kitUid), "kit");
+    std::stringstream list;
+    {
+        QrOutBuffer bytes(&list);
+        QrBinaryStream stream(&bytes);
+        manager->writeRecords(stream);
+    }
+    restart();
+    {
+        QrInBuffer bytes(&list);
+        QrBinaryStream stream(&bytes);
+        manager->readRecords(stream);
+    }
+    manager->initialize(L"plugins");
+    EXPECT_TRUE(indexed(kitUid));
+    std::filesystem::current_path(here);
+    EXPECT_FALSE(manager->createObject(kitUid));
+    EXPECT_THAT(names(), IsEmpty());
 }
 
 TEST_F(RecordedLibrary, UnchangedWithoutBuildersIsNeverTried) {

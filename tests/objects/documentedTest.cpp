@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: BSL-1.0
-// Tests the examples of docs/objects.md, which documented.cmake extracts.
-#include "documentedHost.h"
+// Tests the examples of docs/savedObjects.md, which tests/documentation extracts.
+#include "gauge.h"
+#include "saveGauge.h"
 
 #include "components/componentManager/componentImp.h"
 #include "tests/support/temporaryDirectory.h"
@@ -30,6 +31,12 @@ TEST(DocumentedGauges, AreSavedAndLoaded) {
     ASSERT_TRUE(read->next);
     EXPECT_EQ(read->next->name, L"second");
     EXPECT_FALSE(read->next->next);
+}
+
+TEST(DocumentedGauges, AreNotLoadedFromAFileThatCannotBeOpened) {
+    const Mz::Test::TemporaryDirectory folder;
+    EXPECT_THROW(loadGauge((folder.path() / "nothing").string().c_str()),
+                 Mz::QrStreamEx::ExReadOpen);
 }
 
 } // namespace

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Puts a stream on an object IO on a buffer, as docs/objects.md explains. A text file ends with a
+/// Puts a stream on an object IO on a buffer, as docs/savedObjects.md explains. A text file ends with a
 /// line end, for people and their tools. Loading checks that nothing follows the object, because a
 /// longer file is not one that was saved here.
 #include "objectFile.h"
