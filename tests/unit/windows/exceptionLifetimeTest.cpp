@@ -30,7 +30,7 @@ const void* const* wordsOf(const ExBase& exception) {
     return static_cast<const void* const*>(dynamic_cast<const void*>(&exception));
 }
 
-TEST(ForeignExceptions, NeedTheirLibraryAndTheirClonesDoNot) {
+TEST(ExceptionLifetime, EndsWithTheLibraryThatThrewUnlikeThatOfAClone) {
     const auto path = platform::toNative(THROWING_LIBRARY);
     ASSERT_TRUE(path);
     const platform::Module library = platform::loadLibrary(*path);
