@@ -10,8 +10,10 @@ using namespace Mz;
 using namespace Mz::Tools;
 using namespace Mz::Test;
 using ::testing::AllOf;
+using ::testing::AnyOf;
 using ::testing::EndsWith;
 using ::testing::HasSubstr;
+using ::testing::Not;
 using ::testing::StartsWith;
 using Json = nlohmann::json;
 
@@ -87,7 +89,7 @@ TEST_F(Command, LeavesNoVerdictsBesideAFolderThatIsNamedAsTheList) {
 TEST_F(Command, HelpSaysWhatEachDoesWithAnExample) {
     const ProgramResult help = run({"--help"});
     EXPECT_EQ(help.exitCode, 0);
-    for (const char* command : {"check", "new", "uid"})
+    for (const char* command : {"check", "new", "uid", "help"})
         EXPECT_THAT(run({command, "--help"}).output,
                     HasSubstr("Example:\n  mzcomponents " + std::string(command)));
     for (const char* command :
@@ -479,6 +481,28 @@ TEST_F(Command, ListAndScanNameTheLibraryThatWinsABuilder) {
     const ProgramResult scanned = run({"scan", "--path", path(), "--cache", inWork("list")});
     EXPECT_THAT(scanned.output, HasSubstr("\\b too, which comes later and wins\n"));
     EXPECT_THAT(scanned.output, HasSubstr("2 files: 2 with builders, 0 with faults"));
+}
+
+TEST_F(Command, HelpSaysWhatThePagesSay) {
+    const ProgramResult verdict = run({"help", "dependencyMissing"});
+    EXPECT_EQ(verdict.exitCode, 0);
+    EXPECT_THAT(verdict.output, StartsWith("dependencyMissing\n\n"));
+    EXPECT_THAT(verdict.output, HasSubstr("\nRemedy: "));
+    EXPECT_THAT(verdict.output, HasSubstr("\n    $ mzcomponents explain"));
+    EXPECT_THAT(verdict.output, Not(AnyOf(HasSubstr("<!--"), HasSubstr("**"), HasSubstr("]("))));
+    EXPECT_EQ(run({"help", "DEPENDENCYMISSING"}).output, verdict.output);
+    EXPECT_THAT(run({"help", "uid-not-nil"}).output, StartsWith("uid-not-nil (error)\n\n"));
+    const std::string byReason = run({"help", "Error reading stream"}).output;
+    EXPECT_THAT(byReason, StartsWith("Error reading stream. (ExReadError)\n\n"));
+    EXPECT_THAT(run({"help", "ExReadError"}).output, HasSubstr(byReason));
+}
+
+TEST_F(Command, HelpHasEachVerdictAndEachRule) {
+    const std::string topics = run({"help"}).output;
+    for (const char* topic : {"\n  component\n", "\n  endUnknown\n", "\n  uid-free (error)\n",
+                              "\n  Bad swap bytes size. (ExBadSwapSize)\n"})
+        EXPECT_THAT(topics, HasSubstr(topic));
+    EXPECT_EQ(run({"help", "nonsense"}).exitCode, 2);
 }
 
 TEST_F(Command, ExplainSaysWhetherASearchPathLeadsToTheFile) {

@@ -7,6 +7,7 @@
 #include "tools/mzcomponents/checkCommand.h"
 #include "tools/mzcomponents/commands.h"
 #include "tools/mzcomponents/exitGuard.h"
+#include "tools/mzcomponents/helpCommand.h"
 #include "tools/mzcomponents/newCommand.h"
 #include "tools/mzcomponents/output.h"
 #include "tools/mzcomponents/profileCommand.h"
@@ -41,6 +42,7 @@ struct Arguments {
     UidArguments uid;
     ProfileArguments profile;
     std::string shown;
+    std::string topic;
     std::function<int()> command;
 };
 
@@ -233,6 +235,7 @@ int run(std::vector<std::string> words) {
     addCheckCommand(app, arguments.check, arguments.probe, arguments.command);
     addNewCommand(app, arguments.made, arguments.command);
     addUidCommand(app, arguments.uid, arguments.command);
+    addHelpCommand(app, arguments.topic, arguments.command);
     try {
         std::transform(words.begin(), words.end(), words.begin(), asOneName);
         std::reverse(words.begin(), words.end()); // The parser expects reverse order.

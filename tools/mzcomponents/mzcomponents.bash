@@ -6,7 +6,7 @@ _mzcomponents() {
   local options word command= kind=
   for word in "${COMP_WORDS[@]:1:COMP_CWORD-1}"; do
     case $word in
-    list | explain | scan | profile | types | import | show | graph | check | new | uid)
+    list | explain | scan | profile | types | import | show | graph | check | new | uid | help)
       command=${command:-$word}
       ;;
     component | importer | host) [ "$command" != new ] || kind=${kind:-$word} ;;
@@ -32,7 +32,7 @@ _mzcomponents() {
     ;;
   esac
   case $command in
-  '') options="list explain scan profile types import show graph check new uid --help --version" ;;
+  '') options="list explain scan profile types import show graph check new uid help --help --version" ;;
   list) options=$common ;;
   explain) options="$common $limits --load" ;;
   scan) options="$common $limits --retry" ;;
@@ -51,6 +51,7 @@ _mzcomponents() {
     esac
     ;;
   uid) options="--words --help" ;;
+  help) options="--help" ;;
   *) options="$common $limits" ;;
   esac
   mapfile -t COMPREPLY < <(compgen -W "$options" -- "$current")
