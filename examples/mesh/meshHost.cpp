@@ -11,11 +11,13 @@
 ///     --list FILE          starts with the recorded list in FILE, if it exists, and writes a new
 ///                          one; prints how many component libraries are loaded
 ///     --save FOLDER        saves each mesh, and a scene of all, to files in FOLDER, and loads them
+///     --draw FOLDER        draws each mesh to an SVG file in FOLDER
 ///     --load FOLDER        loads the files that were saved in FOLDER
 ///
 /// The exit status is 0 if every file was imported, saved and loaded, else 1.
 #include "console/console.h"
 #include "host/description.h"
+#include "host/drawing.h"
 #include "host/savedFiles.h"
 #include "mesh.h"
 #include "saving/recordedList.h"
@@ -48,6 +50,7 @@ struct Options {
     std::filesystem::path list;
     std::filesystem::path saveFolder;
     std::filesystem::path loadFolder;
+    std::filesystem::path drawFolder;
     bool showProgress = false;
     std::vector<std::filesystem::path> files;
 };
@@ -58,7 +61,8 @@ Options parseOptions(const std::vector<std::string>& arguments) {
         {"--components", &options.components},
         {"--list", &options.list},
         {"--save", &options.saveFolder},
-        {"--load", &options.loadFolder}};
+        {"--load", &options.loadFolder},
+        {"--draw", &options.drawFolder}};
     for (std::size_t index = 0; index < arguments.size(); ++index) {
         const auto named = std::ranges::find(
             paths, arguments[index], &std::pair<const char*, std::filesystem::path*>::first);
@@ -138,6 +142,16 @@ QrPtr<Mesh> importMesh(const MeshImporter& importer, ConsoleController& controll
     return mesh;
 }
 
+/// Draws the mesh, as file number `number`, in the folder of drawings.
+void drawMesh(const Options& options, const Mesh& mesh, const std::filesystem::path& file,
+              int number) {
+    std::filesystem::create_directories(options.drawFolder);
+    std::filesystem::path name = std::to_string(number) + "-";
+    name += file.filename();
+    name += ".svg";
+    draw(mesh, options.drawFolder / name);
+}
+
 /// Calls `work`. Reports an exception as an error that names the file or folder `path`.
 template <class Work>
 void attempt(ConsoleController& controller, const std::filesystem::path& path, Work&& work) {
@@ -153,11 +167,14 @@ void importAll(const Options& options, ConsoleController& controller,
     std::optional<SavedFiles> saved;
     if (!options.saveFolder.empty())
         attempt(controller, options.saveFolder, [&] { saved.emplace(options.saveFolder); });
+    int meshes = 0;
     for (const std::filesystem::path& file : options.files)
         attempt(controller, file, [&] {
             const QrPtr<Mesh> mesh = importMesh(importer, controller, file);
             if (mesh && saved)
                 saved->save(file, mesh);
+            if (mesh && !options.drawFolder.empty())
+                drawMesh(options, *mesh, file, ++meshes);
         });
     if (saved)
         attempt(controller, options.saveFolder, [&] { saved->saveScene(); });
