@@ -56,6 +56,25 @@ if(MZ_SANITIZE)
   target_link_options(mzCompile INTERFACE -fsanitize=address,undefined)
 endif()
 
+# mz_precompile(TARGET HEADER...): precompiles headers of others, which take a third of the time to
+# compile TARGET. Only in builds with tests: packages are built as their sources say. The Clang build
+# compiles without them and fails where an include is missing.
+function(mz_precompile target)
+  if(MZ_BUILD_TESTS)
+    target_precompile_headers(${target} PRIVATE ${ARGN})
+    mz_allow_precompiled(${target})
+  endif()
+endfunction()
+
+# GCC 12 does not know which precompiled headers are the system's, and reports its known false
+# warnings on std::string.
+function(mz_allow_precompiled target)
+  if(CMAKE_CXX_COMPILER_ID STREQUAL "GNU")
+    target_compile_options(${target} PRIVATE -Wno-array-bounds -Wno-restrict
+      -Wno-stringop-overflow -Wno-stringop-overread)
+  endif()
+endfunction()
+
 # mz_copy_file(TARGET FILE FOLDER): copies FILE to FOLDER whenever TARGET has been built.
 function(mz_copy_file target file folder)
   add_custom_command(TARGET ${target} POST_BUILD

@@ -10,17 +10,15 @@ set(gtest_force_shared_crt ON)
 add_subdirectory(${MZ_GOOGLETEST_SOURCES} ${PROJECT_BINARY_DIR}/googletest EXCLUDE_FROM_ALL SYSTEM)
 include(GoogleTest)
 
-# The test code runs once per build, so it is hardly optimised and has few debug symbols: both took
-# most of the build time. The tested libraries and components keep the build's options. Header
-# templates are optimised here as well in the Linux build only.
+# The test code runs once per build, so it is not optimised and has few debug symbols or none: both
+# took most of the build time. The tested libraries, the components and the examples keep the build's
+# options, and the header templates that they use.
 add_library(mzTestCode INTERFACE)
 if(MZ_SANITIZE)
   target_compile_options(mzTestCode INTERFACE -O0 -g1)
-elseif(WIN32)
-  target_compile_options(mzTestCode INTERFACE $<$<CONFIG:Release,RelWithDebInfo>:-O0>)
 else()
   target_compile_options(mzTestCode INTERFACE
-    $<$<CONFIG:Release,RelWithDebInfo>:-O1> $<$<CONFIG:RelWithDebInfo>:-g1>)
+    "$<$<CONFIG:Release,RelWithDebInfo>:SHELL:-O0 -g0>")
 endif()
 
 foreach(target gtest gtest_main gmock gmock_main)
@@ -59,12 +57,7 @@ function(mz_add_test_program name)
   mz_link_manager(${name} ${arg_INTERNALS})
   target_link_libraries(${name} PRIVATE mzCompile mzTestCode mzTestSupport GTest::gmock)
   target_precompile_headers(${name} REUSE_FROM mzTestHeaders)
-  # GCC 12 does not know which precompiled headers are the system's, and reports its known false
-  # warnings on std::string.
-  if(CMAKE_CXX_COMPILER_ID STREQUAL "GNU")
-    target_compile_options(${name} PRIVATE -Wno-array-bounds -Wno-restrict
-      -Wno-stringop-overflow -Wno-stringop-overread)
-  endif()
+  mz_allow_precompiled(${name})
 endfunction()
 
 # mz_link_manager(PROGRAM INTERNALS): links libMZcomponentManager as it is installed, or with
