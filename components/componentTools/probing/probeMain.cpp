@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: BSL-1.0
-/// The program `mzcomponents-probe FILE MEMORY`. With `--check` as its first argument it is the child
-/// process of a check (`checking/checkChild.h`), with `--profile` that of the measurement of a start
+/// The program `mzcomponents-probe FILE MEMORY`. With `--check` as its first argument it is the
+/// child process of a check (`checking/checkChild.h`), with `--profile` that of the measurement of
+/// a start
 /// (`profiling/profileChild.h`). Else the program loads one library, requests
 /// its description as the component manager does, and reports on standard output.
 /// libMZcomponentTools starts it. Before each stage it reports the stage, so that the parent
