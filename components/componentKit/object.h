@@ -16,7 +16,7 @@
 ///     };
 ///
 /// The interface declares no destructor: an object is destroyed by its last release. Each interface
-/// has a uid of its own (`mzcomponents uid` prints a new one), and a changed interface a new uid.
+/// has a different uid (`mzcomponents uid` prints a new one). A changed interface gets a new uid.
 ///
 /// `Object` combines three templates of `castImpl.h`: `QrCastRef` counts the references,
 /// `QrCastHeap` deletes the object at `destroy`, and `QrCastImpl` (for one interface) or

@@ -104,7 +104,7 @@ class MZ_SHARED_TYPE QrReference {
         return result;
     }
 
-    /// Returns the pointer, without a reference of its own; may be null.
+    /// Returns the pointer, which may be null. Takes no reference.
     T* get() const noexcept { return held; }
 
     /// Accesses the object. This reference must not be null.

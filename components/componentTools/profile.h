@@ -59,7 +59,7 @@ struct ProfileOptions {
 
 /// The result for one library: a file that exports the entry point, or has builders in the list.
 struct ProfiledLibrary {
-    std::filesystem::path path;
+    std::filesystem::path path; ///< the full path
     /// `works`, `offersNothing`, `recordedUnchanged` (not loaded), or a fault.
     Finding verdict;
     /// With a list: `recordedUnchanged`, or why the library is loaded nonetheless.

@@ -163,7 +163,7 @@ std::wstring shellWord(const std::wstring& word) {
     return result + L"'";
 }
 
-/// Returns the folder that CMake must be told of to find the library; empty if it searches there
+/// Returns the folder in which CMake finds the library; empty if it searches there
 /// anyway.
 std::wstring neededPrefix() {
     const std::filesystem::path program = programFolder();

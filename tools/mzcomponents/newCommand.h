@@ -19,7 +19,7 @@ struct NewArguments {
     std::string directory; ///< empty for a folder with the name of the project
 };
 
-/// Adds the command, with a command of its own for each kind of project, to the parser.
+/// Adds the command, with a subcommand for each kind of project, to the parser.
 /// \param arguments  receives the options, and must outlive the parser
 /// \param command    receives the command to run
 void addNewCommand(CLI::App& app, NewArguments& arguments, std::function<int()>& command);
