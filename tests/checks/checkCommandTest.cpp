@@ -17,11 +17,7 @@ class CheckCommand : public ::testing::Test {
   protected:
     ProgramResult run(std::vector<std::string> arguments) const {
         arguments.insert(arguments.begin(), "check");
-        const auto program =
-            buildFolder / "bin" / (std::wstring(L"mzcomponents") + MZ_PROGRAM_EXTENSION);
-        ProgramResult result = runProgram(program, program.string(), arguments, work.path());
-        EXPECT_TRUE(result.finished);
-        return result;
+        return runCommandLine(arguments, work.path());
     }
 
     static std::string library(const wchar_t* name, const wchar_t* folder = L"checks") {

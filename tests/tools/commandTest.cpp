@@ -22,11 +22,7 @@ namespace {
 class Command : public ToolsTest {
   protected:
     ProgramResult run(const std::vector<std::string>& arguments) const {
-        const auto program =
-            buildFolder / "bin" / (std::wstring(L"mzcomponents") + MZ_PROGRAM_EXTENSION);
-        ProgramResult result = runProgram(program, program.string(), arguments, work.path());
-        EXPECT_TRUE(result.finished);
-        return result;
+        return runCommandLine(arguments, work.path());
     }
 
     /// The same, with the result as JSON and the test's folder as the search path.

@@ -23,11 +23,7 @@ namespace {
 class NewCommand : public ::testing::Test {
   protected:
     ProgramResult run(const std::vector<std::string>& arguments) const {
-        const auto program =
-            buildFolder / "bin" / (std::wstring(L"mzcomponents") + MZ_PROGRAM_EXTENSION);
-        ProgramResult result = runProgram(program, program.string(), arguments, work.path());
-        EXPECT_TRUE(result.finished);
-        return result;
+        return runCommandLine(arguments, work.path());
     }
 
     std::vector<std::string> linesOf(const std::vector<std::string>& arguments) const {

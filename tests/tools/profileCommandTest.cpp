@@ -28,11 +28,7 @@ class ProfileCommand : public ToolsTest {
     }
 
     ProgramResult runExactly(const std::vector<std::string>& arguments) const {
-        const auto program =
-            buildFolder / "bin" / (std::wstring(L"mzcomponents") + MZ_PROGRAM_EXTENSION);
-        ProgramResult result = runProgram(program, program.string(), arguments, work.path());
-        EXPECT_TRUE(result.finished);
-        return result;
+        return runCommandLine(arguments, work.path());
     }
 
     Json json(int status, std::vector<std::string> arguments = {}) const {

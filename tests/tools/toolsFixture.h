@@ -15,6 +15,7 @@
 #include <fstream>
 #include <iterator>
 #include <string>
+#include <vector>
 
 namespace Mz::Tools {
 
@@ -37,6 +38,16 @@ inline std::filesystem::path builtComponent(const std::wstring& name,
 inline std::string contentOf(const std::filesystem::path& file) {
     std::ifstream stream(file, std::ios::binary);
     return std::string(std::istreambuf_iterator<char>(stream), {});
+}
+
+/// Runs the command line in `folder`, and waits for its end.
+inline ProgramResult runCommandLine(const std::vector<std::string>& arguments,
+                                    const std::filesystem::path& folder) {
+    const auto program =
+        buildFolder / "bin" / (std::wstring(L"mzcomponents") + MZ_PROGRAM_EXTENSION);
+    ProgramResult result = runProgram(program, program.string(), arguments, folder);
+    EXPECT_TRUE(result.finished);
+    return result;
 }
 
 /// Returns the file with another processor in its header, in either format.
