@@ -42,6 +42,8 @@ install(FILES ${PROJECT_SOURCE_DIR}/LICENSE ${PROJECT_SOURCE_DIR}/CHANGELOG.md $
 # The guides and examples, in the folders that README.md links.
 file(GLOB mzGuides CONFIGURE_DEPENDS ${PROJECT_SOURCE_DIR}/docs/*.md)
 install(FILES ${mzGuides} DESTINATION ${mzDocuments}/docs COMPONENT documents)
+file(GLOB mzPictures CONFIGURE_DEPENDS ${PROJECT_SOURCE_DIR}/docs/pictures/*.svg)
+install(FILES ${mzPictures} DESTINATION ${mzDocuments}/docs/pictures COMPONENT documents)
 install(DIRECTORY ${PROJECT_SOURCE_DIR}/examples DESTINATION ${mzDocuments} COMPONENT documents)
 
 # ---- The installer for Windows ----------------------------------------------------------------

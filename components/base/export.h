@@ -17,7 +17,7 @@
 /// of that library.
 ///
 /// When the process ends, static objects of the program may be destroyed after those of a library
-/// that it loaded. On Linux `function` runs after both.
+/// that it loaded. On Linux `function` runs after both. Since 0.2.
 #ifdef _WIN32
 #define MZ_EXPORT __declspec(dllexport)
 #define MZ_IMPORT __declspec(dllimport)

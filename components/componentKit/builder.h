@@ -18,6 +18,8 @@ namespace Mz::Kit {
 
 /// The identity of a builder, which is not nil. A builder with a constant identity of four zero
 /// words, or without one, does not compile.
+///
+/// \since 0.2
 class BuilderUid {
   public:
     /// Does not compile: each builder has an identity.
@@ -29,7 +31,7 @@ class BuilderUid {
     /// Takes a constant.
     consteval BuilderUid(const QrUid& uid) : value(uid) {
         if (uid == QrUid{})
-            throw "the uid of a builder is nil: make a new one, four random words";
+            throw "the uid of a builder is nil: `mzcomponents uid` prints a new one";
     }
 
     /// Takes an identity that is known at run time only, and must not be nil.

@@ -7,6 +7,8 @@
 ///
 /// The tests are compiled into the library, so they reach what it hides. Leave them out of the
 /// library that you ship by a condition around the macro.
+///
+/// \since 0.2
 #pragma once
 
 #include "components/base/export.h"

@@ -6,6 +6,8 @@
 ///     };
 ///     Log log;
 ///     const Mz::Kit::ControllerScope installed(log);
+///
+/// \since 0.2
 #pragma once
 
 #include "components/base/assertions.h"

@@ -10,6 +10,8 @@
 /// A component that offers the importer to other libraries registers it like any class:
 ///
 ///     Kit::builderOf<Kit::Importer<L"settings">>({.uid = importerUid, .name = L"importer"})
+///
+/// \since 0.2
 #pragma once
 
 #include "components/componentKit/object.h"

@@ -2,6 +2,8 @@
 /// The component manager in the fewest words: start, objects, and the list of builders.
 ///
 /// Threads: as for `QrComponentManager`, whose functions these call.
+///
+/// \since 0.2
 #pragma once
 
 #include "components/componentKit/names.h"

@@ -3,6 +3,8 @@
 ///
 ///     const auto plugins = Mz::Kit::programFolder() / "plugins";
 ///     QrGetComponentManager()->initialize(Mz::Kit::searchPath(plugins).c_str());
+///
+/// \since 0.2
 #pragma once
 
 #include "components/componentManager/files.h"

@@ -25,6 +25,8 @@
 ///
 /// This header also checks interfaces at compile time. The checks are made where a class is
 /// declared or registered, so that a mistake does not wait for the first host that casts.
+///
+/// \since 0.2
 #pragma once
 
 #include "components/componentManager/castImpl.h"

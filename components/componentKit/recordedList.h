@@ -10,6 +10,8 @@
 /// texts are in the encoding of the locale, so read it under the locale under which it was written.
 ///
 /// Threads: as for the initialisation of the component manager.
+///
+/// \since 0.2
 #pragma once
 
 #include "components/componentManager/binaryStream.h"

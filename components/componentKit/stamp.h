@@ -3,6 +3,8 @@
 /// component library that is written by hand adds it in one of its sources, outside all namespaces:
 ///
 ///     MZ_COMPONENT_STAMP;
+///
+/// \since 0.2
 #pragma once
 
 #include "components/base/export.h"

@@ -6,6 +6,8 @@
 ///
 ///     class Loud final : public Mz::QrCastImpl<Loud, Volume> { int decibels() const override { … }
 ///     }; Loud loud; const Mz::Kit::Translation<Volume> translation(*greeter, loud);
+///
+/// \since 0.2
 #pragma once
 
 #include "components/componentKit/object.h"

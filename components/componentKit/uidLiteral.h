@@ -3,6 +3,8 @@
 ///
 ///     using namespace Mz::literals;
 ///     constexpr Mz::QrUid gaugeUid = "6E1B0A01-4D1F-11EF-9C2A-7B105D3E8F41"_uid;
+///
+/// \since 0.2
 #pragma once
 
 #include "components/componentManager/uid.h"

@@ -5,6 +5,8 @@
 /// A component and its host exchange objects of C++. They need the same binary compatibility number
 /// (SOVERSION) of this library, the same C++ ABI, and the same layout of the standard library's
 /// classes. The stamp shows a mismatch before code of the library runs.
+///
+/// \since 0.2
 #pragma once
 
 #include "components/componentManager/version.h"

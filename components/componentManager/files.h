@@ -2,6 +2,8 @@
 /// File operations for hosts and tools: safe replacement of a file, and full paths.
 ///
 /// All functions may be called from any thread.
+///
+/// \since 0.2
 #pragma once
 
 #include "components/componentManager/export.h"

@@ -13,6 +13,8 @@
 /// It must not change during a call.
 ///
 /// All functions may be called from any thread and throw `std::bad_alloc` only.
+///
+/// \since 0.2
 #pragma once
 
 #include "components/componentManager/export.h"

@@ -193,7 +193,7 @@ class MZ_COMPONENT_MANAGER_API QrStream {
     /// \return the number of arguments assigned. The end of input ends the read and does not throw.
     virtual int formattedRead(const wchar_t* format, ...);
 
-    /// The operation of the stream to which a call of the IO belongs.
+    /// The operation of the stream to which a call of the IO belongs. Since 0.2.
     enum class TextKind : unsigned char {
         Other,     ///< Binary data, or an operation of a derived class.
         Value,     ///< A number or a `bool`, by an operator.
@@ -204,6 +204,8 @@ class MZ_COMPONENT_MANAGER_API QrStream {
 
     /// Returns what the stream writes or reads at this moment. For an IO that must distinguish
     /// operations that write the same characters, some of which cannot be read back.
+    ///
+    /// \since 0.2
     TextKind textKind() const { return currentText; }
 
     /// Reads one whole object through the IO. If its `read` called `postLoad`, that request is

@@ -2,6 +2,8 @@
 /// Conversions from and to UTF-8, independent of the locale.
 ///
 /// All functions may be called from any thread and throw `std::bad_alloc` only.
+///
+/// \since 0.2
 #pragma once
 
 #include "components/componentManager/export.h"

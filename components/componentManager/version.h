@@ -3,6 +3,8 @@
 ///
 /// The build reads its own version from these lines. While the major number is 0, a new minor
 /// version may break source compatibility.
+///
+/// \since 0.2
 #pragma once
 
 /// Grows with an incompatible change.

@@ -5,6 +5,8 @@
 /// files, without memory, in another locale. They run in child processes. A crash, a hang or an
 /// exit becomes a finding of the rule that was being checked, and the other rules are checked in a
 /// new process.
+///
+/// \since 0.2
 #pragma once
 
 #include "components/componentTools/export.h"

@@ -69,6 +69,8 @@ class MZ_COMPONENT_TOOLS_API ConsoleController final
                           const wchar_t* fallbackSearchPath) override;
 
     /// Shows progress, the default, or hides it.
+    ///
+    /// \since 0.2
     void showProgress(bool show);
 
     /// Returns the number of errors that were reported.

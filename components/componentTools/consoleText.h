@@ -1,5 +1,7 @@
 // SPDX-License-Identifier: BSL-1.0
 /// Text and arguments of command lines: conversion between wide text and what a terminal shows.
+///
+/// \since 0.2
 #pragma once
 
 #include "components/componentTools/export.h"

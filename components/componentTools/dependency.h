@@ -1,5 +1,7 @@
 // SPDX-License-Identifier: BSL-1.0
 /// A library that another one needs, as plain data.
+///
+/// \since 0.2
 #pragma once
 
 #include <string>

@@ -34,6 +34,7 @@ struct ExplainOptions {
     /// A recorded list in which to look the file up; may be null.
     const RecordedLibraries* recorded = nullptr;
     /// The folders of a host's search path, to check whether the file is in one; may be null.
+    /// Since 0.2.
     const std::vector<std::filesystem::path>* folders = nullptr;
     /// Load the file in a child process if reading it shows no fault. A missing dependency does not
     /// prevent the attempt.

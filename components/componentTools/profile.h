@@ -5,6 +5,8 @@
 /// calls `QrComponentManager::initialize` and measures its time. The other takes the same steps in
 /// the same order, one library at a time, with a clock around each. The component manager itself is
 /// not changed for this and has no hooks.
+///
+/// \since 0.2
 #pragma once
 
 #include "components/componentTools/discovery.h"

@@ -1,5 +1,7 @@
 // SPDX-License-Identifier: BSL-1.0
 /// Draws a profile of a start as a bar chart.
+///
+/// \since 0.2
 #pragma once
 
 #include "components/componentTools/profile.h"

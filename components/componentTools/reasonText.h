@@ -1,5 +1,7 @@
 // SPDX-License-Identifier: BSL-1.0
 /// Formats the reasons of exceptions for people.
+///
+/// \since 0.2
 #pragma once
 
 #include "components/componentTools/export.h"

@@ -1,5 +1,7 @@
 // SPDX-License-Identifier: BSL-1.0
 /// The records of a recorded list, as plain data.
+///
+/// \since 0.2
 #pragma once
 
 #include "components/componentManager/uid.h"

@@ -1,5 +1,7 @@
 // SPDX-License-Identifier: BSL-1.0
 /// Uids as text for people.
+///
+/// \since 0.2
 #pragma once
 
 #include "components/componentManager/uid.h"

@@ -12,7 +12,8 @@
 namespace Mz::Tools {
 
 /// The kind of a finding. The numeric values may change between versions: store the name
-/// (`nameOf`).
+/// (`nameOf`). Since 0.2: `otherAbi`, `needsHost`, `unreachable`, `notAFolder`, `answerLost`,
+/// `answerTooLong`, `onPath`, `notOnPath`, `uidNil`.
 enum class Verdict {
     // Good.
     component,     ///< a component library, as far as reading the file can show

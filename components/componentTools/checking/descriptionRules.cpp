@@ -259,7 +259,7 @@ void textsNotNull(CheckContext& context) {
 void uidsNotNil(CheckContext& context) {
     for (const DescribedBuilder& builder : context.builders())
         if (builder.uid == QrUid{})
-            context.report(builder.place, L"its uid is nil. Give it four random words.");
+            context.report(builder.place, L"its uid is nil. `mzcomponents uid` prints a new one.");
 }
 
 void uidsUnique(CheckContext& context) {

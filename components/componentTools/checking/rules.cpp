@@ -62,8 +62,8 @@ std::vector<RuleEntry> makeEntries() {
          main,
          Rules::textsNotNull},
         {{"uid-not-nil", description, error, L"No builder has the uid of four zero words.",
-          L"A nil uid is one that was forgotten, and all forgotten ones are the same. Make four "
-          L"random words."},
+          L"A nil uid is one that was forgotten, and all forgotten ones are the same. "
+          L"`mzcomponents uid` prints a new one."},
          main,
          Rules::uidsNotNil},
         {{"uid-unique", description, error, L"Each builder of the library has a uid of its own.",
