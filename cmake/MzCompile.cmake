@@ -56,14 +56,19 @@ if(MZ_SANITIZE)
   target_link_options(mzCompile INTERFACE -fsanitize=address,undefined)
 endif()
 
-# mz_precompile(TARGET HEADER...): precompiles headers of others, which take a third of the time to
-# compile TARGET. Only in builds with tests: packages are built as their sources say. The Clang build
-# compiles without them and fails where an include is missing.
-function(mz_precompile target)
-  if(MZ_BUILD_TESTS)
-    target_precompile_headers(${target} PRIVATE ${ARGN})
-    mz_allow_precompiled(${target})
-  endif()
+# mz_compile_together(TARGET...): compiles up to eight sources of each target at once, in builds with
+# tests. Templates of large headers are instantiated once for all of them, which more than halves the
+# time. Packages are built source by source. So is the Clang build, which fails where a source lacks
+# an include or uses what another one defines.
+option(MZ_COMPILE_TOGETHER "Compile several sources at once, to save time" ${MZ_BUILD_TESTS})
+function(mz_compile_together)
+  set_target_properties(${ARGN} PROPERTIES UNITY_BUILD ${MZ_COMPILE_TOGETHER} UNITY_BUILD_BATCH_SIZE 8)
+endfunction()
+
+# mz_compile_alone(SOURCE...): compiles these sources by themselves all the same: they use names that
+# others of their target use, too.
+function(mz_compile_alone)
+  set_source_files_properties(${ARGN} PROPERTIES SKIP_UNITY_BUILD_INCLUSION ON)
 endfunction()
 
 # GCC 12 does not know which precompiled headers are the system's, and reports its known false

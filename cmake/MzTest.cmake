@@ -58,6 +58,7 @@ function(mz_add_test_program name)
   target_link_libraries(${name} PRIVATE mzCompile mzTestCode mzTestSupport GTest::gmock)
   target_precompile_headers(${name} REUSE_FROM mzTestHeaders)
   mz_allow_precompiled(${name})
+  mz_compile_together(${name})
 endfunction()
 
 # mz_link_manager(PROGRAM INTERNALS): links libMZcomponentManager as it is installed, or with

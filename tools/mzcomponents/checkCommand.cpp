@@ -20,10 +20,6 @@ namespace Mz::Commands {
 
 namespace {
 
-std::wstring wide(const char* ascii) {
-    return std::wstring(ascii, ascii + std::char_traits<char>::length(ascii));
-}
-
 Tools::Grade gradeNamed(const std::string& name) {
     for (const Tools::Grade grade : {Tools::Grade::note, Tools::Grade::warning})
         if (name == Tools::nameOf(grade))

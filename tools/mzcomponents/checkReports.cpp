@@ -15,10 +15,6 @@ namespace Mz::Commands {
 
 namespace {
 
-std::wstring wide(const char* ascii) {
-    return std::wstring(ascii, ascii + std::char_traits<char>::length(ascii));
-}
-
 std::wstring sentenceOf(const Tools::CheckFinding& finding) {
     return finding.place.empty() ? finding.sentence : finding.place + L": " + finding.sentence;
 }
@@ -119,6 +115,10 @@ Json sarifResult(const CheckedLibrary& library, std::size_t index) {
 }
 
 } // namespace
+
+std::wstring wide(const char* ascii) {
+    return std::wstring(ascii, ascii + std::char_traits<char>::length(ascii));
+}
 
 bool anyFails(const std::vector<CheckedLibrary>& libraries, Tools::Grade failOn) {
     for (const CheckedLibrary& library : libraries)

@@ -16,6 +16,9 @@ struct CheckedLibrary {
     std::vector<std::wstring> reasons;
 };
 
+/// Returns ASCII text, such as the name of a rule, as wide text.
+std::wstring wide(const char* ascii);
+
 /// Returns whether a finding of this grade or a more serious one is not tolerated.
 bool anyFails(const std::vector<CheckedLibrary>& libraries, Tools::Grade failOn);
 

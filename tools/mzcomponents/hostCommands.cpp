@@ -122,7 +122,7 @@ std::wstring describe(const QrCastable* object) {
     }
 }
 
-Json jsonOf(const std::filesystem::path& file, const Imported& imported) {
+Json jsonOfImport(const std::filesystem::path& file, const Imported& imported) {
     const bool good = static_cast<bool>(imported.object);
     return {{"file", utf8(Tools::displayName(file))},
             {"imported", good},
@@ -179,12 +179,12 @@ std::vector<Tools::GraphImporter> importersOf(const Host& host) {
     return importers;
 }
 
-Json jsonOf(const Host& host, const std::vector<Tools::GraphImporter>& importers) {
+Json jsonOfHost(const Host& host, const std::vector<Tools::GraphImporter>& importers) {
     Json libraries = Json::array(), used = Json::array();
     for (const Tools::RecordedLibrary& library : host.libraries()) {
         if (library.builders.empty())
             continue;
-        libraries.push_back(Commands::jsonOf(library));
+        libraries.push_back(jsonOf(library));
         // Offsets apply only to the file from which a list was read.
         libraries.back().erase("position");
         for (Json& builder : libraries.back()["builders"])
@@ -247,7 +247,7 @@ int importFiles(const Common& common, const ImportArguments& arguments,
         if (imported.object)
             objects.push_back(imported.object);
         if (common.json)
-            files.push_back(jsonOf(file, imported));
+            files.push_back(jsonOfImport(file, imported));
         tell(host, file, imported, !common.json);
     }
     if (common.json)
@@ -266,7 +266,7 @@ int graph(const Common& common, const GraphArguments& arguments, const ProbeArgu
     const std::vector<Tools::GraphImporter> importers = importersOf(host);
     const std::string dot = Tools::dotOf(host.libraries(), importers);
     if (common.json) {
-        printJson(jsonOf(host, importers));
+        printJson(jsonOfHost(host, importers));
     } else if (arguments.output.empty() && arguments.svg.empty()) {
         results() << dot;
     }

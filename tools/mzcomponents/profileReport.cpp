@@ -123,10 +123,10 @@ void reportFaults(const StartProfile& profile, std::set<std::filesystem::path>& 
         }
 }
 
-Json jsonOf(const ProfiledLibrary& library, const StartProfile& profile) {
+Json jsonOfLibrary(const ProfiledLibrary& library, const StartProfile& profile) {
     Json entry{{"file", utf8(Tools::displayName(library.path))}};
-    entry.update(Commands::jsonOf(library.verdict));
-    entry["record"] = library.record ? Commands::jsonOf(*library.record) : Json();
+    entry.update(jsonOf(library.verdict));
+    entry["record"] = library.record ? jsonOf(*library.record) : Json();
     entry["loaded"] = library.loaded;
     entry["measured"] = library.measured;
     entry["share"] = profile.shareOf(library);
@@ -142,30 +142,30 @@ Json jsonOf(const ProfiledLibrary& library, const StartProfile& profile) {
     return entry;
 }
 
-Json jsonOf(const std::optional<nanoseconds>& time) {
+Json jsonOfTime(const std::optional<nanoseconds>& time) {
     return time ? Json(millisecondsOf(*time)) : Json();
 }
 
-Json jsonOf(const StartProfile& profile) {
+Json jsonOfStart(const StartProfile& profile) {
     Json libraries = Json::array(), folders = Json::array();
     for (const ProfiledLibrary& library : profile.libraries)
-        libraries.push_back(jsonOf(library, profile));
+        libraries.push_back(jsonOfLibrary(library, profile));
     for (const Tools::Discovery::LeftOut& left : profile.leftOut) {
         folders.push_back({{"file", utf8(Tools::displayName(left.path))}});
-        folders.back().update(Commands::jsonOf(left.finding));
+        folders.back().update(jsonOf(left.finding));
     }
     const Json own =
         profile.initialize ? Json(millisecondsOf(*profile.initialize - profile.sum())) : Json();
     return {{"answer", utf8(Tools::answerOf(profile))},
             {"runs", profile.runs},
             {"fileCache", "warm"},
-            {"initialize", jsonOf(profile.initialize)},
+            {"initialize", jsonOfTime(profile.initialize)},
             {"sum", millisecondsOf(profile.sum())},
             {"managersOwnSteps", own},
             {"listing", millisecondsOf(profile.listing)},
             {"otherFiles",
              {{"count", profile.otherFiles}, {"time", millisecondsOf(profile.otherTime)}}},
-            {"listReading", jsonOf(profile.listReading)},
+            {"listReading", jsonOfTime(profile.listReading)},
             {"libraries", std::move(libraries)},
             {"skippedFolders", std::move(folders)},
             {"listProblem", utf8(profile.listProblem)},
@@ -191,8 +191,8 @@ void printProfile(const MeasuredStarts& measured) {
 }
 
 Json jsonOf(const MeasuredStarts& measured) {
-    Json value = jsonOf(measured.start);
-    value["withoutList"] = measured.without ? jsonOf(*measured.without) : Json();
+    Json value = jsonOfStart(measured.start);
+    value["withoutList"] = measured.without ? jsonOfStart(*measured.without) : Json();
     return value;
 }
 

@@ -15,7 +15,7 @@ namespace Mz::Tools {
 
 namespace {
 
-using Name = std::pair<std::wstring_view, std::wstring_view>;
+using NameView = std::pair<std::wstring_view, std::wstring_view>;
 
 /// The files that were listed already, under this or another name.
 class ListedFiles {
@@ -60,10 +60,10 @@ std::vector<StartFile> listStartFiles(const std::wstring& searchPath) {
 }
 
 void findRecords(std::vector<StartFile>& files, const RecordedLibraries& recorded) {
-    std::map<Name, std::vector<const RecordedLibrary*>> records;
+    std::map<NameView, std::vector<const RecordedLibrary*>> records;
     for (const RecordedLibrary& record : recorded)
         records[{record.directory, record.fileName}].push_back(&record);
-    std::map<Name, std::vector<StartFile*>> groups;
+    std::map<NameView, std::vector<StartFile*>> groups;
     for (StartFile& file : files)
         groups[{file.directory, file.fileName}].push_back(&file);
     for (const auto& [name, group] : groups) {

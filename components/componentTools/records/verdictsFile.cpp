@@ -22,21 +22,21 @@ namespace Mz::Tools {
 
 namespace {
 
-using Json = nlohmann::ordered_json;
+using OrderedJson = nlohmann::ordered_json;
 
 constexpr int version = 1;
 
-std::wstring wide(const Json& entry, const char* key) {
+std::wstring wide(const OrderedJson& entry, const char* key) {
     return fromUtf8(entry.at(key).get<std::string>());
 }
 
 /// Verdicts by directory and file name.
-using Verdicts = std::map<std::pair<std::wstring, std::wstring>, const Json*>;
+using Verdicts = std::map<std::pair<std::wstring, std::wstring>, const OrderedJson*>;
 
-Verdicts verdictsOf(const Json& all) {
+Verdicts verdictsOf(const OrderedJson& all) {
     Verdicts verdicts;
     if (all.at("version").get<int>() == version)
-        for (const Json& entry : all.at("libraries"))
+        for (const OrderedJson& entry : all.at("libraries"))
             verdicts[{wide(entry, "directory"), wide(entry, "fileName")}] = &entry;
     return verdicts;
 }
@@ -68,7 +68,7 @@ void fillIn(RecordedLibrary& library, const Verdicts& verdicts) {
     const auto found = verdicts.find({library.directory, library.fileName});
     if (found == verdicts.end())
         return;
-    const Json& entry = *found->second;
+    const OrderedJson& entry = *found->second;
     if (entry.at("time").get<std::uint32_t>() != library.time ||
         entry.at("size").get<std::int64_t>() != library.size)
         return;
@@ -84,7 +84,7 @@ void readVerdicts(const std::filesystem::path& file, RecordedLibraries& librarie
     if (!openPatiently(input, file))
         return;
     try {
-        const Json all = Json::parse(input);
+        const OrderedJson all = OrderedJson::parse(input);
         const Verdicts verdicts = verdictsOf(all);
         for (RecordedLibrary& library : libraries)
             if (library.builders.empty())
@@ -95,7 +95,7 @@ void readVerdicts(const std::filesystem::path& file, RecordedLibraries& librarie
 }
 
 void writeVerdicts(const std::filesystem::path& file, const RecordedLibraries& libraries) {
-    Json entries = Json::array();
+    OrderedJson entries = OrderedJson::array();
     for (const RecordedLibrary& library : libraries)
         if (library.kept)
             entries.push_back({{"directory", toUtf8(library.directory)},
@@ -107,7 +107,8 @@ void writeVerdicts(const std::filesystem::path& file, const RecordedLibraries& l
                                {"words", toUtf8(library.kept->words)},
                                {"sentence", toUtf8(sentenceOf(*library.kept))},
                                {"cure", toUtf8(cureOf(*library.kept))}});
-    replaceFile(file, Json{{"version", version}, {"libraries", entries}}.dump(2, ' ', true) + "\n");
+    replaceFile(file, OrderedJson{{"version", version}, {"libraries", entries}}.dump(2, ' ', true) +
+                          "\n");
 }
 
 } // namespace Mz::Tools
