@@ -41,3 +41,9 @@ plain=' override \(function\)| override=|Member (Self|uid|CastChainLink) |Member
 plain="$plain|Member MZ_\w+_API|Member MZ_IMPORT"
 if grep -vE "($plain).*$undocumented" "$output/warnings.txt" >&2; then exit 1; fi
 rm "$output/warnings.txt"
+for page in page_streams classMz_1_1QrStream; do
+  if ! grep -q '<code>%I64d</code>' "$output/$page.html"; then
+    echo "$page.html shows formats without their percent signs" >&2
+    exit 1
+  fi
+done

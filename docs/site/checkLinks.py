@@ -20,7 +20,7 @@ class Page(HTMLParser):
         for name, value in attributes:
             if name == "id" or (tag == "a" and name == "name"):
                 self.anchors.add(value or "")
-            elif name in ("href", "src") and value:
+            elif name in ("href", "src", "data") and value:
                 self.links.append(value)
 
 

@@ -3,8 +3,8 @@
 """Prepares a file for doxygen, line for line, so that the lines of its warnings are right.
 
 Headers and guides are written to be read as they are. Doxygen 1.9 takes the first comment of a
-header for that of what follows it, and knows neither the anchors that others give to headings nor
-links to them.
+header for that of what follows it, knows neither the anchors that others give to headings nor links
+to them, and drops a percent sign at the beginning of a word.
 """
 import os
 import re
@@ -15,6 +15,14 @@ HEADING = re.compile(r"^(#{1,6}) +(.*?) *$")
 LINK = re.compile(r"(?<!\!)\[((?:[^\[\]]|\[[^\]]*\])*)\]\(([^()\s]+)\)")
 
 
+CODE = re.compile(r"`[^`\n]+`")
+
+
+def with_percent_signs(text: str) -> str:
+    """Doubles what doxygen drops, also in code: the percent sign of `%s`."""
+    return CODE.sub(lambda code: re.sub(r"(?<=[`\s])%(?=[A-Za-z_])", "%%", code.group(0)), text)
+
+
 def header(text: str) -> str:
     """Marks the first comment as that of the file, and shares comments among declarations."""
     text = re.sub(r"\A// SPDX[^\n]*\n///", "/// \\\\file\n///", text, count=1)
@@ -22,7 +30,7 @@ def header(text: str) -> str:
     index = 0
     while index < len(lines):
         index = share(lines, index) if is_comment(lines[index]) else index + 1
-    return "\n".join(lines)
+    return with_percent_signs("\n".join(lines))
 
 
 def is_comment(line: str) -> bool:
@@ -118,7 +126,7 @@ class Guide:
                 fenced = not fenced
             elif not fenced:
                 match = HEADING.match(line)
-                line = self.heading(match) if match else self.links(line)
+                line = with_percent_signs(self.heading(match) if match else self.links(line))
             lines.append(line)
         return "\n".join(lines)
 
