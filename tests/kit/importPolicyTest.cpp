@@ -257,7 +257,7 @@ TEST_F(KitImportPolicy, AsksNobodyAboutAnInputThatIsTooLarge) {
 
 TEST_F(KitImportPolicy, InterruptsABuilderWhenTheTimeIsOver) {
     initialize();
-    policy.timeLimit = milliseconds(200);
+    policy.timeLimit = milliseconds(50);
     for (const char* script : {"A=wait", "A=warn", "A=progress", "A=reread", "A=canReread"}) {
         const Kit::ImportResult result = import(script);
         EXPECT_EQ(result.end, Kit::ImportEnd::timeOver) << script;
