@@ -122,6 +122,23 @@ TEST_F(ElfTables, OfSymbolsAndNamesAreNeededForSymbols) {
     }
 }
 
+TEST_F(ElfTables, ThatAreMissingAreNotLookedForInTheHeader) {
+    restart({.program = true}); // For programs, no missing table is reported.
+    // Where symbol 1 of a table at address 0 would be, there is the address of the first statement.
+    const std::uint64_t name = get<std::uint32_t>(value(symbolsTag) + 24), type = 0x12;
+    put(24, name | type << 32);
+    setTag(symbolsTag, ignoredTag);
+    put<std::uint32_t>(value(gnuHashTag) + 4, 2);
+    EXPECT_TRUE(wantedSymbols(file()).empty());
+
+    constexpr std::uint64_t firstSection = std::uint64_t{1} << 48;
+    put(24, name | type << 32 | firstSection);
+    put<std::uint32_t>(value(gnuHashTag) + 4, 1);
+    std::set<std::string> names{entryPoint};
+    EXPECT_TRUE(removeDefined(file(), names));
+    EXPECT_THAT(names, ElementsAre(entryPoint));
+}
+
 TEST_F(ElfTables, HoldANameUpToTheirLastByte) {
     const std::uint64_t size = value(stringsSizeTag);
     setValue(neededTag, size - 1);
@@ -168,7 +185,7 @@ TEST_F(ElfTables, OfTheOlderKindHaveChains) {
     EXPECT_TRUE(hasEntryPoint());
     setOldHash({1, 3, 2, 0, 0, 2}); // Symbol 2 follows itself.
     EXPECT_FALSE(hasEntryPoint());
-    setOldHash({1, 3, 0, 0, 0, 0}); // There is nothing in the bucket.
+    setOldHash({1, 3, 0, 1, 0, 0}); // There is nothing in the bucket, whatever follows.
     EXPECT_FALSE(hasEntryPoint());
     setOldHash({0, 3, 1, 0, 0, 0}); // There is no bucket.
     EXPECT_FALSE(hasEntryPoint());
