@@ -202,6 +202,12 @@ TEST_F(KitImportPolicy, GoesOnAfterABuilderThatThrowsWhenAsked) {
     EXPECT_EQ(result.builders[1].reason, L"an exception of an unknown type");
 }
 
+TEST_F(KitImportPolicy, BeginsAgainForEachBuilder) {
+    initialize();
+    EXPECT_EQ(words(import("A=canBlock;B=take")), L"B");
+    EXPECT_EQ(words(import("A=canThrow;B=canBlock;C=take")), L"C");
+}
+
 TEST_F(KitImportPolicy, EndsWithTheBuilderThatAccepts) {
     initialize();
     for (const char* script : {"A=null;B=take", "A=error;B=take", "A=throw;B=take"}) {

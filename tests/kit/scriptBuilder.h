@@ -41,7 +41,13 @@ class ScriptBuilder final : public Kit::ImportBuilder<ScriptBuilder> {
             throw 42;
         if (action == "canReread")
             reread(*io);
-        return !action.empty() && action != "decline";
+        if (action == "canBlock") { // Reads beyond the end, and leaves the stream there.
+            char block[4096];
+            io->seek(0, 0);
+            io->read(block, sizeof block);
+            return false;
+        }
+        return !action.empty();
     }
 
     QrRef<QrCastable> import(QrPtr<QrBufferedIO> io, const wchar_t* path,
