@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: BSL-1.0
 /// The component: an import builder for OBJ files. It asks the process controller for the material
 /// libraries, by the names that the OBJ file has for them. Which file that is, and whether the
-/// component gets one at all, is for the host to decide: the names come from a file of strangers.
+/// component gets one at all, is for the host to decide: the names come from an untrusted file.
 #include "objFormat.h"
 
 #include "components/componentKit/componentKit.h"

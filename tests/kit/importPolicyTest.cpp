@@ -181,7 +181,7 @@ TEST_F(KitImportPolicy, TakesTheBuildersOfAnImporter) {
     EXPECT_TRUE(Kit::importFrom(*Kit::newImporter<L"script">(), "A=take", L"x", policy));
     const QrPtr<QrImporter> importer = Kit::newImporter<L"script">();
     EXPECT_TRUE(Kit::importFrom(*importer, "A=take", L"x", policy));
-    EXPECT_TRUE(Kit::importFrom(L"nobody", "A=take", L"x", policy).builders.empty());
+    EXPECT_TRUE(Kit::importFrom(L"no family", "A=take", L"x", policy).builders.empty());
 }
 
 TEST_F(KitImportPolicy, TakesBytesOfAnyValue) {
@@ -248,7 +248,7 @@ TEST_F(KitImportPolicy, ReportsOddBuilders) {
 
 // ---- Limits -------------------------------------------------------------------------------------
 
-TEST_F(KitImportPolicy, AsksNobodyAboutAnInputThatIsTooLarge) {
+TEST_F(KitImportPolicy, AsksNoBuilderAboutAnInputThatIsTooLarge) {
     initialize();
     policy.byteLimit = 5;
     const Kit::ImportResult result = import("A=take");
