@@ -442,6 +442,16 @@ TEST(KitCompanionNames, StayBelowAFolder) {
         EXPECT_FALSE(Kit::detail::staysBelow(name)) << toNarrow(name, '?');
 }
 
+TEST_F(KitImportPolicy, ReportsToTheControllerOfTheThread) {
+    initialize();
+    Log own;
+    const Kit::ControllerScope scope(own, Kit::ControllerScope::thread);
+    EXPECT_EQ(import("A=error").builders[0].reason, L"line 1: bad; line 2: worse");
+    EXPECT_EQ(own.shown.size(), 2U);
+    EXPECT_TRUE(log.shown.empty());
+    EXPECT_EQ(QrGetThreadProcessController(), &own);
+}
+
 // ---- The controller of the host -----------------------------------------------------------------
 
 TEST(KitImportController, PassesEverythingOn) {
