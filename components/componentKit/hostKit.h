@@ -14,11 +14,13 @@
 /// - `recordedList.h`: starts that load no library
 /// - `controller.h`: messages, progress, abort, file lookup
 /// - `importer.h`: imports of foreign files
+/// - `importFile.h`: imports under a policy, of files and of bytes, with a report
 /// - `translation.h`: interfaces that one object supplies for another
 /// - `uidLiteral.h`: uids as text
 #pragma once
 
 #include "components/componentKit/controller.h"
+#include "components/componentKit/importFile.h"
 #include "components/componentKit/importer.h"
 #include "components/componentKit/manager.h"
 #include "components/componentKit/names.h"
