@@ -6,6 +6,8 @@
 /// finds companion files by the policy.
 ///
 /// For `importFile.h`; hosts do not need this class.
+///
+/// \since 0.2
 #pragma once
 
 #include "components/base/assertions.h"

@@ -14,6 +14,8 @@
 ///
 /// The manager's builders are enumerated here, and not by the importer: its enumeration loads the
 /// library of each builder before a policy can see it.
+///
+/// \since 0.2
 #pragma once
 
 #include "components/componentKit/controller.h"

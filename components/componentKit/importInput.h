@@ -6,6 +6,8 @@
 /// becomes a failure of the medium there, which builders must handle anyway.
 ///
 /// For `importFile.h`; hosts do not need these classes.
+///
+/// \since 0.2
 #pragma once
 
 #include <algorithm>

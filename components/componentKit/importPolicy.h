@@ -5,6 +5,8 @@
 ///     policy.deny = {brokenBuilderUid};
 ///     policy.byteLimit = 50'000'000;
 ///     policy.timeLimit = std::chrono::seconds(10);
+///
+/// \since 0.2
 #pragma once
 
 #include "components/componentManager/uid.h"

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: BSL-1.0
 /// The result of an import under a policy: the object, who read it, and who did not, and why (see
 /// `importFile.h`).
+///
+/// \since 0.2
 #pragma once
 
 #include "components/componentManager/castable.h"
