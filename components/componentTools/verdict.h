@@ -38,7 +38,8 @@ enum class Verdict {
     sameName,       ///< its name equals that of another file except for case
     otherSystem,
     otherProcessor,
-    otherAbi, ///< its stamp names another ABI or SOVERSION than that of this library
+    otherAbi,       ///< its stamp names another ABI or SOVERSION than that of this library
+    otherInterface, ///< an interface differs from that of its host; see `MZ_INTERFACE`
     damaged,
     entryPointNoFunction, ///< the exported entry point is not a function of this library
     dependencyMissing,

@@ -18,7 +18,7 @@ _mzcomponents() {
     mapfile -t COMPREPLY < <(compgen -d -- "$current")
     return
     ;;
-  --cache | --save | --output | --svg | --sample | --suppress | --junit | --sarif)
+  --cache | --save | --output | --svg | --sample | --host | --suppress | --junit | --sarif)
     compopt -o filenames 2>/dev/null
     mapfile -t COMPREPLY < <(compgen -f -- "$current")
     return
