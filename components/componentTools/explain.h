@@ -42,8 +42,9 @@ struct ExplainOptions {
     ProbeOptions probe;
     /// The folder of the host's program, in which Windows looks for libraries too; empty for none.
     std::filesystem::path programFolder;
-    /// Programs and libraries of the host. The interfaces of the file are compared with theirs: see
-    /// `otherInterface`. They are compared with those of libMZcomponentManager in any case.
+    /// Programs and libraries of the host, with whose interfaces those of the file are compared: see
+    /// `otherInterface`. The program of this process and its libMZcomponentManager are compared in
+    /// any case.
     std::vector<std::filesystem::path> hosts;
     /// Look for every library that the file needs. If false, the check is faster, and
     /// `dependencyMissing` and `needsHost` are not found.

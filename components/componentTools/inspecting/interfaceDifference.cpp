@@ -6,6 +6,7 @@
 #include "components/componentManager/interfaceTable.h"
 #include "components/componentManager/utf8.h"
 #include "components/componentTools/platform/system.h"
+#include "components/platform/files.h"
 
 #include <algorithm>
 #include <string>
@@ -189,9 +190,9 @@ std::optional<Finding> interfaceDifference(const std::filesystem::path& componen
     const std::vector<InterfaceTable> here = interfaceTablesOf(component);
     if (here.empty())
         return std::nullopt;
-    if (auto finding = interfaceDifference(here, interfaceTablesOf(System::managerFile())))
-        return finding;
-    for (const std::filesystem::path& host : hosts)
+    std::vector<std::filesystem::path> files{System::managerFile(), platform::programFile()};
+    files.insert(files.end(), hosts.begin(), hosts.end());
+    for (const std::filesystem::path& host : files)
         if (auto finding = interfaceDifference(here, interfaceTablesOf(host)))
             return finding;
     return std::nullopt;

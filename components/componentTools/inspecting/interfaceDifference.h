@@ -16,8 +16,8 @@ namespace Mz::Tools {
 std::optional<Finding> interfaceDifference(const std::vector<InterfaceTable>& component,
                                            const std::vector<InterfaceTable>& host);
 
-/// Returns the same for the file of a component. It is compared with the libMZcomponentManager of
-/// this process, and with the programs and libraries `hosts`.
+/// Returns the same for the file of a component. It is compared with the program and the
+/// libMZcomponentManager of this process, and with the programs and libraries `hosts`.
 std::optional<Finding> interfaceDifference(const std::filesystem::path& component,
                                            const std::vector<std::filesystem::path>& hosts);
 
