@@ -163,6 +163,9 @@ using OwnPointer = MemberPointer<Interface, FunctionOf<Pointer>>;
 template <class Class>
 struct EndOf : Class {
     virtual void mzEnd() = 0;
+
+  protected:
+    ~EndOf() = default; // No warning that it is not virtual, if that of `Class` is not.
 };
 
 /// An `InterfaceEntry` with its text. `Function` is a pointer to a virtual function, which the
