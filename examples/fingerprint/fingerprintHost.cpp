@@ -4,6 +4,7 @@
 /// The files are read before the component manager loads anything. `explainFile` compares the
 /// interfaces of each with those of the program in which it runs: this one.
 #include "components/componentKit/hostKit.h"
+#include "components/componentManager/utf8.h"
 #include "components/componentTools/explain.h"
 #include "greeter.h"
 

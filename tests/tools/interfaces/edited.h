@@ -128,10 +128,11 @@ virtual const char* greeting() const = 0;
     }
 #endif
 
-  private:
 #ifdef MZ_EDIT_member
     int member;
 #endif
+
+  private:
 #ifdef MZ_EDIT_privateAppended
     virtual void hidden();
 #endif
