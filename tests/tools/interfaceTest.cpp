@@ -2,6 +2,7 @@
 /// The fingerprints of interfaces: what is read from a file, and which edits are found. The
 /// libraries are built by each compiler of the system: see `interfaces/CMakeLists.txt`.
 #include "components/componentManager/interfaceTable.h"
+#include "components/componentTools/fingerprints.h"
 #include "components/componentTools/images/libraryImage.h"
 #include "components/componentTools/inspecting/interfaceDifference.h"
 #include "components/componentTools/platform/system.h"
@@ -123,6 +124,13 @@ TEST_F(Interfaces, OfTheLibraryAreInItsFileAndInEachComponent) {
     EXPECT_THAT(names(System::managerFile()), own);
     EXPECT_THAT(names(builtComponent(L"goodWithKit")), own);
     EXPECT_FALSE(interfaceDifference(builtComponent(L"goodWithKit"), {}));
+}
+
+TEST_F(Interfaces, HaveNamesForCallers) {
+    EXPECT_EQ(fingerprintsOf(library("own", "none")),
+              (std::vector<std::string>{"Greeter", "Other"}));
+    EXPECT_TRUE(fingerprintsOf(folder.write("text", "no library")).empty());
+    EXPECT_TRUE(fingerprintsOf(folder.path() / "missing").empty());
 }
 
 /// The tables of the library, to be changed.

@@ -16,6 +16,7 @@ namespace Mz::Commands {
 struct HostFiles {
     std::vector<std::string> files; ///< as in the arguments
 
+    /// Returns the files. Reports each that describes no interface.
     std::vector<std::filesystem::path> paths() const;
 };
 
