@@ -172,8 +172,9 @@ TEST_F(Scan, FollowsTheInterfacesOfTheHostThoughTheLibraryIsUnchanged) {
         const ListReading reading = readRecordedList(list());
         ASSERT_EQ(reading.libraries.size(), 1u);
         EXPECT_EQ(reading.libraries[0].builders.size(), verdict == Verdict::works ? 1u : 0u);
-        if (verdict != Verdict::works)
+        if (verdict != Verdict::works) {
             EXPECT_EQ(reading.libraries[0].kept.value_or(Finding{}).verdict, verdict);
+        }
     };
     verdictIs(Verdict::works);
     wanted.hosts = {folder.path() / "missing", hostWithInterfaces()};
