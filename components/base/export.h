@@ -18,6 +18,11 @@
 ///
 /// When the process ends, static objects of the program may be destroyed after those of a library
 /// that it loaded. On Linux `function` runs after both. Since 0.2.
+
+/// \def MZ_INTERFACE_TABLE
+/// Places the constant with this name in a section for `MZ_INTERFACE`, though no code uses it. The
+/// linker discards equal constants of several sources with their sections, so each constant needs a
+/// section of its own. The line tells apart those of the same name.
 #ifdef _WIN32
 #define MZ_EXPORT __declspec(dllexport)
 #define MZ_IMPORT __declspec(dllimport)
@@ -33,6 +38,8 @@
     __attribute__((init_priority(101))) function##UnloadHook function##AtUnload;                   \
     }                                                                                              \
     static_assert(true)
+/// The linker joins the sections whose names are equal before the '$'.
+#define MZ_INTERFACE_TABLE(name, line) __attribute__((used, section("mziface$" #name "." #line)))
 #else
 #define MZ_EXPORT __attribute__((visibility("default")))
 #define MZ_IMPORT __attribute__((visibility("default")))
@@ -47,6 +54,14 @@
         function();                                                                                \
     }                                                                                              \
     static_assert(true)
+/// `retain` protects it from `--gc-sections`.
+#if __has_attribute(retain)
+#define MZ_INTERFACE_TABLE(name, line)                                                             \
+    __attribute__((used, retain, visibility("hidden"), section("mziface." #name "." #line)))
+#else
+#define MZ_INTERFACE_TABLE(name, line)                                                             \
+    __attribute__((used, visibility("hidden"), section("mziface." #name "." #line)))
+#endif
 #endif
 
 #ifdef MZ_BUILDING_BASE

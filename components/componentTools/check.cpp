@@ -141,7 +141,9 @@ class CheckRun {
     }
 
     bool isComponent() {
-        const Explanation explanation = explainFile(task.file);
+        ExplainOptions fromOutside;
+        fromOutside.hosts = options.hosts;
+        const Explanation explanation = explainFile(task.file, fromOutside);
         if (severityOf(explanation.verdict.verdict) == Severity::good)
             return true;
         addVerdict(explanation.verdict);

@@ -68,6 +68,9 @@ struct CheckOptions {
     std::chrono::milliseconds fuzzTime{0};
     /// Files that import builders can read. They are read whole, cut off and changed.
     std::vector<std::filesystem::path> samples;
+    /// Programs and libraries of the host, with which the interfaces of the library are compared:
+    /// see `ExplainOptions::hosts`.
+    std::vector<std::filesystem::path> hosts;
     /// Whether the library says that its builders may be used by several threads at a time.
     bool threadSafe = false;
     /// The rule to check, as an identifier, or the value of a finding; empty for all rules.

@@ -7,6 +7,7 @@
 #include "components/componentTools/discovery.h"
 #include "components/componentTools/inspecting/hostNeeds.h"
 #include "components/componentTools/inspecting/inspection.h"
+#include "components/componentTools/inspecting/interfaceDifference.h"
 #include "components/componentTools/inspecting/uidNotes.h"
 #include "components/platform/platform.h"
 
@@ -83,6 +84,9 @@ Explanation explainFile(const std::filesystem::path& file, const ExplainOptions&
     explanation.file = candidate.path;
     LibraryImage image;
     explanation.verdict = inspectFile(candidate.path, image);
+    if (explanation.verdict.verdict == Verdict::component)
+        if (auto difference = interfaceDifference(candidate.path, options.hosts))
+            explanation.verdict = std::move(*difference);
     bool component = explanation.verdict.verdict == Verdict::component;
     if (options.followDependencies && image.format != ImageFormat::none &&
         explanation.verdict.verdict != Verdict::otherSystem)

@@ -43,6 +43,10 @@ struct ExplainOptions {
     ProbeOptions probe;
     /// The folder of the host's program, in which Windows looks for libraries too; empty for none.
     std::filesystem::path programFolder;
+    /// Programs and libraries of the host, with whose interfaces those of the file are compared: see
+    /// `otherInterface`. The program of this process and its libMZcomponentManager are compared in
+    /// any case. Since 0.2.
+    std::vector<std::filesystem::path> hosts;
     /// Look for every library that the file needs. If false, the check is faster, and
     /// `dependencyMissing` and `needsHost` are not found.
     bool followDependencies = true;
@@ -52,7 +56,8 @@ struct ExplainOptions {
 ///
 /// No code of the file runs in this process. Code of the file runs in the child process only if
 /// `options.load` is set, reading the file found a component library, its stamp does not name
-/// another ABI (see `otherAbi`), and it does not import from a program (see `needsHost`).
+/// another ABI (see `otherAbi`), its interfaces are those of the host (see `otherInterface`), and
+/// it does not import from a program (see `needsHost`).
 ///
 /// Dependencies are searched as the loader would search them in this process. If a library has a
 /// manifest, which changes the loader's rules, none of its dependencies counts as missing.

@@ -8,6 +8,7 @@
 #include "components/componentTools/explain.h"
 #include "components/componentTools/inspecting/abiDifference.h"
 #include "components/componentTools/inspecting/inspection.h"
+#include "components/componentTools/inspecting/interfaceDifference.h"
 #include "components/componentTools/inspecting/uidNotes.h"
 #include "components/componentTools/reasonText.h"
 #include "components/componentTools/records/verdictsFile.h"
@@ -125,7 +126,7 @@ class Scanner {
             file.verdict.verdict =
                 verdictOnAbsence(candidate.path); // Gone since the folder was listed.
         } else if (unchanged && !isTriedAgain(known->second) &&
-                   !isForOtherAbi(candidate, known->second)) {
+                   !isForOtherHost(candidate, known->second)) {
             file.verdict = verdictOf(known->second);
             keep(file, known->second);
         } else if (result.interrupted) {
@@ -140,11 +141,12 @@ class Scanner {
         result.files.push_back(std::move(file));
     }
 
-    /// Returns whether the stamp of a library that worked earlier does not match. The library does
-    /// not change when libMZcomponentManager is replaced.
-    static bool isForOtherAbi(const Candidate& candidate, const RecordedLibrary& library) {
+    /// Returns whether a library that worked earlier does not match: its stamp, or its interfaces.
+    /// The library does not change when libMZcomponentManager or the host is replaced.
+    bool isForOtherHost(const Candidate& candidate, const RecordedLibrary& library) const {
         return !library.builders.empty() &&
-               abiDifference(readLibraryImage(candidate.path)).has_value();
+               (abiDifference(readLibraryImage(candidate.path)).has_value() ||
+                interfaceDifference(candidate.path, options.hosts).has_value());
     }
 
     /// Returns whether an unchanged library may have another result now.
@@ -157,6 +159,7 @@ class Scanner {
         case Verdict::dependencyMissing: // It does not change when its dependency arrives.
         case Verdict::loadFailed:        // Nor when the dependency of a dependency does.
         case Verdict::otherAbi:          // Nor when this library does.
+        case Verdict::otherInterface:    // Nor when its host does.
         case Verdict::unreadable:
         case Verdict::probeFailed:
         case Verdict::endUnknown:
@@ -180,6 +183,7 @@ class Scanner {
     void look(ScannedFile& file, const platform::FileStatus& status) {
         ExplainOptions explaining;
         explaining.load = true;
+        explaining.hosts = options.hosts;
         explaining.probe = probeOptions;
         Explanation explanation = explainFile(file.path, explaining);
         file.looked = true;

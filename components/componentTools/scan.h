@@ -20,6 +20,9 @@ struct ScanOptions {
     std::vector<std::filesystem::path> folders;
     /// The list to update; empty to write none.
     std::filesystem::path list;
+    /// Programs and libraries of the host, with which the interfaces of each library are compared:
+    /// see `ExplainOptions::hosts`. Since 0.2.
+    std::vector<std::filesystem::path> hosts;
     /// Retry unchanged libraries that failed earlier.
     bool retry = false;
     /// The limits for each library. If `interrupted` returns true, the whole scan stops.
@@ -56,7 +59,8 @@ struct ScanResult {
 ///
 /// Each library is loaded in a child process if it is new, has changed, or failed for a reason that
 /// may have disappeared, such as a missing dependency. Other libraries keep their record. A library
-/// whose stamp names another ABI (`otherAbi`) is not loaded, and loses the builders of its record.
+/// whose stamp names another ABI (`otherAbi`), or whose interfaces differ from those of the host
+/// (`otherInterface`), is not loaded, and loses the builders of its record.
 ///
 /// A library that fails is recorded with its time and size and no builders. A host that reads the
 /// list does not load it until its file changes. The verdict is saved beside the list, in the file

@@ -71,6 +71,8 @@ constexpr Entry entries[] = {
      L"it was built for %1, and this libMZcomponentManager for %2, so neither can use objects of "
      L"the other",
      L"build it with the compiler, the options and the libMZcomponentManager of its host: %2"},
+    {Verdict::otherInterface, "otherInterface", Severity::fault, L"%2",
+     L"rebuild it with the %1 of its host, or give the changed interface a uid of its own"},
     {Verdict::damaged, "damaged", Severity::fault, L"it is damaged or truncated: %1",
      L"build or copy it again"},
     {Verdict::entryPointNoFunction, "entryPointNoFunction", Severity::fault,

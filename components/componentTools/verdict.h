@@ -13,7 +13,7 @@ namespace Mz::Tools {
 
 /// The kind of a finding. The numeric values may change between versions: store the name
 /// (`nameOf`). Since 0.2: `otherAbi`, `needsHost`, `unreachable`, `notAFolder`, `answerLost`,
-/// `answerTooLong`, `onPath`, `notOnPath`, `uidNil`.
+/// `answerTooLong`, `onPath`, `notOnPath`, `uidNil`, `otherInterface`.
 enum class Verdict {
     // Good.
     component,     ///< a component library, as far as reading the file can show
@@ -39,7 +39,8 @@ enum class Verdict {
     sameName,       ///< its name equals that of another file except for case
     otherSystem,
     otherProcessor,
-    otherAbi, ///< its stamp names another ABI or SOVERSION than that of this library
+    otherAbi,       ///< its stamp names another ABI or SOVERSION than that of this library
+    otherInterface, ///< an interface differs from that of its host; see `MZ_INTERFACE`
     damaged,
     entryPointNoFunction, ///< the exported entry point is not a function of this library
     dependencyMissing,

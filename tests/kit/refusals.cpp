@@ -173,3 +173,56 @@ void visit() {
 #ifdef REFUSAL_createdClass
 const auto created = Kit::create<One>(oneUid);
 #endif
+
+// The list of operations of MZ_INTERFACE.
+class Meter : public Gauge {
+  public:
+    using Self = Meter;
+    static constexpr QrUid uid = "3C5A0006-51C2-4E0B-8F3D-6A701B9E0C55"_uid;
+    virtual int reading() const = 0;
+    virtual void set(int value) = 0;
+    virtual void set(double value) = 0;
+    int twice() const { return 2 * reading(); }
+
+  private:
+    virtual void hidden();
+};
+#ifdef REFUSAL_fingerprint
+MZ_INTERFACE(Meter, MZ_OPERATION(set, void(int)), reading, MZ_OPERATION(set, void(double)),
+             MZ_BASE(Gauge))
+MZ_INTERFACE(Gauge, value);
+MZ_INTERFACE(OtherGauge)
+#endif
+#ifdef REFUSAL_fingerprintOfOverload
+MZ_INTERFACE(Meter, reading, set)
+#endif
+#ifdef REFUSAL_fingerprintMisspelled
+MZ_INTERFACE(Meter, raeding)
+#endif
+#ifdef REFUSAL_fingerprintOfPrivate
+MZ_INTERFACE(Meter, hidden)
+#endif
+#ifdef REFUSAL_fingerprintSignature
+MZ_INTERFACE(Meter, MZ_OPERATION(set, void(long)))
+#endif
+#ifdef REFUSAL_fingerprintOfNoVirtual
+MZ_INTERFACE(Meter, reading, twice)
+#endif
+#ifdef REFUSAL_fingerprintOfBase
+MZ_INTERFACE(Meter, reading, value)
+#endif
+#ifdef REFUSAL_fingerprintNoBase
+MZ_INTERFACE(Meter, MZ_BASE(OtherGauge))
+#endif
+#ifdef REFUSAL_fingerprintBaseWithoutFunctions
+struct Plain {};
+class Derived : public Gauge, public Plain {
+  public:
+    using Self = Derived;
+    static constexpr QrUid uid = "3C5A0007-51C2-4E0B-8F3D-6A701B9E0C55"_uid;
+};
+MZ_INTERFACE(Derived, MZ_BASE(Plain))
+#endif
+#ifdef REFUSAL_fingerprintWithoutSelf
+MZ_INTERFACE(WithoutSelf)
+#endif

@@ -175,6 +175,39 @@ TEST_F(Command, NamesBothSidesOfALibraryForAnotherAbi) {
                             HasSubstr("\n    cure: build it with ")));
 }
 
+TEST_F(Command, ComparesInterfacesWithThoseOfTheNamedHost) {
+    const std::string file = add(L"changedInterface", "a").string();
+    const std::string other = add(L"goodWithKit", "b").string();
+    const std::string host = hostWithInterfaces().string();
+    const std::string sentence = "slot 10 of Greeter is `void added()` here and "
+                                 "`void setGreeting(const std::string&)` in the host";
+    EXPECT_EQ(run({"explain", file}).exitCode, 0);
+    const Json entry = json(1, {"explain", "--host", host, file}).at("files").at(0);
+    EXPECT_EQ(entry.at("verdict"), "otherInterface");
+    EXPECT_EQ(entry.at("sentence"), sentence);
+    EXPECT_THAT(entry.at("cure").get<std::string>(), StartsWith("rebuild it with the Greeter of"));
+    // Of several hosts each one counts.
+    EXPECT_EQ(run({"explain", "--host", file, file}).exitCode, 0);
+    EXPECT_EQ(run({"explain", "--host", file, "--host", host, file}).exitCode, 1);
+    EXPECT_EQ(run({"explain", "--host", host, other}).exitCode, 0);
+    for (const char* command : {"list", "scan"}) {
+        std::vector<std::string> arguments{command, "--host", host, "--path", path()};
+        if (command == std::string("scan"))
+            arguments.insert(arguments.end(), {"--cache", inWork("list")});
+        const ProgramResult result = run(arguments);
+        EXPECT_EQ(result.exitCode, 1);
+        EXPECT_THAT(result.output, StartsWith("otherInterface "));
+        EXPECT_THAT(result.output, HasSubstr(sentence));
+    }
+    const ProgramResult checked = run({"check", "--host", host, file});
+    EXPECT_EQ(checked.exitCode, 1);
+    EXPECT_THAT(checked.output, HasSubstr(sentence));
+    EXPECT_EQ(run({"explain", "--host", inWork("missing"), file}).exitCode, 2);
+    const std::string text = folder.write("text", "no library").string();
+    EXPECT_THAT(run({"explain", "--host", text, file}).output,
+                HasSubstr("text: it describes no interface by MZ_INTERFACE"));
+}
+
 TEST_F(Command, ExplainTellsTheCureAndWhatIsNeeded) {
     const auto file = add(L"missesDependency").string();
     const Json entry = json(1, {"explain", file}).at("files").at(0);

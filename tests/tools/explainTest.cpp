@@ -88,6 +88,21 @@ TEST_F(Explain, TellsALibraryThatWasBuiltForAnotherAbi) {
               L"containers in debug mode (_GLIBCXX_DEBUG)");
 }
 
+TEST_F(Explain, TellsALibraryWithAnotherInterfaceThanItsHost) {
+    const std::filesystem::path file = add(L"changedInterface");
+    EXPECT_EQ(loaded(file).verdict.verdict, Verdict::works);
+    ExplainOptions options;
+    options.load = true;
+    options.hosts = {hostWithInterfaces()};
+    const Explanation explanation = explainFile(file, options);
+    EXPECT_EQ(explanation.verdict.verdict, Verdict::otherInterface);
+    EXPECT_EQ(explanation.verdict.subject, L"Greeter");
+    EXPECT_THAT(sentenceOf(explanation.verdict), HasSubstr(L"`void added()` here"));
+    EXPECT_THAT(explanation.builders, IsEmpty()) << "it is not loaded";
+    options.hosts = {file};
+    EXPECT_EQ(explainFile(file, options).verdict.verdict, Verdict::works);
+}
+
 TEST_F(Explain, FindsTheStampInALibraryThatWasOptimisedAndStripped) {
     if (!std::filesystem::exists(builtComponent(L"kitShrunk")))
         GTEST_SKIP() << "it is built by GCC without sanitizers only";

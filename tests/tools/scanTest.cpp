@@ -161,6 +161,31 @@ TEST_F(Scan, DropsTheBuildersOfALibraryThatWasRecordedUnderAnotherAbi) {
     EXPECT_TRUE(readRecordedList(list()).libraries[0].builders.empty());
 }
 
+TEST_F(Scan, FollowsTheInterfacesOfTheHostThoughTheLibraryIsUnchanged) {
+    add(L"changedInterface");
+    ScanOptions wanted = options();
+    const auto verdictIs = [&](Verdict verdict) {
+        const ScanResult result = scan(wanted);
+        ASSERT_EQ(result.files.size(), 1u);
+        EXPECT_EQ(result.files[0].verdict.verdict, verdict);
+        EXPECT_EQ(result.libraries[0].builders.size(), verdict == Verdict::works ? 1u : 0u);
+        const ListReading reading = readRecordedList(list());
+        ASSERT_EQ(reading.libraries.size(), 1u);
+        EXPECT_EQ(reading.libraries[0].builders.size(), verdict == Verdict::works ? 1u : 0u);
+        if (verdict != Verdict::works) {
+            EXPECT_EQ(reading.libraries[0].kept.value_or(Finding{}).verdict, verdict);
+        }
+    };
+    verdictIs(Verdict::works);
+    wanted.hosts = {folder.path() / "missing", hostWithInterfaces()};
+    verdictIs(Verdict::otherInterface);
+    verdictIs(Verdict::otherInterface);
+    wanted.hosts = {builtComponent(L"changedInterface")};
+    verdictIs(Verdict::works);
+    wanted.hosts = {hostWithInterfaces()};
+    verdictIs(Verdict::otherInterface);
+}
+
 TEST_F(Scan, LeavesOutALibraryThatNeedsItsHostSoThatTheHostLoadsIt) {
     const auto file = add(L"takesFromHost");
     add(L"goodWithKit");

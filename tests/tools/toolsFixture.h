@@ -35,6 +35,11 @@ inline std::filesystem::path builtComponent(const std::wstring& name,
            (name + MZ_LIBRARY_EXTENSION);
 }
 
+/// The program of a host with other interfaces than those of the component changedInterface.
+inline std::filesystem::path hostWithInterfaces() {
+    return buildFolder / "interfaces" / "own" / "host.program";
+}
+
 inline std::string contentOf(const std::filesystem::path& file) {
     std::ifstream stream(file, std::ios::binary);
     return std::string(std::istreambuf_iterator<char>(stream), {});

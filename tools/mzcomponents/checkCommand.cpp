@@ -71,6 +71,7 @@ std::vector<std::filesystem::path> librariesOf(const CheckArguments& arguments, 
 Tools::CheckOptions optionsOf(const CheckArguments& arguments, const ProbeArguments& probe) {
     Tools::CheckOptions options;
     options.process = probe.options();
+    options.hosts = arguments.host.paths();
     options.seed = arguments.seed;
     options.fuzzTime =
         std::chrono::milliseconds(static_cast<long long>(arguments.fuzzSeconds * 1000));
@@ -177,6 +178,7 @@ void addCheckCommand(CLI::App& app, CheckArguments& arguments, ProbeArguments& p
                      "A file that import builders can read; may be repeated")
         ->type_name("FILE")
         ->allow_extra_args(false); // What follows it is a library.
+    addHostOption(*check, arguments.host);
     check
         ->add_option("--fail-on", arguments.failOn,
                      "The least serious findings that cause status 1: error, warning or note")

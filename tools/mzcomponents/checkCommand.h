@@ -19,6 +19,7 @@ namespace Mz::Commands {
 struct CheckArguments {
     std::vector<std::string> files, samples;
     std::string path; ///< folders whose libraries are checked, too; empty for none
+    HostFiles host;
     std::string failOn = "error";
     std::string suppressions, junit, sarif; ///< names of files; empty for none
     std::string explained;                  ///< a rule to explain instead of a check

@@ -5,6 +5,7 @@
 
 #include "components/componentTools/console.h"
 #include "components/componentTools/scan.h"
+#include "tools/mzcomponents/hostOption.h"
 
 #include <chrono>
 #include <cstdint>
@@ -24,6 +25,7 @@ struct Common {
     std::string path = "."; ///< folders as in the argument, separated by ';'
     std::string cache;      ///< the recorded list; empty for none
     bool json = false;
+    HostFiles host;
 };
 
 struct ExplainArguments {

@@ -146,6 +146,7 @@ int list(const Common& common) {
         Tools::discover(Tools::foldersOf(Tools::pathOf(common.path)));
     Tools::ExplainOptions options;
     options.recorded = recorded.get();
+    options.hosts = common.host.paths();
     Json files = Json::array();
     bool faults = !recorded.sound;
     const auto tell = [&](const std::filesystem::path& file, const Tools::Finding& finding,
@@ -156,7 +157,8 @@ int list(const Common& common) {
             return;
         }
         printFile(file, finding, notes);
-        if (finding.verdict == Tools::Verdict::otherAbi)
+        if (finding.verdict == Tools::Verdict::otherAbi ||
+            finding.verdict == Tools::Verdict::otherInterface)
             printSentence(finding); // It names both sides.
     };
     for (const Tools::Candidate& candidate : discovery.candidates) {
@@ -181,6 +183,7 @@ int explain(const Common& common, const ExplainArguments& arguments, const Probe
     Tools::ConsoleController controller;
     Tools::ExplainOptions options;
     options.recorded = recorded.get();
+    options.hosts = common.host.paths();
     options.load = arguments.load;
     const auto folders = Tools::foldersOf(Tools::pathOf(arguments.path));
     options.folders = arguments.path.empty() ? nullptr : &folders;
@@ -208,6 +211,7 @@ int scan(const Common& common, const ProbeArguments& probe) {
     Tools::ScanOptions options;
     options.folders = Tools::foldersOf(Tools::pathOf(common.path));
     options.list = Tools::pathOf(common.cache);
+    options.hosts = common.host.paths();
     options.retry = probe.retry;
     options.probe = probe.options();
     options.controller = &controller;

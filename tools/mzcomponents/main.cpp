@@ -113,6 +113,7 @@ void addLookCommands(CLI::App& app, Arguments& arguments) {
                    "their code.",
                    "mzcomponents list --path /opt/app/components");
     addCache(list, arguments, readCache);
+    addHostOption(*list, arguments.common.host);
     list->callback(
         [&] { arguments.command = [&] { return Mz::Commands::list(arguments.common); }; });
 
@@ -124,6 +125,7 @@ void addLookCommands(CLI::App& app, Arguments& arguments) {
     explain->add_flag("--load", arguments.explain.load,
                       "Load each file in a child process and report the result");
     addCache(explain, arguments, readCache);
+    addHostOption(*explain, arguments.common.host);
     addLimits(explain, arguments);
     explain->callback([&] {
         arguments.command = [&] {
@@ -140,6 +142,7 @@ void addLookCommands(CLI::App& app, Arguments& arguments) {
         ->type_name("FILE")
         ->required()
         ->check(namesAFile);
+    addHostOption(*scan, arguments.common.host);
     scan->add_flag("--retry", arguments.probe.retry, "Retry libraries that failed earlier");
     addLimits(scan, arguments);
     scan->callback([&] {

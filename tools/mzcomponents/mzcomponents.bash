@@ -18,7 +18,7 @@ _mzcomponents() {
     mapfile -t COMPREPLY < <(compgen -d -- "$current")
     return
     ;;
-  --cache | --save | --output | --svg | --sample | --suppress | --junit | --sarif)
+  --cache | --save | --output | --svg | --sample | --host | --suppress | --junit | --sarif)
     compopt -o filenames 2>/dev/null
     mapfile -t COMPREPLY < <(compgen -f -- "$current")
     return
@@ -33,14 +33,14 @@ _mzcomponents() {
   esac
   case $command in
   '') options="list explain scan profile types import show graph check new uid help --help --version" ;;
-  list) options=$common ;;
-  explain) options="$common $limits --load" ;;
-  scan) options="$common $limits --retry" ;;
+  list) options="$common --host" ;;
+  explain) options="$common $limits --host --load" ;;
+  scan) options="$common $limits --host --retry" ;;
   profile) options="$common $limits --runs --svg" ;;
   import) options="$common $limits --save" ;;
   graph) options="$common $limits --output --svg" ;;
   check)
-    options="--path --sample --fail-on --suppress --seed --fuzz --reproduce --in-process"
+    options="--path --host --sample --fail-on --suppress --seed --fuzz --reproduce --in-process"
     options+=" --thread-safe --jobs --explain --json --junit --sarif --help $limits"
     ;;
   new)

@@ -29,6 +29,13 @@ struct Segment {
     std::uint64_t offset, address, physical, fileSize, memorySize, alignment;
 };
 
+struct Section {
+    std::uint32_t name, type;
+    std::uint64_t flags, address, offset, size;
+    std::uint32_t link, info;
+    std::uint64_t alignment, entrySize;
+};
+
 struct Dynamic {
     std::int64_t tag;
     std::uint64_t value;
@@ -43,6 +50,7 @@ struct Symbol {
 
 constexpr std::uint16_t executable = 2, shared = 3;
 constexpr std::uint16_t x86_64 = 62;
+constexpr std::uint32_t programContent = 1; // the type of a section
 constexpr std::uint32_t loadSegment = 1, dynamicSegment = 2;
 
 /// Limits far above those of real libraries. They bound the time and memory for a malicious file.
@@ -117,6 +125,28 @@ class ElfReader {
         return names;
     }
 
+    /// Returns the content of the sections. Unlike everything else, they are found by the table of
+    /// sections, which the loader does not need.
+    std::string sections(std::string_view prefix) {
+        std::string content;
+        if (!readHeader() || !image.otherProcessor.empty() || header.sectionSize != sizeof(Section))
+            return content;
+        const auto names = section(header.names);
+        for (std::size_t index = 0; names && index < header.sectionCount; ++index) {
+            const auto candidate = section(index);
+            if (!candidate || candidate->type != programContent || candidate->name >= names->size)
+                continue;
+            char name[32] = {};
+            const std::uint64_t length =
+                std::min<std::uint64_t>(prefix.size(), names->size - candidate->name);
+            if (length == prefix.size() && length <= sizeof name &&
+                file.read(names->offset + candidate->name, name, prefix.size()) &&
+                std::string_view(name, prefix.size()) == prefix)
+                appendSection(file, candidate->offset, candidate->size, content);
+        }
+        return content;
+    }
+
     bool defines(std::string_view wanted) {
         return symbols && strings && (gnuHash || hash) && find(wanted);
     }
@@ -150,6 +180,12 @@ class ElfReader {
             return damaged(L"the header is cut off");
         header = *whole;
         return true;
+    }
+
+    std::optional<Section> section(std::size_t index) {
+        if (index >= header.sectionCount)
+            return std::nullopt;
+        return file.read<Section>(header.sections + index * sizeof(Section));
     }
 
     bool readSegments() {
@@ -429,6 +465,11 @@ bool isElf(FileBytes& file) {
 }
 
 } // namespace
+
+std::string elfSections(FileBytes& file, std::string_view prefix) {
+    LibraryImage image;
+    return ElfReader(file, image).sections(prefix);
+}
 
 std::vector<std::string> exportedElfNames(FileBytes& file) {
     LibraryImage image;

@@ -76,6 +76,34 @@ std::vector<std::string> exportedNames(const std::filesystem::path& path) {
     return {};
 }
 
+std::string sectionsOf(const std::filesystem::path& path, std::string_view prefix) {
+    FileBytes file(path);
+    const auto magic = file.read<std::array<char, 4>>(0);
+    if (magic && std::memcmp(magic->data(), "\177ELF", 4) == 0)
+        return elfSections(file, prefix);
+    if (magic && std::memcmp(magic->data(), "MZ", 2) == 0)
+        return peSections(file, prefix);
+    return {};
+}
+
+bool appendSection(FileBytes& file, std::uint64_t offset, std::uint64_t size,
+                   std::string& content) {
+    const std::size_t begin = (content.size() + 7) / 8 * 8;
+    if (begin > mostSectionBytes || size > mostSectionBytes - begin || !file.reaches(offset, size))
+        return false;
+    content.resize(begin + static_cast<std::size_t>(size));
+    for (std::size_t done = 0; done < size;) {
+        const std::size_t piece = std::min<std::size_t>(static_cast<std::size_t>(size) - done,
+                                                        platform::FileBlocks::blockSize);
+        if (!file.read(offset + done, content.data() + begin + done, piece)) {
+            content.resize(begin);
+            return false;
+        }
+        done += piece;
+    }
+    return true;
+}
+
 bool isComponentExport(const std::string& name) {
     // The last ones are added by the linkers.
     for (const char* known : {entryPointName, stampName, "MzRunComponentTest", "_init", "_fini",

@@ -14,6 +14,7 @@
 #include <optional>
 #include <set>
 #include <string>
+#include <string_view>
 #include <vector>
 
 namespace Mz::Tools {
@@ -90,8 +91,10 @@ LibraryImage readLibraryImage(const std::filesystem::path& path);
 /// format, and stops at the first fault.
 void readElfImage(FileBytes& file, LibraryImage& image);
 std::vector<std::string> exportedElfNames(FileBytes& file);
+std::string elfSections(FileBytes& file, std::string_view prefix);
 void readPeImage(FileBytes& file, LibraryImage& image);
 std::vector<std::string> exportedPeNames(FileBytes& file);
+std::string peSections(FileBytes& file, std::string_view prefix);
 
 /// Returns the symbols that other files must define before the ELF library at `path` can be loaded.
 /// Skips weak symbols, which may be undefined, and symbols with a version, which can only come from
@@ -108,6 +111,17 @@ std::optional<ComponentStamp> validStamp(const std::optional<ComponentStamp>& st
 /// Returns the names that the library at `path` exports. Of an ELF library, those of weak symbols
 /// are left out: templates and inline functions of its headers. Empty if it cannot be read.
 std::vector<std::string> exportedNames(const std::filesystem::path& path);
+
+/// Returns the content of all sections of a library or program whose names begin with `prefix`, one
+/// after the other. Each begins at a multiple of 8. Empty if the file has none or cannot be read.
+/// No more than `mostSectionBytes`.
+std::string sectionsOf(const std::filesystem::path& path, std::string_view prefix);
+
+/// Appends a section that the file contains as a whole. Returns false if it is missing or too long.
+bool appendSection(FileBytes& file, std::uint64_t offset, std::uint64_t size, std::string& content);
+
+/// The largest content that `sectionsOf` returns: far more than the fingerprints of any library.
+inline constexpr std::size_t mostSectionBytes = std::size_t{4} << 20;
 
 /// Returns whether every component library may export this name.
 bool isComponentExport(const std::string& name);

@@ -101,6 +101,17 @@ class PeReader {
         return names;
     }
 
+    /// Returns the content of the sections.
+    std::string sectionContents(std::string_view prefix) {
+        std::string content;
+        if (!readHeader() || !image.otherProcessor.empty() || !readSections())
+            return content;
+        for (const Section& section : sections)
+            if (std::string_view(section.name, sizeof section.name).starts_with(prefix))
+                appendSection(file, section.offset, backedSize(section), content);
+        return content;
+    }
+
   private:
     bool damaged(const wchar_t* what) {
         image.damage = what;
@@ -379,6 +390,11 @@ class PeReader {
 
 void readPeImage(FileBytes& file, LibraryImage& image) {
     PeReader(file, image).read();
+}
+
+std::string peSections(FileBytes& file, std::string_view prefix) {
+    LibraryImage image;
+    return PeReader(file, image).sectionContents(prefix);
 }
 
 std::vector<std::string> exportedPeNames(FileBytes& file) {

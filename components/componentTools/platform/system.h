@@ -75,6 +75,10 @@ std::wstring loaderError(const NativePath& path);
 /// Returns the folder of libMZcomponentTools; empty if the system does not know it.
 NativePath moduleFolder();
 
+/// Returns the file of the libMZcomponentManager of this process; empty if the system does not know
+/// it.
+NativePath managerFile();
+
 /// Returns the path of a program that is found in PATH; empty if there is none.
 /// \param name  the program's name without extension
 NativePath findProgram(const std::string& name);

@@ -3,6 +3,7 @@
 /// the cache, the default folders), because the loader itself cannot search without loading.
 #include "components/componentTools/platform/system.h"
 
+#include "components/componentManager/componentImp.h"
 #include "components/componentManager/nativeText.h"
 #include "components/componentTools/platform/posix/loaderCache.h"
 
@@ -150,13 +151,26 @@ std::wstring loaderError(const NativePath& path) {
     return displayName(words ? words : "");
 }
 
-NativePath moduleFolder() {
+namespace {
+
+/// Returns the file of the library or program that contains a function.
+NativePath fileOf(const void* function) {
     Dl_info info;
-    if (::dladdr(reinterpret_cast<const void*>(&moduleFolder), &info) == 0 || !info.dli_fname)
+    if (::dladdr(function, &info) == 0 || !info.dli_fname)
         return {};
     std::error_code failure;
     const NativePath file = std::filesystem::canonical(info.dli_fname, failure);
-    return failure ? NativePath() : file.parent_path();
+    return failure ? NativePath() : file;
+}
+
+} // namespace
+
+NativePath moduleFolder() {
+    return fileOf(reinterpret_cast<const void*>(&moduleFolder)).parent_path();
+}
+
+NativePath managerFile() {
+    return fileOf(reinterpret_cast<const void*>(&QrGetComponentManager));
 }
 
 NativePath findProgram(const std::string& name) {

@@ -4,6 +4,7 @@
 /// and reports only an error.
 #include "components/componentTools/platform/system.h"
 
+#include "components/componentManager/componentImp.h"
 #include "components/componentManager/nativeText.h"
 #include "components/componentManager/utf8.h"
 #include "components/platform/platform.h"
@@ -160,15 +161,28 @@ std::wstring loaderError(const NativePath& path) {
     return textOfError(::GetLastError());
 }
 
-NativePath moduleFolder() {
+namespace {
+
+/// Returns the file of the library or program that contains a function.
+NativePath fileOf(const void* function) {
     HMODULE module = nullptr;
     constexpr DWORD flags =
         GET_MODULE_HANDLE_EX_FLAG_FROM_ADDRESS | GET_MODULE_HANDLE_EX_FLAG_UNCHANGED_REFCOUNT;
-    if (!::GetModuleHandleExW(flags, reinterpret_cast<const wchar_t*>(&moduleFolder), &module))
+    if (!::GetModuleHandleExW(flags, static_cast<const wchar_t*>(function), &module))
         return {};
     wchar_t path[32768];
     const DWORD length = ::GetModuleFileNameW(module, path, 32768);
-    return NativePath(std::wstring(path, length)).parent_path();
+    return NativePath(std::wstring(path, length));
+}
+
+} // namespace
+
+NativePath moduleFolder() {
+    return fileOf(reinterpret_cast<const void*>(&moduleFolder)).parent_path();
+}
+
+NativePath managerFile() {
+    return fileOf(reinterpret_cast<const void*>(&QrGetComponentManager));
 }
 
 NativePath findProgram(const std::string& name) {
