@@ -43,9 +43,9 @@ struct ExplainOptions {
     ProbeOptions probe;
     /// The folder of the host's program, in which Windows looks for libraries too; empty for none.
     std::filesystem::path programFolder;
-    /// Programs and libraries of the host, with whose interfaces those of the file are compared: see
-    /// `otherInterface`. The program of this process and its libMZcomponentManager are compared in
-    /// any case. Since 0.2.
+    /// Programs and libraries of the host, with whose interfaces those of the file are compared:
+    /// see `otherInterface`. The program of this process and its libMZcomponentManager are compared
+    /// in any case. Since 0.2.
     std::vector<std::filesystem::path> hosts;
     /// Look for every library that the file needs. If false, the check is faster, and
     /// `dependencyMissing` and `needsHost` are not found.

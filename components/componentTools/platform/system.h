@@ -11,7 +11,9 @@
 #include <chrono>
 #include <cstdint>
 #include <filesystem>
+#include <fstream>
 #include <functional>
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -46,6 +48,11 @@ struct FileAttributes {
 };
 /// Returns the attributes of a file. If there is none, only `hidden` may be set.
 FileAttributes fileAttributes(const NativePath& path);
+
+/// Returns the folder that has this normalised name; `std::nullopt` if there is none. Where letter
+/// case matters, it searches each folder on the way for a name that equals it except for case; a
+/// name in lower case comes first.
+std::optional<NativePath> findFolder(const std::wstring& normalised);
 
 /// Returns the name of the environment variable that adds folders to the loader's search path.
 const wchar_t* loaderPathVariable();
@@ -98,6 +105,37 @@ struct ChildLimits {
     bool outputRestartsTime = false;
     /// Receives the output after each new piece, and may remove what it has used; may be empty.
     std::function<void(std::string&)> received = {};
+    /// Polled after each piece of output; true ends the child, which is not needed any more; may be
+    /// empty.
+    std::function<bool()> complete = {};
+};
+
+/// A file that is open for reading, and that a child can inherit.
+class InheritableFile {
+  public:
+    /// Opens a regular file, without denying any access to other openers.
+    explicit InheritableFile(const NativePath& path);
+    ~InheritableFile();
+    InheritableFile(const InheritableFile&) = delete;
+    InheritableFile& operator=(const InheritableFile&) = delete;
+
+    /// Returns whether the file was opened.
+    bool isOpen() const;
+    /// Returns the argument of the child for `takeInheritedFile`.
+    std::string argument() const;
+    std::intptr_t number() const { return handle; }
+
+  private:
+    std::intptr_t handle = -1;
+};
+
+/// What a child gets besides its arguments.
+struct ChildSupply {
+    /// The bytes for its standard input, which are removed as they are sent; callbacks of
+    /// `ChildLimits` may append more. The child never blocks this process. Null for an empty
+    /// standard input.
+    std::string* input = nullptr;
+    const InheritableFile* file = nullptr; ///< an open file; may be null
 };
 
 struct ChildResult {
@@ -109,7 +147,8 @@ struct ChildResult {
         outOfMemory,
         tooMuchOutput,
         interrupted,
-        unknown, ///< not available, because this process ignores SIGCHLD
+        complete, ///< ended because `ChildLimits::complete` returned true
+        unknown,  ///< not available, because this process ignores SIGCHLD
     };
     End end = End::notStarted;
     int status = 0;           ///< the exit status, if it exited
@@ -118,26 +157,45 @@ struct ChildResult {
     std::uint64_t memory = 0; ///< the peak of its used memory, in bytes
 };
 
-/// Runs a program with empty standard input and discarded standard error, and waits for its end. If
-/// it exceeds a limit, kills it and the processes that it started.
-/// \throws whatever `limits.interrupted` throws, after it has killed the program
+/// Runs a program with discarded standard error, and waits for its end. If it exceeds a limit,
+/// kills it and the processes that it started. \throws whatever the callbacks in `limits` throw,
+/// after it has killed the program
 ChildResult runChild(const NativePath& program, const std::vector<NativePath>& arguments,
-                     const ChildLimits& limits);
+                     const ChildLimits& limits, const ChildSupply& supply = {});
 
 /// The pipe of a probe to the process that started it.
 ///
 /// The constructor takes over standard output, and redirects standard output and standard error to
 /// the null device, so that other output cannot mix with the messages. On Linux it closes all other
-/// inherited files.
+/// inherited files, except the one of `ChildSupply::file` if it is kept.
 class AnswerPipe {
   public:
-    AnswerPipe();
+    explicit AnswerPipe(bool keepsFile = false);
     /// Writes all bytes; ignores failures. May be called from a signal handler.
     void write(const char* data, std::size_t size);
 
   private:
     std::intptr_t handle;
 };
+
+/// The pipe from the process that started this one, on `ChildSupply::input`.
+///
+/// The constructor takes over standard input, and redirects it to the null device.
+class InputPipe {
+  public:
+    InputPipe();
+    /// Reads up to `size` bytes; waits for the first one. Returns 0 at the end and on failure.
+    std::size_t read(char* data, std::size_t size);
+
+  private:
+    std::intptr_t handle;
+};
+
+/// Opens `stream` on the file that this process inherited. It is the standard file buffer, so reads
+/// are as fast as from a file that was opened by name.
+/// \param argument  the result of `InheritableFile::argument`
+/// \return whether there is such a file
+bool takeInheritedFile(const std::string& argument, std::ifstream& stream);
 
 /// Redirects standard output to standard error, for all other code in this process.
 /// \return a descriptor of the original standard output, for `writeReserved`; -1 if it was closed

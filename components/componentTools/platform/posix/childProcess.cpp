@@ -1,8 +1,11 @@
 // SPDX-License-Identifier: BSL-1.0
 /// The child runs in its own process group, so that the processes that it starts can be killed with
 /// it. The parent polls the used memory in /proc: limits of the system count reserved addresses
-/// too, which code generators and drivers reserve in large amounts.
+/// too, which code generators and drivers reserve in large amounts. The child's standard input is a
+/// socket: unlike a pipe, it can be written without a signal if the child has closed it.
 #include "components/componentTools/platform/system.h"
+
+#include "components/componentTools/platform/posix/inheritedNumber.h"
 
 #include <algorithm>
 #include <cerrno>
@@ -13,6 +16,8 @@
 #include <poll.h>
 #include <spawn.h>
 #include <sys/resource.h>
+#include <sys/socket.h>
+#include <sys/stat.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
@@ -42,8 +47,20 @@ class Descriptor {
     int value;
 };
 
+/// Returns a copy of the descriptor above those that a child uses, or -1. A host that has closed
+/// its standard files gets their numbers for new files.
+int raised(int descriptor) {
+    constexpr int first = inheritedNumber + 1;
+    return ::fcntl(descriptor, F_DUPFD_CLOEXEC, first);
+}
+
+/// The files of a child; -1 for none.
+struct Files {
+    int input, output, file;
+};
+
 /// Starts the program in its own process group. Returns 0 or an error number.
-int start(const NativePath& program, const std::vector<NativePath>& arguments, int output,
+int start(const NativePath& program, const std::vector<NativePath>& arguments, const Files& files,
           pid_t& child) {
     std::vector<char*> pointers{const_cast<char*>(program.c_str())};
     for (const NativePath& argument : arguments)
@@ -52,9 +69,14 @@ int start(const NativePath& program, const std::vector<NativePath>& arguments, i
 
     posix_spawn_file_actions_t actions;
     ::posix_spawn_file_actions_init(&actions);
-    ::posix_spawn_file_actions_addopen(&actions, STDIN_FILENO, "/dev/null", O_RDONLY, 0);
-    ::posix_spawn_file_actions_adddup2(&actions, output, STDOUT_FILENO);
+    if (files.input < 0)
+        ::posix_spawn_file_actions_addopen(&actions, STDIN_FILENO, "/dev/null", O_RDONLY, 0);
+    else
+        ::posix_spawn_file_actions_adddup2(&actions, files.input, STDIN_FILENO);
+    ::posix_spawn_file_actions_adddup2(&actions, files.output, STDOUT_FILENO);
     ::posix_spawn_file_actions_addopen(&actions, STDERR_FILENO, "/dev/null", O_WRONLY, 0);
+    if (files.file >= 0)
+        ::posix_spawn_file_actions_adddup2(&actions, files.file, inheritedNumber);
     posix_spawnattr_t attributes;
     ::posix_spawnattr_init(&attributes);
     sigset_t signals;
@@ -97,8 +119,11 @@ const wchar_t* signalName(int number) {
 /// the caller's `interrupted` and the growth of the output may throw.
 class Watch {
   public:
-    Watch(pid_t process, int pipe, const ChildLimits& allowed)
-        : child(process), output(pipe), limits(allowed), end(Clock::now() + allowed.time) {}
+    /// \param socket  the other end of the child's standard input; -1 for none
+    Watch(pid_t process, int pipe, int socket, const ChildLimits& allowed,
+          const ChildSupply& supplied)
+        : child(process), output(pipe), input(socket), limits(allowed), supply(supplied),
+          end(Clock::now() + allowed.time) {}
     ~Watch() {
         if (reaped)
             return;
@@ -113,13 +138,14 @@ class Watch {
         int status = 0;
         rusage usage{};
         while (!over(status, usage)) {
+            sendInput();
             waitForOutput();
             readOutput();
             judge();
         }
-        readOutput();
-        // Kill the processes that the child started, too.
+        // Kill the processes that the child started, too. They could write for ever.
         ::kill(-child, SIGKILL);
+        readOutput();
         if (judged)
             return std::move(judgement);
         judgement.memory = std::max(judgement.memory, mostMemory(usage));
@@ -159,15 +185,35 @@ class Watch {
         return reaped;
     }
 
-    void waitForOutput() {
-        pollfd wanted{output, POLLIN, 0};
-        // A closed pipe is always ready, so do not poll it.
-        ::poll(closed ? nullptr : &wanted, closed ? 0 : 1, pause);
+    bool hasInput() const { return supply.input && !supply.input->empty(); }
+
+    /// Sends as much as the child's buffer takes.
+    void sendInput() {
+        while (hasInput()) {
+            const ssize_t sent = ::send(input, supply.input->data(), supply.input->size(),
+                                        MSG_NOSIGNAL | MSG_DONTWAIT);
+            if (sent > 0)
+                supply.input->erase(0, static_cast<std::size_t>(sent));
+            else if (errno == EAGAIN)
+                return;
+            else if (errno != EINTR)
+                supply.input->clear(); // The child has closed its standard input.
+        }
     }
 
+    void waitForOutput() {
+        // A closed pipe is always ready, so do not poll it: the system skips negative descriptors.
+        pollfd wanted[] = {{closed ? -1 : output, POLLIN, 0},
+                           {hasInput() ? input : -1, POLLOUT, 0}};
+        ::poll(wanted, 2, pause);
+    }
+
+    /// Reads the available output, but not for ever, because the child may write faster.
     void readOutput() {
         char block[65536];
-        while (!closed && judgement.output.size() <= limits.output) {
+        constexpr int mostBlocks = 64;
+        for (int count = 0;
+             count < mostBlocks && !closed && judgement.output.size() <= limits.output; ++count) {
             const ssize_t got = ::read(output, block, sizeof block);
             if (got > 0)
                 receive(block, static_cast<std::size_t>(got));
@@ -189,7 +235,9 @@ class Watch {
     void judge() {
         if (judged)
             return;
-        if (limits.interrupted && limits.interrupted())
+        if (limits.complete && limits.complete())
+            stop(ChildResult::End::complete);
+        else if (limits.interrupted && limits.interrupted())
             stop(ChildResult::End::interrupted);
         else if (usesTooMuch())
             stop(ChildResult::End::outOfMemory);
@@ -218,7 +266,9 @@ class Watch {
 
     pid_t child;
     int output;
+    int input;
     const ChildLimits& limits;
+    const ChildSupply& supply;
     Clock::time_point end;
     ChildResult judgement;
     bool judged = false;
@@ -229,25 +279,59 @@ class Watch {
 
 } // namespace
 
+InheritableFile::InheritableFile(const NativePath& path) {
+    // A pipe without a writer would block.
+    const int file = ::open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK | O_NOCTTY);
+    struct stat status;
+    if (file >= 0 && ::fstat(file, &status) == 0 && S_ISREG(status.st_mode))
+        handle = file;
+    else if (file >= 0)
+        ::close(file);
+}
+
+InheritableFile::~InheritableFile() {
+    if (isOpen())
+        ::close(static_cast<int>(handle));
+}
+
+bool InheritableFile::isOpen() const {
+    return handle >= 0;
+}
+
+std::string InheritableFile::argument() const {
+    return std::to_string(inheritedNumber);
+}
+
 ChildResult runChild(const NativePath& program, const std::vector<NativePath>& arguments,
-                     const ChildLimits& limits) {
+                     const ChildLimits& limits, const ChildSupply& supply) {
     ChildResult failed;
-    int ends[2];
-    if (::pipe2(ends, O_CLOEXEC) != 0) {
+    int ends[2] = {-1, -1}, sockets[2] = {-1, -1};
+    const bool made =
+        ::pipe2(ends, O_CLOEXEC) == 0 &&
+        (!supply.input || ::socketpair(AF_UNIX, SOCK_STREAM | SOCK_CLOEXEC, 0, sockets) == 0);
+    const Descriptor output(ends[0]), ownInput(sockets[0]);
+    Descriptor childOutput(ends[1]), childInput(sockets[1]);
+    if (!made) {
         failed.detail = displayName(std::strerror(errno));
         return failed;
     }
-    const Descriptor output(ends[0]);
-    Descriptor input(ends[1]);
     ::fcntl(output.get(), F_SETFL, O_NONBLOCK);
     pid_t child = 0;
-    const int failure = start(program, arguments, input.get(), child);
-    input.close();
+    int failure = 0;
+    {
+        const Descriptor high[] = {
+            Descriptor(supply.input ? raised(childInput.get()) : -1),
+            Descriptor(raised(childOutput.get())),
+            Descriptor(supply.file ? raised(static_cast<int>(supply.file->number())) : -1)};
+        failure = start(program, arguments, {high[0].get(), high[1].get(), high[2].get()}, child);
+    }
+    childOutput.close();
+    childInput.close();
     if (failure) {
         failed.detail = displayName(program) + L": " + displayName(std::strerror(failure));
         return failed;
     }
-    return Watch(child, output.get(), limits).result();
+    return Watch(child, output.get(), ownInput.get(), limits, supply).result();
 }
 
 } // namespace Mz::Tools::System

@@ -5,13 +5,18 @@
 
 #include "components/componentManager/componentImp.h"
 #include "components/componentManager/nativeText.h"
+#include "components/componentTools/platform/posix/inheritedNumber.h"
 #include "components/componentTools/platform/posix/loaderCache.h"
+#include "components/platform/platform.h"
 
+#include <algorithm>
 #include <cerrno>
+#include <charconv>
 #include <csignal>
 #include <cstdlib>
 #include <cstring>
 #include <dlfcn.h>
+#include <ext/stdio_filebuf.h>
 #include <fcntl.h>
 #include <initializer_list>
 #include <optional>
@@ -97,6 +102,39 @@ FileAttributes fileAttributes(const NativePath& path) {
     attributes.hidden = path.filename().native().starts_with('.');
     attributes.directory = ::stat(path.c_str(), &status) == 0 && S_ISDIR(status.st_mode);
     return attributes;
+}
+
+namespace {
+
+/// Returns the folder in `parent` whose name is `name` except for case.
+std::optional<NativePath> findSubfolder(const NativePath& parent, const std::wstring& name) {
+    std::error_code failure;
+    const std::optional<NativePath> exact = toNativePath(name);
+    if (exact && std::filesystem::is_directory(parent / *exact, failure))
+        return parent / *exact;
+    const std::filesystem::directory_iterator end;
+    for (std::filesystem::directory_iterator entry(parent, failure); !failure && entry != end;
+         entry.increment(failure)) {
+        const std::optional<std::wstring> other = toWideName(entry->path().filename());
+        std::error_code unknown;
+        if (other && platform::lowerCase(*other) == name && entry->is_directory(unknown))
+            return entry->path();
+    }
+    return std::nullopt;
+}
+
+} // namespace
+
+std::optional<NativePath> findFolder(const std::wstring& normalised) {
+    std::optional<NativePath> folder(normalised.starts_with(L'\\') ? "/" : ".");
+    for (std::size_t begin = 0; folder && begin <= normalised.size();) {
+        const std::size_t end = std::min(normalised.find(L'\\', begin), normalised.size());
+        const std::wstring name = normalised.substr(begin, end - begin);
+        if (!name.empty() && name != L".")
+            folder = findSubfolder(*folder, name);
+        begin = end + 1;
+    }
+    return folder;
 }
 
 const wchar_t* loaderPathVariable() {
@@ -206,9 +244,9 @@ bool writeAll(int descriptor, const char* data, std::size_t size) {
 
 } // namespace
 
-AnswerPipe::AnswerPipe() {
+AnswerPipe::AnswerPipe(bool keepsFile) {
     // The library must not reach files that this process inherited from the host.
-    ::syscall(SYS_close_range, STDERR_FILENO + 1, ~0u, 0);
+    ::syscall(SYS_close_range, keepsFile ? inheritedNumber + 1 : STDERR_FILENO + 1, ~0u, 0);
     // A high number, so that a loop that closes low descriptors does not close the pipe.
     handle = ::fcntl(STDOUT_FILENO, F_DUPFD_CLOEXEC, 500);
     const int nowhere = ::open("/dev/null", O_RDWR);
@@ -221,6 +259,38 @@ AnswerPipe::AnswerPipe() {
 
 void AnswerPipe::write(const char* data, std::size_t size) {
     writeAll(static_cast<int>(handle), data, size);
+}
+
+InputPipe::InputPipe() {
+    handle = ::fcntl(STDIN_FILENO, F_DUPFD_CLOEXEC, 500);
+    const int nowhere = ::open("/dev/null", O_RDONLY);
+    if (nowhere >= 0 && nowhere != STDIN_FILENO) {
+        ::dup2(nowhere, STDIN_FILENO);
+        ::close(nowhere);
+    }
+}
+
+std::size_t InputPipe::read(char* data, std::size_t size) {
+    for (;;) {
+        const ssize_t got = ::read(static_cast<int>(handle), data, size);
+        if (got >= 0)
+            return static_cast<std::size_t>(got);
+        if (errno != EINTR)
+            return 0;
+    }
+}
+
+bool takeInheritedFile(const std::string& argument, std::ifstream& stream) {
+    int number = -1;
+    if (std::from_chars(argument.data(), argument.data() + argument.size(), number).ec !=
+            std::errc() ||
+        number != inheritedNumber)
+        return false;
+    __gnu_cxx::stdio_filebuf<char> buffer(number, std::ios::in | std::ios::binary);
+    if (!buffer.is_open())
+        return false;
+    *stream.rdbuf() = std::move(static_cast<std::filebuf&>(buffer));
+    return true;
 }
 
 int reserveOutput() {

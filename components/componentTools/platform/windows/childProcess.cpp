@@ -1,7 +1,8 @@
 // SPDX-License-Identifier: BSL-1.0
 /// A job kills the child, and the processes that it starts, when `runChild` returns or the parent
 /// ends. The parent polls time, output and memory. The job's memory limit is only for memory that
-/// is taken faster than that, and Wine does not enforce it.
+/// is taken faster than that, and Wine does not enforce it. The child's standard input is a named
+/// pipe, because an anonymous one cannot be written without blocking.
 #include "components/componentTools/platform/system.h"
 
 #include "components/platform/platform.h"
@@ -9,6 +10,8 @@
 #include "components/componentTools/platform/windows/faultName.h"
 
 #include <algorithm>
+#include <atomic>
+#include <optional>
 #include <windows.h>
 
 #include <psapi.h>
@@ -19,8 +22,8 @@ namespace {
 
 using Clock = std::chrono::steady_clock;
 
-/// The polling interval of the child, in milliseconds.
-constexpr DWORD pause = 10;
+/// The polling interval of the child, in milliseconds; and that of one that waits for answers.
+constexpr DWORD pause = 10, shortPause = 1;
 
 class Handle {
   public:
@@ -93,7 +96,73 @@ HANDLE newJob(std::uint64_t refused) {
     return job;
 }
 
-bool start(const NativePath& program, const std::vector<NativePath>& arguments, HANDLE output,
+/// The end of the child's standard input at which this process writes. At most one write is under
+/// way.
+class InputWriter {
+  public:
+    /// Opens both ends.
+    /// \param childEnd  receives the other end, which a child can inherit
+    explicit InputWriter(HANDLE* childEnd) {
+        static std::atomic<unsigned int> count{0};
+        const std::wstring name = L"\\\\.\\pipe\\mzcomponents-" +
+                                  std::to_wstring(::GetCurrentProcessId()) + L"-" +
+                                  std::to_wstring(++count);
+        pipe = ::CreateNamedPipeW(name.c_str(),
+                                  PIPE_ACCESS_OUTBOUND | FILE_FLAG_OVERLAPPED |
+                                      FILE_FLAG_FIRST_PIPE_INSTANCE,
+                                  PIPE_TYPE_BYTE | PIPE_WAIT, 1, 65536, 65536, 0, nullptr);
+        SECURITY_ATTRIBUTES inheritable{sizeof inheritable, nullptr, TRUE};
+        *childEnd =
+            ::CreateFileW(name.c_str(), GENERIC_READ, 0, &inheritable, OPEN_EXISTING, 0, nullptr);
+        state.hEvent = ::CreateEventW(nullptr, TRUE, FALSE, nullptr);
+    }
+    ~InputWriter() {
+        DWORD ignored = 0;
+        if (underWay && ::CancelIo(pipe))
+            ::GetOverlappedResult(pipe, &state, &ignored, TRUE);
+        if (pipe != INVALID_HANDLE_VALUE)
+            ::CloseHandle(pipe);
+        ::CloseHandle(state.hEvent);
+    }
+    InputWriter(const InputWriter&) = delete;
+    InputWriter& operator=(const InputWriter&) = delete;
+
+    /// Sends `bytes` as far as the child reads, and removes what was taken over.
+    void send(std::string& bytes) {
+        DWORD written = 0;
+        while (underWay || !bytes.empty()) {
+            if (underWay && !::GetOverlappedResult(pipe, &state, &written, FALSE)) {
+                if (::GetLastError() == ERROR_IO_INCOMPLETE)
+                    return;
+                broken = true;
+            }
+            underWay = false;
+            if (broken)
+                return bytes.clear(); // The child has closed its standard input.
+            piece.assign(bytes, 0, 65536);
+            bytes.erase(0, piece.size());
+            if (piece.empty())
+                return;
+            underWay = ::WriteFile(pipe, piece.data(), static_cast<DWORD>(piece.size()), nullptr,
+                                   &state) ||
+                       ::GetLastError() == ERROR_IO_PENDING;
+            broken = !underWay;
+        }
+    }
+
+  private:
+    HANDLE pipe = INVALID_HANDLE_VALUE;
+    OVERLAPPED state{};
+    std::string piece; ///< must not change while a write is under way
+    bool underWay = false, broken = false;
+};
+
+/// The handles of a child; null for none.
+struct Files {
+    HANDLE input, output, file;
+};
+
+bool start(const NativePath& program, const std::vector<NativePath>& arguments, const Files& files,
            HANDLE job, PROCESS_INFORMATION& process) {
     std::wstring commandLine = quoted(program.native());
     for (const NativePath& argument : arguments)
@@ -102,12 +171,16 @@ bool start(const NativePath& program, const std::vector<NativePath>& arguments, 
     const Handle nowhere(::CreateFileW(L"NUL", GENERIC_READ | GENERIC_WRITE,
                                        FILE_SHARE_READ | FILE_SHARE_WRITE, &inheritable,
                                        OPEN_EXISTING, 0, nullptr));
-    const Inherited inherited({output, nowhere.get()});
+    std::vector<HANDLE> handles{files.output, nowhere.get()};
+    for (const HANDLE optional : {files.input, files.file})
+        if (optional)
+            handles.push_back(optional);
+    const Inherited inherited(std::move(handles));
     STARTUPINFOEXW startup{};
     startup.StartupInfo.cb = sizeof startup;
     startup.StartupInfo.dwFlags = STARTF_USESTDHANDLES;
-    startup.StartupInfo.hStdInput = nowhere.get();
-    startup.StartupInfo.hStdOutput = output;
+    startup.StartupInfo.hStdInput = files.input ? files.input : nowhere.get();
+    startup.StartupInfo.hStdOutput = files.output;
     startup.StartupInfo.hStdError = nowhere.get();
     startup.lpAttributeList = inherited.get();
     constexpr DWORD flags = CREATE_SUSPENDED | CREATE_NO_WINDOW | CREATE_NEW_PROCESS_GROUP |
@@ -125,8 +198,11 @@ bool start(const NativePath& program, const std::vector<NativePath>& arguments, 
 /// end, because the caller's `interrupted` and the growth of the output may throw.
 class Watch {
   public:
-    Watch(HANDLE process, HANDLE pipe, const ChildLimits& allowed)
-        : child(process), output(pipe), limits(allowed), end(Clock::now() + allowed.time) {}
+    /// \param writer  for the child's standard input; null for none
+    Watch(HANDLE process, HANDLE pipe, InputWriter* writer, const ChildLimits& allowed,
+          const ChildSupply& supplied)
+        : child(process), output(pipe), input(writer), limits(allowed), supply(supplied),
+          end(Clock::now() + allowed.time) {}
     ~Watch() {
         if (::WaitForSingleObject(child, 0) != WAIT_TIMEOUT)
             return;
@@ -137,7 +213,7 @@ class Watch {
     Watch& operator=(const Watch&) = delete;
 
     ChildResult result() {
-        while (::WaitForSingleObject(child, readOutput() ? 0 : pause) == WAIT_TIMEOUT)
+        while (::WaitForSingleObject(child, nextPause()) == WAIT_TIMEOUT)
             judge();
         readOutput();
         if (judged)
@@ -159,12 +235,26 @@ class Watch {
     }
 
   private:
-    /// Reads the available output. Returns whether there was any.
+    /// Transfers input and output. Returns how long to wait before the next time.
+    DWORD nextPause() {
+        if (judged)
+            return INFINITE;
+        if (input)
+            input->send(*supply.input);
+        if (readOutput())
+            return 0;
+        return input ? shortPause : pause;
+    }
+
+    /// Reads the available output, but not for ever, because the child may write faster. Returns
+    /// whether there was any.
     bool readOutput() {
         bool any = false;
+        constexpr int mostBlocks = 64;
+        int count = 0;
         char block[65536];
         DWORD waiting = 0, got = 0;
-        while (judgement.output.size() <= limits.output &&
+        while (count++ < mostBlocks && judgement.output.size() <= limits.output &&
                ::PeekNamedPipe(output, nullptr, 0, nullptr, &waiting, nullptr) && waiting > 0 &&
                ::ReadFile(output, block, sizeof block, &got, nullptr) && got > 0) {
             judgement.output.append(block, got);
@@ -190,7 +280,9 @@ class Watch {
     void judge() {
         if (judged)
             return;
-        if (limits.interrupted && limits.interrupted())
+        if (limits.complete && limits.complete())
+            stop(ChildResult::End::complete);
+        else if (limits.interrupted && limits.interrupted())
             stop(ChildResult::End::interrupted);
         else if (mostMemory() >= limits.memory)
             stop(ChildResult::End::outOfMemory);
@@ -208,7 +300,9 @@ class Watch {
 
     HANDLE child;
     HANDLE output;
+    InputWriter* input;
     const ChildLimits& limits;
+    const ChildSupply& supply;
     Clock::time_point end;
     ChildResult judgement;
     bool judged = false;
@@ -233,25 +327,55 @@ std::wstring faultName(unsigned long code) {
     return L"0x" + digits;
 }
 
+InheritableFile::InheritableFile(const NativePath& path) {
+    SECURITY_ATTRIBUTES inheritable{sizeof inheritable, nullptr, TRUE};
+    const HANDLE file = ::CreateFileW(path.c_str(), GENERIC_READ,
+                                      FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE,
+                                      &inheritable, OPEN_EXISTING, 0, nullptr);
+    if (file != INVALID_HANDLE_VALUE && ::GetFileType(file) == FILE_TYPE_DISK)
+        handle = reinterpret_cast<std::intptr_t>(file);
+    else if (file != INVALID_HANDLE_VALUE)
+        ::CloseHandle(file);
+}
+
+InheritableFile::~InheritableFile() {
+    if (isOpen())
+        ::CloseHandle(reinterpret_cast<HANDLE>(handle));
+}
+
+bool InheritableFile::isOpen() const {
+    return handle != -1;
+}
+
+std::string InheritableFile::argument() const {
+    return std::to_string(handle);
+}
+
 ChildResult runChild(const NativePath& program, const std::vector<NativePath>& arguments,
-                     const ChildLimits& limits) {
+                     const ChildLimits& limits, const ChildSupply& supply) {
     ChildResult failed;
     SECURITY_ATTRIBUTES inheritable{sizeof inheritable, nullptr, TRUE};
-    Handle output, input;
-    if (!::CreatePipe(output.out(), input.out(), &inheritable, 65536)) {
+    Handle output, childOutput, childInput;
+    if (!::CreatePipe(output.out(), childOutput.out(), &inheritable, 65536)) {
         failed.detail = L"no pipe";
         return failed;
     }
     ::SetHandleInformation(output.get(), HANDLE_FLAG_INHERIT, 0);
+    std::optional<InputWriter> input;
+    if (supply.input)
+        input.emplace(childInput.out());
     const Handle job(newJob(limits.refused));
+    const Files files{childInput ? childInput.get() : nullptr, childOutput.get(),
+                      supply.file ? reinterpret_cast<HANDLE>(supply.file->number()) : nullptr};
     PROCESS_INFORMATION process{};
-    if (!start(program, arguments, input.get(), job.get(), process)) {
+    if (!start(program, arguments, files, job.get(), process)) {
         failed.detail = displayName(program) + L": error " + std::to_wstring(::GetLastError());
         return failed;
     }
     const Handle child(process.hProcess), thread(process.hThread);
-    input.close();
-    return Watch(child.get(), output.get(), limits).result();
+    childOutput.close();
+    childInput.close();
+    return Watch(child.get(), output.get(), input ? &*input : nullptr, limits, supply).result();
 }
 
 } // namespace Mz::Tools::System

@@ -12,6 +12,8 @@
 #include "components/componentTools/platform/windows/faultName.h"
 
 #include <atomic>
+#include <charconv>
+#include <ext/stdio_filebuf.h>
 #include <fcntl.h>
 #include <io.h>
 #include <windows.h>
@@ -120,6 +122,13 @@ FileAttributes fileAttributes(const NativePath& path) {
             (attributes & FILE_ATTRIBUTE_DIRECTORY) != 0};
 }
 
+std::optional<NativePath> findFolder(const std::wstring& normalised) {
+    const DWORD attributes = ::GetFileAttributesW(normalised.c_str());
+    if (attributes == INVALID_FILE_ATTRIBUTES || !(attributes & FILE_ATTRIBUTE_DIRECTORY))
+        return std::nullopt;
+    return normalised;
+}
+
 const wchar_t* loaderPathVariable() {
     return L"PATH";
 }
@@ -196,7 +205,7 @@ const char* programExtension() {
     return ".exe";
 }
 
-AnswerPipe::AnswerPipe() {
+AnswerPipe::AnswerPipe(bool) {
     HANDLE pipe = INVALID_HANDLE_VALUE;
     const HANDLE self = ::GetCurrentProcess();
     ::DuplicateHandle(self, ::GetStdHandle(STD_OUTPUT_HANDLE), self, &pipe, 0, FALSE,
@@ -222,6 +231,39 @@ void AnswerPipe::write(const char* data, std::size_t size) {
         data += written;
         size -= written;
     }
+}
+
+InputPipe::InputPipe() {
+    HANDLE pipe = INVALID_HANDLE_VALUE;
+    const HANDLE self = ::GetCurrentProcess();
+    ::DuplicateHandle(self, ::GetStdHandle(STD_INPUT_HANDLE), self, &pipe, 0, FALSE,
+                      DUPLICATE_SAME_ACCESS);
+    handle = reinterpret_cast<std::intptr_t>(pipe);
+    const int nowhere = ::_open("NUL", _O_RDONLY);
+    if (nowhere >= 0) {
+        ::_dup2(nowhere, 0);
+        ::SetStdHandle(STD_INPUT_HANDLE, reinterpret_cast<HANDLE>(::_get_osfhandle(0)));
+        ::_close(nowhere);
+    }
+}
+
+std::size_t InputPipe::read(char* data, std::size_t size) {
+    DWORD got = 0;
+    const DWORD piece = static_cast<DWORD>(size < 65536 ? size : 65536);
+    return ::ReadFile(reinterpret_cast<HANDLE>(handle), data, piece, &got, nullptr) ? got : 0;
+}
+
+bool takeInheritedFile(const std::string& argument, std::ifstream& stream) {
+    std::intptr_t number = -1;
+    std::from_chars(argument.data(), argument.data() + argument.size(), number);
+    const int descriptor = ::_open_osfhandle(number, _O_RDONLY | _O_BINARY);
+    if (descriptor < 0)
+        return false;
+    __gnu_cxx::stdio_filebuf<char> buffer(descriptor, std::ios::in | std::ios::binary);
+    if (!buffer.is_open())
+        return false;
+    *stream.rdbuf() = std::move(static_cast<std::filebuf&>(buffer));
+    return true;
 }
 
 int reserveOutput() {
