@@ -22,11 +22,12 @@ enum class Verdict {
     // Not a component library. The manager correctly skips the file.
     directory,
     hidden,
-    systemFile,   ///< it has the system attribute (Windows)
-    notRegular,   ///< a pipe or a device
-    notALibrary,  ///< neither a library nor a program for Linux or Windows
-    program,      ///< an executable program
-    noEntryPoint, ///< a library that does not export "QrGetComponentDescription" itself
+    systemFile,     ///< it has the system attribute (Windows)
+    notRegular,     ///< a pipe or a device
+    notALibrary,    ///< neither a library nor a program for Linux or Windows
+    program,        ///< an executable program
+    noEntryPoint,   ///< a library that does not export "QrGetComponentDescription" itself
+    disabledByUser, ///< the user switched it off, see `disabled.h`
 
     // Faults that reading the file or its folder shows.
     missing,

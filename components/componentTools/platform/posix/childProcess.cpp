@@ -12,6 +12,7 @@
 #include <fstream>
 #include <poll.h>
 #include <spawn.h>
+#include <string_view>
 #include <sys/resource.h>
 #include <sys/wait.h>
 #include <unistd.h>
@@ -42,9 +43,37 @@ class Descriptor {
     int value;
 };
 
+/// The environment of this process with more variables, which replace those of the same name.
+class Environment {
+  public:
+    explicit Environment(const std::vector<std::pair<std::string, NativePath>>& added) {
+        for (const auto& [name, value] : added)
+            texts.push_back(name + "=" + value.native());
+        for (char** variable = environ; *variable; ++variable)
+            if (!isReplaced(*variable))
+                pointers.push_back(*variable);
+        for (std::string& text : texts)
+            pointers.push_back(text.data());
+        pointers.push_back(nullptr);
+    }
+    Environment(const Environment&) = delete;
+    Environment& operator=(const Environment&) = delete;
+    char** get() { return pointers.data(); }
+
+  private:
+    bool isReplaced(std::string_view variable) const {
+        return std::any_of(texts.begin(), texts.end(), [&](const std::string& text) {
+            return variable.starts_with(std::string_view(text).substr(0, text.find('=') + 1));
+        });
+    }
+
+    std::vector<std::string> texts;
+    std::vector<char*> pointers;
+};
+
 /// Starts the program in its own process group. Returns 0 or an error number.
 int start(const NativePath& program, const std::vector<NativePath>& arguments, int output,
-          pid_t& child) {
+          char** environment, pid_t& child) {
     std::vector<char*> pointers{const_cast<char*>(program.c_str())};
     for (const NativePath& argument : arguments)
         pointers.push_back(const_cast<char*>(argument.c_str()));
@@ -66,7 +95,7 @@ int start(const NativePath& program, const std::vector<NativePath>& arguments, i
     ::posix_spawnattr_setflags(&attributes, POSIX_SPAWN_SETPGROUP | POSIX_SPAWN_SETSIGMASK |
                                                 POSIX_SPAWN_SETSIGDEF);
     const int failure =
-        ::posix_spawn(&child, program.c_str(), &actions, &attributes, pointers.data(), environ);
+        ::posix_spawn(&child, program.c_str(), &actions, &attributes, pointers.data(), environment);
     ::posix_spawnattr_destroy(&attributes);
     ::posix_spawn_file_actions_destroy(&actions);
     return failure;
@@ -241,7 +270,8 @@ ChildResult runChild(const NativePath& program, const std::vector<NativePath>& a
     Descriptor input(ends[1]);
     ::fcntl(output.get(), F_SETFL, O_NONBLOCK);
     pid_t child = 0;
-    const int failure = start(program, arguments, input.get(), child);
+    Environment environment(limits.environment);
+    const int failure = start(program, arguments, input.get(), environment.get(), child);
     input.close();
     if (failure) {
         failed.detail = displayName(program) + L": " + displayName(std::strerror(failure));

@@ -9,6 +9,7 @@
 #include "components/componentTools/platform/windows/faultName.h"
 
 #include <algorithm>
+#include <cwchar>
 #include <windows.h>
 
 #include <psapi.h>
@@ -93,8 +94,29 @@ HANDLE newJob(std::uint64_t refused) {
     return job;
 }
 
+/// Returns the environment of this process with more variables, which replace those of the same
+/// name: texts that end with NUL, and another NUL. The system takes them in any order.
+std::wstring environmentWith(const std::vector<std::pair<std::string, NativePath>>& added) {
+    std::wstring block;
+    for (const auto& [name, value] : added)
+        block += std::wstring(name.begin(), name.end()) + L'=' + value.native() + L'\0';
+    wchar_t* const own = ::GetEnvironmentStringsW();
+    for (const wchar_t* variable = own; *variable; variable += std::wcslen(variable) + 1) {
+        const bool replaced = std::any_of(added.begin(), added.end(), [&](const auto& entry) {
+            const std::wstring name(entry.first.begin(), entry.first.end());
+            return std::wcslen(variable) > name.size() && variable[name.size()] == L'=' &&
+                   ::_wcsnicmp(variable, name.c_str(), name.size()) == 0;
+        });
+        if (!replaced)
+            block.append(variable).push_back(L'\0');
+    }
+    ::FreeEnvironmentStringsW(own);
+    block.push_back(L'\0');
+    return block;
+}
+
 bool start(const NativePath& program, const std::vector<NativePath>& arguments, HANDLE output,
-           HANDLE job, PROCESS_INFORMATION& process) {
+           HANDLE job, std::wstring environment, PROCESS_INFORMATION& process) {
     std::wstring commandLine = quoted(program.native());
     for (const NativePath& argument : arguments)
         commandLine += L" " + quoted(argument.native());
@@ -111,10 +133,10 @@ bool start(const NativePath& program, const std::vector<NativePath>& arguments, 
     startup.StartupInfo.hStdError = nowhere.get();
     startup.lpAttributeList = inherited.get();
     constexpr DWORD flags = CREATE_SUSPENDED | CREATE_NO_WINDOW | CREATE_NEW_PROCESS_GROUP |
-                            EXTENDED_STARTUPINFO_PRESENT;
+                            EXTENDED_STARTUPINFO_PRESENT | CREATE_UNICODE_ENVIRONMENT;
     const platform::QuietErrors quiet; // The child inherits the error mode.
     if (!::CreateProcessW(program.c_str(), commandLine.data(), nullptr, nullptr, TRUE, flags,
-                          nullptr, nullptr, &startup.StartupInfo, &process))
+                          environment.data(), nullptr, &startup.StartupInfo, &process))
         return false;
     ::AssignProcessToJobObject(job, process.hProcess);
     ::ResumeThread(process.hThread);
@@ -245,7 +267,8 @@ ChildResult runChild(const NativePath& program, const std::vector<NativePath>& a
     ::SetHandleInformation(output.get(), HANDLE_FLAG_INHERIT, 0);
     const Handle job(newJob(limits.refused));
     PROCESS_INFORMATION process{};
-    if (!start(program, arguments, input.get(), job.get(), process)) {
+    if (!start(program, arguments, input.get(), job.get(), environmentWith(limits.environment),
+               process)) {
         failed.detail = displayName(program) + L": error " + std::to_wstring(::GetLastError());
         return failed;
     }
