@@ -82,6 +82,26 @@ TEST_F(Bisect, FindsTheCulpritThatFailsInThirtyPercentOfTheStarts) {
     EXPECT_THAT(names(result), ElementsAre("good3x"));
 }
 
+TEST_F(Bisect, GoesOnWhereAHostWouldOfferItsSafeMode) {
+    add(L"failsAlone", "bad");
+    fill(5);
+    options.host = buildFolder / "bin" / "startHost";
+    options.arguments.push_back("mode=changed"); // Would leave out the culprit after a crash.
+    const BisectResult result = bisect(options);
+    EXPECT_EQ(result.state, State::found);
+    EXPECT_THAT(names(result), ElementsAre("bad"));
+    EXPECT_FALSE(std::filesystem::exists(work.path() / "own list"));
+}
+
+TEST_F(Bisect, ReplacesTheListThatItsOwnEnvironmentNames) {
+    add(L"failsAlone", "bad");
+    fill(2);
+    const auto other = work.path() / "other list";
+    setEnvironment("MZ_COMPONENT_LIST", other.string());
+    EXPECT_THAT(names(bisect(options)), ElementsAre("bad"));
+    EXPECT_FALSE(std::filesystem::exists(other));
+}
+
 TEST_F(Bisect, CountsAHostThatHangsAsFailed) {
     add(L"failsByHanging", "bad");
     options.timeLimit = std::chrono::seconds(10);

@@ -6,6 +6,7 @@
 /// It prints the unclean end before it, what it left out, and the number of builders; then it makes
 /// an object of each builder. MODE answers the offer of the safe mode, NAME is a file's name.
 /// `exit` ends the process in the middle, `finish` before that ends the work cleanly.
+#include "components/componentKit/recordedList.h"
 #include "components/componentManager/componentImp.h"
 #include "components/componentTools/start.h"
 #include "tests/components/testUids.h"
@@ -56,7 +57,7 @@ int main(int count, char** words) {
         return std::string();
     };
     Kit::StartOptions options;
-    options.list = arguments.at(0);
+    options.list = Kit::listFromEnvironment(arguments.at(0));
     options.searchPath = arguments.at(1);
     options.probe.timeLimit = std::chrono::seconds(60);
     options.isOwn = [&](const std::filesystem::path& file) { return file.stem() == value("own"); };
