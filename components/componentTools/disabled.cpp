@@ -112,10 +112,6 @@ class SwitchedList {
 
 } // namespace
 
-bool isRecordOf(const RecordedLibrary& library, const DisabledComponent& component) {
-    return library.fileName == component.fileName && library.directory == component.directory;
-}
-
 DisabledComponents disabledComponents(const std::filesystem::path& list) {
     return readDisabled(verdictsFileOf(list)).value_or(DisabledComponents());
 }

@@ -9,7 +9,6 @@
 #pragma once
 
 #include "components/componentTools/export.h"
-#include "components/componentTools/recordedLibrary.h"
 
 #include <filesystem>
 #include <string>
@@ -34,10 +33,6 @@ struct SwitchResult {
     /// Why nothing was written, as a sentence that names the file; empty if all is well.
     std::wstring problem;
 };
-
-/// Returns whether the record is the component's, by their names.
-MZ_COMPONENT_TOOLS_API bool isRecordOf(const RecordedLibrary& library,
-                                       const DisabledComponent& component);
 
 /// Returns the components that are switched off in the list.
 ///

@@ -124,6 +124,10 @@ std::optional<DisabledComponents> readDisabled(const std::filesystem::path& file
     }
 }
 
+bool isRecordOf(const RecordedLibrary& library, const DisabledComponent& component) {
+    return library.fileName == component.fileName && library.directory == component.directory;
+}
+
 Finding disabledFinding(const DisabledComponent& component) {
     return {Verdict::disabledByUser, component.reason,
             component.reason.empty() ? std::wstring() : L" (" + component.reason + L")"};

@@ -18,6 +18,9 @@ void readVerdicts(const std::filesystem::path& file, RecordedLibraries& librarie
 /// Returns what is switched off; `std::nullopt` if there is a file, but it is not valid.
 std::optional<DisabledComponents> readDisabled(const std::filesystem::path& file);
 
+/// Returns whether the record is the component's, by their names.
+bool isRecordOf(const RecordedLibrary& library, const DisabledComponent& component);
+
 /// Returns the verdict on a component that is switched off.
 Finding disabledFinding(const DisabledComponent& component);
 
