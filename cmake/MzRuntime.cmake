@@ -21,12 +21,18 @@ function(mz_find_runtime variable)
 endfunction()
 
 # mz_copy_runtime(PROGRAM): copies the DLLs that PROGRAM needs, with those of the compiler, to its
-# folder whenever it has been built. A no-op on other systems, where the run path names the folders.
+# folder whenever it has been built. If PROGRAM links Mz::MZcomponentTools directly, copies the program
+# that the library starts to try components, too. A no-op on other systems, where the run path names
+# the folders.
 function(mz_copy_runtime program)
   if(NOT WIN32)
     return()
   endif()
   mz_find_runtime(runtime)
+  get_target_property(libraries ${program} LINK_LIBRARIES)
+  if("Mz::MZcomponentTools" IN_LIST libraries)
+    list(APPEND runtime $<TARGET_FILE_DIR:Mz::MZcomponentTools>/mzcomponents-probe.exe)
+  endif()
   add_custom_command(TARGET ${program} POST_BUILD
     COMMAND ${CMAKE_COMMAND} -E copy_if_different
       $<TARGET_RUNTIME_DLLS:${program}> ${runtime} $<TARGET_FILE_DIR:${program}>

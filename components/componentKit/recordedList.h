@@ -6,6 +6,9 @@
 ///     Mz::Kit::initialize(components);
 ///     Mz::Kit::writeList(list);             // throws if it cannot be written
 ///
+/// With `listFromEnvironment(list)` in place of `list`, `mzcomponents bisect` can find the
+/// component with which the host fails.
+///
 /// The list helps, and is never needed: whatever is missing from it is read from the libraries. Its
 /// texts are in the encoding of the locale, so read it under the locale under which it was written.
 ///
@@ -17,6 +20,7 @@
 #include "components/componentManager/binaryStream.h"
 #include "components/componentManager/componentImp.h"
 #include "components/componentManager/files.h"
+#include "components/componentManager/listVariable.h"
 #include "components/componentManager/nativeText.h"
 #include "components/componentManager/persistant.h"
 
@@ -36,6 +40,19 @@ inline QrPtr<QrPersistant> recordsOfManager() {
 }
 
 } // namespace detail
+
+/// Returns the list that the environment variable MZ_COMPONENT_LIST names, else `list`.
+///
+/// A search for a faulty component starts the host with other lists by this variable. Use the
+/// result for all that the host does with its list, so that such a start does not change the host's
+/// own.
+///
+///     const auto list = Mz::Kit::listFromEnvironment(folder / "components.list");
+///
+/// \param list  the host's own list
+inline std::filesystem::path listFromEnvironment(const std::filesystem::path& list) {
+    return environmentPath(listVariable).value_or(list);
+}
 
 /// The result of `readList`.
 struct ListReading {

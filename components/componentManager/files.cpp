@@ -124,6 +124,10 @@ std::filesystem::path programFolder() {
     return platform::programFile().parent_path();
 }
 
+std::optional<std::filesystem::path> environmentPath(const char* name) {
+    return platform::environmentPath(name);
+}
+
 std::filesystem::path fullPath(const std::filesystem::path& path) {
     std::filesystem::path full = platform::resolveDots(std::filesystem::absolute(path));
     if (!full.has_filename() && full.has_relative_path())

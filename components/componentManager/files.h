@@ -11,6 +11,7 @@
 #include <filesystem>
 #include <functional>
 #include <iosfwd>
+#include <optional>
 #include <string_view>
 
 namespace Mz {
@@ -56,6 +57,13 @@ MZ_COMPONENT_MANAGER_API void replaceFile(const std::filesystem::path& file,
 ///
 /// \throws std::system_error if the system does not know it (on Linux, if /proc is not mounted)
 MZ_COMPONENT_MANAGER_API std::filesystem::path programFolder();
+
+/// Returns the path in an environment variable of this process; `std::nullopt` if the variable is
+/// not set or empty. The path has all its characters, whatever the locale. No other thread may
+/// change the environment meanwhile.
+///
+/// \param name  the variable's name, in ASCII
+MZ_COMPONENT_MANAGER_API std::optional<std::filesystem::path> environmentPath(const char* name);
 
 /// Returns `path` as a full path without "." and "..", without a separator at its end, and with the
 /// system's preferred separators. Hosts pass folders to the component manager in this form.

@@ -41,6 +41,22 @@ Finding judgeRecord(const RecordedLibrary* record, const std::filesystem::path& 
     return {Verdict::recordedUnchanged, std::to_wstring(record->builders.size()), {}};
 }
 
+/// Adds what the list has on the file. A component that is switched off has that verdict, unless
+/// there is a fault to report: the host would meet it after the component is switched on.
+void judgeRecord(Explanation& explanation, const RecordedLibrary* record, bool load) {
+    Finding recorded = judgeRecord(record, explanation.file);
+    if (!record || !record->kept || record->kept->verdict != Verdict::disabledByUser) {
+        explanation.notes.push_back(std::move(recorded));
+        return;
+    }
+    if (explanation.verdict.verdict == Verdict::component && !load)
+        explanation.verdict = *record->kept;
+    else
+        explanation.notes.push_back(*record->kept);
+    if (recorded.verdict != Verdict::recordedFailed) // A host loads it, whatever the user wants.
+        explanation.notes.push_back(std::move(recorded));
+}
+
 /// Adds the notes on builders whose uids collide with the list.
 void compareUids(Explanation& explanation, const RecordedLibraries& recorded,
                  const RecordedLibrary* own) {
@@ -103,7 +119,7 @@ Explanation explainFile(const std::filesystem::path& file, const ExplainOptions&
         options.recorded ? findRecord(*options.recorded, candidate.directory, candidate.fileName)
                          : nullptr;
     if (options.recorded)
-        explanation.notes.push_back(judgeRecord(record, candidate.path));
+        judgeRecord(explanation, record, options.load);
     if (options.load && component)
         load(explanation, options);
     else if (record)

@@ -34,7 +34,8 @@ struct RecordedLibrary {
     std::int64_t size = 0;                 ///< in bytes
     std::vector<RecordedBuilder> builders; ///< empty if the file is no component or failed
     std::int64_t position = -1; ///< its offset in the list file, in bytes; -1 if it was not read
-    /// The saved verdict on a file without builders. It is stored beside the list, not in it.
+    /// The saved verdict on a file without builders, or `disabledByUser`, which a file with
+    /// builders can have, too. It is stored beside the list, not in it.
     std::optional<Finding> kept = std::nullopt;
 };
 

@@ -62,6 +62,7 @@ class Scanner {
     void readOld() {
         if (options.list.empty())
             return;
+        readDisabledNames();
         ListReading reading = readRecordedList(options.list);
         result.rejected = reading.reason;
         for (RecordedLibrary& library : reading.libraries) {
@@ -80,11 +81,38 @@ class Scanner {
             keepFromWriting(L"nothing was written, for what is there could not be kept");
         if (!result.notWritten.empty())
             return;
+        dropNewlyDisabled();
         writeGuarded([&] { writeRecordedList(options.list, result.libraries); });
         // The list comes first: without verdicts it is still valid, and the next scan only retries
         // more. Verdicts without their list are useless.
         if (result.notWritten.empty())
-            writeGuarded([&] { writeVerdicts(verdictsFileOf(options.list), result.libraries); });
+            writeGuarded(
+                [&] { writeVerdicts(verdictsFileOf(options.list), result.libraries, disabled); });
+    }
+
+    /// Reads what is switched off. A file that is not valid is treated as in `readVerdicts`.
+    void readDisabledNames() {
+        disabled = readDisabled(verdictsFileOf(options.list)).value_or(DisabledComponents());
+    }
+
+    const DisabledComponent* findDisabled(const Candidate& candidate) const {
+        const auto found =
+            std::find_if(disabled.begin(), disabled.end(), [&](const DisabledComponent& component) {
+                return component.fileName == candidate.fileName &&
+                       component.directory == candidate.directory;
+            });
+        return found == disabled.end() ? nullptr : &*found;
+    }
+
+    /// The user may have switched off a component during the scan.
+    void dropNewlyDisabled() {
+        readDisabledNames();
+        for (const DisabledComponent& component : disabled)
+            for (RecordedLibrary& library : result.libraries)
+                if (isRecordOf(library, component)) {
+                    library.builders.clear();
+                    library.kept = disabledFinding(component);
+                }
     }
 
     template <class Write>
@@ -125,6 +153,9 @@ class Scanner {
         if (!status) {
             file.verdict.verdict =
                 verdictOnAbsence(candidate.path); // Gone since the folder was listed.
+        } else if (const DisabledComponent* const component = findDisabled(candidate)) {
+            file.verdict = disabledFinding(*component);
+            recordWithoutBuilders(file, *status);
         } else if (unchanged && !isTriedAgain(known->second) &&
                    !isForOtherHost(candidate, known->second)) {
             file.verdict = verdictOf(known->second);
@@ -178,6 +209,14 @@ class Scanner {
     void keep(ScannedFile& file, const RecordedLibrary& library) {
         file.recorded = true;
         result.libraries.push_back(library);
+    }
+
+    /// Records a library that no host is to load.
+    void recordWithoutBuilders(ScannedFile& file, const platform::FileStatus& status) {
+        RecordedLibrary library{file.directory, file.fileName, status.time, status.size, {}};
+        library.kept = file.verdict;
+        file.recorded = true;
+        result.libraries.push_back(std::move(library));
     }
 
     void look(ScannedFile& file, const platform::FileStatus& status) {
@@ -258,6 +297,7 @@ class Scanner {
     const ScanOptions& options;
     ProbeOptions probeOptions;
     std::map<Name, RecordedLibrary> old;
+    DisabledComponents disabled;
     ScanResult result;
     int probed = 0, unprobed = 0; ///< libraries that were tried, and that could not be tried
 };

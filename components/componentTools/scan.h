@@ -67,6 +67,9 @@ struct ScanResult {
 /// `verdictsFileOf(list)`. A file that is not a component library is recorded in the same way, as
 /// by the manager.
 ///
+/// A component that the user switched off (`disabled.h`) is recorded without builders and not
+/// examined, whether or not its file has changed.
+///
 /// A library that needs its host's program cannot be tried. It is not recorded, and a host loads it
 /// at each start. A program that must not load it adds `unjudged` to the list that it passes to its
 /// manager.

@@ -44,6 +44,9 @@ constexpr Entry entries[] = {
     {Verdict::noEntryPoint, "noEntryPoint", Severity::bystander,
      L"it is a library, but does not export \"QrGetComponentDescription\" itself",
      L"if it is meant to be a component, define and export that function (MZ_COMPONENT does)"},
+    {Verdict::disabledByUser, "disabledByUser", Severity::bystander,
+     L"it is switched off in the list%2, so no host that reads the list loads it",
+     L"mzcomponents enable switches it on"},
 
     {Verdict::missing, "missing", Severity::fault, L"there is no such file", L"check the path"},
     {Verdict::unreachable, "unreachable", Severity::fault,

@@ -13,7 +13,7 @@ namespace Mz::Tools {
 
 /// The kind of a finding. The numeric values may change between versions: store the name
 /// (`nameOf`). Since 0.2: `otherAbi`, `needsHost`, `unreachable`, `notAFolder`, `answerLost`,
-/// `answerTooLong`, `onPath`, `notOnPath`, `uidNil`, `otherInterface`.
+/// `answerTooLong`, `onPath`, `notOnPath`, `uidNil`, `otherInterface`, `disabledByUser`.
 enum class Verdict {
     // Good.
     component,     ///< a component library, as far as reading the file can show
@@ -23,11 +23,12 @@ enum class Verdict {
     // Not a component library. The manager correctly skips the file.
     directory,
     hidden,
-    systemFile,   ///< it has the system attribute (Windows)
-    notRegular,   ///< a pipe or a device
-    notALibrary,  ///< neither a library nor a program for Linux or Windows
-    program,      ///< an executable program
-    noEntryPoint, ///< a library that does not export "QrGetComponentDescription" itself
+    systemFile,     ///< it has the system attribute (Windows)
+    notRegular,     ///< a pipe or a device
+    notALibrary,    ///< neither a library nor a program for Linux or Windows
+    program,        ///< an executable program
+    noEntryPoint,   ///< a library that does not export "QrGetComponentDescription" itself
+    disabledByUser, ///< the user switched it off, see `disabled.h`
 
     // Faults that reading the file or its folder shows.
     missing,

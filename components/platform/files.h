@@ -40,6 +40,9 @@ std::wstring errorText(const std::error_code& error);
 /// \throws std::system_error if the system does not know it
 std::filesystem::path programFile();
 
+/// Returns the path in an environment variable; `std::nullopt` if it is not set or empty.
+std::optional<std::filesystem::path> environmentPath(const char* name);
+
 /// Returns `path`, which must be absolute, without `.` and `..`. The result names the same file.
 std::filesystem::path resolveDots(const std::filesystem::path& path);
 

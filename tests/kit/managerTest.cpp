@@ -66,6 +66,16 @@ TEST_F(KitManager, CreatesNothingThatIsNotThere) {
     EXPECT_FALSE(Kit::create<Shape>(countUid)) << "the builder makes no objects";
 }
 
+TEST_F(KitManager, TakesTheListFromTheEnvironment) {
+    setEnvironment("MZ_COMPONENT_LIST", "");
+    EXPECT_EQ(Kit::listFromEnvironment(list), list);
+    const std::string other(300, 'x'); // Longer than the usual path on Windows.
+    setEnvironment("MZ_COMPONENT_LIST", other);
+    EXPECT_EQ(Kit::listFromEnvironment(list), other);
+    setEnvironment("MZ_COMPONENT_LIST", "short");
+    EXPECT_EQ(Kit::listFromEnvironment(list), "short");
+}
+
 TEST_F(KitManager, HasNoBuildersInAFolderThatIsNotThere) {
     Kit::initialize(folder.path() / "nowhere");
     EXPECT_TRUE(Kit::builders().empty());

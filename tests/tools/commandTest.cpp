@@ -85,11 +85,11 @@ TEST_F(Command, LeavesNoVerdictsBesideAFolderThatIsNamedAsTheList) {
 TEST_F(Command, HelpSaysWhatEachDoesWithAnExample) {
     const ProgramResult help = run({"--help"});
     EXPECT_EQ(help.exitCode, 0);
-    for (const char* command : {"check", "new", "uid", "help"})
+    for (const char* command : {"check", "new", "uid", "help", "disable", "enable"})
         EXPECT_THAT(run({command, "--help"}).output,
                     HasSubstr("Example:\n  mzcomponents " + std::string(command)));
     for (const char* command :
-         {"list", "explain", "scan", "profile", "types", "import", "show", "graph"}) {
+         {"list", "explain", "scan", "profile", "bisect", "types", "import", "show", "graph"}) {
         EXPECT_THAT(help.output, HasSubstr(command));
         const ProgramResult own = run({command, "--help"});
         EXPECT_EQ(own.exitCode, 0);
@@ -101,7 +101,7 @@ TEST_F(Command, HelpSaysWhatEachDoesWithAnExample) {
 
 TEST_F(Command, HelpNamesTheKindOfEachValue) {
     for (const char* command :
-         {"list", "explain", "scan", "types", "import", "show", "graph", "check", "uid"})
+         {"list", "explain", "scan", "types", "import", "show", "graph", "check", "uid", "bisect"})
         EXPECT_THAT(run({command, "--help"}).output, ::testing::Not(HasSubstr("TEXT"))) << command;
     for (const char* kind : {"component", "importer", "host"})
         EXPECT_THAT(run({"new", kind, "--help"}).output,

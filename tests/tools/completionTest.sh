@@ -23,7 +23,7 @@ expect() { # expect WORD CONTEXT: expects WORD as a line of standard input
 }
 
 commands=$("$@" --help | tr -d '\r' | sed -n '/^Subcommands:/,$s/^  \([a-z]*\) .*/\1/p')
-[ "$(wc -w <<<"$commands")" = 12 ] || { echo "twelve commands expected: $commands" >&2; exit 1; }
+[ "$(wc -w <<<"$commands")" = 15 ] || { echo "fifteen commands expected: $commands" >&2; exit 1; }
 for command in $commands; do
     expect "$command" mzcomponents < <(complete_for mzcomponents '')
     for option in $("$@" "$command" --help | tr -d '\r' | grep -oE '^  (-h,)?--[a-z-]+' | grep -oE -- '--[a-z-]+'); do

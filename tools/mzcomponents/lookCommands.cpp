@@ -58,7 +58,8 @@ void printFile(const std::filesystem::path& file, const Tools::Finding& finding,
         if (!(note == finding))
             line += L"  " + nameOf(note);
     printLine(line);
-    if (finding.verdict == Tools::Verdict::uidTaken)
+    if (finding.verdict == Tools::Verdict::uidTaken ||
+        finding.verdict == Tools::Verdict::disabledByUser)
         printSentence(finding);
 }
 
@@ -114,6 +115,13 @@ Json jsonOfExplanation(const Tools::Explanation& explanation) {
 bool failedEarlier(const Tools::Explanation& explanation) {
     return explanation.verdict.verdict == Tools::Verdict::component && !explanation.notes.empty() &&
            explanation.notes.front().verdict == Tools::Verdict::recordedFailed;
+}
+
+/// Returns whether the user switched the component off.
+bool isDisabled(const Tools::Explanation& explanation) {
+    return std::any_of(
+        explanation.notes.begin(), explanation.notes.end(),
+        [](const Tools::Finding& note) { return note.verdict == Tools::Verdict::disabledByUser; });
 }
 
 /// Returns whether the search path does not lead to the file.
@@ -195,6 +203,7 @@ int explain(const Common& common, const ExplainArguments& arguments, const Probe
         const Tools::Explanation explanation = Tools::explainFile(Tools::pathOf(file), options);
         // The user expects a component, so every other file is a failure, not only a fault.
         faults = faults || failedEarlier(explanation) || isPassedBy(explanation) ||
+                 isDisabled(explanation) ||
                  Tools::severityOf(explanation.verdict.verdict) != Tools::Severity::good;
         if (common.json)
             files.push_back(jsonOfExplanation(explanation));

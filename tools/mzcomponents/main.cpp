@@ -4,6 +4,7 @@
 /// The parser only fills in `Arguments` and selects a command, which runs after parsing, so that a
 /// usage error has no side effects. Exceptions end here.
 #include "components/componentTools/consoleText.h"
+#include "tools/mzcomponents/bisectCommand.h"
 #include "tools/mzcomponents/checkCommand.h"
 #include "tools/mzcomponents/commands.h"
 #include "tools/mzcomponents/exitGuard.h"
@@ -11,6 +12,7 @@
 #include "tools/mzcomponents/newCommand.h"
 #include "tools/mzcomponents/output.h"
 #include "tools/mzcomponents/profileCommand.h"
+#include "tools/mzcomponents/switchCommands.h"
 #include "tools/mzcomponents/uidCommand.h"
 
 #include "components/componentTools/standardOutput.h"
@@ -41,6 +43,8 @@ struct Arguments {
     NewArguments made;
     UidArguments uid;
     ProfileArguments profile;
+    SwitchArguments switching;
+    BisectArguments bisecting;
     std::string shown;
     std::string topic;
     std::function<int()> command;
@@ -164,6 +168,24 @@ void addLookCommands(CLI::App& app, Arguments& arguments) {
     });
 }
 
+void addSearchCommand(CLI::App& app, Arguments& arguments) {
+    CLI::App* bisect =
+        addCommand(app, arguments, "bisect",
+                   "Starts a host again and again with some components switched off, and finds the "
+                   "one with which it fails, or those that only fail together.",
+                   "mzcomponents bisect --path /opt/app/components --cache "
+                   "~/.cache/app/components.list -- /opt/app/bin/app --self-test");
+    addCache(bisect, arguments, updatedCache);
+    bisect->get_option("--cache")->required();
+    addBisectOptions(*bisect, arguments.bisecting);
+    addLimits(bisect, arguments);
+    bisect->callback([&] {
+        arguments.command = [&] {
+            return Mz::Commands::bisect(arguments.common, arguments.bisecting, arguments.probe);
+        };
+    });
+}
+
 void addUseCommands(CLI::App& app, Arguments& arguments) {
     CLI::App* types =
         addCommand(app, arguments, "types", "Lists the file types that the components import.",
@@ -239,6 +261,8 @@ int run(std::vector<std::string> words) {
     app.set_version_flag("--version", MZ_VERSION);
     addLookCommands(app, arguments);
     addUseCommands(app, arguments);
+    addSearchCommand(app, arguments);
+    addSwitchCommands(app, arguments.switching, arguments.command);
     addCheckCommand(app, arguments.check, arguments.probe, arguments.command);
     addNewCommand(app, arguments.made, arguments.command);
     addUidCommand(app, arguments.uid, arguments.command);

@@ -6,7 +6,7 @@ _mzcomponents() {
   local options word command= kind=
   for word in "${COMP_WORDS[@]:1:COMP_CWORD-1}"; do
     case $word in
-    list | explain | scan | profile | types | import | show | graph | check | new | uid | help)
+    list | explain | scan | profile | types | import | show | graph | check | new | uid | help | disable | enable | bisect)
       command=${command:-$word}
       ;;
     component | importer | host) [ "$command" != new ] || kind=${kind:-$word} ;;
@@ -27,13 +27,16 @@ _mzcomponents() {
     mapfile -t COMPREPLY < <(compgen -W "error warning note" -- "$current")
     return
     ;;
-  --time-limit | --memory-limit | --seed | --fuzz | --jobs | --reproduce | --explain | --extension | --runs)
+  --time-limit | --memory-limit | --seed | --fuzz | --jobs | --reproduce | --explain | --extension | --runs | --reason | --repeat | --time)
     return
     ;;
   esac
   case $command in
-  '') options="list explain scan profile types import show graph check new uid help --help --version" ;;
+  '') options="list explain scan profile types import show graph check new uid help disable enable bisect --help --version" ;;
   list) options="$common --host" ;;
+  disable) options="--cache --reason --help" ;;
+  enable) options="--cache --help" ;;
+  bisect) options="$common $limits --repeat --time --running-is-good --ask" ;;
   explain) options="$common $limits --host --load" ;;
   scan) options="$common $limits --host --retry" ;;
   profile) options="$common $limits --runs --svg" ;;
@@ -56,7 +59,7 @@ _mzcomponents() {
   esac
   mapfile -t COMPREPLY < <(compgen -W "$options" -- "$current")
   case $command in
-  explain | import | show | check)
+  explain | import | show | check | disable | enable | bisect)
     if [[ $current != -* ]]; then
       compopt -o filenames 2>/dev/null
       mapfile -t COMPREPLY < <(compgen -f -- "$current")

@@ -77,6 +77,15 @@ std::optional<Finding> abiDifference(const ComponentStamp& stamp) {
     return finding.subject.empty() ? std::nullopt : std::optional(std::move(finding));
 }
 
+std::wstring textOf(const ComponentStamp& stamp) {
+    return versionName(stamp) + L", " + cxxAbiName(stamp) + L", " + stringAbiName(stamp) + L", " +
+           debugName(stamp) + L", " + wideCharName(stamp);
+}
+
+std::wstring ownStampText() {
+    return textOf(own);
+}
+
 std::optional<Finding> abiDifference(const LibraryImage& image) {
     return image.stamp ? abiDifference(*image.stamp) : std::nullopt;
 }

@@ -17,4 +17,10 @@ std::optional<Finding> abiDifference(const ComponentStamp& stamp);
 /// Returns the same for a file; `std::nullopt` if the file has no stamp.
 std::optional<Finding> abiDifference(const LibraryImage& image);
 
+/// Returns the properties that a stamp names, as text.
+std::wstring textOf(const ComponentStamp& stamp);
+
+/// Returns the same for the stamp that a component of this build has.
+std::wstring ownStampText();
+
 } // namespace Mz::Tools

@@ -15,6 +15,7 @@
 #include <functional>
 #include <optional>
 #include <string>
+#include <utility>
 #include <vector>
 
 namespace Mz::Tools::System {
@@ -108,6 +109,8 @@ struct ChildLimits {
     /// Polled after each piece of output; true ends the child, which is not needed any more; may be
     /// empty.
     std::function<bool()> complete = {};
+    /// Environment variables of the child in addition to those of this process, by ASCII names.
+    std::vector<std::pair<std::string, NativePath>> environment = {};
 };
 
 /// A file that is open for reading, and that a child can inherit.
@@ -220,6 +223,31 @@ void confine(std::uint64_t refused);
 /// Returns the name of the last fault that an exception handler in this process caught; empty if
 /// there was none. Windows catches crashes in the initialisers of libraries. Empty on Linux.
 std::wstring caughtFault();
+
+/// A file that this process has created and holds: other code, in this process or another, sees
+/// that it is held, until the object is destroyed or the process ends. The file stays then, unless
+/// `remove` was called.
+class HeldFile {
+  public:
+    HeldFile() = default;
+    ~HeldFile();
+    HeldFile(const HeldFile&) = delete;
+    HeldFile& operator=(const HeldFile&) = delete;
+
+    /// Creates the file, in place of one that is not held. Returns false on failure.
+    bool create(const NativePath& file);
+    /// Replaces the content. Returns false on failure.
+    bool write(const std::string& content);
+    /// Deletes the file. No-op if there is none.
+    void remove();
+
+  private:
+    NativePath path;
+    std::intptr_t handle = -1;
+};
+
+/// Returns whether a `HeldFile` exists for the file, in any process.
+bool isHeld(const NativePath& file);
 
 /// Returns the id of this process.
 unsigned long processNumber();

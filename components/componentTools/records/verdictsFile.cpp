@@ -1,12 +1,14 @@
 // SPDX-License-Identifier: BSL-1.0
 /// The verdicts are stored as JSON beside the list, because the format of the list is fixed. Each
-/// has the time and size of its library, so that it is ignored after the library has changed.
+/// has the time and size of its library, so that it is ignored after the library has changed. What
+/// the user switched off has neither: the choice outlasts a change of the file, and its absence.
 /// Names, not numbers, identify verdicts, so that versions can exchange files.
 #include "components/componentTools/records/verdictsFile.h"
 
 #include "components/componentManager/files.h"
 #include "components/componentManager/utf8.h"
 #include "components/componentTools/records/openPatiently.h"
+#include "components/platform/platform.h"
 
 #include <cstdint>
 #include <fstream>
@@ -46,7 +48,8 @@ bool isKept(Verdict verdict) {
     switch (verdict) {
     case Verdict::component: // Replaced by the verdict of the probe.
     case Verdict::works:
-    case Verdict::directory: // Not candidates.
+    case Verdict::disabledByUser: // Stored apart.
+    case Verdict::directory:      // Not candidates.
     case Verdict::hidden:
     case Verdict::systemFile:
     case Verdict::notRegular:
@@ -77,6 +80,16 @@ void fillIn(RecordedLibrary& library, const Verdicts& verdicts) {
         library.kept = Finding{*verdict, wide(entry, "subject"), wide(entry, "words")};
 }
 
+/// Older versions write no choices.
+DisabledComponents disabledIn(const OrderedJson& all) {
+    DisabledComponents disabled;
+    if (all.at("version").get<int>() == version && all.contains("disabled"))
+        for (const OrderedJson& entry : all.at("disabled"))
+            disabled.push_back(
+                {wide(entry, "directory"), wide(entry, "fileName"), wide(entry, "reason")});
+    return disabled;
+}
+
 } // namespace
 
 void readVerdicts(const std::filesystem::path& file, RecordedLibraries& libraries) {
@@ -89,15 +102,46 @@ void readVerdicts(const std::filesystem::path& file, RecordedLibraries& librarie
         for (RecordedLibrary& library : libraries)
             if (library.builders.empty())
                 fillIn(library, verdicts);
+        for (const DisabledComponent& component : disabledIn(all))
+            for (RecordedLibrary& library : libraries)
+                if (isRecordOf(library, component))
+                    library.kept = disabledFinding(component);
     } catch (const nlohmann::json::exception&) {
         return; // Without verdicts the next scan only retries more.
     }
 }
 
-void writeVerdicts(const std::filesystem::path& file, const RecordedLibraries& libraries) {
-    OrderedJson entries = OrderedJson::array();
+std::optional<DisabledComponents> readDisabled(const std::filesystem::path& file) {
+    std::ifstream input;
+    if (!openPatiently(input, file))
+        return platform::queryFile(file.native())
+                   ? std::nullopt
+                   : std::optional<DisabledComponents>(std::in_place);
+    try {
+        return disabledIn(OrderedJson::parse(input));
+    } catch (const nlohmann::json::exception&) {
+        return std::nullopt;
+    }
+}
+
+bool isRecordOf(const RecordedLibrary& library, const DisabledComponent& component) {
+    return library.fileName == component.fileName && library.directory == component.directory;
+}
+
+Finding disabledFinding(const DisabledComponent& component) {
+    return {Verdict::disabledByUser, component.reason,
+            component.reason.empty() ? std::wstring() : L" (" + component.reason + L")"};
+}
+
+void writeVerdicts(const std::filesystem::path& file, const RecordedLibraries& libraries,
+                   const DisabledComponents& disabled) {
+    OrderedJson entries = OrderedJson::array(), choices = OrderedJson::array();
+    for (const DisabledComponent& component : disabled)
+        choices.push_back({{"directory", toUtf8(component.directory)},
+                           {"fileName", toUtf8(component.fileName)},
+                           {"reason", toUtf8(component.reason)}});
     for (const RecordedLibrary& library : libraries)
-        if (library.kept)
+        if (library.kept && library.kept->verdict != Verdict::disabledByUser)
             entries.push_back({{"directory", toUtf8(library.directory)},
                                {"fileName", toUtf8(library.fileName)},
                                {"time", library.time},
@@ -107,8 +151,8 @@ void writeVerdicts(const std::filesystem::path& file, const RecordedLibraries& l
                                {"words", toUtf8(library.kept->words)},
                                {"sentence", toUtf8(sentenceOf(*library.kept))},
                                {"cure", toUtf8(cureOf(*library.kept))}});
-    replaceFile(file, OrderedJson{{"version", version}, {"libraries", entries}}.dump(2, ' ', true) +
-                          "\n");
+    const OrderedJson all{{"version", version}, {"libraries", entries}, {"disabled", choices}};
+    replaceFile(file, all.dump(2, ' ', true) + "\n");
 }
 
 } // namespace Mz::Tools

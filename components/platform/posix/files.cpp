@@ -9,6 +9,7 @@
 
 #include <cerrno>
 #include <cstdio>
+#include <cstdlib>
 #include <fcntl.h>
 #include <sys/stat.h>
 #include <unistd.h>
@@ -72,6 +73,11 @@ std::filesystem::path programFile() {
     if (failure)
         throw std::system_error(failure, "the program's file");
     return file;
+}
+
+std::optional<std::filesystem::path> environmentPath(const char* name) {
+    const char* const value = std::getenv(name);
+    return value && *value ? std::optional<std::filesystem::path>(value) : std::nullopt;
 }
 
 std::filesystem::path resolveDots(const std::filesystem::path& path) {

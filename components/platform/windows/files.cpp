@@ -140,6 +140,20 @@ std::filesystem::path programFile() {
     }
 }
 
+std::optional<std::filesystem::path> environmentPath(const char* name) {
+    const std::wstring wide(name, name + std::strlen(name));
+    std::wstring value(MAX_PATH, L'\0');
+    while (true) {
+        const auto size = static_cast<DWORD>(value.size());
+        const DWORD length = ::GetEnvironmentVariableW(wide.c_str(), value.data(), size);
+        if (length == 0)
+            return std::nullopt;
+        value.resize(length); // Without the terminator if it fitted, else with it.
+        if (length < size)
+            return value;
+    }
+}
+
 std::filesystem::path resolveDots(const std::filesystem::path& path) {
     return path.lexically_normal();
 }

@@ -15,6 +15,7 @@
 #include <fstream>
 #include <poll.h>
 #include <spawn.h>
+#include <string_view>
 #include <sys/resource.h>
 #include <sys/socket.h>
 #include <sys/stat.h>
@@ -47,6 +48,34 @@ class Descriptor {
     int value;
 };
 
+/// The environment of this process with more variables, which replace those of the same name.
+class Environment {
+  public:
+    explicit Environment(const std::vector<std::pair<std::string, NativePath>>& added) {
+        for (const auto& [name, value] : added)
+            texts.push_back(name + "=" + value.native());
+        for (char** variable = environ; *variable; ++variable)
+            if (!isReplaced(*variable))
+                pointers.push_back(*variable);
+        for (std::string& text : texts)
+            pointers.push_back(text.data());
+        pointers.push_back(nullptr);
+    }
+    Environment(const Environment&) = delete;
+    Environment& operator=(const Environment&) = delete;
+    char** get() { return pointers.data(); }
+
+  private:
+    bool isReplaced(std::string_view variable) const {
+        return std::any_of(texts.begin(), texts.end(), [&](const std::string& text) {
+            return variable.starts_with(std::string_view(text).substr(0, text.find('=') + 1));
+        });
+    }
+
+    std::vector<std::string> texts;
+    std::vector<char*> pointers;
+};
+
 /// Returns a copy of the descriptor above those that a child uses, or -1. A host that has closed
 /// its standard files gets their numbers for new files.
 int raised(int descriptor) {
@@ -61,7 +90,7 @@ struct Files {
 
 /// Starts the program in its own process group. Returns 0 or an error number.
 int start(const NativePath& program, const std::vector<NativePath>& arguments, const Files& files,
-          pid_t& child) {
+          char** environment, pid_t& child) {
     std::vector<char*> pointers{const_cast<char*>(program.c_str())};
     for (const NativePath& argument : arguments)
         pointers.push_back(const_cast<char*>(argument.c_str()));
@@ -88,7 +117,7 @@ int start(const NativePath& program, const std::vector<NativePath>& arguments, c
     ::posix_spawnattr_setflags(&attributes, POSIX_SPAWN_SETPGROUP | POSIX_SPAWN_SETSIGMASK |
                                                 POSIX_SPAWN_SETSIGDEF);
     const int failure =
-        ::posix_spawn(&child, program.c_str(), &actions, &attributes, pointers.data(), environ);
+        ::posix_spawn(&child, program.c_str(), &actions, &attributes, pointers.data(), environment);
     ::posix_spawnattr_destroy(&attributes);
     ::posix_spawn_file_actions_destroy(&actions);
     return failure;
@@ -317,13 +346,15 @@ ChildResult runChild(const NativePath& program, const std::vector<NativePath>& a
     }
     ::fcntl(output.get(), F_SETFL, O_NONBLOCK);
     pid_t child = 0;
+    Environment environment(limits.environment);
     int failure = 0;
     {
         const Descriptor high[] = {
             Descriptor(supply.input ? raised(childInput.get()) : -1),
             Descriptor(raised(childOutput.get())),
             Descriptor(supply.file ? raised(static_cast<int>(supply.file->number())) : -1)};
-        failure = start(program, arguments, {high[0].get(), high[1].get(), high[2].get()}, child);
+        failure = start(program, arguments, {high[0].get(), high[1].get(), high[2].get()},
+                        environment.get(), child);
     }
     childOutput.close();
     childInput.close();

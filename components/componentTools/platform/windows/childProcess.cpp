@@ -11,6 +11,7 @@
 
 #include <algorithm>
 #include <atomic>
+#include <cwchar>
 #include <optional>
 #include <windows.h>
 
@@ -96,6 +97,27 @@ HANDLE newJob(std::uint64_t refused) {
     return job;
 }
 
+/// Returns the environment of this process with more variables, which replace those of the same
+/// name: texts that end with NUL, and another NUL. The system takes them in any order.
+std::wstring environmentWith(const std::vector<std::pair<std::string, NativePath>>& added) {
+    std::wstring block;
+    for (const auto& [name, value] : added)
+        block += std::wstring(name.begin(), name.end()) + L'=' + value.native() + L'\0';
+    wchar_t* const own = ::GetEnvironmentStringsW();
+    for (const wchar_t* variable = own; *variable; variable += std::wcslen(variable) + 1) {
+        const bool replaced = std::any_of(added.begin(), added.end(), [&](const auto& entry) {
+            const std::wstring name(entry.first.begin(), entry.first.end());
+            return std::wcslen(variable) > name.size() && variable[name.size()] == L'=' &&
+                   ::_wcsnicmp(variable, name.c_str(), name.size()) == 0;
+        });
+        if (!replaced)
+            block.append(variable).push_back(L'\0');
+    }
+    ::FreeEnvironmentStringsW(own);
+    block.push_back(L'\0');
+    return block;
+}
+
 /// The end of the child's standard input at which this process writes. At most one write is under
 /// way.
 class InputWriter {
@@ -163,7 +185,7 @@ struct Files {
 };
 
 bool start(const NativePath& program, const std::vector<NativePath>& arguments, const Files& files,
-           HANDLE job, PROCESS_INFORMATION& process) {
+           HANDLE job, std::wstring environment, PROCESS_INFORMATION& process) {
     std::wstring commandLine = quoted(program.native());
     for (const NativePath& argument : arguments)
         commandLine += L" " + quoted(argument.native());
@@ -184,10 +206,10 @@ bool start(const NativePath& program, const std::vector<NativePath>& arguments, 
     startup.StartupInfo.hStdError = nowhere.get();
     startup.lpAttributeList = inherited.get();
     constexpr DWORD flags = CREATE_SUSPENDED | CREATE_NO_WINDOW | CREATE_NEW_PROCESS_GROUP |
-                            EXTENDED_STARTUPINFO_PRESENT;
+                            EXTENDED_STARTUPINFO_PRESENT | CREATE_UNICODE_ENVIRONMENT;
     const platform::QuietErrors quiet; // The child inherits the error mode.
     if (!::CreateProcessW(program.c_str(), commandLine.data(), nullptr, nullptr, TRUE, flags,
-                          nullptr, nullptr, &startup.StartupInfo, &process))
+                          environment.data(), nullptr, &startup.StartupInfo, &process))
         return false;
     ::AssignProcessToJobObject(job, process.hProcess);
     ::ResumeThread(process.hThread);
@@ -368,7 +390,8 @@ ChildResult runChild(const NativePath& program, const std::vector<NativePath>& a
     const Files files{childInput ? childInput.get() : nullptr, childOutput.get(),
                       supply.file ? reinterpret_cast<HANDLE>(supply.file->number()) : nullptr};
     PROCESS_INFORMATION process{};
-    if (!start(program, arguments, files, job.get(), process)) {
+    if (!start(program, arguments, files, job.get(), environmentWith(limits.environment),
+               process)) {
         failed.detail = displayName(program) + L": error " + std::to_wstring(::GetLastError());
         return failed;
     }
