@@ -203,9 +203,6 @@ TEST_F(Command, ComparesInterfacesWithThoseOfTheNamedHost) {
     EXPECT_EQ(checked.exitCode, 1);
     EXPECT_THAT(checked.output, HasSubstr(sentence));
     EXPECT_EQ(run({"explain", "--host", inWork("missing"), file}).exitCode, 2);
-    const std::string text = folder.write("text", "no library").string();
-    EXPECT_THAT(run({"explain", "--host", text, file}).output,
-                HasSubstr("text: it describes no interface by MZ_INTERFACE"));
 }
 
 TEST_F(Command, ExplainTellsTheCureAndWhatIsNeeded) {

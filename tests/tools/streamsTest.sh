@@ -68,6 +68,9 @@ said=$("${program[@]}" scan --path good --cache no/list 2>&1 >/dev/null)
 
 touch empty
 expect 1 'empty: the file is empty' show empty
+# Nothing is compared with a host that describes no interface.
+expect 0 'empty: it describes no interface by MZ_INTERFACE' list --path good --host empty
+expect 2 '--host: File does not exist: missing' list --path good --host missing
 head -c 60 list >cut
 expect 1 'cut: neither a recorded list (byte [1-9]' show cut
 echo 'some text of somebody' >text
