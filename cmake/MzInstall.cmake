@@ -90,5 +90,5 @@ unset(mzVariables)
 mz_install_pc(MZobjectIO "Whole objects on the streams of libMZcomponentManager" MZcomponentManager)
 if(TARGET MZcomponentTools)
   mz_install_pc(MZcomponentTools "Diagnosis and crash-proof scan of component libraries"
-    MZcomponentManager)
+    MZcomponentManager MZobjectIO)
 endif()

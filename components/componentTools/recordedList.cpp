@@ -10,6 +10,7 @@
 #include "components/componentManager/nativeText.h"
 #include "components/componentManager/recordFormat.h"
 #include "components/componentTools/records/openPatiently.h"
+#include "components/componentTools/records/readRecords.h"
 #include "components/componentTools/records/verdictsFile.h"
 #include "components/platform/platform.h"
 
@@ -112,6 +113,10 @@ void write(QrStream& stream, const RecordedLibraries& libraries) {
 }
 
 } // namespace
+
+RecordedLibraries readRecords(std::istream& stream) {
+    return ListReader(stream).read();
+}
 
 ListReading readRecordedList(const std::filesystem::path& file) {
     ListReading reading;

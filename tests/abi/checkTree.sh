@@ -72,7 +72,6 @@ layers)
     above componentManager 'componentKit|objectIO|componentTools'
     above componentKit 'platform|objectIO|componentTools'
     above objectIO 'platform|componentKit|componentTools'
-    above componentTools 'objectIO'
     # The tools run the tests of components, and know nothing else of the kit.
     included components/componentTools components/componentKit |
         grep -v 'components/componentKit/componentTest\.h"' |

@@ -19,14 +19,18 @@ std::wstring foreignText(const char* text) {
     return System::displayName(System::pathOfArgument(text ? text : ""));
 }
 
+std::wstring typeText(const std::type_info& type) {
+    int failure = 0;
+    const std::unique_ptr<char, decltype(&std::free)> name(
+        abi::__cxa_demangle(type.name(), nullptr, nullptr, &failure), &std::free);
+    return foreignText(name ? name.get() : type.name());
+}
+
 std::wstring exceptionClass() {
     const std::type_info* type = abi::__cxa_current_exception_type();
     if (!type)
         return L"an exception of another language";
-    int failure = 0;
-    const std::unique_ptr<char, decltype(&std::free)> name(
-        abi::__cxa_demangle(type->name(), nullptr, nullptr, &failure), &std::free);
-    return L"a value of type " + foreignText(name ? name.get() : type->name());
+    return L"a value of type " + typeText(*type);
 }
 
 std::wstring exceptionText() {

@@ -1,8 +1,8 @@
 // SPDX-License-Identifier: BSL-1.0
 /// The program `mzcomponents-probe FILE MEMORY`. With `--check` as its first argument it is the
 /// child process of a check (`checking/checkChild.h`), with `--profile` that of the measurement of
-/// a start
-/// (`profiling/profileChild.h`). Else the program loads one library, requests
+/// a start (`profiling/profileChild.h`), with `--import` that of a guarded import
+/// (`guarding/importChild.h`). Else the program loads one library, requests
 /// its description as the component manager does, and reports on standard output.
 /// libMZcomponentTools starts it. Before each stage it reports the stage, so that the parent
 /// process knows where a crash happened. It ends without running exit handlers, because the
@@ -10,6 +10,9 @@
 #include "components/componentManager/componentImp.h"
 #include "components/componentManager/recordFormat.h"
 #include "components/componentTools/checking/checkChild.h"
+#include "components/componentTools/guarding/importChild.h"
+#include "components/componentTools/guarding/importMessages.h"
+#include "components/componentTools/platform/confinement.h"
 #include "components/componentTools/platform/system.h"
 #include "components/componentTools/probing/fatalFaults.h"
 #include "components/componentTools/probing/probeAnswer.h"
@@ -128,6 +131,8 @@ int main(int argc, char** argv) {
         return runCheckChild(arguments);
     if (!arguments.empty() && arguments[0] == profileArgument)
         return runProfileChild(arguments);
+    if (!arguments.empty() && arguments[0] == importArgument)
+        return runImportChild(arguments, System::confineToReading);
     if (arguments.size() != 2) {
         std::fputs("mzcomponents-probe is started by libMZcomponentTools; see mzcomponents\n",
                    stderr);

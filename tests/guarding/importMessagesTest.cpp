@@ -1,0 +1,148 @@
+// SPDX-License-Identifier: BSL-1.0
+/// Tests the messages between the processes of a guarded import, and the state that they lead to.
+#include "components/componentTools/guarding/importConversation.h"
+#include "components/componentTools/probing/frames.h"
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <limits>
+
+using namespace Mz;
+using namespace Mz::Tools;
+using Kit::ImportVerdict;
+
+namespace {
+
+/// Returns the payload of a message that is one frame.
+std::string payloadOf(const std::string& message) {
+    FrameReader frames(message);
+    const std::optional<Frame> frame = frames.next();
+    EXPECT_TRUE(frame && frames.remaining() == 0);
+    return frame ? std::string(frame->payload) : std::string();
+}
+
+TEST(ImportMessages, ArriveAsTheyWereSent) {
+    ImportTask task{"list\0data", L"path \x20AC", "C.UTF-8", L"file", L"name", 7, 8,
+                    true,         false,          true};
+    const auto again = decodeTask(payloadOf(encode(task)));
+    ASSERT_TRUE(again);
+    EXPECT_EQ(encode(*again), encode(task));
+    EXPECT_EQ(again->searchPath, task.searchPath);
+    EXPECT_EQ(again->answer, 8u);
+    EXPECT_TRUE(again->errorShown);
+
+    ControllerCall call{ControllerFunction::findFile, -3, 0.5f, L"name", L"path", std::nullopt};
+    const auto sameCall = decodeCall(payloadOf(encode(call)));
+    ASSERT_TRUE(sameCall);
+    EXPECT_EQ(sameCall->code, -3);
+    EXPECT_EQ(sameCall->fraction, 0.5f);
+    EXPECT_EQ(sameCall->searchPath, std::optional<std::wstring>(L"path"));
+    EXPECT_FALSE(sameCall->fallbackSearchPath);
+
+    const auto outcome =
+        decodeOutcome(payloadOf(encode(ImportOutcome{ImportVerdict::threw, L"why"})));
+    ASSERT_TRUE(outcome);
+    EXPECT_EQ(outcome->verdict, ImportVerdict::threw);
+    EXPECT_EQ(outcome->detail, L"why");
+    EXPECT_FALSE(decodeOutcome(payloadOf(encode(ImportOutcome{ImportVerdict::timedOut, L"60"}))));
+}
+
+TEST(ImportMessages, AreRejectedWhenCutOrExtended) {
+    const std::string payload =
+        payloadOf(encode(ControllerCall{ControllerFunction::warning, 1, 0, L"text", {}, L"x"}));
+    ASSERT_TRUE(decodeCall(payload));
+    EXPECT_FALSE(decodeCall(payload + '\0'));
+    for (std::size_t size = 0; size < payload.size(); ++size)
+        EXPECT_FALSE(decodeCall(payload.substr(0, size))) << size;
+}
+
+TEST(ImportConversation, KeepsToItsLimits) {
+    Kit::ImportLimits limits;
+    limits.answer = 10;
+    limits.calls = 2;
+    std::string replies;
+    {
+        ImportConversation conversation(nullptr, limits);
+        std::string bytes = encodePiece("123456") + encodePiece("7890");
+        conversation.receive(bytes, replies);
+        EXPECT_FALSE(conversation.isOver());
+        EXPECT_EQ(conversation.object, "1234567890");
+        EXPECT_EQ(bytes, "");
+        bytes = encodePiece("1");
+        conversation.receive(bytes, replies);
+        EXPECT_EQ(conversation.outcome().verdict, ImportVerdict::answerTooLong);
+    }
+    ImportConversation conversation(nullptr, limits);
+    const std::string call = encode(ControllerCall{});
+    std::string bytes = call + call;
+    conversation.receive(bytes, replies);
+    EXPECT_FALSE(conversation.isOver());
+    bytes = call;
+    conversation.receive(bytes, replies);
+    EXPECT_EQ(conversation.outcome().verdict, ImportVerdict::tooManyCalls);
+    EXPECT_EQ(replies, "");
+}
+
+TEST(ImportConversation, WaitsForTheRestOfAMessage) {
+    const Kit::ImportLimits limits;
+    ImportConversation conversation(nullptr, limits);
+    const std::string message =
+        encodeActivity(L"the import") + encode(ImportOutcome{ImportVerdict::notTaken, {}});
+    std::string bytes, replies;
+    for (const char byte : message) {
+        EXPECT_FALSE(conversation.isOver());
+        bytes += byte;
+        conversation.receive(bytes, replies);
+    }
+    EXPECT_TRUE(conversation.isOver());
+    EXPECT_EQ(conversation.activity, L"the import");
+    EXPECT_EQ(conversation.outcome().verdict, ImportVerdict::notTaken);
+}
+
+/// Counts what it receives, and checks the fraction.
+class Progress final : public QrCastImpl<Progress, QrProcessControl> {
+  public:
+    void* getContext() override { return nullptr; }
+    void message(int, const wchar_t*) override {}
+    bool isInterrupted() override { return false; }
+    bool warning(int, const wchar_t*) override { return true; }
+    bool isProgressShown() override { return true; }
+    bool progress(float fraction, const wchar_t*) override {
+        last = fraction;
+        return true;
+    }
+    bool isStatusShown() override { return false; }
+    void status(const wchar_t*) override {}
+    bool error(int, const wchar_t*) override { return false; }
+    bool isErrorShown() override { return false; }
+    void log(int, const wchar_t*) override {}
+    [[noreturn]] void abort(int, const wchar_t*) override { throw 1; }
+    std::wstring findFile(const wchar_t*, const wchar_t*, const wchar_t*) override { return {}; }
+
+    float last = -1;
+};
+
+TEST(ImportConversation, RelaysSoundFractionsOnly) {
+    const Kit::ImportLimits limits;
+    Progress progress;
+    ImportConversation conversation(&progress, limits);
+    std::string replies;
+    const auto relayed = [&](float fraction) {
+        std::string bytes =
+            encode(ControllerCall{ControllerFunction::progress, 0, fraction, L"", {}, {}});
+        conversation.receive(bytes, replies);
+        return progress.last;
+    };
+    EXPECT_EQ(relayed(0.25f), 0.25f);
+    EXPECT_EQ(relayed(7), 1);
+    EXPECT_EQ(relayed(-1), 0);
+    EXPECT_EQ(relayed(std::numeric_limits<float>::quiet_NaN()), 0);
+    FrameReader frames(replies);
+    int count = 0;
+    for (; frames.next(); ++count)
+        continue;
+    EXPECT_EQ(count, 4);
+}
+
+} // namespace
