@@ -1,0 +1,124 @@
+// SPDX-License-Identifier: BSL-1.0
+// Reads what the child process of a guarded import sends, which an importer may have written, and
+// loads the object in it.
+//
+// Input: the size of the pieces in which the rest arrives. If it is odd, the rest is what arrives.
+// If it is even, the rest is a sequence of messages, each a kind, a size of two bytes and a
+// payload, and arrives in frames with the right checksums, which mutations would not find.
+#include "components/componentManager/componentImp.h"
+#include "components/componentTools/guarding/importConversation.h"
+#include "components/componentTools/guarding/storedObject.h"
+#include "components/componentTools/probing/frames.h"
+#include "fuzz/fuzz.h"
+#include "tests/guarding/components/parcel.h"
+
+#include <algorithm>
+
+namespace {
+
+using namespace Mz;
+using namespace Mz::Tools;
+
+/// Accepts every call, and checks what it receives.
+class CheckingController final : public QrCastImpl<CheckingController, QrProcessControl> {
+  public:
+    void* getContext() override { return nullptr; }
+    void message(int, const wchar_t* text) override { count(text); }
+    bool isInterrupted() override { return false; }
+    bool warning(int, const wchar_t* text) override { return count(text); }
+    bool isProgressShown() override { return true; }
+    bool progress(float fraction, const wchar_t* text) override {
+        Fuzz::expect(fraction >= 0 && fraction <= 1, "a fraction is between 0 and 1");
+        return count(text);
+    }
+    bool isStatusShown() override { return true; }
+    void status(const wchar_t* text) override { count(text); }
+    bool error(int, const wchar_t* text) override { return count(text); }
+    bool isErrorShown() override { return true; }
+    void log(int, const wchar_t* text) override { count(text); }
+    [[noreturn]] void abort(int, const wchar_t* text) override {
+        count(text);
+        throw Aborted();
+    }
+    std::wstring findFile(const wchar_t* name, const wchar_t*, const wchar_t*) override {
+        count(name);
+        return name;
+    }
+
+    struct Aborted {};
+    std::uint64_t calls = 0;
+
+  private:
+    bool count(const wchar_t* text) {
+        Fuzz::expect(text != nullptr, "a text is not null");
+        return ++calls > 0;
+    }
+};
+
+/// Breaks the circles of parcels; otherwise they leak.
+void unlink(const QrPtr<Test::Parcel>& parcel) {
+    if (!parcel)
+        return;
+    const QrPtr<Test::Parcel> first = std::exchange(parcel->first, {});
+    const QrPtr<Test::Parcel> second = std::exchange(parcel->second, {});
+    unlink(first);
+    unlink(second);
+}
+
+/// Returns the bytes that arrive.
+std::string arriving(Fuzz::Input& input, bool framed) {
+    if (!framed)
+        return std::string(input.rest());
+    std::string bytes;
+    for (std::string_view kind; !(kind = input.take(1)).empty();) {
+        std::size_t size = input.byte() << 8;
+        size += input.byte();
+        bytes += frameOf(static_cast<unsigned char>(kind[0]), input.take(size));
+    }
+    return bytes;
+}
+
+void converse(Fuzz::Input& input, const Kit::ImportLimits& limits, ImportConversation& conversation,
+              CheckingController& controller) {
+    const unsigned int first = input.byte();
+    const std::string bytes = arriving(input, first % 2 == 0);
+    const std::size_t piece = 1 + first * 16;
+    std::string pending, replies;
+    for (std::size_t at = 0; !conversation.isOver() && at < bytes.size(); at += piece) {
+        pending += bytes.substr(at, piece);
+        conversation.receive(pending, replies);
+    }
+    Fuzz::expect(conversation.object.size() <= limits.answer, "the object is within its limit");
+    Fuzz::expect(controller.calls <= limits.calls, "the calls are within their limit");
+    FrameReader frames(replies);
+    while (const std::optional<Frame> frame = frames.next())
+        Fuzz::expect(decodeReply(frame->payload).has_value(), "a reply can be read");
+    Fuzz::expect(frames.remaining() == 0, "a reply is whole");
+}
+
+} // namespace
+
+int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
+    QrGetComponentManager()->initialize(MZ_BUILD_PATH L"/components/hostile");
+    Kit::ImportLimits limits;
+    limits.answer = 4096;
+    limits.objects = 100;
+    limits.calls = 10;
+    limits.classes = {Test::parcelUid};
+    CheckingController controller;
+    ImportConversation conversation(&controller, limits);
+    Fuzz::Input input(data, size);
+    try {
+        converse(input, limits, conversation, controller);
+    } catch (const CheckingController::Aborted&) {
+        return 0;
+    }
+    if (!conversation.isOver() || conversation.outcome().verdict != Kit::ImportVerdict::imported)
+        return 0;
+    QrRef<QrCastable> object;
+    const ImportOutcome restored = restoreObject(conversation.object, limits, object);
+    Fuzz::expect(static_cast<bool>(object) == (restored.verdict == Kit::ImportVerdict::imported),
+                 "there is an object if it was accepted");
+    unlink(queryCast<Test::Parcel>(object.get()));
+    return 0;
+}
