@@ -311,6 +311,35 @@ TEST_F(Command, EndsWithOneWhenAComponentExits) {
     EXPECT_EQ(run({"types", "--path", path()}).exitCode, 0);
 }
 
+TEST_F(Command, ImportsInChildProcesses) {
+    // The component manager records the folder in lower case.
+    const std::filesystem::path components = work.path() / "Plug-Ins" / "Of The Host";
+    std::filesystem::create_directories(components);
+    for (const wchar_t* component : {L"notes", L"exitsInImport"}) {
+        const std::filesystem::path file = builtComponent(component);
+        std::filesystem::copy_file(file, components / file.filename());
+    }
+    std::ofstream(work.path() / "one.note", std::ios::binary) << "N1";
+    std::ofstream(work.path() / "two.exit", std::ios::binary) << "E";
+    const ProgramResult lines = run({"import", "one.note", "two.exit", "--guarded", "--path",
+                                     "Plug-Ins/Of The Host", "--save", "saved"});
+    EXPECT_EQ(lines.exitCode, 1);
+    EXPECT_THAT(lines.output, StartsWith("one.note: imported through \"Notes\""));
+    EXPECT_FALSE(std::filesystem::exists(work.path() / "saved"));
+    const ProgramResult json = run({"import", "one.note", "two.exit", "--guarded", "--path",
+                                    "Plug-Ins/Of The Host", "--json"});
+    const auto files = Json::parse(json.output).at("files");
+    EXPECT_EQ(files.at(0).at("verdict"), "imported");
+    EXPECT_EQ(files.at(1).at("verdict"), "exited");
+    EXPECT_THAT(files.at(1).at("object").get<std::string>(),
+                HasSubstr("the import by \"Exits\" ended its process with status 0"));
+    EXPECT_EQ(run({"import", "one.note", "--guarded", "--path", "Plug-Ins/Of The Host", "--save",
+                   "saved"})
+                  .exitCode,
+              0);
+    EXPECT_TRUE(std::filesystem::exists(work.path() / "saved"));
+}
+
 TEST_F(Command, UsesTheOthersBesideALibraryThatNeedsItsHost) {
     add(L"notes");
     add(L"takesFromHost");

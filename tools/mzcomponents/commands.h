@@ -48,6 +48,7 @@ struct ProbeArguments {
 struct ImportArguments {
     std::vector<std::string> files;
     std::string save;
+    bool guarded = false; ///< import in child processes
 };
 
 struct GraphArguments {

@@ -14,6 +14,7 @@
 #include "components/componentManager/nativeText.h"
 #include "components/componentTools/discovery.h"
 #include "components/componentTools/graph.h"
+#include "components/componentTools/guardedImport.h"
 #include "components/objectIO/objectIO.h"
 
 #include <algorithm>
@@ -70,8 +71,10 @@ std::vector<std::wstring> familiesFor(const Host& host, const std::filesystem::p
 
 struct Imported {
     QrRef<QrCastable> object;
-    std::wstring family; ///< the name of the builders that imported it
+    std::wstring
+        family; ///< the name of the builders that imported it; of a guarded import, the label
     std::wstring reason; ///< why there is no object
+    std::string verdict; ///< of a guarded import; else empty
 };
 
 /// Tries the families in order until one succeeds. If none does, the reason is the first exception.
@@ -110,6 +113,22 @@ Imported importFile(const Host& host, const std::filesystem::path& file) {
     return imported;
 }
 
+/// Imports the file in a child process. The limits are those of a probe.
+Imported importGuarded(const std::filesystem::path& file, const ProbeArguments& probe) {
+    Kit::ImportLimits limits;
+    limits.time = probe.options().timeLimit;
+    limits.memory = probe.options().memoryLimit;
+    const Kit::GuardedImport guarded = Kit::importGuarded(file, limits);
+    Imported imported;
+    imported.object = guarded.object;
+    imported.verdict = nameOf(guarded.verdict);
+    if (guarded)
+        imported.family = guarded.detail;
+    else
+        imported.reason = guarded.reason();
+    return imported;
+}
+
 std::wstring describe(const QrCastable* object) {
     try {
         const auto persistant = queryCast<QrPersistant>(const_cast<QrCastable*>(object));
@@ -124,10 +143,15 @@ std::wstring describe(const QrCastable* object) {
 
 Json jsonOf(const std::filesystem::path& file, const Imported& imported) {
     const bool good = static_cast<bool>(imported.object);
-    return {{"file", utf8(Tools::displayName(file))},
-            {"imported", good},
-            {"builderName", good ? utf8(imported.family) : ""},
-            {"object", utf8(good ? describe(imported.object.get()) : imported.reason)}};
+    Json result{{"file", utf8(Tools::displayName(file))},
+                {"imported", good},
+                {"builderName", good ? utf8(imported.family) : ""},
+                {"object", utf8(good ? describe(imported.object.get()) : imported.reason)}};
+    if (!imported.verdict.empty()) {
+        result["verdict"] = imported.verdict;
+        result["builderLabel"] = std::exchange(result["builderName"], "");
+    }
+    return result;
 }
 
 /// Writes a failure to standard error. Writes a success to standard output, if `success` is set.
@@ -242,7 +266,8 @@ int importFiles(const Common& common, const ImportArguments& arguments,
     Json files = Json::array();
     for (const std::string& argument : arguments.files) {
         const std::filesystem::path file = Tools::pathOf(argument);
-        const Imported imported = importFile(host, file);
+        const Imported imported =
+            arguments.guarded ? importGuarded(file, probe) : importFile(host, file);
         host.console().clearLine();
         if (imported.object)
             objects.push_back(imported.object);

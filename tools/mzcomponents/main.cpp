@@ -180,6 +180,10 @@ void addUseCommands(CLI::App& app, Arguments& arguments) {
                      "Store the imported objects in this file, if all of them can be stored")
         ->type_name("FILE")
         ->check(namesAFile);
+    importer->add_flag("--guarded", arguments.import.guarded,
+                       "Import in child processes, with the limits of time and memory below: a "
+                       "component that crashes or hangs does no harm. Only objects that can be "
+                       "stored come back");
     addCache(importer, arguments, updatedCache);
     addLimits(importer, arguments);
     importer->callback([&] {

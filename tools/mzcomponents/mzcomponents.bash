@@ -37,7 +37,7 @@ _mzcomponents() {
   explain) options="$common $limits --load" ;;
   scan) options="$common $limits --retry" ;;
   profile) options="$common $limits --runs --svg" ;;
-  import) options="$common $limits --save" ;;
+  import) options="$common $limits --save --guarded" ;;
   graph) options="$common $limits --output --svg" ;;
   check)
     options="--path --sample --fail-on --suppress --seed --fuzz --reproduce --in-process"
