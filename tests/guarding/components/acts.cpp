@@ -32,6 +32,18 @@ namespace {
 
 // ---- Frames, as an attacker would write them -------------------------------------------------
 
+/// Returns all parts, one after the other.
+template <class... Parts>
+std::string joined(const Parts&... parts) {
+    std::string bytes;
+    (bytes.append(parts), ...);
+    return bytes;
+}
+
+std::string byte(int value) {
+    return std::string(1, static_cast<char>(value));
+}
+
 std::string word(std::uint32_t value) {
     std::string bytes;
     for (int shift = 24; shift >= 0; shift -= 8)
@@ -43,26 +55,26 @@ std::string frame(int kind, const std::string& payload) {
     std::uint32_t sum = 2166136261u;
     for (const char byte : payload)
         sum = (sum ^ static_cast<unsigned char>(byte)) * 16777619u;
-    return "MZPR" + std::string(1, static_cast<char>(kind)) +
-           word(static_cast<std::uint32_t>(payload.size())) + payload + word(sum);
+    return joined("MZPR", byte(kind), word(static_cast<std::uint32_t>(payload.size())), payload,
+                  word(sum));
 }
 
 constexpr int stageKind = 131, callKind = 132, objectKind = 133, outcomeKind = 134;
 
 std::string outcome(int verdict) {
-    return frame(outcomeKind, std::string(1, static_cast<char>(verdict)) + word(0));
+    return frame(outcomeKind, joined(byte(verdict), word(0)));
 }
 
 /// A call of the process controller without texts.
 std::string call(int function) {
-    return frame(callKind, std::string(1, static_cast<char>(function)) + word(0) + word(0) +
-                               word(0) + std::string(2, '\0'));
+    return frame(callKind, joined(byte(function), word(0), word(0), word(0), byte(0), byte(0)));
 }
 
 /// The stored form of a parcel of the class `uidOfTestFamily` that refers to itself twice.
 std::string storedCircle(std::uint32_t number) {
-    const std::string uid = word(number) + word(0x3C5A11EF) + word(0x8D1B2C00) + word(0x6F40A9D7);
-    return word(1) + uid + word(1) + word(0) + word(1) + word(1) + word(0x454F424Bu);
+    const std::string uid =
+        joined(word(number), word(0x3C5A11EF), word(0x8D1B2C00), word(0x6F40A9D7));
+    return joined(word(1), uid, word(1), word(0), word(1), word(1), word(0x454F424Bu));
 }
 
 // ---- Acts ------------------------------------------------------------------------------------
@@ -156,7 +168,7 @@ Acts actsThatLie() {
     return {
         {"garbage", [] { lie("no frame at all"); }},
         {"garbageForever", [] { writeForever(std::string(4096, 'x')); }},
-        {"halfFrame", [] { lie(frame(stageKind, word(0)).substr(0, 9) + "xx"); }},
+        {"halfFrame", [] { lie(joined(frame(stageKind, word(0)).substr(0, 9), "xx")); }},
         {"wrongSum",
          [] {
              std::string bytes = frame(stageKind, word(0));
@@ -167,21 +179,22 @@ Acts actsThatLie() {
         {"taskKind", [] { lie(frame(128, "")); }},
         {"longPayload", [] { lie(frame(stageKind, std::string(std::size_t{2} << 20, 'x'))); }},
         {"hugeLength",
-         [] { lie("MZPR\x83\xFF\xFF\xFF\xFF" + std::string(std::size_t{2} << 20, 'x')); }},
-        {"longText", [] { lie(frame(stageKind, word(0x40000000) + word(65))); }},
-        {"nulInText", [] { lie(frame(stageKind, word(1) + word(0))); }},
+         [] { lie(joined("MZPR\x83\xFF\xFF\xFF\xFF", std::string(std::size_t{2} << 20, 'x'))); }},
+        {"longText", [] { lie(frame(stageKind, joined(word(0x40000000), word(65)))); }},
+        {"nulInText", [] { lie(frame(stageKind, joined(word(1), word(0)))); }},
         {"wrongFlag", [] { lie(frame(130, "\2\2\2")); }},
         {"unknownFunction", [] { lie(call(99)); }},
         {"verdictOfTheHost", [] { lie(outcome(14)); }},
         {"unknownVerdict", [] { lie(outcome(200)); }},
         {"importedNothing", [] { lie(outcome(0)); }},
-        {"importedGarbage", [] { lie(frame(objectKind, "garbage, no object") + outcome(0)); }},
+        {"importedGarbage",
+         [] { lie(joined(frame(objectKind, "garbage, no object"), outcome(0))); }},
         {"importedUnknownClass",
-         [] { lie(frame(objectKind, storedCircle(0x49999)) + outcome(0)); }},
+         [] { lie(joined(frame(objectKind, storedCircle(0x49999)), outcome(0))); }},
         {"importedMore",
-         [] { lie(frame(objectKind, storedCircle(0x40001) + "more") + outcome(0)); }},
+         [] { lie(joined(frame(objectKind, joined(storedCircle(0x40001), "more")), outcome(0))); }},
         {"importedForged",
-         [] { lie(frame(objectKind, storedCircle(0x40001)) + outcome(0) + "ignored"); }},
+         [] { lie(joined(frame(objectKind, storedCircle(0x40001)), outcome(0), "ignored")); }},
         {"hugeAnswer", [] { writeForever(frame(objectKind, std::string(60000, 'x'))); }},
         {"callsWithoutReading",
          [] {
