@@ -32,7 +32,7 @@
 #include <cstdint>
 #include <type_traits>
 
-/// Exports the fingerprint of `interface`: `MZ_INTERFACE(interface, operations...)`.
+/// Defines the fingerprint of `interface`: `MZ_INTERFACE(interface, operations...)`.
 ///
 /// Use it beside the interface: in the same header, in the same namespace, after the class. Name
 /// the class without its namespace. List the public virtual functions that it declares itself, at

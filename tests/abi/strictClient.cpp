@@ -9,6 +9,7 @@
 #include "components/componentManager/processControl.h"
 #include "components/componentManager/textStream.h"
 #include "components/componentTools/explain.h"
+#include "components/componentTools/fingerprints.h"
 #include "components/componentTools/scan.h"
 #include "components/objectIO/objectIO.h"
 
@@ -23,6 +24,19 @@ class Gauge : public QrCastable {
 
     virtual int value() const = 0;
 };
+
+class Listed : public Gauge {
+  public:
+    using Self = Listed;
+    static constexpr QrUid uid{0x5C0A77E2, 0x2F1B11EF, 0x9D3A6C20, 0x81F0B365};
+
+    virtual QrRef<Listed> next() const noexcept = 0;
+    virtual void set(int number) = 0;
+    virtual void set(double number) = 0;
+};
+MZ_INTERFACE(Gauge, value)
+MZ_INTERFACE(Listed, next, MZ_OPERATION(set, void(int)), MZ_OPERATION(set, void(double)),
+             MZ_BASE(Gauge))
 
 class Static final : public QrCastImpl<Static, Gauge> {
   public:
