@@ -114,19 +114,21 @@ bool denyByArguments(scmp_filter_ctx filter) {
     const auto deny = SCMP_ACT_ERRNO(EPERM);
     const auto self = static_cast<scmp_datum_t>(::getpid());
     bool good = true;
-    const auto add = [&](int call, scmp_arg_cmp condition) {
+    // Not the macros of the library, which are no standard C++.
+    const auto add = [&](int call, const scmp_arg_cmp& condition) {
         good = ::seccomp_rule_add(filter, deny, call, 1, condition) == 0 && good;
     };
-    for (const scmp_datum_t flag : {O_WRONLY, O_RDWR, O_CREAT, O_TRUNC}) {
-        add(SCMP_SYS(open), SCMP_A1(SCMP_CMP_MASKED_EQ, flag, flag));
-        add(SCMP_SYS(openat), SCMP_A2(SCMP_CMP_MASKED_EQ, flag, flag));
+    for (const int number : {O_WRONLY, O_RDWR, O_CREAT, O_TRUNC}) {
+        const auto flag = static_cast<scmp_datum_t>(number);
+        add(SCMP_SYS(open), {1, SCMP_CMP_MASKED_EQ, flag, flag});
+        add(SCMP_SYS(openat), {2, SCMP_CMP_MASKED_EQ, flag, flag});
     }
     for (const int call :
          {SCMP_SYS(kill), SCMP_SYS(tgkill), SCMP_SYS(rt_sigqueueinfo), SCMP_SYS(rt_tgsigqueueinfo)})
-        add(call, SCMP_A0(SCMP_CMP_NE, self));
-    add(SCMP_SYS(prlimit64), SCMP_A0(SCMP_CMP_NE, 0));
+        add(call, {0, SCMP_CMP_NE, self, 0});
+    add(SCMP_SYS(prlimit64), {0, SCMP_CMP_NE, 0, 0});
     // A thread is a new process with this flag.
-    add(SCMP_SYS(clone), SCMP_A0(SCMP_CMP_MASKED_EQ, CLONE_THREAD, 0));
+    add(SCMP_SYS(clone), {0, SCMP_CMP_MASKED_EQ, CLONE_THREAD, 0});
     // Without them the C library uses the older calls, whose arguments can be read.
     for (const int call : {SCMP_SYS(clone3), SCMP_SYS(openat2)})
         good = ::seccomp_rule_add(filter, SCMP_ACT_ERRNO(ENOSYS), call, 0) == 0 && good;
