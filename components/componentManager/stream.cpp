@@ -1,11 +1,12 @@
 // SPDX-License-Identifier: BSL-1.0
 /// The text half of `QrStream`: every number goes through `formattedWrite` and `formattedRead`,
 /// which derived classes may override. A separator is written late, before the next value, so that
-/// data does not end in one. Numbers in the stream's own formats skip the general formatter, and
-/// their digits go straight to the standard buffer where the caller cannot tell the difference.
+/// data does not end in one. Numbers in the stream's own formats skip the general formatter. Where
+/// no caller can tell the difference, their digits are made in the buffer of the standard stream,
+/// also if an IO between the stream and that buffer passes numbers on (numberRelay.h).
 #include "components/componentManager/stream.h"
 
-#include "components/componentManager/buffers/directBuffer.h"
+#include "components/componentManager/buffers/byteSink.h"
 #include "components/componentManager/text/characterCount.h"
 #include "components/componentManager/text/formatText.h"
 #include "components/componentManager/text/numberText.h"
@@ -16,7 +17,6 @@
 #include <cstdarg>
 #include <cstddef>
 #include <cstdint>
-#include <iosfwd>
 #include <limits>
 
 namespace Mz {
@@ -117,13 +117,41 @@ int QrStream::formattedWrite(const wchar_t* format, ...) {
     std::va_list arguments;
     va_start(arguments, format);
     const EndOfArguments end(arguments);
-    char number[1 + longestNumberText]; // The first place is for a separator.
-    char* numberEnd = number + 1;
+    const ByteSink sink(io());
+    constexpr int longest = 1 + static_cast<int>(longestNumberText); // With a separator.
+    char* const place = sink.room(longest);
+    if (!place) [[unlikely]]
+        return writeElsewhere(format, arguments);
+    // Made in its place: a copy of bytes that were just written has to wait for them.
+    char* const digits = place + (separatorPending ? 1 : 0);
+    char* numberEnd = digits;
     const NumberText kind = formatNumber(numberEnd, format, arguments);
-    if (kind == NumberText::DoesNotFit)
-        throw QrStreamEx::ExWriteError(source, __LINE__);
-    if (kind == NumberText::Written)
-        return writeNumber(number, numberEnd);
+    if (kind != NumberText::Written) [[unlikely]]
+        return kind == NumberText::None ? writeOther(format, arguments) : rejectNumber();
+    if (separatorPending)
+        *place = takeSeparator();
+    sink.advance(numberEnd - place);
+    const int length = static_cast<int>(numberEnd - digits);
+    column = addCharacters(column, length);
+    return length;
+}
+
+int QrStream::rejectNumber() {
+    throw QrStreamEx::ExWriteError(source, __LINE__);
+}
+
+/// Writes a number, or other text, that is not made in its place.
+int QrStream::writeElsewhere(const wchar_t* format, std::va_list& arguments) {
+    char number[1 + longestNumberText]; // The first place is for a separator.
+    char* end = number + 1;
+    const NumberText kind = formatNumber(end, format, arguments);
+    if (kind != NumberText::Written)
+        return kind == NumberText::None ? writeOther(format, arguments) : rejectNumber();
+    return writeNumber(number, end);
+}
+
+/// Writes text in a format that is not one of single numbers.
+int QrStream::writeOther(const wchar_t* format, std::va_list& arguments) {
     std::wstring text;
     if (!formatText(text, format, arguments) ||
         text.size() > static_cast<std::size_t>(std::numeric_limits<int>::max()))
@@ -142,23 +170,26 @@ int QrStream::writeText(const wchar_t* text, int length) {
 int QrStream::writeNumber(char* begin, const char* end) {
     const char* const digits = begin + 1;
     const int length = static_cast<int>(end - digits);
-    std::ostream* const out = StandardStreams::outputUnder(io());
-    std::streambuf* const buffer = out ? directBuffer(*out) : nullptr;
-    if (!buffer) {
+    const ByteSink sink(io());
+    if (!sink.isFree()) {
         wchar_t text[longestNumberText];
         return writeText(text, static_cast<int>(std::copy(digits, end, text) - text));
     }
-    if (!separatorPending) {
+    if (separatorPending)
+        *begin = takeSeparator();
+    else
         ++begin;
-    } else {
-        const bool ends = column > longestLine;
-        *begin = ends ? '\n' : ' ';
-        column = ends ? 0 : column + 1;
-        separatorPending = false;
-    }
-    writeDirectly(*out, *buffer, begin, static_cast<int>(end - begin));
+    sink.write(begin, static_cast<int>(end - begin));
     column = addCharacters(column, length);
     return length;
+}
+
+/// Returns the separator that is due, which it no longer is.
+char QrStream::takeSeparator() {
+    const bool ends = column > longestLine;
+    column = ends ? 0 : column + 1;
+    separatorPending = false;
+    return ends ? '\n' : ' ';
 }
 
 int QrStream::formattedRead(const wchar_t* format, ...) {
