@@ -7,6 +7,7 @@
 #include "components/componentManager/stream.h"
 
 #include "components/componentManager/buffers/byteSink.h"
+#include "components/componentManager/buffers/numberPath.h"
 #include "components/componentManager/text/characterCount.h"
 #include "components/componentManager/text/formatText.h"
 #include "components/componentManager/text/numberText.h"
@@ -170,15 +171,22 @@ int QrStream::writeText(const wchar_t* text, int length) {
 int QrStream::writeNumber(char* begin, const char* end) {
     const char* const digits = begin + 1;
     const int length = static_cast<int>(end - digits);
-    const ByteSink sink(io());
+    // The words for infinities and NaNs are text for an IO that passes numbers on.
+    const bool isFinite = end[-1] >= '0' && end[-1] <= '9';
+    const NumberPath path(io());
+    const bool mayPass = currentText == TextKind::Value && isFinite;
+    const ByteSink sink(mayPass ? path.output() : io());
     if (!sink.isFree()) {
         wchar_t text[longestNumberText];
         return writeText(text, static_cast<int>(std::copy(digits, end, text) - text));
     }
-    if (separatorPending)
+    const bool hasSeparator = separatorPending;
+    if (hasSeparator)
         *begin = takeSeparator();
     else
         ++begin;
+    if (mayPass)
+        path.noteNumber(hasSeparator ? *begin : '\0');
     sink.write(begin, static_cast<int>(end - begin));
     column = addCharacters(column, length);
     return length;

@@ -8,6 +8,7 @@
 
 #include "components/componentManager/bufferio.h"
 #include "components/componentManager/buffers/byteSource.h"
+#include "components/componentManager/buffers/numberPath.h"
 #include "components/componentManager/text/characterCount.h"
 #include "components/componentManager/text/numericLocale.h"
 #include "components/componentManager/text/plainBytes.h"
@@ -546,6 +547,9 @@ int scanText(QrBufferedIO& io, const wchar_t* format, std::va_list& arguments) {
             return 1;
         return Scanner(DirectInput(source), arguments).scan(format);
     }
+    if (const ByteSource source(NumberPath(io).input());
+        source.isFree() && scanNumber(source, format, arguments))
+        return 1;
     const NumericLocale bracket(io);
     return Scanner(LookaheadInput(io), arguments).scan(format);
 }
