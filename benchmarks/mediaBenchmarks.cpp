@@ -279,7 +279,7 @@ void readText(benchmark::State& state) {
 template <class T>
 void addObjects(RatioTable& table, const std::string& type) {
     table.add({"objects/" + type + "TextWrite", "text " + type + " by << through the IO of objects",
-               "the same without it", 1.5},
+               "the same without it", 2},
               writeText<T, true>, writeText<T, false>);
     table.add({"objects/" + type + "TextRead", "text " + type + " by >> through the IO of objects",
                "the same without it", 1.5},

@@ -59,6 +59,24 @@ class TextScope {
     const Kind previous;
 };
 
+/// Returns the text of a format that is not one of single numbers.
+[[gnu::noinline]] std::wstring otherText(NumberText kind, const wchar_t* format,
+                                         std::va_list& arguments) {
+    std::wstring text;
+    if (kind == NumberText::DoesNotFit || !formatText(text, format, arguments) ||
+        text.size() > static_cast<std::size_t>(std::numeric_limits<int>::max()))
+        throw QrStreamEx::ExWriteError(source, __LINE__);
+    return text;
+}
+
+/// Returns the separator that is due, which it no longer is afterwards.
+char takeSeparator(int& column, bool& pending) {
+    const bool ends = column > longestLine;
+    column = ends ? 0 : column + 1;
+    pending = false;
+    return ends ? '\n' : ' ';
+}
+
 } // namespace
 
 QrStream::QrStream(QrCastable* io)
@@ -118,46 +136,26 @@ int QrStream::formattedWrite(const wchar_t* format, ...) {
     std::va_list arguments;
     va_start(arguments, format);
     const EndOfArguments end(arguments);
+    char number[1 + longestNumberText]; // The first place is for a separator.
     const ByteSink sink(io());
-    constexpr int longest = 1 + static_cast<int>(longestNumberText); // With a separator.
-    char* const place = sink.room(longest);
-    if (!place) [[unlikely]]
-        return writeElsewhere(format, arguments);
     // Made in its place: a copy of bytes that were just written has to wait for them.
-    char* const digits = place + (separatorPending ? 1 : 0);
+    char* const place = sink.room(sizeof number);
+    char* const begin = place ? place : number;
+    char* const digits = begin + (!place || separatorPending ? 1 : 0);
     char* numberEnd = digits;
     const NumberText kind = formatNumber(numberEnd, format, arguments);
-    if (kind != NumberText::Written) [[unlikely]]
-        return kind == NumberText::None ? writeOther(format, arguments) : rejectNumber();
+    if (kind != NumberText::Written) [[unlikely]] {
+        const std::wstring text = otherText(kind, format, arguments);
+        return writeText(text.data(), static_cast<int>(text.size()));
+    }
+    if (!place) [[unlikely]]
+        return writeNumber(begin, numberEnd);
     if (separatorPending)
-        *place = takeSeparator();
+        *place = takeSeparator(column, separatorPending);
     sink.advance(numberEnd - place);
     const int length = static_cast<int>(numberEnd - digits);
     column = addCharacters(column, length);
     return length;
-}
-
-int QrStream::rejectNumber() {
-    throw QrStreamEx::ExWriteError(source, __LINE__);
-}
-
-/// Writes a number, or other text, that is not made in its place.
-int QrStream::writeElsewhere(const wchar_t* format, std::va_list& arguments) {
-    char number[1 + longestNumberText]; // The first place is for a separator.
-    char* end = number + 1;
-    const NumberText kind = formatNumber(end, format, arguments);
-    if (kind != NumberText::Written)
-        return kind == NumberText::None ? writeOther(format, arguments) : rejectNumber();
-    return writeNumber(number, end);
-}
-
-/// Writes text in a format that is not one of single numbers.
-int QrStream::writeOther(const wchar_t* format, std::va_list& arguments) {
-    std::wstring text;
-    if (!formatText(text, format, arguments) ||
-        text.size() > static_cast<std::size_t>(std::numeric_limits<int>::max()))
-        throw QrStreamEx::ExWriteError(source, __LINE__);
-    return writeText(text.data(), static_cast<int>(text.size()));
 }
 
 int QrStream::writeText(const wchar_t* text, int length) {
@@ -182,7 +180,7 @@ int QrStream::writeNumber(char* begin, const char* end) {
     }
     const bool hasSeparator = separatorPending;
     if (hasSeparator)
-        *begin = takeSeparator();
+        *begin = takeSeparator(column, separatorPending);
     else
         ++begin;
     if (mayPass)
@@ -190,14 +188,6 @@ int QrStream::writeNumber(char* begin, const char* end) {
     sink.write(begin, static_cast<int>(end - begin));
     column = addCharacters(column, length);
     return length;
-}
-
-/// Returns the separator that is due, which it no longer is.
-char QrStream::takeSeparator() {
-    const bool ends = column > longestLine;
-    column = ends ? 0 : column + 1;
-    separatorPending = false;
-    return ends ? '\n' : ' ';
 }
 
 int QrStream::formattedRead(const wchar_t* format, ...) {

@@ -6,7 +6,6 @@
 #include "components/componentManager/export.h"
 #include "components/componentManager/persistant.h"
 
-#include <cstdarg>
 #include <string>
 #include <type_traits>
 
@@ -256,10 +255,6 @@ class MZ_COMPONENT_MANAGER_API QrStream {
     void writeBinary(const T& values, int count);
     template <class T>
     int readBinary(T& values, int count);
-    [[noreturn]] static int rejectNumber();
-    int writeElsewhere(const wchar_t* format, std::va_list& arguments);
-    int writeOther(const wchar_t* format, std::va_list& arguments);
-    char takeSeparator();
     int writeText(const wchar_t* text, int length);
     /// Writes the digits from `begin + 1` to `end`. Puts the separator, if one is due, at `begin`.
     int writeNumber(char* begin, const char* end);

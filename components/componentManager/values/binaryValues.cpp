@@ -13,6 +13,8 @@
 #include <cstdint>
 #include <cstring>
 #include <limits>
+#include <memory>
+#include <new>
 #include <string>
 #include <string_view>
 #include <type_traits>
@@ -27,7 +29,7 @@ constexpr const char* source = "components/componentManager/stream";
 constexpr int blockSize = 1024;
 
 /// The same for a free sink or source. A file's buffer passes such a block on by one system call.
-constexpr int largeBlockSize = 16 * 1024;
+constexpr int largeBlockSize = 64 * 1024;
 
 /// The largest number of values that are written or read in place in one step, so that the size of
 /// a step fits an `int`.
@@ -177,14 +179,12 @@ int pack(const T* values, int count, char* to) {
     }
 }
 
-/// Packs the values in blocks of `Size` bytes and passes each block to `write`.
-template <int Size, class T, class Write>
-void writeBlocks(const T* values, int count, Write write) {
+/// Packs the values in blocks of at most `size` bytes at `block`, and passes each to `write`.
+template <class T, class Write>
+void writeBlocks(const T* values, int count, char* block, int size, Write write) {
     constexpr int width = sizeof(WireType<T>);
-    constexpr int perBlock = Size / width;
-    char block[Size];
     for (int done = 0; done < count;) {
-        const int wanted = std::min(perBlock, count - done);
+        const int wanted = std::min(size / width, count - done);
         const int ready = pack(values + done, wanted, block);
         if (ready > 0)
             write(block, ready * width);
@@ -210,28 +210,39 @@ int writeInPlace(const ByteSink& sink, const T* values, int count) {
     return ready;
 }
 
-/// Not inlined, so that a single value needs no stack for a block.
+/// Writes an array to a free sink: in place, while the buffer has room and prefers it, then in
+/// large blocks. A large block is not on the stack, which may be small. Without memory for it, the
+/// blocks are those of an IO.
 template <class T>
-[[gnu::noinline]] void writeValues(QrBufferedIO& io, const T* values, int count) {
-    const ByteSink sink(io);
-    if (!sink.isFree()) {
-        writeBlocks<blockSize>(values, count,
-                               [&](const char* block, int size) { io.write(block, size); });
-        return;
-    }
-    // Each block that finds no room makes the buffer of a string grow, so the next finds some.
-    constexpr int perBlock = largeBlockSize / static_cast<int>(sizeof(WireType<T>));
+void writeFree(const ByteSink& sink, const T* values, int count) {
+    constexpr int width = sizeof(WireType<T>);
+    char small[blockSize];
+    std::unique_ptr<char[]> large;
     for (int done = 0; done < count;) {
         const int placed =
             sink.prefersPlace() ? writeInPlace(sink, values + done, count - done) : 0;
         done += placed;
         if (placed > 0)
             continue;
-        const int wanted = std::min(perBlock, count - done);
-        writeBlocks<largeBlockSize>(values + done, wanted,
-                                    [&](const char* block, int size) { sink.write(block, size); });
+        const int left = count - done;
+        if (!large && left > blockSize / width)
+            large.reset(new (std::nothrow) char[largeBlockSize]);
+        const int size = large ? largeBlockSize : blockSize;
+        const int wanted = std::min(size / width, left);
+        writeBlocks(values + done, wanted, large ? large.get() : small, size,
+                    [&](const char* block, int bytes) { sink.write(block, bytes); });
         done += wanted;
     }
+}
+
+/// Not inlined, so that a single value needs no stack for a block.
+template <class T>
+[[gnu::noinline]] void writeValues(QrBufferedIO& io, const T* values, int count) {
+    if (const ByteSink sink(io); sink.isFree())
+        return writeFree(sink, values, count);
+    char block[blockSize];
+    writeBlocks(values, count, block, blockSize,
+                [&](const char* bytes, int size) { io.write(bytes, size); });
 }
 
 /// Writes values of one byte without a copy.
