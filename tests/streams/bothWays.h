@@ -5,6 +5,7 @@
 
 #include "tests/streams/support.h"
 
+#include <array>
 #include <fstream>
 #include <ios>
 #include <stdexcept>
@@ -25,10 +26,11 @@ inline void choose(std::ios& stream, Way way) {
 }
 
 /// A foreign medium that records each call of its virtual functions. From the call `failsAt` on, it
-/// fails or throws.
+/// fails or throws. It may have areas of a few bytes, which the standard functions use.
 class RecordingBuffer final : public std::streambuf {
   public:
-    explicit RecordingBuffer(std::string content = {}) : bytes(std::move(content)) {}
+    explicit RecordingBuffer(std::string content = {}, bool hasAreas = false)
+        : bytes(std::move(content)), areas(hasAreas) {}
 
     std::string bytes;
     std::vector<std::string> calls;
@@ -36,11 +38,20 @@ class RecordingBuffer final : public std::streambuf {
     bool throws = false;
     std::ios* flushed = nullptr; ///< is set to `unitbuf` by the next write
 
+    /// Moves the put area to `bytes`.
+    void empty() {
+        bytes.append(pbase(), static_cast<std::size_t>(pptr() - pbase()));
+        setp(nullptr, nullptr);
+    }
+
   protected:
     int_type overflow(int_type c) override {
         if (!begin("overflow"))
             return traits_type::eof();
+        empty();
         bytes += traits_type::to_char_type(c);
+        if (areas)
+            setp(output.data(), output.data() + output.size());
         return traits_type::not_eof(c);
     }
     std::streamsize xsputn(const char* data, std::streamsize size) override {
@@ -48,20 +59,38 @@ class RecordingBuffer final : public std::streambuf {
             return 0;
         if (flushed)
             flushed->setf(std::ios::unitbuf);
+        empty();
         bytes.append(data, static_cast<std::size_t>(size));
+        if (areas)
+            setp(output.data(), output.data() + output.size());
         return size;
     }
     std::streamsize xsgetn(char* data, std::streamsize size) override {
         if (!begin("xsgetn " + std::to_string(size)))
             return 0;
+        at -= static_cast<std::size_t>(egptr() - gptr());
+        setg(nullptr, nullptr, nullptr);
         const std::size_t got = bytes.copy(data, static_cast<std::size_t>(size), at);
         at += got;
         return static_cast<std::streamsize>(got);
     }
-    int_type underflow() override { return take("underflow", 0); }
-    int_type uflow() override { return take("uflow", 1); }
+    int_type underflow() override {
+        if (!areas)
+            return take("underflow", 0);
+        if (!begin("underflow") || at >= bytes.size())
+            return traits_type::eof();
+        const std::size_t got = bytes.copy(input.data(), input.size(), at);
+        at += got;
+        setg(input.data(), input.data(), input.data() + got);
+        return traits_type::to_int_type(input[0]);
+    }
+    int_type uflow() override { return areas ? std::streambuf::uflow() : take("uflow", 1); }
     int_type pbackfail(int_type c) override {
-        if (!begin("pbackfail") || at == 0)
+        if (!begin("pbackfail"))
+            return traits_type::eof();
+        at -= static_cast<std::size_t>(egptr() - gptr());
+        setg(nullptr, nullptr, nullptr);
+        if (at == 0)
             return traits_type::eof();
         bytes[--at] = traits_type::to_char_type(c);
         return c;
@@ -88,7 +117,10 @@ class RecordingBuffer final : public std::streambuf {
         return c;
     }
 
-    std::size_t at = 0;
+    const bool areas;
+    std::array<char, 50> output{};
+    std::array<char, 50> input{};
+    std::size_t at = 0; ///< the position after the get area
 };
 
 /// Returns what happened as text: the exception of `work`, if any, then the state of the stream. If
