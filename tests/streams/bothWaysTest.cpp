@@ -106,7 +106,7 @@ TYPED_TEST_SUITE(WrittenBothWays, Streams);
 TYPED_TEST(WrittenBothWays, ToMemoryIsEqual) {
     for (const Writer& writer : writers())
         for (const std::ios::iostate mask : {std::ios::goodbit, everyFlag})
-            for (const std::size_t before : {0, 1, 50, 5000, 500'000}) {
+            for (const std::size_t before : {0U, 1U, 50U, 5000U, 500'000U}) {
                 std::string told[2];
                 for (const Way way : {Way::Short, Way::Whole}) {
                     // The output overwrites what was there before, and no more.
@@ -162,7 +162,7 @@ TYPED_TEST(WrittenBothWays, ToAForeignMediumMakesTheSameCalls) {
     for (const Writer& writer : writers())
         for (const bool hasAreas : {false, true})
             for (const bool throwing : {false, true})
-                for (const std::size_t failsAt : {0, 1, 2, 3, 4, 7, 20, 21, 1'000'000}) {
+                for (const std::size_t failsAt : {0U, 1U, 2U, 3U, 4U, 7U, 20U, 21U, 1'000'000U}) {
                     const auto happens = [&](Way way) {
                         RecordingBuffer medium({}, hasAreas);
                         medium.failsAt = failsAt;
@@ -379,7 +379,7 @@ TYPED_TEST(ReadBothWays, FromAForeignMediumMakesTheSameCalls) {
     for (const std::string& content : contents())
         for (const Reader& reader : readers())
             for (const bool hasAreas : {false, true})
-                for (const std::size_t failsAt : {0, 1, 2, 3, 5, 8, 13, 1'000'000}) {
+                for (const std::size_t failsAt : {0U, 1U, 2U, 3U, 5U, 8U, 13U, 1'000'000U}) {
                     const auto happens = [&](Way way) {
                         RecordingBuffer medium(content, hasAreas);
                         medium.failsAt = failsAt;

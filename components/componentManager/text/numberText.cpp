@@ -95,7 +95,7 @@ char* writeSpecial(char* text, double value) {
     return writeText(text, std::isnan(value) ? "nan" : std::isinf(value) ? "inf" : "0");
 }
 
-/// Writes the text of `%.*g` by the standard library, which may write zeros after the number first.
+/// Writes the text of `%.*g` by the standard library, which may change the bytes after the number.
 char* writeRounded(char* text, double value, int digits) {
     if (!std::isfinite(value))
         return writeSpecial(text, value);
