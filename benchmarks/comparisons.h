@@ -11,6 +11,7 @@ void addCreateComparisons(RatioTable& table);
 void addStartComparisons(RatioTable& table);
 void addControllerComparisons(RatioTable& table);
 void addStreamComparisons(RatioTable& table);
+void addMediaComparisons(RatioTable& table);
 void addToolsComparisons(RatioTable& table);
 
 } // namespace Mz::Benchmarks

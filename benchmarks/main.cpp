@@ -91,6 +91,7 @@ int run(int argc, char** argv) {
     addStartComparisons(table);
     addControllerComparisons(table);
     addStreamComparisons(table);
+    addMediaComparisons(table);
     addToolsComparisons(table);
 
     stayOnOneCore();

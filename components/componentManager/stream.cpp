@@ -1,11 +1,13 @@
 // SPDX-License-Identifier: BSL-1.0
 /// The text half of `QrStream`: every number goes through `formattedWrite` and `formattedRead`,
 /// which derived classes may override. A separator is written late, before the next value, so that
-/// data does not end in one. Numbers in the stream's own formats skip the general formatter, and
-/// their digits go straight to the standard buffer where the caller cannot tell the difference.
+/// data does not end in one. Numbers in the stream's own formats skip the general formatter. Where
+/// no caller can tell the difference, their digits are made in the buffer of the standard stream,
+/// also if an IO between the stream and that buffer passes numbers on (numberRelay.h).
 #include "components/componentManager/stream.h"
 
-#include "components/componentManager/buffers/directBuffer.h"
+#include "components/componentManager/buffers/byteSink.h"
+#include "components/componentManager/buffers/numberPath.h"
 #include "components/componentManager/text/characterCount.h"
 #include "components/componentManager/text/formatText.h"
 #include "components/componentManager/text/numberText.h"
@@ -16,7 +18,6 @@
 #include <cstdarg>
 #include <cstddef>
 #include <cstdint>
-#include <iosfwd>
 #include <limits>
 
 namespace Mz {
@@ -57,6 +58,24 @@ class TextScope {
     Kind& current;
     const Kind previous;
 };
+
+/// Returns the text of a format that is not one of single numbers.
+[[gnu::noinline]] std::wstring otherText(NumberText kind, const wchar_t* format,
+                                         std::va_list& arguments) {
+    std::wstring text;
+    if (kind == NumberText::DoesNotFit || !formatText(text, format, arguments) ||
+        text.size() > static_cast<std::size_t>(std::numeric_limits<int>::max()))
+        throw QrStreamEx::ExWriteError(source, __LINE__);
+    return text;
+}
+
+/// Returns the separator that is due, which it no longer is afterwards.
+char takeSeparator(int& column, bool& pending) {
+    const bool ends = column > longestLine;
+    column = ends ? 0 : column + 1;
+    pending = false;
+    return ends ? '\n' : ' ';
+}
 
 } // namespace
 
@@ -118,17 +137,25 @@ int QrStream::formattedWrite(const wchar_t* format, ...) {
     va_start(arguments, format);
     const EndOfArguments end(arguments);
     char number[1 + longestNumberText]; // The first place is for a separator.
-    char* numberEnd = number + 1;
+    const ByteSink sink(io());
+    // Made in its place: a copy of bytes that were just written has to wait for them.
+    char* const place = sink.room(sizeof number);
+    char* const begin = place ? place : number;
+    char* const digits = begin + (!place || separatorPending ? 1 : 0);
+    char* numberEnd = digits;
     const NumberText kind = formatNumber(numberEnd, format, arguments);
-    if (kind == NumberText::DoesNotFit)
-        throw QrStreamEx::ExWriteError(source, __LINE__);
-    if (kind == NumberText::Written)
-        return writeNumber(number, numberEnd);
-    std::wstring text;
-    if (!formatText(text, format, arguments) ||
-        text.size() > static_cast<std::size_t>(std::numeric_limits<int>::max()))
-        throw QrStreamEx::ExWriteError(source, __LINE__);
-    return writeText(text.data(), static_cast<int>(text.size()));
+    if (kind != NumberText::Written) [[unlikely]] {
+        const std::wstring text = otherText(kind, format, arguments);
+        return writeText(text.data(), static_cast<int>(text.size()));
+    }
+    if (!place) [[unlikely]]
+        return writeNumber(begin, numberEnd);
+    if (separatorPending)
+        *place = takeSeparator(column, separatorPending);
+    sink.advance(numberEnd - place);
+    const int length = static_cast<int>(numberEnd - digits);
+    column = addCharacters(column, length);
+    return length;
 }
 
 int QrStream::writeText(const wchar_t* text, int length) {
@@ -142,21 +169,23 @@ int QrStream::writeText(const wchar_t* text, int length) {
 int QrStream::writeNumber(char* begin, const char* end) {
     const char* const digits = begin + 1;
     const int length = static_cast<int>(end - digits);
-    std::ostream* const out = StandardStreams::outputUnder(io());
-    std::streambuf* const buffer = out ? directBuffer(*out) : nullptr;
-    if (!buffer) {
+    // The words for infinities and NaNs are text for an IO that passes numbers on.
+    const bool isFinite = end[-1] >= '0' && end[-1] <= '9';
+    const NumberPath path(io());
+    const bool mayPass = currentText == TextKind::Value && isFinite;
+    const ByteSink sink(mayPass ? path.output() : io());
+    if (!sink.isFree()) {
         wchar_t text[longestNumberText];
         return writeText(text, static_cast<int>(std::copy(digits, end, text) - text));
     }
-    if (!separatorPending) {
+    const bool hasSeparator = separatorPending;
+    if (hasSeparator)
+        *begin = takeSeparator(column, separatorPending);
+    else
         ++begin;
-    } else {
-        const bool ends = column > longestLine;
-        *begin = ends ? '\n' : ' ';
-        column = ends ? 0 : column + 1;
-        separatorPending = false;
-    }
-    writeDirectly(*out, *buffer, begin, static_cast<int>(end - begin));
+    if (mayPass)
+        path.noteNumber(hasSeparator ? *begin : '\0');
+    sink.write(begin, static_cast<int>(end - begin));
     column = addCharacters(column, length);
     return length;
 }

@@ -54,6 +54,9 @@
 
 namespace Mz {
 
+struct ObjectInputRelay;
+struct ObjectOutputRelay;
+
 /// The largest depth to which objects may be nested in one another. More throws, to prevent an
 /// overflow of the stack. Write a long chain as a list of its elements.
 ///
@@ -154,6 +157,8 @@ class MZ_OBJECT_IO_API QrObjectOutBuffer
     void writeSpace() override;
 
   private:
+    friend struct ObjectOutputRelay;
+
     void writeRecord(QrStream& s, std::uint32_t number, QrPersistant* object);
 
     struct State;
@@ -210,6 +215,8 @@ class MZ_OBJECT_IO_API QrObjectInBuffer
     using QrForwardingIO::read;
 
   private:
+    friend struct ObjectInputRelay;
+
     QrRef<QrCastable> readRecord(QrStream& s, int64 position);
     QrRef<QrCastable> readNewObject(QrStream& s, std::uint32_t number, int64 position);
 

@@ -5,6 +5,7 @@
 /// each level with the position of that level's object, and stops all later reads: after it the
 /// position in the data is unknown.
 #include "components/componentManager/componentImp.h"
+#include "components/componentManager/numberRelay.h"
 #include "components/objectIO/objectIO.h"
 #include "components/objectIO/objectRecord.h"
 #include "components/objectIO/objectTable.h"
@@ -15,6 +16,7 @@
 #include <memory>
 #include <string>
 #include <string_view>
+#include <typeinfo>
 
 namespace Mz {
 
@@ -219,5 +221,21 @@ int QrObjectInBuffer::read(void* data, int size) {
     }
     return inner().read(data, size);
 }
+
+/// What `readChar` does for each character of a number.
+struct ObjectInputRelay {
+    static QrBufferedIO* input(QrBufferedIO& io) {
+        auto& objects = static_cast<QrObjectInBuffer&>(io);
+        QrObjectInBuffer::State& state = *objects.state;
+        state.readText = state.textKind() != QrStream::TextKind::Other;
+        return &objects.inner();
+    }
+};
+
+namespace {
+
+const QrNumberRelay relay(typeid(QrObjectInBuffer), {nullptr, nullptr, ObjectInputRelay::input});
+
+} // namespace
 
 } // namespace Mz

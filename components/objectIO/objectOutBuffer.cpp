@@ -3,6 +3,7 @@
 /// that an object inside it can refer back to it. Nested objects pass through `writeObject` again;
 /// each level restores the stream and form of the level around it. Checks that reject an object run
 /// before any of it is written; a failure after that stops all later writes.
+#include "components/componentManager/numberRelay.h"
 #include "components/objectIO/objectIO.h"
 #include "components/objectIO/objectRecord.h"
 #include "components/objectIO/objectTable.h"
@@ -15,6 +16,7 @@
 #include <memory>
 #include <string>
 #include <string_view>
+#include <typeinfo>
 #include <unordered_map>
 #include <utility>
 
@@ -142,5 +144,32 @@ void QrObjectOutBuffer::writeSpace() {
     inner().writeSpace();
     state->text.noteSpace();
 }
+
+/// What `writeSpace`, `writeEol` and `writeChar` do for a finite number that needs no blank before
+/// it: they record it, and pass it on.
+struct ObjectOutputRelay {
+    static QrBufferedIO* output(QrBufferedIO& io) {
+        auto& objects = static_cast<QrObjectOutBuffer&>(io);
+        const QrObjectOutBuffer::State& state = *objects.state;
+        const bool passes = !state.stream || (state.textKind() == QrStream::TextKind::Value &&
+                                              state.text.continuesWithValue());
+        return passes ? &objects.inner() : nullptr;
+    }
+
+    static void noteNumber(QrBufferedIO& io, char separator) {
+        QrObjectOutBuffer::State& state = *static_cast<QrObjectOutBuffer&>(io).state;
+        if (state.stream || separator == ' ')
+            state.text.noteValue();
+        else if (separator == '\n')
+            state.text.noteLineEnd();
+    }
+};
+
+namespace {
+
+const QrNumberRelay relay(typeid(QrObjectOutBuffer),
+                          {ObjectOutputRelay::output, ObjectOutputRelay::noteNumber, nullptr});
+
+} // namespace
 
 } // namespace Mz

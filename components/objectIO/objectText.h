@@ -44,6 +44,10 @@ class ObjectTextOutput {
     /// Writes the separator that text of this kind needs before it, and records how the text ends.
     /// Throws `QrStreamEx::ExWriteError` if a reader could not find the beginning of the text.
     void begin(QrBufferedIO& io, QrStream::TextKind kind, ObjectForm form, std::wstring_view text);
+    /// Returns whether `begin` would write nothing before a value, and only record it.
+    bool continuesWithValue() const { return last != Last::Formatted; }
+    /// Records that a value was written.
+    void noteValue() { last = Last::Value; }
     /// Writes the line end that binary data needs before it. Throws `QrStreamEx::ExWriteError` if a
     /// reader could not find the beginning of the data.
     void beginData(QrBufferedIO& io, ObjectForm form);

@@ -9,6 +9,8 @@
 #include <array>
 #include <bit>
 #include <cmath>
+#include <cstdint>
+#include <cstdio>
 #include <cstring>
 #include <filesystem>
 #include <fstream>
@@ -420,6 +422,69 @@ TEST(ShortCuts, GiveADoubleAtAnEdgeTheDigitsOfTheWholeWay) {
           123456789012345.6, 0.0001, 0.00001, 1e22, 1e23, std::numeric_limits<double>::infinity(),
           -std::numeric_limits<double>::infinity(), std::numeric_limits<double>::quiet_NaN()})
         EXPECT_EQ(shortCut(value), wholeWay(value));
+}
+
+/// Reads a `double` by both ways and expects the same bits. The width prevents the short cut.
+void expectSameDouble(const std::string& text) {
+    const auto bits = [&](const wchar_t* format) {
+        Reading<BaseStream> in(text + " ");
+        double value = -1;
+        EXPECT_EQ(in.stream.formattedRead(format, &value), 1) << text;
+        return std::bit_cast<std::uint64_t>(value);
+    };
+    EXPECT_EQ(bits(L"%lg"), bits(L"%340lg")) << text;
+}
+
+TEST(ShortCuts, ReadADoubleAsTheWholeWayDoes) {
+    std::mt19937_64 engine(17);
+    char text[64];
+    for (int round = 0; round < MZ_RANDOM_VALUES / 4 && !HasFailure(); ++round) {
+        const auto any = std::bit_cast<double>(engine());
+        if (std::isfinite(any)) {
+            std::snprintf(text, sizeof text, "%.*g", static_cast<int>(1 + engine() % 18), any);
+            expectSameDouble(text);
+        }
+        // Digits and a point anywhere.
+        std::string digits = std::to_string(engine() >> (engine() % 64));
+        digits.insert(engine() % (digits.size() + 1), ".");
+        expectSameDouble(digits);
+        expectSameDouble(digits + "e" + std::to_string(static_cast<int>(engine() % 660) - 340));
+    }
+}
+
+TEST(ShortCuts, ReadADoubleHalfwayBetweenTwoAsTheWholeWayDoes) {
+    for (std::uint64_t number = (std::uint64_t{1} << 53) - 50;
+         number < (std::uint64_t{1} << 53) + 200; ++number)
+        for (const char* const end : {"", ".0", ".5", "e1", "0", "00", "e-1", "e22", "e-22", "e23"})
+            expectSameDouble(std::to_string(number) + end);
+    for (const char* const text : {"0",
+                                   "-0",
+                                   "0.0",
+                                   "0e5",
+                                   "1e22",
+                                   "1e23",
+                                   "8.5e-324",
+                                   "4.9e-324",
+                                   "2.4e-324",
+                                   "2.2250738585072011e-308",
+                                   "2.2250738585072014e-308",
+                                   "1.7976931348623157e308",
+                                   "1.7976931348623158e308",
+                                   "1.7976931348623159e308",
+                                   "1e308",
+                                   "1e309",
+                                   "1e-307",
+                                   "1e-323",
+                                   "9007199254740993",
+                                   "9007199254740992.5",
+                                   "999999999999999999",
+                                   "1e330",
+                                   "1e-330",
+                                   "1e331",
+                                   "1e-331",
+                                   "123456789012345678e-340",
+                                   "123456789012345678e291"})
+        expectSameDouble(text);
 }
 
 } // namespace

@@ -198,7 +198,9 @@ int show(const Common& common, const std::string& argument, const ProbeArguments
         showList(common, reading.libraries);
         return exitSuccess;
     }
+    std::vector<char> memory(64 * 1024); // Few system calls; the default on Windows has 512 bytes.
     std::ifstream input;
+    input.rdbuf()->pubsetbuf(memory.data(), static_cast<std::streamsize>(memory.size()));
     const std::wstring wrong = obstacle(file, input, reading.reason);
     if (wrong.empty())
         return showObjects(common, file, input, reading.reason, probe);

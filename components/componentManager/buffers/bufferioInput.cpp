@@ -1,11 +1,10 @@
 // SPDX-License-Identifier: BSL-1.0
 /// The input buffer fetches single bytes, converts them, and puts back those that it did not need,
 /// so that the position is exact after each operation. It keeps no data: all state is the stream's.
-/// Where the stream's guard has no effect, the bytes come straight from the standard buffer
-/// (directBuffer.h).
+/// Each byte comes from a `ByteSource`, which omits the guard of the stream where it has no effect.
 #include "components/componentManager/bufferio.h"
 
-#include "components/componentManager/buffers/directBuffer.h"
+#include "components/componentManager/buffers/byteSource.h"
 #include "components/componentManager/text/plainBytes.h"
 
 #include <algorithm>
@@ -13,6 +12,7 @@
 #include <cwctype>
 #include <istream>
 #include <string>
+#include <string_view>
 
 namespace Mz {
 
@@ -23,7 +23,7 @@ constexpr const char* source = "components/componentManager/bufferio";
 /// A sequence of this many bytes that is not a character is an error.
 constexpr int maximumPendingBytes = 4;
 
-constexpr int endOfInput = -1;
+constexpr int endOfInput = ByteSource::endOfInput;
 
 [[noreturn]] void throwWrite(int line) {
     throw QrStreamEx::ExWrite(source, line);
@@ -34,38 +34,14 @@ void throwIfBad(const std::istream& in, int line) {
         throw QrStreamEx::ExReadError(source, line);
 }
 
-constexpr int endOfBuffer = std::streambuf::traits_type::eof();
-
-/// Returns the next byte, 0 to 255, or -1 if there is none, and clears the end of input. The caller
-/// checks for a medium that failed, after it has stored its bytes.
+/// Returns the next byte, 0 to 255, or -1 if there is none. Looks at the stream anew for each byte:
+/// a foreign buffer may change its state.
 int fetch(std::istream& in) {
-    int byte = endOfInput;
-    if (std::streambuf* const buffer = directBuffer(in)) {
-        directly(in, [&] {
-            byte = buffer->sbumpc();
-            return true;
-        });
-        return byte == endOfBuffer ? endOfInput : byte;
-    }
-    operate(in, [&] { byte = in.get(); });
-    if (in.good())
-        return byte;
-    clearEndOfInput(in);
-    return endOfInput;
-}
-
-/// Runs an operation that clears the end of input before it begins.
-template <class Work>
-void operateFromEnd(std::istream& in, Work&& work) {
-    ignoringExceptions([&] { in.clear(in.rdstate() & ~std::ios::eofbit); });
-    operate(in, work);
+    return ByteSource(in).get();
 }
 
 void putBack(std::istream& in, char byte) {
-    if (std::streambuf* const buffer = directBuffer(in))
-        directly(in, [&] { return buffer->sputbackc(byte) != endOfBuffer; });
-    else
-        operateFromEnd(in, [&] { in.putback(byte); });
+    ByteSource(in).putBack(byte);
 }
 
 /// Puts back the bytes from `begin` to `end`, last first, so that they are read again in order.
@@ -74,19 +50,22 @@ void putBack(std::istream& in, const char* begin, const char* end) {
         putBack(in, *--end);
 }
 
-/// Reads up to `wanted` characters of one byte each. A NUL is delivered but never consumed, so it
-/// fills the rest.
-int readPlainCharacters(std::istream& in, std::streambuf& buffer, wchar_t* characters, int wanted) {
-    for (int stored = 0; stored < wanted; ++stored) {
-        const int byte = peekDirectly(in, buffer);
-        if (byte < 0)
+/// Reads up to `wanted` characters of one byte each, from what the buffer holds. A NUL is delivered
+/// but never consumed, so it fills the rest.
+int readPlainCharacters(const ByteSource& source, wchar_t* characters, int wanted) {
+    for (int stored = 0; stored < wanted;) {
+        if (source.peek() < 0)
             return stored;
-        if (byte == 0) {
+        const std::string_view held =
+            source.held().substr(0, static_cast<std::size_t>(wanted - stored));
+        const std::string_view taken = held.substr(0, held.find('\0'));
+        for (const char byte : taken)
+            characters[stored++] = static_cast<wchar_t>(static_cast<unsigned char>(byte));
+        source.take(static_cast<std::ptrdiff_t>(taken.size()));
+        if (taken.size() < held.size()) {
             std::fill(characters + stored, characters + wanted, L'\0');
-            break;
+            return wanted;
         }
-        characters[stored] = static_cast<wchar_t>(byte);
-        buffer.sbumpc();
     }
     return wanted;
 }
@@ -110,12 +89,7 @@ int QrInBuffer::read(void* data, int size) {
         throwIfBad(*in, __LINE__);
         return 0;
     }
-    auto* const bytes = static_cast<char*>(data);
-    if (std::streambuf* const buffer = directBuffer(*in))
-        return readDirectly(*in, *buffer, bytes, size);
-    operate(*in, [&] { in->read(bytes, size); });
-    throwIfBad(*in, __LINE__);
-    return static_cast<int>(in->gcount());
+    return ByteSource(*in).read(static_cast<char*>(data), size);
 }
 
 int QrInBuffer::read() {
@@ -173,8 +147,9 @@ int QrInBuffer::readChar(wchar_t* buf, int size, int count) {
     if (wanted < 1)
         return 0;
     const platform::CharacterConverter converter = bufferedConverter();
-    if (std::streambuf* const buffer = converter.plainBytes() ? directBuffer(*in) : nullptr)
-        return readPlainCharacters(*in, *buffer, buf, wanted);
+    if (converter.plainBytes())
+        if (const ByteSource bytes(*in); bytes.isFree())
+            return readPlainCharacters(bytes, buf, wanted);
     char pending[maximumPendingBytes];
     int pendingBytes = 0;
     int stored = 0;
@@ -250,7 +225,9 @@ int64 QrInBuffer::seek(int64 offset, int origin) {
     if (origin < 0 || origin > 2)
         throw QrStreamEx::ExReadError(source, __LINE__);
     constexpr std::ios::seekdir directions[] = {std::ios::beg, std::ios::cur, std::ios::end};
-    operateFromEnd(*in, [&] { in->seekg(offset, directions[origin]); });
+    // A seek clears the end of input before it begins.
+    ignoringExceptions([&] { in->clear(in->rdstate() & ~std::ios::eofbit); });
+    operate(*in, [&] { in->seekg(offset, directions[origin]); });
     const int64 position = tell();
     if (position == -1)
         throw QrStreamEx::ExReadError(source, __LINE__);

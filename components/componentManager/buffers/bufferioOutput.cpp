@@ -1,10 +1,11 @@
 // SPDX-License-Identifier: BSL-1.0
 /// The output buffer converts wide characters one by one and writes the bytes of each; it keeps no
-/// data. Where byte and character code are equal, it writes text in blocks. Where the stream's
-/// guard has no effect, the bytes go straight to the standard buffer (directBuffer.h).
+/// data. Where byte and character code are equal and nothing foreign can observe the pieces, it
+/// writes text in blocks. All bytes go to a `ByteSink`, which omits the guard of the stream where
+/// it has no effect.
 #include "components/componentManager/bufferio.h"
 
-#include "components/componentManager/buffers/directBuffer.h"
+#include "components/componentManager/buffers/byteSink.h"
 #include "components/componentManager/text/plainBytes.h"
 
 #include <algorithm>
@@ -30,20 +31,12 @@ void throwIfBad(const std::ostream& out, int line) {
 }
 
 void put(std::ostream& out, char byte) {
-    if (std::streambuf* const buffer = directBuffer(out))
-        directly(out, [&] { return buffer->sputc(byte) != std::streambuf::traits_type::eof(); });
-    else
-        operate(out, [&] { out.put(byte); });
+    ByteSink(out).put(byte);
 }
 
 void put(std::ostream& out, const void* data, int size) {
-    const auto* bytes = static_cast<const char*>(data);
-    if (size < 1)
-        return;
-    if (std::streambuf* const buffer = directBuffer(out))
-        directly(out, [&] { return buffer->sputn(bytes, size) == size; });
-    else
-        operate(out, [&] { out.write(bytes, size); });
+    if (size > 0)
+        ByteSink(out).put(static_cast<const char*>(data), size);
 }
 
 void putCharacter(std::ostream& out, const platform::CharacterConverter& converter, wchar_t c) {
@@ -126,7 +119,7 @@ void QrOutBuffer::writeSpace() {
 
 int QrOutBuffer::writeChar(const wchar_t* s, int count) {
     const platform::CharacterConverter converter = bufferedConverter();
-    if (converter.plainBytes() && directBuffer(*out))
+    if (converter.plainBytes() && ByteSink(*out).isFree())
         putPlainCharacters(*out, s, count);
     else
         for (int index = 0; index < count; ++index)

@@ -1,19 +1,22 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Formats single numbers into a small buffer. The 16 digits of a `double` take most of the time:
-/// the standard library finds the fewest digits that read back much faster than any fixed number of
-/// them. So these are used where they provably are, or round to, the digits of `%.16g`. The other
-/// values take the standard library's rounding.
+/// Formats single numbers, two digits at a time. The 16 digits of a `double` come from one product
+/// of its mantissa and a power of ten of 128 bits, whose error is known. Where the error could
+/// change a digit, and for the other formats of floating-point numbers, the standard library
+/// rounds.
 #include "components/componentManager/text/numberText.h"
 
+#include "components/componentManager/text/powersOfTen.h"
 #include "components/componentManager/uid.h"
 
 #include <algorithm>
 #include <array>
+#include <bit>
 #include <charconv>
 #include <cmath>
 #include <cstdint>
 #include <cstring>
-#include <limits>
+#include <optional>
+#include <type_traits>
 
 namespace Mz {
 
@@ -27,9 +30,62 @@ char* writeText(char* text, const char* other) {
     return text + length;
 }
 
+/// "00", "01" and so on to "99".
+constexpr auto digitPairs = [] {
+    std::array<char, 200> table{};
+    for (std::size_t pair = 0; pair < 100; ++pair) {
+        table[2 * pair] = static_cast<char>('0' + pair / 10);
+        table[2 * pair + 1] = static_cast<char>('0' + pair % 10);
+    }
+    return table;
+}();
+
+void writePair(char* text, std::uint64_t number) {
+    std::memcpy(text, &digitPairs[static_cast<std::size_t>(2 * number)], 2);
+}
+
+/// Returns the number of digits of `value`.
+template <class Unsigned>
+int digitCount(Unsigned value) {
+    constexpr auto limits = [] {
+        std::array<Unsigned, 20> table{}; // The first is 0, so that a zero has one digit.
+        Unsigned power = 10;
+        for (std::size_t index = 1; index < table.size(); ++index) {
+            table[index] = power;
+            const bool isLast = power > static_cast<Unsigned>(-1) / 10;
+            power = isLast ? static_cast<Unsigned>(-1) : static_cast<Unsigned>(power * 10);
+        }
+        return table;
+    }();
+    // The number of bits times log10(2), which is at most one too small.
+    const int estimate = static_cast<int>(std::bit_width(value | 1)) * 1233 >> 12;
+    return estimate + (value >= limits[static_cast<std::size_t>(estimate)] ? 1 : 0);
+}
+
+/// Writes a number and no byte after it.
+template <class Unsigned>
+char* writeUnsigned(char* text, Unsigned value) {
+    char* const end = text + digitCount(value);
+    char* at = end;
+    for (; value >= 100; value /= 100)
+        writePair(at -= 2, value % 100);
+    if (value >= 10)
+        writePair(at - 2, value);
+    else
+        at[-1] = static_cast<char>('0' + value);
+    return end;
+}
+
 template <class Integer>
 char* writeInteger(char* text, Integer value) {
-    return std::to_chars(text, text + longestNumberText, value).ptr;
+    using Unsigned = std::make_unsigned_t<Integer>;
+    auto magnitude = static_cast<Unsigned>(value);
+    if constexpr (std::is_signed_v<Integer>)
+        if (value < 0) {
+            *text++ = '-';
+            magnitude = 0 - magnitude;
+        }
+    return writeUnsigned(text, magnitude);
 }
 
 /// Writes a zero, an infinity or a NaN.
@@ -39,119 +95,79 @@ char* writeSpecial(char* text, double value) {
     return writeText(text, std::isnan(value) ? "nan" : std::isinf(value) ? "inf" : "0");
 }
 
-/// Writes the text of `%.*g` by the standard library.
+/// Writes the text of `%.*g` by the standard library, which may change the bytes after the number.
 char* writeRounded(char* text, double value, int digits) {
     if (!std::isfinite(value))
         return writeSpecial(text, value);
-    return std::to_chars(text, text + longestNumberText, value, std::chars_format::general, digits)
-        .ptr;
+    char number[longestNumberText];
+    const char* const end =
+        std::to_chars(number, number + sizeof number, value, std::chars_format::general, digits)
+            .ptr;
+    const auto length = static_cast<std::size_t>(end - number);
+    std::memcpy(text, number, length);
+    return text + length;
 }
 
 /// A decimal number d.ddd…e±x: its digits without the point, and without trailing zeros.
 struct Decimal {
-    char digits[24];
+    char digits[digitsOfDouble];
     int count = 0;
     int exponent = 0;
 };
 
-/// Returns the fewest digits that read back as `value`, which is positive and finite.
-Decimal shortest(double value) {
-    char text[32];
-    const char* const end =
-        std::to_chars(text, text + sizeof text, value, std::chars_format::scientific).ptr;
-    const char* mark = end - 4; // "d.ddde-123", "d.ddde+12" or "de+12"
-    while (*mark != 'e')
-        --mark;
-    Decimal decimal;
-    decimal.count = static_cast<int>(std::max<std::ptrdiff_t>(mark - text - 1, 1));
-    decimal.digits[0] = text[0];
-    std::memcpy(decimal.digits + 1, text + 2, sizeof decimal.digits - 1);
-    for (const char* at = mark + 2; at != end; ++at)
-        decimal.exponent = decimal.exponent * 10 + (*at - '0');
-    if (mark[1] == '-')
-        decimal.exponent = -decimal.exponent;
-    return decimal;
+/// Returns `mantissa`, whose highest bit is set, times 2^`exponent` times 10^`power`, rounded to an
+/// integer. Returns nothing if the bits do not show to which of two it rounds.
+std::optional<std::uint64_t> scaled(std::uint64_t mantissa, int exponent, int power) {
+    const PowerOfTen& factor = powerOfTen(power);
+    const UInt128 product = multiplied(mantissa, factor);
+    const int fractionBits = 63 - exponent - factor.exponent;
+    const UInt128 fraction = product & ((UInt128{1} << fractionBits) - 1);
+    const UInt128 half = UInt128{1} << (fractionBits - 1);
+    const UInt128 distance = fraction > half ? fraction - half : half - fraction;
+    if (distance < productError)
+        return std::nullopt;
+    return static_cast<std::uint64_t>(product >> fractionBits) + (fraction > half ? 1 : 0);
 }
 
-void dropZeros(Decimal& decimal) {
+/// Writes the eight digits of `number`.
+void writeEight(char* text, std::uint32_t number) {
+    const std::uint32_t high = number / 10'000;
+    const std::uint32_t low = number % 10'000;
+    writePair(text, high / 100);
+    writePair(text + 2, high % 100);
+    writePair(text + 4, low / 100);
+    writePair(text + 6, low % 100);
+}
+
+/// Stores the digits of `%.16g` of `value`, which is positive and finite. Returns false if they are
+/// not certain.
+bool sixteenDigits(Decimal& decimal, double value) {
+    constexpr int mantissaBits = 52;
+    constexpr int bias = 1023;
+    const auto bits = std::bit_cast<std::uint64_t>(value);
+    const int biased = static_cast<int>(bits >> mantissaBits);
+    if (biased == 0)
+        return false; // A subnormal number has fewer bits.
+    const std::uint64_t mantissa = (bits << 11) | std::uint64_t{1} << 63;
+    const int exponent = biased - bias - 63;
+    // The decimal exponent, by log10(2); it is exact or one too small.
+    decimal.exponent = ((biased - bias) * 315653) >> 20;
+    constexpr std::uint64_t limit = 10'000'000'000'000'000;
+    std::optional<std::uint64_t> digits =
+        scaled(mantissa, exponent, digitsOfDouble - 1 - decimal.exponent);
+    if (digits && *digits >= limit) {
+        ++decimal.exponent;
+        digits = scaled(mantissa, exponent, digitsOfDouble - 1 - decimal.exponent);
+    }
+    if (!digits || *digits < limit / 10 || *digits >= limit)
+        return false;
+    constexpr std::uint64_t half = 100'000'000;
+    writeEight(decimal.digits, static_cast<std::uint32_t>(*digits / half));
+    writeEight(decimal.digits + 8, static_cast<std::uint32_t>(*digits % half));
+    decimal.count = digitsOfDouble;
     while (decimal.count > 1 && decimal.digits[decimal.count - 1] == '0')
         --decimal.count;
-}
-
-/// Rounds 17 digits to 16. Returns false if the last one is a 5: the number itself may be on either
-/// side of the middle.
-bool dropLastDigit(Decimal& decimal) {
-    const char last = decimal.digits[--decimal.count];
-    if (last == '5')
-        return false;
-    if (last > '5') {
-        int index = decimal.count;
-        while (index > 0 && decimal.digits[index - 1] == '9')
-            decimal.digits[--index] = '0';
-        if (index == 0) {
-            decimal.digits[0] = '1';
-            ++decimal.exponent;
-        } else {
-            ++decimal.digits[index - 1];
-        }
-    }
-    dropZeros(decimal);
     return true;
-}
-
-using Wide = long double;
-
-/// The powers of ten that a `long double` of 64 bits holds exactly.
-constexpr auto powersOfTen = [] {
-    std::array<Wide, 28> powers{1};
-    for (std::size_t index = 1; index < powers.size(); ++index)
-        powers[index] = powers[index - 1] * 10;
-    return powers;
-}();
-
-/// Whether this thread computes with all bits of the type. On Windows the precision depends on the
-/// code that started the thread.
-bool hasFullPrecision() {
-    if (std::numeric_limits<Wide>::digits < 64)
-        return false;
-    const volatile Wide one = 1;
-    const volatile Wide finest = std::numeric_limits<Wide>::epsilon();
-    return (one + finest) - one == finest;
-}
-
-/// Whether no other number of 16 digits is nearer to `value` than this one of fewer digits. False
-/// if that is not certain.
-bool isNearest(const Decimal& decimal, double value) {
-    // With full precision the distance is a thousand times finer than needed.
-    if (!hasFullPrecision())
-        return false;
-    const int scale = decimal.count - 1 - decimal.exponent;
-    if (scale < 0 || static_cast<std::size_t>(scale) >= powersOfTen.size())
-        return false;
-    std::uint64_t number = 0;
-    std::from_chars(decimal.digits, decimal.digits + decimal.count, number);
-    const Wide scaled = static_cast<Wide>(value) * powersOfTen[static_cast<std::size_t>(scale)];
-    const Wide distance = std::fabs(scaled - static_cast<Wide>(number));
-    // The distance in units of the 16th digit: below half a unit, this number is the nearest. Below
-    // a power of ten the units are smaller.
-    const int missing = digitsOfDouble - decimal.count + (number == 1 ? 1 : 0);
-    return distance * powersOfTen[static_cast<std::size_t>(missing)] < Wide(0.49);
-}
-
-/// Stores the digits of `%.16g` if they follow from the fewest that read back, else returns false.
-bool sixteenDigits(Decimal& decimal, double value) {
-    decimal = shortest(value);
-    if (decimal.count < digitsOfDouble)
-        return isNearest(decimal, value);
-    std::uint64_t bits;
-    std::memcpy(&bits, &value, sizeof bits);
-    constexpr std::uint64_t fraction = (std::uint64_t(1) << 52) - 1;
-    // Only at a power of two do the neighbours have different distances. The nearest number of 16
-    // digits may then be one that does not read back.
-    if (!(bits & fraction))
-        return false;
-    // Of several shortest numbers `std::to_chars` returns the nearest, so 16 digits are the result.
-    return decimal.count == digitsOfDouble || dropLastDigit(decimal);
 }
 
 char* writeExponent(char* text, int exponent) {

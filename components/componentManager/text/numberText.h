@@ -19,7 +19,7 @@ enum class NumberText {
 
 /// Writes the text that `formatText` returns for one of the formats `%d %u %ld %lu %I64d %I64u %.9g
 /// %.16g`, which are nearly all that streams use, to `text` and moves `text` to its end. `text`
-/// must have room for `longestNumberText` characters.
+/// must have room for `longestNumberText` characters; those after the number remain as they are.
 NumberText formatNumber(char*& text, const wchar_t* format, std::va_list& arguments);
 
 } // namespace Mz

@@ -1,18 +1,22 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Copies what the standard buffer holds into a small window, parses the number there, and moves
-/// the buffer back to its end: a few pointer moves in place of a call for each character. The
-/// parser accepts only ordinary numbers that end inside the window. Everything else is put back for
-/// the general scanner, so there is one place that decides the special cases.
+/// Parses the number in place, in the bytes that the standard buffer holds, and takes these bytes
+/// only if it stores the number. The parser accepts only ordinary numbers that end inside these
+/// bytes. Everything else is left to the general scanner, so there is one place that decides the
+/// special cases.
 #include "components/componentManager/text/scanNumber.h"
 
-#include "components/componentManager/buffers/directBuffer.h"
+#include "components/componentManager/buffers/byteSource.h"
+#include "components/componentManager/text/powersOfTen.h"
 #include "components/componentManager/uid.h"
 
 #include <algorithm>
 #include <array>
+#include <bit>
 #include <charconv>
 #include <cstddef>
 #include <cstdint>
+#include <cstring>
+#include <string_view>
 #include <system_error>
 
 namespace Mz {
@@ -53,14 +57,9 @@ bool isReal(Target target) {
     return target == Target::Float || target == Target::Double;
 }
 
-/// Returns the size of the window: white space, the longest number that streams write, and the
-/// character after it. Not more, because every unneeded character must be put back.
-int windowOf(Target target) {
-    constexpr int real = 28;
-    constexpr int longInteger = 23;
-    constexpr int integer = 14;
-    return isReal(target) ? real : target == Target::Int64 ? longInteger : integer;
-}
+/// At most this many bytes are parsed, more than white space and a number usually take: the general
+/// scanner parses a longer text again, perhaps in small portions.
+constexpr std::size_t windowSize = 64;
 
 bool isSpace(char c) {
     return c == ' ' || (c >= '\t' && c <= '\r');
@@ -68,6 +67,16 @@ bool isSpace(char c) {
 
 bool isDigit(char c) {
     return c >= '0' && c <= '9';
+}
+
+static_assert(std::endian::native == std::endian::little);
+
+/// Returns the number that eight digits form, each a byte with the value of the digit, the first
+/// one in the lowest byte. Combines neighbours: digits to pairs, pairs to fours, fours to eight.
+std::uint64_t numberOf(std::uint64_t digits) {
+    digits = (digits * 2561) >> 8 & 0x00FF00FF00FF00FF;     // 10 + 2^8
+    digits = (digits * 6553601) >> 16 & 0x0000FFFF0000FFFF; // 100 + 2^16
+    return (digits * 42949672960001) >> 32;                 // 10,000 + 2^32
 }
 
 /// A number in the window.
@@ -82,7 +91,25 @@ struct Number {
 /// Up to this many digits always fit 64 bits. A number with more is unusual.
 constexpr std::ptrdiff_t mostDigits = 18;
 
+/// Appends the digits at `at` to `value`, up to eight at a time, and returns their end.
 const char* takeDigits(const char* at, const char* end, std::uint64_t& value) {
+    constexpr std::uint32_t powers[] = {1,       10,        100,        1'000,      10'000,
+                                        100'000, 1'000'000, 10'000'000, 100'000'000};
+    constexpr int width = 8;
+    while (end - at >= width) {
+        std::uint64_t digits;
+        std::memcpy(&digits, at, width);
+        digits ^= 0x3030303030303030; // A digit has its value now, any other byte a larger one.
+        const std::uint64_t others = ((digits + 0x7676767676767676) | digits) & 0x8080808080808080;
+        const int count = std::countr_zero(others) / width;
+        if (count == 0)
+            return at;
+        // Zeros before the digits take the place of what is no digit.
+        value = value * powers[count] + numberOf(digits << (width * (width - count)));
+        at += count;
+        if (count < width)
+            return at;
+    }
     for (; at != end && isDigit(*at); ++at)
         value = value * 10 + static_cast<std::uint64_t>(*at - '0');
     return at;
@@ -131,6 +158,33 @@ bool parse(const char* at, const char* end, bool real, Number& number) {
     return at && at != end && *at > 0;
 }
 
+/// Computes the nearest `double` from one product with a power of ten. Returns false if the bits do
+/// not show to which of two `double`s the product rounds, or if the result is not a normal number.
+bool nearest(std::uint64_t digits, int power, double& value) {
+    if (digits == 0 || power < smallestPowerOfTen || power > largestPowerOfTen)
+        return false;
+    const int leadingZeros = std::countl_zero(digits);
+    const PowerOfTen& factor = powerOfTen(power);
+    const UInt128 product = multiplied(digits << leadingZeros, factor);
+    constexpr int mantissaBits = 52;
+    const int top = product >> 127 ? 127 : 126;
+    const int dropped = top - mantissaBits;
+    const UInt128 fraction = product & ((UInt128{1} << dropped) - 1);
+    const UInt128 half = UInt128{1} << (dropped - 1);
+    if ((fraction > half ? fraction - half : half - fraction) < productError)
+        return false;
+    constexpr int bias = 1023;
+    const int biased = factor.exponent - 63 - leadingZeros + top + bias;
+    if (biased < 1 || biased >= 2 * bias)
+        return false;
+    // The highest bit of the mantissa adds one to the exponent, as a carry of the rounding does.
+    const auto mantissa =
+        static_cast<std::uint64_t>(product >> dropped) + (fraction > half ? 1 : 0);
+    value =
+        std::bit_cast<double>((static_cast<std::uint64_t>(biased - 1) << mantissaBits) + mantissa);
+    return true;
+}
+
 /// Computes the value of the number. Returns false if it is too large or too small for a `double`.
 bool valueOf(const Number& number, double& value) {
     constexpr auto powers = [] {
@@ -147,7 +201,8 @@ bool valueOf(const Number& number, double& value) {
         const auto digits = static_cast<double>(number.digits);
         value = number.exponent < 0 ? digits / powers[static_cast<std::size_t>(-number.exponent)]
                                     : digits * powers[static_cast<std::size_t>(number.exponent)];
-    } else if (std::from_chars(number.begin, number.end, value).ec != std::errc()) {
+    } else if (!nearest(number.digits, number.exponent, value) &&
+               std::from_chars(number.begin, number.end, value).ec != std::errc()) {
         return false;
     }
     if (number.negative)
@@ -186,32 +241,23 @@ bool store(Target target, const Number& number, std::va_list& arguments) {
 
 } // namespace
 
-bool scanNumber(std::istream& in, std::streambuf& buffer, const wchar_t* format,
-                std::va_list& arguments) {
+bool scanNumber(const ByteSource& source, const wchar_t* format, std::va_list& arguments) {
     const Target target = targetOf(format);
     if (target == Target::None)
         return false;
-    // Characters in the buffer are read and put back by moving a pointer. A single one may be a
-    // putback character, which buffers keep elsewhere.
-    constexpr std::streamsize fewest = 2;
-    char window[32];
-    std::streamsize got = 0;
-    directly(in, [&] {
-        // Fills the buffer first: if it is empty, `in_avail` only estimates the rest of the medium.
-        if (buffer.sgetc() == std::streambuf::traits_type::eof())
-            return true;
-        const std::streamsize available = buffer.in_avail();
-        if (available >= fewest)
-            got = buffer.sgetn(window, std::min<std::streamsize>(available, windowOf(target)));
-        return true;
-    });
-    if (in.bad()) [[unlikely]]
-        throwBrokenInput();
+    std::string_view window = source.held();
+    if (window.empty()) [[unlikely]] {
+        if (source.peek() < 0)
+            return false;
+        window = source.held();
+    }
+    window = window.substr(0, windowSize);
     Number number;
     const bool scanned =
-        parse(window, window + got, isReal(target), number) && store(target, number, arguments);
-    for (const char* at = window + got; at != (scanned ? number.end : window); --at)
-        buffer.sungetc();
+        parse(window.data(), window.data() + window.size(), isReal(target), number) &&
+        store(target, number, arguments);
+    if (scanned)
+        source.take(number.end - window.data());
     return scanned;
 }
 

@@ -4,18 +4,18 @@
 #pragma once
 
 #include <cstdarg>
-#include <iosfwd>
 
 namespace Mz {
 
+class ByteSource;
+
 /// Reads a number, as `scanText` does, in one of the formats `%d %u %hd %hu %ld %lu %I64d %I64u %g
-/// %lg`. `buffer` is the buffer of `in`.
+/// %lg`. `source` must be free.
 ///
 /// \return true if the number was stored. False if the format is another one, or the number is
 ///         unusual or not complete in the buffer with an ASCII character after it. The input and
 ///         the arguments are then unchanged.
 /// \throws QrStreamEx::ExReadError if the medium fails
-bool scanNumber(std::istream& in, std::streambuf& buffer, const wchar_t* format,
-                std::va_list& arguments);
+bool scanNumber(const ByteSource& source, const wchar_t* format, std::va_list& arguments);
 
 } // namespace Mz

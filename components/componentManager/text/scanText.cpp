@@ -2,11 +2,13 @@
 /// A scanner that reads character by character and never further than one lookahead character, so
 /// that the next read continues exactly where this one stopped. The C library's scanner cannot do
 /// that on a `QrBufferedIO`, and differs between platforms and locales. The scanner is a template
-/// of its input: a standard buffer supplies bytes directly, any other IO by its virtual functions.
+/// of its input: a free `ByteSource` supplies bytes directly, any other IO by its virtual
+/// functions.
 #include "components/componentManager/text/scanText.h"
 
 #include "components/componentManager/bufferio.h"
-#include "components/componentManager/buffers/directBuffer.h"
+#include "components/componentManager/buffers/byteSource.h"
+#include "components/componentManager/buffers/numberPath.h"
 #include "components/componentManager/text/characterCount.h"
 #include "components/componentManager/text/numericLocale.h"
 #include "components/componentManager/text/plainBytes.h"
@@ -16,7 +18,6 @@
 #include <bitset>
 #include <charconv>
 #include <cstdint>
-#include <iosfwd>
 #include <limits>
 #include <memory>
 #include <system_error>
@@ -79,22 +80,22 @@ class LookaheadInput {
     int consumed = 0;
 };
 
-/// The input from a standard buffer, where bytes are characters. The lookahead stays in the buffer,
-/// so nothing needs to be put back.
+/// The input from a free source, where bytes are characters. The lookahead stays in the buffer, so
+/// nothing needs to be put back.
 class DirectInput {
   public:
-    DirectInput(std::istream& source, std::streambuf& bytes) : in(source), buffer(bytes) {}
+    explicit DirectInput(const ByteSource& bytes) : source(bytes) {}
 
     bool available() {
         if (byte == unknown)
-            byte = peekDirectly(in, buffer);
+            byte = source.peek();
         return byte >= 0;
     }
     wchar_t next() const { return static_cast<wchar_t>(byte); }
 
     /// Does not look at the next character yet: an interactive input could block.
     void consume() {
-        buffer.sbumpc();
+        source.take(1);
         byte = unknown;
         consumed = addCharacters(consumed, 1);
     }
@@ -106,8 +107,7 @@ class DirectInput {
   private:
     static constexpr int unknown = -2;
 
-    std::istream& in;
-    std::streambuf& buffer;
+    ByteSource source;
     int byte = unknown;
     int consumed = 0;
 };
@@ -542,12 +542,14 @@ class Scanner {
 int scanText(QrBufferedIO& io, const wchar_t* format, std::va_list& arguments) {
     if (!*format)
         return 0;
-    std::istream* const in = StandardStreams::inputUnder(io);
-    if (std::streambuf* const buffer = in ? directBuffer(*in) : nullptr) {
-        if (scanNumber(*in, *buffer, format, arguments))
+    if (const ByteSource source(io); source.isFree()) {
+        if (scanNumber(source, format, arguments))
             return 1;
-        return Scanner(DirectInput(*in, *buffer), arguments).scan(format);
+        return Scanner(DirectInput(source), arguments).scan(format);
     }
+    if (const ByteSource source(NumberPath(io).input());
+        source.isFree() && scanNumber(source, format, arguments))
+        return 1;
     const NumericLocale bracket(io);
     return Scanner(LookaheadInput(io), arguments).scan(format);
 }
