@@ -9,7 +9,7 @@ checks=$build/package-check
 
 need_packaging() {
   need git cmake ninja-build g++ g++-mingw-w64-x86-64-posix wine wine64 libcli11-dev \
-    nlohmann-json3-dev librang-dev debhelper dpkg-dev lintian nsis zip unzip p7zip-full debootstrap
+    nlohmann-json3-dev librang-dev libseccomp-dev debhelper dpkg-dev lintian nsis zip unzip p7zip-full debootstrap
   if [ "$(id -u)" != 0 ] && ! command -v sudo >/dev/null; then
     echo "failed: the packages are tried on a fresh system, which only root can make; run this as" \
       "root, or install sudo" >&2
