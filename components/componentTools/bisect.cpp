@@ -99,6 +99,8 @@ class Bisection {
     }
 
     std::optional<bool> startFails(const Subset& active) {
+        if (isInterrupted()) // A host may end before it is polled.
+            return std::nullopt;
         writeList(active);
         const System::ChildResult child = startHost();
         if (child.end == System::ChildResult::End::interrupted)
@@ -122,6 +124,11 @@ class Bisection {
             result.ending = start.ending;
         }
         return start.failed;
+    }
+
+    bool isInterrupted() const {
+        return (options.controller && options.controller->isInterrupted()) ||
+               (options.probe.interrupted && options.probe.interrupted());
     }
 
     bool isFailure(const System::ChildResult& child) const {
@@ -158,13 +165,10 @@ class Bisection {
 
     System::ChildResult startHost() const {
         constexpr std::chrono::milliseconds never = std::chrono::hours(24 * 365);
-        System::ChildLimits limits{
-            options.timeLimit.count() > 0 ? options.timeLimit : never,
-            std::numeric_limits<std::uint64_t>::max(), 0, std::numeric_limits<std::size_t>::max(),
-            [this] {
-                return (options.controller && options.controller->isInterrupted()) ||
-                       (options.probe.interrupted && options.probe.interrupted());
-            }};
+        System::ChildLimits limits{options.timeLimit.count() > 0 ? options.timeLimit : never,
+                                   std::numeric_limits<std::uint64_t>::max(), 0,
+                                   std::numeric_limits<std::size_t>::max(),
+                                   [this] { return isInterrupted(); }};
         limits.received = [this](std::string& output) {
             if (options.output)
                 options.output(output);

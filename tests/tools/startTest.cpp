@@ -77,7 +77,7 @@ TEST_F(Start, LeavesOutALibraryThatNeedsItsHost) {
 
 TEST_F(Start, OffersTheSafeModeAfterACrash) {
     output();
-    add(L"failsAlone", "bad.x");
+    add(L"failsByEnding", "bad.x");
     EXPECT_NE(run().exitCode, 0);
     EXPECT_EQ(marks(), 1);
     EXPECT_EQ(output({"mode=changed"}),
@@ -90,7 +90,7 @@ TEST_F(Start, OffersTheSafeModeAfterACrash) {
 
 TEST_F(Start, KnowsWhatChangedLastThoughAScanRecordedItMeanwhile) {
     output();
-    add(L"failsAlone", "bad.x");
+    add(L"failsByEnding", "bad.x");
     ScanOptions scanning;
     scanning.folders = {folder.path()};
     scanning.list = list();
