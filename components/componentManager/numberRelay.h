@@ -1,5 +1,7 @@
 // SPDX-License-Identifier: BSL-1.0
 /// Tells streams which IO passes the text of numbers on to another one unchanged.
+///
+/// \since 0.2
 #pragma once
 
 #include "components/componentManager/bufferio.h"
