@@ -31,7 +31,11 @@ function(mz_copy_runtime program)
   mz_find_runtime(runtime)
   get_target_property(libraries ${program} LINK_LIBRARIES)
   if("Mz::MZcomponentTools" IN_LIST libraries)
-    list(APPEND runtime $<TARGET_FILE_DIR:Mz::MZcomponentTools>/mzcomponents-probe.exe)
+    if(TARGET mzcomponents-probe) # in the library's own build
+      list(APPEND runtime $<TARGET_FILE:mzcomponents-probe>)
+    else()
+      list(APPEND runtime $<TARGET_FILE_DIR:Mz::MZcomponentTools>/mzcomponents-probe.exe)
+    endif()
   endif()
   add_custom_command(TARGET ${program} POST_BUILD
     COMMAND ${CMAKE_COMMAND} -E copy_if_different
