@@ -24,7 +24,7 @@ Verdicts ending() {
     // On Windows a raised signal is not a fault: the C library ends the process.
     constexpr ImportVerdict raised = MZ_RAISE_CRASHES ? crashed : exited;
     // Wine grants any request, and counts it as used.
-    constexpr ImportVerdict requested = MZ_REQUEST_FAILS ? threw : outOfMemory;
+    constexpr ImportVerdict requested = MZ_REQUESTED;
     return {
         {"crash", crashed},         {"recurse", crashed},
         {"divide", crashed},        {"trap", crashed},
@@ -89,7 +89,7 @@ Verdicts harmless() {
             {"longMessage", imported},
             {"otherController", imported},
             {"endParent", imported},
-            {"swallowBadAlloc", MZ_REQUEST_FAILS ? imported : outOfMemory}};
+            {"swallowBadAlloc", MZ_REQUESTED == threw ? imported : MZ_REQUESTED}};
 }
 
 class HostileImport : public Guarding {
