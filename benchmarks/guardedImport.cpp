@@ -2,7 +2,7 @@
 /// Measures what a guard costs: mzGuardedImport FOLDER
 ///
 /// Imports a mesh of 330 KB through the mesh components in FOLDER, plainly and guarded in turn, and
-/// prints the medians of both and their difference. A program of its own, because the component
+/// prints the medians of both and their difference. It is a separate program, because the component
 /// manager of the other benchmarks knows a thousand libraries.
 #include "components/componentTools/guardedImport.h"
 #include "components/componentKit/hostKit.h"

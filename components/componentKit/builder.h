@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Builders of a component library: what they are, and how `MZ_COMPONENT` is told of them.
+/// Builders of a component library: what they are, and how `MZ_COMPONENT` gets them.
 ///
 /// Most builders need no class of their own. `builderOf<Class>({.uid = …})` makes one that creates
 /// objects of a class. A builder that does more derives from `Builder`, or from `ImportBuilder`

@@ -52,7 +52,7 @@ class Controller : public QrCastImpl<Controller, QrProcessControl> {
     /// Shows the text.
     void message(int, const wchar_t* text) override { show(Kind::message, textOrEmpty(text)); }
 
-    /// Returns false: nobody interrupts the work.
+    /// Returns false: the work is never interrupted.
     bool isInterrupted() override { return false; }
 
     /// Shows the text. Returns true: continue.

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// The environment variable by which a host is told to use another recorded list.
+/// The environment variable that names another recorded list for a host to use.
 ///
 /// \since 0.2
 #pragma once

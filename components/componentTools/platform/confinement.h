@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// What a process can give up before it runs code that nobody trusts. The probe program alone links
+/// What a process can give up before it runs untrusted code. The probe program alone links
 /// the implementation, `confinement.cpp` in `posix/` or `windows/`.
 #pragma once
 

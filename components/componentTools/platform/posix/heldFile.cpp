@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
 /// The lock of `flock`, which the system releases when the process ends, however it does. The file
-/// gets its name after it is locked, so that nobody sees it without the lock.
+/// gets its name after it is locked, so that it is never visible without the lock.
 #include "components/componentTools/platform/system.h"
 
 #include <cerrno>
