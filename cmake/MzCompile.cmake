@@ -56,11 +56,11 @@ if(MZ_SANITIZE)
   target_link_options(mzCompile INTERFACE -fsanitize=address,undefined)
 endif()
 
-# mz_compile_together(TARGET...): compiles up to eight sources of each target at once, in builds with
-# tests. Templates of large headers are instantiated once for all of them, which more than halves the
+# mz_compile_together(TARGET...): compiles up to eight sources of each target at once, in the builds
+# of developers. Templates of large headers are instantiated once for all of them, which more than halves the
 # time. Packages are built source by source. So is the Clang build, which fails where a source lacks
 # an include or uses what another one defines.
-option(MZ_COMPILE_TOGETHER "Compile several sources at once, to save time" ${MZ_BUILD_TESTS})
+option(MZ_COMPILE_TOGETHER "Compile several sources at once, to save time" OFF)
 function(mz_compile_together)
   set_target_properties(${ARGN} PROPERTIES UNITY_BUILD ${MZ_COMPILE_TOGETHER} UNITY_BUILD_BATCH_SIZE 8)
 endfunction()
