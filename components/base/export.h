@@ -41,6 +41,7 @@
 /// The linker joins the sections whose names are equal before the '$'.
 #define MZ_INTERFACE_TABLE(name, line) __attribute__((used, section("mziface$" #name "." #line)))
 #else
+/// Exports a name from any library.
 #define MZ_EXPORT __attribute__((visibility("default")))
 #define MZ_IMPORT __attribute__((visibility("default")))
 /// Marks class templates whose instances cross library boundaries: their type information must be

@@ -40,9 +40,9 @@ enum class BuilderAnswer {
 
 /// One import builder of the family and its answer.
 struct BuilderReport {
-    QrUid uid{};        ///< identity of the builder, for a policy
-    std::wstring label; ///< label of the builder, for people
-    BuilderAnswer answer = BuilderAnswer::notAsked;
+    QrUid uid{};                                    ///< identity of the builder, for a policy
+    std::wstring label;                             ///< label of the builder, for people
+    BuilderAnswer answer = BuilderAnswer::notAsked; ///< what it did
     /// The errors that the builder reported, or the reason of its exception; empty if there are
     /// none.
     std::wstring reason;
@@ -57,7 +57,7 @@ struct CompanionReport {
 
 /// The result of an import under a policy.
 struct ImportResult {
-    ImportEnd end = ImportEnd::declined;
+    ImportEnd end = ImportEnd::declined; ///< how the import ended
 
     /// The imported object; null unless `end` is `imported`. Release it before the component
     /// manager is destroyed.

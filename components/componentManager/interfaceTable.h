@@ -52,14 +52,14 @@ enum class InterfaceEntryKind : std::uint16_t {
 };
 
 /// The properties in `InterfaceEntry::flags` of a class that is passed by value, and of a base.
-inline constexpr std::uint16_t valueIsTrivial = 1;     ///< it may be passed in registers
-inline constexpr std::uint16_t valueIsPolymorphic = 2; ///< it has virtual functions
-inline constexpr std::uint16_t baseHasVirtualDestructor = 1;
+inline constexpr std::uint16_t valueIsTrivial = 1;           ///< it may be passed in registers
+inline constexpr std::uint16_t valueIsPolymorphic = 2;       ///< it has virtual functions
+inline constexpr std::uint16_t baseHasVirtualDestructor = 1; ///< of a base
 
 /// The begin of an entry. The pointer to a virtual function of the Itanium C++ ABI is the offset of
 /// its slot in bytes, plus 1, followed by 0.
 struct InterfaceEntry {
-    InterfaceEntryKind kind;
+    InterfaceEntryKind kind; ///< what it describes
     std::uint16_t flags;     ///< of a value or base: see `valueIsTrivial`; else 0
     std::uint32_t size;      ///< of the entry and its text, in bytes: a multiple of 8
     std::uint32_t valueSize; ///< `sizeof` of a value or base; 0 if the type is incomplete

@@ -25,6 +25,7 @@ namespace Mz {
 /// declarations in a process; further ones have no effect. Thread-safe.
 class MZ_COMPONENT_MANAGER_API QrNumberRelay {
   public:
+    /// The number of declarations for which there is room.
     static constexpr int maximumCount = 16;
 
     /// What the objects of the class do with a number. Each function receives an object of the

@@ -79,7 +79,7 @@ struct BisectResult {
         notStarted, ///< the host cannot be started
         stopped,    ///< the user stopped the search; the culprits are the smallest set seen to fail
     };
-    State state = State::stopped;
+    State state = State::stopped;  ///< how the search ended
     std::vector<Culprit> culprits; ///< in the host's order
     std::size_t components = 0;    ///< the number of components that were searched
     int starts = 0;                ///< of the host
