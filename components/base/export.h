@@ -22,7 +22,7 @@
 /// \def MZ_INTERFACE_TABLE
 /// Places the constant with this name in a section for `MZ_INTERFACE`, though no code uses it. The
 /// linker discards equal constants of several sources with their sections, so each constant needs a
-/// section of its own. The line tells apart those of the same name.
+/// separate section. The line distinguishes constants of the same name.
 #ifdef _WIN32
 #define MZ_EXPORT __declspec(dllexport)
 #define MZ_IMPORT __declspec(dllimport)

@@ -137,7 +137,7 @@ class Bisection {
                                           : child.end != End::exited || child.status != 0;
     }
 
-    /// Each start has a folder of its own, so that a host finds no mark of an unclean end.
+    /// Each start has a separate folder, so that a host finds no mark of an unclean end.
     void writeList(const Subset& active) const {
         std::filesystem::create_directory(hostList().parent_path());
         RecordedLibraries libraries = result.scanned.libraries;

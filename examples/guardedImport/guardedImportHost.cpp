@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// The host: imports the files that it is given, each in a process of its own.
+/// The host: imports the files that it is given, each in a child process.
 #include "palette.h"
 
 #include "components/componentKit/hostKit.h"

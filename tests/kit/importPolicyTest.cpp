@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
 // Imports under a policy: which builders are asked, what limits an import, and what its result
-// says. A manager is initialised once, so each of these tests needs a process of its own, as ctest
+// says. A manager is initialised once, so each of these tests needs a separate process, as ctest
 // gives it one.
 #include "components/componentKit/hostKit.h"
 #include "tests/kit/importers.h"

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-// The start of a host in one call, and the safe mode. Hosts are processes of their own.
+// The start of a host in one call, and the safe mode. Hosts are separate processes.
 #include "components/componentTools/start.h"
 #include "components/componentTools/disabled.h"
 #include "tests/tools/toolsFixture.h"
