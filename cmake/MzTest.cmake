@@ -15,7 +15,7 @@ include(GoogleTest)
 # options, and the header templates that they use.
 add_library(mzTestCode INTERFACE)
 if(MZ_SANITIZE)
-  target_compile_options(mzTestCode INTERFACE -O0 -g1)
+  target_compile_options(mzTestCode INTERFACE -O0 -g1 ${MZ_FEWER_CHECKS})
 else()
   target_compile_options(mzTestCode INTERFACE
     "$<$<CONFIG:Release,RelWithDebInfo>:SHELL:-O0 -g0>")
@@ -24,7 +24,7 @@ endif()
 foreach(target gtest gtest_main gmock gmock_main)
   target_link_libraries(${target} PRIVATE mzTestCode)
   if(MZ_SANITIZE)
-    target_compile_options(${target} PRIVATE -fsanitize=address,undefined)
+    target_compile_options(${target} PRIVATE -fsanitize=address)
   endif()
 endforeach()
 
