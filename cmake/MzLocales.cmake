@@ -14,7 +14,7 @@ function(mz_make_locale name charmap)
   set(output ${PROJECT_BINARY_DIR}/locales/${name}.${charmap})
   add_custom_command(OUTPUT ${output}/LC_NUMERIC
     COMMAND ${CMAKE_COMMAND} -E make_directory ${PROJECT_BINARY_DIR}/locales
-    COMMAND ${MZ_LOCALEDEF} -i ${name} -f ${charmap} --no-archive ${output}
+    COMMAND ${MZ_LOCALEDEF} --no-warnings=ascii -i ${name} -f ${charmap} --no-archive ${output}
     COMMENT "Making the locale ${name}.${charmap}")
   set_property(GLOBAL APPEND PROPERTY mzLocales ${output}/LC_NUMERIC)
 endfunction()
@@ -22,6 +22,8 @@ endfunction()
 if(NOT WIN32)
   mz_make_locale(de_DE UTF-8)
   mz_make_locale(de_DE ISO-8859-15)
+  # Has other characters in the place of the backslash and the tilde.
+  mz_make_locale(ja_JP SHIFT_JIS)
 endif()
 get_property(mzLocales GLOBAL PROPERTY mzLocales)
 add_custom_target(mzLocales DEPENDS ${mzLocales})

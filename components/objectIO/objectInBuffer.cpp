@@ -14,6 +14,7 @@
 #include <algorithm>
 #include <cstdint>
 #include <memory>
+#include <optional>
 #include <string>
 #include <string_view>
 #include <typeinfo>
@@ -83,11 +84,23 @@ struct QrObjectInBuffer::State {
              std::string("inside the object that begins here: ") + failure.getReason());
     }
 
-    void expectMark(QrStream& s, std::uint32_t number, int64 position) {
+    /// Reads the end mark. A message about a wrong one gives `position`, or without it the place of
+    /// the mark.
+    void expectMark(QrStream& s, std::uint32_t number, const QrBufferedIO& io,
+                    std::optional<int64> position = {}) {
+        // Positions cost a call of the system, so that of a binary mark, which has a fixed size, is
+        // determined after it.
+        if (form != ObjectForm::Binary && !position)
+            position = io.tell();
         std::uint32_t mark = 0;
         s >> mark;
-        if (mark != ObjectRecord::endMark(number))
-            fail(__LINE__, position, "the object should end here and does not");
+        if (mark == ObjectRecord::endMark(number))
+            return;
+        if (!position) {
+            const int64 end = io.tell();
+            position = end < 0 ? end : end - int64{sizeof mark};
+        }
+        fail(__LINE__, *position, "the object should end here and does not");
     }
 };
 
@@ -151,7 +164,7 @@ QrRef<QrCastable> QrObjectInBuffer::readRecord(QrStream& s, int64 position) {
         return readNewObject(s, number, position);
     }
     if (state->depth == 1)
-        state->expectMark(s, number, position);
+        state->expectMark(s, number, inner(), position);
     return number == ObjectRecord::null ? nullptr : state->objects.at(number);
 }
 
@@ -181,7 +194,7 @@ QrRef<QrCastable> QrObjectInBuffer::readNewObject(QrStream& s, std::uint32_t num
     persistant->read(s);
     if (state->failed)
         state->fail(__LINE__, position, "an object inside this one failed");
-    state->expectMark(s, number, inner().tell());
+    state->expectMark(s, number, inner());
     return state->objects.at(number);
 }
 

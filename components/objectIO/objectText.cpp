@@ -23,12 +23,21 @@ using TextKind = QrStream::TextKind;
 /// Whether the character belongs to a number that can be read back. The letters of "inf" and "nan"
 /// do not.
 bool isOfNumber(wchar_t c) {
-    return c != L'\0' && std::wcschr(L"0123456789+-.e", c);
+    return (c >= L'0' && c <= L'9') || c == L'+' || c == L'-' || c == L'.' || c == L'e';
+}
+
+/// Whether the character is the same single byte in every locale. Some locales have another
+/// character in the place of a backslash, a tilde or a currency sign.
+bool isPortable(wchar_t c) {
+    return (c >= L'a' && c <= L'z') || (c >= L'A' && c <= L'Z') || (c >= L' ' && c <= L'"') ||
+           (c >= L'%' && c <= L'?') || c == L'_' || (c >= L'\t' && c <= L'\r');
 }
 
 /// Whether the character is read back, if the locale writes it at all. Some locales write a similar
 /// one in its place.
 bool readsBack(wchar_t character) {
+    if (isPortable(character))
+        return true;
     char bytes[MB_LEN_MAX];
     std::mbstate_t writing{};
     const std::size_t length = std::wcrtomb(bytes, character, &writing);

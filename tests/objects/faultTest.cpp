@@ -84,6 +84,31 @@ TYPED_TEST(Faulty, ObjectThatReadsLessThanWasWrittenIsNoticed) {
                 HasSubstr("the object should end here and does not"));
 }
 
+TYPED_TEST(Faulty, WrongEndIsToldByThePlaceOfItsMark) {
+    Saving<TypeParam> record;
+    record.stream << 1U << nodeUid << 3U;
+    this->writeNode(record.stream);
+    const std::string end = std::to_string(record.bytes().size());
+    EXPECT_THAT(this->failureOf(nodeUid, 3,
+                                [](QrStream& s) {
+                                    Faulty<TypeParam>::writeNode(s);
+                                    s << 5;
+                                }),
+                HasSubstr("byte " + end + ": the object should end here and does not"));
+}
+
+TYPED_TEST(Faulty, WrongEndOfAKnownObjectIsToldByThePlaceOfItsRecord) {
+    const QrPtr<Node> root = this->node(1);
+    Saving<TypeParam> out;
+    out.stream << root.get();
+    const std::string second = std::to_string(out.bytes().size());
+    out.stream << 1U << 7U;
+    Loading<TypeParam> in(out.bytes());
+    in.object();
+    EXPECT_THAT(readFailure([&] { in.object(); }),
+                HasSubstr("byte " + second + ": the object should end here and does not"));
+}
+
 TYPED_TEST(Faulty, ObjectThatReadsMoreThanWasWrittenIsNoticed) {
     this->failureOf(nodeUid, 3, [](QrStream& s) { s << 1; });
     this->failureOf(nodeUid, 3, [](QrStream&) {});
@@ -167,6 +192,18 @@ TYPED_TEST(Faulty, PlaceIsToldEvenIfTheMediumCannotTell) {
     TypeParam stream(&objects);
     EXPECT_THAT(readFailure([&] { stream.readObject(nullptr, nullptr, nullptr); }),
                 StartsWith("unknown position: inside the object that begins here: Error reading"));
+    // A wrong end.
+    Scripted object(nodeUid, 3, [](QrStream& s) {
+        Faulty<TypeParam>::writeNode(s);
+        s << 5;
+    });
+    std::istringstream longer(saved<TypeParam>(&object));
+    QrInBuffer longerBuffer(&longer);
+    NoPosition blindBuffer(&longerBuffer);
+    QrObjectInBuffer longerObjects(&blindBuffer);
+    TypeParam longerStream(&longerObjects);
+    EXPECT_THAT(readFailure([&] { longerStream.readObject(nullptr, nullptr, nullptr); }),
+                StartsWith("unknown position: the object should end here"));
 }
 
 TYPED_TEST(Faulty, ObjectThatIsNotPersistentIsRefusedAndNothingOfItWritten) {

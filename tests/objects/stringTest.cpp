@@ -125,10 +125,16 @@ TEST_F(Strings, WithCharactersThatTheLocaleChangesAreRefused) {
         names.emplace_back(locale.name);
     for (const SingleByteLocale& locale : singleByteLocales())
         names.emplace_back(locale.name);
+    // Yen sign and overline have the places of the backslash and the tilde.
+    if (LocaleGuard("ja_JP.SHIFT_JIS"))
+        names.emplace_back("ja_JP.SHIFT_JIS");
+    std::wstring characters = L"\x100\x221E\x2212\xE9\xFF01\x2018\xA0\xA5\x203E\xFF3C";
+    for (wchar_t ascii = 1; ascii < 0x80; ++ascii)
+        characters += ascii;
     for (const std::string& name : names) {
         const LocaleGuard guard(name.c_str());
         ASSERT_TRUE(guard);
-        for (const wchar_t character : std::wstring(L"\x100\x221E\x2212\xE9\xFF01\x2018\xA0"))
+        for (const wchar_t character : characters)
             try {
                 const std::wstring text(1, character);
                 EXPECT_EQ(through<QrBinaryStream>(text), text)
