@@ -8,8 +8,6 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include <fstream>
-#include <iterator>
 #include <sstream>
 #include <string>
 
@@ -93,7 +91,7 @@ TEST(ImageDecoding, ReadsNoMoreThanOnePortionBeyondTheLimitOfTheFile) {
     ImageLimits limits;
     limits.fileSize = 1000;
     EXPECT_THROW(decodeImage(buffer, nullptr, limits), ImageError);
-    EXPECT_LE(buffer.tell(), 64 * 1024);
+    EXPECT_GE(in.rdbuf()->in_avail(), 1'000'000 - 64 * 1024);
 }
 
 TEST(ImageDecoding, LimitsEachSide) {
