@@ -1,9 +1,13 @@
 // SPDX-License-Identifier: BSL-1.0
 /// What keeps an image from being decoded: each limit, and the user. The images are bitmaps that
-/// the tests make, because their size is then known to the byte.
+/// the tests make, because their size is then known to the byte. The import builders are linked to
+/// this program, and called through their description.
 #include "examples/images/decoding.h"
 
 #include "components/componentKit/controller.h"
+#include "components/componentKit/uidLiteral.h"
+#include "components/componentManager/componentImp.h"
+#include "components/componentManager/importBuilder.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -11,8 +15,12 @@
 #include <sstream>
 #include <string>
 
+extern "C" MZ_EXPORT Mz::QrCastable* QrGetComponentDescription();
+
 using namespace Mz;
+using ::testing::ElementsAre;
 using ::testing::HasSubstr;
+using ::testing::IsEmpty;
 
 namespace {
 
@@ -59,8 +67,10 @@ class Impatient final : public Kit::Controller {
   public:
     explicit Impatient(int question) : last(question) {}
     bool isInterrupted() override { return ++questions >= last; }
+    void show(Kind, const wchar_t* text) override { texts.emplace_back(text); }
 
     int questions = 0;
+    std::vector<std::wstring> texts;
 
   private:
     int last;
@@ -112,14 +122,14 @@ TEST(ImageDecoding, LimitsTheNumberOfPixels) {
 }
 
 TEST(ImageDecoding, HasLimitsOfItsOwnForWhatAHeaderClaims) {
-    std::string tall = bitmap(1, 1);
-    tall.replace(18, 8, littleEndian(16'384, 4) + littleEndian(4'096, 4));
-    // Within the limits: the decoder is asked, and misses the pixels.
-    EXPECT_THAT(refusal(tall), Not(HasSubstr("too large")));
-    tall.replace(18, 8, littleEndian(16'385, 4) + littleEndian(1, 4));
-    EXPECT_EQ(refusal(tall), "the image is too large: 16385 x 1 pixels");
-    tall.replace(18, 8, littleEndian(16'384, 4) + littleEndian(4'097, 4));
-    EXPECT_EQ(refusal(tall), "the image is too large: 16384 x 4097 pixels");
+    std::string claim = bitmap(1, 1);
+    claim.replace(18, 8, littleEndian(16'384, 4) + littleEndian(1, 4));
+    // Within the limits, so the decoder is asked, whatever it says of the missing pixels.
+    EXPECT_THAT(refusal(claim), Not(HasSubstr("too large")));
+    claim.replace(18, 8, littleEndian(16'385, 4) + littleEndian(1, 4));
+    EXPECT_EQ(refusal(claim), "the image is too large: 16385 x 1 pixels");
+    claim.replace(18, 8, littleEndian(16'384, 4) + littleEndian(4'097, 4));
+    EXPECT_EQ(refusal(claim), "the image is too large: 16384 x 4097 pixels");
 }
 
 TEST(ImageDecoding, StopsAtTheFirstQuestionAndLater) {
@@ -132,6 +142,35 @@ TEST(ImageDecoding, StopsAtTheFirstQuestionAndLater) {
         EXPECT_THROW(decode(image, {}, &controller), ImageInterrupted) << question;
         EXPECT_EQ(controller.questions, question);
     }
+}
+
+/// Imports the bytes through the builder of bitmaps.
+QrRef<QrCastable> import(const std::string& bytes, QrProcessControl& controller) {
+    const Kit::ControllerScope installed(controller);
+    const auto description = queryCast<QrComponentDescription>(QrGetComponentDescription());
+    const auto made = description->createBuilder("B3970E04-7A6C-11EF-97D8-5A1C40E2F68B"_uid);
+    std::istringstream in(bytes);
+    QrInBuffer buffer(&in);
+    return queryCast<QrImportBuilder>(made.get())->import(&buffer, L"image.bmp", nullptr);
+}
+
+TEST(ImageImport, OfAnImageThatCanBeDecodedReportsNothing) {
+    Impatient controller(1000);
+    EXPECT_TRUE(queryCast<Image>(import(bitmap(4, 4), controller).get()));
+    EXPECT_THAT(controller.texts, IsEmpty());
+}
+
+TEST(ImageImport, ThatTheUserInterruptsIsNoFailure) {
+    Impatient controller(2);
+    EXPECT_FALSE(import(bitmap(200, 200), controller));
+    EXPECT_THAT(controller.texts, IsEmpty());
+}
+
+TEST(ImageImport, BeyondALimitNamesTheFileAndTheLimit) {
+    Impatient controller(1000);
+    EXPECT_FALSE(import(bitmap(16'385, 1), controller));
+    EXPECT_THAT(controller.texts,
+                ElementsAre(L"image.bmp: the image is too large: 16385 x 1 pixels"));
 }
 
 } // namespace
