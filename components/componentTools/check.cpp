@@ -402,20 +402,40 @@ CheckResult checkLibrary(const std::filesystem::path& file, const CheckOptions& 
     return CheckRun(file, options).run();
 }
 
+namespace {
+
+bool hasBuilder(const CheckResult& library, const QrUid& uid) {
+    return std::any_of(library.builders.begin(), library.builders.end(),
+                       [&](const CheckedBuilder& builder) { return builder.uid == uid; });
+}
+
+/// Removes the findings of stored classes whose builder another library has.
+void dropClassesOfOthers(std::vector<CheckResult>& libraries) {
+    for (CheckResult& one : libraries)
+        std::erase_if(one.findings, [&](const CheckFinding& finding) {
+            return !(finding.missingClass == QrUid{}) &&
+                   std::any_of(libraries.begin(), libraries.end(), [&](const CheckResult& other) {
+                       return hasBuilder(other, finding.missingClass);
+                   });
+        });
+}
+
+} // namespace
+
 void compareLibraries(std::vector<CheckResult>& libraries) {
+    dropClassesOfOthers(libraries);
     for (CheckResult& one : libraries)
         for (const CheckedBuilder& builder : one.builders)
             for (const CheckResult& other : libraries) {
-                const bool shared =
-                    std::any_of(other.builders.begin(), other.builders.end(),
-                                [&](const CheckedBuilder& its) { return its.uid == builder.uid; });
-                if (&other == &one || !shared || builder.uid == QrUid{})
+                if (&other == &one || !hasBuilder(other, builder.uid) || builder.uid == QrUid{})
                     continue;
-                one.findings.push_back(
-                    {findCheckRule("uid-free"), placeOf(builder.name, builder.uid),
-                     displayName(other.file) + L" has a builder with the same uid, so that hosts "
-                                               L"find only one of them. Make a new uid.",
-                     "uid-free"});
+                one.findings.push_back({findCheckRule("uid-free"),
+                                        placeOf(builder.name, builder.uid),
+                                        displayName(other.file) +
+                                            L" has a builder with the same uid, so that hosts "
+                                            L"find only one of them. Make a new uid.",
+                                        "uid-free",
+                                        {}});
             }
 }
 

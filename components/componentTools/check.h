@@ -55,6 +55,7 @@ struct CheckFinding {
     std::wstring place;    ///< for example a builder, with name and uid; empty for the library
     std::wstring sentence; ///< the fact and the remedy
     std::string reproduce; ///< the value of `CheckOptions::reproduce` that repeats the finding
+    QrUid missingClass{};  ///< the class that has no builder in the library, else nil
 };
 
 /// What is checked, and how.
@@ -102,8 +103,9 @@ struct CheckResult {
 MZ_COMPONENT_TOOLS_API CheckResult checkLibrary(const std::filesystem::path& file,
                                                 const CheckOptions& options = {});
 
-/// Adds the findings that only a comparison of the libraries of one search path shows: uids that
-/// several libraries use.
+/// Compares the libraries of one search path. Adds the findings that only the comparison shows:
+/// uids that several libraries use. Removes those that it refutes: classes of stored objects whose
+/// builder another library has.
 MZ_COMPONENT_TOOLS_API void compareLibraries(std::vector<CheckResult>& libraries);
 
 } // namespace Mz::Tools

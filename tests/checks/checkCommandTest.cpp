@@ -77,6 +77,29 @@ TEST_F(CheckCommand, FailsOnTheGradesThatItIsTold) {
     EXPECT_EQ(run({file, "--fail-on", "nothing"}).exitCode, 2);
 }
 
+TEST_F(CheckCommand, FailsOnANoteOnlyIfItIsToldTo) {
+    const std::string file = library(L"unlabelledImport");
+    const ProgramResult result = run({file});
+    EXPECT_EQ(result.exitCode, 0);
+    EXPECT_THAT(result.output, HasSubstr(": note: builder \"broken\""));
+    EXPECT_THAT(result.output, HasSubstr("[import-label]\n"));
+    EXPECT_THAT(result.output, HasSubstr("1 library: 0 errors, 0 warnings, 1 note\n"));
+    EXPECT_EQ(run({file, "--fail-on", "warning"}).exitCode, 0);
+    EXPECT_EQ(run({file, "--fail-on", "note", "--sarif", "log"}).exitCode, 1);
+    const Json found = Json::parse(contentOf(work.path() / "log"))["runs"][0]["results"][0];
+    EXPECT_EQ(found["level"], "note");
+}
+
+TEST_F(CheckCommand, FindsTheBuilderOfAClassInAnotherLibrary) {
+    const std::string stores = library(L"storesCrates", L"sound");
+    const ProgramResult alone = run({stores});
+    EXPECT_EQ(alone.exitCode, 1);
+    EXPECT_THAT(alone.output, HasSubstr("[persistant-class]\n"));
+    const ProgramResult both = run({stores, library(L"crates", L"sound")});
+    EXPECT_EQ(both.exitCode, 0) << both.output;
+    EXPECT_EQ(both.output, "2 libraries: 0 errors, 0 warnings, 0 notes\n");
+}
+
 TEST_F(CheckCommand, ToleratesWhatIsSuppressedWithAReason) {
     const std::string file = library(L"dotInExtension");
     const std::string name = std::filesystem::path(file).filename().string();
@@ -143,6 +166,8 @@ TEST_F(CheckCommand, ExplainsRulesWithoutALibrary) {
     EXPECT_EQ(one.exitCode, 0);
     EXPECT_THAT(one.output, HasSubstr("extension-form (error, import builders)\n"));
     EXPECT_THAT(one.output, HasSubstr("no wildcard"));
+    EXPECT_THAT(run({"--explain", "import-label"}).output,
+                HasSubstr("import-label (note, import builders)\n"));
     const ProgramResult all = run({"--explain", "all"});
     EXPECT_GT(std::count(all.output.begin(), all.output.end(), '\n'), 30);
     EXPECT_EQ(run({"--explain", "no-such-rule"}).exitCode, 2);

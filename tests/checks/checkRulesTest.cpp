@@ -1,9 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Each rule with a library that breaks it and nothing else, and good libraries that break none.
-#include "tests/tools/toolsFixture.h"
-
-#include "components/componentManager/utf8.h"
-#include "components/componentTools/check.h"
+/// Each rule with a library that breaks it and nothing else, and what is said of the rules.
+#include "tests/checks/checking.h"
 
 #include <algorithm>
 #include <set>
@@ -19,33 +16,6 @@ using ::testing::HasSubstr;
 using ::testing::IsEmpty;
 
 namespace {
-
-/// Returns the findings as text: for comparison their rules, for people their sentences.
-std::string textOf(const CheckResult& result) {
-    std::string text;
-    for (const CheckFinding& finding : result.findings)
-        text += std::string(finding.rule->id) + ": " + toUtf8(finding.place) + ": " +
-                toUtf8(finding.sentence) + "\n";
-    return text;
-}
-
-std::set<std::string> rulesOf(const CheckResult& result) {
-    std::set<std::string> rules;
-    for (const CheckFinding& finding : result.findings)
-        rules.insert(finding.rule->id);
-    return rules;
-}
-
-/// Time for a process under load, but not for a test that waits for a library that hangs.
-CheckOptions options(int seconds = 30) {
-    CheckOptions result;
-    result.process.timeLimit = std::chrono::seconds(seconds);
-    return result;
-}
-
-/// Whether the child process can let the allocations of libraries fail, and count their memory.
-constexpr bool limitsAllocations = MZ_LIMITS_ALLOCATIONS;
-constexpr bool countsMemory = MZ_COUNTS_MEMORY;
 
 /// A library, and the rule that it breaks.
 struct Broken {
@@ -94,6 +64,7 @@ const Broken brokenLibraries[] = {
     {L"ignoresStop", L"checks", "description-enumerates"},
     {L"liesAboutCountLow", L"", "description-count"},
     {L"nullTexts", L"", "description-texts"},
+    {L"unlabelled", L"checks", "description-label"},
     {L"nilUid", L"", "uid-not-nil"},
     {L"duplicateUids", L"", "uid-unique"},
     {L"createsNull", L"", "builder-made"},
@@ -109,6 +80,7 @@ const Broken brokenLibraries[] = {
     {L"throwsInObject", L"checks", "exceptions-allowed"},
     {L"throwsInCreate", L"", "exceptions-allowed"},
     {L"unknownClass", L"checks", "persistant-class"},
+    {L"cannotBeWritten", L"checks", "persistant-roundtrip"},
     {L"forgetsState", L"checks", "persistant-roundtrip"},
     {L"acceptsCutData", L"checks", "persistant-truncated"},
     {L"leaksOnFailure", L"checks", "persistant-frees"},
@@ -116,6 +88,7 @@ const Broken brokenLibraries[] = {
     {L"seeks", L"checks", "persistant-pieces"},
     {L"dotInExtension", L"checks", "extension-form"},
     {L"capitalExtension", L"checks", "extension-case"},
+    {L"unlabelledImport", L"checks", "import-label"},
     {L"crashesOnForeign", L"checks", "canimport-survives"},
     {L"hangsOnEmpty", L"checks", "canimport-survives"},
     {L"changesController", L"checks", "canimport-restores"},
@@ -129,7 +102,9 @@ const Broken brokenLibraries[] = {
     {L"crashesInInitialiser", L"", "library-loads"},
     {L"staysLoaded", L"checks", "library-unloads"},
     {L"leaksAtLoad", L"checks", "library-reloads"},
+    {L"leaksAtLaterLoads", L"checks", "library-reloads"},
     {L"leavesFile", L"checks", "library-leaves"},
+    {L"leavesThread", L"checks", "library-leaves"},
     {L"exportsMore", L"checks", "library-exports"},
     {L"takesFromHost", L"", "library-host"},
     {L"localeNumbers", L"checks", "surroundings-locale"},
@@ -143,36 +118,6 @@ const Broken brokenLibraries[] = {
 
 INSTANTIATE_TEST_SUITE_P(Check, BrokenLibrary, ::testing::ValuesIn(brokenLibraries),
                          [](const auto& test) { return toUtf8(test.param.component); });
-
-class GoodLibrary : public ::testing::TestWithParam<const wchar_t*> {};
-
-TEST_P(GoodLibrary, HasNoFinding) {
-    const std::wstring name = GetParam();
-    const std::size_t slash = name.find(L'/');
-    CheckOptions checked = options();
-    checked.threadSafe = true;
-    const CheckResult result = checkLibrary(
-        slash == std::wstring::npos ? builtComponent(name)
-                                    : builtComponent(name.substr(slash + 1), name.substr(0, slash)),
-        checked);
-    EXPECT_THAT(result.findings, IsEmpty()) << textOf(result);
-    EXPECT_EQ(result.notRun.size(), limitsAllocations ? 0u : 1u);
-    EXPECT_THAT(result.builders, ::testing::Not(IsEmpty()));
-    EXPECT_FALSE(result.interrupted);
-}
-
-INSTANTIATE_TEST_SUITE_P(Check, GoodLibrary,
-                         ::testing::Values(L"goodByHand", L"goodWithKit", L"countedDescription",
-                                           L"notes", L"checks/soundImporter",
-                                           L"checks/succeedsOwnTest", L"numbered/numbered10",
-                                           L"mesh/meshObj", L"mesh/meshOff", L"mesh/meshPly",
-                                           L"mesh/meshStl", L"mesh/meshScene",
-                                           L"mesh/meshImporter"),
-                         [](const auto& test) {
-                             std::string name = toUtf8(test.param);
-                             std::replace(name.begin(), name.end(), '/', '_');
-                             return name;
-                         });
 
 TEST(CheckedLibraries, ThatEndTheProcessForWantOfMemoryAreFoundWherePossible) {
     const CheckResult result = checkLibrary(builtComponent(L"terminates", L"checks"), options());

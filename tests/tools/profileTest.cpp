@@ -153,6 +153,26 @@ TEST_F(Profile, NamesLibrariesThatEndTheProcessAndMeasuresTheOthers) {
     EXPECT_EQ(profile.otherFiles, 0u);
 }
 
+TEST_F(Profile, ExplainsACrashByAForeignStamp) {
+    add(L"crashesWithForeignStamp");
+    add(L"crashesInEntryPoint");
+    add(L"stampedOtherVersion");
+    add(L"goodWithKit");
+    const StartProfile profile = profileStart(options());
+    const ProfiledLibrary& foreign = find(profile, L"crashesWithForeignStamp");
+    EXPECT_EQ(foreign.verdict.verdict, Verdict::otherAbi);
+    EXPECT_THAT(sentenceOf(foreign.verdict), HasSubstr(L"version"));
+    EXPECT_FALSE(foreign.measured);
+    EXPECT_EQ(foreign.total(), 0ns);
+    EXPECT_EQ(find(profile, L"crashesInEntryPoint").verdict.verdict, Verdict::crashed);
+    // Only the libraries that end the process are explained: the manager loads this one.
+    EXPECT_EQ(find(profile, L"stampedOtherVersion").verdict.verdict, Verdict::works);
+    EXPECT_TRUE(find(profile, L"stampedOtherVersion").measured);
+    EXPECT_TRUE(find(profile, L"goodWithKit").measured);
+    EXPECT_TRUE(profile.initialize);
+    EXPECT_EQ(profile.problem, L"");
+}
+
 TEST_F(Profile, TellsFilesApartWhoseNamesDifferOnlyInCase) {
     add(L"goodWithKit", L"a");
     if (std::filesystem::exists(folder.path() / "A"))

@@ -13,6 +13,7 @@
 #include "components/componentTools/uidText.h"
 
 #include <algorithm>
+#include <iterator>
 #include <new>
 
 namespace Mz::Tools {
@@ -29,7 +30,13 @@ void CheckContext::begin(const CheckRule& rule) {
 void CheckContext::report(const std::wstring& place, const std::wstring& sentence,
                           const std::string& reproduce) {
     found = true;
-    sender.finding({current, place, sentence, reproduce});
+    sender.finding({current, place, sentence, reproduce, {}});
+}
+
+void CheckContext::reportMissingClass(const std::wstring& place, const std::wstring& sentence,
+                                      const QrUid& missingClass) {
+    found = true;
+    sender.finding({current, place, sentence, {}, missingClass});
 }
 
 bool CheckContext::isAvoided(const std::wstring& what, const std::wstring& place) const {
@@ -71,7 +78,7 @@ void CheckContext::noteException(const std::wstring& what, const std::wstring& p
     if (std::find(reported.begin(), reported.end(), place + sentence) != reported.end())
         return;
     reported.push_back(place + sentence);
-    sender.finding({findCheckRule("exceptions-allowed"), place, sentence, {}});
+    sender.finding({findCheckRule("exceptions-allowed"), place, sentence, {}, {}});
 }
 
 platform::Module CheckContext::load(std::wstring& loaderError) {
@@ -112,7 +119,7 @@ QrComponentDescription* CheckContext::description() {
 const std::vector<DescribedBuilder>& CheckContext::builders() {
     if (!described)
         describe();
-    return all;
+    return checked;
 }
 
 void CheckContext::describe() {
@@ -150,9 +157,9 @@ void CheckContext::describe() {
             static_cast<void>(QrCPtr<QrBuilderDescription>(item).detach());
             all.push_back(std::move(builder));
         });
-    if (work.builder >= 0)
-        std::erase_if(all, [&](const DescribedBuilder& builder) {
-            return builder.index != static_cast<std::size_t>(work.builder);
+    std::copy_if(
+        all.begin(), all.end(), std::back_inserter(checked), [&](const DescribedBuilder& builder) {
+            return work.builder < 0 || builder.index == static_cast<std::size_t>(work.builder);
         });
 }
 
@@ -179,7 +186,9 @@ QrRef<QrCastable> CheckContext::object(const DescribedBuilder& described,
 }
 
 const DescribedBuilder* CheckContext::describedAs(const QrUid& uid) {
-    for (const DescribedBuilder& known : builders())
+    if (!described)
+        describe();
+    for (const DescribedBuilder& known : all)
         if (known.uid == uid)
             return &known;
     return nullptr;

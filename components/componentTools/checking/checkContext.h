@@ -61,6 +61,10 @@ class CheckContext {
     /// Returns whether a call ended an earlier process, so that it must not be repeated.
     bool isAvoided(const std::wstring& what, const std::wstring& place) const;
 
+    /// Reports that a class of stored objects has no builder in this library.
+    void reportMissingClass(const std::wstring& place, const std::wstring& sentence,
+                            const QrUid& missingClass);
+
     /// Returns whether that exception was one of a stream.
     bool lastWasStreamException() const { return streamException; }
 
@@ -93,7 +97,8 @@ class CheckContext {
     QrRef<QrCastable> object(const DescribedBuilder& described);
     QrRef<QrCastable> object(const DescribedBuilder& described, QrComponentBuilder& builder);
 
-    /// Returns the described builder with that uid, or null.
+    /// Returns the described builder with that uid, or null. Also finds those that the task
+    /// excludes, because objects may contain theirs.
     const DescribedBuilder* describedAs(const QrUid& uid);
 
     CheckSender& messages() { return sender; }
@@ -111,7 +116,8 @@ class CheckContext {
     bool held = false, described = false, found = false;
     platform::Module library = nullptr;
     QrComponentDescription* kept = nullptr;
-    std::vector<DescribedBuilder> all;
+    std::vector<DescribedBuilder> all;     ///< what the description enumerates
+    std::vector<DescribedBuilder> checked; ///< those that the task wants
 };
 
 /// Collects what a description enumerates. Elements that are not descriptions of builders are

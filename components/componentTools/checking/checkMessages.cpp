@@ -39,12 +39,22 @@ std::wstring wideAt(const Json& value, const char* name) {
     return fromUtf8(value.at(name).get<std::string>());
 }
 
+Json wordsOf(const QrUid& uid) {
+    return Json::array({uid.w0, uid.w1, uid.w2, uid.w3});
+}
+
+QrUid uidAt(const Json& value, const char* name) {
+    const Json& words = value.at(name);
+    return {words.at(0), words.at(1), words.at(2), words.at(3)};
+}
+
 void readFinding(const Json& value, CheckReport& report) {
     CheckFinding finding;
     finding.rule = findCheckRule(value.at("rule").get<std::string>());
     finding.place = wideAt(value, "place");
     finding.sentence = wideAt(value, "sentence");
     finding.reproduce = value.at("reproduce").get<std::string>();
+    finding.missingClass = uidAt(value, "missingClass");
     if (finding.rule)
         report.findings.push_back(std::move(finding));
 }
@@ -52,8 +62,7 @@ void readFinding(const Json& value, CheckReport& report) {
 void readBuilder(const Json& value, CheckReport& report) {
     CheckedBuilder builder;
     builder.name = wideAt(value, "name");
-    const Json& words = value.at("uid");
-    builder.uid = {words.at(0), words.at(1), words.at(2), words.at(3)};
+    builder.uid = uidAt(value, "uid");
     report.builders.push_back(std::move(builder));
 }
 
@@ -138,14 +147,13 @@ void CheckSender::finding(const CheckFinding& finding) {
                       {"rule", finding.rule->id},
                       {"place", toUtf8(finding.place)},
                       {"sentence", toUtf8(finding.sentence)},
-                      {"reproduce", finding.reproduce}}));
+                      {"reproduce", finding.reproduce},
+                      {"missingClass", wordsOf(finding.missingClass)}}));
 }
 
 void CheckSender::builder(const CheckedBuilder& builder) {
-    const QrUid& uid = builder.uid;
-    output(messageOf({{"kind", "builder"},
-                      {"name", toUtf8(builder.name)},
-                      {"uid", Json::array({uid.w0, uid.w1, uid.w2, uid.w3})}}));
+    output(messageOf(
+        {{"kind", "builder"}, {"name", toUtf8(builder.name)}, {"uid", wordsOf(builder.uid)}}));
 }
 
 void CheckSender::answer(const std::wstring& key, const std::string& value) {

@@ -27,7 +27,10 @@ constexpr int maximumDepth = 200;
 
 class ObjectsOut final : public QrOutBuffer {
   public:
-    using QrOutBuffer::QrOutBuffer;
+    ObjectsOut(std::ostream* out, CheckContext& checked) : QrOutBuffer(out), context(checked) {}
+
+    /// Returns the class uids of the inner objects that no builder of the library has, each once.
+    const std::vector<QrUid>& missingClasses() const { return missing; }
 
     void writeObject(const QrCastable* object, QrStream& stream, const wchar_t*,
                      const wchar_t*) override {
@@ -46,6 +49,9 @@ class ObjectsOut final : public QrOutBuffer {
         const QrUid* const classUid = stored->getClassUid();
         if (!classUid)
             throw QrStreamEx::ExWriteObject(source, __LINE__);
+        if (!context.describedAs(*classUid) &&
+            std::find(missing.begin(), missing.end(), *classUid) == missing.end())
+            missing.push_back(*classUid);
         written.push_back(object->getCastable());
         stream << newObject << *classUid;
         ++depth;
@@ -54,7 +60,9 @@ class ObjectsOut final : public QrOutBuffer {
     }
 
   private:
+    CheckContext& context;
     std::vector<const QrCastable*> written;
+    std::vector<QrUid> missing;
     int depth = 0;
 };
 
@@ -135,10 +143,18 @@ std::optional<std::string> writtenBytes(CheckContext& context, const std::wstrin
                                         QrPersistant& object, StoredForm form) {
     std::ostringstream bytes;
     const bool written = context.attempt(L"write", place, [&] {
-        ObjectsOut buffer(&bytes);
+        ObjectsOut buffer(&bytes, context);
         object.write(*streamOf(buffer, form));
     });
     return written ? std::optional(bytes.str()) : std::nullopt;
+}
+
+std::vector<QrUid> missingClassesInside(CheckContext& context, const std::wstring& place,
+                                        QrPersistant& object) {
+    std::ostringstream bytes;
+    ObjectsOut buffer(&bytes, context);
+    context.attempt(L"write", place, [&] { object.write(*streamOf(buffer, StoredForm::binary)); });
+    return buffer.missingClasses();
 }
 
 bool readBytes(CheckContext& context, const std::wstring& place, QrPersistant& object,

@@ -8,6 +8,7 @@
 
 #include <optional>
 #include <string>
+#include <vector>
 
 namespace Mz::Tools {
 
@@ -23,6 +24,11 @@ enum class Supply {
 /// Returns what the object writes; `std::nullopt` if it throws. Objects inside it are written too.
 std::optional<std::string> writtenBytes(CheckContext& context, const std::wstring& place,
                                         QrPersistant& object, StoredForm form);
+
+/// Returns the class uids of the objects inside the object that no builder of the library has, each
+/// once.
+std::vector<QrUid> missingClassesInside(CheckContext& context, const std::wstring& place,
+                                        QrPersistant& object);
 
 /// Reads the object from what `writtenBytes` returned. Objects inside it are made by the library's
 /// own builders.

@@ -256,6 +256,17 @@ void textsNotNull(CheckContext& context) {
         });
 }
 
+void libraryLabel(CheckContext& context) {
+    QrComponentDescription* const description = context.description();
+    if (!description)
+        return;
+    context.attempt(L"the texts of the description", {}, [&] {
+        const wchar_t* const label = description->getComponentLabel();
+        if (label && !*label) // Null is the finding of another rule.
+            context.report({}, L"its label is empty. Name the library for people.");
+    });
+}
+
 void uidsNotNil(CheckContext& context) {
     for (const DescribedBuilder& builder : context.builders())
         if (builder.uid == QrUid{})

@@ -90,6 +90,19 @@ void extensionCase(CheckContext& context) {
     }
 }
 
+void importLabel(CheckContext& context) {
+    for (const ImportingBuilder& importing : importBuilders(context)) {
+        const DescribedBuilder& described = *importing.described;
+        context.attempt(L"the texts of the description", described.place, [&] {
+            const wchar_t* const label = described.description->getLabel();
+            if (label && !*label) // Null is the finding of another rule.
+                context.report(described.place, L"its label is empty, and so is its line in the "
+                                                L"list of file types. Name the files that it "
+                                                L"reads.");
+        });
+    }
+}
+
 void canImportSurvives(CheckContext& context) {
     forEachTry(context, "canimport-survives", [&](const ImportingBuilder&, ImportTry& attempt) {
         CheckController controller;

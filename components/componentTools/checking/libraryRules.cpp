@@ -118,7 +118,7 @@ void reloads(CheckContext& context) {
     holdDependencies(context);
     if (!useOnce(context, false) || isLoaded(context))
         return;
-    constexpr int count = 30;
+    constexpr int count = 100;
     const std::size_t growth = growthOf([&] { static_cast<void>(useOnce(context, false)); }, count);
     if (!growth)
         return;

@@ -41,13 +41,15 @@ QrPtr<QrPersistant> persistantOf(CheckContext& context, const std::wstring& plac
     return stored;
 }
 
-/// Returns the objects that can be made again by a builder of this library.
+/// Returns the objects that can be made again by builders of this library, together with all that
+/// they contain.
 std::vector<StoredObject> storedObjects(CheckContext& context) {
     std::vector<StoredObject> objects;
     const auto add = [&](const std::wstring& place, const QrRef<QrCastable>& made) {
         const QrPtr<QrPersistant> object = made ? persistantOf(context, place, made) : nullptr;
-        if (const DescribedBuilder* builder =
-                object ? builderOfClass(context, place, *object) : nullptr)
+        const DescribedBuilder* const builder =
+            object ? builderOfClass(context, place, *object) : nullptr;
+        if (builder && missingClassesInside(context, place, *object).empty())
             objects.push_back({builder, place, object});
     };
     for (const DescribedBuilder& described : context.builders())
@@ -104,6 +106,20 @@ std::vector<std::size_t> cuts(std::size_t size) {
 
 } // namespace
 
+namespace {
+
+void reportMissingClass(CheckContext& context, const std::wstring& place, const QrUid& uid,
+                        const wchar_t* whose) {
+    context.reportMissingClass(
+        place,
+        L"the library has no builder for the class uid " + textOf(uid) + L" of " + whose +
+            L", so that they cannot be read. Describe a builder with that uid, or check the "
+            L"library together with the one that has it.",
+        uid);
+}
+
+} // namespace
+
 void classUid(CheckContext& context) {
     for (const DescribedBuilder& described : context.builders()) {
         const QrRef<QrCastable> made = context.object(described);
@@ -121,11 +137,11 @@ void classUid(CheckContext& context) {
         if (!uid)
             context.report(described.place, L"getClassUid returns null. Return the uid of the "
                                             L"builder that makes objects of this class.");
-        else if (context.task().builder < 0 && !context.describedAs(value))
-            context.report(described.place,
-                           L"the library has no builder for the class uid " + textOf(value) +
-                               L" of its objects, so that they cannot be read. Describe a builder "
-                               L"with that uid.");
+        else if (!context.describedAs(value))
+            reportMissingClass(context, described.place, value, L"its objects");
+        for (const QrUid& missing : missingClassesInside(context, described.place, *object))
+            reportMissingClass(context, described.place, missing,
+                               L"objects that its objects contain");
     }
 }
 
@@ -133,6 +149,13 @@ void roundTrip(CheckContext& context) {
     for (const StoredObject& stored : storedObjects(context))
         for (const StoredForm form : {StoredForm::binary, StoredForm::text}) {
             const auto first = writtenBytes(context, stored.place, *stored.object, form);
+            // Not every value has a text form.
+            if (!first && form == StoredForm::binary && context.lastWasStreamException())
+                context.report(stored.place,
+                               L"write throws in " + nameOf(form) + L" form: " +
+                                   context.lastException() +
+                                   L" Let an object be saved in every state. A long or wchar_t "
+                                   L"that does not fit the stream's width throws.");
             const QrPtr<QrPersistant> copy = first ? newObject(context, stored) : nullptr;
             if (!copy)
                 continue;

@@ -11,7 +11,7 @@ namespace {
 
 using enum RuleProcess;
 
-constexpr Grade warning = Grade::warning, error = Grade::error;
+constexpr Grade note = Grade::note, warning = Grade::warning, error = Grade::error;
 
 constexpr const char* description = "description";
 constexpr const char* builders = "builders";
@@ -61,6 +61,11 @@ std::vector<RuleEntry> makeEntries() {
           L"L\"\"."},
          main,
          Rules::textsNotNull},
+        {{"description-label", description, note, L"The library has a label.",
+          L"Hosts that list their plug-ins show the label of each; without one, people see a file "
+          L"name. The first argument of MZ_COMPONENT is the label."},
+         main,
+         Rules::libraryLabel},
         {{"uid-not-nil", description, error, L"No builder has the uid of four zero words.",
           L"A nil uid is one that was forgotten, and all forgotten ones are the same. "
           L"`mzcomponents uid` prints a new one."},
@@ -132,9 +137,10 @@ std::vector<RuleEntry> makeEntries() {
          nullptr},
 
         {{"persistant-class", persistent, error,
-          L"The class uid of an object that stores itself is that of a builder of the library.",
+          L"The class uid of an object that stores itself is that of a builder.",
           L"A stored object is read back by the builder of its class uid. Without one it can be "
-          L"written and never read."},
+          L"written and never read. A builder of another library counts if both libraries are "
+          L"checked together, by --path for example. Reading such an object is not checked."},
          main,
          Rules::classUid},
         {{"persistant-roundtrip", persistent, error,
@@ -178,6 +184,11 @@ std::vector<RuleEntry> makeEntries() {
           L"Importers compare extensions exactly, and most files have lower-case extensions."},
          main,
          Rules::extensionCase},
+        {{"import-label", imports, note, L"An import builder has a label.",
+          L"Importers show it in the list of file types, where a builder without one is an empty "
+          L"line. Set .label of the builder, for example to L\"PNG images\"."},
+         main,
+         Rules::importLabel},
         {{"canimport-survives", imports, error,
           L"canImport returns for every input: empty, random, cut off, or of another format.",
           L"An importer asks every builder about a file until one accepts it, so canImport sees "
@@ -240,7 +251,7 @@ std::vector<RuleEntry> makeEntries() {
          apart,
          Rules::leavesNothing},
         {{"library-reloads", library, error,
-          L"Loading and unloading the library again and again leaves no memory behind.",
+          L"Loading and unloading the library a hundred times leaves no memory behind.",
           L"What static objects, initialisers and the description allocate must be freed when the "
           L"library is unloaded."},
          apart,

@@ -43,6 +43,7 @@ void descriptionStable(CheckContext& context);
 void enumerationObeys(CheckContext& context);
 void countTrue(CheckContext& context);
 void textsNotNull(CheckContext& context);
+void libraryLabel(CheckContext& context);
 void uidsNotNil(CheckContext& context);
 void uidsUnique(CheckContext& context);
 void uidsExact(CheckContext& context);
@@ -65,6 +66,7 @@ void damagedObjects(CheckContext& context);
 
 void extensionForm(CheckContext& context);
 void extensionCase(CheckContext& context);
+void importLabel(CheckContext& context);
 void canImportSurvives(CheckContext& context);
 void canImportRestores(CheckContext& context);
 void importSurvives(CheckContext& context);

@@ -10,6 +10,9 @@ bool holdThisLibrary();
 /// Opens a file, or a handle, and forgets it.
 bool leaveFileOpen();
 
+/// Starts a thread that waits in a function of the system until the process ends.
+bool leaveThreadRunning();
+
 /// Returns whether this process has standard input.
 bool hasStandardInput();
 

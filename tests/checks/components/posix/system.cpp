@@ -3,6 +3,7 @@
 
 #include <dlfcn.h>
 #include <fcntl.h>
+#include <pthread.h>
 #include <unistd.h>
 
 namespace Mz::Test {
@@ -15,6 +16,15 @@ bool holdThisLibrary() {
 
 bool leaveFileOpen() {
     return ::open("/dev/null", O_RDONLY | O_CLOEXEC) >= 0;
+}
+
+bool leaveThreadRunning() {
+    const auto wait = [](void*) -> void* {
+        for (;;)
+            ::pause();
+    };
+    pthread_t thread{};
+    return ::pthread_create(&thread, nullptr, wait, nullptr) == 0 && ::pthread_detach(thread) == 0;
 }
 
 bool hasStandardInput() {

@@ -16,6 +16,15 @@ bool leaveFileOpen() {
                          nullptr) != INVALID_HANDLE_VALUE;
 }
 
+bool leaveThreadRunning() {
+    const auto wait = [](void*) -> DWORD {
+        for (;;)
+            ::Sleep(INFINITE);
+    };
+    const HANDLE thread = ::CreateThread(nullptr, 0, wait, nullptr, 0, nullptr);
+    return thread && ::CloseHandle(thread) != 0;
+}
+
 bool hasStandardInput() {
     return ::GetStdHandle(STD_INPUT_HANDLE) != nullptr;
 }
