@@ -9,7 +9,7 @@ cd "$top"
 rm -rf "$output"
 mkdir -p "$output"
 # The headers that are installed. What stands in rooms is private.
-inputs=(docs/README.md README.md)
+inputs=(docs/README.md README.md SECURITY.md)
 # The site shows the guides in the order in which the index names them.
 while IFS= read -r guide; do inputs+=("docs/$guide"); done \
   < <(grep -o '](\w[^)/#]*\.md)' docs/README.md | tr -d ']()' | awk '!seen[$0]++')

@@ -80,7 +80,7 @@ def anchor_of(path: str, name: str) -> str:
 
 
 def on_site(path: str) -> bool:
-    return path == "README.md" or path.startswith(("docs/", "examples/"))
+    return path in ("README.md", "SECURITY.md") or path.startswith(("docs/", "examples/"))
 
 
 class Guide:

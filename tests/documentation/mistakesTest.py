@@ -129,4 +129,54 @@ class Headings(Page):
         self.assertEqual(self.headings("### one\n### two\n### three\n"), 1)
 
 
+class Proofs(Page):
+    CMAKE = """function(add_page_test name)
+  add_test(NAME ${MZ_BUILD_NAME}/Pages.${name} COMMAND x)
+endfunction()
+function(add_rule_test name)
+  add_test(NAME ${MZ_BUILD_NAME}/${name} COMMAND x)
+endfunction()
+add_page_test(AreThere)
+foreach(rule layers
+    circles)
+  add_rule_test(Tree.${rule} x)
+endforeach()
+foreach(library IN LISTS libraries)
+  add_rule_test(Exports.${library} x)
+endforeach()
+add_test(NAME ${MZ_BUILD_NAME}/Host.Works COMMAND x)
+"""
+
+    def setUp(self):
+        super().setUp()
+        (self.page.parent / "tests").mkdir()
+        (self.page.parent / "tests" / "CMakeLists.txt").write_text(self.CMAKE)
+        (self.page.parent / "tests" / "test.cpp").write_text(
+            "TEST(Scan, Ends) {\nTYPED_TEST(Both, Read) {\nTEST(Scan, DISABLED_Waits) {\n// TEST(Scan, Was) {\n")
+        (self.page.parent / "run").write_text("case $1 in\nfuzz) fuzz ;;\n")
+
+    def proofs(self, proof, heading="proof"):
+        return self.script("proofs.py", self.folder.name,
+                           self.write(f"| promise | {heading} |\n|---|---|\n| a | {proof} |\n"))
+
+    def test_each_proof_is_a_test(self):
+        for name in ("Scan.Ends", "Scan.*", "Both.Read", "Pages.AreThere", "Tree.layers", "Tree.circles",
+                     "Exports.*", "Host.Works", "./run fuzz"):
+            status, text = self.proofs(f"`{name}`")
+            self.assertEqual(status, 0, text)
+
+    def test_other_names_are_none(self):
+        for name in ("Scan.End", "Scn.*", "Scan.DISABLED_Waits", "Scan.Was", "Pages.AreGone", "Tree.rule",
+                     "Exports.MZbase", "Exports.IN", "Ends", "./run fuz"):
+            status, text = self.proofs(f"`Scan.Ends`, `{name}`", "test")
+            self.assertEqual(status, 1, name)
+            self.assertEqual(text, f"page.md:3: there is no test {name}\n")
+
+    def test_each_row_needs_a_proof(self):
+        self.assertEqual(self.proofs("Scan.Ends")[0], 1)
+
+    def test_a_page_needs_a_table(self):
+        self.assertEqual(self.proofs("`Scan.Ends`", "why")[0], 1)
+
+
 unittest.main()
