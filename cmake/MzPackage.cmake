@@ -38,7 +38,8 @@ if(WIN32)
     COMPONENT documents)
 endif()
 install(FILES ${PROJECT_SOURCE_DIR}/LICENSE ${PROJECT_SOURCE_DIR}/CHANGELOG.md ${mzCopyright}
-  ${PROJECT_SOURCE_DIR}/README.md DESTINATION ${mzDocuments} COMPONENT documents)
+  ${PROJECT_SOURCE_DIR}/README.md ${PROJECT_SOURCE_DIR}/SECURITY.md
+  DESTINATION ${mzDocuments} COMPONENT documents)
 # The guides and examples, in the folders that README.md links.
 file(GLOB mzGuides CONFIGURE_DEPENDS ${PROJECT_SOURCE_DIR}/docs/*.md)
 install(FILES ${mzGuides} DESTINATION ${mzDocuments}/docs COMPONENT documents)

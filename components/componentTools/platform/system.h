@@ -87,7 +87,8 @@ NativePath moduleFolder();
 /// it.
 NativePath managerFile();
 
-/// Returns the path of a program that is found in PATH; empty if there is none.
+/// Returns the path of a program that is found in the folders of PATH that have full paths; empty if
+/// there is none.
 /// \param name  the program's name without extension
 NativePath findProgram(const std::string& name);
 

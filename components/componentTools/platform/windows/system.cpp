@@ -5,6 +5,7 @@
 #include "components/componentTools/platform/system.h"
 
 #include "components/componentManager/componentImp.h"
+#include "components/componentManager/files.h"
 #include "components/componentManager/nativeText.h"
 #include "components/componentManager/utf8.h"
 #include "components/platform/platform.h"
@@ -194,11 +195,18 @@ NativePath managerFile() {
     return fileOf(reinterpret_cast<const void*>(&QrGetComponentManager));
 }
 
+// Not by SearchPathW: that looks in the current folder, too, which others may be able to write to.
 NativePath findProgram(const std::string& name) {
-    wchar_t path[32768];
-    const DWORD length =
-        ::SearchPathW(nullptr, toCharacters(name, CP_ACP).c_str(), L".exe", 32768, path, nullptr);
-    return length > 0 && length < 32768 ? NativePath(path) : NativePath();
+    const std::wstring file = toCharacters(name, CP_ACP) + L".exe";
+    for (std::wstring rest = environmentPath("PATH").value_or(NativePath()).native();
+         !rest.empty();) {
+        const std::size_t end = rest.find(L';');
+        const NativePath program = NativePath(rest.substr(0, end)) / file;
+        if (program.is_absolute() && isFile(program))
+            return program;
+        rest.erase(0, end == std::wstring::npos ? end : end + 1);
+    }
+    return {};
 }
 
 const char* programExtension() {
