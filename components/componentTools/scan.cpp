@@ -252,9 +252,11 @@ class Scanner {
     /// Returns whether a library that worked earlier does not match: its stamp, or its interfaces.
     /// The library does not change when libMZcomponentManager or the host is replaced.
     bool isForOtherHost(const Candidate& candidate, const RecordedLibrary& library) const {
-        return !library.builders.empty() &&
-               (abiDifference(readLibraryImage(candidate.path)).has_value() ||
-                host.difference(candidate.path).has_value());
+        if (library.builders.empty())
+            return false;
+        FileBytes file(candidate.path);
+        return abiDifference(readLibraryImage(file)).has_value() ||
+               host.difference(file).has_value();
     }
 
     /// Returns whether an unchanged library may have another result now.

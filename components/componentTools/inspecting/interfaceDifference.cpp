@@ -6,7 +6,6 @@
 
 #include "components/componentManager/interfaceTable.h"
 #include "components/componentManager/utf8.h"
-#include "components/componentTools/images/libraryImage.h"
 #include "components/componentTools/platform/system.h"
 #include "components/platform/files.h"
 
@@ -188,10 +187,15 @@ std::optional<Finding> interfaceDifference(const std::vector<InterfaceTable>& co
 }
 
 std::optional<Finding> HostInterfaces::difference(const std::filesystem::path& component) const {
-    return difference(sectionsOf(component, interfaceSection));
+    FileBytes file(component);
+    return difference(file);
 }
 
-std::optional<Finding> HostInterfaces::difference(const std::string& content) const {
+std::optional<Finding> HostInterfaces::difference(FileBytes& component) const {
+    return differenceOf(sectionsOf(component, interfaceSection));
+}
+
+std::optional<Finding> HostInterfaces::differenceOf(const std::string& content) const {
     const std::vector<std::string_view> here = splitInterfaceTables(content);
     if (here.empty())
         return std::nullopt;

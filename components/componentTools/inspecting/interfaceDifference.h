@@ -2,6 +2,7 @@
 /// Compares the interfaces with which a component was compiled with those of its host.
 #pragma once
 
+#include "components/componentTools/images/libraryImage.h"
 #include "components/componentTools/inspecting/interfaceTables.h"
 #include "components/componentTools/verdict.h"
 
@@ -31,10 +32,11 @@ class HostInterfaces {
     /// Returns `interfaceDifference` of the component and the first file from which it differs.
     /// \param component  the file of a component
     std::optional<Finding> difference(const std::filesystem::path& component) const;
-    /// \param content  the sections of a component with its fingerprints
-    std::optional<Finding> difference(const std::string& content) const;
+    std::optional<Finding> difference(FileBytes& component) const;
 
   private:
+    /// \param content  the sections of a component with its fingerprints
+    std::optional<Finding> differenceOf(const std::string& content) const;
     void read() const;
     bool differsFromNone(std::string_view table) const;
 
