@@ -5,6 +5,7 @@
 
 #include "components/componentTools/scan.h"
 
+#include <chrono>
 #include <dirent.h>
 #include <fcntl.h>
 #include <filesystem>
@@ -20,6 +21,20 @@
 namespace Mz::Benchmarks {
 
 namespace {
+
+using Clock = std::chrono::steady_clock;
+
+/// Measures the time that passes, not that of this process: a scan waits for others.
+template <class Work>
+void measure(benchmark::State& state, Work work) {
+    for (auto iteration : state) {
+        static_cast<void>(iteration);
+        const Clock::time_point begin = Clock::now();
+        if (!work())
+            return state.SkipWithError("a library or a process failed");
+        state.SetIterationTime(std::chrono::duration<double>(Clock::now() - begin).count());
+    }
+}
 
 /// A folder of component libraries with a list, made when the first benchmark needs it.
 class ScannedFolder {
@@ -54,43 +69,28 @@ class ScannedFolder {
         return result.libraries.size() == count && result.notWritten.empty();
     }
 
+    /// Scans, unless there is a list.
+    void scanFirst() {
+        if (!std::filesystem::exists(list()))
+            scan();
+    }
+
     const unsigned int count;
 
   private:
     std::unique_ptr<LibraryFolder> folder;
 };
 
-void scanNew(benchmark::State& state, ScannedFolder& folder) {
-    for (auto iteration : state) {
-        static_cast<void>(iteration);
-        folder.forget();
-        if (!folder.scan())
-            return state.SkipWithError("a library was not recorded");
-    }
-}
-
-void startProcesses(benchmark::State& state, unsigned int count) {
+bool startProcesses(unsigned int count) {
     char* const arguments[] = {const_cast<char*>(MZ_BENCHMARK_EMPTY), nullptr};
-    for (auto iteration : state) {
-        static_cast<void>(iteration);
-        for (unsigned int started = 0; started < count; ++started) {
-            pid_t process = 0;
-            int status = 0;
-            if (::posix_spawn(&process, MZ_BENCHMARK_EMPTY, nullptr, nullptr, arguments, environ) ||
-                ::waitpid(process, &status, 0) != process || status != 0)
-                return state.SkipWithError("a process failed");
-        }
+    for (unsigned int started = 0; started < count; ++started) {
+        pid_t process = 0;
+        int status = 0;
+        if (::posix_spawn(&process, MZ_BENCHMARK_EMPTY, nullptr, nullptr, arguments, environ) ||
+            ::waitpid(process, &status, 0) != process || status != 0)
+            return false;
     }
-}
-
-void scanUnchanged(benchmark::State& state, ScannedFolder& folder) {
-    if (!folder.scan())
-        return state.SkipWithError("a library was not recorded");
-    for (auto iteration : state) {
-        static_cast<void>(iteration);
-        if (!folder.scan())
-            return state.SkipWithError("a library was not recorded");
-    }
+    return true;
 }
 
 void readOnce(const std::string& file) {
@@ -105,39 +105,49 @@ void readOnce(const std::string& file) {
 }
 
 /// Lists the folder, reads one block of each file, and the list.
-void readFiles(benchmark::State& state, ScannedFolder& folder) {
-    if (!folder.scan())
-        return state.SkipWithError("a library was not recorded");
+bool readFiles(ScannedFolder& folder) {
     const std::string path = folder.path().string();
-    for (auto iteration : state) {
-        static_cast<void>(iteration);
-        DIR* const directory = ::opendir(path.c_str());
-        while (const dirent* const entry = directory ? ::readdir(directory) : nullptr)
-            if (entry->d_name[0] != '.')
-                readOnce(path + "/" + entry->d_name);
-        if (directory)
-            ::closedir(directory);
-        std::ifstream stream(folder.list(), std::ios::binary);
-        std::string list(std::istreambuf_iterator<char>(stream), {});
-        benchmark::DoNotOptimize(list.data());
-    }
+    DIR* const directory = ::opendir(path.c_str());
+    if (!directory)
+        return false;
+    while (const dirent* const entry = ::readdir(directory))
+        if (entry->d_name[0] != '.')
+            readOnce(path + "/" + entry->d_name);
+    ::closedir(directory);
+    std::ifstream stream(folder.list(), std::ios::binary);
+    std::string list(std::istreambuf_iterator<char>(stream), {});
+    benchmark::DoNotOptimize(list.data());
+    return !list.empty();
 }
 
 } // namespace
 
 void addScanComparisons(RatioTable& table) {
     const auto few = std::make_shared<ScannedFolder>(50);
-    table.add(
+    table.addSelfTimed(
         {"scan/new", "scan of 50 new libraries, one job",
          "start of 50 processes that do nothing, their ends", std::nullopt},
-        [few](benchmark::State& state) { scanNew(state, *few); },
-        [few](benchmark::State& state) { startProcesses(state, few->count); });
+        [few](benchmark::State& state) {
+            measure(state, [&] {
+                few->forget();
+                return few->scan();
+            });
+        },
+        [few](benchmark::State& state) {
+            measure(state, [&] { return startProcesses(few->count); });
+        });
     const auto many = std::make_shared<ScannedFolder>(1000);
-    table.add(
+    table.addSelfTimed(
         {"scan/unchanged", "scan of 1,000 unchanged libraries",
          "list, status, open, one read, close; read the list", std::nullopt},
-        [many](benchmark::State& state) { scanUnchanged(state, *many); },
-        [many](benchmark::State& state) { readFiles(state, *many); });
+        [many](benchmark::State& state) {
+            many->scanFirst();
+            measure(state, [&] { return many->scan(); });
+        },
+        [many](benchmark::State& state) {
+            many->scanFirst();
+            measure(state, [&] { return readFiles(*many); });
+        });
 }
 
 } // namespace Mz::Benchmarks
