@@ -155,6 +155,7 @@ TEST_F(ScanJobs, EndWhenACallbackThrows) {
     for (const char* name : {"one", "two", "three", "four", "five"})
         add(L"loopsForever", name);
     ScanOptions wanted = options(3);
+    wanted.probe.timeLimit = std::chrono::hours(1);
     int asked = 0;
     const std::thread::id own = std::this_thread::get_id();
     bool isForeign = false;

@@ -40,14 +40,15 @@ void OrderedWork::wait(std::size_t index, const std::function<void()>& poll) {
     using Clock = std::chrono::steady_clock;
     constexpr std::chrono::milliseconds interval(10);
     std::unique_lock lock(mutex);
-    // Ends of other ends wake this thread, too, and must not delay the poll.
-    for (auto next = Clock::now() + interval; !ends[index].done;) {
-        if (changed.wait_until(lock, next) == std::cv_status::no_timeout && Clock::now() < next)
+    // The ends of other parts wake this thread, too, and must not delay the poll.
+    for (auto nextPoll = Clock::now() + interval; !ends[index].done;) {
+        if (changed.wait_until(lock, nextPoll) == std::cv_status::no_timeout &&
+            Clock::now() < nextPoll)
             continue;
         lock.unlock();
         poll();
         lock.lock();
-        next = Clock::now() + interval;
+        nextPoll = Clock::now() + interval;
     }
     if (ends[index].failure)
         std::rethrow_exception(ends[index].failure);
