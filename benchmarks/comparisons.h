@@ -13,5 +13,6 @@ void addControllerComparisons(RatioTable& table);
 void addStreamComparisons(RatioTable& table);
 void addMediaComparisons(RatioTable& table);
 void addToolsComparisons(RatioTable& table);
+void addScanComparisons(RatioTable& table);
 
 } // namespace Mz::Benchmarks

@@ -93,6 +93,7 @@ int run(int argc, char** argv) {
     addStreamComparisons(table);
     addMediaComparisons(table);
     addToolsComparisons(table);
+    addScanComparisons(table);
 
     stayOnOneCore();
     {

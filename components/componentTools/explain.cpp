@@ -5,9 +5,9 @@
 #include "components/componentTools/explain.h"
 
 #include "components/componentTools/discovery.h"
+#include "components/componentTools/inspecting/explaining.h"
 #include "components/componentTools/inspecting/hostNeeds.h"
 #include "components/componentTools/inspecting/inspection.h"
-#include "components/componentTools/inspecting/interfaceDifference.h"
 #include "components/componentTools/inspecting/uidNotes.h"
 #include "components/platform/platform.h"
 
@@ -95,13 +95,18 @@ void load(Explanation& explanation, const ExplainOptions& options) {
 } // namespace
 
 Explanation explainFile(const std::filesystem::path& file, const ExplainOptions& options) {
+    return explainFile(file, options, HostInterfaces(options.hosts));
+}
+
+Explanation explainFile(const std::filesystem::path& file, const ExplainOptions& options,
+                        const HostInterfaces& host) {
     const Candidate candidate = candidateOf(file);
     Explanation explanation;
     explanation.file = candidate.path;
     LibraryImage image;
     explanation.verdict = inspectFile(candidate.path, image);
     if (explanation.verdict.verdict == Verdict::component)
-        if (auto difference = interfaceDifference(candidate.path, options.hosts))
+        if (auto difference = host.difference(candidate.path))
             explanation.verdict = std::move(*difference);
     bool component = explanation.verdict.verdict == Verdict::component;
     if (options.followDependencies && image.format != ImageFormat::none &&

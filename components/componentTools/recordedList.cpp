@@ -6,11 +6,11 @@
 
 #include "components/componentManager/binaryStream.h"
 #include "components/componentManager/bufferio.h"
-#include "components/componentManager/files.h"
 #include "components/componentManager/nativeText.h"
 #include "components/componentManager/recordFormat.h"
 #include "components/componentTools/records/openPatiently.h"
 #include "components/componentTools/records/readRecords.h"
+#include "components/componentTools/records/replaceChanged.h"
 #include "components/componentTools/records/verdictsFile.h"
 #include "components/platform/platform.h"
 
@@ -153,7 +153,7 @@ void writeRecordedList(std::ostream& output, const RecordedLibraries& libraries)
 void writeRecordedList(const std::filesystem::path& file, const RecordedLibraries& libraries) {
     std::ostringstream content;
     writeRecordedList(content, libraries);
-    replaceFile(file, content.view());
+    replaceChanged(file, content.view());
 }
 
 std::filesystem::path verdictsFileOf(const std::filesystem::path& list) {

@@ -1,21 +1,27 @@
 // SPDX-License-Identifier: BSL-1.0
 /// Goes through the candidates in the host's order. A record of the old list is reused if the file
-/// is unchanged and a retry cannot help; otherwise the file is examined by `explainFile`. The list
-/// is written at the end, in one step, so that an interrupted scan loses no old record.
+/// is unchanged and a retry cannot help; otherwise the file is examined by `explainFile`. With
+/// several jobs, other threads examine, and this one takes their outcomes in the host's order: so
+/// everything that depends on the order, and every callback, is as with one. The list is written at
+/// the end, in one step, so that an interrupted scan loses no old record.
 #include "components/componentTools/scan.h"
 
 #include "components/componentManager/exceptions.h"
-#include "components/componentTools/explain.h"
 #include "components/componentTools/inspecting/abiDifference.h"
+#include "components/componentTools/inspecting/explaining.h"
 #include "components/componentTools/inspecting/inspection.h"
-#include "components/componentTools/inspecting/interfaceDifference.h"
 #include "components/componentTools/inspecting/uidNotes.h"
 #include "components/componentTools/reasonText.h"
 #include "components/componentTools/records/verdictsFile.h"
+#include "components/componentTools/scanning/orderedWork.h"
 #include "components/platform/platform.h"
 
 #include <algorithm>
+#include <cstddef>
 #include <map>
+#include <optional>
+#include <thread>
+#include <utility>
 
 namespace Mz::Tools {
 
@@ -23,22 +29,29 @@ namespace {
 
 using Name = std::pair<std::wstring, std::wstring>;
 
+/// The largest number of threads, far above that of processors which a scan can use.
+constexpr std::size_t mostJobs = 256;
+
+/// What was found out about one candidate.
+struct Outcome {
+    enum class Step { absent, disabled, reused, leftForLater, examined };
+    Step step = Step::absent;
+    std::optional<platform::FileStatus> status;
+    const RecordedLibrary* known = nullptr; ///< its old record
+    bool unchanged = false;                 ///< whether that has the file's time and size
+    Finding verdict;
+    std::vector<Finding> notes;
+    std::vector<RecordedBuilder> builders;
+};
+
 class Scanner {
   public:
-    explicit Scanner(const ScanOptions& wanted) : options(wanted), probeOptions(wanted.probe) {
-        probeOptions.interrupted = [this] { return isInterrupted(); };
-    }
+    explicit Scanner(const ScanOptions& wanted) : options(wanted), host(wanted.hosts) {}
 
     ScanResult run() {
         readOld();
         const Discovery discovery = discover(options.folders);
-        const std::size_t count = discovery.candidates.size();
-        for (std::size_t index = 0; index < count; ++index) {
-            result.interrupted = result.interrupted || isInterrupted();
-            if (!result.interrupted)
-                report(index, count, discovery.candidates[index]);
-            add(discovery.candidates[index]);
-        }
+        addAll(discovery.candidates);
         compareUids();
         for (const Discovery::LeftOut& left : discovery.leftOut)
             leaveOut(left);
@@ -51,6 +64,35 @@ class Scanner {
     bool isInterrupted() const {
         return (options.controller && options.controller->isInterrupted()) ||
                (options.probe.interrupted && options.probe.interrupted());
+    }
+
+    std::size_t jobs() const {
+        const std::size_t processors = std::max(1u, std::thread::hardware_concurrency());
+        return std::min(options.jobs ? options.jobs : processors, mostJobs);
+    }
+
+    void addAll(const std::vector<Candidate>& candidates) {
+        const std::size_t count = candidates.size();
+        std::vector<Outcome> outcomes(count);
+        // Threads that start processes change the error mode of the whole process, and restore the
+        // one that they find. It must be the same for all of them.
+        const platform::QuietErrors quiet;
+        OrderedWork all(count, jobs(), [&](std::size_t index, const OrderedWork& work) {
+            outcomes[index] = examine(candidates[index], work);
+        });
+        for (std::size_t index = 0; index < count; ++index) {
+            stopIfInterrupted(all);
+            if (!result.interrupted)
+                report(index, count, candidates[index]);
+            all.wait(index, [&] { stopIfInterrupted(all); });
+            add(candidates[index], std::move(outcomes[index]));
+        }
+    }
+
+    void stopIfInterrupted(OrderedWork& work) {
+        result.interrupted = result.interrupted || isInterrupted();
+        if (result.interrupted)
+            work.stop();
     }
 
     void report(std::size_t index, std::size_t count, const Candidate& candidate) const {
@@ -143,41 +185,78 @@ class Scanner {
         return !failure;
     }
 
-    void add(const Candidate& candidate) {
-        ScannedFile file{candidate.path, candidate.directory, candidate.fileName, {}, {}};
-        const auto status = platform::queryFile(candidate.path.native());
-        const Name name(candidate.directory, candidate.fileName);
-        const auto known = old.find(name);
-        const bool unchanged = known != old.end() && status && status->time == known->second.time &&
-                               status->size == known->second.size;
-        if (!status) {
-            file.verdict.verdict =
+    /// Finds out what to do with a candidate, and examines it if that is necessary. Several threads
+    /// may call it at once, which call nothing of the caller.
+    Outcome examine(const Candidate& candidate, const OrderedWork& work) const {
+        Outcome outcome;
+        outcome.status = platform::queryFile(candidate.path.native());
+        const auto known = old.find(Name(candidate.directory, candidate.fileName));
+        if (known != old.end())
+            outcome.known = &known->second;
+        outcome.unchanged = outcome.known && outcome.status &&
+                            outcome.status->time == outcome.known->time &&
+                            outcome.status->size == outcome.known->size;
+        if (!outcome.status) {
+            outcome.verdict.verdict =
                 verdictOnAbsence(candidate.path); // Gone since the folder was listed.
         } else if (const DisabledComponent* const component = findDisabled(candidate)) {
-            file.verdict = disabledFinding(*component);
-            recordWithoutBuilders(file, *status);
-        } else if (unchanged && !isTriedAgain(known->second) &&
-                   !isForOtherHost(candidate, known->second)) {
-            file.verdict = verdictOf(known->second);
-            keep(file, known->second);
-        } else if (result.interrupted) {
-            file.verdict.verdict = Verdict::interrupted;
+            outcome.step = Outcome::Step::disabled;
+            outcome.verdict = disabledFinding(*component);
+        } else if (outcome.unchanged && !isTriedAgain(*outcome.known) &&
+                   !isForOtherHost(candidate, *outcome.known)) {
+            outcome.step = Outcome::Step::reused;
+            outcome.verdict = verdictOf(*outcome.known);
+        } else if (work.isStopped()) {
+            outcome.step = Outcome::Step::leftForLater;
+            outcome.verdict.verdict = Verdict::interrupted;
         } else {
-            look(file, *status);
+            explain(candidate, work, outcome);
+        }
+        return outcome;
+    }
+
+    void explain(const Candidate& candidate, const OrderedWork& work, Outcome& outcome) const {
+        ExplainOptions explaining;
+        explaining.load = true;
+        explaining.probe = options.probe;
+        if (work.hasThreads())
+            explaining.probe.interrupted = [&work] { return work.isStopped(); };
+        else
+            explaining.probe.interrupted = [this] { return isInterrupted(); };
+        Explanation explanation = explainFile(candidate.path, explaining, host);
+        outcome.step = Outcome::Step::examined;
+        outcome.verdict = std::move(explanation.verdict);
+        outcome.notes = std::move(explanation.notes);
+        outcome.builders = std::move(explanation.builders);
+    }
+
+    void add(const Candidate& candidate, Outcome outcome) {
+        ScannedFile file{candidate.path, candidate.directory, candidate.fileName,
+                         std::move(outcome.verdict), std::move(outcome.notes)};
+        switch (outcome.step) {
+        case Outcome::Step::disabled: recordWithoutBuilders(file, *outcome.status); break;
+        case Outcome::Step::reused: keep(file, *outcome.known); break;
+        case Outcome::Step::examined:
+            record(file, *outcome.status, std::move(outcome.builders));
+            break;
+        case Outcome::Step::absent:
+        case Outcome::Step::leftForLater: break;
         }
         // A library that could not be tried keeps its old record.
-        if (known != old.end() && (file.verdict.verdict == Verdict::interrupted ||
-                                   (unchanged && file.verdict.verdict == Verdict::probeFailed)))
-            keep(file, known->second);
+        if (outcome.known && (file.verdict.verdict == Verdict::interrupted ||
+                              (outcome.unchanged && file.verdict.verdict == Verdict::probeFailed)))
+            keep(file, *outcome.known);
         result.files.push_back(std::move(file));
     }
 
     /// Returns whether a library that worked earlier does not match: its stamp, or its interfaces.
     /// The library does not change when libMZcomponentManager or the host is replaced.
     bool isForOtherHost(const Candidate& candidate, const RecordedLibrary& library) const {
-        return !library.builders.empty() &&
-               (abiDifference(readLibraryImage(candidate.path)).has_value() ||
-                interfaceDifference(candidate.path, options.hosts).has_value());
+        if (library.builders.empty())
+            return false;
+        FileBytes file(candidate.path);
+        return abiDifference(readLibraryImage(file)).has_value() ||
+               host.difference(file).has_value();
     }
 
     /// Returns whether an unchanged library may have another result now.
@@ -219,15 +298,10 @@ class Scanner {
         result.libraries.push_back(std::move(library));
     }
 
-    void look(ScannedFile& file, const platform::FileStatus& status) {
-        ExplainOptions explaining;
-        explaining.load = true;
-        explaining.hosts = options.hosts;
-        explaining.probe = probeOptions;
-        Explanation explanation = explainFile(file.path, explaining);
+    /// Records what the examination of a library found.
+    void record(ScannedFile& file, const platform::FileStatus& status,
+                std::vector<RecordedBuilder> builders) {
         file.looked = true;
-        file.verdict = std::move(explanation.verdict);
-        file.notes = std::move(explanation.notes);
         if (file.verdict.verdict == Verdict::interrupted) {
             result.interrupted = true;
             return;
@@ -247,7 +321,7 @@ class Scanner {
             return;
         }
         if (file.verdict.verdict == Verdict::works)
-            library.builders = std::move(explanation.builders);
+            library.builders = std::move(builders);
         if (const std::wstring* text = uncarriedText(library)) {
             // A record without builders would keep hosts from loading it, though it works.
             file.verdict = {Verdict::textNotCarried, *text, {}};
@@ -295,7 +369,7 @@ class Scanner {
     }
 
     const ScanOptions& options;
-    ProbeOptions probeOptions;
+    const HostInterfaces host;
     std::map<Name, RecordedLibrary> old;
     DisabledComponents disabled;
     ScanResult result;

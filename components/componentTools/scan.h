@@ -8,6 +8,7 @@
 
 #include "components/componentManager/processControl.h"
 
+#include <cstddef>
 #include <filesystem>
 #include <string>
 #include <vector>
@@ -29,6 +30,16 @@ struct ScanOptions {
     ProbeOptions probe;
     /// Receives the progress and decides whether to stop; may be null. The caller owns it.
     QrProcessControl* controller = nullptr;
+    /// How many libraries to try at a time; 0 for the number of processors. Since 0.2.
+    ///
+    /// The result and the list are the same as with one. So are the callbacks: `scan` calls all of
+    /// them in the thread of its caller, never two at once, and reports libraries in the host's
+    /// order. The limits hold for each library; together they may use `jobs` times the memory.
+    ///
+    /// The default is one, because libraries that are loaded at the same time may disturb each
+    /// other: two that open the same port, device or file as they are loaded work one by one, and
+    /// fail together. Such a failure would be recorded.
+    std::size_t jobs = 1;
 };
 
 /// The result for one file or folder.

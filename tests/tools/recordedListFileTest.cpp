@@ -57,6 +57,20 @@ TEST_F(RecordedListFile, ComesBackAsItWasWritten) {
     EXPECT_EQ(reading.libraries[0].position, 4);
 }
 
+TEST_F(RecordedListFile, IsReplacedOnlyIfItChanges) {
+    RecordedLibraries libraries = sample();
+    writeRecordedList(file(), libraries);
+    const auto before = std::filesystem::file_time_type::clock::now() - std::chrono::hours(1);
+    std::filesystem::last_write_time(file(), before);
+    const auto written = std::filesystem::last_write_time(file());
+    writeRecordedList(file(), libraries);
+    EXPECT_EQ(std::filesystem::last_write_time(file()), written);
+    ++libraries[1].builders[0].uid.w3; // The size of the file stays.
+    writeRecordedList(file(), libraries);
+    EXPECT_TRUE(same(readRecordedList(file()).libraries, libraries));
+    EXPECT_NE(std::filesystem::last_write_time(file()), written);
+}
+
 TEST_F(RecordedListFile, HasTheManagersOwnBytes) {
     writeRecordedList(file(),
                       {{L"\\a", L"b", 0x01020304, 5, {{{1, 2, 3, 4}, L"n", L"", L"", 9, true}}}});

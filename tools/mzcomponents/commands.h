@@ -38,6 +38,7 @@ struct ProbeArguments {
     double seconds = 10;
     unsigned int mebibytes = 1024;
     bool retry = false;
+    unsigned int jobs = 1; ///< 0 for the number of processors
 
     Tools::ProbeOptions options() const {
         Tools::ProbeOptions result;

@@ -222,6 +222,7 @@ int scan(const Common& common, const ProbeArguments& probe) {
     options.list = Tools::pathOf(common.cache);
     options.hosts = common.host.paths();
     options.retry = probe.retry;
+    options.jobs = probe.jobs;
     options.probe = probe.options();
     options.controller = &controller;
     const Tools::ScanResult result = Tools::scan(options);

@@ -148,6 +148,10 @@ void addLookCommands(CLI::App& app, Arguments& arguments) {
         ->check(namesAFile);
     addHostOption(*scan, arguments.common.host);
     scan->add_flag("--retry", arguments.probe.retry, "Retry libraries that failed earlier");
+    scan->add_option("-j,--jobs", arguments.probe.jobs,
+                     "Libraries to try at a time; 0 for the number of processors")
+        ->check(CLI::Range(0u, 256u))
+        ->capture_default_str();
     addLimits(scan, arguments);
     scan->callback([&] {
         arguments.command = [&] { return Mz::Commands::scan(arguments.common, arguments.probe); };

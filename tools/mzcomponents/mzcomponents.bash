@@ -38,7 +38,7 @@ _mzcomponents() {
   enable) options="--cache --help" ;;
   bisect) options="$common $limits --repeat --time --running-is-good --ask" ;;
   explain) options="$common $limits --host --load" ;;
-  scan) options="$common $limits --host --retry" ;;
+  scan) options="$common $limits --host --retry --jobs" ;;
   profile) options="$common $limits --runs --svg" ;;
   import) options="$common $limits --save --guarded" ;;
   graph) options="$common $limits --output --svg" ;;

@@ -129,9 +129,13 @@ class ElfReader {
     /// sections, which the loader does not need.
     std::string sections(std::string_view prefix) {
         std::string content;
+        std::vector<Section> wanted;
         if (!readHeader() || !image.otherProcessor.empty() || header.sectionSize != sizeof(Section))
             return content;
+        section(0); // So that the block with the first one has as many of the others as it can.
         const auto names = section(header.names);
+        if (names)
+            file.read<char>(names->offset); // The same for the names.
         for (std::size_t index = 0; names && index < header.sectionCount; ++index) {
             const auto candidate = section(index);
             if (!candidate || candidate->type != programContent || candidate->name >= names->size)
@@ -142,8 +146,11 @@ class ElfReader {
             if (length == prefix.size() && length <= sizeof name &&
                 file.read(names->offset + candidate->name, name, prefix.size()) &&
                 std::string_view(name, prefix.size()) == prefix)
-                appendSection(file, candidate->offset, candidate->size, content);
+                wanted.push_back(*candidate);
         }
+        // Afterwards: their bytes would take the place of the tables in the cached blocks.
+        for (const Section& found : wanted)
+            appendSection(file, found.offset, found.size, content);
         return content;
     }
 

@@ -11,11 +11,11 @@
 namespace Mz::Tools {
 
 FileBytes::Source::Source(const std::filesystem::path& path) {
+    stream.rdbuf()->pubsetbuf(nullptr, 0); // `FileBlocks` has its own.
     opened = platform::openForReading(stream, path.native());
     if (!opened)
         return;
-    stream.seekg(0, std::ios::end);
-    const auto end = static_cast<std::streamoff>(stream.tellg());
+    const std::streamoff end = stream.rdbuf()->pubseekoff(0, std::ios::end, std::ios::in);
     bytes = end > 0 ? static_cast<std::uint64_t>(end) : 0;
 }
 
@@ -53,8 +53,12 @@ std::optional<ComponentStamp> validStamp(const std::optional<ComponentStamp>& st
 }
 
 LibraryImage readLibraryImage(const std::filesystem::path& path) {
-    LibraryImage image;
     FileBytes file(path);
+    return readLibraryImage(file);
+}
+
+LibraryImage readLibraryImage(FileBytes& file) {
+    LibraryImage image;
     image.readable = file.isOpen();
     if (!image.readable)
         return image;
@@ -78,6 +82,10 @@ std::vector<std::string> exportedNames(const std::filesystem::path& path) {
 
 std::string sectionsOf(const std::filesystem::path& path, std::string_view prefix) {
     FileBytes file(path);
+    return sectionsOf(file, prefix);
+}
+
+std::string sectionsOf(FileBytes& file, std::string_view prefix) {
     const auto magic = file.read<std::array<char, 4>>(0);
     if (magic && std::memcmp(magic->data(), "\177ELF", 4) == 0)
         return elfSections(file, prefix);
@@ -92,14 +100,12 @@ bool appendSection(FileBytes& file, std::uint64_t offset, std::uint64_t size,
     if (begin > mostSectionBytes || size > mostSectionBytes - begin || !file.reaches(offset, size))
         return false;
     content.resize(begin + static_cast<std::size_t>(size));
-    for (std::size_t done = 0; done < size;) {
-        const std::size_t piece = std::min<std::size_t>(static_cast<std::size_t>(size) - done,
-                                                        platform::FileBlocks::blockSize);
-        if (!file.read(offset + done, content.data() + begin + done, piece)) {
-            content.resize(begin);
-            return false;
-        }
-        done += piece;
+    char* const target = content.data() + begin;
+    const auto length = static_cast<std::size_t>(size);
+    if (length <= platform::FileBlocks::blockSize ? !file.read(offset, target, length)
+                                                  : !file.readLong(offset, target, length)) {
+        content.resize(begin);
+        return false;
     }
     return true;
 }

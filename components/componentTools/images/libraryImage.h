@@ -44,6 +44,12 @@ class FileBytes {
         return blocks.read(offset, data, length);
     }
 
+    /// Reads any number of bytes, past the cached blocks. Returns false if it cannot read all of
+    /// them.
+    bool readLong(std::uint64_t offset, void* data, std::size_t length) {
+        return reaches(offset, length) && source.read(offset, data, length) == length;
+    }
+
     /// Returns the NUL-terminated text at `offset`; `std::nullopt` if it is not terminated or has
     /// 4096 bytes or more.
     std::optional<std::string> text(std::uint64_t offset);
@@ -86,6 +92,7 @@ struct LibraryImage {
 
 /// Returns the image of a file, which must be a regular file: opening a pipe would block.
 LibraryImage readLibraryImage(const std::filesystem::path& path);
+LibraryImage readLibraryImage(FileBytes& file);
 
 /// The parts of `readLibraryImage`. Each fills `image` from a file with the magic number of its
 /// format, and stops at the first fault.
@@ -116,6 +123,7 @@ std::vector<std::string> exportedNames(const std::filesystem::path& path);
 /// after the other. Each begins at a multiple of 8. Empty if the file has none or cannot be read.
 /// No more than `mostSectionBytes`.
 std::string sectionsOf(const std::filesystem::path& path, std::string_view prefix);
+std::string sectionsOf(FileBytes& file, std::string_view prefix);
 
 /// Appends a section that the file contains as a whole. Returns false if it is missing or too long.
 bool appendSection(FileBytes& file, std::uint64_t offset, std::uint64_t size, std::string& content);

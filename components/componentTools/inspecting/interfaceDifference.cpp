@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: BSL-1.0
 /// Reports the first difference only: an inserted operation moves all that follow, and the first
-/// one shows where the edit is.
+/// one shows where the edit is. Components that are compiled with the headers of their host contain
+/// the same bytes as it, so their tables are compared as bytes first.
 #include "components/componentTools/inspecting/interfaceDifference.h"
 
 #include "components/componentManager/interfaceTable.h"
@@ -185,17 +186,54 @@ std::optional<Finding> interfaceDifference(const std::vector<InterfaceTable>& co
     return std::nullopt;
 }
 
-std::optional<Finding> interfaceDifference(const std::filesystem::path& component,
-                                           const std::vector<std::filesystem::path>& hosts) {
-    const std::vector<InterfaceTable> here = interfaceTablesOf(component);
+std::optional<Finding> HostInterfaces::difference(const std::filesystem::path& component) const {
+    FileBytes file(component);
+    return difference(file);
+}
+
+std::optional<Finding> HostInterfaces::difference(FileBytes& component) const {
+    return differenceOf(sectionsOf(component, interfaceSection));
+}
+
+std::optional<Finding> HostInterfaces::differenceOf(const std::string& content) const {
+    const std::vector<std::string_view> here = splitInterfaceTables(content);
     if (here.empty())
         return std::nullopt;
-    std::vector<std::filesystem::path> files{System::managerFile(), platform::programFile()};
-    files.insert(files.end(), hosts.begin(), hosts.end());
-    for (const std::filesystem::path& host : files)
-        if (auto finding = interfaceDifference(here, interfaceTablesOf(host)))
+    std::call_once(isRead, [this] { read(); });
+    std::string unknown;
+    for (const std::string_view table : here)
+        if (!known.contains(table))
+            unknown += table;
+    const std::vector<InterfaceTable> others = parseInterfaceTables(unknown);
+    for (const std::vector<InterfaceTable>& host : tables)
+        if (auto finding = interfaceDifference(others, host))
             return finding;
     return std::nullopt;
+}
+
+void HostInterfaces::read() const {
+    std::vector<std::filesystem::path> all{System::managerFile(), platform::programFile()};
+    all.insert(all.end(), files.begin(), files.end());
+    std::vector<std::string> contents;
+    for (const std::filesystem::path& host : all)
+        tables.push_back(
+            parseInterfaceTables(contents.emplace_back(sectionsOf(host, interfaceSection))));
+    for (const std::string& content : contents)
+        for (const std::string_view table : splitInterfaceTables(content))
+            if (differsFromNone(table))
+                known.emplace(table);
+}
+
+bool HostInterfaces::differsFromNone(std::string_view table) const {
+    const std::vector<InterfaceTable> one = parseInterfaceTables(table);
+    return std::none_of(tables.begin(), tables.end(), [&](const auto& host) {
+        return interfaceDifference(one, host).has_value();
+    });
+}
+
+std::optional<Finding> interfaceDifference(const std::filesystem::path& component,
+                                           const std::vector<std::filesystem::path>& hosts) {
+    return HostInterfaces(hosts).difference(component);
 }
 
 } // namespace Mz::Tools

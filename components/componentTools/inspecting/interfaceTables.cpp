@@ -86,10 +86,9 @@ std::optional<InterfaceTable> parseTable(const InterfaceHead& head, std::string_
 
 } // namespace
 
-std::vector<InterfaceTable> parseInterfaceTables(std::string_view content) {
+std::vector<std::string_view> splitInterfaceTables(std::string_view content) {
     static constexpr char magic[8] = "MZiface";
-    constexpr std::uint16_t layout = 1;
-    std::vector<InterfaceTable> tables;
+    std::vector<std::string_view> tables;
     while (content.size() >= sizeof(InterfaceHead)) {
         if (readHead<std::uint64_t>(content) == 0) {
             content.remove_prefix(step); // Bytes that align the next table.
@@ -99,10 +98,20 @@ std::vector<InterfaceTable> parseInterfaceTables(std::string_view content) {
         if (std::memcmp(head.magic, magic, sizeof magic) != 0 || head.size < sizeof head ||
             head.size % step || head.size > content.size())
             break;
-        if (head.layout == layout)
-            if (auto table = parseTable(head, content.substr(0, head.size)))
-                tables.push_back(std::move(*table));
+        tables.push_back(content.substr(0, head.size));
         content.remove_prefix(head.size);
+    }
+    return tables;
+}
+
+std::vector<InterfaceTable> parseInterfaceTables(std::string_view content) {
+    constexpr std::uint16_t layout = 1;
+    std::vector<InterfaceTable> tables;
+    for (const std::string_view bytes : splitInterfaceTables(content)) {
+        const auto head = readHead<InterfaceHead>(bytes);
+        if (head.layout == layout)
+            if (auto table = parseTable(head, bytes))
+                tables.push_back(std::move(*table));
     }
     return tables;
 }

@@ -54,4 +54,7 @@ std::vector<InterfaceTable> interfaceTablesOf(const std::filesystem::path& file)
 /// Returns the fingerprints in the content of a file's sections.
 std::vector<InterfaceTable> parseInterfaceTables(std::string_view content);
 
+/// Returns the bytes of each fingerprint in the content, without reading them further.
+std::vector<std::string_view> splitInterfaceTables(std::string_view content);
+
 } // namespace Mz::Tools

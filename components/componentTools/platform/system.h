@@ -212,6 +212,19 @@ bool writeReserved(int descriptor, const char* data, std::size_t size);
 /// process may have ignored it. No-op on Windows.
 void resetChildSignal();
 
+/// While it lives, the calling thread receives no signals except those of its own faults. Threads
+/// that it starts inherit that, for as long as they live. No-op on Windows.
+class BlockedSignals {
+  public:
+    BlockedSignals();
+    ~BlockedSignals();
+    BlockedSignals(const BlockedSignals&) = delete;
+    BlockedSignals& operator=(const BlockedSignals&) = delete;
+
+  private:
+    [[maybe_unused]] std::uint64_t previous = 0; ///< one bit for each signal
+};
+
 /// Prepares this process for loading faulty libraries: it ends with its parent, opens no dialogs,
 /// leaves no core dump, and gets at most `refused` bytes of memory, unless that is 0. Writable
 /// reserved addresses count. On Windows, `runChild` enforces the memory limit and the end with the

@@ -5,9 +5,9 @@
 /// Names, not numbers, identify verdicts, so that versions can exchange files.
 #include "components/componentTools/records/verdictsFile.h"
 
-#include "components/componentManager/files.h"
 #include "components/componentManager/utf8.h"
 #include "components/componentTools/records/openPatiently.h"
+#include "components/componentTools/records/replaceChanged.h"
 #include "components/platform/platform.h"
 
 #include <cstdint>
@@ -152,7 +152,7 @@ void writeVerdicts(const std::filesystem::path& file, const RecordedLibraries& l
                                {"sentence", toUtf8(sentenceOf(*library.kept))},
                                {"cure", toUtf8(cureOf(*library.kept))}});
     const OrderedJson all{{"version", version}, {"libraries", entries}, {"disabled", choices}};
-    replaceFile(file, all.dump(2, ' ', true) + "\n");
+    replaceChanged(file, all.dump(2, ' ', true) + "\n");
 }
 
 } // namespace Mz::Tools

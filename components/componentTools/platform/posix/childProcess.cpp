@@ -1,8 +1,11 @@
 // SPDX-License-Identifier: BSL-1.0
 /// The child runs in its own process group, so that the processes that it starts can be killed with
 /// it. The parent polls the used memory in /proc: limits of the system count reserved addresses
-/// too, which code generators and drivers reserve in large amounts. The child's standard input is a
-/// socket: unlike a pipe, it can be written without a signal if the child has closed it.
+/// too, which code generators and drivers reserve in large amounts. The end of the child wakes the
+/// parent through a descriptor of the process, because the end of its output is no sign of it: the
+/// child may close the pipe earlier, and a process that it started may keep the pipe open. The
+/// child's standard input is a socket: unlike a pipe, it can be written without a signal if the
+/// child has closed it.
 #include "components/componentTools/platform/system.h"
 
 #include "components/componentTools/platform/posix/inheritedNumber.h"
@@ -10,15 +13,18 @@
 #include <algorithm>
 #include <cerrno>
 #include <csignal>
+#include <cstdio>
+#include <cstdlib>
 #include <cstring>
+#include <ctime>
 #include <fcntl.h>
-#include <fstream>
 #include <poll.h>
 #include <spawn.h>
 #include <string_view>
 #include <sys/resource.h>
 #include <sys/socket.h>
 #include <sys/stat.h>
+#include <sys/syscall.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
@@ -28,8 +34,10 @@ namespace {
 
 using Clock = std::chrono::steady_clock;
 
-/// The polling interval of the child's memory, in milliseconds.
-constexpr int pause = 10;
+/// The polling interval of the child's memory.
+constexpr std::chrono::nanoseconds pause = std::chrono::milliseconds(10);
+/// The first interval in which a child is polled whose end the system cannot report.
+constexpr std::chrono::nanoseconds shortestPause = std::chrono::microseconds(50);
 
 class Descriptor {
   public:
@@ -123,12 +131,28 @@ int start(const NativePath& program, const std::vector<NativePath>& arguments, c
     return failure;
 }
 
-/// Returns the memory that the process uses, in bytes; 0 if it has ended.
+/// Returns the memory that the process uses, in bytes; 0 if it has ended. Called after each piece
+/// of output, so it makes no more than the three system calls that it needs.
 std::uint64_t memoryOf(pid_t process) {
-    std::ifstream file("/proc/" + std::to_string(process) + "/statm");
-    std::uint64_t all = 0, resident = 0;
-    file >> all >> resident;
+    char text[64];
+    std::snprintf(text, sizeof text, "/proc/%ld/statm", static_cast<long>(process));
+    const Descriptor file(::open(text, O_RDONLY | O_CLOEXEC));
+    const ssize_t size = file.get() < 0 ? 0 : ::read(file.get(), text, sizeof text - 1);
+    text[std::max<ssize_t>(size, 0)] = '\0';
+    const char* const second = std::strchr(text, ' '); // After the reserved addresses.
+    const std::uint64_t resident = second ? std::strtoull(second, nullptr, 10) : 0;
     return resident * static_cast<std::uint64_t>(::sysconf(_SC_PAGESIZE));
+}
+
+/// Returns a descriptor that becomes readable when the process ends; -1 if the system has none, as
+/// before Linux 5.3 and in some containers.
+int endOf(pid_t process) {
+#ifdef SYS_pidfd_open
+    return static_cast<int>(::syscall(SYS_pidfd_open, process, 0));
+#else
+    static_cast<void>(process);
+    return -1;
+#endif
 }
 
 const wchar_t* signalName(int number) {
@@ -151,8 +175,8 @@ class Watch {
     /// \param socket  the other end of the child's standard input; -1 for none
     Watch(pid_t process, int pipe, int socket, const ChildLimits& allowed,
           const ChildSupply& supplied)
-        : child(process), output(pipe), input(socket), limits(allowed), supply(supplied),
-          end(Clock::now() + allowed.time) {}
+        : child(process), ended(endOf(process)), output(pipe), input(socket), limits(allowed),
+          supply(supplied), end(Clock::now() + allowed.time) {}
     ~Watch() {
         if (reaped)
             return;
@@ -168,7 +192,7 @@ class Watch {
         rusage usage{};
         while (!over(status, usage)) {
             sendInput();
-            waitForOutput();
+            waitForEvent();
             readOutput();
             judge();
         }
@@ -207,10 +231,11 @@ class Watch {
     }
 
     bool over(int& status, rusage& usage) {
-        const pid_t ended = ::wait4(child, &status, judged ? 0 : WNOHANG, &usage);
+        // A debugger of the child receives its end first. Wait for that, too.
+        const pid_t found = ::wait4(child, &status, judged || hasEnded ? 0 : WNOHANG, &usage);
         // If this process ignores SIGCHLD, the system does not store the child's exit status.
-        unknown = ended < 0 && errno == ECHILD;
-        reaped = ended == child || (ended < 0 && errno != EINTR);
+        unknown = found < 0 && errno == ECHILD;
+        reaped = found == child || (found < 0 && errno != EINTR);
         return reaped;
     }
 
@@ -230,11 +255,23 @@ class Watch {
         }
     }
 
-    void waitForOutput() {
+    /// Waits for output, for the end of the child, or until it can take input.
+    void waitForEvent() {
         // A closed pipe is always ready, so do not poll it: the system skips negative descriptors.
         pollfd wanted[] = {{closed ? -1 : output, POLLIN, 0},
-                           {hasInput() ? input : -1, POLLOUT, 0}};
-        ::poll(wanted, 2, pause);
+                           {hasInput() ? input : -1, POLLOUT, 0},
+                           {ended.get(), POLLIN, 0}};
+        const timespec longest{0, static_cast<long>(nextPause().count())};
+        hasEnded = ::ppoll(wanted, 3, &longest, nullptr) > 0 && wanted[2].revents != 0;
+    }
+
+    /// Returns the time to wait. Without a descriptor of the process, the end of its output is the
+    /// first sign of its end, which follows soon: poll often at first, then less often.
+    std::chrono::nanoseconds nextPause() {
+        if (ended.get() >= 0 || !closed)
+            return pause;
+        closedPause = std::min(pause, closedPause * 2);
+        return closedPause;
     }
 
     /// Reads the available output, but not for ever, because the child may write faster.
@@ -294,13 +331,16 @@ class Watch {
     }
 
     pid_t child;
+    const Descriptor ended;
     int output;
     int input;
     const ChildLimits& limits;
     const ChildSupply& supply;
     Clock::time_point end;
     ChildResult judgement;
+    std::chrono::nanoseconds closedPause = shortestPause / 2; ///< the last one after the output
     bool judged = false;
+    bool hasEnded = false;
     bool reaped = false;
     bool closed = false;
     bool unknown = false;

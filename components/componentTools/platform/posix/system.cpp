@@ -33,6 +33,8 @@ namespace Mz::Tools::System {
 
 namespace {
 
+constexpr int mostSignals = 64;
+
 bool isFile(const NativePath& path) {
     struct stat status;
     return ::stat(path.c_str(), &status) == 0 && S_ISREG(status.st_mode);
@@ -311,6 +313,26 @@ bool writeReserved(int descriptor, const char* data, std::size_t size) {
 
 void resetChildSignal() {
     std::signal(SIGCHLD, SIG_DFL);
+}
+
+BlockedSignals::BlockedSignals() {
+    sigset_t blocked, before;
+    ::sigfillset(&blocked);
+    for (const int fault : {SIGSEGV, SIGBUS, SIGFPE, SIGILL, SIGTRAP, SIGABRT})
+        ::sigdelset(&blocked, fault);
+    ::pthread_sigmask(SIG_BLOCK, &blocked, &before);
+    for (int number = 1; number <= mostSignals; ++number)
+        if (::sigismember(&before, number) == 1)
+            previous |= std::uint64_t{1} << (number - 1);
+}
+
+BlockedSignals::~BlockedSignals() {
+    sigset_t before;
+    ::sigemptyset(&before);
+    for (int number = 1; number <= mostSignals; ++number)
+        if (previous >> (number - 1) & 1)
+            ::sigaddset(&before, number);
+    ::pthread_sigmask(SIG_SETMASK, &before, nullptr);
 }
 
 void confine(std::uint64_t refused) {

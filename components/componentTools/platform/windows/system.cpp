@@ -300,6 +300,9 @@ bool writeReserved(int descriptor, const char* data, std::size_t size) {
 
 void resetChildSignal() {}
 
+BlockedSignals::BlockedSignals() = default;
+BlockedSignals::~BlockedSignals() = default;
+
 void confine(std::uint64_t) {
     ::SetErrorMode(SEM_FAILCRITICALERRORS | SEM_NOGPFAULTERRORBOX | SEM_NOOPENFILEERRORBOX);
     ::AddVectoredExceptionHandler(1, noteFault);
