@@ -84,6 +84,8 @@ class Profiler {
         for (int run = 0; run <= std::max(options.runs, 1); ++run) {
             if (run == 1)
                 clearSamples();
+            if (interrupted())
+                return true;
             if (!measureSteps())
                 return over;
             measureWhole();
@@ -91,6 +93,15 @@ class Profiler {
                 return true;
             result.runs += run > 0;
         }
+        return true;
+    }
+
+    /// Asks between processes, too: a short one can end before anybody asks.
+    bool interrupted() {
+        const auto& asked = options.process.interrupted;
+        if (!asked || !asked())
+            return false;
+        result.interrupted = over = true;
         return true;
     }
 
