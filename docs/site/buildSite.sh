@@ -47,3 +47,7 @@ for page in page_streams classMz_1_1QrStream; do
     exit 1
   fi
 done
+if grep -l '@section' "$output"/*.html >&2; then
+  echo "these pages show a heading as a command" >&2
+  exit 1
+fi

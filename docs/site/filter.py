@@ -10,9 +10,9 @@ import os
 import re
 import sys
 
-FENCE = re.compile(r"^\s*```")
 HEADING = re.compile(r"^(#{1,6}) +(.*?) *$")
 LINK = re.compile(r"(?<!\!)\[((?:[^\[\]]|\[[^\]]*\])*)\]\(([^()\s]+)\)")
+LINK_AND_WORD = re.compile(LINK.pattern + r"\S* ?")
 
 
 CODE = re.compile(r"`[^`\n]+`")
@@ -115,19 +115,28 @@ class Guide:
             return f"[{text}](@ref {anchor_of(path, anchor)})"
         return f"[{text}](@ref {'index' if path == 'docs/README.md' else page_of(path)})"
 
-    def links(self, line: str) -> str:
-        return LINK.sub(self.link, line)
+    def links(self, text: str) -> str:
+        return LINK.sub(self.link, text)
+
+    def on_one_line(self, match: re.Match) -> str:
+        """Moves the line breaks of a link behind it: on a page with a table, doxygen would show its
+        commands for headings as text."""
+        words = match.group(0)
+        if "\n" not in words:
+            return words
+        return re.sub(r"\n *", " ", words.rstrip(" ")) + "\n" * words.count("\n")
 
     def filtered(self, text: str) -> str:
+        # Every second part is a block of code.
+        parts = re.split(r"(?ms)(^ *```.*?^ *```$)", text)
+        parts[::2] = [self.prose(LINK_AND_WORD.sub(self.on_one_line, part)) for part in parts[::2]]
+        return "".join(parts)
+
+    def prose(self, text: str) -> str:
         lines = []
-        fenced = False
         for line in text.split("\n"):
-            if FENCE.match(line):
-                fenced = not fenced
-            elif not fenced:
-                match = HEADING.match(line)
-                line = with_percent_signs(self.heading(match) if match else self.links(line))
-            lines.append(line)
+            match = HEADING.match(line)
+            lines.append(with_percent_signs(self.heading(match) if match else self.links(line)))
         return "\n".join(lines)
 
 
