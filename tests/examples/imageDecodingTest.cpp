@@ -39,7 +39,7 @@ std::string bitmap(std::size_t width, std::size_t height) {
     std::string bytes = "BM" + littleEndian(headerSize + size, 4) + littleEndian(0, 4) +
                         littleEndian(headerSize, 4) + littleEndian(40, 4) + littleEndian(width, 4) +
                         littleEndian(height, 4) + littleEndian(1, 2) + littleEndian(32, 2) +
-                        littleEndian(0, 4) + littleEndian(size, 4) + littleEndian(0, 16);
+                        littleEndian(0, 4) + littleEndian(size, 4) + std::string(16, '\0');
     for (std::size_t pixel = 0; pixel < width * height; ++pixel)
         bytes += "\x10\x20\x30\xFF"; // blue, green, red, alpha
     return bytes;
