@@ -1,0 +1,157 @@
+#!/usr/bin/env python3
+# SPDX-License-Identifier: BSL-1.0
+"""Puts small faults into the libraries, one at a time, and reports those that no test notices.
+
+    mutate.py FOLDER COUNT SEED
+
+FOLDER contains a clone of the project in `source`, with the build `source/build/linux-release`. Each
+outcome is appended to `FOLDER/outcomes.jsonl`, so that a run that was stopped goes on where it was.
+Ends with 1 if a fault was not noticed that is not in equivalent.txt.
+"""
+import collections
+import hashlib
+import json
+import pathlib
+import random
+import re
+import subprocess
+import sys
+import tempfile
+import time
+
+import faults
+
+FOLDERS = ("componentManager", "objectIO", "componentTools")
+TARGETS = ("mzManagerObjects", "MZobjectIO", "mzToolsObjects")
+# Tests that compile, draw or read the tree. They take most of the time, and judge no behaviour.
+# Nor those that are disabled, at which ctest would stop.
+LEFT_OUT = (r"/(Package|Documentation|Compatibility|KitRefusal|Refusal|Client|Tree|Exports|Run|"
+            r"KitListWriter|KitImportPolicyList)\.")
+BUILD_LIMIT = 600
+TEST_LIMIT = 600
+
+
+class Judge:
+    def __init__(self, folder: pathlib.Path) -> None:
+        self.source = folder / "source"
+        self.build = self.source / "build/linux-release"
+        self.objects = self.digests()
+
+    def digests(self) -> dict[pathlib.Path, str]:
+        """Returns digests of the libraries' objects without debug symbols, which name columns."""
+        found = {}
+        with tempfile.NamedTemporaryFile() as stripped:
+            for target in TARGETS:
+                for file in self.build.glob(f"components/*/CMakeFiles/{target}.dir/**/*.o"):
+                    subprocess.run(["objcopy", "--strip-debug", file, stripped.name], check=True)
+                    content = pathlib.Path(stripped.name).read_bytes()
+                    found[file] = hashlib.sha256(content).hexdigest()
+        return found
+
+    def run(self, limit: int, *command: str) -> subprocess.CompletedProcess[str] | None:
+        try:
+            return subprocess.run(command, cwd=self.build, text=True, timeout=limit, check=False,
+                                  stdout=subprocess.PIPE, stderr=subprocess.STDOUT,
+                                  stdin=subprocess.DEVNULL)
+        except subprocess.TimeoutExpired:
+            return None
+
+    def outcome(self, file: pathlib.Path, faulty: str) -> tuple[str, str]:
+        """Returns what became of a fault, and the test that noticed it."""
+        original = file.read_text(encoding="utf-8")
+        try:
+            file.write_text(faulty, encoding="utf-8")
+            built = self.run(BUILD_LIMIT, "ninja", *TARGETS)
+            if built is None or built.returncode:
+                return "invalid", ""
+            if self.digests() == self.objects:
+                return "same object", ""
+            built = self.run(BUILD_LIMIT, "ninja")
+            if built is None or built.returncode:
+                # Programs list their tests when they are built; a fault may keep them from that.
+                return "noticed", "the build"
+            failed = self.failed_test()
+            return ("noticed", failed) if failed else ("not noticed", "")
+        finally:
+            file.write_text(original, encoding="utf-8")
+
+    def failed_test(self) -> str:
+        """Runs the tests up to the first that fails, and returns its name; empty if all pass."""
+        tested = self.run(TEST_LIMIT, "ctest", "-j4", "--stop-on-failure", "--timeout", "60",
+                          "-E", LEFT_OUT)
+        if tested is None:
+            return "the limit of time"
+        failed = re.search(r"Test +#\d+: (\S+).*\*\*\*(?!Skipped)", tested.stdout)
+        if not tested.returncode:
+            return ""
+        return failed.group(1) if failed else "ctest"
+
+
+def chosen(source: pathlib.Path, count: int, seed: int) -> list[tuple[str, faults.Fault]]:
+    """Returns the faults of a seed: as many of each kind as there are."""
+    kinds = collections.defaultdict(list)
+    for folder in FOLDERS:
+        for file in sorted((source / "components" / folder).rglob("*.cpp")):
+            if "windows" in file.parts:
+                continue
+            for fault in faults.faults_of(file.read_text(encoding="utf-8")):
+                kinds[fault.kind].append((str(file.relative_to(source)), fault))
+    generator = random.Random(seed)
+    for some in kinds.values():
+        generator.shuffle(some)
+    order = sorted(kinds)
+    return [kinds[order[number % len(order)]][number // len(order)] for number in range(count)]
+
+
+def known_equivalents(file: pathlib.Path) -> set[tuple[str, str, str]]:
+    """Returns the faults that change nothing: file, line and faulty line; the reason follows."""
+    lines = [line for line in file.read_text(encoding="utf-8").splitlines()
+             if line and not line.startswith("#")]
+    return {tuple(part.strip() for part in line.split(" | ")[:3]) for line in lines}  # type: ignore
+
+
+def main() -> int:
+    folder, count, seed = pathlib.Path(sys.argv[1]), int(sys.argv[2]), int(sys.argv[3])
+    judge = Judge(folder)
+    failed = judge.failed_test()
+    if failed:
+        sys.exit(f"without any fault, {failed} fails")
+    log = folder / "outcomes.jsonl"
+    known = [json.loads(line) for line in log.read_text().splitlines()] if log.exists() else []
+    done = {(entry["file"], entry["line"], entry["old"], entry["new"]): entry for entry in known}
+    equivalent = known_equivalents(pathlib.Path(__file__).with_name("equivalent.txt"))
+    tally: collections.Counter[str] = collections.Counter()
+    survivors = []
+    for number, (name, fault) in enumerate(chosen(judge.source, count, seed), 1):
+        file = judge.source / name
+        source = file.read_text(encoding="utf-8")
+        faulty = fault.put_into(source)
+        line = fault.line(source)
+        old = source.splitlines()[line - 1].strip()
+        new = faulty.splitlines()[line - 1].strip()
+        entry = done.get((name, line, old, new))
+        if entry is None:
+            begin = time.monotonic()
+            verdict, test = judge.outcome(file, faulty)
+            entry = {"file": name, "line": line, "old": old, "new": new, "kind": fault.kind,
+                     "verdict": verdict, "test": test, "seconds": round(time.monotonic() - begin)}
+            with log.open("a", encoding="utf-8") as output:
+                output.write(json.dumps(entry) + "\n")
+        verdict = entry["verdict"]
+        if verdict == "not noticed":
+            if (name, old, new) in equivalent:
+                verdict = "equivalent"
+            else:
+                survivors.append(entry)
+        tally[verdict] += 1
+        print(f"{number}/{count} {verdict:12} {name}:{line} {entry['test']}", flush=True)
+    meaningful = tally["noticed"] + tally["not noticed"]
+    print(", ".join(f"{number} {verdict}" for verdict, number in sorted(tally.items())))
+    print(f"noticed: {tally['noticed']} of {meaningful} that change behaviour")
+    for entry in survivors:
+        print(f"\n{entry['file']}:{entry['line']}\n  {entry['old']}\n  {entry['new']}")
+    return 1 if survivors else 0
+
+
+if __name__ == "__main__":
+    sys.exit(main())
