@@ -96,7 +96,7 @@ class Profiler {
         return true;
     }
 
-    /// Asks between processes, too: a short one can end before anybody asks.
+    /// Called before each run, because a short process can end before the option is asked.
     bool interrupted() {
         const auto& asked = options.process.interrupted;
         if (!asked || !asked())

@@ -11,7 +11,7 @@
 using namespace Mz;
 
 int main() {
-    // A search passes a list of its own, in which some components are switched off.
+    // A search passes a temporary list, in which some components are switched off.
     Kit::readList(Kit::listFromEnvironment("editor.list"));
     Kit::initialize(Kit::programFolder() / "components");
     std::string text = "plug-ins\nare apart\n";

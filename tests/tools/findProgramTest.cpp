@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-// The search for programs of others, which must not run what somebody left in the current folder.
+// The search for other programs in PATH, which must not find one in the current folder.
 #include "components/componentTools/platform/system.h"
 #include "tests/support/temporaryDirectory.h"
 #include "tests/support/testSystem.h"

@@ -87,9 +87,8 @@ NativePath moduleFolder();
 /// it.
 NativePath managerFile();
 
-/// Returns the path of a program that is found in the folders of PATH that have full paths; empty if
-/// there is none.
-/// \param name  the program's name without extension
+/// Returns the path of a program that is found in the folders of PATH that have full paths; empty
+/// if there is none. \param name  the program's name without extension
 NativePath findProgram(const std::string& name);
 
 /// Returns the extension of programs; empty on Linux.
@@ -212,8 +211,8 @@ bool writeReserved(int descriptor, const char* data, std::size_t size);
 /// process may have ignored it. No-op on Windows.
 void resetChildSignal();
 
-/// While it lives, the calling thread receives no signals except those of its own faults. Threads
-/// that it starts inherit that, for as long as they live. No-op on Windows.
+/// Blocks all signals of the calling thread but those of faults, until it is destroyed. Threads
+/// that are started meanwhile keep them blocked to their end. No-op on Windows.
 class BlockedSignals {
   public:
     BlockedSignals();

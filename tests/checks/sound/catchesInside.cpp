@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Throws exceptions of its own and of the standard library, and catches all of them.
+/// Throws exceptions of its class and of the standard library, and catches all of them.
 #include "tests/checks/sound/thing.h"
 
 #include <stdexcept>
