@@ -11,8 +11,8 @@ add_subdirectory(${MZ_GOOGLETEST_SOURCES} ${PROJECT_BINARY_DIR}/googletest EXCLU
 include(GoogleTest)
 
 # The test code runs once per build, so it is not optimised and has few debug symbols or none: both
-# took most of the build time. The tested libraries, the components and the examples keep the build's
-# options, and the header templates that they use.
+# took most of the build time. The tested libraries and the examples, components among them, keep the
+# build's options, and so do the header templates that they use.
 add_library(mzTestCode INTERFACE)
 if(MZ_SANITIZE)
   target_compile_options(mzTestCode INTERFACE -O0 -g1 ${MZ_FEWER_CHECKS})
@@ -37,6 +37,12 @@ target_precompile_headers(mzTestHeaders PRIVATE <gmock/gmock.h> <gtest/gtest.h>)
 # A program can use the precompiled headers only if both are compiled with the same options.
 set_target_properties(mzTestHeaders PROPERTIES POSITION_INDEPENDENT_CODE OFF)
 target_compile_options(mzTestHeaders PRIVATE ${CMAKE_CXX_COMPILE_OPTIONS_PIE})
+
+# The same for test components: most of the time to compile one went into the kit's headers.
+add_library(mzTestComponentHeaders OBJECT ${PROJECT_SOURCE_DIR}/tests/support/testHeaders.cpp)
+target_link_libraries(mzTestComponentHeaders PRIVATE mzCompile mzTestCode Mz::MZcomponentManager)
+target_precompile_headers(mzTestComponentHeaders PRIVATE
+  "${PROJECT_SOURCE_DIR}/components/componentKit/componentKit.h")
 
 # Each test has the name of its build as a prefix, so that one summary covers all builds.
 get_filename_component(MZ_BUILD_NAME ${PROJECT_BINARY_DIR} NAME)
@@ -92,15 +98,20 @@ function(mz_discover_tests name)
     DISCOVERY_TIMEOUT 120 PROPERTIES TIMEOUT 120)
 endfunction()
 
-# mz_add_test_component(NAME [FOLDER folder] sources...): adds a component library in
-# <build>/components/<folder>. The default folder is NAME.
+# mz_add_test_component(NAME [AS_SHIPPED] [FOLDER folder] sources...): adds a component library in
+# <build>/components/<folder>. The default folder is NAME. AS_SHIPPED compiles it with the build's
+# options, for tests that look at the file, or with options of its own.
 function(mz_add_test_component name)
-  cmake_parse_arguments(PARSE_ARGV 1 arg "" "FOLDER" "")
+  cmake_parse_arguments(PARSE_ARGV 1 arg "AS_SHIPPED" "FOLDER" "")
   if(NOT arg_FOLDER)
     set(arg_FOLDER ${name})
   endif()
   mz_add_component(${name} ${arg_UNPARSED_ARGUMENTS})
   target_link_libraries(${name} PRIVATE mzCompile)
+  if(NOT arg_AS_SHIPPED)
+    target_link_libraries(${name} PRIVATE mzTestCode)
+    target_precompile_headers(${name} REUSE_FROM mzTestComponentHeaders)
+  endif()
   set_target_properties(${name} PROPERTIES
     LIBRARY_OUTPUT_DIRECTORY ${PROJECT_BINARY_DIR}/components/${arg_FOLDER}
     RUNTIME_OUTPUT_DIRECTORY ${PROJECT_BINARY_DIR}/components/${arg_FOLDER})

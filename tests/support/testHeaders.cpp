@@ -1,3 +1,2 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Nothing but the headers that `mzTestHeaders` precompiles: CMake precompiles for a target with a
-/// source.
+/// Nothing but precompiled headers, which CMake makes for a target with a source.
