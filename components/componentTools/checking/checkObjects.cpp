@@ -2,11 +2,16 @@
 /// The object IO of libMZobjectIO is above this library, and makes objects through the component
 /// manager, which is not initialised here. The two buffers below store objects inside objects in
 /// the simplest way: a number for null, for a new object, or for one that was stored before.
+///
+/// Both pass numbers on to a buffer of the core, as the object IO does. Otherwise a text stream
+/// would switch the locale for each number, which for 100,000 of them takes a minute on Windows,
+/// and the library would be said to hang.
 #include "components/componentTools/checking/checkObjects.h"
 
 #include "components/componentManager/binaryStream.h"
 #include "components/componentManager/bufferio.h"
 #include "components/componentManager/exceptions.h"
+#include "components/componentManager/numberRelay.h"
 #include "components/componentManager/textStream.h"
 
 #include <algorithm>
@@ -27,7 +32,12 @@ constexpr int maximumDepth = 200;
 
 class ObjectsOut final : public QrOutBuffer {
   public:
-    ObjectsOut(std::ostream* out, CheckContext& checked) : QrOutBuffer(out), context(checked) {}
+    ObjectsOut(std::ostream* out, CheckContext& checked)
+        : QrOutBuffer(out), numbers(out), context(checked) {}
+
+    static QrBufferedIO* numbersOf(QrBufferedIO& io) {
+        return &static_cast<ObjectsOut&>(io).numbers;
+    }
 
     /// Returns the class uids of the inner objects that no builder of the library has, each once.
     const std::vector<QrUid>& missingClasses() const { return missing; }
@@ -60,6 +70,7 @@ class ObjectsOut final : public QrOutBuffer {
     }
 
   private:
+    QrOutBuffer numbers;
     CheckContext& context;
     std::vector<const QrCastable*> written;
     std::vector<QrUid> missing;
@@ -68,7 +79,12 @@ class ObjectsOut final : public QrOutBuffer {
 
 class ObjectsIn final : public QrInBuffer {
   public:
-    ObjectsIn(std::istream* in, CheckContext& checked) : QrInBuffer(in), context(checked) {}
+    ObjectsIn(std::istream* in, CheckContext& checked)
+        : QrInBuffer(in), numbers(in), context(checked) {}
+
+    static QrBufferedIO* numbersOf(QrBufferedIO& io) {
+        return &static_cast<ObjectsIn&>(io).numbers;
+    }
 
     QrRef<QrCastable> readObject(QrStream& stream, const QrUid*, const wchar_t*,
                                  const wchar_t*) override {
@@ -104,10 +120,14 @@ class ObjectsIn final : public QrInBuffer {
         return builder ? builder->createObject() : nullptr;
     }
 
+    QrInBuffer numbers;
     CheckContext& context;
     std::vector<QrRef<QrCastable>> objects;
     int depth = 0;
 };
+
+const QrNumberRelay outRelay(typeid(ObjectsOut), {ObjectsOut::numbersOf, nullptr, nullptr});
+const QrNumberRelay inRelay(typeid(ObjectsIn), {nullptr, nullptr, ObjectsIn::numbersOf});
 
 /// Supplies three bytes at a time and has no positions, like a pipe.
 class Pieces final : public std::streambuf {
