@@ -15,6 +15,14 @@ set(componentFlags "$(${pkgConfig} --variable=component_flags MZcomponentManager
 run(sh -ec "${compiler} -std=c++20 ${componentFlags} ${source}/helloComponent.cpp -o ${work}/components/hello.so ${flags}")
 says("Hello, world!" ${work}/helloHost)
 
+# Clang has options of its own.
+if(clang)
+  file(REMOVE ${work}/components/hello.so)
+  set(componentFlags "$(${pkgConfig} --variable=clang_component_flags MZcomponentManager)")
+  run(sh -ec "${clang} -Werror -std=c++20 ${componentFlags} ${source}/helloComponent.cpp -o ${work}/components/hello.so ${flags}")
+  says("Hello, world!" ${work}/helloHost)
+endif()
+
 # The libraries that a library's headers need come with it: here libMZbase.
 run(sh -ec "${compiler} -std=c++20 ${CMAKE_CURRENT_LIST_DIR}/parent/parent.cpp -o ${work}/parent ${flags}")
 says("in the parent" ${work}/parent)
