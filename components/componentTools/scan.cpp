@@ -55,12 +55,26 @@ class Scanner {
         compareUids();
         for (const Discovery::LeftOut& left : discovery.leftOut)
             leaveOut(left);
+        if (std::any_of(discovery.leftOut.begin(), discovery.leftOut.end(), isUnreadFolder))
+            keepUnlisted(discovery.candidates);
         if (!options.list.empty())
             write();
         return std::move(result);
     }
 
   private:
+    static bool isUnreadFolder(const Discovery::LeftOut& left) {
+        return left.folder && left.finding.verdict == Verdict::unreadable;
+    }
+
+    /// Keeps the old records without a candidate: their files may exist nevertheless.
+    void keepUnlisted(const std::vector<Candidate>& candidates) {
+        for (const Candidate& candidate : candidates)
+            old.erase(Name(candidate.directory, candidate.fileName));
+        for (const auto& [name, library] : old)
+            result.libraries.push_back(library);
+    }
+
     bool isInterrupted() const {
         return (options.controller && options.controller->isInterrupted()) ||
                (options.probe.interrupted && options.probe.interrupted());
@@ -121,9 +135,10 @@ class Scanner {
             keepFromWriting(L"nothing was written, for no library could be tried");
         else if (!result.rejected.empty() && !keepRejected())
             keepFromWriting(L"nothing was written, for what is there could not be kept");
+        if (result.notWritten.empty())
+            dropNewlyDisabled();
         if (!result.notWritten.empty())
             return;
-        dropNewlyDisabled();
         writeGuarded([&] { writeRecordedList(options.list, result.libraries); });
         // The list comes first: without verdicts it is still valid, and the next scan only retries
         // more. Verdicts without their list are useless.
@@ -134,7 +149,12 @@ class Scanner {
 
     /// Reads what is switched off. A file that is not valid is treated as in `readVerdicts`.
     void readDisabledNames() {
-        disabled = readDisabled(verdictsFileOf(options.list)).value_or(DisabledComponents());
+        bool unreadable = false;
+        const std::filesystem::path file = verdictsFileOf(options.list);
+        disabled = readDisabled(file, &unreadable).value_or(DisabledComponents());
+        if (unreadable) // Writing it anew would switch everything on.
+            result.notWritten =
+                displayName(file) + L": nothing was written, for this file could not be read";
     }
 
     const DisabledComponent* findDisabled(const Candidate& candidate) const {
@@ -233,17 +253,22 @@ class Scanner {
     void add(const Candidate& candidate, Outcome outcome) {
         ScannedFile file{candidate.path, candidate.directory, candidate.fileName,
                          std::move(outcome.verdict), std::move(outcome.notes)};
+        const bool unchanged = outcome.unchanged || outcome.step == Outcome::Step::absent;
+        const bool isUnread =
+            outcome.known && unchanged && file.verdict.verdict == Verdict::unreadable;
         switch (outcome.step) {
         case Outcome::Step::disabled: recordWithoutBuilders(file, *outcome.status); break;
         case Outcome::Step::reused: keep(file, *outcome.known); break;
         case Outcome::Step::examined:
-            record(file, *outcome.status, std::move(outcome.builders));
+            file.looked = true;
+            if (!isUnread)
+                record(file, *outcome.status, std::move(outcome.builders));
             break;
         case Outcome::Step::absent:
         case Outcome::Step::leftForLater: break;
         }
-        // A library that could not be tried keeps its old record.
-        if (outcome.known && (file.verdict.verdict == Verdict::interrupted ||
+        // A library that could not be read or tried keeps its old record.
+        if (outcome.known && (file.verdict.verdict == Verdict::interrupted || isUnread ||
                               (outcome.unchanged && file.verdict.verdict == Verdict::probeFailed)))
             keep(file, *outcome.known);
         result.files.push_back(std::move(file));
@@ -301,7 +326,6 @@ class Scanner {
     /// Records what the examination of a library found.
     void record(ScannedFile& file, const platform::FileStatus& status,
                 std::vector<RecordedBuilder> builders) {
-        file.looked = true;
         if (file.verdict.verdict == Verdict::interrupted) {
             result.interrupted = true;
             return;

@@ -8,7 +8,6 @@
 #include "components/componentManager/utf8.h"
 #include "components/componentTools/records/openPatiently.h"
 #include "components/componentTools/records/replaceChanged.h"
-#include "components/platform/platform.h"
 
 #include <cstdint>
 #include <fstream>
@@ -111,17 +110,22 @@ void readVerdicts(const std::filesystem::path& file, RecordedLibraries& librarie
     }
 }
 
-std::optional<DisabledComponents> readDisabled(const std::filesystem::path& file) {
+std::optional<DisabledComponents> readDisabled(const std::filesystem::path& file,
+                                               bool* unreadable) {
     std::ifstream input;
-    if (!openPatiently(input, file))
-        return platform::queryFile(file.native())
-                   ? std::nullopt
-                   : std::optional<DisabledComponents>(std::in_place);
+    const bool opened = openPatiently(input, file);
+    if (unreadable)
+        *unreadable = false;
+    if (!opened && isMissing(file))
+        return std::optional<DisabledComponents>(std::in_place);
     try {
-        return disabledIn(OrderedJson::parse(input));
-    } catch (const nlohmann::json::exception&) {
-        return std::nullopt;
+        if (opened)
+            return disabledIn(OrderedJson::parse(input));
+    } catch (const nlohmann::json::exception&) { // NOLINT(bugprone-empty-catch)
     }
+    if (unreadable)
+        *unreadable = !opened || input.bad();
+    return std::nullopt;
 }
 
 bool isRecordOf(const RecordedLibrary& library, const DisabledComponent& component) {

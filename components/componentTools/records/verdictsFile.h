@@ -16,7 +16,10 @@ namespace Mz::Tools {
 void readVerdicts(const std::filesystem::path& file, RecordedLibraries& libraries);
 
 /// Returns what is switched off; `std::nullopt` if there is a file, but it is not valid.
-std::optional<DisabledComponents> readDisabled(const std::filesystem::path& file);
+/// \param unreadable  receives whether the system could not read the file, which may be valid; may
+///     be null
+std::optional<DisabledComponents> readDisabled(const std::filesystem::path& file,
+                                               bool* unreadable = nullptr);
 
 /// Returns whether the record is the component's, by their names.
 bool isRecordOf(const RecordedLibrary& library, const DisabledComponent& component);

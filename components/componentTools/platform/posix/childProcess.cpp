@@ -393,8 +393,13 @@ ChildResult runChild(const NativePath& program, const std::vector<NativePath>& a
             Descriptor(supply.input ? raised(childInput.get()) : -1),
             Descriptor(raised(childOutput.get())),
             Descriptor(supply.file ? raised(static_cast<int>(supply.file->number())) : -1)};
-        failure = start(program, arguments, {high[0].get(), high[1].get(), high[2].get()},
-                        environment.get(), child);
+        // Without its pipe, the child would write to the standard output of this process.
+        if ((supply.input && high[0].get() < 0) || high[1].get() < 0 ||
+            (supply.file && high[2].get() < 0))
+            failure = errno;
+        else
+            failure = start(program, arguments, {high[0].get(), high[1].get(), high[2].get()},
+                            environment.get(), child);
     }
     childOutput.close();
     childInput.close();
