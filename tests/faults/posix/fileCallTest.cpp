@@ -5,6 +5,8 @@
 #include "tests/kit/importers.h"
 #include "tests/streams/components/recordedUids.h"
 #include "tests/support/failingCalls.h"
+#include "tests/support/fullMedium.h"
+#include "tests/support/signalStorm.h"
 #include "tests/support/temporaryDirectory.h"
 
 #include <gmock/gmock.h>
@@ -102,6 +104,38 @@ TEST_P(FilesWithFailingCalls, AreImportedWhollyOrNotAtAll) {
 
 INSTANTIATE_TEST_SUITE_P(, FilesWithFailingCalls,
                          testing::Values(EIO, EINTR, EMFILE, ENOMEM, ENOSPC));
+
+TEST(FilesOnAFullMedium, KeepTheOldList) {
+    TemporaryDirectory folder;
+    Kit::initialize(components / "recordedLists");
+    const auto list = folder.path() / "list";
+    Kit::writeList(list);
+    const auto size = std::filesystem::file_size(list);
+    std::ofstream(list, std::ios::binary) << "the old one";
+    for (std::uintmax_t room = 0; room < size; ++room) {
+        const FullMedium full(room);
+        EXPECT_THROW(Kit::writeList(list), QrStreamEx::ExWriteError) << room;
+        EXPECT_EQ(contentOf(list), "the old one");
+        EXPECT_EQ(filesIn(folder.path()), 1);
+    }
+    Kit::writeList(list);
+    EXPECT_EQ(std::filesystem::file_size(list), size);
+}
+
+TEST(FilesUnderSignals, AreTheSame) {
+    TemporaryDirectory folder;
+    Kit::initialize(components / "kitImporters");
+    const auto list = folder.path() / "list", other = folder.path() / "other";
+    const auto input = folder.write("input.a", "B=take");
+    Kit::writeList(list);
+    const auto importer = Kit::newImporter<L"script">();
+    bool found = false;
+    underSignals(100, [&] {
+        Kit::writeList(other);
+        EXPECT_EQ(contentOf(other), contentOf(list));
+        EXPECT_TRUE(importer->import(input.wstring().c_str(), nullptr, found));
+    });
+}
 
 TEST(FilesWithShortTransfers, AreTheSame) {
     TemporaryDirectory folder;

@@ -3,6 +3,7 @@
 /// one reads, and nothing that was recorded is lost.
 #include "tests/faults/managerFaultFixture.h"
 #include "tests/support/failingCalls.h"
+#include "tests/support/signalStorm.h"
 
 #include <cerrno>
 #include <cstddef>
@@ -70,6 +71,20 @@ TEST_P(ManagerWithFailingCalls, CreatesTheObjectInTheNextStart) {
 
 INSTANTIATE_TEST_SUITE_P(, ManagerWithFailingCalls,
                          ::testing::Values(EIO, EINTR, EMFILE, ENFILE, ENOMEM));
+
+using ManagerUnderSignals = ManagerFaultTest;
+
+TEST_F(ManagerUnderSignals, FindsTheSame) {
+    const std::string recorded = wholeList();
+    underSignals(200, [&] {
+        restart();
+        initialize();
+        EXPECT_EQ(list(), recorded);
+        EXPECT_TRUE(manager->createObject(recordedGamma));
+        restartWithList();
+        EXPECT_EQ(list(), recorded);
+    });
+}
 
 using ManagerWithShortReads = ManagerFaultTest;
 

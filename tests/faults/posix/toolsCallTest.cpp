@@ -3,6 +3,8 @@
 /// not be read or tried, and no list loses a record.
 #include "components/componentTools/disabled.h"
 #include "tests/support/failingCalls.h"
+#include "tests/support/fullMedium.h"
+#include "tests/support/signalStorm.h"
 #include "tests/tools/toolsFixture.h"
 
 #include <algorithm>
@@ -18,9 +20,9 @@ using ::testing::AnyOf;
 namespace {
 
 /// A folder with two components, of which one is switched off, and the list of a scan.
-class ToolsWithFailingCalls : public ToolsTest, public ::testing::WithParamInterface<int> {
+class ToolsWithAList : public ToolsTest {
   protected:
-    ToolsWithFailingCalls() {
+    ToolsWithAList() {
         scanned();
         EXPECT_TRUE(disableComponent(counted, list, L"too slow").changed);
         wholeList = contentOf(list);
@@ -40,6 +42,9 @@ class ToolsWithFailingCalls : public ToolsTest, public ::testing::WithParamInter
     const std::filesystem::path good = add(L"goodWithKit"), counted = add(L"countedDescription");
     std::string wholeList, wholeVerdicts;
 };
+
+class ToolsWithFailingCalls : public ToolsWithAList, public ::testing::WithParamInterface<int> {};
+using ToolsOnAFullMedium = ToolsWithAList;
 
 TEST_P(ToolsWithFailingCalls, ExplainTheFileOrSayThatItCannotBeRead) {
     ExplainOptions options;
@@ -83,17 +88,34 @@ TEST_P(ToolsWithFailingCalls, ScanWithoutSwitchingAnythingOn) {
 TEST_P(ToolsWithFailingCalls, TryALibraryOrSayThatTheProcessFailed) {
     const int failures = failEachCall(GetParam(), [&](CallAttempt& attempt) {
         ::testing::internal::CaptureStdout();
-        const Finding finding =
-            attempt.run([&] { return probeLibrary(good, patient()).verdict; });
+        const Finding finding = attempt.run([&] { return probeLibrary(good, patient()).verdict; });
         EXPECT_EQ(::testing::internal::GetCapturedStdout(), "") << attempt.failed;
-        EXPECT_THAT(finding.verdict, AnyOf(Verdict::works, Verdict::probeFailed))
-            << attempt.failed;
+        EXPECT_THAT(finding.verdict, AnyOf(Verdict::works, Verdict::probeFailed)) << attempt.failed;
         EXPECT_FALSE(hasChildProcess());
     });
     EXPECT_GE(failures, 4);
 }
 
 INSTANTIATE_TEST_SUITE_P(, ToolsWithFailingCalls, ::testing::Values(EIO, EINTR, EMFILE, ENOMEM));
+
+TEST_F(ToolsOnAFullMedium, KeepWhatIsThere) {
+    // The first file that does not fit is the list, or the one beside it.
+    std::filesystem::remove(list);
+    for (const std::size_t room : {std::size_t{0}, wholeList.size() - 1, wholeList.size()}) {
+        const FullMedium full(room);
+        EXPECT_NE(scanned().notWritten, L"") << room;
+        EXPECT_EQ(contentOf(verdictsFileOf(list)), wholeVerdicts);
+        EXPECT_EQ(contentOf(list), room < wholeList.size() ? "" : wholeList);
+    }
+}
+
+using ToolsUnderSignals = ToolsTest;
+
+TEST_F(ToolsUnderSignals, TryALibrary) {
+    const auto good = add(L"goodWithKit");
+    underSignals(100,
+                 [&] { EXPECT_EQ(probeLibrary(good, patient()).verdict.verdict, Verdict::works); });
+}
 
 using ToolsWithoutStandardFiles = ToolsTest;
 
