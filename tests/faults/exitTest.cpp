@@ -35,8 +35,7 @@ TEST_P(ComponentThatExits, EndsTheProcessWithItsStatus) {
 INSTANTIATE_TEST_SUITE_P(, ComponentThatExits,
                          testing::Values("initialiser", "entry point", "label", "enumerate",
                                          "createBuilder", "createObject", "thread", "translator",
-                                         "write", "read", "destructor", "canImport", "import",
-                                         "finaliser"));
+                                         "write", "read", "destructor", "canImport", "import"));
 
 TEST(ComponentThatDoesNotExit, LeavesTheStatusToTheHost) {
     const ProgramResult result = runHost("nowhere");

@@ -24,14 +24,10 @@ void exitAt(std::string_view place) {
         std::exit(exitStatus); // NOLINT(concurrency-mt-unsafe)
 }
 
-/// Runs when the library is loaded and unloaded.
+/// Runs when the library is loaded. None does when it is unloaded: another call of `exit` while the
+/// process ends is undefined.
 struct Presence {
     Presence() { exitAt("initialiser"); }
-    ~Presence() {
-        // Another call of exit would be undefined.
-        if (isPlace("finaliser"))
-            std::_Exit(exitStatus);
-    }
 } presence;
 
 class Exiting final : public Kit::Object<Exiting, PlainObject, QrPersistant> {
