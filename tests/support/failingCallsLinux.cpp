@@ -166,7 +166,8 @@ int ppoll(pollfd* files, nfds_t count, const timespec* time, const sigset_t* sig
 
 pid_t wait4(pid_t child, int* status, int options, rusage* usage) noexcept {
     static auto* const real = next<pid_t(pid_t, int*, int, rusage*)>("wait4");
-    return fails("wait4") ? -1 : real(child, status, options, usage);
+    // The process would stay a zombie: with other errors there is no child.
+    return errorNumber == EINTR && fails("wait4") ? -1 : real(child, status, options, usage);
 }
 
 } // extern "C"

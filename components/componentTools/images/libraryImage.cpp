@@ -23,6 +23,7 @@ FileBytes::Source::Source(const std::filesystem::path& path) {
 std::size_t FileBytes::Source::read(std::uint64_t offset, void* data, std::size_t length) {
     stream.clear();
     stream.seekg(static_cast<std::streamoff>(offset));
+    failed = failed || !stream;
     stream.read(static_cast<char*>(data), static_cast<std::streamsize>(length));
     failed = failed || stream.bad();
     const std::streamsize count = stream.bad() ? 0 : stream.gcount();

@@ -107,24 +107,29 @@ void readVerdicts(const std::filesystem::path& file, RecordedLibraries& librarie
                     library.kept = disabledFinding(component);
     } catch (const nlohmann::json::exception&) {
         return; // Without verdicts the next scan only retries more.
+    } catch (const std::ios_base::failure&) {
+        return; // The buffer of a file throws it, and JSON is read from the buffer.
     }
 }
 
 std::optional<DisabledComponents> readDisabled(const std::filesystem::path& file,
                                                bool* unreadable) {
     std::ifstream input;
-    const bool opened = openPatiently(input, file);
+    bool isRead = openPatiently(input, file);
     if (unreadable)
         *unreadable = false;
-    if (!opened && isMissing(file))
+    if (!isRead && isMissing(file))
         return std::optional<DisabledComponents>(std::in_place);
     try {
-        if (opened)
+        if (isRead)
             return disabledIn(OrderedJson::parse(input));
-    } catch (const nlohmann::json::exception&) { // NOLINT(bugprone-empty-catch)
+    } catch (const nlohmann::json::exception&) {
+        isRead = !input.bad();
+    } catch (const std::ios_base::failure&) { // Of the file's buffer, from which JSON is read.
+        isRead = false;
     }
     if (unreadable)
-        *unreadable = !opened || input.bad();
+        *unreadable = !isRead;
     return std::nullopt;
 }
 

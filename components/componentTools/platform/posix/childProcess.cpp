@@ -283,11 +283,21 @@ class Watch {
             const ssize_t got = ::read(output, block, sizeof block);
             if (got > 0)
                 receive(block, static_cast<std::size_t>(got));
-            else if (got == 0 || (errno != EINTR && errno != EAGAIN))
+            else if (got == 0)
                 closed = true;
             else if (errno == EAGAIN)
                 return;
+            else if (errno != EINTR)
+                giveUp(errno);
         }
+    }
+
+    /// Ends the child, whose output cannot be read: it is not at fault.
+    void giveUp(int error) {
+        closed = true;
+        judgement.detail = displayName(std::strerror(error));
+        if (!judged)
+            stop(ChildResult::End::notStarted);
     }
 
     void receive(const char* bytes, std::size_t size) {
