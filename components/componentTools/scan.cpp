@@ -13,6 +13,7 @@
 #include "components/componentTools/inspecting/uidNotes.h"
 #include "components/componentTools/reasonText.h"
 #include "components/componentTools/records/verdictsFile.h"
+#include "components/componentTools/scanning/judgement.h"
 #include "components/componentTools/scanning/orderedWork.h"
 #include "components/platform/platform.h"
 
@@ -73,6 +74,7 @@ class Scanner {
             old.erase(Name(candidate.directory, candidate.fileName));
         for (const auto& [name, library] : old)
             result.libraries.push_back(library);
+        allJudged = false;
     }
 
     bool isInterrupted() const {
@@ -121,6 +123,9 @@ class Scanner {
         readDisabledNames();
         ListReading reading = readRecordedList(options.list);
         result.rejected = reading.reason;
+        const std::string judgement = readJudgement(verdictsFileOf(options.list));
+        ownJudgement = judgementOf({}, options.hosts);
+        judged = !judgement.empty() && judgement == judgementOf(reading.libraries, options.hosts);
         for (RecordedLibrary& library : reading.libraries) {
             Name name(library.directory, library.fileName);
             old.emplace(std::move(name), std::move(library));
@@ -143,8 +148,16 @@ class Scanner {
         // The list comes first: without verdicts it is still valid, and the next scan only retries
         // more. Verdicts without their list are useless.
         if (result.notWritten.empty())
-            writeGuarded(
-                [&] { writeVerdicts(verdictsFileOf(options.list), result.libraries, disabled); });
+            writeGuarded([&] {
+                writeVerdicts(verdictsFileOf(options.list), result.libraries, disabled,
+                              newJudgement());
+            });
+    }
+
+    /// Returns the digest of this scan; empty if the next scan must compare again.
+    std::string newJudgement() const {
+        const bool sameHost = judgementOf({}, options.hosts) == ownJudgement;
+        return allJudged && sameHost ? judgementOf(result.libraries, options.hosts) : "";
     }
 
     /// Reads what is switched off. A file that is not valid is treated as in `readVerdicts`.
@@ -268,16 +281,19 @@ class Scanner {
         case Outcome::Step::leftForLater: break;
         }
         // A library that could not be read or tried keeps its old record.
-        if (outcome.known && (file.verdict.verdict == Verdict::interrupted || isUnread ||
-                              (outcome.unchanged && file.verdict.verdict == Verdict::probeFailed)))
+        if (outcome.known &&
+            (file.verdict.verdict == Verdict::interrupted || isUnread ||
+             (outcome.unchanged && file.verdict.verdict == Verdict::probeFailed))) {
             keep(file, *outcome.known);
+            allJudged = false;
+        }
         result.files.push_back(std::move(file));
     }
 
     /// Returns whether a library that worked earlier does not match: its stamp, or its interfaces.
     /// The library does not change when libMZcomponentManager or the host is replaced.
     bool isForOtherHost(const Candidate& candidate, const RecordedLibrary& library) const {
-        if (library.builders.empty())
+        if (library.builders.empty() || judged)
             return false;
         FileBytes file(candidate.path);
         return abiDifference(readLibraryImage(file)).has_value() ||
@@ -394,6 +410,9 @@ class Scanner {
 
     const ScanOptions& options;
     const HostInterfaces host;
+    std::string ownJudgement; ///< of this host, with no libraries, before the first comparison
+    bool judged = false;      ///< whether the old list was compared with this host
+    bool allJudged = true;    ///< whether the new list is
     std::map<Name, RecordedLibrary> old;
     DisabledComponents disabled;
     ScanResult result;

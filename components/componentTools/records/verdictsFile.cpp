@@ -133,6 +133,18 @@ std::optional<DisabledComponents> readDisabled(const std::filesystem::path& file
     return std::nullopt;
 }
 
+std::string readJudgement(const std::filesystem::path& file) {
+    std::ifstream input;
+    if (!openPatiently(input, file))
+        return {};
+    try {
+        const OrderedJson all = OrderedJson::parse(input);
+        return all.at("version").get<int>() == version ? all.value("judgement", "") : "";
+    } catch (const nlohmann::json::exception&) {
+        return {}; // The next scan only compares more.
+    }
+}
+
 bool isRecordOf(const RecordedLibrary& library, const DisabledComponent& component) {
     return library.fileName == component.fileName && library.directory == component.directory;
 }
@@ -143,7 +155,7 @@ Finding disabledFinding(const DisabledComponent& component) {
 }
 
 void writeVerdicts(const std::filesystem::path& file, const RecordedLibraries& libraries,
-                   const DisabledComponents& disabled) {
+                   const DisabledComponents& disabled, const std::string& judgement) {
     OrderedJson entries = OrderedJson::array(), choices = OrderedJson::array();
     for (const DisabledComponent& component : disabled)
         choices.push_back({{"directory", toUtf8(component.directory)},
@@ -160,7 +172,9 @@ void writeVerdicts(const std::filesystem::path& file, const RecordedLibraries& l
                                {"words", toUtf8(library.kept->words)},
                                {"sentence", toUtf8(sentenceOf(*library.kept))},
                                {"cure", toUtf8(cureOf(*library.kept))}});
-    const OrderedJson all{{"version", version}, {"libraries", entries}, {"disabled", choices}};
+    OrderedJson all{{"version", version}, {"libraries", entries}, {"disabled", choices}};
+    if (!judgement.empty())
+        all["judgement"] = judgement;
     replaceChanged(file, all.dump(2, ' ', true) + "\n");
 }
 
