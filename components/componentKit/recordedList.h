@@ -76,7 +76,9 @@ struct ListReading {
 inline ListReading readList(const std::filesystem::path& file) {
     ListReading result;
     std::error_code unknown;
-    result.found = std::filesystem::exists(file, unknown);
+    // A file that cannot be queried may exist: opening it tells.
+    result.found =
+        std::filesystem::status(file, unknown).type() != std::filesystem::file_type::not_found;
     if (!result.found)
         return result;
     const std::wstring name = displayName(file);

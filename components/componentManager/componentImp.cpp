@@ -8,6 +8,8 @@
 
 #include <cstddef>
 #include <list>
+#include <string>
+#include <vector>
 
 namespace Mz {
 
@@ -75,17 +77,16 @@ void ComponentManager::initialize(const wchar_t* searchPath) {
     // An exception may end this call anywhere, and another call may follow. Therefore the restored
     // records stay in `libraries` until discovery is complete, and the index never refers to a
     // destroyed record.
-    LibraryList recorded;
     {
         LibraryList found;
         LibraryMap byName;
-        discover(searchPath, found, byName);
-        recorded.swap(libraries);
+        std::vector<std::wstring> unlisted;
+        discover(searchPath, found, byName, unlisted);
+        merge(found, byName);
+        keepUnlisted(found, unlisted);
         libraries.swap(found);
-        merge(recorded, byName);
+        builderIndex.clear(); // Before the records without a file, in `found`, are destroyed.
     }
-    builderIndex.clear();
-    recorded.clear();
     for (ComponentLibrary& library : libraries)
         if (library.module)
             reindexBuilders(library); // Loaded by an earlier call that threw.

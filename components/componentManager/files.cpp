@@ -38,7 +38,10 @@ std::filesystem::path targetOf(const std::filesystem::path& file) {
     constexpr int maximumLinks = 40; // The limit of Linux.
     std::filesystem::path target = file;
     for (int count = 0; count < maximumLinks; ++count) {
-        const auto text = platform::symlinkTarget(target);
+        std::error_code failure;
+        const auto text = platform::symlinkTarget(target, failure);
+        if (failure)
+            failToOpen(__LINE__, file, toUtf8(platform::errorText(failure)));
         if (!text)
             return target;
         target = target.parent_path() / *text; // An absolute target replaces the folder.
@@ -53,6 +56,8 @@ class NewFile {
     explicit NewFile(const std::filesystem::path& file) : file(file), target(targetOf(file)) {
         std::error_code failure;
         old = std::filesystem::status(target, failure);
+        if (!std::filesystem::status_known(old)) // Its permissions could not be kept.
+            failToOpen(__LINE__, file, toUtf8(platform::errorText(failure)));
         if (std::filesystem::exists(old) && !std::filesystem::is_regular_file(old))
             failToOpen(__LINE__, file, "it is not a regular file");
         // This process must write and read the file, whatever its final permissions are.

@@ -62,10 +62,14 @@ class Discoverer {
 
     Discovery take() {
         // In one call, like the manager: only then are identities comparable between folders.
-        const auto listings = platform::listCandidates(openedNames);
-        for (std::size_t index = 0; index < listings.size(); ++index)
+        std::vector<bool> unlisted;
+        const auto listings = platform::listCandidates(openedNames, &unlisted);
+        for (std::size_t index = 0; index < listings.size(); ++index) {
+            if (unlisted[index])
+                leaveOutFolder(openedNames[index], Verdict::unreadable);
             for (const platform::DirectoryEntry& entry : listings[index])
                 add(directories[index], entry);
+        }
         return std::move(result);
     }
 

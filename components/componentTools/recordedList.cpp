@@ -18,6 +18,7 @@
 #include <cstdint>
 #include <exception>
 #include <fstream>
+#include <new>
 #include <optional>
 #include <sstream>
 #include <stdexcept>
@@ -122,7 +123,7 @@ ListReading readRecordedList(const std::filesystem::path& file) {
     ListReading reading;
     std::ifstream input;
     if (!openPatiently(input, file)) {
-        if (platform::queryFile(file.native())) {
+        if (!isMissing(file)) {
             reading.state = ListReading::State::rejected;
             reading.reason = L"it cannot be read";
         }
@@ -135,6 +136,8 @@ ListReading readRecordedList(const std::filesystem::path& file) {
         reading.state = ListReading::State::good;
         reading.reason.clear();
         readVerdicts(verdictsFileOf(file), reading.libraries);
+    } catch (const std::bad_alloc&) {
+        throw; // The list is not at fault.
     } catch (const std::exception& failure) {
         input.clear();
         const std::string what = failure.what();

@@ -13,6 +13,7 @@
 #include "components/componentTools/inspecting/uidNotes.h"
 #include "components/componentTools/reasonText.h"
 #include "components/componentTools/records/verdictsFile.h"
+#include "components/componentTools/scanning/judgement.h"
 #include "components/componentTools/scanning/orderedWork.h"
 #include "components/platform/platform.h"
 
@@ -55,12 +56,27 @@ class Scanner {
         compareUids();
         for (const Discovery::LeftOut& left : discovery.leftOut)
             leaveOut(left);
+        if (std::any_of(discovery.leftOut.begin(), discovery.leftOut.end(), isUnreadFolder))
+            keepUnlisted(discovery.candidates);
         if (!options.list.empty())
             write();
         return std::move(result);
     }
 
   private:
+    static bool isUnreadFolder(const Discovery::LeftOut& left) {
+        return left.folder && left.finding.verdict == Verdict::unreadable;
+    }
+
+    /// Keeps the old records without a candidate: their files may exist nevertheless.
+    void keepUnlisted(const std::vector<Candidate>& candidates) {
+        for (const Candidate& candidate : candidates)
+            old.erase(Name(candidate.directory, candidate.fileName));
+        for (const auto& [name, library] : old)
+            result.libraries.push_back(library);
+        allJudged = false;
+    }
+
     bool isInterrupted() const {
         return (options.controller && options.controller->isInterrupted()) ||
                (options.probe.interrupted && options.probe.interrupted());
@@ -107,6 +123,9 @@ class Scanner {
         readDisabledNames();
         ListReading reading = readRecordedList(options.list);
         result.rejected = reading.reason;
+        const std::string judgement = readJudgement(verdictsFileOf(options.list));
+        ownJudgement = judgementOf({}, options.hosts);
+        judged = !judgement.empty() && judgement == judgementOf(reading.libraries, options.hosts);
         for (RecordedLibrary& library : reading.libraries) {
             Name name(library.directory, library.fileName);
             old.emplace(std::move(name), std::move(library));
@@ -121,20 +140,34 @@ class Scanner {
             keepFromWriting(L"nothing was written, for no library could be tried");
         else if (!result.rejected.empty() && !keepRejected())
             keepFromWriting(L"nothing was written, for what is there could not be kept");
+        if (result.notWritten.empty())
+            dropNewlyDisabled();
         if (!result.notWritten.empty())
             return;
-        dropNewlyDisabled();
         writeGuarded([&] { writeRecordedList(options.list, result.libraries); });
         // The list comes first: without verdicts it is still valid, and the next scan only retries
         // more. Verdicts without their list are useless.
         if (result.notWritten.empty())
-            writeGuarded(
-                [&] { writeVerdicts(verdictsFileOf(options.list), result.libraries, disabled); });
+            writeGuarded([&] {
+                writeVerdicts(verdictsFileOf(options.list), result.libraries, disabled,
+                              newJudgement());
+            });
+    }
+
+    /// Returns the digest of this scan; empty if the next scan must compare again.
+    std::string newJudgement() const {
+        const bool sameHost = judgementOf({}, options.hosts) == ownJudgement;
+        return allJudged && sameHost ? judgementOf(result.libraries, options.hosts) : "";
     }
 
     /// Reads what is switched off. A file that is not valid is treated as in `readVerdicts`.
     void readDisabledNames() {
-        disabled = readDisabled(verdictsFileOf(options.list)).value_or(DisabledComponents());
+        bool unreadable = false;
+        const std::filesystem::path file = verdictsFileOf(options.list);
+        disabled = readDisabled(file, &unreadable).value_or(DisabledComponents());
+        if (unreadable) // Writing it anew would switch everything on.
+            result.notWritten =
+                displayName(file) + L": nothing was written, for this file could not be read";
     }
 
     const DisabledComponent* findDisabled(const Candidate& candidate) const {
@@ -233,26 +266,34 @@ class Scanner {
     void add(const Candidate& candidate, Outcome outcome) {
         ScannedFile file{candidate.path, candidate.directory, candidate.fileName,
                          std::move(outcome.verdict), std::move(outcome.notes)};
+        const bool unchanged = outcome.unchanged || outcome.step == Outcome::Step::absent;
+        const bool isUnread =
+            outcome.known && unchanged && file.verdict.verdict == Verdict::unreadable;
         switch (outcome.step) {
         case Outcome::Step::disabled: recordWithoutBuilders(file, *outcome.status); break;
         case Outcome::Step::reused: keep(file, *outcome.known); break;
         case Outcome::Step::examined:
-            record(file, *outcome.status, std::move(outcome.builders));
+            file.looked = true;
+            if (!isUnread)
+                record(file, *outcome.status, std::move(outcome.builders));
             break;
         case Outcome::Step::absent:
         case Outcome::Step::leftForLater: break;
         }
-        // A library that could not be tried keeps its old record.
-        if (outcome.known && (file.verdict.verdict == Verdict::interrupted ||
-                              (outcome.unchanged && file.verdict.verdict == Verdict::probeFailed)))
+        // A library that could not be read or tried keeps its old record.
+        if (outcome.known &&
+            (file.verdict.verdict == Verdict::interrupted || isUnread ||
+             (outcome.unchanged && file.verdict.verdict == Verdict::probeFailed))) {
             keep(file, *outcome.known);
+            allJudged = false;
+        }
         result.files.push_back(std::move(file));
     }
 
     /// Returns whether a library that worked earlier does not match: its stamp, or its interfaces.
     /// The library does not change when libMZcomponentManager or the host is replaced.
     bool isForOtherHost(const Candidate& candidate, const RecordedLibrary& library) const {
-        if (library.builders.empty())
+        if (library.builders.empty() || judged)
             return false;
         FileBytes file(candidate.path);
         return abiDifference(readLibraryImage(file)).has_value() ||
@@ -301,7 +342,6 @@ class Scanner {
     /// Records what the examination of a library found.
     void record(ScannedFile& file, const platform::FileStatus& status,
                 std::vector<RecordedBuilder> builders) {
-        file.looked = true;
         if (file.verdict.verdict == Verdict::interrupted) {
             result.interrupted = true;
             return;
@@ -370,6 +410,9 @@ class Scanner {
 
     const ScanOptions& options;
     const HostInterfaces host;
+    std::string ownJudgement; ///< of this host, with no libraries, before the first comparison
+    bool judged = false;      ///< whether the old list was compared with this host
+    bool allJudged = true;    ///< whether the new list is
     std::map<Name, RecordedLibrary> old;
     DisabledComponents disabled;
     ScanResult result;

@@ -29,8 +29,11 @@ std::error_code syncFile(const std::filesystem::path& file,
 /// file open, the function may retry for half a second.
 std::error_code moveOver(const std::filesystem::path& from, const std::filesystem::path& to);
 
-/// Returns the target of a symlink, as it is stored; `std::nullopt` if `path` is not a symlink.
-std::optional<std::filesystem::path> symlinkTarget(const std::filesystem::path& path);
+/// Returns the target of a symlink, as it is stored; `std::nullopt` if `path` is not a symlink or
+/// does not exist, and after a failure.
+/// \param failure  whether it is unknown if `path` is a symlink, and why
+std::optional<std::filesystem::path> symlinkTarget(const std::filesystem::path& path,
+                                                   std::error_code& failure);
 
 /// Returns the system's message for an error.
 std::wstring errorText(const std::error_code& error);

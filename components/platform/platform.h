@@ -89,7 +89,12 @@ struct DirectoryEntry {
 /// fixed table; names that are equal then are sorted by their bytes.
 ///
 /// All identities in the result are comparable: several names of one file have the same identity.
-std::vector<std::vector<DirectoryEntry>> listCandidates(const std::vector<NativePath>& directories);
+///
+/// \param unlisted  receives for each directory whether candidates may be missing because the
+/// system
+///     lacked resources or could not read the directory now; may be null. Always false on Windows
+std::vector<std::vector<DirectoryEntry>> listCandidates(const std::vector<NativePath>& directories,
+                                                        std::vector<bool>* unlisted = nullptr);
 
 /// Returns the candidates of one directory.
 inline std::vector<DirectoryEntry> listCandidates(const NativePath& directory) {
@@ -112,9 +117,9 @@ Module findLoadedLibrary(const NativePath& path);
 
 /// Whether a file exports a function.
 enum class ExportState {
-    absent,   ///< the file does not export it, is not a library, is damaged or cannot be opened
+    absent,   ///< the file does not export it, is not a library, is damaged, or may not be opened
     exported, ///< the file is a library that exports the function
-    unknown,  ///< the system lacked the resources to open the file
+    unknown,  ///< the system lacked resources, or could not read the file now
 };
 
 /// Returns whether the file is a library for this system and processor that exports the function
@@ -136,8 +141,8 @@ Module loadLibrary(const NativePath& path);
 struct UsedLibrary {
     Module module = nullptr; ///< null if there is no such library
     bool loaded = false;     ///< whether this call loaded it; then the caller must unload it
-    /// The system lacked the resources to open the file. If the module is null, the file may be a
-    /// library nevertheless.
+    /// The system lacked resources, or could not read the file now. If the module is null, the file
+    /// may be a library nevertheless.
     bool unknown = false;
 };
 

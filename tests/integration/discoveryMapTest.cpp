@@ -14,7 +14,8 @@ TEST_F(DiscoveryMap, KeepsTheFirstOfTwoRecordsOfOneNameInTheMap) {
     folder.write("b", "2");
     ComponentManager::LibraryList found;
     ComponentManager::LibraryMap byName;
-    manager->discover(searchPathOf(folder.path()).c_str(), found, byName);
+    std::vector<std::wstring> unlisted;
+    manager->discover(searchPathOf(folder.path()).c_str(), found, byName, unlisted);
     ASSERT_EQ(found.size(), 2u);
     EXPECT_EQ(byName.size(), 2u);
     ComponentManager::LibraryList::iterator* a =
@@ -26,7 +27,7 @@ TEST_F(DiscoveryMap, KeepsTheFirstOfTwoRecordsOfOneNameInTheMap) {
     EXPECT_EQ(found.front().fileTime, 0u);
     EXPECT_EQ(found.front().fileSize, 0);
     // A second walk appends records but keeps the entries of the map.
-    manager->discover(searchPathOf(folder.path()).c_str(), found, byName);
+    manager->discover(searchPathOf(folder.path()).c_str(), found, byName, unlisted);
     EXPECT_EQ(byName.size(), 2u);
     EXPECT_EQ(&**byName.find({found.front().directory, L"a"}), &found.front());
 }

@@ -13,6 +13,7 @@
 #include <unistd.h>
 
 using Mz::platform::elfExportsFunction;
+using Mz::platform::ExportState;
 using Mz::Test::buildFolder;
 using Mz::Test::builtComponent;
 
@@ -39,7 +40,7 @@ class MemoryFile {
         EXPECT_EQ(::ftruncate(descriptor, static_cast<off_t>(size)), 0);
     }
     bool exports(const char* symbol = entryPoint) const {
-        return elfExportsFunction(descriptor, symbol);
+        return elfExportsFunction(descriptor, symbol) == ExportState::exported;
     }
 
   private:
@@ -310,6 +311,30 @@ TEST_P(ElfProbe, RefusesATableWithoutBuckets) {
     }
 }
 
+TEST_P(ElfProbe, ShiftsTheHashOfTheFilterAsTheProcessorDoes) {
+    if (!usesGnuHash())
+        GTEST_SKIP() << "this kind of table has no filter";
+    std::uint32_t hash = 5381;
+    for (const char* c = entryPoint; *c; ++c)
+        hash = hash * 33 + static_cast<unsigned char>(*c);
+    const std::size_t table = hashTable();
+    const auto words = get<std::uint32_t>(whole, table + 8);
+    const auto passes = [&](std::uint32_t shift, std::uint64_t filter) {
+        std::string content = whole;
+        put(content, table + 12, shift);
+        for (std::size_t word = 0; word < words; ++word)
+            put(content, table + 16 + word * 8, filter);
+        return exports(content);
+    };
+    for (const std::uint32_t shift : {0U, 6U, 30U, 31U, 32U, 33U, 63U, 64U, 0xFFFFFFFFU}) {
+        const std::uint64_t first = std::uint64_t{1} << hash % 64;
+        const std::uint64_t second = std::uint64_t{1} << (hash >> shift % 32) % 64;
+        EXPECT_TRUE(passes(shift, first | second)) << shift;
+        EXPECT_FALSE(passes(shift, ~first)) << shift;
+        EXPECT_FALSE(passes(shift, ~second)) << shift;
+    }
+}
+
 TEST_P(ElfProbe, EndsOnAChainThatNeverEnds) {
     std::string content = whole;
     const std::size_t table = hashTable();
@@ -389,7 +414,7 @@ TEST(ElfProbeOnFiles, RefusesShortTextsAndZeros) {
         EXPECT_FALSE(exports(std::string("\177ELF\2\1\1") + std::string(length, '\0')));
         EXPECT_FALSE(exports(std::string("\177ELF\2\1\1") + std::string(length, '\377')));
     }
-    EXPECT_FALSE(elfExportsFunction(-1, entryPoint));
+    EXPECT_EQ(elfExportsFunction(-1, entryPoint), ExportState::unknown);
 }
 
 } // namespace

@@ -7,9 +7,9 @@
 /// returns the manager. At the end the program prints for each PATH whether that file is mapped.
 ///
 ///     cycles      300 times: loads, initialises with a folder that does not exist, unloads
-///     growth      1,000 times the same, with entries in the registries; prints whether memory grew
-///     threads     loads and unloads on four threads at once, 75 cycles each
-///     component   300 times: loads, initialises with the folder of the first PATH, creates an
+///     growth      1,000 times the same, with entries in the registries; prints whether memory or
+///     handles grew threads     loads and unloads on four threads at once, 75 cycles each component
+///     300 times: loads, initialises with the folder of the first PATH, creates an
 ///                 object, unloads
 ///     thread      the same once, on a thread that ends before the library is unloaded
 ///     copy        the same once; then a forked copy of the process ends before the process
@@ -86,11 +86,13 @@ void measureGrowth() {
     for (int warmUp = 0; warmUp < 50; ++warmUp)
         cycle();
     constexpr std::size_t cycles = 1000;
-    const std::size_t before = allocatedBytes();
+    const std::size_t before = allocatedBytes(), handles = openHandles();
     for (std::size_t count = 0; count < cycles; ++count)
         cycle();
     // Allow less than one byte per cycle: the memory of the loader and the heap varies a little.
     const std::size_t after = allocatedBytes();
+    if (openHandles() != handles)
+        std::printf("has %zu handles instead of %zu\n", openHandles(), handles);
     if (after < before + cycles)
         std::puts("did not grow");
     else

@@ -5,6 +5,7 @@
 #include <gmock/gmock.h>
 
 #include <cmath>
+#include <cstdint>
 #include <limits>
 
 namespace {
@@ -157,11 +158,24 @@ TEST(FormattedWrite, CountsWhatItHasFormatted) {
 TEST(FormattedWrite, StoresItsCountInTheWidthThatIsSaid) {
     signed char bytes[] = {0x55, -1, 0x55};
     short half[] = {0x5555, -1, 0x5555};
+    long number[] = {0x55, -1, 0x55};
     int64 whole = -1;
-    EXPECT_EQ(formatted(L"abc%hhnde%hnf%I64n", &bytes[1], &half[1], &whole), "abcdef");
+    EXPECT_EQ(formatted(L"abc%hhnde%hnf%I64n%ln", &bytes[1], &half[1], &whole, &number[1]),
+              "abcdef");
     EXPECT_THAT(bytes, testing::ElementsAre(0x55, 3, 0x55));
     EXPECT_THAT(half, testing::ElementsAre(0x5555, 5, 0x5555));
     EXPECT_EQ(whole, 6);
+    EXPECT_THAT(number, testing::ElementsAre(0x55, 6, 0x55));
+}
+
+TEST(FormattedWrite, PutsAddressesInSixteenDigits) {
+    const auto address = [](std::uintptr_t number) { return reinterpret_cast<void*>(number); };
+    EXPECT_EQ(formatted(L"%p|%p", address(0), address(0x1F2E)),
+              "0000000000000000|0000000000001F2E");
+    EXPECT_EQ(formatted(L"%#p|%.3p", address(0xAB), address(1)),
+              "00000000000000AB|0000000000000001");
+    EXPECT_EQ(formatted(L"%18p|%-18p|", address(~std::uintptr_t{0}), address(1)),
+              "  FFFFFFFFFFFFFFFF|0000000000000001  |");
 }
 
 } // namespace

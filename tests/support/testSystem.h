@@ -24,6 +24,9 @@ void* functionOf(void* module, const char* name);
 /// leaks.
 std::size_t allocatedBytes();
 
+/// Returns the number of open descriptors (POSIX) or handles (Windows) of this process.
+std::size_t openHandles();
+
 /// Forks, ends the child by `std::exit(0)` and returns its exit code, or -1 if the child did not
 /// exit. Returns 0 on systems without fork.
 int exitCodeOfCopy();

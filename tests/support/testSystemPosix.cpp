@@ -48,6 +48,15 @@ std::size_t allocatedBytes() {
     return heap.uordblks + heap.hblkhd;
 }
 
+std::size_t openHandles() {
+    std::error_code failure;
+    std::size_t count = 0;
+    for (std::filesystem::directory_iterator entry("/proc/self/fd", failure), end; entry != end;
+         ++entry)
+        ++count;
+    return count;
+}
+
 int exitCodeOfCopy() {
     const pid_t copy = ::fork();
     if (copy == 0)

@@ -62,6 +62,12 @@ std::size_t allocatedBytes() {
     return bytes;
 }
 
+std::size_t openHandles() {
+    DWORD count = 0;
+    ::GetProcessHandleCount(::GetCurrentProcess(), &count);
+    return count;
+}
+
 int exitCodeOfCopy() {
     return 0;
 }

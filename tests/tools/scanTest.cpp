@@ -186,6 +186,41 @@ TEST_F(Scan, FollowsTheInterfacesOfTheHostThoughTheLibraryIsUnchanged) {
     verdictIs(Verdict::otherInterface);
 }
 
+TEST_F(Scan, ComparesALibraryThatAHostHasRecordedSince) {
+    add(L"goodWithKit");
+    ScanOptions wanted = options();
+    wanted.hosts = {hostWithInterfaces()};
+    ScanResult first = scan(wanted);
+    ASSERT_EQ(first.libraries.size(), 1u);
+    // A host that loads a library does not compare its interfaces.
+    const auto file = add(L"changedInterface");
+    ScanOptions byHost = options();
+    const RecordedLibraries both = scan(byHost).libraries;
+    ASSERT_EQ(both.size(), 2u);
+    scan(wanted); // Leaves a digest, and no builders of the second library.
+    writeRecordedList(list(), both);
+    const ScanResult result = scan(wanted);
+    EXPECT_EQ(verdicts(result)[file.filename().string()], Verdict::otherInterface);
+    EXPECT_EQ(readRecordedList(list()).libraries.size(), 2u);
+}
+
+TEST_F(Scan, ComparesAgainAfterTheHostWasReplacedByAFileOfItsSize) {
+    add(L"changedInterface");
+    TemporaryDirectory hosts;
+    const std::filesystem::path host = hosts.path() / "host";
+    const auto putHost = [&](const std::filesystem::path& from) {
+        std::filesystem::copy_file(from, host, std::filesystem::copy_options::overwrite_existing);
+        std::filesystem::resize_file(host, std::uintmax_t{4} << 20);
+    };
+    ScanOptions wanted = options();
+    wanted.hosts = {host};
+    putHost(builtComponent(L"changedInterface"));
+    EXPECT_EQ(scan(wanted).files[0].verdict.verdict, Verdict::works);
+    EXPECT_EQ(scan(wanted).files[0].verdict.verdict, Verdict::works);
+    putHost(hostWithInterfaces());
+    EXPECT_EQ(scan(wanted).files[0].verdict.verdict, Verdict::otherInterface);
+}
+
 TEST_F(Scan, LeavesOutALibraryThatNeedsItsHostSoThatTheHostLoadsIt) {
     const auto file = add(L"takesFromHost");
     add(L"goodWithKit");

@@ -2,6 +2,7 @@
 // Tests how the buffers convert characters in multibyte and single-byte locales, and the platform's
 // converter alone.
 #include "components/componentManager/bufferio.h"
+#include "components/componentManager/text/plainBytes.h"
 #include "components/platform/characters.h"
 #include "tests/unit/locales.h"
 
@@ -220,6 +221,27 @@ TEST(MultibyteLocale, IsFollowedFromOneCallToTheNext) {
         }
         EXPECT_EQ(in.readChar(c), 1);
         EXPECT_EQ(c, locale.code);
+    });
+}
+
+TEST(MultibyteLocale, ReturnsAfterTheOuterScopeOfPlainBytes) {
+    inEveryMultibyteLocale([](const MultibyteLocale& locale) {
+        const auto written = [](wchar_t character) {
+            std::ostringstream stream;
+            QrOutBuffer out(&stream);
+            out.writeChar(character);
+            return stream.str();
+        };
+        EXPECT_EQ(written(locale.code), locale.character);
+        {
+            const PlainBytes outer;
+            {
+                const PlainBytes inner;
+                EXPECT_EQ(written(L'\u00E4'), "\xE4");
+            }
+            EXPECT_EQ(written(L'\u00E4'), "\xE4");
+        }
+        EXPECT_EQ(written(locale.code), locale.character);
     });
 }
 

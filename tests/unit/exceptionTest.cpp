@@ -4,7 +4,7 @@
 #include "components/base/assertions.h"
 #include "components/componentManager/cast.h"
 #include "components/platform/platform.h"
-#include "tests/unit/allocationFailure.h"
+#include "tests/support/failingAllocations.h"
 #include "tests/unit/throwsEverything.h"
 
 #include <gtest/gtest.h>

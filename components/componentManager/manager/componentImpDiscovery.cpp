@@ -146,8 +146,8 @@ std::wstring ComponentManager::normalisePath(const wchar_t* path, bool listMode)
     return Mz::normalisePath(path, listMode);
 }
 
-void ComponentManager::discover(const wchar_t* searchPath, LibraryList& newList,
-                                LibraryMap& byName) {
+void ComponentManager::discover(const wchar_t* searchPath, LibraryList& newList, LibraryMap& byName,
+                                std::vector<std::wstring>& unlisted) {
     std::vector<std::wstring> directories; // normalised
     std::vector<platform::NativePath> openingPaths;
     for (const std::wstring& entry : directoriesOf(searchPath)) {
@@ -158,9 +158,12 @@ void ComponentManager::discover(const wchar_t* searchPath, LibraryList& newList,
         openingPaths.push_back(platform::openingPath(directories.back(), {}, *native));
     }
     SeenFiles seen;
+    std::vector<bool> incomplete;
     std::vector<std::vector<platform::DirectoryEntry>> listings =
-        platform::listCandidates(openingPaths);
-    for (std::size_t index = 0; index < listings.size(); ++index)
+        platform::listCandidates(openingPaths, &incomplete);
+    for (std::size_t index = 0; index < listings.size(); ++index) {
+        if (incomplete[index])
+            unlisted.push_back(directories[index]);
         for (platform::DirectoryEntry& candidate : listings[index]) {
             std::wstring fileName = normalisePath(candidate.name.c_str(), false);
             // Each file gets one record, even if the search path leads to it several times.
@@ -177,30 +180,40 @@ void ComponentManager::discover(const wchar_t* searchPath, LibraryList& newList,
             if (!byName.find(key))
                 byName[key] = std::prev(newList.end());
         }
+    }
 }
 
-void ComponentManager::merge(LibraryList& recorded, LibraryMap& byName) {
+void ComponentManager::keepUnlisted(LibraryList& found, const std::vector<std::wstring>& unlisted) {
+    for (auto next = libraries.begin(); next != libraries.end();) {
+        const auto old = next++;
+        if (std::find(unlisted.begin(), unlisted.end(), old->directory) != unlisted.end())
+            found.splice(found.end(), libraries, old);
+    }
+}
+
+void ComponentManager::merge(LibraryList& found, LibraryMap& byName) {
+    // Whatever allocates comes first: if it throws, no restored record has moved.
     std::vector<LibraryList::iterator*> places; // In the map; null if the file is gone.
-    places.reserve(recorded.size());
-    for (const ComponentLibrary& library : recorded) {
+    places.reserve(libraries.size());
+    for (const ComponentLibrary& library : libraries) {
         places.push_back(byName.find({library.directory, library.fileName}));
         if (places.back())
             ++(*places.back())->restoredCount;
     }
-    SameNameGroups groups(libraries, byName);
+    SameNameGroups groups(found, byName);
     LibraryList replaced; // Kept alive because the keys of both maps are views into these records.
     auto place = places.begin();
-    for (auto next = recorded.begin(); next != recorded.end();) {
+    for (auto next = libraries.begin(); next != libraries.end();) {
         const auto old = next++;
-        LibraryList::iterator* const found = *place++;
+        LibraryList::iterator* const file = *place++;
         const LibraryKey key(old->directory, old->fileName);
-        if (!found || groups.isAmbiguous(key, **found))
+        if (!file || groups.isAmbiguous(key, **file))
             continue;
-        groups.advance(key, *found);
-        old->foundPath = std::move((*found)->foundPath);
-        libraries.splice(*found, recorded, old);
-        replaced.splice(replaced.end(), libraries, *found);
-        *found = old;
+        groups.advance(key, *file);
+        old->foundPath = std::move((*file)->foundPath);
+        found.splice(*file, libraries, old);
+        replaced.splice(replaced.end(), found, *file);
+        *file = old;
     }
 }
 

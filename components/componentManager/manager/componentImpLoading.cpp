@@ -9,6 +9,7 @@
 #include "components/componentManager/recordFormat.h"
 
 #include <cxxabi.h>
+#include <list>
 #include <optional>
 #include <type_traits>
 #include <utility>
@@ -84,6 +85,8 @@ bool ComponentManager::ensureLoaded(ComponentLibrary& library, bool forUse) {
         return !library.builders.empty();
     const std::optional<platform::FileStatus> status = platform::queryFile(library.openingPath());
     if (!status) {
+        if (!library.builders.empty())
+            library.noteFile({}); // The file may be accessible again at the next start.
         dropBuilders(library);
         return false;
     }
@@ -132,7 +135,10 @@ __attribute__((no_sanitize("null"))) bool
 ComponentManager::registerLibrary(ComponentLibrary& library, const platform::FileStatus& status) {
     bool described = false;
     bool failed = false;
+    // For the builders of a failure, which may be a failed allocation. There are none without it.
+    std::list<BuilderList> place;
     try {
+        place.emplace_back();
         LibraryReference<QrComponentDescription> description(getDescription(library).detach());
         const bool found = description.get() != nullptr;
         if (found)
@@ -142,7 +148,7 @@ ComponentManager::registerLibrary(ComponentLibrary& library, const platform::Fil
     } catch (abi::__forced_unwind&) {
         // The thread is being cancelled, and this exception must propagate. An incomplete
         // description must not stay registered.
-        dropBuilders(library);
+        dropBuilders(library, place);
         unload(library);
         throw;
     } catch (...) {
@@ -151,7 +157,7 @@ ComponentManager::registerLibrary(ComponentLibrary& library, const platform::Fil
         failed = true;
     }
     if (failed)
-        dropBuilders(library);
+        dropBuilders(library, place);
     if (!described)
         unload(library);
     if (!failed)

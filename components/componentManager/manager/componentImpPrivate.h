@@ -61,12 +61,19 @@ class MZ_INTERNAL_API ComponentManager final
     static std::wstring normalisePath(const wchar_t* path, bool listMode);
 
     /// Appends a record to `newList` for each candidate in the directories of `searchPath`, and
-    /// enters it in `byName` unless another record has the same names.
-    void discover(const wchar_t* searchPath, LibraryList& newList, LibraryMap& byName);
+    /// enters it in `byName` unless another record has the same names. Appends to `unlisted` the
+    /// normalised directories of which the system could not list all files.
+    void discover(const wchar_t* searchPath, LibraryList& newList, LibraryMap& byName,
+                  std::vector<std::wstring>& unlisted);
 
-    /// Replaces each new record by the restored record of the same file, if there is one, with its
-    /// time, size and builders. List nodes are spliced; no record is copied or moved in memory.
-    void merge(LibraryList& recorded, LibraryMap& byName);
+    /// Replaces each new record in `found` by the restored record of the same file, if there is
+    /// one, with its time, size and builders. The other restored records stay in `libraries`, and
+    /// all of them do if it throws. List nodes are spliced; no record is copied or moved in memory.
+    void merge(LibraryList& found, LibraryMap& byName);
+
+    /// Moves the restored records of these directories from `libraries` to `found`. Their files may
+    /// exist nevertheless, and a record without builders keeps its library from being loaded.
+    void keepUnlisted(LibraryList& found, const std::vector<std::wstring>& unlisted);
 
     /// Registers the builders of the library and, if `forUse`, loads it. Without `forUse`, a
     /// library whose file has not changed since it was recorded is not loaded. Returns false if the
@@ -99,7 +106,7 @@ class MZ_INTERNAL_API ComponentManager final
 
     /// Removes the builder records from the library, and their uids from the index, even where the
     /// entry refers to a builder of another library. The records stay valid, because clients may
-    /// still hold pointers to them.
+    /// still hold pointers to them. If it throws, nothing has changed.
     void dropBuilders(ComponentLibrary& library);
 
     LibraryList libraries;
@@ -110,13 +117,16 @@ class MZ_INTERNAL_API ComponentManager final
     enum class LoadResult {
         loaded,
         rejected, ///< the file is not a component library, or cannot be loaded
-        unknown,  ///< the system lacked the resources to open the file
+        unknown,  ///< the system lacked resources, or could not read the file now
     };
     /// Uses the library that is mapped in the process already, or else loads it.
     LoadResult loadModule(ComponentLibrary& library);
     /// Records the builders that the loaded library describes. On failure, drops them and unloads
     /// the library. Returns whether the library has a description.
     bool registerLibrary(ComponentLibrary& library, const platform::FileStatus& status);
+    /// Does the same without an allocation.
+    /// \param place  one empty list for the builders, which is taken over
+    void dropBuilders(ComponentLibrary& library, std::list<BuilderList>& place);
     /// Copies the values and builders of the description into the library record.
     void readDescription(ComponentLibrary& library, QrComponentDescription& description);
 

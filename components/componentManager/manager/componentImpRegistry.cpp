@@ -70,9 +70,17 @@ void ComponentManager::reindexBuilders(ComponentLibrary& library) {
 void ComponentManager::dropBuilders(ComponentLibrary& library) {
     if (library.builders.empty())
         return;
+    std::list<BuilderList> place(1);
+    dropBuilders(library, place);
+}
+
+void ComponentManager::dropBuilders(ComponentLibrary& library, std::list<BuilderList>& place) {
+    if (library.builders.empty())
+        return;
     for (std::size_t index = library.builders.size(); index-- > 0;)
         builderIndex.erase(library.builders[index].uid);
-    droppedBuilders.emplace_back().swap(library.builders);
+    place.front().swap(library.builders);
+    droppedBuilders.splice(droppedBuilders.end(), place);
 }
 
 } // namespace Mz

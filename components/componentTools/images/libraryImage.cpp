@@ -16,13 +16,16 @@ FileBytes::Source::Source(const std::filesystem::path& path) {
     if (!opened)
         return;
     const std::streamoff end = stream.rdbuf()->pubseekoff(0, std::ios::end, std::ios::in);
+    failed = end < 0;
     bytes = end > 0 ? static_cast<std::uint64_t>(end) : 0;
 }
 
 std::size_t FileBytes::Source::read(std::uint64_t offset, void* data, std::size_t length) {
     stream.clear();
     stream.seekg(static_cast<std::streamoff>(offset));
+    failed = failed || !stream;
     stream.read(static_cast<char*>(data), static_cast<std::streamsize>(length));
+    failed = failed || stream.bad();
     const std::streamsize count = stream.bad() ? 0 : stream.gcount();
     return static_cast<std::size_t>(std::max<std::streamsize>(count, 0));
 }
@@ -67,6 +70,7 @@ LibraryImage readLibraryImage(FileBytes& file) {
         readElfImage(file, image);
     else if (magic && std::memcmp(magic->data(), "MZ", 2) == 0)
         readPeImage(file, image);
+    image.readable = !file.hasFailed();
     return image;
 }
 

@@ -25,6 +25,8 @@ class FileBytes {
     explicit FileBytes(const std::filesystem::path& path) : source(path), blocks(source) {}
 
     bool isOpen() const { return source.opened; }
+    /// Returns whether the system could not read something. The file is not at fault then.
+    bool hasFailed() const { return source.failed; }
     std::uint64_t size() const { return source.bytes; }
 
     /// Returns whether the file contains all of these bytes.
@@ -62,6 +64,7 @@ class FileBytes {
 
         std::ifstream stream;
         bool opened = false;
+        bool failed = false;
         std::uint64_t bytes = 0;
     };
 
@@ -75,7 +78,7 @@ struct LibraryImage {
     enum class Kind { other, library, program };
     enum class EntryPoint { absent, function, noFunction };
 
-    bool readable = false;
+    bool readable = false; ///< false if it cannot be opened, or not be read completely
     ImageFormat format = ImageFormat::none;
     Kind kind = Kind::other;
     std::wstring otherProcessor; ///< the name of its processor; empty for x86-64

@@ -80,8 +80,11 @@ Finding inspectFile(const std::filesystem::path& file, LibraryImage& image) {
 
 Verdict verdictOnAbsence(const std::filesystem::path& file) {
     std::error_code failure;
-    static_cast<void>(std::filesystem::status(file, failure));
-    return failure == std::errc::permission_denied ? Verdict::unreachable : Verdict::missing;
+    const std::filesystem::file_status status = std::filesystem::status(file, failure);
+    if (failure == std::errc::permission_denied)
+        return Verdict::unreachable;
+    return status.type() == std::filesystem::file_type::not_found ? Verdict::missing
+                                                                  : Verdict::unreadable;
 }
 
 namespace {

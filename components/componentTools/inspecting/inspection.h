@@ -16,8 +16,8 @@ namespace Mz::Tools {
 /// \param image  receives the file's content if the file is a candidate; else it is unchanged
 Finding inspectFile(const std::filesystem::path& file, LibraryImage& image);
 
-/// Returns why the status of a file cannot be queried: `unreachable` if access is denied, else
-/// `missing`.
+/// Returns why the status of a file could not be queried: `unreachable` if access is denied,
+/// `missing` if there is no such file, else `unreadable`.
 Verdict verdictOnAbsence(const std::filesystem::path& file);
 
 /// Returns the direct and indirect dependencies of a file, each name once, in the loader's order.

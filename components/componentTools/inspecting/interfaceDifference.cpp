@@ -211,11 +211,16 @@ std::optional<Finding> HostInterfaces::differenceOf(const std::string& content) 
     return std::nullopt;
 }
 
-void HostInterfaces::read() const {
+std::vector<std::filesystem::path>
+HostInterfaces::filesOf(const std::vector<std::filesystem::path>& hosts) {
     std::vector<std::filesystem::path> all{System::managerFile(), platform::programFile()};
-    all.insert(all.end(), files.begin(), files.end());
+    all.insert(all.end(), hosts.begin(), hosts.end());
+    return all;
+}
+
+void HostInterfaces::read() const {
     std::vector<std::string> contents;
-    for (const std::filesystem::path& host : all)
+    for (const std::filesystem::path& host : filesOf(files))
         tables.push_back(
             parseInterfaceTables(contents.emplace_back(sectionsOf(host, interfaceSection))));
     for (const std::string& content : contents)

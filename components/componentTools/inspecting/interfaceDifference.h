@@ -29,6 +29,10 @@ class HostInterfaces {
     HostInterfaces(const HostInterfaces&) = delete;
     HostInterfaces& operator=(const HostInterfaces&) = delete;
 
+    /// Returns the files that a component is compared with.
+    static std::vector<std::filesystem::path>
+    filesOf(const std::vector<std::filesystem::path>& hosts);
+
     /// Returns `interfaceDifference` of the component and the first file from which it differs.
     /// \param component  the file of a component
     std::optional<Finding> difference(const std::filesystem::path& component) const;

@@ -7,6 +7,7 @@
 
 #include <chrono>
 #include <optional>
+#include <system_error>
 #include <thread>
 
 namespace Mz::Tools {
@@ -23,6 +24,11 @@ bool openPatiently(std::ifstream& stream, const std::filesystem::path& file) {
         std::this_thread::sleep_for(std::chrono::milliseconds(10));
     }
     return false;
+}
+
+bool isMissing(const std::filesystem::path& file) {
+    std::error_code ignored;
+    return std::filesystem::status(file, ignored).type() == std::filesystem::file_type::not_found;
 }
 
 } // namespace Mz::Tools

@@ -12,4 +12,7 @@ namespace Mz::Tools {
 /// \return false if there is no regular file, or it still cannot be opened after half a second
 bool openPatiently(std::ifstream& stream, const std::filesystem::path& file);
 
+/// Returns whether there is no such file. A file that cannot be queried may exist.
+bool isMissing(const std::filesystem::path& file);
+
 } // namespace Mz::Tools

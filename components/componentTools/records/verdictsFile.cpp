@@ -8,7 +8,6 @@
 #include "components/componentManager/utf8.h"
 #include "components/componentTools/records/openPatiently.h"
 #include "components/componentTools/records/replaceChanged.h"
-#include "components/platform/platform.h"
 
 #include <cstdint>
 #include <fstream>
@@ -108,19 +107,41 @@ void readVerdicts(const std::filesystem::path& file, RecordedLibraries& librarie
                     library.kept = disabledFinding(component);
     } catch (const nlohmann::json::exception&) {
         return; // Without verdicts the next scan only retries more.
+    } catch (const std::ios_base::failure&) {
+        return; // The buffer of a file throws it, and JSON is read from the buffer.
     }
 }
 
-std::optional<DisabledComponents> readDisabled(const std::filesystem::path& file) {
+std::optional<DisabledComponents> readDisabled(const std::filesystem::path& file,
+                                               bool* unreadable) {
+    std::ifstream input;
+    bool isRead = openPatiently(input, file);
+    if (unreadable)
+        *unreadable = false;
+    if (!isRead && isMissing(file))
+        return std::optional<DisabledComponents>(std::in_place);
+    try {
+        if (isRead)
+            return disabledIn(OrderedJson::parse(input));
+    } catch (const nlohmann::json::exception&) {
+        isRead = !input.bad();
+    } catch (const std::ios_base::failure&) { // Of the file's buffer, from which JSON is read.
+        isRead = false;
+    }
+    if (unreadable)
+        *unreadable = !isRead;
+    return std::nullopt;
+}
+
+std::string readJudgement(const std::filesystem::path& file) {
     std::ifstream input;
     if (!openPatiently(input, file))
-        return platform::queryFile(file.native())
-                   ? std::nullopt
-                   : std::optional<DisabledComponents>(std::in_place);
+        return {};
     try {
-        return disabledIn(OrderedJson::parse(input));
+        const OrderedJson all = OrderedJson::parse(input);
+        return all.at("version").get<int>() == version ? all.value("judgement", "") : "";
     } catch (const nlohmann::json::exception&) {
-        return std::nullopt;
+        return {}; // The next scan only compares more.
     }
 }
 
@@ -134,7 +155,7 @@ Finding disabledFinding(const DisabledComponent& component) {
 }
 
 void writeVerdicts(const std::filesystem::path& file, const RecordedLibraries& libraries,
-                   const DisabledComponents& disabled) {
+                   const DisabledComponents& disabled, const std::string& judgement) {
     OrderedJson entries = OrderedJson::array(), choices = OrderedJson::array();
     for (const DisabledComponent& component : disabled)
         choices.push_back({{"directory", toUtf8(component.directory)},
@@ -151,7 +172,9 @@ void writeVerdicts(const std::filesystem::path& file, const RecordedLibraries& l
                                {"words", toUtf8(library.kept->words)},
                                {"sentence", toUtf8(sentenceOf(*library.kept))},
                                {"cure", toUtf8(cureOf(*library.kept))}});
-    const OrderedJson all{{"version", version}, {"libraries", entries}, {"disabled", choices}};
+    OrderedJson all{{"version", version}, {"libraries", entries}, {"disabled", choices}};
+    if (!judgement.empty())
+        all["judgement"] = judgement;
     replaceChanged(file, all.dump(2, ' ', true) + "\n");
 }
 

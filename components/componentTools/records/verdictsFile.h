@@ -7,6 +7,7 @@
 
 #include <filesystem>
 #include <optional>
+#include <string>
 
 namespace Mz::Tools {
 
@@ -16,7 +17,13 @@ namespace Mz::Tools {
 void readVerdicts(const std::filesystem::path& file, RecordedLibraries& libraries);
 
 /// Returns what is switched off; `std::nullopt` if there is a file, but it is not valid.
-std::optional<DisabledComponents> readDisabled(const std::filesystem::path& file);
+/// \param unreadable  receives whether the system could not read the file, which may be valid; may
+///     be null
+std::optional<DisabledComponents> readDisabled(const std::filesystem::path& file,
+                                               bool* unreadable = nullptr);
+
+/// Returns what `writeVerdicts` wrote as `judgement`; empty if there is none.
+std::string readJudgement(const std::filesystem::path& file);
 
 /// Returns whether the record is the component's, by their names.
 bool isRecordOf(const RecordedLibrary& library, const DisabledComponent& component);
@@ -25,8 +32,9 @@ bool isRecordOf(const RecordedLibrary& library, const DisabledComponent& compone
 Finding disabledFinding(const DisabledComponent& component);
 
 /// Writes the saved verdicts and what is switched off, atomically.
+/// \param judgement  what the libraries with builders were compared with (`judgementOf`)
 /// \throws whatever `replaceFile` throws
 void writeVerdicts(const std::filesystem::path& file, const RecordedLibraries& libraries,
-                   const DisabledComponents& disabled);
+                   const DisabledComponents& disabled, const std::string& judgement = {});
 
 } // namespace Mz::Tools

@@ -12,9 +12,11 @@
 #include "components/platform/platform.h"
 
 #include "components/platform/characters.h"
+#include "components/platform/posix/temporaryErrors.h"
 #include "components/platform/upperCase.h"
 
 #include <algorithm>
+#include <cerrno>
 #include <cstddef>
 #include <dirent.h>
 #include <fcntl.h>
@@ -40,6 +42,7 @@ using Directory = std::unique_ptr<DIR, CloseDirectory>;
 struct Listing {
     std::vector<DirectoryEntry> files;
     std::vector<bool> byStatus; ///< which of them were identified by their status
+    bool incomplete = false;    ///< candidates may be missing, by a temporary failure
 };
 
 /// Returns whether an entry contains the number of its file. Some file systems use a placeholder.
@@ -56,17 +59,23 @@ std::optional<FileIdentity> identityByStatus(int directory, const char* name) {
     return FileIdentity{status.st_dev, status.st_ino};
 }
 
+/// Notes a failure of the last call, whose error number is in `errno`.
+void noteFailure(Listing& listing) {
+    listing.incomplete = listing.incomplete || isTemporary(errno);
+}
+
 /// Adds the file of `item` if it is a candidate. `device` is the device of the directory.
 void addCandidate(Listing& listing, const NativePath& path, DIR* directory, dev_t device,
                   const dirent& item) {
     if (item.d_name[0] == '.' || item.d_type == DT_DIR)
         return;
     const bool listed = item.d_type == DT_REG && hasFileNumber(item);
+    errno = 0;
     const std::optional<FileIdentity> identity =
         listed ? FileIdentity{device, item.d_ino}
                : identityByStatus(::dirfd(directory), item.d_name);
     if (!identity)
-        return;
+        return noteFailure(listing);
     std::optional<std::wstring> name = toCharacters(item.d_name);
     if (!name)
         return;
@@ -74,14 +83,23 @@ void addCandidate(Listing& listing, const NativePath& path, DIR* directory, dev_
     listing.byStatus.push_back(!listed);
 }
 
+/// Returns null at the end of the directory, where `errno` is zero, and after a failure.
+const dirent* nextEntry(DIR* directory) {
+    errno = 0;
+    return ::readdir(directory);
+}
+
 Listing list(const NativePath& path) {
     Listing listing;
     const Directory directory(::opendir(path.c_str()));
     struct stat status;
-    if (!directory || ::fstat(::dirfd(directory.get()), &status) != 0)
+    if (!directory || ::fstat(::dirfd(directory.get()), &status) != 0) {
+        noteFailure(listing);
         return listing;
-    while (const dirent* item = ::readdir(directory.get()))
+    }
+    while (const dirent* item = nextEntry(directory.get()))
         addCandidate(listing, path, directory.get(), status.st_dev, *item);
+    noteFailure(listing);
     return listing;
 }
 
@@ -144,12 +162,17 @@ void sort(std::vector<DirectoryEntry>& files) {
 
 } // namespace
 
-std::vector<std::vector<DirectoryEntry>>
-listCandidates(const std::vector<NativePath>& directories) {
+std::vector<std::vector<DirectoryEntry>> listCandidates(const std::vector<NativePath>& directories,
+                                                        std::vector<bool>* unlisted) {
     std::vector<Listing> listings;
     listings.reserve(directories.size());
     for (const NativePath& directory : directories)
         listings.push_back(list(directory));
+    if (unlisted) {
+        unlisted->clear();
+        for (const Listing& listing : listings)
+            unlisted->push_back(listing.incomplete);
+    }
     if (hasUnlistedTarget(listings))
         for (Listing& listing : listings)
             identifyByStatus(listing);

@@ -36,7 +36,12 @@ class DescriptorSource final : public ByteSource {
         struct stat status;
         if (::fstat(descriptor, &status) == 0)
             fileSize = static_cast<std::uint64_t>(status.st_size);
+        else
+            failed = true;
     }
+
+    /// Returns whether the system could not read something. The file is not at fault then.
+    bool hasFailed() const { return failed; }
 
     std::uint64_t size() const override { return fileSize; }
 
@@ -47,8 +52,12 @@ class DescriptorSource final : public ByteSource {
                                         static_cast<off_t>(offset + done));
             if (got > 0)
                 done += static_cast<std::size_t>(got);
-            else if (got == 0 || errno != EINTR)
+            else if (got == 0)
                 break;
+            else if (errno != EINTR) {
+                failed = true;
+                break;
+            }
         }
         return done;
     }
@@ -56,6 +65,7 @@ class DescriptorSource final : public ByteSource {
   private:
     int descriptor;
     std::uint64_t fileSize = 0;
+    bool failed = false;
 };
 
 /// The tables for symbol lookup, by their addresses in the loaded library.
@@ -261,9 +271,11 @@ class ElfLibrary {
 
 } // namespace
 
-bool elfExportsFunction(int descriptor, const char* symbol) {
+ExportState elfExportsFunction(int descriptor, const char* symbol) {
     DescriptorSource source(descriptor);
-    return ElfLibrary(source).exports(symbol);
+    if (ElfLibrary(source).exports(symbol))
+        return ExportState::exported;
+    return source.hasFailed() ? ExportState::unknown : ExportState::absent;
 }
 
 } // namespace Mz::platform

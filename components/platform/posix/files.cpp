@@ -47,20 +47,26 @@ std::error_code syncFile(const std::filesystem::path& path,
 }
 
 std::error_code moveOver(const std::filesystem::path& from, const std::filesystem::path& to) {
+    // What may throw comes first, for a caller relies on the old file after an exception.
+    const std::filesystem::path folder =
+        to.has_parent_path() ? to.parent_path() : std::filesystem::path(".");
     if (std::rename(from.c_str(), to.c_str()) != 0)
         return lastError();
     // Failures are ignored: some file systems cannot sync a folder, and the file is renamed
     // already.
-    syncFile(to.has_parent_path() ? to.parent_path() : std::filesystem::path("."), std::nullopt);
+    syncFile(folder, std::nullopt);
     return {};
 }
 
-std::optional<std::filesystem::path> symlinkTarget(const std::filesystem::path& path) {
-    std::error_code failure;
+std::optional<std::filesystem::path> symlinkTarget(const std::filesystem::path& path,
+                                                   std::error_code& failure) {
     std::filesystem::path text = std::filesystem::read_symlink(path, failure);
-    if (failure)
-        return std::nullopt;
-    return text;
+    if (!failure)
+        return text;
+    if (failure == std::errc::invalid_argument || failure == std::errc::no_such_file_or_directory ||
+        failure == std::errc::not_a_directory)
+        failure.clear();
+    return std::nullopt;
 }
 
 std::wstring errorText(const std::error_code& error) {

@@ -9,16 +9,21 @@
 
 #include "components/platform/characters.h"
 #include "components/platform/posix/elfProbe.h"
+#include "components/platform/posix/temporaryErrors.h"
 
+#include <algorithm>
 #include <cerrno>
 #include <cstring>
 #include <dlfcn.h>
 #include <fcntl.h>
+#include <iterator>
 #include <langinfo.h>
+#include <libintl.h>
 #include <link.h>
 #include <locale.h>
 #include <pthread.h>
 #include <span>
+#include <string_view>
 #include <sys/stat.h>
 #include <system_error>
 #include <type_traits>
@@ -46,9 +51,19 @@ class Descriptor {
     int value;
 };
 
-/// Returns whether an operation failed for lack of resources, not because of the file.
-bool isShortage(int error) {
-    return error == EMFILE || error == ENFILE || error == ENOMEM;
+/// Returns whether the loader's last failure may be temporary. Discards its message.
+///
+/// The loader returns no error number. Its message ends with the system's text for one, except
+/// where it cannot map a file. A file system without executable files causes that, too: libraries
+/// there are tried at each start.
+bool takeTemporaryFailure() {
+    const char* const text = ::dlerror();
+    if (!text)
+        return false;
+    const std::string_view message(text);
+    return message.ends_with(::dgettext("libc", "failed to map segment from shared object")) ||
+           std::any_of(std::begin(temporaryErrors), std::end(temporaryErrors),
+                       [&](int error) { return message.ends_with(std::strerror(error)); });
 }
 
 /// The program headers of a loaded library.
@@ -117,6 +132,12 @@ template <class Result, class... Args>
 Result callLoader(Result (*function)(Args...), std::type_identity_t<Args>... args) noexcept {
     Result (*const volatile opaque)(Args...) = function;
     return opaque(args...);
+}
+
+/// Loads the library, or takes a reference to it if the process has mapped it.
+UsedLibrary load(const NativePath& path) {
+    const Module module = callLoader(::dlopen, path.c_str(), RTLD_NOW | RTLD_LOCAL);
+    return {module, module != nullptr, !module && takeTemporaryFailure()};
 }
 
 /// Returns the number of libraries that the process has ever mapped.
@@ -203,15 +224,12 @@ Module findLoadedLibrary(const NativePath& path) {
 ExportState queryExport(const NativePath& path, const char* symbol) {
     const Descriptor file(::open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK));
     if (!file)
-        return isShortage(errno) ? ExportState::unknown : ExportState::absent;
-    return elfExportsFunction(file.get(), symbol) ? ExportState::exported : ExportState::absent;
+        return isTemporary(errno) ? ExportState::unknown : ExportState::absent;
+    return elfExportsFunction(file.get(), symbol);
 }
 
 Module loadLibrary(const NativePath& path) {
-    const Module module = callLoader(::dlopen, path.c_str(), RTLD_NOW | RTLD_LOCAL);
-    if (!module)
-        ::dlerror(); // Discards the message.
-    return module;
+    return load(path).module;
 }
 
 UsedLibrary useLibrary(const NativePath& path, const char* symbol) {
@@ -221,11 +239,11 @@ UsedLibrary useLibrary(const NativePath& path, const char* symbol) {
         return {isMappedAs(path) ? findLoadedLibrary(path) : nullptr, false,
                 state == ExportState::unknown};
     const unsigned long long before = mappingCount();
-    const Module module = loadLibrary(path);
-    if (!module || mappingCount() != before)
-        return {module, module != nullptr, false};
-    unloadLibrary(module); // The code that loaded it decides how long it stays.
-    return {module, false, false};
+    const UsedLibrary used = load(path);
+    if (!used.module || mappingCount() != before)
+        return used;
+    unloadLibrary(used.module); // The code that loaded it decides how long it stays.
+    return {used.module, false, false};
 }
 
 void unloadLibrary(Module module) {

@@ -36,6 +36,9 @@ class FileSource final : public ByteSource {
     bool isOpen() const { return file != INVALID_HANDLE_VALUE; }
     DWORD openError() const { return error; }
 
+    /// Returns whether the system could not read something. The file is not at fault then.
+    bool hasFailed() const { return failed; }
+
     std::uint64_t size() const override { return fileSize; }
 
     std::size_t read(std::uint64_t offset, void* data, std::size_t length) override {
@@ -43,13 +46,17 @@ class FileSource final : public ByteSource {
         position.Offset = static_cast<DWORD>(offset);
         position.OffsetHigh = static_cast<DWORD>(offset >> 32);
         DWORD done = 0;
-        return ::ReadFile(file, data, static_cast<DWORD>(length), &done, &position) ? done : 0;
+        if (::ReadFile(file, data, static_cast<DWORD>(length), &done, &position))
+            return done;
+        failed = failed || ::GetLastError() != ERROR_HANDLE_EOF;
+        return 0;
     }
 
   private:
     HANDLE file;
     DWORD error;
     std::uint64_t fileSize = 0;
+    bool failed = false;
 };
 
 } // namespace
@@ -75,7 +82,9 @@ ExportState readExport(const NativePath& path, const char* symbol) {
     FileSource file(path);
     if (!file.isOpen())
         return isShortage(file.openError()) ? ExportState::unknown : ExportState::absent;
-    return peExportsFunction(file, symbol) ? ExportState::exported : ExportState::absent;
+    if (peExportsFunction(file, symbol))
+        return ExportState::exported;
+    return file.hasFailed() ? ExportState::unknown : ExportState::absent;
 }
 
 } // namespace Mz::platform

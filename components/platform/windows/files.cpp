@@ -84,7 +84,9 @@ std::error_code moveOver(const std::filesystem::path& from, const std::filesyste
     }
 }
 
-std::optional<std::filesystem::path> symlinkTarget(const std::filesystem::path& path) {
+std::optional<std::filesystem::path> symlinkTarget(const std::filesystem::path& path,
+                                                   std::error_code& failure) {
+    failure.clear();
     // The header of REPARSE_DATA_BUFFER for a symlink. Only the headers for drivers define it.
     struct Header {
         std::uint32_t tag;

@@ -175,8 +175,10 @@ bool isSameFile(const NativePath& a, const NativePath& b) {
     return a == b;
 }
 
-std::vector<std::vector<DirectoryEntry>>
-listCandidates(const std::vector<NativePath>& directories) {
+std::vector<std::vector<DirectoryEntry>> listCandidates(const std::vector<NativePath>& directories,
+                                                        std::vector<bool>* unlisted) {
+    if (unlisted)
+        unlisted->assign(directories.size(), false);
     std::vector<std::vector<DirectoryEntry>> entries;
     entries.reserve(directories.size());
     for (const NativePath& directory : directories)

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: BSL-1.0
 // Tests exceptions without memory. On POSIX, the program's operator new also serves the libraries.
 #include "components/componentManager/exceptions.h"
-#include "tests/unit/allocationFailure.h"
+#include "tests/support/failingAllocations.h"
 
 #include <gtest/gtest.h>
 

@@ -1,36 +1,15 @@
 // SPDX-License-Identifier: BSL-1.0
 // Tests the replacement of files with what only POSIX has: a full medium, symlinks and permissions.
 #include "components/componentManager/exceptions.h"
+#include "tests/support/fullMedium.h"
 #include "tests/unit/replaceFileFixture.h"
 
-#include <csignal>
-#include <sys/resource.h>
 #include <sys/stat.h>
 
 using namespace Mz;
 using namespace Mz::Test;
 
 namespace {
-
-/// While it lives, files of this process cannot grow beyond `size` bytes, as on a full medium.
-class FullMedium {
-  public:
-    explicit FullMedium(rlim_t size) {
-        std::signal(SIGXFSZ, SIG_IGN); // A write fails instead of ending the process.
-        limitFiles(size);
-    }
-    ~FullMedium() { limitFiles(RLIM_INFINITY); }
-    FullMedium(const FullMedium&) = delete;
-    FullMedium& operator=(const FullMedium&) = delete;
-
-  private:
-    static void limitFiles(rlim_t size) {
-        rlimit limit{};
-        ::getrlimit(RLIMIT_FSIZE, &limit);
-        limit.rlim_cur = size;
-        ::setrlimit(RLIMIT_FSIZE, &limit);
-    }
-};
 
 TEST_F(ReplaceFile, KeepsTheOldOneWhenTheMediumIsFull) {
     put(file, "old");

@@ -283,11 +283,21 @@ class Watch {
             const ssize_t got = ::read(output, block, sizeof block);
             if (got > 0)
                 receive(block, static_cast<std::size_t>(got));
-            else if (got == 0 || (errno != EINTR && errno != EAGAIN))
+            else if (got == 0)
                 closed = true;
             else if (errno == EAGAIN)
                 return;
+            else if (errno != EINTR)
+                giveUp(errno);
         }
+    }
+
+    /// Ends the child, whose output cannot be read: it is not at fault.
+    void giveUp(int error) {
+        closed = true;
+        judgement.detail = displayName(std::strerror(error));
+        if (!judged)
+            stop(ChildResult::End::notStarted);
     }
 
     void receive(const char* bytes, std::size_t size) {
@@ -393,8 +403,13 @@ ChildResult runChild(const NativePath& program, const std::vector<NativePath>& a
             Descriptor(supply.input ? raised(childInput.get()) : -1),
             Descriptor(raised(childOutput.get())),
             Descriptor(supply.file ? raised(static_cast<int>(supply.file->number())) : -1)};
-        failure = start(program, arguments, {high[0].get(), high[1].get(), high[2].get()},
-                        environment.get(), child);
+        // Without its pipe, the child would write to the standard output of this process.
+        if ((supply.input && high[0].get() < 0) || high[1].get() < 0 ||
+            (supply.file && high[2].get() < 0))
+            failure = errno;
+        else
+            failure = start(program, arguments, {high[0].get(), high[1].get(), high[2].get()},
+                            environment.get(), child);
     }
     childOutput.close();
     childInput.close();

@@ -1,18 +1,25 @@
 // SPDX-License-Identifier: BSL-1.0
 // Replaces the program's operator new by one that throws once a thread has used up its allocations.
-#include "tests/unit/allocationFailure.h"
+// The operators are in a file of their own, so that a compiler cannot inline one of a pair without
+// the other.
+#include "tests/support/failingAllocations.h"
 
 #include <cstdlib>
-#include <new>
 
 namespace {
 
 constexpr int unlimited = -1;
 constinit thread_local int allowedAllocations = unlimited;
+constinit thread_local bool onlyOneFails = false;
+constinit thread_local bool anyFailed = false;
 
 void* allocate(std::size_t size) {
-    if (allowedAllocations == 0)
+    if (allowedAllocations == 0) {
+        anyFailed = true;
+        if (onlyOneFails)
+            allowedAllocations = unlimited;
         throw std::bad_alloc();
+    }
     if (allowedAllocations > 0)
         --allowedAllocations;
     if (void* memory = std::malloc(size ? size : 1))
@@ -43,12 +50,18 @@ void operator delete[](void* memory, std::size_t) noexcept {
 
 namespace Mz::Test {
 
-FailingAllocations::FailingAllocations(int allowed) {
+FailingAllocations::FailingAllocations(int allowed, Which which) {
+    anyFailed = false;
+    onlyOneFails = which == Which::one;
     allowedAllocations = allowed;
 }
 
 FailingAllocations::~FailingAllocations() {
     allowedAllocations = unlimited;
+}
+
+bool FailingAllocations::failed() const {
+    return anyFailed;
 }
 
 } // namespace Mz::Test
