@@ -68,7 +68,10 @@ struct FileStatus {
 
 /// Returns the status of the file, from one query that follows symlinks; `std::nullopt` if the
 /// query fails.
-std::optional<FileStatus> queryFile(const NativePath& path);
+/// \param unknown  receives whether the query failed because the system lacked resources or could
+/// not
+///     read the medium now; may be null. Always false on Windows
+std::optional<FileStatus> queryFile(const NativePath& path, bool* unknown = nullptr);
 
 /// Returns whether two paths refer to the same file. Neither may be the path of a directory.
 bool isSameFile(const NativePath& a, const NativePath& b);

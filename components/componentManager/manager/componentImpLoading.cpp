@@ -83,10 +83,12 @@ class AddBuilders final : public QrEnumerator<QrCPtr<QrBuilderDescription>> {
 bool ComponentManager::ensureLoaded(ComponentLibrary& library, bool forUse) {
     if (library.module)
         return !library.builders.empty();
-    const std::optional<platform::FileStatus> status = platform::queryFile(library.openingPath());
+    bool unknown = false;
+    const std::optional<platform::FileStatus> status =
+        platform::queryFile(library.openingPath(), &unknown);
     if (!status) {
-        if (!library.builders.empty())
-            library.noteFile({}); // The file may be accessible again at the next start.
+        if (unknown && !library.builders.empty())
+            library.noteFile({}); // A later start must not take the file for one without builders.
         dropBuilders(library);
         return false;
     }

@@ -188,9 +188,12 @@ std::optional<std::wstring> firstArgument() {
     return toCharacters(argument);
 }
 
-std::optional<FileStatus> queryFile(const NativePath& path) {
+std::optional<FileStatus> queryFile(const NativePath& path, bool* unknown) {
     struct stat status;
-    if (::stat(path.c_str(), &status) != 0)
+    const bool failed = ::stat(path.c_str(), &status) != 0;
+    if (unknown)
+        *unknown = failed && isTemporary(errno);
+    if (failed)
         return std::nullopt;
     return FileStatus{static_cast<std::uint32_t>(status.st_mtime), status.st_size,
                       S_ISREG(status.st_mode)};

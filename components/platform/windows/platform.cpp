@@ -163,7 +163,9 @@ std::optional<std::wstring> firstArgument() {
     return argument;
 }
 
-std::optional<FileStatus> queryFile(const NativePath& path) {
+std::optional<FileStatus> queryFile(const NativePath& path, bool* unknown) {
+    if (unknown)
+        *unknown = false;
     struct _stat64 status;
     if (::_wstat64(path.c_str(), &status) != 0)
         return std::nullopt;
