@@ -32,7 +32,7 @@ TEST_F(ManagerWithoutMemory, IsInitialisedByTheNextCall) {
         EXPECT_TRUE(manager->createObject(recordedBeta));
         EXPECT_TRUE(manager->createObject(recordedGamma));
     });
-    EXPECT_GE(failures, 40);
+    EXPECT_GE(failures, leastFailures(40));
 }
 
 TEST_F(ManagerWithoutMemory, LosesNothingOfTheRecordedList) {
@@ -47,7 +47,7 @@ TEST_F(ManagerWithoutMemory, LosesNothingOfTheRecordedList) {
         EXPECT_FALSE(isLoaded(L"recorded"));
         EXPECT_EQ(list(), recorded);
     });
-    EXPECT_GE(failures, 40);
+    EXPECT_GE(failures, leastFailures(40));
 }
 
 TEST_F(ManagerWithoutMemory, ReadsTheListUpToTheFailure) {
@@ -62,7 +62,7 @@ TEST_F(ManagerWithoutMemory, ReadsTheListUpToTheFailure) {
         EXPECT_EQ(names(), all);
         EXPECT_EQ(list(), recorded);
     });
-    EXPECT_GE(failures, 20);
+    EXPECT_GE(failures, leastFailures(20));
 }
 
 /// A medium that allocates nothing.
@@ -107,7 +107,7 @@ TEST_F(ManagerWithoutMemory, CreatesTheObjectInTheNextCall) {
         EXPECT_TRUE(manager->createObject(recordedGamma));
         EXPECT_EQ(list(), recorded);
     });
-    EXPECT_GE(failures, 2);
+    EXPECT_GE(failures, leastFailures(2));
 }
 
 TEST_F(ManagerWithoutMemory, RecordsAChangedLibraryWhollyOrNotAtAll) {
@@ -129,7 +129,7 @@ TEST_F(ManagerWithoutMemory, RecordsAChangedLibraryWhollyOrNotAtAll) {
         restartWithList();
         EXPECT_EQ(names(), all);
     });
-    EXPECT_GE(failures, 20);
+    EXPECT_GE(failures, leastFailures(20));
 }
 
 } // namespace

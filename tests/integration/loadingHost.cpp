@@ -86,7 +86,8 @@ void measureGrowth() {
     for (int warmUp = 0; warmUp < 50; ++warmUp)
         cycle();
     constexpr std::size_t cycles = 1000;
-    const std::size_t before = allocatedBytes(), handles = openHandles();
+    const std::size_t handles = openHandles();
+    const std::size_t before = allocatedBytes();
     for (std::size_t count = 0; count < cycles; ++count)
         cycle();
     // Allow less than one byte per cycle: the memory of the loader and the heap varies a little.

@@ -4,6 +4,8 @@
 // the other.
 #include "tests/support/failingAllocations.h"
 
+#include "tests/support/journal.h"
+
 #include <cstdlib>
 
 namespace {
@@ -62,6 +64,16 @@ FailingAllocations::~FailingAllocations() {
 
 bool FailingAllocations::failed() const {
     return anyFailed;
+}
+
+int leastFailures(int count) {
+    // Whether an allocation in a library fails: that of the journal for a long text.
+    const FailingAllocations failing(0);
+    try {
+        setSearchPathUnderTest(L"a text that is too long for the buffer in a string");
+    } catch (const std::bad_alloc&) { // NOLINT(bugprone-empty-catch)
+    }
+    return failing.failed() ? count : 0;
 }
 
 } // namespace Mz::Test

@@ -1,8 +1,9 @@
 // SPDX-License-Identifier: BSL-1.0
 /// Makes allocations fail on request.
 ///
-/// On Linux the program's operator new also serves the libraries. On Windows each DLL has its own,
-/// so only the allocations of the program fail, which include those of header-only code.
+/// On Linux the program's operator new also serves the libraries. On Windows a DLL imports that of
+/// the C++ library by the name of its file, so only the allocations of the program fail, which
+/// include those of header-only code.
 #pragma once
 
 #include <gtest/gtest.h>
@@ -80,5 +81,9 @@ int failEachAllocation(Test&& test) {
         }
     return failures;
 }
+
+/// Returns the least number of failures to expect of an operation that allocates `count` times,
+/// most of them in the libraries.
+int leastFailures(int count);
 
 } // namespace Mz::Test

@@ -32,6 +32,9 @@ TEST_P(ManagerWithFailingCalls, HasAllBuildersInTheNextStart) {
         restart();
         attempt.run([&] { manager->initialize(path.c_str()); });
         EXPECT_THAT(all, IsSupersetOf(names())) << attempt.failed;
+        if (GetParam() == EINTR && attempt.failed == "pread") {
+            EXPECT_EQ(names(), all) << "an interrupted read goes on";
+        }
         restartWithList();
         EXPECT_EQ(names(), all) << attempt.failed;
         restart();
