@@ -217,8 +217,9 @@ TEST_P(ElfProbe, RefusesHeadersOfOtherKindsOfFile) {
     EXPECT_TRUE(exports(withHeader([](Elf64_Ehdr&) {})));
     EXPECT_TRUE(refuses([](Elf64_Ehdr& h) { h.e_ident[EI_MAG3] = 'G'; }));
     EXPECT_TRUE(refuses([](Elf64_Ehdr& h) { h.e_ident[EI_CLASS] = ELFCLASS32; }));
-    EXPECT_TRUE(refuses([](Elf64_Ehdr& h) { h.e_ident[EI_DATA] = ELFDATA2MSB; }));
-    EXPECT_TRUE(refuses([](Elf64_Ehdr& h) { h.e_machine = EM_AARCH64; }));
+    EXPECT_TRUE(refuses([](Elf64_Ehdr& h) { h.e_ident[EI_DATA] = 3 - h.e_ident[EI_DATA]; }));
+    EXPECT_TRUE(refuses(
+        [](Elf64_Ehdr& h) { h.e_machine = h.e_machine == EM_X86_64 ? EM_AARCH64 : EM_X86_64; }));
     EXPECT_TRUE(refuses([](Elf64_Ehdr& h) { h.e_machine = EM_386; }));
     EXPECT_TRUE(refuses([](Elf64_Ehdr& h) { h.e_type = ET_EXEC; }));
     EXPECT_TRUE(refuses([](Elf64_Ehdr& h) { h.e_type = ET_REL; }));
