@@ -162,6 +162,17 @@ TEST(FormattedWrite, StoresItsCountInTheWidthThatIsSaid) {
     EXPECT_THAT(bytes, testing::ElementsAre(0x55, 3, 0x55));
     EXPECT_THAT(half, testing::ElementsAre(0x5555, 5, 0x5555));
     EXPECT_EQ(whole, 6);
+    long words[] = {0x55, -1, 0x55};
+    EXPECT_EQ(formatted(L"ab%ln", &words[1]), "ab");
+    EXPECT_THAT(words, testing::ElementsAre(0x55, 2, 0x55));
+}
+
+TEST(FormattedWrite, WritesAnAddressInSixteenCapitalDigits) {
+    const auto address = reinterpret_cast<void*>(std::uintptr_t{0x12AB});
+    EXPECT_EQ(formatted(L"%p", address), "00000000000012AB");
+    EXPECT_EQ(formatted(L"%#20p|", address), "    00000000000012AB|") << "without a prefix";
+    EXPECT_EQ(formatted(L"%-18.3p|", address), "00000000000012AB  |") << "whatever the precision";
+    EXPECT_EQ(formatted(L"%p", static_cast<void*>(nullptr)), "0000000000000000");
 }
 
 } // namespace
