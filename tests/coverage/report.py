@@ -108,7 +108,8 @@ def listed(file: pathlib.Path) -> tuple[collections.Counter, list[str]]:
     for entry in file.read_text().splitlines():
         if not entry or entry.startswith("#"):
             continue
-        name, kind, count, text, reason = entry.split(" | ")
+        name, kind, count, rest = entry.split(" | ", 3)
+        text, _, reason = rest.rpartition(" | ")
         entries[name, kind, text] += int(count)
         if not reason.strip() or reason == "?":
             faults.append(f"no reason: {name}: {text}")
