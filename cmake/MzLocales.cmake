@@ -7,6 +7,12 @@ include_guard(GLOBAL)
 # folder. If the tools are missing (Debian: locales), the folder does not exist.
 find_program(MZ_LOCALEDEF localedef)
 
+# The numbers in the files of a locale have the order of the processor.
+set(mzLocaleOrder --little-endian)
+if(CMAKE_CXX_BYTE_ORDER STREQUAL "BIG_ENDIAN")
+  set(mzLocaleOrder --big-endian)
+endif()
+
 function(mz_make_locale name charmap)
   if(NOT MZ_LOCALEDEF OR NOT EXISTS /usr/share/i18n/charmaps/${charmap}.gz)
     return()
@@ -14,7 +20,7 @@ function(mz_make_locale name charmap)
   set(output ${PROJECT_BINARY_DIR}/locales/${name}.${charmap})
   add_custom_command(OUTPUT ${output}/LC_NUMERIC
     COMMAND ${CMAKE_COMMAND} -E make_directory ${PROJECT_BINARY_DIR}/locales
-    COMMAND ${MZ_LOCALEDEF} --no-warnings=ascii -i ${name} -f ${charmap} --no-archive ${output}
+    COMMAND ${MZ_LOCALEDEF} --no-warnings=ascii ${mzLocaleOrder} -i ${name} -f ${charmap} --no-archive ${output}
     COMMENT "Making the locale ${name}.${charmap}")
   set_property(GLOBAL APPEND PROPERTY mzLocales ${output}/LC_NUMERIC)
 endfunction()

@@ -57,7 +57,7 @@ inline constexpr std::uint16_t valueIsPolymorphic = 2;       ///< it has virtual
 inline constexpr std::uint16_t baseHasVirtualDestructor = 1; ///< of a base
 
 /// The begin of an entry. The pointer to a virtual function of the Itanium C++ ABI is the offset of
-/// its slot in bytes, plus 1, followed by 0.
+/// its slot in bytes, plus 1, followed by 0; on ARM processors the offset, followed by 1.
 struct InterfaceEntry {
     InterfaceEntryKind kind; ///< what it describes
     std::uint16_t flags;     ///< of a value or base: see `valueIsTrivial`; else 0
@@ -65,7 +65,7 @@ struct InterfaceEntry {
     std::uint32_t valueSize; ///< `sizeof` of a value or base; 0 if the type is incomplete
     std::uint32_t alignment; ///< `alignof` of a value or base; 0 if the type is incomplete
     std::int64_t function;   ///< of `end`, `base` and `operation`
-    std::int64_t adjustment; ///< 0
+    std::int64_t adjustment; ///< 0; on ARM processors 1, of those three
 };
 static_assert(sizeof(InterfaceEntry) == 32 && std::is_trivially_copyable_v<InterfaceEntry>);
 

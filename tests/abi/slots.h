@@ -10,7 +10,8 @@ namespace Mz::Test {
 
 /// Returns the vtable slot of a virtual function, -1 if it is not virtual. In the C++ ABI of both
 /// platforms, a pointer to a virtual member has two parts: the offset of its slot plus one, and an
-/// adjustment of `this`.
+/// adjustment of `this`. On ARM processors, whose functions may have odd addresses, the offset is
+/// as it is, and the adjustment is doubled, plus one.
 template <class Member>
 std::ptrdiff_t slotOf(Member member) {
     struct {
@@ -20,8 +21,13 @@ std::ptrdiff_t slotOf(Member member) {
     static_assert(sizeof member == sizeof parts);
     std::memcpy(&parts, &member, sizeof parts);
     constexpr std::ptrdiff_t notVirtual = -1;
+#if defined(__aarch64__) || defined(__arm__)
+    if (parts.adjustment != 1)
+        return notVirtual;
+#else
     if (parts.tableOffset % 2 == 0 || parts.adjustment != 0)
         return notVirtual;
+#endif
     return parts.tableOffset / static_cast<std::ptrdiff_t>(sizeof(void*));
 }
 

@@ -173,7 +173,9 @@ TEST_F(Discovery, PassesOverALibraryForAnotherProcessor) {
         elf ? 18
             : static_cast<std::size_t>(static_cast<unsigned char>(content[0x3C])) +
                   static_cast<std::size_t>(static_cast<unsigned char>(content[0x3D])) * 256 + 4;
-    content[position] = static_cast<char>(elf ? 0xB7 : 0x64); // 64-bit Arm
+    // 64-bit ARM; of a library for that, x86-64.
+    constexpr char arm = '\xB7', x86_64 = '\x3E';
+    content[position] = !elf ? '\x64' : content[position] == arm ? x86_64 : arm;
     content[position + 1] = static_cast<char>(elf ? 0x00 : 0xAA);
     const auto file = folder.write("foreign", content);
     add(L"goodWithKit", "zz");

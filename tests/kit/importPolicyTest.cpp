@@ -30,7 +30,7 @@ const std::filesystem::path components =
     std::filesystem::path(MZ_BUILD_PATH) / "components" / "kitImporters";
 
 /// Keeps what it is told, and finds files as the controller before it.
-class Log final : public Kit::Controller {
+class Log : public Kit::Controller {
   public:
     void show(Kind, const wchar_t* text) override { shown.emplace_back(text); }
     bool isInterrupted() override { return interrupted; }
@@ -455,7 +455,11 @@ TEST_F(KitImportPolicy, ReportsToTheControllerOfTheThread) {
 // ---- The controller of the host -----------------------------------------------------------------
 
 TEST(KitImportController, PassesEverythingOn) {
-    Log host;
+    class FullLog final : public Log {
+        void status(const wchar_t* text) override { shown.emplace_back(text); }
+        void log(int, const wchar_t* text) override { shown.emplace_back(text); }
+    };
+    FullLog host;
     const Kit::ImportPolicy policy;
     Kit::detail::ImportLimits limits({}, {});
     std::vector<Kit::CompanionReport> companions;
@@ -473,10 +477,12 @@ TEST(KitImportController, PassesEverythingOn) {
     host.interrupted = true;
     EXPECT_TRUE(controller.isInterrupted());
     EXPECT_FALSE(controller.progress(0.5F, L""));
+    controller.status(L"s");
+    controller.log(0, L"l");
     EXPECT_FALSE(controller.wasAborted());
     EXPECT_THROW(controller.abort(0, L"a"), Assertions::ExProgramAborted);
     EXPECT_TRUE(controller.wasAborted());
-    EXPECT_THAT(host.shown, ElementsAre(L"m", L"w", L"e", L"a"));
+    EXPECT_THAT(host.shown, ElementsAre(L"m", L"w", L"e", L"s", L"l", L"a"));
     EXPECT_EQ(controller.takeErrors(), L"e");
     EXPECT_EQ(controller.takeErrors(), L"");
 }

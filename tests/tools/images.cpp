@@ -2,6 +2,8 @@
 // Writes the headers and tables of minimal ELF and PE libraries field by field.
 #include "tests/tools/images.h"
 
+#include "components/platform/elfMachine.h"
+
 #include <cstdint>
 #include <cstring>
 #include <initializer_list>
@@ -51,7 +53,9 @@ std::string elfLibrary(const ImageTraits& traits) {
                           dynamic = 0x200, sections = 0x2C0, size = elfPlaces.fileEnd;
     Bytes bytes(size);
     bytes.put(0, std::string("\177ELF\2\1\1", 7));
-    bytes.row<Half>(16, {3, static_cast<Half>(traits.arm ? 183 : 62)});
+    const Half other = platform::nativeElfMachine == platform::elfX86_64 ? platform::elfAArch64
+                                                                         : platform::elfX86_64;
+    bytes.row<Half>(16, {3, traits.otherProcessor ? other : platform::nativeElfMachine});
     bytes.row<Long>(32, {segments, sections});
     bytes.row<Half>(52, {64, 56, 2, 64, 1, 0});
     // The first segment maps the whole file at its own offsets. The second one is the dynamic
@@ -99,7 +103,7 @@ std::string peLibrary(const ImageTraits& traits) {
     bytes.put(0, std::string("MZ"));
     bytes.put<Word>(0x3C, header);
     bytes.put(header, std::string("PE\0\0", 4));
-    bytes.row<Half>(header + 4, {static_cast<Half>(traits.arm ? 0xAA64 : 0x8664), 2});
+    bytes.row<Half>(header + 4, {static_cast<Half>(traits.otherProcessor ? 0xAA64 : 0x8664), 2});
     bytes.row<Half>(header + 20, {optionalSize, static_cast<Half>(traits.program ? 0x22 : 0x2022)});
     bytes.put<Half>(optional, 0x20B);
     bytes.row<Word>(optional + 32, {0x1000, 0x200});

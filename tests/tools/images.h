@@ -12,8 +12,8 @@ namespace Mz::Test {
 
 struct ImageTraits {
     const char* entryPoint = "QrGetComponentDescription";
-    bool function = true; ///< whether the entry point is a function
-    bool arm = false;
+    bool function = true;        ///< whether the entry point is a function
+    bool otherProcessor = false; ///< 64-bit ARM; of an ELF file on ARM, x86-64
     bool program = false;
     std::optional<ComponentStamp> stamp = std::nullopt; ///< exported if set
     std::uint64_t stampAddress = 0;                     ///< another address than the stamp's if set

@@ -242,7 +242,7 @@ TEST_F(InterfaceBytes, ThatAreDamagedAreReadWithoutHarm) {
     for (int round = 0; round < 20000; ++round) {
         std::string damaged = content;
         for (unsigned int count = random() % 4 + 1; count > 0; --count) {
-            static constexpr char values[] = {0, 1, 2, 7, 8, 16, 127, -128, -1};
+            static constexpr char values[] = {0, 1, 2, 7, 8, 16, 127, '\x80', '\xFF'};
             damaged[random() % damaged.size()] = values[random() % sizeof values];
         }
         std::size_t texts = 0;

@@ -3,6 +3,7 @@
 #include "tests/tools/images.h"
 
 #include "components/componentTools/images/libraryImage.h"
+#include "components/platform/elfMachine.h"
 #include "tests/support/temporaryDirectory.h"
 #include "tests/tools/toolsFixture.h"
 
@@ -51,7 +52,9 @@ TEST_P(Image, TellsThatTheEntryPointIsAbsentOrNoFunction) {
 }
 
 TEST_P(Image, NamesAnotherProcessor) {
-    EXPECT_EQ(read(whole({.arm = true})).otherProcessor, L"ARM, 64 bits");
+    const bool isArm = Mz::platform::nativeElfMachine == Mz::platform::elfAArch64;
+    EXPECT_EQ(read(whole({.otherProcessor = true})).otherProcessor,
+              isArm && GetParam() == ImageFormat::elf ? L"x86-64" : L"ARM, 64 bits");
 }
 
 TEST_P(Image, TellsAProgram) {

@@ -58,7 +58,9 @@ inline ProgramResult runCommandLine(const std::vector<std::string>& arguments,
 /// Returns the file with another processor in its header, in either format.
 inline std::string forOtherProcessor(std::string content) {
     if (content.starts_with("\177ELF")) {
-        content[18] = static_cast<char>(183);
+        // 64-bit ARM; a library for that becomes one for x86-64.
+        constexpr char arm = '\xB7', x86_64 = '\x3E';
+        content[18] = content[18] == arm ? x86_64 : arm;
     } else {
         std::uint32_t header = 0;
         std::memcpy(&header, content.data() + 0x3C, sizeof header);

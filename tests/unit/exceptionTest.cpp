@@ -203,6 +203,17 @@ TEST(ExBase, StartsWithoutAReason) {
     EXPECT_STREQ(bare.getDetailedReason(), "components/x/y(7)");
 }
 
+TEST(ExBase, AssignsReasonAndPlaceInEachFamily) {
+    QrStreamEx::ExReadError read("f", 1);
+    const QrStreamEx::ExReadError otherRead("components/x/y", 7, "damaged");
+    static_cast<QrStreamEx&>(read) = otherRead;
+    EXPECT_STREQ(read.getDetailedReason(), otherRead.getDetailedReason());
+    QrComponentManagerEx::ExBadCast cast("f", 1);
+    const QrComponentManagerEx::ExBadCast otherCast("components/x/y", 8);
+    static_cast<QrComponentManagerEx&>(cast) = otherCast;
+    EXPECT_STREQ(cast.getDetailedReason(), otherCast.getDetailedReason());
+}
+
 TEST(ExBase, CopiesTheTextsItIsGiven) {
     std::string source = "components/x/y";
     std::string text = "first";

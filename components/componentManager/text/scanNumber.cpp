@@ -69,7 +69,12 @@ bool isDigit(char c) {
     return c >= '0' && c <= '9';
 }
 
-static_assert(std::endian::native == std::endian::little);
+/// Returns the eight bytes at `at` as a number with the first one in its lowest byte.
+std::uint64_t eightBytes(const char* at) {
+    std::uint64_t bytes;
+    std::memcpy(&bytes, at, sizeof bytes);
+    return std::endian::native == std::endian::little ? bytes : __builtin_bswap64(bytes);
+}
 
 /// Returns the number that eight digits form, each a byte with the value of the digit, the first
 /// one in the lowest byte. Combines neighbours: digits to pairs, pairs to fours, fours to eight.
@@ -97,9 +102,8 @@ const char* takeDigits(const char* at, const char* end, std::uint64_t& value) {
                                         100'000, 1'000'000, 10'000'000, 100'000'000};
     constexpr int width = 8;
     while (end - at >= width) {
-        std::uint64_t digits;
-        std::memcpy(&digits, at, width);
-        digits ^= 0x3030303030303030; // A digit has its value now, any other byte a larger one.
+        // A digit has its value in it, any other byte a larger one.
+        const std::uint64_t digits = eightBytes(at) ^ 0x3030303030303030;
         const std::uint64_t others = ((digits + 0x7676767676767676) | digits) & 0x8080808080808080;
         const int count = std::countr_zero(others) / width;
         if (count == 0)

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: BSL-1.0
 /// The binary half of `QrStream`: each type has a wire type of fixed width, whose bytes are
-/// reversed in blocks on writing and in place after reading. Where no caller can tell the
+/// reversed in blocks on writing and in place after reading, unless the host is big-endian as the
+/// format is. Where no caller can tell the
 /// difference, values are reversed from and to the areas of the standard buffer, and blocks are
 /// larger. `bool` has its own reader, because a byte other than 0 and 1 is not a valid `bool` in
 /// memory.
@@ -54,20 +55,22 @@ struct Bits<8> {
     using Type = std::uint64_t;
 };
 
-std::uint8_t reversed(std::uint8_t bits) {
+constexpr bool littleEndian = std::endian::native == std::endian::little;
+static_assert(littleEndian || std::endian::native == std::endian::big);
+
+/// Returns the bits in the order of the format; in that of the host, given those of the format.
+std::uint8_t reordered(std::uint8_t bits) {
     return bits;
 }
-std::uint16_t reversed(std::uint16_t bits) {
-    return __builtin_bswap16(bits);
+std::uint16_t reordered(std::uint16_t bits) {
+    return littleEndian ? __builtin_bswap16(bits) : bits;
 }
-std::uint32_t reversed(std::uint32_t bits) {
-    return __builtin_bswap32(bits);
+std::uint32_t reordered(std::uint32_t bits) {
+    return littleEndian ? __builtin_bswap32(bits) : bits;
 }
-std::uint64_t reversed(std::uint64_t bits) {
-    return __builtin_bswap64(bits);
+std::uint64_t reordered(std::uint64_t bits) {
+    return littleEndian ? __builtin_bswap64(bits) : bits;
 }
-
-static_assert(std::endian::native == std::endian::little);
 
 /// The type whose width and bits a `T` has in binary data. It is `T` itself, except for `bool` and
 /// the types whose width depends on the platform.
@@ -112,7 +115,7 @@ bool fits(T value) {
 
 template <class T>
 WireBits<T> packed(T value) {
-    return reversed(std::bit_cast<WireBits<T>>(static_cast<WireType<T>>(value)));
+    return reordered(std::bit_cast<WireBits<T>>(static_cast<WireType<T>>(value)));
 }
 
 /// Writes the bytes of one value by the call of the IO, or by the same call of its buffer.
@@ -139,23 +142,24 @@ template <class T>
     }
 }
 
-/// Reverses the bytes of each of `count` values of `Width` bytes. `to` may be `from`.
+/// Converts `count` values of `Width` bytes between the order of the host and that of the format.
+/// `to` may be `from`.
 template <std::size_t Width>
-[[gnu::noinline]] void reverseAll(char* to, const char* from, std::size_t count) {
+[[gnu::noinline]] void reorderAll(char* to, const char* from, std::size_t count) {
     using Bits = typename Bits<Width>::Type;
     std::size_t at = 0;
     const std::size_t end = count * Width;
-    if constexpr (Width == 4) // Two at a time, in one word.
+    if constexpr (Width == 4 && littleEndian) // Two at a time, in one word.
         for (; at + 2 * Width <= end; at += 2 * Width) {
             std::uint64_t two;
             std::memcpy(&two, from + at, sizeof two);
-            two = std::rotl(reversed(two), 32);
+            two = std::rotl(reordered(two), 32);
             std::memcpy(to + at, &two, sizeof two);
         }
     for (; at != end; at += Width) {
         Bits bits;
         std::memcpy(&bits, from + at, sizeof bits);
-        bits = reversed(bits);
+        bits = reordered(bits);
         std::memcpy(to + at, &bits, sizeof bits);
     }
 }
@@ -166,7 +170,7 @@ template <class T>
 int pack(const T* values, int count, char* to) {
     constexpr std::size_t width = sizeof(WireType<T>);
     if constexpr (alwaysFits<T> && !std::is_same_v<T, bool>) {
-        reverseAll<width>(to, reinterpret_cast<const char*>(values),
+        reorderAll<width>(to, reinterpret_cast<const char*>(values),
                           static_cast<std::size_t>(count));
         return count;
     } else {
@@ -278,7 +282,7 @@ template <class T>
 T unpacked(const char* packed) {
     WireBits<T> bits;
     std::memcpy(&bits, packed, sizeof bits);
-    return static_cast<T>(std::bit_cast<WireType<T>>(reversed(bits)));
+    return static_cast<T>(std::bit_cast<WireType<T>>(reordered(bits)));
 }
 
 /// Converts `count` packed values at the front of the array into values of the host, in place.
@@ -288,7 +292,7 @@ void unpack(T* values, int count) {
     auto* const bytes = reinterpret_cast<char*>(values);
     const auto size = static_cast<std::size_t>(count);
     if constexpr (alwaysFits<T>)
-        reverseAll<width>(bytes, bytes, size);
+        reorderAll<width>(bytes, bytes, size);
     else // From the last to the first, so that none overwrites a packed one.
         for (std::size_t index = size; index-- > 0;)
             values[index] = unpacked<T>(bytes + index * width);
@@ -301,7 +305,7 @@ int readInPlace(const ByteSource& source, T* values, int count) {
     const std::string_view held = source.held();
     const int got = static_cast<int>(std::min<std::ptrdiff_t>(
         {static_cast<std::ptrdiff_t>(held.size()) / width, count, largestStep}));
-    reverseAll<width>(reinterpret_cast<char*>(values), held.data(), static_cast<std::size_t>(got));
+    reorderAll<width>(reinterpret_cast<char*>(values), held.data(), static_cast<std::size_t>(got));
     source.take(got * width);
     return got;
 }

@@ -3,6 +3,7 @@
 /// sections, which may be stripped. The entry point is looked up through the hash tables, so the
 /// time does not depend on the number of symbols.
 #include "components/componentTools/images/libraryImage.h"
+#include "components/platform/elfMachine.h"
 
 #include <algorithm>
 #include <string_view>
@@ -49,7 +50,6 @@ struct Symbol {
 };
 
 constexpr std::uint16_t executable = 2, shared = 3;
-constexpr std::uint16_t x86_64 = 62;
 constexpr std::uint32_t programContent = 1; // the type of a section
 constexpr std::uint32_t loadSegment = 1, dynamicSegment = 2;
 
@@ -66,9 +66,9 @@ std::wstring processorName(std::uint16_t machine, bool narrow) {
     switch (machine) {
     case 3: return L"x86, 32 bits";
     case 40: return L"ARM, 32 bits";
-    case 183: return L"ARM, 64 bits";
+    case platform::elfAArch64: return L"ARM, 64 bits";
     case 243: return L"RISC-V";
-    case x86_64: return narrow ? L"x86-64 with 32-bit addresses" : L"x86-64";
+    case platform::elfX86_64: return narrow ? L"x86-64 with 32-bit addresses" : L"x86-64";
     default: return L"number " + std::to_wstring(machine);
     }
 }
@@ -170,15 +170,16 @@ class ElfReader {
         const auto machine = file.read<std::uint16_t>(18);
         if (!identity || !type || !machine)
             return damaged(L"the header is cut off");
-        const bool littleEndian = identity->byteOrder == 1;
+        const bool sameOrder = identity->byteOrder == platform::nativeElfOrder;
         const auto ordered = [&](std::uint16_t value) {
-            return littleEndian ? value : static_cast<std::uint16_t>(value << 8 | value >> 8);
+            return sameOrder ? value : static_cast<std::uint16_t>(value << 8 | value >> 8);
         };
         if (ordered(*type) == shared)
             image.kind = LibraryImage::Kind::library;
         else if (ordered(*type) == executable)
             image.kind = LibraryImage::Kind::program;
-        if (ordered(*machine) != x86_64 || identity->wordSize != 2 || !littleEndian) {
+        if (ordered(*machine) != platform::nativeElfMachine || identity->wordSize != 2 ||
+            !sameOrder) {
             image.otherProcessor = processorName(ordered(*machine), identity->wordSize != 2);
             return true;
         }

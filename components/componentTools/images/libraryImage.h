@@ -81,7 +81,7 @@ struct LibraryImage {
     bool readable = false; ///< false if it cannot be opened, or not be read completely
     ImageFormat format = ImageFormat::none;
     Kind kind = Kind::other;
-    std::wstring otherProcessor; ///< the name of its processor; empty for x86-64
+    std::wstring otherProcessor; ///< the name of its processor; empty if this is built for it
     std::wstring damage;         ///< the first fault in the file; empty if none was found
     EntryPoint entryPoint = EntryPoint::absent;
     std::string ownName;             ///< the SONAME (ELF); empty if there is none

@@ -36,10 +36,13 @@ std::string textOf(std::string_view bytes) {
     return text;
 }
 
-/// Returns the slot that a pointer to a virtual function names.
+/// Returns the slot that a pointer to a virtual function names. Accepts the layouts of all
+/// processors: no entry is valid in both.
 std::optional<std::int64_t> slotOf(const InterfaceEntry& entry) {
     constexpr std::int64_t slotSize = 8;
-    if (entry.function < 1 || entry.function % slotSize != 1 || entry.adjustment != 0)
+    const bool markedInFunction = entry.function % slotSize == 1 && entry.adjustment == 0;
+    const bool markedInAdjustment = entry.function % slotSize == 0 && entry.adjustment == 1;
+    if (entry.function < 0 || !(markedInFunction || markedInAdjustment))
         return std::nullopt;
     return entry.function / slotSize;
 }

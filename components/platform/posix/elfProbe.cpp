@@ -6,6 +6,7 @@
 /// are checked against the file, because the loader crashes on some damaged files.
 #include "components/platform/posix/elfProbe.h"
 
+#include "components/platform/elfMachine.h"
 #include "components/platform/fileBlocks.h"
 
 #include <algorithm>
@@ -17,6 +18,7 @@
 #include <optional>
 #include <string_view>
 #include <sys/stat.h>
+#include <type_traits>
 #include <unistd.h>
 #include <vector>
 
@@ -95,8 +97,8 @@ class ElfLibrary {
     bool readHeaders() {
         const auto header = file.read<Elf64_Ehdr>(0);
         if (!header || std::memcmp(header->e_ident, ELFMAG, SELFMAG) != 0 ||
-            header->e_ident[EI_CLASS] != ELFCLASS64 || header->e_ident[EI_DATA] != ELFDATA2LSB ||
-            header->e_type != ET_DYN || header->e_machine != EM_X86_64 ||
+            header->e_ident[EI_CLASS] != ELFCLASS64 || header->e_ident[EI_DATA] != nativeElfOrder ||
+            header->e_type != ET_DYN || header->e_machine != nativeElfMachine ||
             header->e_phentsize != sizeof(Elf64_Phdr) || header->e_phnum > maximumSegments)
             return false;
         // The section headers are usually at the end of the file, so a truncated file lacks them.
@@ -217,8 +219,9 @@ class ElfLibrary {
     }
 
     bool foundByHash(std::string_view name) {
+        using Entry = std::conditional_t<hasWideElfHash, std::uint64_t, std::uint32_t>;
         struct Header {
-            std::uint32_t bucketCount, chainCount;
+            Entry bucketCount, chainCount;
         };
         const auto header = readAt<Header>(tables.hash);
         if (!header || !header->bucketCount)
@@ -229,12 +232,12 @@ class ElfLibrary {
             hash = (hash ^ (hash >> 28 << 28) >> 24) & 0x0FFFFFFF;
         }
         const std::uint64_t buckets = tables.hash + sizeof(Header);
-        const std::uint64_t chains = buckets + header->bucketCount * 4ull;
-        auto index = readAt<std::uint32_t>(buckets + hash % header->bucketCount * 4ull);
+        const std::uint64_t chains = buckets + header->bucketCount * sizeof(Entry);
+        auto index = readAt<Entry>(buckets + hash % header->bucketCount * sizeof(Entry));
         for (std::size_t step = 0; index && *index && step < maximumChainLength; ++step) {
             if (isExportedFunction(*index, name))
                 return true;
-            index = readAt<std::uint32_t>(chains + *index * 4ull);
+            index = readAt<Entry>(chains + *index * sizeof(Entry));
         }
         return false;
     }

@@ -7,6 +7,7 @@
 #include "components/componentManager/nativeText.h"
 #include "components/componentTools/platform/posix/inheritedNumber.h"
 #include "components/componentTools/platform/posix/loaderCache.h"
+#include "components/platform/elfMachine.h"
 #include "components/platform/platform.h"
 
 #include <algorithm>
@@ -54,10 +55,10 @@ std::string expanded(std::string folder, const NativePath& library) {
     const std::pair<const char*, std::string> variables[] = {
         {"$ORIGIN", library.parent_path().string()},
         {"${ORIGIN}", library.parent_path().string()},
-        {"$LIB", "lib/x86_64-linux-gnu"},
-        {"${LIB}", "lib/x86_64-linux-gnu"},
-        {"$PLATFORM", "x86_64"},
-        {"${PLATFORM}", "x86_64"}};
+        {"$LIB", std::string("lib/") + platform::multiarchFolder},
+        {"${LIB}", std::string("lib/") + platform::multiarchFolder},
+        {"$PLATFORM", platform::loaderPlatform},
+        {"${PLATFORM}", platform::loaderPlatform}};
     for (const auto& [variable, value] : variables)
         for (std::size_t at = 0; (at = folder.find(variable, at)) != std::string::npos;
              at += value.size())
@@ -175,8 +176,10 @@ Located findDependency(const std::string& wanted, const Needer& needer, const Na
     }
     if (const std::optional<std::string> file = findInLoaderCache(name); file && isFile(*file))
         return {true, *file};
-    for (const char* folder : {"/lib/x86_64-linux-gnu", "/usr/lib/x86_64-linux-gnu", "/lib64",
-                               "/usr/lib64", "/lib", "/usr/lib"})
+    const std::string multiarch = platform::multiarchFolder;
+    for (const std::string& folder :
+         {"/lib/" + multiarch, "/usr/lib/" + multiarch, std::string("/lib64"),
+          std::string("/usr/lib64"), std::string("/lib"), std::string("/usr/lib")})
         if (isFile(NativePath(folder) / name))
             return {true, NativePath(folder) / name};
     // The loader also uses a library of that name that this process has already loaded.
