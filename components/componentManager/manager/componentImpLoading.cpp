@@ -87,8 +87,10 @@ bool ComponentManager::ensureLoaded(ComponentLibrary& library, bool forUse) {
     const std::optional<platform::FileStatus> status =
         platform::queryFile(library.openingPath(), &unknown);
     if (!status) {
-        if (unknown && !library.builders.empty())
-            library.noteFile({}); // A later start must not take the file for one without builders.
+        // A later start must not take the file for one without builders. Its name on this system is
+        // not known if its folder could not be listed.
+        if ((unknown || library.foundPath.empty()) && !library.builders.empty())
+            library.noteFile({});
         dropBuilders(library);
         return false;
     }

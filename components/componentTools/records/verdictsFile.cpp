@@ -120,6 +120,9 @@ std::optional<DisabledComponents> readDisabled(const std::filesystem::path& file
         *unreadable = false;
     if (!isRead && isMissing(file))
         return std::optional<DisabledComponents>(std::in_place);
+    std::error_code unknown;
+    if (!isRead && std::filesystem::is_directory(file, unknown))
+        return std::nullopt; // No choices can be in it.
     try {
         if (isRead)
             return disabledIn(OrderedJson::parse(input));
@@ -139,10 +142,12 @@ std::string readJudgement(const std::filesystem::path& file) {
         return {};
     try {
         const OrderedJson all = OrderedJson::parse(input);
-        return all.at("version").get<int>() == version ? all.value("judgement", "") : "";
-    } catch (const nlohmann::json::exception&) {
-        return {}; // The next scan only compares more.
+        if (all.at("version").get<int>() == version)
+            return all.value("judgement", "");
+    } catch (const nlohmann::json::exception&) { // NOLINT(bugprone-empty-catch)
+    } catch (const std::ios_base::failure&) {    // NOLINT(bugprone-empty-catch)
     }
+    return {}; // The next scan only compares more.
 }
 
 bool isRecordOf(const RecordedLibrary& library, const DisabledComponent& component) {
