@@ -61,12 +61,12 @@ void castSharedPointer(benchmark::State& state) {
 
 void addCastComparisons(RatioTable& table) {
     table.add(
-        {"cast/uncounted", "safeCast and release, uncounted object", "three virtual calls", 1.1},
+        {"cast/uncounted", "safeCast and release, uncounted object", "three virtual calls", 0.8},
         castUncounted, threeCalls);
-    table.add({"cast/null", "a cast that answers null", "one virtual call", 1.3}, castToAbsent,
+    table.add({"cast/null", "a cast that answers null", "one virtual call", 1.2}, castToAbsent,
               oneCall);
     table.add({"cast/counted", "safeCast and release, counted object",
-               "std::dynamic_pointer_cast with threads", 0.8},
+               "std::dynamic_pointer_cast with threads", 0.65},
               castCounted, castSharedPointer);
 }
 

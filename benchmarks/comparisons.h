@@ -12,6 +12,8 @@ void addStartComparisons(RatioTable& table);
 void addControllerComparisons(RatioTable& table);
 void addStreamComparisons(RatioTable& table);
 void addMediaComparisons(RatioTable& table);
+void addObjectComparisons(RatioTable& table);
+void addImportComparisons(RatioTable& table);
 void addToolsComparisons(RatioTable& table);
 void addScanComparisons(RatioTable& table);
 

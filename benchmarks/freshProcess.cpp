@@ -54,10 +54,12 @@ std::string outputOf(const std::string& program, const std::string& work,
 
 } // namespace
 
-FreshResult inFreshProcess(const std::string& work, const std::filesystem::path& folder) {
-    const std::string output = outputOf(MZ_BENCHMARK_START, work, folder.string());
+FreshResult inFreshProcess(const std::string& work, const std::filesystem::path& folder,
+                           const std::string& program) {
+    const std::string output = outputOf(program, work, folder.string());
     FreshResult result;
-    if (std::sscanf(output.c_str(), "%lf %ld", &result.seconds, &result.count) != 2)
+    if (std::sscanf(output.c_str(), "%lf %ld %ld %ld", &result.seconds, &result.count,
+                    &result.peakBytes, &result.heapBytes) != 4)
         throw std::runtime_error("unexpected answer of " + work + ": " + output);
     return result;
 }

@@ -11,9 +11,14 @@ namespace Mz::Benchmarks {
 struct FreshResult {
     double seconds = 0; ///< processor time of the work alone, in user and system mode
     long count = 0;     ///< the number of libraries that the work found
+    long peakBytes = 0; ///< the most memory that the process had at a time
+    long heapBytes = 0; ///< what the work allocated and kept
 };
 
 /// Runs `work` (see start.cpp) on `folder` in a new process. Throws `std::exception` on failure.
-FreshResult inFreshProcess(const std::string& work, const std::filesystem::path& folder);
+///
+/// \param program  the program that does the work and prints its result as `printResult` does
+FreshResult inFreshProcess(const std::string& work, const std::filesystem::path& folder,
+                           const std::string& program = MZ_BENCHMARK_START);
 
 } // namespace Mz::Benchmarks

@@ -4,17 +4,17 @@
 /// Imports a mesh of 330 KB through the mesh components in FOLDER, plainly and guarded in turn, and
 /// prints the medians of both and their difference. It is a separate program, because the component
 /// manager of the other benchmarks knows a thousand libraries.
-#include "components/componentTools/guardedImport.h"
+#include "sphere.h"
+
 #include "components/componentKit/hostKit.h"
+#include "components/componentTools/guardedImport.h"
 
 #include <algorithm>
 #include <chrono>
-#include <cmath>
 #include <cstdio>
 #include <filesystem>
 #include <fstream>
 #include <functional>
-#include <numbers>
 #include <stdexcept>
 #include <string>
 #include <unistd.h>
@@ -25,29 +25,6 @@ namespace {
 using namespace Mz;
 
 constexpr int repetitions = 101;
-
-/// Returns a sphere as OBJ text.
-std::string sphere(int rings, int segments) {
-    std::string text;
-    char line[96];
-    const auto add = [&](auto... values) {
-        text.append(line, static_cast<std::size_t>(std::snprintf(line, sizeof line, values...)));
-    };
-    for (int ring = 0; ring <= rings; ++ring)
-        for (int segment = 0; segment < segments; ++segment) {
-            const double up = std::numbers::pi * ring / rings;
-            const double around = 2 * std::numbers::pi * segment / segments;
-            add("v %.6f %.6f %.6f\n", std::sin(up) * std::cos(around), std::cos(up),
-                std::sin(up) * std::sin(around));
-        }
-    for (int ring = 0; ring < rings; ++ring)
-        for (int segment = 0; segment < segments; ++segment) {
-            const int here = ring * segments + segment + 1;
-            const int next = ring * segments + (segment + 1) % segments + 1;
-            add("f %d %d %d %d\n", here, next, next + segments, here + segments);
-        }
-    return text;
-}
 
 /// Returns the time of `work` in milliseconds.
 double timeOf(const std::function<bool()>& work) {
@@ -64,7 +41,7 @@ double median(std::vector<double> values) {
 }
 
 int measure(const std::filesystem::path& components, const std::filesystem::path& file) {
-    std::ofstream(file, std::ios::binary) << sphere(84, 75);
+    std::ofstream(file, std::ios::binary) << Benchmarks::sphere();
     Kit::initialize(components);
     const auto importer = Kit::newImporter<L"mesh">();
     Kit::ImportLimits limits;

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: BSL-1.0
 /// Measures the library, each work together with its limit, and prints a table of ratios.
 #include "comparisons.h"
+#include "memory.h"
+#include "peers/registration.h"
 
 #include <condition_variable>
 #include <exception>
@@ -18,6 +20,7 @@ using namespace Mz::Benchmarks;
 namespace {
 
 constexpr std::string_view ratiosOption = "--ratios_out=";
+constexpr std::string_view memoryFilter = "--benchmark_filter=memory";
 
 /// An idle second thread while it lives. The standard library's reference counts are atomic only in
 /// programs with several threads, as most programs are.
@@ -54,18 +57,29 @@ void stayOnOneCore() {
         std::cerr << "could not stay on one core\n";
 }
 
-/// Returns the default options followed by those of the command line, which override them.
-/// `--ratios_out` is removed; its value goes to `ratiosFile`.
-std::vector<std::string> optionsOf(int argc, char** argv, std::string& ratiosFile) {
-    std::vector<std::string> options{argv[0], "--benchmark_repetitions=25",
-                                     "--benchmark_enable_random_interleaving=true",
-                                     "--benchmark_min_time=0.04"};
+/// What the command line asks for, beside the options of Google Benchmark.
+struct Options {
+    std::vector<std::string> forLibrary; ///< defaults first, which those of the user override
+    std::string ratiosFile;              ///< empty for none
+    bool memory = true;                  ///< measure memory, too
+};
+
+Options optionsOf(int argc, char** argv) {
+    Options options;
+    options.forLibrary = {argv[0], "--benchmark_repetitions=25",
+                          "--benchmark_enable_random_interleaving=true",
+                          "--benchmark_min_time=0.04"};
     for (int index = 1; index < argc; ++index) {
         const std::string_view option = argv[index];
-        if (option.starts_with(ratiosOption))
-            ratiosFile = option.substr(ratiosOption.size());
-        else
-            options.emplace_back(option);
+        if (option.starts_with(ratiosOption)) {
+            options.ratiosFile = option.substr(ratiosOption.size());
+            continue;
+        }
+        // A filter selects the times; the memory is measured with all of them, or by itself.
+        if (option.starts_with("--benchmark_filter=") ||
+            option.starts_with("--benchmark_list_tests"))
+            options.memory = option == memoryFilter;
+        options.forLibrary.emplace_back(option);
     }
     return options;
 }
@@ -80,20 +94,36 @@ bool initializeLibrary(std::vector<std::string>& options) {
     return !benchmark::ReportUnrecognizedArguments(count, arguments.data());
 }
 
-int run(int argc, char** argv) {
-    std::string ratiosFile;
-    std::vector<std::string> options = optionsOf(argc, argv, ratiosFile);
-    if (!initializeLibrary(options))
-        return 2;
-    RatioTable table;
+void addComparisons(RatioTable& table) {
     addCastComparisons(table);
     addCreateComparisons(table);
     addStartComparisons(table);
     addControllerComparisons(table);
     addStreamComparisons(table);
     addMediaComparisons(table);
+    addObjectComparisons(table);
+    addImportComparisons(table);
     addToolsComparisons(table);
     addScanComparisons(table);
+    PeerRegistration::addAll(table);
+}
+
+bool writeRatios(const std::string& file, const RatioTable& table,
+                 const std::vector<MemoryLine>& memory) {
+    std::ofstream out(file);
+    writeJson(out, table.ratioLines(), memory);
+    if (out.flush())
+        return true;
+    std::cerr << "cannot write " << file << '\n';
+    return false;
+}
+
+int run(int argc, char** argv) {
+    Options options = optionsOf(argc, argv);
+    if (!initializeLibrary(options.forLibrary))
+        return 2;
+    RatioTable table;
+    addComparisons(table);
 
     stayOnOneCore();
     {
@@ -103,14 +133,14 @@ int run(int argc, char** argv) {
     }
     benchmark::Shutdown();
     table.print(std::cout);
-    if (!ratiosFile.empty()) {
-        std::ofstream out(ratiosFile);
-        table.printJson(out);
-        if (!out.flush()) {
-            std::cerr << "cannot write " << ratiosFile << '\n';
-            return 1;
-        }
+    std::vector<MemoryLine> memory;
+    if (options.memory) {
+        memory = measureMemory();
+        std::cout << '\n';
+        printMemory(std::cout, memory);
     }
+    if (!options.ratiosFile.empty() && !writeRatios(options.ratiosFile, table, memory))
+        return 1;
     return table.failed() ? 1 : 0;
 }
 

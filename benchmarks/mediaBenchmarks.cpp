@@ -4,20 +4,18 @@
 #include "comparisons.h"
 #include "measure.h"
 #include "streamValues.h"
+#include "temporaryFile.h"
 
 #include "components/componentManager/binaryStream.h"
 #include "components/componentManager/textStream.h"
 #include "components/objectIO/objectIO.h"
 
-#include <cstdlib>
-#include <filesystem>
 #include <fstream>
 #include <istream>
 #include <ostream>
 #include <sstream>
 #include <streambuf>
 #include <string>
-#include <unistd.h>
 #include <vector>
 
 namespace Mz::Benchmarks {
@@ -25,24 +23,6 @@ namespace Mz::Benchmarks {
 namespace {
 
 // ---- Files ----------------------------------------------------------------------------------
-
-/// A temporary file, removed at the end of the scope.
-class TemporaryFile {
-  public:
-    TemporaryFile() : name((std::filesystem::temp_directory_path() / "mzBenchXXXXXX").string()) {
-        const int descriptor = ::mkstemp(name.data());
-        if (descriptor >= 0)
-            ::close(descriptor);
-    }
-    ~TemporaryFile() { std::filesystem::remove(name); }
-    TemporaryFile(const TemporaryFile&) = delete;
-    TemporaryFile& operator=(const TemporaryFile&) = delete;
-
-    const std::string& path() const { return name; }
-
-  private:
-    std::string name;
-};
 
 /// Returns the binary form of `values`.
 template <class T>

@@ -6,6 +6,7 @@ namespace Mz::Benchmarks {
 
 SharedRoot::~SharedRoot() = default;
 SharedGauge::~SharedGauge() = default;
+SharedAbsent::~SharedAbsent() = default;
 
 namespace {
 

@@ -47,6 +47,12 @@ class MZ_SHARED_TYPE SharedGauge : public SharedRoot {
     virtual long value() const = 0;
 };
 
+/// An interface that no shared gauge has.
+class MZ_SHARED_TYPE SharedAbsent : public SharedRoot {
+  public:
+    ~SharedAbsent() override;
+};
+
 /// The limit of `createObject`.
 class Product {
   public:

@@ -2,12 +2,12 @@
 // Collects the repetitions of each benchmark and prints medians and their ratios.
 #include "ratioTable.h"
 
-#include "ratioJson.h"
+#include "textRows.h"
 
 #include <algorithm>
-#include <array>
 #include <cstdio>
 #include <iostream>
+#include <stdexcept>
 #include <utility>
 
 namespace Mz::Benchmarks {
@@ -37,40 +37,49 @@ std::string timeText(double nanoseconds) {
                              : formatted("%.2f ms", nanoseconds / 1e6);
 }
 
-using Cells = std::array<std::string, 7>;
+std::string reachText(std::optional<double> reach) {
+    return reach ? formatted("%.2f", *reach) : "-";
+}
 
-void printCells(std::ostream& out, const std::vector<Cells>& rows) {
-    std::array<std::size_t, std::tuple_size_v<Cells>> widths{};
-    for (const Cells& row : rows)
-        for (std::size_t column = 0; column < row.size(); ++column)
-            widths[column] = std::max(widths[column], row[column].size());
-    for (const Cells& row : rows) {
-        for (std::size_t column = 0; column < row.size(); ++column) {
-            const std::string padding(widths[column] - row[column].size(), ' ');
-            // Texts are left-aligned, numbers right-aligned.
-            const bool figure = column > 1;
-            out << (column ? " | " : "| ") << (figure ? padding : "") << row[column]
-                << (figure ? "" : padding);
-        }
-        out << " |\n";
-    }
+void addPeerCells(TextRow& row, const RatioLine& line) {
+    std::string names;
+    for (const PeerTime& peer : line.peers)
+        names += (names.empty() ? "" : ", ") + peer.name + " " + timeText(peer.nanoseconds);
+    row.push_back(line.peers.empty()
+                      ? "-"
+                      : formatted("%.2f", line.workNanoseconds / line.peers[0].nanoseconds));
+    row.push_back(reachText(line.peerReach));
+    row.push_back(names);
 }
 
 } // namespace
 
+void RatioTable::registerBenchmark(const std::string& name, Body body, bool setsTime) {
+    benchmark::internal::Benchmark* const registered =
+        benchmark::RegisterBenchmark(name.c_str(), std::move(body));
+    if (setsTime)
+        registered->UseManualTime()->Iterations(1)->Unit(benchmark::kMillisecond);
+}
+
 void RatioTable::add(const Comparison& comparison, Body work, Body limit) {
-    benchmark::RegisterBenchmark((comparison.name + "/work").c_str(), std::move(work));
-    benchmark::RegisterBenchmark((comparison.name + "/limit").c_str(), std::move(limit));
+    registerBenchmark(comparison.name + "/work", std::move(work), false);
+    registerBenchmark(comparison.name + "/limit", std::move(limit), false);
     comparisons.push_back(comparison);
 }
 
 void RatioTable::addSelfTimed(const Comparison& comparison, Body work, Body limit) {
-    for (const auto& [side, body] : {std::pair("/work", work), std::pair("/limit", limit)})
-        benchmark::RegisterBenchmark((comparison.name + side).c_str(), body)
-            ->UseManualTime()
-            ->Iterations(1)
-            ->Unit(benchmark::kMillisecond);
+    registerBenchmark(comparison.name + "/work", std::move(work), true);
+    registerBenchmark(comparison.name + "/limit", std::move(limit), true);
     comparisons.push_back(comparison);
+    selfTimed.insert(comparison.name);
+}
+
+void RatioTable::addPeer(const std::string& name, const std::string& peer, Body body) {
+    if (std::none_of(comparisons.begin(), comparisons.end(),
+                     [&](const Comparison& comparison) { return comparison.name == name; }))
+        throw std::out_of_range("no comparison is named " + name);
+    registerBenchmark(name + "/" + peer, std::move(body), selfTimed.count(name) > 0);
+    peers.push_back({name, peer});
 }
 
 void RatioTable::note(const std::string& name, double nanoseconds) {
@@ -94,27 +103,44 @@ std::vector<RatioTable::Line> RatioTable::lines() const {
 }
 
 void RatioTable::print(std::ostream& out) const {
-    std::vector<Cells> rows{
+    constexpr std::size_t textColumns = 2;
+    std::vector<TextRow> rows{
         {"work", "limit", "median", "limit's median", "ratio", "of fastest", "reach"}};
-    for (const Line& line : lines()) {
-        const Comparison& comparison = *line.comparison;
-        rows.push_back({comparison.work, comparison.limit, timeText(line.work),
-                        timeText(line.limit), formatted("%.2f", line.ratio()),
-                        formatted("%.2f", line.fastestRatio()),
-                        comparison.reach ? formatted("%.2f", *comparison.reach) : "-"});
+    if (!peers.empty())
+        rows.front().insert(rows.front().end(), {"of best peer", "reach", "peers"});
+    for (const RatioLine& line : ratioLines()) {
+        rows.push_back({line.work, line.limit, timeText(line.workNanoseconds),
+                        timeText(line.limitNanoseconds), formatted("%.2f", line.ratio),
+                        formatted("%.2f", line.ratioOfFastest), reachText(line.reach)});
+        if (!peers.empty())
+            addPeerCells(rows.back(), line);
     }
-    printCells(out, rows);
+    printRows(out, rows, textColumns);
     for (const auto& [name, message] : errors)
         out << name << " failed: " << message << '\n';
 }
 
-void RatioTable::printJson(std::ostream& out) const {
+std::vector<PeerTime> RatioTable::peersOf(const std::string& name) const {
+    std::vector<PeerTime> result;
+    for (const Peer& peer : peers) {
+        const auto times = repetitions.find(name + "/" + peer.name);
+        if (peer.comparison == name && times != repetitions.end())
+            result.push_back({peer.name, medianOf(times->second)});
+    }
+    std::sort(result.begin(), result.end(),
+              [](const PeerTime& a, const PeerTime& b) { return a.nanoseconds < b.nanoseconds; });
+    return result;
+}
+
+std::vector<RatioLine> RatioTable::ratioLines() const {
     std::vector<RatioLine> all;
-    for (const Line& line : lines())
-        all.push_back({line.comparison->name, line.comparison->work, line.comparison->limit,
-                       line.work, line.limit, line.ratio(), line.fastestRatio(),
-                       line.comparison->reach});
-    writeJson(out, all);
+    for (const Line& line : lines()) {
+        const Comparison& comparison = *line.comparison;
+        all.push_back({comparison.name, comparison.work, comparison.limit, line.work, line.limit,
+                       line.ratio(), line.fastestRatio(), comparison.reach, comparison.peerReach,
+                       peersOf(comparison.name)});
+    }
+    return all;
 }
 
 bool RatioReporter::ReportContext(const Context& context) {

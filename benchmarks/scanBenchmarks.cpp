@@ -126,7 +126,7 @@ void addScanComparisons(RatioTable& table) {
     const auto few = std::make_shared<ScannedFolder>(50);
     table.addSelfTimed(
         {"scan/new", "scan of 50 new libraries, one job",
-         "start of 50 processes that do nothing, their ends", std::nullopt},
+         "start of 50 processes that do nothing, their ends"},
         [few](benchmark::State& state) {
             measure(state, [&] {
                 few->forget();
@@ -139,7 +139,7 @@ void addScanComparisons(RatioTable& table) {
     const auto many = std::make_shared<ScannedFolder>(1000);
     table.addSelfTimed(
         {"scan/unchanged", "scan of 1,000 unchanged libraries",
-         "list, status, open, one read, close; read the list", std::nullopt},
+         "list, status, open, one read, close; read the list"},
         [many](benchmark::State& state) {
             many->scanFirst();
             measure(state, [&] { return many->scan(); });

@@ -1,25 +1,27 @@
 // SPDX-License-Identifier: BSL-1.0
 /// Does work that a process can measure only once: mzBenchmarkStart WORK FOLDER
 ///
-/// Runs the work on the libraries of the folder and prints the processor time in seconds and the
-/// number of libraries found. The works:
+/// Runs the work on the libraries of the folder and prints the processor time in seconds, the
+/// number of libraries found, and the memory (`Measurement`). The works:
 ///   initialize   initialises the component manager; counts builders
 ///   load         the limit: loads each library, looks up its entry point and calls it
 ///   readTables   the limit for libraries without entry point: lists the folder, gets the status of
-///                each file and reads its symbol table
+///                each file, and reads a block at its beginning and one in its symbol table
 ///   record       writes the manager's records to a hidden file in the folder; counts builders
+///   recordMany   writes a list to the same file in which each library has ten more builders
 ///   initializeRecorded
 ///                reads that file and initialises the component manager; counts builders; fails if
 ///                a library was loaded
 ///   readList     the limit for that: lists the folder, gets the status of each file, reads
 ///                that file and adds every builder to a map
+#include "freshResult.h"
+
 #include "components/componentManager/binaryStream.h"
 #include "components/componentManager/componentImp.h"
 
 #include <algorithm>
 #include <cstdio>
 #include <cstring>
-#include <ctime>
 #include <dirent.h>
 #include <dlfcn.h>
 #include <elf.h>
@@ -30,26 +32,16 @@
 #include <list>
 #include <map>
 #include <string>
+#include <string_view>
 #include <sys/stat.h>
 #include <unistd.h>
 #include <unordered_map>
 #include <vector>
 
 using namespace Mz;
+using namespace Mz::Benchmarks;
 
 namespace {
-
-/// Returns the processor time of this process, which other processes do not affect.
-double processorTime() {
-    timespec time{};
-    ::clock_gettime(CLOCK_PROCESS_CPUTIME_ID, &time);
-    return static_cast<double>(time.tv_sec) + static_cast<double>(time.tv_nsec) * 1e-9;
-}
-
-int report(double begin, double end, long count) {
-    std::printf("%.9f %ld\n", end - begin, count);
-    return 0;
-}
 
 class Counter final : public QrEnumerator<QrCPtr<QrBuilderDescription>> {
   public:
@@ -69,25 +61,16 @@ long countBuilders() {
 
 int initialize(const std::filesystem::path& folder) {
     const std::wstring searchPath = folder.wstring();
-    const double begin = processorTime();
+    const Measurement measurement;
     QrGetComponentManager()->initialize(searchPath.c_str());
     const double end = processorTime();
-    return report(begin, end, countBuilders());
-}
-
-/// Returns the files of the folder in the order in which the manager loads them.
-std::vector<std::string> filesOf(const std::filesystem::path& folder) {
-    std::vector<std::string> files;
-    for (const auto& entry : std::filesystem::directory_iterator(folder))
-        files.push_back(entry.path().string());
-    std::sort(files.begin(), files.end());
-    return files;
+    return measurement.print(end, countBuilders());
 }
 
 int load(const std::filesystem::path& folder) {
     const std::vector<std::string> files = filesOf(folder);
     long count = 0;
-    const double begin = processorTime();
+    const Measurement measurement;
     for (const std::string& file : files) {
         void* const library = ::dlopen(file.c_str(), RTLD_NOW | RTLD_LOCAL);
         if (!library)
@@ -96,21 +79,16 @@ int load(const std::filesystem::path& folder) {
         if (entryPoint && reinterpret_cast<QrGetComponentDescriptionFunction*>(entryPoint)())
             ++count;
     }
-    return report(begin, processorTime(), count);
+    return measurement.print(processorTime(), count);
 }
 
-/// The position of a library's symbol table in its file.
-struct TablePlace {
-    off_t offset = 0;
-    std::size_t size = 0;
-};
-
-TablePlace symbolTableOf(const std::string& file) {
+/// Returns the offset of a library's symbol table in its file, or 0.
+off_t symbolTableOf(const std::string& file) {
     std::ifstream stream(file, std::ios::binary);
     const std::string content(std::istreambuf_iterator<char>(stream), {});
     Elf64_Ehdr header{};
     if (content.size() < sizeof header)
-        return {};
+        return 0;
     std::memcpy(&header, content.data(), sizeof header);
     for (std::size_t index = 0; index < header.e_shnum; ++index) {
         Elf64_Shdr section{};
@@ -119,33 +97,37 @@ TablePlace symbolTableOf(const std::string& file) {
             break;
         std::memcpy(&section, content.data() + offset, sizeof section);
         if (section.sh_type == SHT_DYNSYM)
-            return {static_cast<off_t>(section.sh_offset), section.sh_size};
+            return static_cast<off_t>(section.sh_offset);
     }
-    return {};
+    return 0;
+}
+
+/// Returns whether both blocks of the open file can be read.
+bool readTwoBlocks(int file, off_t table) {
+    char block[1024];
+    return ::pread(file, block, sizeof block, 0) > 0 &&
+           ::pread(file, block, sizeof block, table) > 0;
 }
 
 int readTables(const std::filesystem::path& folder) {
     // All files are copies of one file, so the position is the same. It is determined before the
     // measurement.
     const std::vector<std::string> known = filesOf(folder);
-    const TablePlace place = known.empty() ? TablePlace() : symbolTableOf(known.front());
-    std::vector<char> table(place.size);
+    const off_t table = known.empty() ? 0 : symbolTableOf(known.front());
     long count = 0;
-    const double begin = processorTime();
+    const Measurement measurement;
     DIR* const listing = ::opendir(folder.c_str());
     while (const dirent* entry = listing ? ::readdir(listing) : nullptr) {
         struct stat status;
         if (entry->d_name[0] == '.' || ::fstatat(::dirfd(listing), entry->d_name, &status, 0) != 0)
             continue;
         const int file = ::openat(::dirfd(listing), entry->d_name, O_RDONLY | O_CLOEXEC);
-        const ssize_t got = ::pread(file, table.data(), table.size(), place.offset);
+        count += readTwoBlocks(file, table);
         ::close(file);
-        if (got > 0 && static_cast<std::size_t>(got) == place.size)
-            ++count;
     }
     if (listing)
         ::closedir(listing);
-    return report(begin, processorTime(), count);
+    return measurement.print(processorTime(), count);
 }
 
 std::filesystem::path listIn(const std::filesystem::path& folder) {
@@ -157,12 +139,13 @@ QrPtr<QrPersistant> records() {
 }
 
 int record(const std::filesystem::path& folder) {
+    const Measurement measurement;
     QrGetComponentManager()->initialize(folder.wstring().c_str());
     std::ofstream file(listIn(folder), std::ios::binary);
     QrOutBuffer buffer(&file);
     QrBinaryStream stream(&buffer);
     records()->write(stream);
-    return file.flush() ? report(0, 0, countBuilders()) : 1;
+    return file.flush() ? measurement.print(processorTime(), countBuilders()) : 1;
 }
 
 /// Returns whether this process has mapped a file of the folder.
@@ -174,7 +157,7 @@ bool loadedFrom(const std::filesystem::path& folder) {
 
 int initializeRecorded(const std::filesystem::path& folder) {
     const std::wstring searchPath = folder.wstring();
-    const double begin = processorTime();
+    const Measurement measurement;
     {
         std::ifstream file(listIn(folder), std::ios::binary);
         QrInBuffer buffer(&file);
@@ -183,7 +166,7 @@ int initializeRecorded(const std::filesystem::path& folder) {
     }
     QrGetComponentManager()->initialize(searchPath.c_str());
     const double end = processorTime();
-    return loadedFrom(folder) ? 1 : report(begin, end, countBuilders());
+    return loadedFrom(folder) ? 1 : measurement.print(end, countBuilders());
 }
 
 /// Reads a recorded list without the library.
@@ -208,6 +191,13 @@ class ListReader {
         return value;
     }
     void skip(std::size_t size) { at += size; }
+    bool atEnd() const { return at >= content.size(); }
+
+    /// Returns what was read since `begin`, a former `position`.
+    std::string_view since(std::size_t begin) const {
+        return std::string_view(content).substr(begin, at - begin);
+    }
+    std::size_t position() const { return at; }
 
   private:
     std::string content;
@@ -220,12 +210,29 @@ struct Record {
     QrUid uid{};
 };
 
+/// Reads the part of a library, up to its builders. Returns the number of builders.
+std::uint32_t readLibrary(ListReader& reader, Record& record) {
+    record.directory = reader.text();
+    record.fileName = reader.text();
+    record.time = reader.word();
+    reader.skip(sizeof(int64));
+    return reader.word();
+}
+
+void readBuilder(ListReader& reader, Record& record) {
+    record.uid = {reader.word(), reader.word(), reader.word(), reader.word()};
+    record.name = reader.text();
+    record.label = reader.text();
+    record.text = reader.text();
+    reader.skip(1 + sizeof(std::uint32_t));
+}
+
 struct UidHash {
     std::size_t operator()(const QrUid& uid) const { return uid.w0; }
 };
 
 int readList(const std::filesystem::path& folder) {
-    const double begin = processorTime();
+    const Measurement measurement;
     long files = 0;
     DIR* const listing = ::opendir(folder.c_str());
     while (const dirent* entry = listing ? ::readdir(listing) : nullptr) {
@@ -240,21 +247,47 @@ int readList(const std::filesystem::path& folder) {
     std::unordered_map<QrUid, Record*, UidHash> byUid;
     for (std::uint32_t count = reader.word(); count > 0; --count) {
         Record& record = read.emplace_back();
-        record.directory = reader.text();
-        record.fileName = reader.text();
-        record.time = reader.word();
-        reader.skip(sizeof(int64));
-        for (std::uint32_t builders = reader.word(); builders > 0; --builders) {
-            record.uid = {reader.word(), reader.word(), reader.word(), reader.word()};
-            record.name = reader.text();
-            record.label = reader.text();
-            record.text = reader.text();
-            reader.skip(1 + sizeof(std::uint32_t));
+        for (std::uint32_t builders = readLibrary(reader, record); builders > 0; --builders) {
+            readBuilder(reader, record);
             byUid[record.uid] = &record;
         }
     }
     const long known = static_cast<long>(byUid.size());
-    return report(begin, processorTime(), std::min(files, known));
+    return measurement.print(processorTime(), std::min(files, known));
+}
+
+void appendWord(std::string& bytes, std::uint32_t word) {
+    word = __builtin_bswap32(word);
+    bytes.append(reinterpret_cast<const char*>(&word), sizeof word);
+}
+
+/// Repeats the builder of each record with other uids.
+int recordMany(const std::filesystem::path& folder) {
+    constexpr std::uint32_t copies = 11;
+    if (record(folder) != 0)
+        return 1;
+    ListReader reader(listIn(folder));
+    const std::uint32_t libraries = reader.word();
+    std::string list(reader.since(0));
+    for (std::uint32_t library = 0; library < libraries; ++library) {
+        Record record;
+        const std::size_t begin = reader.position();
+        if (readLibrary(reader, record) != 1)
+            return 1;
+        list += reader.since(begin);
+        list.resize(list.size() - sizeof(std::uint32_t));
+        appendWord(list, copies);
+        const std::size_t builder = reader.position();
+        readBuilder(reader, record);
+        const std::string bytes(reader.since(builder));
+        for (std::uint32_t copy = 0; copy < copies; ++copy) {
+            appendWord(list, record.uid.w0 + copy * libraries);
+            list += bytes.substr(sizeof(std::uint32_t));
+        }
+    }
+    std::ofstream file(listIn(folder), std::ios::binary);
+    return reader.atEnd() && file.write(list.data(), static_cast<std::streamsize>(list.size())) ? 0
+                                                                                                : 1;
 }
 
 using Work = int (*)(const std::filesystem::path&);
@@ -266,6 +299,7 @@ const std::map<std::string, Work> works = {
     {"readList", readList},
     {"readTables", readTables},
     {"record", record},
+    {"recordMany", recordMany},
 };
 
 } // namespace

@@ -3,7 +3,7 @@
 // compared with the same work by hand on standard streams.
 #include "comparisons.h"
 #include "measure.h"
-#include "streamValues.h"
+#include "streamWork.h"
 
 #include "components/componentManager/binaryStream.h"
 #include "components/componentManager/textStream.h"
@@ -20,55 +20,6 @@
 namespace Mz::Benchmarks {
 
 namespace {
-
-/// Returns what `write` writes to a standard stream.
-template <class Write>
-std::string written(const Write& write) {
-    std::ostringstream out;
-    write(out);
-    return out.str();
-}
-
-template <class T, class Stream>
-std::string valuesIn(int count) {
-    const std::vector<T> values = randomValues<T>(count);
-    return written([&](std::ostream& out) {
-        QrOutBuffer io(&out);
-        Stream stream(&io);
-        for (const T value : values)
-            stream << value;
-    });
-}
-
-/// Repeats `work` on the same output from its beginning, so that no memory is allocated. At the end
-/// checks that the output is `expected`.
-template <class Work>
-void writeRepeatedly(benchmark::State& state, const std::string& expected, const Work& work) {
-    std::ostringstream out;
-    for (auto iteration : state) {
-        static_cast<void>(iteration);
-        out.seekp(0);
-        work(out);
-    }
-    if (out.str() != expected)
-        state.SkipWithError("something else was written");
-}
-
-/// The same for input. At the end checks that the values that `work` read are `expected`.
-template <class T, class Work>
-void readRepeatedly(benchmark::State& state, const std::string& content,
-                    const std::vector<T>& expected, const Work& work) {
-    std::istringstream in(content);
-    std::vector<T> values(expected.size());
-    for (auto iteration : state) {
-        static_cast<void>(iteration);
-        in.clear();
-        in.seekg(0);
-        work(in, values);
-    }
-    if (std::memcmp(values.data(), expected.data(), sizeof(T) * values.size()) != 0)
-        state.SkipWithError("something else was read");
-}
 
 // ---- Binary ---------------------------------------------------------------------------------
 
@@ -198,7 +149,7 @@ void writeTextByHand(benchmark::State& state) {
 
 template <class T>
 void readTextByHand(benchmark::State& state) {
-    const std::string content = valuesIn<T, QrTextStream>(textCount);
+    const std::string& content = valuesIn<T, QrTextStream>(textCount);
     std::vector<T> expected(textCount);
     std::vector<char> block(content.size());
     const auto parse = [&](std::istream& in, std::vector<T>& values) {
@@ -214,17 +165,6 @@ void readTextByHand(benchmark::State& state) {
     std::istringstream once(content);
     parse(once, expected);
     readRepeatedly(state, content, expected, parse);
-}
-
-/// Returns the values that are read back from text: 16 digits do not represent every `double`
-/// exactly.
-template <class T>
-std::vector<T> textValues() {
-    std::istringstream in(valuesIn<T, QrTextStream>(textCount));
-    std::vector<T> values(textCount);
-    for (T& value : values)
-        in >> value;
-    return values;
 }
 
 template <class T>

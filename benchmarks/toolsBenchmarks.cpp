@@ -63,7 +63,7 @@ void addForeign(RatioTable& table, const char* name, const char* text,
     if (!std::filesystem::is_directory(folder))
         return;
     const std::shared_ptr<Files> files = foreignFiles(folder);
-    table.add({name, text, "status, open, one read, close", std::nullopt}, eachFile(files, explain),
+    table.add({name, text, "status, open, one read, close"}, eachFile(files, explain),
               eachFile(files, readOnce));
 }
 
