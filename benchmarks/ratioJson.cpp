@@ -53,10 +53,10 @@ Json arrayOf(const std::vector<Line>& lines) {
 
 } // namespace
 
-void writeJson(std::ostream& out, const std::vector<RatioLine>& lines,
+void writeJson(std::ostream& out, const BuildLine& build, const std::vector<RatioLine>& lines,
                const std::vector<MemoryLine>& memory) {
-    const Json all{{"compiler", MZ_BENCHMARK_COMPILER},
-                   {"options", MZ_BENCHMARK_OPTIONS},
+    const Json all{{"compiler", build.compiler},
+                   {"options", build.options},
                    {"times", arrayOf(lines)},
                    {"memory", arrayOf(memory)}};
     out << all.dump(2, ' ', false, Json::error_handler_t::replace) << '\n';

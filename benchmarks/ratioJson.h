@@ -30,8 +30,13 @@ struct MemoryLine {
     double workBytes = 0, limitBytes = 0;
 };
 
-/// Writes both tables and the compiler as a JSON object. A number that is not finite becomes null.
-void writeJson(std::ostream& out, const std::vector<RatioLine>& lines,
+/// How the measuring program was compiled.
+struct BuildLine {
+    std::string compiler, options;
+};
+
+/// Writes both tables and the build as a JSON object. A number that is not finite becomes null.
+void writeJson(std::ostream& out, const BuildLine& build, const std::vector<RatioLine>& lines,
                const std::vector<MemoryLine>& memory);
 
 } // namespace Mz::Benchmarks
