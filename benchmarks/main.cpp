@@ -111,7 +111,7 @@ void addComparisons(RatioTable& table) {
 bool writeRatios(const std::string& file, const RatioTable& table,
                  const std::vector<MemoryLine>& memory) {
     std::ofstream out(file);
-    writeJson(out, table.ratioLines(), memory);
+    writeJson(out, table.ratioLines(), memory, table.repetitionCount());
     if (out.flush())
         return true;
     std::cerr << "cannot write " << file << '\n';

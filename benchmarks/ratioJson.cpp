@@ -54,9 +54,10 @@ Json arrayOf(const std::vector<Line>& lines) {
 } // namespace
 
 void writeJson(std::ostream& out, const std::vector<RatioLine>& lines,
-               const std::vector<MemoryLine>& memory) {
+               const std::vector<MemoryLine>& memory, std::size_t repetitions) {
     const Json all{{"compiler", MZ_BENCHMARK_COMPILER},
                    {"options", MZ_BENCHMARK_OPTIONS},
+                   {"repetitions", repetitions},
                    {"times", arrayOf(lines)},
                    {"memory", arrayOf(memory)}};
     out << all.dump(2, ' ', false, Json::error_handler_t::replace) << '\n';

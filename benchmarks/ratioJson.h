@@ -2,6 +2,7 @@
 /// Writes the tables of times and of memory as JSON.
 #pragma once
 
+#include <cstddef>
 #include <iosfwd>
 #include <optional>
 #include <string>
@@ -30,8 +31,9 @@ struct MemoryLine {
     double workBytes = 0, limitBytes = 0;
 };
 
-/// Writes both tables and the compiler as a JSON object. A number that is not finite becomes null.
+/// Writes both tables, the compiler and the number of repetitions as a JSON object. A number that
+/// is not finite becomes null.
 void writeJson(std::ostream& out, const std::vector<RatioLine>& lines,
-               const std::vector<MemoryLine>& memory);
+               const std::vector<MemoryLine>& memory, std::size_t repetitions);
 
 } // namespace Mz::Benchmarks
