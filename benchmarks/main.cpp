@@ -111,7 +111,8 @@ void addComparisons(RatioTable& table) {
 bool writeRatios(const std::string& file, const RatioTable& table,
                  const std::vector<MemoryLine>& memory) {
     std::ofstream out(file);
-    writeJson(out, {MZ_BENCHMARK_COMPILER, MZ_BENCHMARK_OPTIONS}, table.ratioLines(), memory);
+    writeJson(out, {MZ_BENCHMARK_COMPILER, MZ_BENCHMARK_OPTIONS, table.repetitionCount()},
+              table.ratioLines(), memory);
     if (out.flush())
         return true;
     std::cerr << "cannot write " << file << '\n';

@@ -119,6 +119,8 @@ def machine(figures: dict, missing: list) -> str:
     lines = [f"- Processor: {processor.group(1) if processor else platform.machine()}, "
              f"{os.cpu_count()} cores seen by the system.",
              f"- System: {system}.",
+             f"- Repetitions: {figures['repetitions']} of each work; other work on the machine: load average "
+             f"{os.getloadavg()[2]:.1f} over the last quarter of an hour, to which the measurement adds 1.",
              f"- Compiler: {figures['compiler']}, `{figures['options']}`.",
              "- Peers: " + ", ".join(f"{name} {version}" for name, version in versions.items() if version) + "."]
     if missing:

@@ -53,10 +53,11 @@ Json arrayOf(const std::vector<Line>& lines) {
 
 } // namespace
 
-void writeJson(std::ostream& out, const BuildLine& build, const std::vector<RatioLine>& lines,
+void writeJson(std::ostream& out, const RunLine& run, const std::vector<RatioLine>& lines,
                const std::vector<MemoryLine>& memory) {
-    const Json all{{"compiler", build.compiler},
-                   {"options", build.options},
+    const Json all{{"compiler", run.compiler},
+                   {"options", run.options},
+                   {"repetitions", run.repetitions},
                    {"times", arrayOf(lines)},
                    {"memory", arrayOf(memory)}};
     out << all.dump(2, ' ', false, Json::error_handler_t::replace) << '\n';

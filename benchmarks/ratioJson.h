@@ -2,6 +2,7 @@
 /// Writes the tables of times and of memory as JSON.
 #pragma once
 
+#include <cstddef>
 #include <iosfwd>
 #include <optional>
 #include <string>
@@ -30,13 +31,14 @@ struct MemoryLine {
     double workBytes = 0, limitBytes = 0;
 };
 
-/// How the measuring program was compiled.
-struct BuildLine {
+/// How the measuring program was compiled, and how often it did each work.
+struct RunLine {
     std::string compiler, options;
+    std::size_t repetitions = 0;
 };
 
-/// Writes both tables and the build as a JSON object. A number that is not finite becomes null.
-void writeJson(std::ostream& out, const BuildLine& build, const std::vector<RatioLine>& lines,
+/// Writes both tables and the run as a JSON object. A number that is not finite becomes null.
+void writeJson(std::ostream& out, const RunLine& run, const std::vector<RatioLine>& lines,
                const std::vector<MemoryLine>& memory);
 
 } // namespace Mz::Benchmarks

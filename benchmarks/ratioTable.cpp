@@ -143,6 +143,13 @@ std::vector<RatioLine> RatioTable::ratioLines() const {
     return all;
 }
 
+std::size_t RatioTable::repetitionCount() const {
+    std::size_t most = 0;
+    for (const auto& [name, times] : repetitions)
+        most = std::max(most, times.size());
+    return most;
+}
+
 bool RatioReporter::ReportContext(const Context& context) {
     PrintBasicContext(&GetErrorStream(), context);
     return true;

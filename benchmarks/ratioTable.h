@@ -6,6 +6,7 @@
 
 #include <benchmark/benchmark.h>
 
+#include <cstddef>
 #include <functional>
 #include <iosfwd>
 #include <map>
@@ -51,6 +52,9 @@ class RatioTable {
     void print(std::ostream& out) const;
     /// Returns the same lines with all peers.
     std::vector<RatioLine> ratioLines() const;
+
+    /// Returns the largest number of repetitions of a benchmark.
+    std::size_t repetitionCount() const;
 
     bool failed() const { return !errors.empty(); }
 

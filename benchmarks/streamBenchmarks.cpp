@@ -217,11 +217,11 @@ void addTypes(RatioTable& table, const std::string& type, const Reaches& reaches
     table.add({"text/" + type + "Read", "text " + type + " by >>", "one read and from_chars",
                reaches.textRead},
               readTextValues<T>, readTextByHand<T>);
-    table.add({"text/" + type + "WriteComma", "the same write under a decimal comma",
+    table.add({"text/" + type + "WriteComma", "text " + type + " by << under a decimal comma",
                "the same under \"C\"", 1.05},
               underDecimalComma(writeValues<T, QrTextStream, textCount>),
               writeValues<T, QrTextStream, textCount>);
-    table.add({"text/" + type + "ReadComma", "the same read under a decimal comma",
+    table.add({"text/" + type + "ReadComma", "text " + type + " by >> under a decimal comma",
                "the same under \"C\"", 1.05},
               underDecimalComma(readTextValues<T>), readTextValues<T>);
 }

@@ -8,7 +8,9 @@
 
 #include <cmath>
 #include <cstddef>
+#include <map>
 #include <random>
+#include <set>
 #include <string>
 #include <vector>
 
@@ -59,37 +61,43 @@ bool isGraph(const ContentOf& contentOf) {
     return true;
 }
 
+using SaveGraph = void (*)(const std::string& path);
+using CheckGraph = bool (*)(const std::string& path);
+
 /// Measures saving a graph to a file, which is opened for it each time.
 ///
 /// \param save  writes the graph to the file of a path
-/// \param check  returns whether the graph can be loaded from that file
-template <class Save, class Check>
-void measureSaving(benchmark::State& state, const Save& save, const Check& check) {
+/// \param check  returns whether the graph can be loaded from that file; called once in a process
+inline void measureSaving(benchmark::State& state, SaveGraph save, CheckGraph check) {
+    static std::set<SaveGraph> checked;
     const TemporaryFile file;
     for (auto iteration : state) {
         static_cast<void>(iteration);
         save(file.path());
     }
-    if (!check(file.path()))
+    if (checked.insert(save).second && !check(file.path()))
         state.SkipWithError("something else was saved");
 }
 
 /// Measures loading a graph from a file. Releasing the loaded graph is part of the work.
 ///
-/// \param save  writes the graph to the file of a path, once
+/// \param save  writes the graph to the file of a path; called once in a process
 /// \param load  loads it
-/// \param check  returns whether the graph can be loaded from that file
-template <class Save, class Load, class Check>
-void measureLoading(benchmark::State& state, const Save& save, const Load& load,
-                    const Check& check) {
-    const TemporaryFile file;
-    save(file.path());
+/// \param check  returns whether the graph can be loaded from that file; called once in a process
+template <class Loaded>
+void measureLoading(benchmark::State& state, SaveGraph save, Loaded (*load)(const std::string&),
+                    CheckGraph check) {
+    static std::map<SaveGraph, TemporaryFile> files;
+    const auto [saved, isNew] = files.try_emplace(save);
+    const std::string& path = saved->second.path();
+    if (isNew)
+        save(path);
     for (auto iteration : state) {
         static_cast<void>(iteration);
-        auto loaded = load(file.path());
+        Loaded loaded = load(path);
         benchmark::DoNotOptimize(loaded);
     }
-    if (!check(file.path()))
+    if (isNew && !check(path))
         state.SkipWithError("something else was loaded");
 }
 

@@ -19,9 +19,15 @@ const char* nameOf(const char* kind, char (&name)[32]) {
     return name;
 }
 
+void describe(gpointer type, gpointer) {
+    gst_element_class_set_static_metadata(GST_ELEMENT_CLASS(type), "Generated", "Generic",
+                                          "One of many elements", "benchmarks");
+}
+
 gboolean registerElement(GstPlugin* plugin) {
     char name[32];
     const GTypeInfo info{.class_size = sizeof(GstElementClass),
+                         .class_init = describe,
                          .instance_size = sizeof(GstElement)};
     const GType type =
         g_type_register_static(GST_TYPE_ELEMENT, nameOf("MzElement", name), &info, {});

@@ -15,7 +15,7 @@ namespace {
 
 Json written(const std::vector<RatioLine>& lines, const std::vector<MemoryLine>& memory = {}) {
     std::ostringstream out;
-    writeJson(out, {"GCC \"12\"", "-O2"}, lines, memory);
+    writeJson(out, {"GCC \"12\"", "-O2", 25}, lines, memory);
     return Json::parse(out.str(), nullptr, false);
 }
 
@@ -25,6 +25,7 @@ TEST(RatioJson, IsReadBackWhateverItsTextsAre) {
     const Json all = written({line, RatioLine{}});
     EXPECT_EQ(all.at("compiler"), "GCC \"12\"");
     EXPECT_EQ(all.at("options"), "-O2");
+    EXPECT_EQ(all.at("repetitions"), 25);
     const Json& times = all.at("times");
     ASSERT_EQ(times.size(), 2u);
     EXPECT_EQ(times[0].at("name"), text);
