@@ -44,8 +44,9 @@ MZ_COMPONENT_TOOLS_API void writeRecordedList(std::ostream& stream,
                                               const RecordedLibraries& libraries);
 
 /// Writes a list to a file, atomically: readers see the complete old file or the complete new one,
-/// even if several processes write it at once. A file that already has this content is not replaced.
-/// \throws QrStreamEx::ExWriteOpen, QrStreamEx::ExWriteError with the file's name, if the file
+/// even if several processes write it at once. A file that already has this content is not
+/// replaced. \throws QrStreamEx::ExWriteOpen, QrStreamEx::ExWriteError with the file's name, if the
+/// file
 ///     cannot be written; an old file is then unchanged
 MZ_COMPONENT_TOOLS_API void writeRecordedList(const std::filesystem::path& file,
                                               const RecordedLibraries& libraries);

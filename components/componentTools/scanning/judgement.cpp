@@ -22,7 +22,7 @@ namespace Mz::Tools {
 
 namespace {
 
-/// FNV-1a with 64 bits. It need not withstand an attack: whoever may write the digest may write the
+/// FNV-1a with 64 bits. It need not withstand an attack: who can write the digest can write the
 /// list as well.
 class Digest {
   public:

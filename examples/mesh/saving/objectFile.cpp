@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Puts a stream on an object IO on a buffer, as docs/savedObjects.md explains. A text file ends with a
-/// line end, for people and their tools. Loading checks that nothing follows the object, because a
-/// longer file is not one that was saved here.
+/// Puts a stream on an object IO on a buffer, as docs/savedObjects.md explains. A text file ends
+/// with a line end, for people and their tools. Loading checks that nothing follows the object,
+/// because a longer file is not one that was saved here.
 #include "objectFile.h"
 
 #include "components/componentManager/binaryStream.h"
