@@ -66,7 +66,7 @@ struct Options {
 
 Options optionsOf(int argc, char** argv) {
     Options options;
-    options.forLibrary = {argv[0], "--benchmark_repetitions=25",
+    options.forLibrary = {argv[0], "--benchmark_repetitions=15",
                           "--benchmark_enable_random_interleaving=true",
                           "--benchmark_min_time=0.04"};
     for (int index = 1; index < argc; ++index) {
