@@ -3,6 +3,7 @@
 
 #include "components/componentManager/utf8.h"
 
+#include <chrono>
 #include <clocale>
 #include <fstream>
 #include <map>
@@ -208,9 +209,12 @@ TEST_F(Scan, ComparesAgainAfterTheHostWasReplacedByAFileOfItsSize) {
     add(L"changedInterface");
     TemporaryDirectory hosts;
     const std::filesystem::path host = hosts.path() / "host";
+    auto time = std::filesystem::file_time_type::clock::now();
     const auto putHost = [&](const std::filesystem::path& from) {
         std::filesystem::copy_file(from, host, std::filesystem::copy_options::overwrite_existing);
         std::filesystem::resize_file(host, std::uintmax_t{4} << 20);
+        // Times have whole seconds in the standard library of MinGW.
+        std::filesystem::last_write_time(host, time += std::chrono::seconds(2));
     };
     ScanOptions wanted = options();
     wanted.hosts = {host};
