@@ -5,8 +5,8 @@
 /// digest is the same. A list that a host has written meanwhile has another digest: a host does not
 /// compare.
 ///
-/// The files of a host are known by path, size and the system's exact time, those of libraries by
-/// what the list has of them.
+/// The files of a host are known by path, size and time (MinGW: in whole seconds), those of
+/// libraries by what the list has of them.
 #include "components/componentTools/scanning/judgement.h"
 
 #include "components/componentTools/inspecting/abiDifference.h"
