@@ -6,7 +6,7 @@
 ///
 /// The process of a guarded import may not open files for writing. So before a process gives up its
 /// rights it starts a broker, a second process that keeps them, which opens the files of counters
-/// for it and passes the descriptors through a socket. The broker is in a session of its own and
+/// for it and passes the descriptors through a socket. The broker leaves the process group and
 /// ends with the socket. The host kills such a process as soon as it has the answer; here it leaves
 /// it a moment to write.
 #include <csignal>
@@ -35,7 +35,7 @@ void call(void* module, const char* name) {
 }
 
 int writeCountersOf(dl_phdr_info* info, std::size_t, void*) {
-    // The name of the program is empty, for which null stands.
+    // The program has an empty name here, and is null for dlopen.
     const char* const file = *info->dlpi_name ? info->dlpi_name : nullptr;
     if (void* const module = ::dlopen(file, RTLD_LAZY | RTLD_NOLOAD)) {
         call(module, "__gcov_dump");
@@ -106,7 +106,7 @@ int receiveDescriptor(int socket) {
 
 [[noreturn]] void serve(int socket) {
     ::setsid();
-    // Whoever reads what the process writes must not wait for the broker.
+    // The reader of a pipe of the process must not wait for the broker.
     if (socket > 0)
         ::syscall(SYS_close_range, 0, socket - 1, 0);
     ::syscall(SYS_close_range, socket + 1, ~0U, 0);
