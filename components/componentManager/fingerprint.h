@@ -31,6 +31,7 @@
 #include <cstddef>
 #include <cstdint>
 #include <type_traits>
+#include <utility>
 
 /// Defines the fingerprint of `interface`: `MZ_INTERFACE(interface, operations...)`.
 ///
@@ -189,36 +190,51 @@ struct NoFunction {
     std::int64_t function = 0, adjustment = 0;
 };
 
-/// Entries, one after the other, without padding.
-template <class First, class... Rest>
-struct TableEntries {
-    First first;
-    TableEntries<Rest...> rest;
-
-    static constexpr std::uint32_t count = First::count + TableEntries<Rest...>::count;
-};
-template <class Last>
-struct TableEntries<Last> {
-    Last first;
-
-    static constexpr std::uint32_t count = Last::count;
+/// One of several entries; the index makes each a base of its own.
+template <std::size_t index, class Entry>
+struct IndexedEntry {
+    Entry entry;
 };
 
-template <class First, class... Rest>
-constexpr TableEntries<First, Rest...> entriesOf(const First& first, const Rest&... rest) {
-    if constexpr (sizeof...(Rest) == 0)
-        return {first};
-    else
-        return {first, entriesOf(rest...)};
+/// Entries, one after the other, without padding. Bases, because they are made without templates
+/// within templates, which would cost the compiler the square of their number.
+template <class Indices, class... Entries>
+struct IndexedEntries;
+template <std::size_t... indices, class... Entries>
+struct IndexedEntries<std::index_sequence<indices...>, Entries...>
+    : IndexedEntry<indices, Entries>... {
+    static constexpr std::uint32_t count = (0 + ... + Entries::count);
+};
+template <class... Entries>
+using TableEntries = IndexedEntries<std::index_sequence_for<Entries...>, Entries...>;
+
+template <class... Entries>
+constexpr TableEntries<Entries...> entriesOf(const Entries&... entries) {
+    return {{entries}...};
 }
 
-template <class Function, std::size_t length>
-constexpr auto entryOf(InterfaceEntryKind kind, Function function, const Text<length>& text) {
+/// Returns an entry with place for a text of `length` characters and the final NUL.
+template <std::size_t length, class Function>
+constexpr auto entryFor(InterfaceEntryKind kind, Function function) {
     using Entry = TableEntry<Function, length / 8 * 8 + 8>;
     static_assert(sizeof(Entry) == sizeof(InterfaceEntry) + sizeof(Entry::text));
-    Entry entry{kind, 0, sizeof(Entry), 0, 0, function, {}};
-    for (std::size_t index = 0; index < length; ++index)
-        entry.text[index] = text.characters[index];
+    return Entry{kind, 0, sizeof(Entry), 0, 0, function, {}};
+}
+
+/// The number of characters in the text of `T`.
+template <class T>
+inline constexpr std::size_t typeTextLength = [] {
+    TextTarget measured;
+    TypeText<T>::put(measured);
+    return measured.length();
+}();
+
+/// Returns an entry with the text of `T`.
+template <class T, class Function>
+constexpr auto typeEntry(InterfaceEntryKind kind, Function function) {
+    auto entry = entryFor<typeTextLength<T>>(kind, function);
+    TextTarget text(entry.text);
+    TypeText<T>::put(text);
     return entry;
 }
 
@@ -237,7 +253,7 @@ constexpr bool isTrivialInCalls =
 
 template <class T>
 constexpr auto valueEntry() {
-    auto entry = entryOf(InterfaceEntryKind::value, NoFunction{}, typeText<T>());
+    auto entry = typeEntry<T>(InterfaceEntryKind::value, NoFunction{});
     if constexpr (Complete<T>) {
         entry.valueSize = sizeof(T);
         entry.alignment = alignof(T);
@@ -272,15 +288,21 @@ struct ValueEntries<First, Rest...> {
 template <class Pointer, std::size_t size>
 constexpr auto operationEntries(const char (&name)[size], Pointer pointer) {
     using Parts = FunctionParts<FunctionOf<Pointer>>;
-    const auto entry =
-        entryOf(InterfaceEntryKind::operation, pointer, Parts::declaration(Text(" ") + name));
+    // The name stands behind the result, after a space; `size` counts its NUL instead.
+    auto entry = entryFor<typeTextLength<FunctionOf<Pointer>> + size>(InterfaceEntryKind::operation,
+                                                                      pointer);
+    TextTarget text(entry.text);
+    Parts::putResult(text);
+    text.put(" ");
+    text.put(name);
+    Parts::putParameters(text);
     return Parts::template Values<ValueEntries>::after(entry);
 }
 
 /// The entry of a base.
 template <class Base>
 constexpr auto baseEntry() {
-    auto entry = entryOf(InterfaceEntryKind::base, &EndOf<Base>::mzEnd, typeText<Base>());
+    auto entry = typeEntry<Base>(InterfaceEntryKind::base, &EndOf<Base>::mzEnd);
     entry.valueSize = sizeof(Base);
     entry.alignment = alignof(Base);
     entry.flags = std::has_virtual_destructor_v<Base> ? baseHasVirtualDestructor : std::uint16_t{0};
@@ -303,9 +325,10 @@ inline constexpr std::uint16_t compilerFlag = 0;
 template <class Interface, std::size_t size, class... Items>
 constexpr auto interfaceTable(const char (&name)[size], std::uint16_t properties,
                               const Items&... items) {
-    const auto entries =
-        entriesOf(entryOf(InterfaceEntryKind::name, NoFunction{}, Text(name)),
-                  entryOf(InterfaceEntryKind::end, &EndOf<Interface>::mzEnd, Text<0>()), items...);
+    auto nameEntry = entryFor<size - 1>(InterfaceEntryKind::name, NoFunction{});
+    TextTarget(nameEntry.text).put(name);
+    const auto entries = entriesOf(
+        nameEntry, entryFor<0>(InterfaceEntryKind::end, &EndOf<Interface>::mzEnd), items...);
     using Table = InterfaceTable<std::remove_cv_t<decltype(entries)>>;
     const auto flags = static_cast<std::uint16_t>(properties | compilerFlag);
     return Table{{"MZiface", 1, flags, sizeof(Table), Interface::uid, sizeof(Interface),

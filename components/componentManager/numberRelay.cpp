@@ -77,4 +77,9 @@ QrBufferedIO& NumberPath::input() const {
     return source ? *source : io;
 }
 
+void NumberPath::noteRead(int bytes) const {
+    if (functions.noteRead)
+        functions.noteRead(io, bytes);
+}
+
 } // namespace Mz

@@ -40,6 +40,9 @@ class MZ_COMPONENT_MANAGER_API QrNumberRelay {
         /// Called before a number is read. Returns the IO that supplies it, or null if the object
         /// must be asked. The stream may ask the object afterwards, also if the result is not null.
         QrBufferedIO* (*input)(QrBufferedIO& io) = nullptr;
+        /// Called after a number was read from that IO, with the number of bytes that were taken
+        /// from it. Not called if the stream asked the object instead.
+        void (*noteRead)(QrBufferedIO& io, int bytes) = nullptr;
     };
 
     /// Declares the class. A function that is null is one that returns null.

@@ -8,39 +8,36 @@
 /// \since 0.2
 #pragma once
 
+#include <array>
 #include <cstddef>
 #include <string>
 #include <string_view>
 
 namespace Mz::detail {
 
-/// A text with its length in its type, so that it can be a member of a constant.
-template <std::size_t length>
-struct Text {
-    char characters[length + 1]{};
+/// Where a text is written. Without a target it is only measured, which is cheap for the compiler:
+/// its time grows with the number of characters that it copies.
+class TextTarget {
+  public:
+    TextTarget() = default;
+    constexpr explicit TextTarget(char* target) : target(target) {}
 
-    constexpr Text() = default;
-    constexpr explicit(false) Text(const char (&literal)[length + 1]) {
-        for (std::size_t index = 0; index < length; ++index)
-            characters[index] = literal[index];
-    }
-
-    template <std::size_t other>
-    constexpr auto operator+(const Text<other>& next) const {
-        Text<length + other> result;
-        for (std::size_t index = 0; index < length; ++index)
-            result.characters[index] = characters[index];
-        for (std::size_t index = 0; index < other; ++index)
-            result.characters[length + index] = next.characters[index];
-        return result;
-    }
     template <std::size_t size>
-    constexpr auto operator+(const char (&literal)[size]) const {
-        return *this + Text<size - 1>(literal);
+    constexpr void put(const char (&literal)[size]) {
+        put(literal, size - 1);
     }
+    constexpr void put(const char* text, std::size_t length) {
+        if (target)
+            for (std::size_t index = 0; index < length; ++index)
+                target[written + index] = text[index];
+        written += length;
+    }
+    constexpr std::size_t length() const { return written; }
+
+  private:
+    char* target = nullptr;
+    std::size_t written = 0;
 };
-template <std::size_t size>
-Text(const char (&)[size]) -> Text<size - 1>;
 
 /// The function name that the compiler makes for this instance, which contains the name of `T`.
 template <class T>
@@ -48,11 +45,15 @@ constexpr const char* functionNameWith() {
     return __PRETTY_FUNCTION__;
 }
 
+/// The number of characters before the type in `functionNameWith`, the same for all types.
+inline constexpr std::size_t lengthBeforeType =
+    std::string_view(functionNameWith<int>()).find("T = ") + 4;
+
 /// Returns the compiler's name of `T`.
 template <class T>
 constexpr std::string_view compilerName() {
     std::string_view name = functionNameWith<T>();
-    name.remove_prefix(name.find("T = ") + 4);
+    name.remove_prefix(lengthBeforeType);
     name.remove_suffix(1); // ']'
     return name;
 }
@@ -70,100 +71,81 @@ constexpr std::string_view withoutArguments(std::string_view name) {
     return name;
 }
 
-/// Copies a compiler's name in the form that all compilers share, and returns its length. Replaces
-/// template arguments by "...", because compilers print values differently, and removes the inline
-/// namespace of the standard library.
-/// \param target  may be null
-constexpr std::size_t copyName(std::string_view name, char* target) {
+/// Writes a compiler's name in the form that all compilers share: replaces template arguments by
+/// "...", because compilers print values differently, and removes the inline namespace of the
+/// standard library.
+constexpr void putName(TextTarget& out, std::string_view name) {
     struct Replacement {
         std::string_view from, to;
     };
     constexpr Replacement replacements[] = {{"{anonymous}", "(unnamed)"},
                                             {"(anonymous namespace)", "(unnamed)"},
                                             {"std::__cxx11::", "std::"}};
-    std::size_t length = 0, depth = 0;
-    const auto put = [&](std::string_view text) {
-        for (const char character : text) {
-            if (target)
-                target[length] = character;
-            ++length;
-        }
-    };
+    std::size_t depth = 0;
     while (!name.empty()) {
         Replacement next{name.substr(0, 1), name.substr(0, 1)};
         for (const Replacement& known : replacements)
-            if (name.starts_with(known.from))
+            if (name.front() == known.from.front() && name.starts_with(known.from))
                 next = known;
-        depth -= next.from == ">";
+        depth -= next.from.front() == '>';
         if (depth == 0)
-            put(next.to);
-        if (next.from == "<" && depth++ == 0)
-            put("...");
+            out.put(next.to.data(), next.to.size());
+        if (next.from.front() == '<' && depth++ == 0)
+            out.put("...");
         name.remove_prefix(next.from.size());
     }
-    return length;
 }
 
-/// Returns the name of a class or an enumeration, without the arguments of its template if
-/// `isTemplate`.
+/// The name of a class or an enumeration, without the arguments of its template if `isTemplate`.
+/// Made once for each type.
 template <class T, bool isTemplate = false>
-constexpr auto nameText() {
-    constexpr std::string_view name =
+struct ClassName {
+    static constexpr std::string_view name =
         isTemplate ? withoutArguments(compilerName<T>()) : compilerName<T>();
-    Text<copyName(name, nullptr)> result;
-    copyName(name, result.characters);
-    return result;
-}
+    static constexpr std::size_t length = [] {
+        TextTarget measured;
+        putName(measured, name);
+        return measured.length();
+    }();
+    static constexpr auto text = [] {
+        std::array<char, length> characters{};
+        TextTarget out(characters.data());
+        putName(out, name);
+        return characters;
+    }();
 
-/// Returns the texts of the types, separated by ", ".
-template <class... Types>
-constexpr auto typeTexts();
+    static constexpr void put(TextTarget& out) { out.put(text.data(), length); }
+};
 
 /// The text of a type, for which no specialisation below is made: a class or an enumeration.
 template <class T>
-struct TypeText {
-    static constexpr auto make() { return nameText<T>(); }
+struct TypeText : ClassName<T> {};
+
+/// The texts of the types, separated by ", ".
+template <class... Types>
+struct TypeList {
+    static constexpr void put(TextTarget&) {}
+};
+template <class First, class... Rest>
+struct TypeList<First, Rest...> {
+    static constexpr void put(TextTarget& out) {
+        TypeText<First>::put(out);
+        (..., (out.put(", "), TypeText<Rest>::put(out)));
+    }
 };
 
-template <class T>
-constexpr auto typeText() {
-    return TypeText<T>::make();
-}
-
-template <class First, class... Rest>
-constexpr auto joinedTexts() {
-    if constexpr (sizeof...(Rest) == 0)
-        return typeText<First>();
-    else
-        return typeText<First>() + ", " + joinedTexts<Rest...>();
-}
-
-template <class... Types>
-constexpr auto typeTexts() {
-    if constexpr (sizeof...(Types) == 0)
-        return Text<0>();
-    else
-        return joinedTexts<Types...>();
-}
-
-template <std::size_t number>
-constexpr auto numberText() {
-    constexpr auto digit = [] {
-        Text<1> text;
-        text.characters[0] = static_cast<char>('0' + number % 10);
-        return text;
-    }();
-    if constexpr (number < 10)
-        return digit;
-    else
-        return numberText<number / 10>() + digit;
+constexpr void putNumber(TextTarget& out, std::size_t number) {
+    if (number >= 10)
+        putNumber(out, number / 10);
+    const char digit = static_cast<char>('0' + number % 10);
+    out.put(&digit, 1);
 }
 
 /// The types whose text is their name here.
 #define MZ_DETAIL_TYPE_TEXT(type)                                                                  \
     template <>                                                                                    \
     struct TypeText<type> {                                                                        \
-        static constexpr auto make() { return Text(#type); }                                       \
+        static constexpr void put(TextTarget& out) { out.put(#type); }                             \
     };
 MZ_DETAIL_TYPE_TEXT(void)
 MZ_DETAIL_TYPE_TEXT(bool)
@@ -194,72 +176,127 @@ MZ_DETAIL_TYPE_TEXT(std::wstring_view)
 
 template <class T>
 struct TypeText<const T> {
-    static constexpr auto make() { return Text("const ") + typeText<T>(); }
+    static constexpr void put(TextTarget& out) {
+        out.put("const ");
+        TypeText<T>::put(out);
+    }
 };
 template <class T>
 struct TypeText<volatile T> {
-    static constexpr auto make() { return Text("volatile ") + typeText<T>(); }
+    static constexpr void put(TextTarget& out) {
+        out.put("volatile ");
+        TypeText<T>::put(out);
+    }
 };
 template <class T>
 struct TypeText<const volatile T> {
-    static constexpr auto make() { return Text("const volatile ") + typeText<T>(); }
+    static constexpr void put(TextTarget& out) {
+        out.put("const volatile ");
+        TypeText<T>::put(out);
+    }
 };
 template <class T>
 struct TypeText<T*> {
-    static constexpr auto make() { return typeText<T>() + "*"; }
+    static constexpr void put(TextTarget& out) {
+        TypeText<T>::put(out);
+        out.put("*");
+    }
 };
 template <class T>
 struct TypeText<T* const> {
-    static constexpr auto make() { return typeText<T>() + "* const"; }
+    static constexpr void put(TextTarget& out) {
+        TypeText<T>::put(out);
+        out.put("* const");
+    }
 };
 template <class T>
 struct TypeText<T* volatile> {
-    static constexpr auto make() { return typeText<T>() + "* volatile"; }
+    static constexpr void put(TextTarget& out) {
+        TypeText<T>::put(out);
+        out.put("* volatile");
+    }
 };
 template <class T>
 struct TypeText<T* const volatile> {
-    static constexpr auto make() { return typeText<T>() + "* const volatile"; }
+    static constexpr void put(TextTarget& out) {
+        TypeText<T>::put(out);
+        out.put("* const volatile");
+    }
 };
 template <class T>
 struct TypeText<T&> {
-    static constexpr auto make() { return typeText<T>() + "&"; }
+    static constexpr void put(TextTarget& out) {
+        TypeText<T>::put(out);
+        out.put("&");
+    }
 };
 template <class T>
 struct TypeText<T&&> {
-    static constexpr auto make() { return typeText<T>() + "&&"; }
+    static constexpr void put(TextTarget& out) {
+        TypeText<T>::put(out);
+        out.put("&&");
+    }
 };
 template <class T>
 struct TypeText<T[]> {
-    static constexpr auto make() { return typeText<T>() + "[]"; }
+    static constexpr void put(TextTarget& out) {
+        TypeText<T>::put(out);
+        out.put("[]");
+    }
 };
 template <class T, std::size_t count>
 struct TypeText<T[count]> {
-    static constexpr auto make() { return typeText<T>() + "[" + numberText<count>() + "]"; }
+    static constexpr void put(TextTarget& out) {
+        TypeText<T>::put(out);
+        out.put("[");
+        putNumber(out, count);
+        out.put("]");
+    }
 };
 // An array of constants is constant, too: without these it would match two of the above.
 template <class T>
 struct TypeText<const T[]> {
-    static constexpr auto make() { return typeText<const T>() + "[]"; }
+    static constexpr void put(TextTarget& out) {
+        TypeText<const T>::put(out);
+        out.put("[]");
+    }
 };
 template <class T, std::size_t count>
 struct TypeText<const T[count]> {
-    static constexpr auto make() { return typeText<const T>() + "[" + numberText<count>() + "]"; }
+    static constexpr void put(TextTarget& out) {
+        TypeText<const T>::put(out);
+        out.put("[");
+        putNumber(out, count);
+        out.put("]");
+    }
 };
 template <class Function, class Class>
 struct TypeText<Function Class::*> {
-    static constexpr auto make() { return typeText<Function>() + " " + typeText<Class>() + "::*"; }
+    static constexpr void put(TextTarget& out) {
+        TypeText<Function>::put(out);
+        out.put(" ");
+        TypeText<Class>::put(out);
+        out.put("::*");
+    }
 };
 template <template <class...> class Template, class... Arguments>
 struct TypeText<Template<Arguments...>> {
-    static constexpr auto make() {
-        return nameText<Template<Arguments...>, true>() + "<" + typeTexts<Arguments...>() + ">";
+    static constexpr void put(TextTarget& out) {
+        ClassName<Template<Arguments...>, true>::put(out);
+        out.put("<");
+        TypeList<Arguments...>::put(out);
+        out.put(">");
     }
 };
 template <template <class, std::size_t> class Template, class T, std::size_t number>
 struct TypeText<Template<T, number>> {
-    static constexpr auto make() {
-        return nameText<Template<T, number>, true>() + "<" + typeText<T>() + ", " +
-               numberText<number>() + ">";
+    static constexpr void put(TextTarget& out) {
+        ClassName<Template<T, number>, true>::put(out);
+        out.put("<");
+        TypeText<T>::put(out);
+        out.put(", ");
+        putNumber(out, number);
+        out.put(">");
     }
 };
 
@@ -276,33 +313,34 @@ struct FunctionParts;
     MZ_DETAIL_REFERENCES(macro, volatile)                                                          \
     MZ_DETAIL_REFERENCES(macro, const volatile)
 
-/// A function with these qualifiers. `with` calls `Visitor::visit` with its result and its
-/// parameters as template arguments.
+/// A function with these qualifiers. `Values` lists its result and its parameters.
 #define MZ_DETAIL_FUNCTION(qualifiers)                                                             \
     template <class Result, class... Parameters>                                                   \
     struct FunctionParts<Result(Parameters...) qualifiers> {                                       \
-        template <class Name>                                                                      \
-        static constexpr auto declaration(Name name) {                                             \
-            return typeText<Result>() + name + "(" + typeTexts<Parameters...>() + ")" +            \
-                   qualifierText(Text(#qualifiers));                                               \
+        static constexpr void putResult(TextTarget& out) { TypeText<Result>::put(out); }           \
+        static constexpr void putParameters(TextTarget& out) {                                     \
+            out.put("(");                                                                          \
+            TypeList<Parameters...>::put(out);                                                     \
+            out.put(")");                                                                          \
+            putQualifiers(out, #qualifiers);                                                       \
         }                                                                                          \
         template <template <class...> class List>                                                  \
         using Values = List<Result, Parameters...>;                                                \
     };                                                                                             \
     template <class Result, class... Parameters>                                                   \
     struct TypeText<Result(Parameters...) qualifiers> {                                            \
-        static constexpr auto make() {                                                             \
-            return FunctionParts<Result(Parameters...) qualifiers>::declaration(Text<0>());        \
+        static constexpr void put(TextTarget& out) {                                               \
+            FunctionParts<Result(Parameters...) qualifiers>::putResult(out);                       \
+            FunctionParts<Result(Parameters...) qualifiers>::putParameters(out);                   \
         }                                                                                          \
     };
 
-/// Returns the qualifiers with a space before them, if there are any.
-template <std::size_t length>
-constexpr auto qualifierText(const Text<length>& qualifiers) {
-    if constexpr (length == 0)
-        return qualifiers;
-    else
-        return Text(" ") + qualifiers;
+/// Writes the qualifiers with a space before them, if there are any.
+template <std::size_t size>
+constexpr void putQualifiers(TextTarget& out, const char (&qualifiers)[size]) {
+    if constexpr (size > 1)
+        out.put(" ");
+    out.put(qualifiers);
 }
 
 MZ_DETAIL_QUALIFIERS(MZ_DETAIL_FUNCTION)

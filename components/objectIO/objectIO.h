@@ -170,6 +170,9 @@ class MZ_OBJECT_IO_API QrObjectOutBuffer
 /// Not counted: the caller keeps it alive as long as the stream on it. Owns a reference to every
 /// object that it has read, until it is destroyed. It releases them in the reverse of the order in
 /// which they were complete.
+///
+/// While an object is read, nothing but this IO may read from the inner one: the positions in the
+/// reasons of exceptions are counted from the beginning of the outermost object.
 class MZ_OBJECT_IO_API QrObjectInBuffer
     : public QrCastImpl<QrObjectInBuffer, QrForwardingIO, const QrObjectInBuffer&> {
   public:
@@ -205,14 +208,19 @@ class MZ_OBJECT_IO_API QrObjectInBuffer
     ///         empty, or a `bool` in text form that is neither 0 nor 1
     int readChar(wchar_t* buf, int size, int count) override;
     int readChar(wchar_t& c) override;
-    using QrForwardingIO::readChar;
+    int readChar(char* buf, int size, int count) override;
+    int readChar(char& c) override;
 
     /// Reads bytes. On a stream of both forms, skips the line end between text and the bytes.
     ///
     /// \throws QrStreamEx::ExReadError if the line end is missing, or on a text stream, where only
     ///         an array of `wchar_t` is read as bytes and its written form is text
     int read(void* data, int size) override;
-    using QrForwardingIO::read;
+    int read() override;
+    void skipWhiteSpace(int count) override;
+    void ungetc(wchar_t c) override;
+    void ungetc(char c) override;
+    int64 seek(int64 offset, int origin) override;
 
   private:
     friend struct ObjectInputRelay;

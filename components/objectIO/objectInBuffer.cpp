@@ -18,6 +18,7 @@
 #include <string>
 #include <string_view>
 #include <typeinfo>
+#include <utility>
 
 namespace Mz {
 
@@ -49,6 +50,41 @@ int readTextBool(QrBufferedIO& io, wchar_t* digit) {
     return got;
 }
 
+/// The position of an IO, for messages. Asking the IO may cost a call of the system, so what is
+/// read is counted from its last answer, until something is read that is not counted.
+class Place {
+  public:
+    int64 of(const QrBufferedIO& io) {
+        if (!known) {
+            position = io.tell();
+            known = true;
+        }
+        return position;
+    }
+
+    /// Something is read that is not counted.
+    void forget() { known = false; }
+
+    void advance(int bytes) {
+        if (position >= 0 && bytes > 0)
+            position += bytes;
+    }
+
+    /// Counts what `read` returns. Forgets the position if it throws.
+    template <class Read>
+    int advanceBy(const Read& read) {
+        const bool wasKnown = std::exchange(known, false);
+        const int bytes = read();
+        known = wasKnown;
+        advance(bytes);
+        return bytes;
+    }
+
+  private:
+    int64 position = -1;
+    bool known = false;
+};
+
 } // namespace
 
 struct QrObjectInBuffer::State {
@@ -56,6 +92,7 @@ struct QrObjectInBuffer::State {
     using Objects = ObjectTable<QrRef<QrCastable>>;
     Objects objects;
     int depth = 0;
+    Place place;                      ///< where the inner IO is
     const QrStream* stream = nullptr; ///< the stream that reads an object; null outside objects
     ObjectForm form = ObjectForm::Binary;
     bool readText = false; ///< whether the last read was of text
@@ -88,16 +125,16 @@ struct QrObjectInBuffer::State {
     /// the mark.
     void expectMark(QrStream& s, std::uint32_t number, const QrBufferedIO& io,
                     std::optional<int64> position = {}) {
-        // Positions cost a call of the system, so that of a binary mark, which has a fixed size, is
-        // determined after it.
+        // The position of a binary mark, which has a fixed size, is determined after it: it may
+        // have to be asked for, and rarely is.
         if (form != ObjectForm::Binary && !position)
-            position = io.tell();
+            position = place.of(io);
         std::uint32_t mark = 0;
         s >> mark;
         if (mark == ObjectRecord::endMark(number))
             return;
         if (!position) {
-            const int64 end = io.tell();
+            const int64 end = place.of(io);
             position = end < 0 ? end : end - int64{sizeof mark};
         }
         fail(__LINE__, *position, "the object should end here and does not");
@@ -111,7 +148,9 @@ QrObjectInBuffer::~QrObjectInBuffer() = default;
 
 QrRef<QrCastable> QrObjectInBuffer::readObject(QrStream& s, const QrUid* id, const wchar_t*,
                                                const wchar_t*) {
-    const int64 position = inner().tell();
+    if (state->depth == 0)
+        state->place.forget(); // Between objects the program may use the inner IO by itself.
+    const int64 position = state->place.of(inner());
     if (state->failed)
         state->fail(__LINE__, position, "an earlier object failed");
     // The object counts as failed until it is complete.
@@ -205,6 +244,7 @@ int QrObjectInBuffer::readChar(wchar_t* buf, int size, int count) {
     const bool isText = state->form == ObjectForm::Text;
     const QrStream::TextKind kind = state->textKind();
     state->readText = kind != QrStream::TextKind::Other;
+    state->place.forget();
     if (count == noLimit && (isText || kind == QrStream::TextKind::String))
         return readTextString(inner(), buf, size, count);
     if (count == 1 && size == 1 &&
@@ -219,7 +259,38 @@ int QrObjectInBuffer::readChar(wchar_t* buf, int size, int count) {
 
 int QrObjectInBuffer::readChar(wchar_t& c) {
     state->readText = state->textKind() != QrStream::TextKind::Other;
+    state->place.forget();
     return inner().readChar(c);
+}
+
+int QrObjectInBuffer::readChar(char* buf, int size, int count) {
+    state->place.forget();
+    return inner().readChar(buf, size, count);
+}
+
+int QrObjectInBuffer::readChar(char& c) {
+    state->place.forget();
+    return inner().readChar(c);
+}
+
+void QrObjectInBuffer::skipWhiteSpace(int count) {
+    state->place.forget();
+    inner().skipWhiteSpace(count);
+}
+
+void QrObjectInBuffer::ungetc(wchar_t c) {
+    state->place.forget();
+    inner().ungetc(c);
+}
+
+void QrObjectInBuffer::ungetc(char c) {
+    state->place.forget();
+    inner().ungetc(c);
+}
+
+int64 QrObjectInBuffer::seek(int64 offset, int origin) {
+    state->place.forget();
+    return inner().seek(offset, origin);
 }
 
 int QrObjectInBuffer::read(void* data, int size) {
@@ -227,12 +298,21 @@ int QrObjectInBuffer::read(void* data, int size) {
         throw QrStreamEx::ExReadError(source, __LINE__,
                                       "a text stream cannot carry arrays of characters");
     if (state->form == ObjectForm::Mixed && size > 0 && state->readText) {
-        if (inner().read() != '\n')
+        if (read() != '\n')
             throw QrStreamEx::ExReadError(source, __LINE__,
                                           "binary data after text begins on a new line");
         state->readText = false;
     }
-    return inner().read(data, size);
+    return state->place.advanceBy([&] { return inner().read(data, size); });
+}
+
+int QrObjectInBuffer::read() {
+    int byte = -1;
+    state->place.advanceBy([&] {
+        byte = inner().read();
+        return byte < 0 ? 0 : 1;
+    });
+    return byte;
 }
 
 /// What `readChar` does for each character of a number.
@@ -243,11 +323,16 @@ struct ObjectInputRelay {
         state.readText = state.textKind() != QrStream::TextKind::Other;
         return &objects.inner();
     }
+
+    static void noteRead(QrBufferedIO& io, int bytes) {
+        static_cast<QrObjectInBuffer&>(io).state->place.advance(bytes);
+    }
 };
 
 namespace {
 
-const QrNumberRelay relay(typeid(QrObjectInBuffer), {nullptr, nullptr, ObjectInputRelay::input});
+const QrNumberRelay relay(typeid(QrObjectInBuffer), {.input = ObjectInputRelay::input,
+                                                     .noteRead = ObjectInputRelay::noteRead});
 
 } // namespace
 

@@ -19,6 +19,8 @@ class NumberPath {
     void noteNumber(char separator) const;
     /// Returns the IO that supplies a number. Must be called before the number is read.
     QrBufferedIO& input() const;
+    /// Must be called after a number was read from `input()`.
+    void noteRead(int bytes) const;
 
   private:
     QrBufferedIO& io;

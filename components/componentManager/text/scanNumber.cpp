@@ -245,24 +245,24 @@ bool store(Target target, const Number& number, std::va_list& arguments) {
 
 } // namespace
 
-bool scanNumber(const ByteSource& source, const wchar_t* format, std::va_list& arguments) {
+int scanNumber(const ByteSource& source, const wchar_t* format, std::va_list& arguments) {
     const Target target = targetOf(format);
     if (target == Target::None)
-        return false;
+        return 0;
     std::string_view window = source.held();
     if (window.empty()) [[unlikely]] {
         if (source.peek() < 0)
-            return false;
+            return 0;
         window = source.held();
     }
     window = window.substr(0, windowSize);
     Number number;
-    const bool scanned =
-        parse(window.data(), window.data() + window.size(), isReal(target), number) &&
-        store(target, number, arguments);
-    if (scanned)
-        source.take(number.end - window.data());
-    return scanned;
+    if (!parse(window.data(), window.data() + window.size(), isReal(target), number) ||
+        !store(target, number, arguments))
+        return 0;
+    const std::ptrdiff_t taken = number.end - window.data();
+    source.take(taken);
+    return static_cast<int>(taken);
 }
 
 } // namespace Mz

@@ -12,10 +12,10 @@ class ByteSource;
 /// Reads a number, as `scanText` does, in one of the formats `%d %u %hd %hu %ld %lu %I64d %I64u %g
 /// %lg`. `source` must be free.
 ///
-/// \return true if the number was stored. False if the format is another one, or the number is
-///         unusual or not complete in the buffer with an ASCII character after it. The input and
-///         the arguments are then unchanged.
+/// \return the number of bytes taken from the source if the number was stored. 0 if the format is
+///         another one, or the number is unusual or not complete in the buffer with an ASCII
+///         character after it. The input and the arguments are then unchanged.
 /// \throws QrStreamEx::ExReadError if the medium fails
-bool scanNumber(const ByteSource& source, const wchar_t* format, std::va_list& arguments);
+int scanNumber(const ByteSource& source, const wchar_t* format, std::va_list& arguments);
 
 } // namespace Mz

@@ -543,13 +543,16 @@ int scanText(QrBufferedIO& io, const wchar_t* format, std::va_list& arguments) {
     if (!*format)
         return 0;
     if (const ByteSource source(io); source.isFree()) {
-        if (scanNumber(source, format, arguments))
+        if (scanNumber(source, format, arguments) > 0)
             return 1;
         return Scanner(DirectInput(source), arguments).scan(format);
     }
-    if (const ByteSource source(NumberPath(io).input());
-        source.isFree() && scanNumber(source, format, arguments))
-        return 1;
+    const NumberPath path(io);
+    if (const ByteSource source(path.input()); source.isFree())
+        if (const int taken = scanNumber(source, format, arguments); taken > 0) {
+            path.noteRead(taken);
+            return 1;
+        }
     const NumericLocale bracket(io);
     return Scanner(LookaheadInput(io), arguments).scan(format);
 }
