@@ -20,7 +20,7 @@ namespace Mz::detail {
 class TextTarget {
   public:
     TextTarget() = default;
-    constexpr explicit TextTarget(char* target) : target(target) {}
+    constexpr explicit TextTarget(char* characters) : target(characters) {}
 
     template <std::size_t size>
     constexpr void put(const char (&literal)[size]) {

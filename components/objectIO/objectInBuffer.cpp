@@ -13,6 +13,7 @@
 
 #include <algorithm>
 #include <cstdint>
+#include <iterator>
 #include <memory>
 #include <optional>
 #include <string>
@@ -39,6 +40,27 @@ int readTextString(QrBufferedIO& io, wchar_t* buf, int size, int count) {
                                       "a text stream cannot carry strings exactly");
     io.skipWhiteSpace(1); // The separator after its length.
     return io.readChar(buf, size, count);
+}
+
+/// The class of an object, as it is stored.
+struct StoredClass {
+    QrUid uid{};
+    std::uint32_t version = 0;
+};
+
+/// In binary form all numbers are read at once.
+StoredClass readClass(QrStream& s) {
+    StoredClass stored;
+    if (formOf(s) != ObjectForm::Binary) {
+        s >> stored.uid >> stored.version;
+        return stored;
+    }
+    std::uint32_t words[5];
+    if (s.read(words[0], std::size(words)) < static_cast<int>(std::size(words)))
+        throw QrStreamEx::ExReadError(source, __LINE__);
+    stored.uid = {words[0], words[1], words[2], words[3]};
+    stored.version = words[4];
+    return stored;
 }
 
 int readTextBool(QrBufferedIO& io, wchar_t* digit) {
@@ -209,9 +231,7 @@ QrRef<QrCastable> QrObjectInBuffer::readRecord(QrStream& s, int64 position) {
 
 QrRef<QrCastable> QrObjectInBuffer::readNewObject(QrStream& s, std::uint32_t number,
                                                   int64 position) {
-    QrUid classUid{};
-    std::uint32_t version = 0;
-    s >> classUid >> version;
+    const auto [classUid, version] = readClass(s);
     // Keeps the object alive while its code runs, whatever the code does with other references.
     const QrRef<QrCastable> object = QrGetComponentManager()->createObject(classUid);
     const QrPtr<QrPersistant> persistant = queryCast<QrPersistant>(object.get());

@@ -6,6 +6,7 @@
 #include "components/componentManager/buffers/standardBuffer.h"
 
 #include <cstddef>
+#include <cstring>
 #include <string_view>
 
 namespace Mz {
@@ -99,6 +100,8 @@ class ByteSource {
     int read(char* data, int size) const {
         if (!buffer)
             return readGuarded(data, size);
+        if (isFree() && takeHeld(data, size))
+            return size;
         std::streamsize got = 0;
         directly(*in, [&] {
             got = buffer->sgetn(data, size);
@@ -114,6 +117,16 @@ class ByteSource {
 
   private:
     static constexpr int end = std::streambuf::traits_type::eof();
+
+    /// Copies what a free source holds, if that is enough. Saves two virtual calls.
+    bool takeHeld(char* data, int size) const {
+        const std::string_view bytes = held();
+        if (static_cast<std::ptrdiff_t>(bytes.size()) < size)
+            return false;
+        std::memcpy(data, bytes.data(), static_cast<std::size_t>(size));
+        take(size);
+        return true;
+    }
 
     int readGuarded(char* data, int size) const {
         operate(*in, [&] { in->read(data, size); });
