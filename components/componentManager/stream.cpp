@@ -7,18 +7,24 @@
 #include "components/componentManager/stream.h"
 
 #include "components/componentManager/buffers/byteSink.h"
+#include "components/componentManager/buffers/byteSource.h"
 #include "components/componentManager/buffers/numberPath.h"
 #include "components/componentManager/text/characterCount.h"
 #include "components/componentManager/text/formatText.h"
 #include "components/componentManager/text/numberText.h"
 #include "components/componentManager/text/numericLocale.h"
+#include "components/componentManager/text/scanNumber.h"
 #include "components/componentManager/text/scanText.h"
+#include "components/componentManager/textStream.h"
 
 #include <algorithm>
+#include <cmath>
 #include <cstdarg>
 #include <cstddef>
 #include <cstdint>
 #include <limits>
+#include <type_traits>
+#include <typeinfo>
 
 namespace Mz {
 
@@ -75,6 +81,26 @@ char takeSeparator(int& column, bool& pending) {
     column = ends ? 0 : column + 1;
     pending = false;
     return ends ? '\n' : ' ';
+}
+
+/// Writes a number to `sink`, after the separator, which `note` receives. Returns false if the sink
+/// is no standard buffer with room for it.
+template <class T, class Note>
+[[gnu::always_inline]] inline bool placeNumber(const ByteSink& sink, T value, int& column,
+                                               bool& separatorPending, const Note& note) {
+    char* const place = sink.room(1 + longestNumberText);
+    if (!place) [[unlikely]]
+        return false;
+    char* const digits = place + (separatorPending ? 1 : 0);
+    char* const end = writeNumberText(digits, value);
+    char separator = '\0';
+    if (separatorPending)
+        *place = separator = takeSeparator(column, separatorPending);
+    note(separator);
+    sink.advance(end - place);
+    column = addCharacters(column, static_cast<int>(end - digits));
+    separatorPending = true;
+    return true;
 }
 
 } // namespace
@@ -206,6 +232,29 @@ QrStream& QrStream::writeFormatted(const wchar_t* format, T value, TextKind kind
     return *this;
 }
 
+/// Writes a number in place, also if an IO passes it on. The words for infinities and NaNs are text
+/// for such an IO.
+template <class T>
+bool QrStream::writeInPlace(T value) {
+    if (placeNumber(ByteSink(io()), value, column, separatorPending, [](char) {})) [[likely]]
+        return true;
+    if constexpr (std::is_floating_point_v<T>)
+        if (!std::isfinite(value))
+            return false;
+    const TextScope scope(currentText, TextKind::Value);
+    const NumberPath path(io());
+    return placeNumber(ByteSink(path.output()), value, column, separatorPending,
+                       [&](char separator) { path.noteNumber(separator); });
+}
+
+/// Only a derived class could observe that `formattedWrite` is not called.
+template <class T>
+QrStream& QrStream::writeTextOf(const wchar_t* format, T value) {
+    if (&typeid(*this) == &typeid(QrTextStream) && writeInPlace(value)) [[likely]]
+        return *this;
+    return writeFormatted(format, value);
+}
+
 template <class T>
 QrStream& QrStream::readFormatted(const wchar_t* format, T& value) {
     if (formattedRead(format, &value) != 1)
@@ -213,16 +262,39 @@ QrStream& QrStream::readFormatted(const wchar_t* format, T& value) {
     return *this;
 }
 
+/// Reads a number from a standard buffer. Returns false if the buffer is another, or the number is
+/// for the general scanner.
+template <class T>
+bool QrStream::readInPlace(T& value) {
+    if (const ByteSource source(io()); source.isFree())
+        return scanNumber(source, value) > 0;
+    const TextScope scope(currentText, TextKind::Formatted);
+    const NumberPath path(io());
+    const ByteSource source(path.input());
+    const int taken = source.isFree() ? scanNumber(source, value) : 0;
+    if (taken > 0)
+        path.noteRead(taken);
+    return taken > 0;
+}
+
+/// Only a derived class could observe that `formattedRead` is not called.
+template <class T>
+QrStream& QrStream::readTextOf(const wchar_t* format, T& value) {
+    if (&typeid(*this) == &typeid(QrTextStream) && readInPlace(value)) [[likely]]
+        return *this;
+    return readFormatted(format, value);
+}
+
 QrStream& QrStream::operator<<(unsigned long long value) {
-    return writeFormatted(L"%I64u", value);
+    return writeTextOf(L"%I64u", value);
 }
 
 QrStream& QrStream::operator<<(int64 value) {
-    return writeFormatted(L"%I64d", value);
+    return writeTextOf(L"%I64d", value);
 }
 
 QrStream& QrStream::operator<<(double value) {
-    return writeFormatted(L"%.16g", value);
+    return writeTextOf(L"%.16g", value);
 }
 
 QrStream& QrStream::operator<<(float value) {
@@ -238,11 +310,11 @@ QrStream& QrStream::operator<<(long value) {
 }
 
 QrStream& QrStream::operator<<(unsigned int value) {
-    return writeFormatted(L"%u", value);
+    return writeTextOf(L"%u", value);
 }
 
 QrStream& QrStream::operator<<(int value) {
-    return writeFormatted(L"%d", value);
+    return writeTextOf(L"%d", value);
 }
 
 QrStream& QrStream::operator<<(unsigned short value) {
@@ -288,19 +360,19 @@ QrStream& QrStream::operator<<(const std::wstring& value) {
 }
 
 QrStream& QrStream::operator>>(unsigned long long& value) {
-    return readFormatted(L"%I64u", value);
+    return readTextOf(L"%I64u", value);
 }
 
 QrStream& QrStream::operator>>(int64& value) {
-    return readFormatted(L"%I64d", value);
+    return readTextOf(L"%I64d", value);
 }
 
 QrStream& QrStream::operator>>(double& value) {
-    return readFormatted(L"%lg", value);
+    return readTextOf(L"%lg", value);
 }
 
 QrStream& QrStream::operator>>(float& value) {
-    return readFormatted(L"%g", value);
+    return readTextOf(L"%g", value);
 }
 
 QrStream& QrStream::operator>>(unsigned long& value) {
@@ -312,11 +384,11 @@ QrStream& QrStream::operator>>(long& value) {
 }
 
 QrStream& QrStream::operator>>(unsigned int& value) {
-    return readFormatted(L"%u", value);
+    return readTextOf(L"%u", value);
 }
 
 QrStream& QrStream::operator>>(int& value) {
-    return readFormatted(L"%d", value);
+    return readTextOf(L"%d", value);
 }
 
 QrStream& QrStream::operator>>(unsigned short& value) {

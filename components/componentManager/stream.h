@@ -261,6 +261,14 @@ class MZ_COMPONENT_MANAGER_API QrStream {
     /// Writes the digits from `begin + 1` to `end`. Puts the separator, if one is due, at `begin`.
     int writeNumber(char* begin, const char* end);
     template <class T>
+    bool writeInPlace(T value);
+    template <class T>
+    bool readInPlace(T& value);
+    template <class T>
+    QrStream& readTextOf(const wchar_t* format, T& value);
+    template <class T>
+    QrStream& writeTextOf(const wchar_t* format, T value);
+    template <class T>
     QrStream& writeFormatted(const wchar_t* format, T value, TextKind kind = TextKind::Value);
     template <class T>
     QrStream& readFormatted(const wchar_t* format, T& value);

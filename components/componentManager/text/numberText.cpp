@@ -239,6 +239,26 @@ bool equals(const wchar_t* text, const wchar_t* other) {
 
 } // namespace
 
+char* writeNumberText(char* text, int value) {
+    return writeInteger(text, value);
+}
+
+char* writeNumberText(char* text, unsigned int value) {
+    return writeInteger(text, value);
+}
+
+char* writeNumberText(char* text, int64 value) {
+    return writeInteger(text, value);
+}
+
+char* writeNumberText(char* text, unsigned long long value) {
+    return writeInteger(text, value);
+}
+
+char* writeNumberText(char* text, double value) {
+    return writeDouble(text, value);
+}
+
 NumberText formatNumber(char*& text, const wchar_t* format, std::va_list& arguments) {
     if (format[0] != L'%')
         return NumberText::None;

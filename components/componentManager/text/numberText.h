@@ -2,6 +2,8 @@
 /// The fast formatter for single numbers in the formats of the streams' operators.
 #pragma once
 
+#include "components/componentManager/uid.h"
+
 #include <cstdarg>
 #include <cstddef>
 
@@ -21,5 +23,13 @@ enum class NumberText {
 /// %.16g`, which are nearly all that streams use, to `text` and moves `text` to its end. `text`
 /// must have room for `longestNumberText` characters; those after the number remain as they are.
 NumberText formatNumber(char*& text, const wchar_t* format, std::va_list& arguments);
+
+/// Writes what `formatNumber` writes for `%d`, `%u`, `%I64d`, `%I64u` and `%.16g`, and returns its
+/// end.
+char* writeNumberText(char* text, int value);
+char* writeNumberText(char* text, unsigned int value);
+char* writeNumberText(char* text, int64 value);
+char* writeNumberText(char* text, unsigned long long value);
+char* writeNumberText(char* text, double value);
 
 } // namespace Mz

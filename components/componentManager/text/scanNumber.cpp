@@ -243,12 +243,9 @@ bool store(Target target, const Number& number, std::va_list& arguments) {
     return true;
 }
 
-} // namespace
-
-int scanNumber(const ByteSource& source, const wchar_t* format, std::va_list& arguments) {
-    const Target target = targetOf(format);
-    if (target == Target::None)
-        return 0;
+/// Parses a number and takes its bytes if `store` accepts it. Returns their count, else 0.
+template <class Store>
+int scanAndStore(const ByteSource& source, bool real, const Store& store) {
     std::string_view window = source.held();
     if (window.empty()) [[unlikely]] {
         if (source.peek() < 0)
@@ -257,12 +254,59 @@ int scanNumber(const ByteSource& source, const wchar_t* format, std::va_list& ar
     }
     window = window.substr(0, windowSize);
     Number number;
-    if (!parse(window.data(), window.data() + window.size(), isReal(target), number) ||
-        !store(target, number, arguments))
+    if (!parse(window.data(), window.data() + window.size(), real, number) || !store(number))
         return 0;
     const std::ptrdiff_t taken = number.end - window.data();
     source.take(taken);
     return static_cast<int>(taken);
+}
+
+template <class Integer>
+int scanInteger(const ByteSource& source, Integer& value) {
+    return scanAndStore(source, false, [&](const Number& number) {
+        value = static_cast<Integer>(number.negative ? 0 - number.digits : number.digits);
+        return true;
+    });
+}
+
+} // namespace
+
+int scanNumber(const ByteSource& source, const wchar_t* format, std::va_list& arguments) {
+    const Target target = targetOf(format);
+    if (target == Target::None)
+        return 0;
+    return scanAndStore(source, isReal(target),
+                        [&](const Number& number) { return store(target, number, arguments); });
+}
+
+int scanNumber(const ByteSource& source, int& value) {
+    return scanInteger(source, value);
+}
+
+int scanNumber(const ByteSource& source, unsigned int& value) {
+    return scanInteger(source, value);
+}
+
+int scanNumber(const ByteSource& source, int64& value) {
+    return scanInteger(source, value);
+}
+
+int scanNumber(const ByteSource& source, unsigned long long& value) {
+    return scanInteger(source, value);
+}
+
+int scanNumber(const ByteSource& source, float& value) {
+    return scanAndStore(source, true, [&](const Number& number) {
+        double exact = 0;
+        if (!valueOf(number, exact))
+            return false;
+        value = static_cast<float>(exact);
+        return true;
+    });
+}
+
+int scanNumber(const ByteSource& source, double& value) {
+    return scanAndStore(source, true, [&](const Number& number) { return valueOf(number, value); });
 }
 
 } // namespace Mz

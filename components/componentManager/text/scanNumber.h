@@ -3,6 +3,8 @@
 /// reading.
 #pragma once
 
+#include "components/componentManager/uid.h"
+
 #include <cstdarg>
 
 namespace Mz {
@@ -17,5 +19,14 @@ class ByteSource;
 ///         character after it. The input and the arguments are then unchanged.
 /// \throws QrStreamEx::ExReadError if the medium fails
 int scanNumber(const ByteSource& source, const wchar_t* format, std::va_list& arguments);
+
+/// The same for one number without a format: reads what `%d`, `%u`, `%I64d`, `%I64u`, `%g` and
+/// `%lg` read.
+int scanNumber(const ByteSource& source, int& value);
+int scanNumber(const ByteSource& source, unsigned int& value);
+int scanNumber(const ByteSource& source, int64& value);
+int scanNumber(const ByteSource& source, unsigned long long& value);
+int scanNumber(const ByteSource& source, float& value);
+int scanNumber(const ByteSource& source, double& value);
 
 } // namespace Mz
