@@ -32,8 +32,12 @@ class FileBlocks {
     /// The maximum size of a piece.
     static constexpr std::size_t blockSize = 4096;
 
-    /// Creates a reader of `file`, which must outlive it.
-    explicit FileBlocks(ByteSource& file) : file(file), fileSize(file.size()) {}
+    /// Creates a reader of `file`, which must outlive it. Reads `firstSize` bytes, at most
+    /// `blockSize`, where no block ends, and a whole block where one does. Few bytes are better for
+    /// a reader that needs little of each table: the file is rarely in the processor's cache, so
+    /// that copying a whole block costs as much as another system call.
+    explicit FileBlocks(ByteSource& file, std::size_t firstSize = blockSize)
+        : file(file), fileSize(file.size()), firstSize(firstSize) {}
 
     /// Returns the `T` at `offset`, or `std::nullopt` if the file ends before.
     template <class T>
@@ -65,10 +69,13 @@ class FileBlocks {
         }
     };
 
+    /// Returns whether a block reaches `offset`, so that a table is read from its begin to its end.
+    bool goesOn(std::uint64_t offset) const;
     Block* blockWith(std::uint64_t offset, std::size_t size);
 
     ByteSource& file;
     std::uint64_t fileSize;
+    std::size_t firstSize;
     std::array<Block, 2> blocks;
     std::size_t older = 0; ///< the block to fill next
 };

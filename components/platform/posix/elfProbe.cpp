@@ -84,7 +84,8 @@ struct DynamicTables {
 
 class ElfLibrary {
   public:
-    explicit ElfLibrary(ByteSource& source) : file(source) {}
+    /// The headers are within the first bytes, and of the symbols one hash chain is read.
+    explicit ElfLibrary(ByteSource& source) : file(source, 1024) {}
 
     bool exports(const char* symbol) {
         if (!readHeaders() || !readDynamicTables())
