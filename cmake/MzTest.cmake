@@ -100,7 +100,9 @@ endfunction()
 
 # mz_add_test_component(NAME [AS_SHIPPED] [FOLDER folder] sources...): adds a component library in
 # <build>/components/<folder>. The default folder is NAME. AS_SHIPPED compiles it with the build's
-# options, for tests that look at the file, or with options of its own.
+# options, for tests that look at the file, or with options of its own. The target `mzTestComponents`
+# builds all of them.
+add_custom_target(mzTestComponents)
 function(mz_add_test_component name)
   cmake_parse_arguments(PARSE_ARGV 1 arg "AS_SHIPPED" "FOLDER" "")
   if(NOT arg_FOLDER)
@@ -115,4 +117,5 @@ function(mz_add_test_component name)
   set_target_properties(${name} PROPERTIES
     LIBRARY_OUTPUT_DIRECTORY ${PROJECT_BINARY_DIR}/components/${arg_FOLDER}
     RUNTIME_OUTPUT_DIRECTORY ${PROJECT_BINARY_DIR}/components/${arg_FOLDER})
+  add_dependencies(mzTestComponents ${name})
 endfunction()
