@@ -4,6 +4,7 @@
 /// each level restores the stream and form of the level around it. A failure is explained once, at
 /// each level with the position of that level's object, and stops all later reads: after it the
 /// position in the data is unknown.
+#include "components/componentManager/binaryStream.h"
 #include "components/componentManager/componentImp.h"
 #include "components/componentManager/numberRelay.h"
 #include "components/objectIO/objectIO.h"
@@ -48,10 +49,10 @@ struct StoredClass {
     std::uint32_t version = 0;
 };
 
-/// In binary form all numbers are read at once.
+/// A binary stream reads all numbers at once. A derived one may read single ones in its own way.
 StoredClass readClass(QrStream& s) {
     StoredClass stored;
-    if (formOf(s) != ObjectForm::Binary) {
+    if (typeid(s) != typeid(QrBinaryStream)) {
         s >> stored.uid >> stored.version;
         return stored;
     }

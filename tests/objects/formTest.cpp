@@ -142,4 +142,29 @@ TEST_F(Objects, LeaveTheValuesBetweenThemAsTheStreamWritesThem) {
                            "1 x55");
 }
 
+/// Writes and reads each single `unsigned int` with all bits inverted.
+class Inverting final : public QrBinaryStream {
+  public:
+    using QrBinaryStream::QrBinaryStream;
+    using QrBinaryStream::operator<<;
+    using QrBinaryStream::operator>>;
+
+    QrStream& operator<<(unsigned int value) override { return QrBinaryStream::operator<<(~value); }
+    QrStream& operator>>(unsigned int& value) override {
+        QrBinaryStream::operator>>(value);
+        value = ~value;
+        return *this;
+    }
+};
+
+TEST_F(Objects, OnADerivedStreamAreReadAsThatStreamWroteThem) {
+    const QrPtr<Node> object = node(7, {node(8)});
+    const std::string bytes = saved<Inverting>(object.get());
+    EXPECT_EQ(bytes.substr(0, 4), "\xFF\xFF\xFF\xFE"); // The number of the first object.
+    Loading<Inverting> in(bytes);
+    const QrPtr<Node> read = in.node();
+    in.finish();
+    expectEqual(*read, *object);
+}
+
 } // namespace
