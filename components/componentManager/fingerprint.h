@@ -190,7 +190,7 @@ struct NoFunction {
     std::int64_t function = 0, adjustment = 0;
 };
 
-/// One of several entries; the index makes each a base of its own.
+/// One of several entries. The index makes the bases differ.
 template <std::size_t index, class Entry>
 struct IndexedEntry {
     Entry entry;
@@ -288,7 +288,7 @@ struct ValueEntries<First, Rest...> {
 template <class Pointer, std::size_t size>
 constexpr auto operationEntries(const char (&name)[size], Pointer pointer) {
     using Parts = FunctionParts<FunctionOf<Pointer>>;
-    // The name stands behind the result, after a space; `size` counts its NUL instead.
+    // The name follows the result and a space, for which `size` counts its NUL.
     auto entry = entryFor<typeTextLength<FunctionOf<Pointer>> + size>(InterfaceEntryKind::operation,
                                                                       pointer);
     TextTarget text(entry.text);

@@ -31,7 +31,7 @@ class Asking final : public QrObjectInBuffer {
     }
 
   private:
-    // At the end of the data a position cannot be told any more, but was known.
+    // After a short read the position cannot be asked for, but was known.
     void ask() {
         if (inner().canSeek())
             seek(0, 1);
