@@ -5,6 +5,7 @@
 #include "components/componentKit/componentKit.h"
 #include "components/componentManager/persistant.h"
 
+#include <chrono>
 #include <cstdlib>
 #include <string_view>
 #include <thread>
@@ -57,7 +58,12 @@ class ExitingBuilder final
     QrRef<QrCastable> createObject() override {
         exitAt("createObject");
         if (isPlace("thread"))
-            std::thread([] { exitAt("thread"); }).join();
+            std::thread([] {
+                // The end of the process unloads this library, which the other thread must no
+                // longer run by then: it is in `join`, in the library of the system.
+                std::this_thread::sleep_for(std::chrono::milliseconds(300));
+                exitAt("thread");
+            }).join();
         return QrRef<QrCastable>((new Exiting)->getCastable());
     }
 };
