@@ -154,4 +154,23 @@ TEST_F(Places, OfBinaryObjectsAreAskedForOnceForEachOutermostObject) {
     EXPECT_EQ(content.asked, 2);
 }
 
+TEST(ObjectInput, PassesEachOperationOn) {
+    std::istringstream source(" abcdef");
+    QrInBuffer bytes(&source);
+    QrObjectInBuffer objects(&bytes);
+    objects.skipWhiteSpace(1);
+    char letter = 0;
+    EXPECT_EQ(objects.readChar(letter), 1);
+    EXPECT_EQ(letter, 'a');
+    objects.ungetc('a');
+    char letters[2]{};
+    EXPECT_EQ(objects.readChar(letters, 2, 2), 2);
+    EXPECT_EQ(std::string(letters, 2), "ab");
+    objects.ungetc(L'b');
+    EXPECT_EQ(objects.read(), 'b');
+    EXPECT_EQ(objects.seek(5, 0), 5);
+    EXPECT_EQ(objects.tell(), 5);
+    EXPECT_EQ(objects.read(), 'e');
+}
+
 } // namespace
