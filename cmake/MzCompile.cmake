@@ -61,13 +61,13 @@ endif()
 # as well. The libraries keep all checks.
 set(MZ_FEWER_CHECKS -fno-sanitize=null,alignment,object-size,vptr)
 
-# mz_compile_together(TARGET...): compiles up to eight sources of each target at once, in the builds
+# mz_compile_together(TARGET...): compiles up to sixteen sources of each target at once, in the builds
 # of developers. Templates of large headers are instantiated once for all of them, which more than
 # halves the time. Packages are built source by source. So is the Clang build, which fails where a source lacks
 # an include or uses what another one defines.
 option(MZ_COMPILE_TOGETHER "Compile several sources at once, to save time" OFF)
 function(mz_compile_together)
-  set_target_properties(${ARGN} PROPERTIES UNITY_BUILD ${MZ_COMPILE_TOGETHER} UNITY_BUILD_BATCH_SIZE 8)
+  set_target_properties(${ARGN} PROPERTIES UNITY_BUILD ${MZ_COMPILE_TOGETHER} UNITY_BUILD_BATCH_SIZE 16)
 endfunction()
 
 # mz_compile_alone(SOURCE...): compiles these sources by themselves all the same: they use names that

@@ -85,12 +85,25 @@ function(mz_link_manager program internals)
   endif()
 endfunction()
 
-# mz_add_tests(NAME [INTERNALS] sources...): adds a test program. Each test is a ctest entry and
-# runs in a process of its own.
+# mz_add_tests(NAME [INTERNALS] [TOGETHER] sources...): adds a test program. Each test is a ctest entry
+# and runs in a process of its own. With TOGETHER they share one in builds with MZ_TESTS_TOGETHER,
+# where starting a process takes longer than most tests; they are one entry then.
+option(MZ_TESTS_TOGETHER "Run the tests of a program in one process where they allow it" OFF)
 function(mz_add_tests name)
-  mz_add_test_program(${name} ${ARGN})
+  cmake_parse_arguments(PARSE_ARGV 1 arg "INTERNALS;TOGETHER" "" "")
+  set(internals)
+  if(arg_INTERNALS)
+    set(internals INTERNALS)
+  endif()
+  mz_add_test_program(${name} ${internals} ${arg_UNPARSED_ARGUMENTS})
   target_link_libraries(${name} PRIVATE GTest::gtest_main)
-  mz_discover_tests(${name})
+  if(arg_TOGETHER AND MZ_TESTS_TOGETHER)
+    # The most costly first: they must not be what the others wait for in the end.
+    add_test(NAME ${MZ_BUILD_NAME}/${name} COMMAND ${name} --gtest_brief=1)
+    set_tests_properties(${MZ_BUILD_NAME}/${name} PROPERTIES TIMEOUT 600 COST 1000)
+  else()
+    mz_discover_tests(${name})
+  endif()
 endfunction()
 
 function(mz_discover_tests name)

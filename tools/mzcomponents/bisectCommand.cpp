@@ -15,7 +15,7 @@ namespace Mz::Commands {
 
 namespace {
 
-using State = Tools::BisectResult::State;
+using BisectState = Tools::BisectResult::State;
 
 void printProgress(const std::wstring& text) {
     std::cerr << Tools::forOutput(Tools::withoutControls(text)) << std::endl;
@@ -65,16 +65,16 @@ Tools::BisectOptions optionsOf(const Common& common, const BisectArguments& argu
 std::wstring answerOf(const Tools::BisectResult& result) {
     const std::size_t count = result.culprits.size();
     switch (result.state) {
-    case State::found:
+    case BisectState::found:
         return count == 1 ? L"the host fails with this component"
                           : L"the host fails with these " + std::to_wstring(count) +
                                 L" components together, and not without any one of them";
-    case State::allPass: return L"the host does not fail with all components";
-    case State::noneFails:
+    case BisectState::allPass: return L"the host does not fail with all components";
+    case BisectState::noneFails:
         return L"the host fails even if all components are switched off. Either they are not the "
                L"reason, or the host does not use Kit::listFromEnvironment";
-    case State::notStarted: return L"the host cannot be started: " + result.problem;
-    case State::stopped: break;
+    case BisectState::notStarted: return L"the host cannot be started: " + result.problem;
+    case BisectState::stopped: break;
     }
     return count == 0 ? L"the search was stopped"
                       : L"the search was stopped. The culprit is among these " +
@@ -107,32 +107,32 @@ void printReport(const Tools::BisectResult& result, const BisectArguments& argum
     printLine(L"mzcomponents " + toWide(MZ_VERSION) + L": " + result.stamp);
 }
 
-const char* nameOf(State state) {
+const char* stateName(BisectState state) {
     switch (state) {
-    case State::found: return "found";
-    case State::allPass: return "allPass";
-    case State::noneFails: return "noneFails";
-    case State::notStarted: return "notStarted";
-    case State::stopped: break;
+    case BisectState::found: return "found";
+    case BisectState::allPass: return "allPass";
+    case BisectState::noneFails: return "noneFails";
+    case BisectState::notStarted: return "notStarted";
+    case BisectState::stopped: break;
     }
     return "stopped";
 }
 
-Json jsonOf(const Tools::BisectResult& result, const BisectArguments& arguments) {
+Json reportOf(const Tools::BisectResult& result, const BisectArguments& arguments) {
     Json culprits = Json::array();
     for (const Tools::Culprit& culprit : result.culprits) {
         Json entry{{"file", utf8(Tools::displayName(culprit.path))}};
-        entry.update(Commands::jsonOf(culprit.verdict));
+        entry.update(jsonOf(culprit.verdict));
         entry["stamp"] = utf8(culprit.stamp);
         entry["size"] = culprit.record.size;
         entry["time"] = culprit.record.time;
-        entry["builders"] = Commands::jsonOf(culprit.record).at("builders");
+        entry["builders"] = jsonOf(culprit.record).at("builders");
         culprits.push_back(entry);
     }
     Json host = Json::array();
     for (const std::string& word : arguments.host)
         host.push_back(utf8(toWide(word)));
-    return {{"result", nameOf(result.state)},
+    return {{"result", stateName(result.state)},
             {"culprits", culprits},
             {"host", host},
             {"ending", utf8(result.ending)},
@@ -173,10 +173,10 @@ int bisect(const Common& common, const BisectArguments& arguments, const ProbeAr
     controller.clearLine();
     reportList(controller, toWide(common.cache), result.scanned);
     if (common.json)
-        printJson(jsonOf(result, arguments));
+        printJson(reportOf(result, arguments));
     else
         printReport(result, arguments);
-    return result.state == State::found ? exitSuccess : exitFailure;
+    return result.state == BisectState::found ? exitSuccess : exitFailure;
 }
 
 } // namespace Mz::Commands

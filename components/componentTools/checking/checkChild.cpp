@@ -62,7 +62,7 @@ int runCheckChild(const std::vector<std::string>& arguments) {
         return usageStatus;
     CheckTask task;
     try {
-        task = decodeTask(arguments[2]);
+        task = decodeCheckTask(arguments[2]);
     } catch (const std::exception&) {
         return usageStatus;
     }

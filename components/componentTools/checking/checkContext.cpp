@@ -52,6 +52,8 @@ bool CheckContext::attempt(const std::wstring& what, const std::wstring& place,
     if (work.avoided.contains(key))
         return false;
     sender.activity({key, what, place, detail, reproduce});
+    if (prepare)
+        prepare();
     try {
         call();
         return true;

@@ -56,6 +56,9 @@ class CheckContext {
                  const std::function<void()>& call, const std::wstring& detail = {},
                  const std::string& reproduce = {});
 
+    /// Sets what `attempt` does between its message to the parent process and the call.
+    void beforeCalls(std::function<void()> work) { prepare = std::move(work); }
+
     /// Returns the text of the exception that ended the last `attempt`; empty if none did.
     const std::wstring& lastException() const { return exception; }
     /// Returns whether a call ended an earlier process, so that it must not be repeated.
@@ -110,6 +113,7 @@ class CheckContext {
     const CheckTask& work;
     CheckSender& sender;
     const CheckRule* current = nullptr;
+    std::function<void()> prepare;
     std::wstring exception, failure;
     bool streamException = false;
     std::vector<std::wstring> reported; ///< unexpected exceptions, each once

@@ -5,21 +5,14 @@
 
 #include "components/componentManager/utf8.h"
 #include "components/componentTools/probing/frames.h"
-
-#include <nlohmann/json.hpp>
+#include "components/componentTools/records/json.h"
 
 namespace Mz::Tools {
 
 namespace {
 
-using Json = nlohmann::json;
-
 /// The kind of the frames; the kinds of a probe are smaller.
 constexpr unsigned char checkKind = 64;
-
-std::string asciiOf(const Json& value) {
-    return value.dump(-1, ' ', true, Json::error_handler_t::replace);
-}
 
 std::string messageOf(const Json& value) {
     return frameOf(checkKind, asciiOf(value));
@@ -105,8 +98,8 @@ std::string encodeTask(const CheckTask& task) {
                     {"noInput", task.noInput}});
 }
 
-CheckTask decodeTask(const std::string& text) {
-    const Json value = Json::parse(text);
+CheckTask decodeCheckTask(const std::string& text) {
+    const Json value = jsonIn(text);
     CheckTask task;
     value.at("rules").get_to(task.rules);
     value.at("avoided").get_to(task.avoided);
@@ -176,7 +169,7 @@ void decodeReport(std::string& bytes, CheckReport& report) {
     FrameReader frames(bytes);
     while (const std::optional<Frame> frame = report.garbled ? std::nullopt : frames.next()) {
         try {
-            readMessage(Json::parse(frame->payload), report);
+            readMessage(jsonIn(frame->payload), report);
         } catch (const Json::exception&) {
             report.garbled = true;
         }

@@ -35,7 +35,7 @@ std::string encodeTask(const CheckTask& task);
 
 /// Returns the task that `encodeTask` encoded, without paths.
 /// \throws std::exception if the text is invalid
-CheckTask decodeTask(const std::string& text);
+CheckTask decodeCheckTask(const std::string& text);
 
 /// What the child does at the moment, in case that it does not survive it.
 struct CheckActivity {

@@ -79,7 +79,6 @@ void surveyImports(CheckContext& context) {
         for (std::size_t number = 0; number < inputs.fixedCount(); ++number) {
             const CheckInput input = inputs.at(number);
             const std::wstring& place = importing.described->place;
-            fillMemory(context);
             CheckController controller;
             ImportTry attempt(importing, input, number);
             const bool accepts = attempt.canImport(context);
@@ -113,12 +112,12 @@ void survey(CheckContext& context) {
     QrComponentDescription* const description = context.description();
     if (!description)
         return;
+    // After each message, which leaves memory behind that the call would find.
+    context.beforeCalls([&context] { fillMemory(context); });
     surveyDescription(context, *description);
-    for (const DescribedBuilder& described : context.builders()) {
-        fillMemory(context);
+    for (const DescribedBuilder& described : context.builders())
         surveyObject(context, L"createObject of the " + described.place, described.place,
                      context.object(described));
-    }
     surveyImports(context);
 }
 

@@ -5,23 +5,18 @@
 
 #include "components/componentManager/utf8.h"
 #include "components/componentTools/probing/frames.h"
+#include "components/componentTools/records/json.h"
 
-#include <nlohmann/json.hpp>
 #include <stdexcept>
 
 namespace Mz::Tools {
 
 namespace {
 
-using Json = nlohmann::json;
 using std::chrono::nanoseconds;
 
 /// The kind of the frames. Probes and checks have others.
 constexpr unsigned char profileKind = 128;
-
-std::string asciiOf(const Json& value) {
-    return value.dump(-1, ' ', true, Json::error_handler_t::replace);
-}
 
 std::string messageOf(const Json& value) {
     return frameOf(profileKind, asciiOf(value));
@@ -132,7 +127,7 @@ std::string encodeTask(const ProfileTask& task) {
 }
 
 ProfileTask decodeProfileTask(const std::string& text) {
-    const Json value = Json::parse(text);
+    const Json value = jsonIn(text);
     ProfileTask task;
     value.at("whole").get_to(task.whole);
     value.at("candidates").get_to(task.candidates);
@@ -192,7 +187,7 @@ ProfileReport decodeProfileReport(std::string_view bytes, std::size_t candidates
         try {
             if (frame->kind != profileKind)
                 throw std::runtime_error("unknown kind of frame");
-            reader.read(Json::parse(frame->payload));
+            reader.read(jsonIn(frame->payload));
         } catch (const std::exception&) {
             report.garbled = true;
             return report;

@@ -6,6 +6,7 @@
 #include "components/componentTools/records/verdictsFile.h"
 
 #include "components/componentManager/utf8.h"
+#include "components/componentTools/records/json.h"
 #include "components/componentTools/records/openPatiently.h"
 #include "components/componentTools/records/replaceChanged.h"
 
@@ -13,7 +14,6 @@
 #include <fstream>
 #include <initializer_list>
 #include <map>
-#include <nlohmann/json.hpp>
 #include <optional>
 #include <string>
 #include <utility>
@@ -23,21 +23,19 @@ namespace Mz::Tools {
 
 namespace {
 
-using OrderedJson = nlohmann::ordered_json;
-
 constexpr int version = 1;
 
-std::wstring wide(const OrderedJson& entry, const char* key) {
+std::wstring wide(const Json& entry, const char* key) {
     return fromUtf8(entry.at(key).get<std::string>());
 }
 
 /// Verdicts by directory and file name.
-using Verdicts = std::map<std::pair<std::wstring, std::wstring>, const OrderedJson*>;
+using Verdicts = std::map<std::pair<std::wstring, std::wstring>, const Json*>;
 
-Verdicts verdictsOf(const OrderedJson& all) {
+Verdicts verdictsOf(const Json& all) {
     Verdicts verdicts;
     if (all.at("version").get<int>() == version)
-        for (const OrderedJson& entry : all.at("libraries"))
+        for (const Json& entry : all.at("libraries"))
             verdicts[{wide(entry, "directory"), wide(entry, "fileName")}] = &entry;
     return verdicts;
 }
@@ -70,7 +68,7 @@ void fillIn(RecordedLibrary& library, const Verdicts& verdicts) {
     const auto found = verdicts.find({library.directory, library.fileName});
     if (found == verdicts.end())
         return;
-    const OrderedJson& entry = *found->second;
+    const Json& entry = *found->second;
     if (entry.at("time").get<std::uint32_t>() != library.time ||
         entry.at("size").get<std::int64_t>() != library.size)
         return;
@@ -80,10 +78,10 @@ void fillIn(RecordedLibrary& library, const Verdicts& verdicts) {
 }
 
 /// Older versions write no choices.
-DisabledComponents disabledIn(const OrderedJson& all) {
+DisabledComponents disabledIn(const Json& all) {
     DisabledComponents disabled;
     if (all.at("version").get<int>() == version && all.contains("disabled"))
-        for (const OrderedJson& entry : all.at("disabled"))
+        for (const Json& entry : all.at("disabled"))
             disabled.push_back(
                 {wide(entry, "directory"), wide(entry, "fileName"), wide(entry, "reason")});
     return disabled;
@@ -96,7 +94,7 @@ void readVerdicts(const std::filesystem::path& file, RecordedLibraries& librarie
     if (!openPatiently(input, file))
         return;
     try {
-        const OrderedJson all = OrderedJson::parse(input);
+        const Json all = jsonIn(input);
         const Verdicts verdicts = verdictsOf(all);
         for (RecordedLibrary& library : libraries)
             if (library.builders.empty())
@@ -105,7 +103,7 @@ void readVerdicts(const std::filesystem::path& file, RecordedLibraries& librarie
             for (RecordedLibrary& library : libraries)
                 if (isRecordOf(library, component))
                     library.kept = disabledFinding(component);
-    } catch (const nlohmann::json::exception&) {
+    } catch (const Json::exception&) {
         return; // Without verdicts the next scan only retries more.
     } catch (const std::ios_base::failure&) {
         return; // The buffer of a file throws it, and JSON is read from the buffer.
@@ -125,8 +123,8 @@ std::optional<DisabledComponents> readDisabled(const std::filesystem::path& file
         return std::nullopt; // No choices can be in it.
     try {
         if (isRead)
-            return disabledIn(OrderedJson::parse(input));
-    } catch (const nlohmann::json::exception&) {
+            return disabledIn(jsonIn(input));
+    } catch (const Json::exception&) {
         isRead = !input.bad();
     } catch (const std::ios_base::failure&) { // Of the file's buffer, from which JSON is read.
         isRead = false;
@@ -141,11 +139,11 @@ std::string readJudgement(const std::filesystem::path& file) {
     if (!openPatiently(input, file))
         return {};
     try {
-        const OrderedJson all = OrderedJson::parse(input);
+        const Json all = jsonIn(input);
         if (all.at("version").get<int>() == version)
             return all.value("judgement", "");
-    } catch (const nlohmann::json::exception&) { // NOLINT(bugprone-empty-catch)
-    } catch (const std::ios_base::failure&) {    // NOLINT(bugprone-empty-catch)
+    } catch (const Json::exception&) {        // NOLINT(bugprone-empty-catch)
+    } catch (const std::ios_base::failure&) { // NOLINT(bugprone-empty-catch)
     }
     return {}; // The next scan only compares more.
 }
@@ -161,7 +159,7 @@ Finding disabledFinding(const DisabledComponent& component) {
 
 void writeVerdicts(const std::filesystem::path& file, const RecordedLibraries& libraries,
                    const DisabledComponents& disabled, const std::string& judgement) {
-    OrderedJson entries = OrderedJson::array(), choices = OrderedJson::array();
+    Json entries = Json::array(), choices = Json::array();
     for (const DisabledComponent& component : disabled)
         choices.push_back({{"directory", toUtf8(component.directory)},
                            {"fileName", toUtf8(component.fileName)},
@@ -177,10 +175,10 @@ void writeVerdicts(const std::filesystem::path& file, const RecordedLibraries& l
                                {"words", toUtf8(library.kept->words)},
                                {"sentence", toUtf8(sentenceOf(*library.kept))},
                                {"cure", toUtf8(cureOf(*library.kept))}});
-    OrderedJson all{{"version", version}, {"libraries", entries}, {"disabled", choices}};
+    Json all{{"version", version}, {"libraries", entries}, {"disabled", choices}};
     if (!judgement.empty())
         all["judgement"] = judgement;
-    replaceChanged(file, all.dump(2, ' ', true) + "\n");
+    replaceChanged(file, linesOf(all));
 }
 
 } // namespace Mz::Tools

@@ -6,18 +6,17 @@
 #include "components/componentManager/exceptions.h"
 #include "components/componentManager/files.h"
 #include "components/componentManager/utf8.h"
+#include "components/componentTools/records/json.h"
 #include "components/componentTools/records/openPatiently.h"
 
 #include <cstdint>
 #include <fstream>
 #include <map>
-#include <nlohmann/json.hpp>
 
 namespace Mz::Tools {
 
 namespace {
 
-using Json = nlohmann::ordered_json;
 using Name = LibraryNames::value_type;
 using Status = std::pair<std::uint32_t, std::int64_t>; ///< time and size
 
@@ -57,8 +56,8 @@ Seen readSeen(const std::filesystem::path& file) {
     if (!openPatiently(input, file))
         return {};
     try {
-        return seenIn(Json::parse(input));
-    } catch (const nlohmann::json::exception&) {
+        return seenIn(jsonIn(input));
+    } catch (const Json::exception&) {
         return {};
     }
 }
@@ -73,7 +72,7 @@ void writeSeen(const std::filesystem::path& file, const Seen& seen) {
                            {"changed", seen.changed.contains(name)}});
     const Json all{{"version", version}, {"components", entries}};
     try {
-        replaceFile(file, all.dump(2, ' ', true) + "\n");
+        replaceFile(file, linesOf(all));
     } catch (const QrStreamEx&) {
         return; // The folder of the list may be read-only.
     }

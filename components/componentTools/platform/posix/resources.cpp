@@ -4,7 +4,9 @@
 
 #include "components/componentTools/platform/system.h"
 
+#include <array>
 #include <clocale>
+#include <cstdlib>
 #include <dlfcn.h>
 #include <iterator>
 #include <malloc.h>
@@ -50,6 +52,20 @@ void holdLibraries(const std::vector<std::string>& names) {
 
 void fillNewMemory(unsigned char pattern) {
     ::mallopt(M_PERTURB, pattern);
+    // glibc does not fill the small blocks that a thread frees and takes again.
+    constexpr std::size_t largest = 1024, copies = 8;
+    std::array<void*, copies> blocks;
+    for (std::size_t size = 16; size <= largest; size += 16) {
+        for (void*& block : blocks) {
+            block = std::malloc(size);
+            // The compiler leaves out what it sees to be written before a block is freed.
+            auto* const bytes = static_cast<volatile unsigned char*>(block);
+            for (std::size_t index = 0; block && index < size; ++index)
+                bytes[index] = pattern;
+        }
+        for (void* block : blocks)
+            std::free(block);
+    }
 }
 
 void closeStandardInput() {

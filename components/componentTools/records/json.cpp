@@ -1,0 +1,24 @@
+// SPDX-License-Identifier: BSL-1.0
+#include "components/componentTools/records/json.h"
+
+#include <istream>
+
+namespace Mz::Tools {
+
+Json jsonIn(std::string_view text) {
+    return Json::parse(text);
+}
+
+Json jsonIn(std::istream& input) {
+    return Json::parse(input);
+}
+
+std::string asciiOf(const Json& value) {
+    return value.dump(-1, ' ', true, Json::error_handler_t::replace);
+}
+
+std::string linesOf(const Json& value) {
+    return value.dump(2, ' ', true) + "\n";
+}
+
+} // namespace Mz::Tools

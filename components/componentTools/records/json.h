@@ -1,0 +1,32 @@
+// SPDX-License-Identifier: BSL-1.0
+/// The JSON of stored files and of messages between processes: one type for all sources, with its
+/// reader and writer compiled once, because each source that instantiates them takes seconds.
+#pragma once
+
+#include <iosfwd>
+#include <nlohmann/json.hpp>
+#include <string>
+#include <string_view>
+
+namespace Mz::Tools {
+
+/// Members keep the order in which they are added.
+using Json = nlohmann::ordered_json;
+
+/// \throws Json::exception if the text is invalid
+Json jsonIn(std::string_view text);
+
+/// Reads a value up to the end of the input.
+/// \throws Json::exception if the text is invalid
+/// \throws std::ios_base::failure if the buffer of the stream throws it
+Json jsonIn(std::istream& input);
+
+/// Returns the value on one line in ASCII, which does not depend on a locale. Invalid UTF-8 is
+/// replaced.
+std::string asciiOf(const Json& value);
+
+/// Returns the value in ASCII for a file that people can read: indented, with an end of line.
+/// \throws Json::exception if a text is invalid UTF-8
+std::string linesOf(const Json& value);
+
+} // namespace Mz::Tools
