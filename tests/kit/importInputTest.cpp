@@ -56,6 +56,19 @@ std::string operate(QrInBuffer& io, unsigned int operation, int number, int size
     return seen + " at " + std::to_string(io.tell());
 }
 
+TEST(KitImportInput, IsNoOutputAndHasNoPositionBeforeItsBegin) {
+    const std::string bytes = someBytes(100);
+    ImportLimits limits({}, {});
+    LimitedInput buffer(sourceOf(bytes), bytes.size(), limits);
+    const std::streampos none(std::streamoff(-1));
+    EXPECT_EQ(buffer.pubseekoff(0, std::ios::beg, std::ios::out), none);
+    EXPECT_EQ(buffer.pubseekpos(0, std::ios::out), none);
+    EXPECT_EQ(buffer.pubseekoff(-1, std::ios::beg, std::ios::in), none);
+    EXPECT_EQ(buffer.pubseekoff(-101, std::ios::end, std::ios::in), none);
+    EXPECT_EQ(buffer.pubseekoff(-100, std::ios::end, std::ios::in), std::streampos(0));
+    EXPECT_EQ(buffer.sgetc(), std::streambuf::traits_type::to_int_type(bytes[0]));
+}
+
 TEST(KitImportInput, BehavesLikeAFile) {
     for (const int size : {0, 1, 100, 16 * 1024, 16 * 1024 + 1, 50'000}) {
         const std::string bytes = someBytes(static_cast<std::size_t>(size));

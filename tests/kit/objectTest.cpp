@@ -64,6 +64,28 @@ TEST(KitObject, IsDeletedByDestroy) {
     EXPECT_EQ(alive, 0);
 }
 
+class Triangles final : public Kit::Builder<Triangles> {
+  public:
+    Triangles() : Kit::Builder<Triangles>({.uid = expected, .name = L"triangles"}) {}
+    QrRef<QrCastable> createObject() override { return (new Triangle)->getCastable(); }
+};
+
+TEST(KitBuilder, IsItsOwnDescription) {
+    Kit::ObjectBuilder<Triangle> plain({.uid = expected, .name = L"triangle"});
+    const QrPtr<Triangles> counted(new Triangles);
+    QrBuilderDescription* const descriptions[] = {&plain, counted.get()};
+    const QrComponentBuilder* const builders[] = {&plain, counted.get()};
+    for (std::size_t index = 0; index < std::size(builders); ++index) {
+        const QrBuilderDescription& description = *descriptions[index];
+        EXPECT_EQ(description.getUid(), expected);
+        EXPECT_STREQ(description.getComponentLabel(), L"");
+        EXPECT_STREQ(description.getComponentText(), L"");
+        EXPECT_EQ(QrCPtr<QrComponentBuilder>(description.getBuilder()).get(), builders[index]);
+        EXPECT_EQ(QrPtr<QrComponentBuilder>(descriptions[index]->getBuilder()).get(),
+                  builders[index]);
+    }
+}
+
 class Loud final : public QrCastImpl<Loud, Sounding> {
   public:
     int tone() const override { return 440; }

@@ -113,6 +113,152 @@ TEST(PeImage, WhoseExportsLeadNowhereIsDamaged) {
         EXPECT_EQ(damageWith(field, 0xFF0000), L"the table of exports makes no sense") << field;
 }
 
+template <class T>
+void put(std::string& bytes, std::size_t offset, T value) {
+    std::memcpy(bytes.data() + offset, &value, sizeof value);
+}
+
+// Offsets in the libraries of images.cpp.
+constexpr std::size_t elfMachine = 18, elfSymbolTag = 0x240, elfHashTag = 0x250, elfHash = 0x1C0,
+                      peMachine = 0x44, peOptional = 0x58, peData = 0x400;
+
+TEST_P(Image, NamesItsExports) {
+    const auto names = [&](const std::string& bytes) {
+        return exportedNames(folder.write("image", bytes));
+    };
+    EXPECT_THAT(names(whole()), ElementsAre(entryPointName));
+    EXPECT_THAT(names(whole({.stamp = Mz::ComponentStamp MZ_STAMP_VALUE})),
+                ::testing::UnorderedElementsAre(entryPointName, stampName));
+    EXPECT_THAT(names("neither format"), ::testing::IsEmpty());
+    EXPECT_THAT(names("M"), ::testing::IsEmpty());
+}
+
+TEST(ElfImage, NamesItsExportsByEitherHashTable) {
+    const TemporaryDirectory folder;
+    std::string bytes = elfLibrary({});
+    put<std::uint64_t>(bytes, elfHashTag, 4); // DT_HASH, whose second number counts the symbols
+    put<std::uint32_t>(bytes, elfHash + 4, 2);
+    EXPECT_THAT(exportedNames(folder.write("image", bytes)), ElementsAre(entryPointName));
+    bytes = elfLibrary({});
+    put<std::uint64_t>(bytes, elfSymbolTag, 0x70000000); // No table of symbols.
+    EXPECT_THAT(exportedNames(folder.write("image", bytes)), ::testing::IsEmpty());
+    EXPECT_THAT(wantedSymbols(folder.write("image", bytes)), ::testing::IsEmpty());
+}
+
+TEST(PeImage, WithoutExportsHasNoNames) {
+    const TemporaryDirectory folder;
+    std::string bytes = peLibrary({});
+    put<std::uint32_t>(bytes, peOptional + 112, 0);
+    EXPECT_THAT(exportedNames(folder.write("image", bytes)), ::testing::IsEmpty());
+    bytes = peLibrary({});
+    put<std::uint32_t>(bytes, peData + 0x2C, 0x9000); // The only name leads out of the file.
+    EXPECT_THAT(exportedNames(folder.write("image", bytes)), ::testing::IsEmpty());
+}
+
+TEST(PeImage, WithFewerDirectoriesHasOnlyThese) {
+    const TemporaryDirectory folder;
+    std::string bytes = peLibrary({});
+    put<std::uint32_t>(bytes, peOptional + 108, 1);
+    const LibraryImage image = readLibraryImage(folder.write("image", bytes));
+    EXPECT_EQ(image.damage, L"");
+    EXPECT_EQ(image.entryPoint, LibraryImage::EntryPoint::function);
+    EXPECT_THAT(image.needed, ::testing::IsEmpty());
+}
+
+TEST(PeImage, WhoseNameIsCutOffByTheEndOfItsSectionIsDamaged) {
+    const TemporaryDirectory folder;
+    std::string bytes = peLibrary({});
+    const std::string_view begin = std::string_view(entryPointName).substr(0, 8);
+    bytes.replace(peData + 0x1F8, begin.size(), begin);
+    put<std::uint32_t>(bytes, peData + 0x2C, 0x21F8);
+    EXPECT_EQ(readLibraryImage(folder.write("image", bytes)).damage,
+              L"the table of exports makes no sense");
+    // Another name is another name before its end.
+    bytes[peData + 0x1F8] = 'R';
+    const LibraryImage other = readLibraryImage(folder.write("image", bytes));
+    EXPECT_EQ(other.damage, L"");
+    EXPECT_EQ(other.entryPoint, LibraryImage::EntryPoint::absent);
+}
+
+TEST(ElfImage, NamesTheProcessor) {
+    const TemporaryDirectory folder;
+    const auto processor = [&](std::uint16_t machine) {
+        std::string bytes = elfLibrary({});
+        put(bytes, elfMachine, machine);
+        return readLibraryImage(folder.write("image", bytes)).otherProcessor;
+    };
+    EXPECT_EQ(processor(3), L"x86, 32 bits");
+    EXPECT_EQ(processor(40), L"ARM, 32 bits");
+    EXPECT_EQ(processor(243), L"RISC-V");
+    EXPECT_EQ(processor(4711), L"number 4711");
+}
+
+TEST(PeImage, NamesTheProcessor) {
+    const TemporaryDirectory folder;
+    const auto processor = [&](std::uint16_t machine) {
+        std::string bytes = peLibrary({});
+        put(bytes, peMachine, machine);
+        return readLibraryImage(folder.write("image", bytes)).otherProcessor;
+    };
+    EXPECT_EQ(processor(0x14C), L"x86, 32 bits");
+    EXPECT_EQ(processor(0x1C4), L"ARM, 32 bits");
+    EXPECT_EQ(processor(0xAA64), L"ARM, 64 bits");
+    EXPECT_EQ(processor(0x8664), L"");
+    EXPECT_EQ(processor(4711), L"number 4711");
+}
+
+TEST(PeImage, TellsWhetherItHasTheManifestOfALibrary) {
+    const TemporaryDirectory folder;
+    constexpr std::uint32_t deeper = 0x80000000, noneOfThem = 77;
+    struct Resources {
+        std::uint32_t address = 0x2140, type = 24, offset = deeper | 0x18, id = 2;
+        std::uint16_t count = 1;
+    };
+    const auto hasManifest = [&](const Resources& resources) {
+        std::string bytes = peLibrary({});
+        put(bytes, peOptional + 128, resources.address);
+        put<std::uint16_t>(bytes, peData + 0x140 + 14, resources.count);
+        put(bytes, peData + 0x150, resources.type);
+        put(bytes, peData + 0x154, resources.offset);
+        put<std::uint16_t>(bytes, peData + 0x158 + 14, 1);
+        put(bytes, peData + 0x168, resources.id);
+        const LibraryImage image = readLibraryImage(folder.write("image", bytes));
+        EXPECT_EQ(image.damage, L"");
+        return image.hasManifest;
+    };
+    EXPECT_TRUE(hasManifest({}));
+    EXPECT_FALSE(hasManifest({.address = 0}));
+    EXPECT_FALSE(hasManifest({.address = 0x9000}));
+    EXPECT_FALSE(hasManifest({.type = 16}));
+    EXPECT_FALSE(hasManifest({.offset = 0x18})); // a resource, not a table
+    EXPECT_FALSE(hasManifest({.id = 1}));        // the manifest of a program
+    EXPECT_FALSE(hasManifest({.count = 0}));
+    EXPECT_FALSE(hasManifest({.type = noneOfThem, .count = 0xFFFF})); // ends with the section
+}
+
+TEST(PeImage, HasTheContentOfLongSectionsUpToALimit) {
+    const TemporaryDirectory folder;
+    const auto dataOf = [&](std::uint32_t size) {
+        std::string bytes = peLibrary({});
+        bytes.resize(peData + size);
+        for (std::size_t index = peData + 0x200; index < bytes.size(); ++index)
+            bytes[index] = static_cast<char>(index % 251);
+        put(bytes, peOptional + 56, 0x2000 + size);
+        const std::size_t section = peOptional + 112 + 16 * 8 + 40;
+        put(bytes, section + 8, size);
+        put(bytes, section + 16, size);
+        const std::string content = sectionsOf(folder.write("image", bytes), ".data");
+        return content.empty()                   ? std::string("nothing")
+               : content == bytes.substr(peData) ? std::string("all")
+                                                 : "something else";
+    };
+    EXPECT_EQ(dataOf(0x200), "all");
+    EXPECT_EQ(dataOf(0x21000), "all");
+    EXPECT_EQ(dataOf(std::uint32_t{mostSectionBytes}), "all");
+    EXPECT_EQ(dataOf(std::uint32_t{mostSectionBytes} + 0x200), "nothing");
+    EXPECT_EQ(sectionsOf(folder.write("image", "neither format"), ".data"), "");
+}
+
 INSTANTIATE_TEST_SUITE_P(Formats, Image, ::testing::Values(ImageFormat::elf, ImageFormat::pe),
                          [](const auto& format) {
                              return format.param == ImageFormat::elf ? "Elf" : "Pe";
