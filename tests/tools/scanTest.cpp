@@ -365,6 +365,17 @@ TEST_F(Scan, KeepsVerdictsBesideTheListInAFileThatMayBeLostOrDamaged) {
     }
 }
 
+TEST_F(Scan, ReadsAVerdictsFileWithAnyNumberOfMembers) {
+    add(L"crashesInEntryPoint");
+    scan(options());
+    const std::string kept = contentOf(verdictsFileOf(list()));
+    std::string many = "{";
+    for (int member = 0; member < 600'000; ++member)
+        many += "\"" + std::to_string(member) + "\": 0, ";
+    std::ofstream(verdictsFileOf(list()), std::ios::binary) << many << kept.substr(1);
+    EXPECT_EQ(verdicts(scan(options())).begin()->second, Verdict::crashed);
+}
+
 TEST_F(Scan, ForgetsLibrariesThatHaveGone) {
     const auto file = add(L"goodWithKit");
     add(L"countedDescription");

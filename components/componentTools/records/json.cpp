@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
+/// The library does the work. All JSON is written in ASCII.
 #include "components/componentTools/records/json.h"
 
 #include <istream>
@@ -17,7 +18,7 @@ std::string asciiOf(const Json& value) {
     return value.dump(-1, ' ', true, Json::error_handler_t::replace);
 }
 
-std::string linesOf(const Json& value) {
+std::string linesOf(const OrderedJson& value) {
     return value.dump(2, ' ', true) + "\n";
 }
 

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
-/// The JSON of stored files and of messages between processes: one type for all sources, with its
-/// reader and writer compiled once, because each source that instantiates them takes seconds.
+/// The JSON of stored files and of messages between processes. Its reader and writers are compiled
+/// once, because each source that instantiates them takes seconds.
 #pragma once
 
 #include <iosfwd>
@@ -10,8 +10,12 @@
 
 namespace Mz::Tools {
 
-/// Members keep the order in which they are added.
-using Json = nlohmann::ordered_json;
+/// What was read, and messages. A file or a process may send any number of members, so they are
+/// found in logarithmic time.
+using Json = nlohmann::json;
+
+/// What is written for people: members keep the order in which they are added.
+using OrderedJson = nlohmann::ordered_json;
 
 /// \throws Json::exception if the text is invalid
 Json jsonIn(std::string_view text);
@@ -26,7 +30,7 @@ Json jsonIn(std::istream& input);
 std::string asciiOf(const Json& value);
 
 /// Returns the value in ASCII for a file that people can read: indented, with an end of line.
-/// \throws Json::exception if a text is invalid UTF-8
-std::string linesOf(const Json& value);
+/// \throws OrderedJson::exception if a text is invalid UTF-8
+std::string linesOf(const OrderedJson& value);
 
 } // namespace Mz::Tools

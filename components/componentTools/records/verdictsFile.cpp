@@ -159,7 +159,7 @@ Finding disabledFinding(const DisabledComponent& component) {
 
 void writeVerdicts(const std::filesystem::path& file, const RecordedLibraries& libraries,
                    const DisabledComponents& disabled, const std::string& judgement) {
-    Json entries = Json::array(), choices = Json::array();
+    OrderedJson entries = OrderedJson::array(), choices = OrderedJson::array();
     for (const DisabledComponent& component : disabled)
         choices.push_back({{"directory", toUtf8(component.directory)},
                            {"fileName", toUtf8(component.fileName)},
@@ -175,7 +175,7 @@ void writeVerdicts(const std::filesystem::path& file, const RecordedLibraries& l
                                {"words", toUtf8(library.kept->words)},
                                {"sentence", toUtf8(sentenceOf(*library.kept))},
                                {"cure", toUtf8(cureOf(*library.kept))}});
-    Json all{{"version", version}, {"libraries", entries}, {"disabled", choices}};
+    OrderedJson all{{"version", version}, {"libraries", entries}, {"disabled", choices}};
     if (!judgement.empty())
         all["judgement"] = judgement;
     replaceChanged(file, linesOf(all));

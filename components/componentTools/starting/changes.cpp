@@ -63,14 +63,14 @@ Seen readSeen(const std::filesystem::path& file) {
 }
 
 void writeSeen(const std::filesystem::path& file, const Seen& seen) {
-    Json entries = Json::array();
+    OrderedJson entries = OrderedJson::array();
     for (const auto& [name, status] : seen.components)
         entries.push_back({{"directory", toUtf8(name.first)},
                            {"fileName", toUtf8(name.second)},
                            {"time", status.first},
                            {"size", status.second},
                            {"changed", seen.changed.contains(name)}});
-    const Json all{{"version", version}, {"components", entries}};
+    const OrderedJson all{{"version", version}, {"components", entries}};
     try {
         replaceFile(file, linesOf(all));
     } catch (const QrStreamEx&) {
