@@ -12,6 +12,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cerrno>
 #include <fstream>
 #include <iterator>
@@ -100,6 +101,34 @@ TEST_P(FilesWithFailingCalls, AreImportedWhollyOrNotAtAll) {
         EXPECT_TRUE(importer->import(name.c_str(), nullptr, found)) << attempt.failed;
     });
     EXPECT_GE(failures, 4);
+}
+
+TEST_P(FilesWithFailingCalls, AreImportedUnderAPolicyOrTheReportNamesTheBuilderThatFailed) {
+    Kit::initialize(components / "kitImporters");
+    const auto file = folder.write("input.a", "A=take");
+    // So that the libraries are loaded.
+    ASSERT_TRUE(Kit::importFile(L"script", file));
+    int failedReads = 0;
+    const int failures = failEachCall(GetParam(), [&](CallAttempt& attempt) {
+        const Kit::ImportResult result =
+            attempt.run([&] { return Kit::importFile(L"script", file); });
+        EXPECT_TRUE(result || !attempt.failed.empty());
+        if (attempt.failed.starts_with("read") && GetParam() != EINTR) {
+            ++failedReads;
+            EXPECT_EQ(std::count_if(result.builders.begin(), result.builders.end(),
+                                    [](const Kit::BuilderReport& report) {
+                                        return (report.answer == Kit::BuilderAnswer::failed ||
+                                                report.answer ==
+                                                    Kit::BuilderAnswer::failedToAnswer) &&
+                                               !report.reason.empty();
+                                    }),
+                      1)
+                << attempt.failed;
+        }
+        EXPECT_TRUE(Kit::importFile(L"script", file)) << attempt.failed;
+    });
+    EXPECT_GE(failures, 4);
+    EXPECT_EQ(failedReads > 0, GetParam() != EINTR);
 }
 
 INSTANTIATE_TEST_SUITE_P(, FilesWithFailingCalls,
