@@ -12,7 +12,6 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include <algorithm>
 #include <cerrno>
 #include <fstream>
 #include <iterator>
@@ -103,32 +102,23 @@ TEST_P(FilesWithFailingCalls, AreImportedWhollyOrNotAtAll) {
     EXPECT_GE(failures, 4);
 }
 
-TEST_P(FilesWithFailingCalls, AreImportedUnderAPolicyOrTheReportNamesTheBuilderThatFailed) {
+// The builder takes what it could read of an input for the whole, so it must not get a part.
+TEST_P(FilesWithFailingCalls, AreNeverReadInPartUnderAPolicy) {
     Kit::initialize(components / "kitImporters");
     const auto file = folder.write("input.a", "A=take");
-    // So that the libraries are loaded.
-    ASSERT_TRUE(Kit::importFile(L"script", file));
-    int failedReads = 0;
+    const auto import = [&] { return Kit::importFile(L"script", file); };
+    ASSERT_TRUE(import()); // So that the libraries are loaded.
+    int refused = 0;
     const int failures = failEachCall(GetParam(), [&](CallAttempt& attempt) {
-        const Kit::ImportResult result =
-            attempt.run([&] { return Kit::importFile(L"script", file); });
+        const Kit::ImportResult result = attempt.run(import);
         EXPECT_TRUE(result || !attempt.failed.empty());
-        if (attempt.failed.starts_with("read") && GetParam() != EINTR) {
-            ++failedReads;
-            EXPECT_EQ(std::count_if(result.builders.begin(), result.builders.end(),
-                                    [](const Kit::BuilderReport& report) {
-                                        return (report.answer == Kit::BuilderAnswer::failed ||
-                                                report.answer ==
-                                                    Kit::BuilderAnswer::failedToAnswer) &&
-                                               !report.reason.empty();
-                                    }),
-                      1)
-                << attempt.failed;
-        }
-        EXPECT_TRUE(Kit::importFile(L"script", file)) << attempt.failed;
+        refused += attempt.failed == "read" && !result ? 1 : 0;
+        EXPECT_TRUE(import()) << attempt.failed;
     });
     EXPECT_GE(failures, 4);
-    EXPECT_EQ(failedReads > 0, GetParam() != EINTR);
+    // When it is asked and when it imports, one call reads the input and another one its end. The
+    // builder ignores failures after that.
+    EXPECT_EQ(refused, GetParam() == EINTR ? 0 : 4);
 }
 
 INSTANTIATE_TEST_SUITE_P(, FilesWithFailingCalls,
