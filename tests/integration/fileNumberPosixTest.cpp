@@ -15,8 +15,8 @@ ino_t commonNumber = 0;
 
 } // namespace
 
-/// Replaces the C library's function in this program.
-extern "C" dirent* readdir(DIR* directory) {
+/// Replaces the C library's function in this program and its libraries.
+extern "C" [[gnu::visibility("default")]] dirent* readdir(DIR* directory) {
     using Function = dirent*(DIR*);
     static const auto next = reinterpret_cast<Function*>(::dlsym(RTLD_NEXT, "readdir"));
     dirent* const entry = next(directory);

@@ -76,6 +76,9 @@ TEST(Utf8, ReplacesEachHalfOfAPairThatIsAlone) {
                                                                "b")
             << half;
     }
+    const std::wstring pair{static_cast<wchar_t>(0xD83D), static_cast<wchar_t>(0xDE00)};
+    EXPECT_EQ(toUtf8(std::wstring_view(pair).substr(0, 1)), "\xEF\xBF\xBD")
+        << "the end of the text";
     const std::wstring highs(2, static_cast<wchar_t>(0xDBFF));
     EXPECT_EQ(toUtf8(highs), "\xEF\xBF\xBD\xEF\xBF\xBD");
 }
