@@ -5,6 +5,7 @@
 #include <gtest/gtest.h>
 
 #include <cmath>
+#include <cstdlib>
 #include <cstring>
 #include <limits>
 
@@ -296,6 +297,25 @@ TEST(FormattedRead, NumbersOfManyDigitsAreExactUpToTheirWidth) {
         expectNumber(std::string(number) + " ", std::stoull(number), " ");
     expectNumber("18446744073709551616 ", 0, " ");
     expectNumber("00000000000000000000000007 ", 7, " ");
+}
+
+TEST(FormattedRead, RealNumbersOfMoreDigitsThanAnIntegerHoldsAreExact) {
+    const std::string digits = "99999999999999999999999999";
+    for (std::size_t count = 15; count <= digits.size(); ++count)
+        for (std::size_t point = 0; point <= count; ++point) {
+            const std::string text =
+                digits.substr(0, point) + "." + digits.substr(point, count - point);
+            Reading<QrTextStream> in(text + " ");
+            double value = 0;
+            in.stream >> value;
+            EXPECT_EQ(value, std::strtod(text.c_str(), nullptr)) << text;
+        }
+    for (std::size_t count = 15; count <= digits.size(); ++count) {
+        Reading<QrTextStream> in(digits.substr(0, count) + " ");
+        double value = 0;
+        in.stream >> value;
+        EXPECT_EQ(value, std::strtod(digits.substr(0, count).c_str(), nullptr)) << count;
+    }
 }
 
 TEST(FormattedRead, ANumberMayFollowAnyAmountOfWhiteSpace) {
