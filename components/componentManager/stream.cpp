@@ -195,8 +195,9 @@ int QrStream::writeText(const wchar_t* text, int length) {
 int QrStream::writeNumber(char* begin, const char* end) {
     const char* const digits = begin + 1;
     const int length = static_cast<int>(end - digits);
-    // The words for infinities and NaNs are text for an IO that passes numbers on.
-    const bool isFinite = end[-1] >= '0' && end[-1] <= '9';
+    // The words for infinities and NaNs, which end in a letter, are text for an IO that passes
+    // numbers on.
+    const bool isFinite = end[-1] <= '9';
     const NumberPath path(io());
     const bool mayPass = currentText == TextKind::Value && isFinite;
     const ByteSink sink(mayPass ? path.output() : io());

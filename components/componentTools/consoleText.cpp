@@ -5,12 +5,15 @@
 
 #include "components/componentTools/platform/system.h"
 
+#include <cstdint>
+
 namespace Mz::Tools {
 
 namespace {
 
 bool isControl(wchar_t character) {
-    return character < L' ' || (character >= 0x7F && character < 0xA0);
+    const auto code = static_cast<std::uint32_t>(character); // A `wchar_t` may be negative.
+    return code < 0x20 || (code >= 0x7F && code < 0xA0);
 }
 
 } // namespace

@@ -118,6 +118,26 @@ TEST_F(PosixDiscovery, KeepsBothRecordsOfSuchNamesFromAnEarlierStart) {
     EXPECT_EQ(maker(kitUid), "kit");
 }
 
+TEST_F(PosixDiscovery, KeepsTheRecordsOfAnyNumberOfSuchNames) {
+    const auto first = add(L"goodWithKit", "LIB.so");
+    const auto second = add(L"countedDescription", "LIb.so");
+    const auto third = add(L"goodByHand", "lIB.so");
+    const auto fourth = add(L"manyBuilders", "lib.so");
+    recordBuilder(record(first), kitUid, L"first");
+    recordBuilder(record(second), countedUid, L"second");
+    recordBuilder(record(third), goodUid, L"third");
+    recordBuilder(record(fourth), faultyUid, L"fourth");
+    initialize();
+    EXPECT_EQ(names(), (Names{L"first", L"second", L"third", L"fourth"}));
+    std::vector<platform::NativePath> paths;
+    for (const ComponentLibrary& library : manager->libraries)
+        paths.push_back(library.foundPath);
+    EXPECT_EQ(paths,
+              (std::vector{first.native(), second.native(), third.native(), fourth.native()}));
+    EXPECT_EQ(maker(kitUid), "kit");
+    EXPECT_EQ(maker(goodUid), "good");
+}
+
 TEST_F(PosixDiscovery, KeepsTheRecordsOfSuchFoldersToo) {
     std::filesystem::create_directory(folder.path() / "Plug");
     std::filesystem::create_directory(folder.path() / "plug");

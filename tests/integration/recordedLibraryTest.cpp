@@ -478,6 +478,42 @@ TEST_F(RecordedLibrary, ChangedThatUsesAHeldRecordWhileItIsLoadedIsRegisteredOnc
     EXPECT_FALSE(isMapped(file));
 }
 
+ComponentManager* starting = nullptr;
+std::istringstream* listDuringStart = nullptr;
+
+/// Reads a list while the manager starts.
+void readList(const char* event) {
+    if (std::string(event) != "enumerate" || !starting)
+        return;
+    QrInBuffer io(listDuringStart);
+    QrBinaryStream stream(&io);
+    starting->readRecords(stream);
+}
+
+TEST_F(RecordedLibrary, IsNotReadDuringTheStart) {
+    add(L"countedDescription");
+    initialize();
+    std::ostringstream list;
+    {
+        QrOutBuffer io(&list);
+        QrBinaryStream stream(&io);
+        manager->writeRecords(stream);
+    }
+    restart();
+    std::istringstream input(list.str());
+    listDuringStart = &input;
+    starting = manager.get();
+    setHook(readList);
+    initialize();
+    setHook(nullptr);
+    starting = nullptr;
+    listDuringStart = nullptr;
+    EXPECT_EQ(static_cast<std::streamoff>(input.tellg()), 0);
+    EXPECT_GE(noted("enumerate"), 2);
+    EXPECT_EQ(manager->libraries.size(), 1u);
+    EXPECT_EQ(names(), (Names{L"counted"}));
+}
+
 std::vector<const ComponentManager::Builder*>* seenWhileGrowing = nullptr;
 ComponentManager* growing = nullptr;
 

@@ -434,6 +434,16 @@ TEST_F(KitCompanions, OfAFileInTheCurrentFolderAreThere) {
     std::filesystem::current_path(folder.path().parent_path());
 }
 
+TEST(KitCompanionNames, AreBesideTheInput) {
+    using Kit::detail::besideName;
+    EXPECT_EQ(besideName(L"a/b.x", L"c"), L"a/c");
+    EXPECT_EQ(besideName(L"b.x", L"c"), L"./c");
+    EXPECT_EQ(besideName(L"/b.x", L"c"), L"/c");
+    // A character that the locale lacks, where file names are in the locale's bytes.
+    const std::wstring lacking = L"\u65E5/b.x";
+    EXPECT_EQ(besideName(lacking, L"c"), toNativePath(lacking) ? L"\u65E5/c" : L"");
+}
+
 TEST(KitCompanionNames, StayBelowAFolder) {
     for (const wchar_t* name : {L"a", L"a/b", L"a\\b", L".", L"./a", L"a/", L".a", L"..a", L"a.."})
         EXPECT_TRUE(Kit::detail::staysBelow(name)) << toNarrow(name, '?');

@@ -86,6 +86,26 @@ TYPED_TEST(Form, OfFormattedTextAtTheEndOfAnObjectComesBack) {
     this->expectComesBack(L"if");
 }
 
+TYPED_TEST(Form, IsTheSameWithFormattedTextThatIsEmpty) {
+    const auto bytes = [](bool withEmptyText) {
+        Scripted object(nodeUid, 2, [&](QrStream& s) {
+            const auto writeNothing = [&] {
+                if (withEmptyText) {
+                    EXPECT_EQ(s.formattedWrite(L""), 0);
+                }
+            };
+            writeNothing();
+            s.formattedWrite(L"%d,", 3);
+            writeNothing();
+            s << 5;
+            writeNothing();
+            s << true;
+        });
+        return saved<TypeParam>(&object);
+    };
+    EXPECT_EQ(bytes(true), bytes(false));
+}
+
 TYPED_TEST(Form, ThatHasNoWayBackIsRefusedWhenItIsWritten) {
     EXPECT_THAT(this->refusal(L"w"), HasSubstr("never read back"));
     if (!this->isBinary) {

@@ -191,7 +191,14 @@ TEST(NumberRelays, ApplyWhileTheyExist) {
     }
     stream << 3;
     EXPECT_EQ(io.calls, 3);
-    EXPECT_EQ(sink.str(), "1 2 inf 3");
+    {
+        const QrNumberRelay again(typeid(Passing), {Passing::target, nullptr, nullptr});
+        stream << 4;
+        EXPECT_EQ(io.calls, 3);
+    }
+    stream << 5;
+    EXPECT_EQ(io.calls, 4);
+    EXPECT_EQ(sink.str(), "1 2 inf 3 4 5");
 }
 
 TEST(NumberRelays, BeyondTheRoomForThemHaveNoEffect) {

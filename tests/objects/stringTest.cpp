@@ -100,6 +100,27 @@ TEST_F(Strings, ThatLookLikeNumbersAreRefusedInTextAsWell) {
                 HasSubstr("a text stream cannot carry strings exactly"));
 }
 
+TEST_F(Strings, OfFormattedTextHaveNoWordForAnInfiniteNumber) {
+    const auto object = [](const wchar_t* text) {
+        return Scripted(nodeUid, 1, [text](QrStream& s) { s.formattedWrite(L"%s", text); });
+    };
+    for (const wchar_t* text :
+         {L"inf",  L"nan",  L"INF",  L"NaN",  L"-inf", L"inf ",  L"a inf b", L"(nan)",
+          L"@inf", L"[inf", L"`inf", L"{inf", L"/inf", L":inf",  L"^inf",    L"inf@",
+          L"nan[", L"inf`", L"nan{", L"inf/", L"nan:", L"x,inf", L"info nan"}) {
+        const Scripted refused = object(text);
+        EXPECT_THROW(saved<QrTextStream>(&refused), QrStreamEx::ExWriteError)
+            << testing::PrintToString(text);
+        EXPECT_NO_THROW(saved<QrBinaryStream>(&refused)) << testing::PrintToString(text);
+    }
+    for (const wchar_t* text :
+         {L"info", L"ainf", L"zinf", L"Ainf", L"Zinf", L"0inf", L"9inf", L"_inf", L"inf_", L"nan0",
+          L"nan9", L"nanz", L"in", L"na", L"nann"}) {
+        const Scripted accepted = object(text);
+        EXPECT_NO_THROW(saved<QrTextStream>(&accepted)) << testing::PrintToString(text);
+    }
+}
+
 TEST_F(Strings, OutsideTheLocaleAreRefused) {
     // In the "C" locale a character is one byte.
     EXPECT_THAT(refusal<QrBinaryStream>(L"a\x100"), HasSubstr("Error writing stream."));

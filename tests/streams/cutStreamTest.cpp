@@ -6,6 +6,8 @@
 
 #include <cctype>
 #include <limits>
+#include <sstream>
+#include <utility>
 
 namespace {
 
@@ -82,6 +84,45 @@ TEST(CutStream, BinaryValuesRaiseOrCountShort) {
     cutBinary<bool>();
     cutBinary<std::wstring>();
     cutBinary<wchar_t>();
+}
+
+/// An input that reports another number of bytes than it has read.
+class MisreportingInput final : public Mz::QrInBuffer {
+  public:
+    using Mz::QrInBuffer::QrInBuffer;
+    using Mz::QrInBuffer::read;
+    int read(void* data, int size) override {
+        Mz::QrInBuffer::read(data, size);
+        return claim;
+    }
+
+    int claim = 0;
+};
+
+TEST(CutStream, ACountedReadBelievesNoImpossibleNumberOfBytes) {
+    const auto count = [](int claim) {
+        std::istringstream source(fromHex("00 00 00 01 00 00 00 02 00 00 00 03 01 00 01"));
+        MisreportingInput io(&source);
+        QrBinaryStream stream(&io);
+        io.claim = claim;
+        int numbers[4] = {5, 5, 5, 5};
+        const int got = stream.read(numbers[0], 3);
+        for (int index = 0; index < got; ++index)
+            EXPECT_EQ(numbers[index], index + 1) << claim;
+        EXPECT_EQ(numbers[3], 5);
+        bool flags[4] = {true, true, true, true};
+        const int gotFlags = stream.read(flags[0], 3);
+        for (int index = 0; index < gotFlags; ++index)
+            EXPECT_EQ(flags[index], index != 1) << claim;
+        return std::pair(got, gotFlags);
+    };
+    EXPECT_EQ(count(-5), std::pair(0, 0));
+    EXPECT_EQ(count(0), std::pair(0, 0));
+    EXPECT_EQ(count(3), std::pair(0, 3));
+    EXPECT_EQ(count(7), std::pair(1, 3));
+    EXPECT_EQ(count(12), std::pair(3, 3));
+    EXPECT_EQ(count(1000), std::pair(3, 3));
+    EXPECT_EQ(count(std::numeric_limits<int>::max()), std::pair(3, 3));
 }
 
 TEST(CutStream, ACountedReadCountsWholeValuesOnly) {

@@ -5,6 +5,7 @@
 #include <gtest/gtest.h>
 
 #include <cmath>
+#include <cstdlib>
 #include <cstring>
 #include <limits>
 
@@ -149,6 +150,45 @@ TEST(FormattedRead, StoresTheWidthThatTheModifierNames) {
     expect<int64>("0x7fffffffffffffff", L"%I64i", std::numeric_limits<int64>::max());
 }
 
+TEST(FormattedRead, ALongHasTheSignOfItsConversion) {
+    expect<long>("-2", L"%lD", -2);
+    expect<long>("4294967294", L"%lD", -2);
+    expect<long>("0xFFFFFFFE", L"%lI", -2);
+    expect<long>("0xFFFFFFFE", L"%li", -2);
+    expect<unsigned long>("-1", L"%lu", 0xFFFFFFFFUL);
+    expect<unsigned long>("-1", L"%9lu", 0xFFFFFFFFUL);
+    expect<unsigned long>("-1", L"%lU", 0xFFFFFFFFUL);
+    expect<unsigned long>("-1", L"%lx", 0xFFFFFFFFUL);
+    expect<unsigned long>("37777777777", L"%lo", 0xFFFFFFFFUL);
+}
+
+TEST(FormattedRead, TheCharactersBesideTheDigitsAreNone) {
+    for (const char* text : {"/", ":", "@", "G", "`", "g"}) {
+        expectNone(text, L"%x", text);
+        expect(std::string("A") + text, L"%x", 10, text);
+        expect(std::string("7") + text, L"%3d", 7, text);
+        expect(std::string("7") + text, L"%d", 7, text);
+        expect(std::string("7") + text, L"%lg", 7.0, text);
+    }
+    expect("09afAF", L"%x", 0x09AFAF);
+    expectNone("\x08"
+               "1",
+               L"%d",
+               "\x08"
+               "1");
+    expectNone("\x0E"
+               "1",
+               L"%d",
+               "\x0E"
+               "1");
+}
+
+TEST(FormattedRead, AWidthOfZeroIsNone) {
+    expect("12", L"%0d", 12);
+    expect("1.25", L"%0lg", 1.25);
+    expect(" a", L"%0c", L' ', "a");
+}
+
 TEST(FormattedRead, NumbersAreTakenModuloTheirWidth) {
     expect<int>("4294967297", L"%d", 1);
     expect<int>("2147483648", L"%d", std::numeric_limits<int>::min());
@@ -187,10 +227,100 @@ TEST(FormattedRead, ReadsRealNumbers) {
     expect("0e99999999999999999999", L"%lg", 0.0);
     expect("4.9406564584124654e-324", L"%lg", std::numeric_limits<double>::denorm_min());
     expect("2.2250738585072011e-308", L"%lg", 2.2250738585072011e-308);
+    expect("1.5", L"%hg", 1.5F);
+    // The digits decide together with the exponent.
+    const std::string zeros(320, '0');
+    expect("1" + zeros + "e-700", L"%lg", 0.0);
+    expect("1" + zeros + "e100", L"%lg", std::numeric_limits<double>::infinity());
+    expect("0." + zeros + "1e700", L"%lg", std::numeric_limits<double>::infinity());
+    expect("0." + zeros + "1e-100", L"%lg", 0.0);
+    expect("000000." + zeros + "1E+700", L"%lg", std::numeric_limits<double>::infinity());
+    expect("1" + zeros + "." + "0000e-330", L"%lg", 1e-10);
     for (const char* none : {"", ".", "e5", "x", "inf", "nan", "-", "+.e1"})
         EXPECT_EQ(Scan(none, L"%lg", std::nullptr_t{}).assigned, 0) << none;
     expectNone(".x", L"%lg", "x");
     expectNone("inf", L"%lg", "inf");
+}
+
+TEST(FormattedRead, ANumberOutsideTheRangeIsReadBySingleValuesToo) {
+    const auto real = []<class T>(const char* text, T value) {
+        Reading<QrTextStream> in(text);
+        in.stream >> value;
+        EXPECT_EQ(in.rest(), " ") << text;
+        return value;
+    };
+    EXPECT_EQ(real("1e400 ", 0.0F), std::numeric_limits<float>::infinity());
+    EXPECT_EQ(real("-1e400 ", 0.0F), -std::numeric_limits<float>::infinity());
+    EXPECT_EQ(real("1e39 ", 0.0F), std::numeric_limits<float>::infinity());
+    EXPECT_EQ(real("1e-400 ", 1.0F), 0.0F);
+    EXPECT_EQ(real("1e400 ", 0.0), std::numeric_limits<double>::infinity());
+    EXPECT_EQ(real("-1e-400 ", 1.0), 0.0);
+}
+
+TEST(FormattedRead, SingleValuesTakeNegativeNumbersModuloTheirWidth) {
+    Reading<QrTextStream> in("-1 -2 -3 -4 ");
+    int number = 0;
+    unsigned int positive = 0;
+    int64 wide = 0;
+    unsigned long long positiveWide = 0;
+    in.stream >> number >> positive >> wide >> positiveWide;
+    EXPECT_EQ(number, -1);
+    EXPECT_EQ(positive, 0xFFFFFFFEU);
+    EXPECT_EQ(wide, -3);
+    EXPECT_EQ(positiveWide, 0xFFFFFFFFFFFFFFFCULL);
+}
+
+/// Reads a number as a single value, which takes several digits at a time.
+void expectNumber(const std::string& text, unsigned long long number, std::string_view rest) {
+    Reading<QrTextStream> in(text);
+    unsigned long long value = 0;
+    in.stream >> value;
+    EXPECT_EQ(value, number) << text;
+    EXPECT_EQ(in.rest(), rest) << text;
+}
+
+TEST(FormattedRead, SeveralDigitsAtATimeEndAtAnyOtherByte) {
+    const std::string digits = "1234567898765432123";
+    for (std::size_t length = 1; length < 18; ++length)
+        for (int byte = 0; byte < 256; ++byte)
+            if (byte < '0' || byte > '9') {
+                const std::string rest = static_cast<char>(byte) + std::string("987654321 ");
+                expectNumber(digits.substr(0, length) + rest, std::stoull(digits.substr(0, length)),
+                             rest);
+            }
+}
+
+TEST(FormattedRead, NumbersOfManyDigitsAreExactUpToTheirWidth) {
+    for (const char* number :
+         {"99999999", "100000000", "999999999999999999", "1000000000000000000",
+          "9999999999999999999", "10000000000000000000", "18446744073709551615"})
+        expectNumber(std::string(number) + " ", std::stoull(number), " ");
+    expectNumber("18446744073709551616 ", 0, " ");
+    expectNumber("00000000000000000000000007 ", 7, " ");
+}
+
+TEST(FormattedRead, RealNumbersOfMoreDigitsThanAnIntegerHoldsAreExact) {
+    const std::string digits = "99999999999999999999999999";
+    for (std::size_t count = 15; count <= digits.size(); ++count)
+        for (std::size_t point = 0; point <= count; ++point) {
+            const std::string text =
+                digits.substr(0, point) + "." + digits.substr(point, count - point);
+            Reading<QrTextStream> in(text + " ");
+            double value = 0;
+            in.stream >> value;
+            EXPECT_EQ(value, std::strtod(text.c_str(), nullptr)) << text;
+        }
+    for (std::size_t count = 15; count <= digits.size(); ++count) {
+        Reading<QrTextStream> in(digits.substr(0, count) + " ");
+        double value = 0;
+        in.stream >> value;
+        EXPECT_EQ(value, std::strtod(digits.substr(0, count).c_str(), nullptr)) << count;
+    }
+}
+
+TEST(FormattedRead, ANumberMayFollowAnyAmountOfWhiteSpace) {
+    for (std::size_t blanks = 0; blanks < 80; ++blanks)
+        expectNumber(std::string(blanks, ' ') + "1234 5", 1234, " 5");
 }
 
 TEST(FormattedRead, ZeroKeepsItsSign) {
@@ -400,6 +530,10 @@ TEST(FormattedRead, TheCountLeavesTheLookAheadOut) {
     Guarded<int64> wide;
     EXPECT_EQ(Scan("ab", L"ab%I64n", static_cast<int64*>(wide)).assigned, 0);
     EXPECT_EQ(wide.get(), 2);
+    Guarded<long> native;
+    EXPECT_EQ(Scan("ab", L"ab%ln", static_cast<long*>(native)).assigned, 0);
+    EXPECT_EQ(native.get(), 2);
+    EXPECT_TRUE(native.intact());
 }
 
 TEST(FormattedRead, ANulEndsTextAndIsLeftUnread) {

@@ -4,8 +4,10 @@
 
 #include <gmock/gmock.h>
 
+#include <cctype>
 #include <cmath>
 #include <cstdint>
+#include <cstdlib>
 #include <limits>
 
 namespace {
@@ -55,6 +57,30 @@ TEST(FormattedWrite, KnowsTheSizesOfIntegers) {
               "-2147483648|4294967295|-1");
 }
 
+TEST(FormattedWrite, TakesTheLowBitsOfAShortSizeInEveryConversion) {
+    EXPECT_EQ(
+        formatted(L"%hd|%hi|%hu|%ho|%hx|%hX", 0x1ABCD, 0x1ABCD, 0x1ABCD, 0x1ABCD, 0x1ABCD, 0x1ABCD),
+        "-21555|-21555|43981|125715|abcd|ABCD");
+    EXPECT_EQ(formatted(L"%hhd|%hhi|%hhu|%hho|%hhx|%hhX", 0x1AB, 0x1AB, 0x1AB, 0x1AB, 0x1AB, 0x1AB),
+              "-85|-85|171|253|ab|AB");
+    EXPECT_EQ(formatted(L"%hd|%hd|%hu|%hu", 32767, 32768, 65535, 65536), "32767|-32768|65535|0");
+    EXPECT_EQ(formatted(L"%hhd|%hhd|%hhu|%hhu", 127, 128, 255, 256), "127|-128|255|0");
+    EXPECT_EQ(formatted(L"%#hx|%#hho|%05hhd", 0xFFFF1, 0x108, 0x1FF), "0xfff1|010|-0001");
+    // The sizes of characters and of real numbers are none of integers.
+    EXPECT_EQ(formatted(L"%wd|%Ld|%wu", -1, -2, 3U), "-1|-2|3");
+}
+
+TEST(FormattedWrite, CombinesFlags) {
+    EXPECT_EQ(formatted(L"%+ d|% +d|% d", 5, 5, -5), "+5|+5|-5");
+    EXPECT_EQ(formatted(L"%-05d|%0-5d|%--5d|%-+ #08x|", 42, 42, 42, 255),
+              "42   |42   |42   |0xff    |");
+    EXPECT_EQ(formatted(L"%+05d|% 05d|%+-5d|", 42, 42, 42), "+0042| 0042|+42  |");
+    EXPECT_EQ(formatted(L"%#.3o|%#.1o|%#.0o|%#.0x|%.0u", 8, 8, 0, 0, 0), "010|010|0||");
+    EXPECT_EQ(formatted(L"%2d|%3d|%4d", 123, 123, 123), "123|123| 123");
+    EXPECT_EQ(formatted(L"%-2d|%-3d|%-4d|", 123, 123, 123), "123|123|123 |");
+    EXPECT_EQ(formatted(L"%.2d|%.3d|%.4d", 123, 123, 123), "123|123|0123");
+}
+
 TEST(FormattedWrite, PutsRealNumbersAlikeOnEveryPlatform) {
     EXPECT_EQ(formatted(L"%e|%.0e|%#.0e|%E", 1e10, 1e10, 1e10, 1e-5),
               "1.000000e+10|1e+10|1.e+10|1.000000E-05");
@@ -74,6 +100,69 @@ TEST(FormattedWrite, PutsRealNumbersAlikeOnEveryPlatform) {
 TEST(FormattedWrite, TakesLongDoublesToo) {
     EXPECT_EQ(formatted(L"%Lf|%.3Le|%Lg|%10.2Lf", 1.5L, 1e10L, 0.1L, -2.25L),
               "1.500000|1.000e+10|0.1|     -2.25");
+}
+
+TEST(FormattedWrite, PutsLongDoublesInEveryConversion) {
+    EXPECT_EQ(formatted(L"%Lf|%LF|%Le|%LE|%Lg|%LG", 1.5L, -1.5L, 0.15625L, -0.15625L, 1e-5L, 1e20L),
+              "1.500000|-1.500000|1.562500e-01|-1.562500E-01|1e-05|1E+20");
+    EXPECT_EQ(formatted(L"%#.0Lf|%#.0Le|%#Lg|%#.3Lg|%#.0Lg", 2.0L, 2.0L, 1.0L, 1e10L, 1.0L),
+              "2.|2.e+00|1.00000|1.00e+10|1.");
+    EXPECT_EQ(
+        formatted(L"%#Lg|%#Lg|%#Lg|%#Lg|%#LG", 0.0001L, 0.00001L, 123456.0L, 999999.5L, 1234567.0L),
+        "0.000100000|1.00000e-05|123456.|1.00000e+06|1.23457E+06");
+    EXPECT_EQ(formatted(L"%+Lf|% Le|%010.2Lf|%-10.2Lf|", 1.5L, 2.5L, -2.25L, 2.25L),
+              "+1.500000| 2.500000e+00|-000002.25|2.25      |");
+    using Limits = std::numeric_limits<long double>;
+    EXPECT_EQ(formatted(L"%Lf|%LE|%Lg|%La|%LA|%05Lg", Limits::infinity(), -Limits::infinity(),
+                        Limits::quiet_NaN(), Limits::infinity(), -Limits::infinity(),
+                        Limits::infinity()),
+              "inf|-INF|nan|inf|-INF|  inf");
+    const auto whole = static_cast<std::size_t>(Limits::max_exponent10) + 1;
+    EXPECT_EQ(formatted(L"%.0Lf", Limits::max()).size(), whole);
+    EXPECT_EQ(formatted(L"%.3Lf", -Limits::max()).size(), whole + 5);
+}
+
+TEST(FormattedWrite, PutsLongDoublesInHexadecimalExactly) {
+    for (const long double value : {1.0L, -0.75L, 0.1L, 1e100L, 0.0L}) {
+        const std::string lower = formatted(L"%La", value);
+        std::string upper = lower;
+        for (char& c : upper)
+            c = static_cast<char>(std::toupper(c));
+        EXPECT_EQ(formatted(L"%LA", value), upper);
+        EXPECT_EQ(lower.find("0x"), value < 0 ? 1U : 0U) << lower;
+        EXPECT_EQ(std::strtold(lower.c_str(), nullptr), value) << lower;
+        EXPECT_NE(formatted(L"%#La", value).find('.'), std::string::npos);
+        EXPECT_EQ(formatted(L"%.3La", value).find('p') - formatted(L"%.3La", value).find('.'), 4U);
+    }
+}
+
+// The leading digit of such a number may be an "e", which is also the mark of an exponent.
+TEST(FormattedWrite, PutsThePointOfAHexadecimalLongDoubleAfterItsDigit) {
+    for (const long double value : {1.0L, 1.25L, 1.5L, 1.75L, 1.875L}) {
+        std::string pointed = formatted(L"%.0La", value);
+        pointed.insert(pointed.find('p'), 1, '.');
+        EXPECT_EQ(formatted(L"%#.0La", value), pointed);
+        EXPECT_EQ(formatted(L"%#.0LA", value).find('.'), 3U);
+    }
+}
+
+TEST(FormattedWrite, PutsTheAlternateFormOfDoubles) {
+    EXPECT_EQ(formatted(L"%#.0g|%#.1g|%#.0a|%#.0E", 1.0, 20.0, 1.0, 3.0),
+              "1.|2.e+01|0x1.p+0|3.E+00");
+    EXPECT_EQ(formatted(L"%#g|%#g|%#g|%#g", 0.0001, 0.00001, 123456.0, 1234567.0),
+              "0.000100000|1.00000e-05|123456.|1.23457e+06");
+    EXPECT_EQ(formatted(L"%#.3g|%#.3g|%#.3g|%#g", 100.0, 999.0, 1000.0, 0.0),
+              "100.|999.|1.00e+03|0.00000");
+    EXPECT_EQ(formatted(L"%#.2f|%#.2e|%#G", 1.0, 1.0, 1e-7), "1.00|1.00e+00|1.00000E-07");
+}
+
+TEST(FormattedWrite, PutsTheSignAndZerosOfRealNumbersBeforeTheirDigits) {
+    EXPECT_EQ(formatted(L"%08a|%+08A|%-8a|", 1.0, 1.0, 1.0), "0x001p+0|+0X01P+0|0x1p+0  |");
+    EXPECT_EQ(formatted(L"%+g|% g|%+ g|% +g|%+g", 1.5, 1.5, 1.5, 1.5, -1.5),
+              "+1.5| 1.5|+1.5|+1.5|-1.5");
+    EXPECT_EQ(formatted(L"%+g|% g|%-6g|%06g", HUGE_VAL, HUGE_VAL, HUGE_VAL, -HUGE_VAL),
+              "+inf| inf|inf   |  -inf");
+    EXPECT_EQ(formatted(L"%.0f", std::numeric_limits<double>::max()).size(), 309U);
 }
 
 TEST(FormattedWrite, SpellsInfinityAndNaN) {
@@ -97,6 +186,32 @@ TEST(FormattedWrite, TextIsWideUnlessItIsSaidToBeNarrow) {
     EXPECT_EQ(formatted(L"%s", L"\xE9"), "\xE9");
 }
 
+TEST(FormattedWrite, TheSizeOfTextIsTheLastWord) {
+    EXPECT_EQ(formatted(L"%hhs|%hhc|%hS|%hC|%hhS", "ab", 'c', "de", 'f', "g"), "ab|c|de|f|g");
+    EXPECT_EQ(formatted(L"%wc|%wC|%lC|%wS", L'a', L'b', L'c', L"de"), "a|b|c|de");
+    EXPECT_EQ(formatted(L"%I64s|%I64S|%Ls|%zc", L"ab", "cd", L"ef", L'g'), "ab|cd|ef|g");
+    // A narrow character is one byte of its argument.
+    EXPECT_EQ(formatted(L"%hc|%C|%hhc", 0x141, 0x142, 0x143), "A|B|C");
+}
+
+TEST(FormattedWrite, PadsTextToItsWidth) {
+    EXPECT_EQ(formatted(L"%05s|%-05s|%03c|%05S", L"ab", L"ab", L'c', "de"),
+              "000ab|ab   |00c|000de");
+    EXPECT_EQ(formatted(L"%3c|%-3c|%1c|%0c", L'a', L'b', L'c', L'd'), "  a|b  |c|d");
+    EXPECT_EQ(formatted(L"%*s|%-*s|%*s|", 4, L"ab", -4, L"cd", -4, L"ef"), "  ab|cd  |ef  |");
+}
+
+TEST(FormattedWrite, TakesAPrecisionFromAnArgument) {
+    EXPECT_EQ(formatted(L"%.*s|%.*s|%.*s", -1, L"ab", 0, L"ab", 1, L"ab"), "ab||a");
+    EXPECT_EQ(formatted(L"%.*f|%.*f|%.*e", -2, 1.5, 0, 2.5, 1, 2.0), "1.500000|2|2.0e+00");
+    EXPECT_EQ(formatted(L"%.d|%.s|%.f|%.x", 0, L"ab", 2.5, 0), "||2|");
+}
+
+TEST(FormattedWrite, APrecisionOfAnyNumberOfDigitsIsALargeOne) {
+    EXPECT_EQ(formatted(L"%.4294967297s|%.99999999999999999999S", L"abc", "def"), "abc|def");
+    EXPECT_EQ(formatted(L"%.00000000000000000000002s", L"abc"), "ab");
+}
+
 TEST(FormattedWrite, NeverReadsTextBeyondItsPrecision) {
     const wchar_t wide[2] = {L'a', L'b'}; // No terminator.
     const char narrow[2] = {'c', 'd'};
@@ -109,12 +224,17 @@ TEST(FormattedWrite, ANullTextIsSpeltOut) {
     EXPECT_EQ(formatted(L"%s|%S|%8s", static_cast<const wchar_t*>(nullptr),
                         static_cast<const char*>(nullptr), static_cast<const wchar_t*>(nullptr)),
               "(null)|(null)|  (null)");
+    EXPECT_EQ(formatted(L"%.3s|%.0S|%.9hs", static_cast<const wchar_t*>(nullptr),
+                        static_cast<const char*>(nullptr), static_cast<const char*>(nullptr)),
+              "(nu||(null)");
 }
 
 TEST(FormattedWrite, LiteralsAndPercentSigns) {
     EXPECT_EQ(formatted(L""), "");
     EXPECT_EQ(formatted(L"100%% sure\n"), "100% sure\n");
     EXPECT_EQ(formatted(L"%y|%5!"), "%y|%5!");
+    EXPECT_EQ(formatted(L"%-+ #08.3I64q|%hhy|%5%"), "%-+ #08.3I64q|%hhy|%");
+    EXPECT_EQ(formatted(L"%.*k|%*!", 3, 4), "%.*k|%*!") << "the numbers are taken all the same";
 }
 
 TEST(FormattedWrite, TheOutputMayBeOfAnyLength) {
@@ -168,6 +288,15 @@ TEST(FormattedWrite, StoresItsCountInTheWidthThatIsSaid) {
     EXPECT_THAT(number, testing::ElementsAre(0x55, 6, 0x55));
 }
 
+TEST(FormattedWrite, StoresItsCountInAnIntByAnyOtherSize) {
+    int numbers[] = {-1, -1, -1, -1, -1};
+    EXPECT_EQ(formatted(L"ab%I32nc%wnd%Lne", &numbers[0], &numbers[2], &numbers[4]), "abcde");
+    EXPECT_THAT(numbers, testing::ElementsAre(2, -1, 3, -1, 4));
+    int64 wide[] = {-1, -1};
+    EXPECT_EQ(formatted(L"%%%jn%d%lln", &wide[0], 10, &wide[1]), "%10");
+    EXPECT_THAT(wide, testing::ElementsAre(1, 3));
+}
+
 TEST(FormattedWrite, PutsAddressesInSixteenDigits) {
     const auto address = [](std::uintptr_t number) { return reinterpret_cast<void*>(number); };
     EXPECT_EQ(formatted(L"%p|%p", address(0), address(0x1F2E)),
@@ -176,6 +305,8 @@ TEST(FormattedWrite, PutsAddressesInSixteenDigits) {
               "00000000000000AB|0000000000000001");
     EXPECT_EQ(formatted(L"%18p|%-18p|", address(~std::uintptr_t{0}), address(1)),
               "  FFFFFFFFFFFFFFFF|0000000000000001  |");
+    EXPECT_EQ(formatted(L"%018p|%+p|% p", address(2), address(3), address(4)),
+              "  0000000000000002|0000000000000003|0000000000000004");
 }
 
 } // namespace

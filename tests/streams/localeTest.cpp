@@ -249,6 +249,20 @@ TEST(WideInput, SetsAndWordsKnowAllSixteenBits) {
     EXPECT_EQ(std::wstring(text), L"\x20AC");
 }
 
+TEST(WideInput, SetsHaveNoCharacterBeyondSixteenBits) {
+    if constexpr (sizeof(wchar_t) > 2)
+        for (const unsigned int code : {0x10000U, 0x1F600U, 0x80000000U, 0xFFFFFFFFU})
+            for (const wchar_t* format : {L"%[^a]", L"%[\xE000-\xFFFF]", L"%[\xFFFF-\U00010000]"}) {
+                const std::wstring character(1, static_cast<wchar_t>(code));
+                WideIO io(L"\xFFFF" + character);
+                QrTextStream stream(&io);
+                wchar_t text[8]{};
+                EXPECT_EQ(stream.formattedRead(format, text), 1) << code;
+                EXPECT_EQ(std::wstring(text), L"\xFFFF") << code;
+                EXPECT_EQ(io.rest(), character) << code;
+            }
+}
+
 TEST(WideInput, ACharacterWithoutANarrowFormEndsTheScanAndIsGivenBack) {
     WideIO io(L"a\x20AC");
     QrTextStream stream(&io);

@@ -29,7 +29,11 @@ class Told final
     : public Mz::QrCastRef<Mz::QrCastHeap<Mz::QrCastImpl<Told, QrPersistant, const Told&>>> {
   public:
     Told(Journal& journal, int name) : toldOnes(journal), ownName(name) { ++alive; }
-    ~Told() override { --alive; }
+    ~Told() override {
+        --alive;
+        if (whenEnded)
+            whenEnded();
+    }
     Told(const Told&) = delete;
     Told& operator=(const Told&) = delete;
 
@@ -44,6 +48,7 @@ class Told final
     }
 
     std::function<void()> whenTold;
+    std::function<void()> whenEnded;
     static inline int alive = 0;
 
   private:
@@ -117,6 +122,20 @@ TEST_F(PostLoad, ObjectsAppendedWhileOthersAreToldAreToldInTheSameRun) {
     append(list, 5);
     list.loadFinished();
     EXPECT_THAT(journal, ElementsAre(1, 2, 3, 4, 5));
+}
+
+TEST_F(PostLoad, AnObjectAppendedByTheEndOfTheLastOneIsTold) {
+    QrPostLoadList list;
+    {
+        const QrRef<Told> last = object(1);
+        last->whenEnded = [&] { append(list, 2); };
+        list.postLoad(last.get());
+    }
+    list.loadFinished();
+    EXPECT_THAT(journal, ElementsAre(1, 2));
+    append(list, 3);
+    list.loadFinished();
+    EXPECT_THAT(journal, ElementsAre(1, 2, 3));
 }
 
 TEST_F(PostLoad, AnExceptionLeavesTheObjectAndThoseBehindIt) {

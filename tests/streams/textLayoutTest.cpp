@@ -1,13 +1,16 @@
 // SPDX-License-Identifier: BSL-1.0
 // Tests the layout of text: separators, lines, columns, bools and strings, what is read back, and
 // line numbers.
+#include "tests/streams/recordingIO.h"
 #include "tests/streams/support.h"
 
 #include "components/componentManager/text/characterCount.h"
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <limits>
+#include <utility>
 
 namespace {
 
@@ -344,6 +347,36 @@ TEST(TextLayout, TextAfterBinaryDataBeginsAtColumnZeroWithoutASeparator) {
               std::string(70, '0') + "1\nAAAA2 3");
 }
 
+TEST(TextLayout, NoBinaryDataEndsNoText) {
+    for (const int count : {0, -1}) {
+        const int number = 1;
+        EXPECT_EQ(written<BaseStream>([&](QrStream& s) {
+                      s << 7;
+                      s.write(number, count);
+                      s.write(true, count);
+                      s << 8;
+                  }),
+                  "7 8");
+    }
+}
+
+TEST(TextLayout, NoBinaryDataThatIsReadSkipsNoSeparator) {
+    RecordingIO io(std::string("\n\0\0\0\1", 5));
+    BaseStream stream(&io);
+    stream << 7;
+    io.calls.clear();
+    int number = 5;
+    bool flag = true;
+    for (const int count : {0, -1}) {
+        EXPECT_EQ(stream.read(number, count), 0);
+        EXPECT_EQ(stream.read(flag, count), 0);
+    }
+    EXPECT_EQ(std::count(io.calls.begin(), io.calls.end(), "skipWhiteSpace 1"), 0);
+    EXPECT_EQ(stream.read(number, 1), 1);
+    EXPECT_EQ(number, 1);
+    EXPECT_EQ(std::count(io.calls.begin(), io.calls.end(), "skipWhiteSpace 1"), 1);
+}
+
 TEST(TextLayout, FormattedTextMakesNoSeparatorDue) {
     EXPECT_EQ(text([](QrStream& s) {
                   EXPECT_EQ(s.formattedWrite(L"a%db", 1), 3);
@@ -426,6 +459,23 @@ TEST(TextLayout, LinesAreCountedFromTheBeginning) {
     // The position is unchanged.
     ASSERT_EQ(in.stream.read(numbers[0], 1), 1);
     EXPECT_EQ(numbers[0], 5);
+}
+
+/// An input that claims a position beyond its end.
+class ClaimingInput final : public Mz::QrInBuffer {
+  public:
+    using Mz::QrInBuffer::QrInBuffer;
+    Mz::int64 tell() const override { return 1000; }
+};
+
+TEST(TextLayout, LinesAreCountedToTheEndAtMost) {
+    for (const auto& [content, lines] :
+         {std::pair("a\nb\nc", 3), std::pair("a\nb\n", 3), std::pair("", 1)}) {
+        std::istringstream source(content);
+        ClaimingInput io(&source);
+        QrTextStream stream(&io);
+        EXPECT_EQ(stream.computeLineNb(), lines) << content;
+    }
 }
 
 TEST(TextLayout, TheLineIsOneWhereThePositionIsUnknown) {

@@ -2,6 +2,7 @@
 // Tests the console controller: messages, progress on a terminal and in a file, and interrupts.
 #include "components/componentTools/console.h"
 #include "components/base/assertions.h"
+#include "components/base/surrogates.h"
 #include "components/componentTools/consoleText.h"
 #include "tests/support/temporaryDirectory.h"
 
@@ -9,8 +10,11 @@
 
 #include <clocale>
 #include <csignal>
+#include <cstdint>
 #include <limits>
 #include <sstream>
+#include <string>
+#include <utility>
 
 using namespace Mz;
 using namespace Mz::Tools;
@@ -84,6 +88,49 @@ TEST_F(Console, CountsColumnsAndKeepsToOneLine) {
     stream.str("");
     controller.status(L"a\nb");
     EXPECT_EQ(stream.str(), "\ra\\x0Ab");
+}
+
+TEST_F(Console, KnowsTheFirstAndLastCharacterOfEachWideRange) {
+    const auto columns = [this](std::uint32_t code) {
+        ConsoleController controller(stream, true);
+        std::wstring text;
+        detail::appendCodePoint(text, code);
+        controller.status(text.c_str());
+        stream.str("");
+        controller.clearLine();
+        return static_cast<int>(stream.str().size()) - 2; // Between the two carriage returns.
+    };
+    const std::pair<std::uint32_t, std::uint32_t> ranges[] = {
+        {0x1100, 0x115F}, {0x2600, 0x27BF}, {0x2E80, 0xA4CF}, {0xAC00, 0xD7A3},
+        {0xF900, 0xFAFF}, {0xFE30, 0xFE6F}, {0xFF00, 0xFF60}, {0xFFE0, 0xFFE6}};
+    for (const auto& [first, last] : ranges) {
+        EXPECT_EQ(columns(first - 1), 1) << first;
+        EXPECT_EQ(columns(first), 2) << first;
+        EXPECT_EQ(columns(last), 2) << last;
+        EXPECT_EQ(columns(last + 1), 1) << last;
+    }
+    // Where a character has two units, each counts as one column.
+    const int single = detail::wideTextHasSurrogates ? 2 : 1;
+    for (const auto& [first, last] :
+         {std::pair{0x1F000U, 0x1FAFFU}, std::pair{0x20000U, 0x3FFFDU}}) {
+        EXPECT_EQ(columns(first - 1), single) << first;
+        EXPECT_EQ(columns(first), 2) << first;
+        EXPECT_EQ(columns(last), 2) << last;
+        EXPECT_EQ(columns(last + 1), single) << last;
+    }
+    EXPECT_EQ(columns(0xE000), 1);
+    EXPECT_EQ(columns(0x10FFFF), single);
+}
+
+TEST_F(Console, EscapesControlCharactersOnly) {
+    EXPECT_EQ(withoutControls(L"\x01\x1F ~\x7F\x80\x9F\xA0\xFF", {}),
+              L"\\x01\\x1F ~\\x7F\\x80\\x9F\xA0\xFF");
+    EXPECT_EQ(withoutControls(L"\t\n\r\xE000\xFFFF", L"\n"), L"\\x09\n\\x0D\xE000\xFFFF");
+    if constexpr (sizeof(wchar_t) > 2) {
+        const std::wstring extremes{std::numeric_limits<wchar_t>::max(),
+                                    std::numeric_limits<wchar_t>::min(), static_cast<wchar_t>(-1)};
+        EXPECT_EQ(withoutControls(extremes, {}), extremes);
+    }
 }
 
 TEST_F(Console, LeavesNoControlCharacterToTheTerminal) {

@@ -111,7 +111,11 @@ TEST(OutputPosition, IsToldAndSought) {
     EXPECT_EQ(output->seek(-1, 2), 5);
     output->write('F');
     EXPECT_EQ(output->seek(0, 1), 6);
-    EXPECT_EQ(output.text(), "aBcDeF");
+    EXPECT_EQ(output->seek(0, 0), 0);
+    output->write('A');
+    EXPECT_EQ(output->seek(0, 1), 1);
+    EXPECT_EQ(output->seek(0, 2), 6);
+    EXPECT_EQ(output.text(), "ABcDeF");
 }
 
 TEST(OutputSeek, OutOfReachIsAWriteErrorAndKeepsTheFailbit) {
@@ -127,7 +131,8 @@ TEST(OutputSeek, OutOfReachIsAWriteErrorAndKeepsTheFailbit) {
 TEST(OutputSeek, ToAnotherOriginIsAWriteErrorAndTouchesNothing) {
     Output output;
     for (const int origin : {-1, 3, 2147483647})
-        EXPECT_THROW(output->seek(1, origin), QrStreamEx::ExWriteError);
+        for (const int offset : {0, 1})
+            EXPECT_THROW(output->seek(offset, origin), QrStreamEx::ExWriteError);
     EXPECT_TRUE(output.stream.good());
 }
 
@@ -163,6 +168,8 @@ TEST(Pipes, CannotTellAndCannotSeek) {
     EXPECT_TRUE(output.good());
     out.write('x');
     EXPECT_THROW(out.seek(5, 0), QrStreamEx::ExWriteError);
+    output.clear();
+    EXPECT_THROW(out.seek(0, 0), QrStreamEx::ExWriteError);
 }
 
 TEST(BadOutput, IsAWriteErrorForAllButTheLineEndAndTheSpace) {

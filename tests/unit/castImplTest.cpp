@@ -550,6 +550,30 @@ TEST(QrCastMulti, HasOnePrincipalObjectAndOneCounterForAllViews) {
     EXPECT_EQ(alive, 0);
 }
 
+/// Not counted, as a static object.
+class PlainMulti final : public QrCastMulti<PlainMulti, Gauge, Dial> {
+  public:
+    explicit PlainMulti(int& count) : alive(count) { ++alive; }
+    ~PlainMulti() override { --alive; }
+    int value() const override { return 31; }
+    int mark() const override { return 32; }
+
+  private:
+    int& alive;
+};
+
+TEST(QrCastMulti, IgnoresDestroyUnlessItIsOnTheHeap) {
+    int alive = 0;
+    {
+        PlainMulti object(alive);
+        static_cast<Gauge&>(object).destroy();
+        static_cast<Dial&>(object).destroy();
+        EXPECT_EQ(alive, 1);
+        EXPECT_EQ(object.value() + object.mark(), 63);
+    }
+    EXPECT_EQ(alive, 0);
+}
+
 TEST(QrCastMulti, DestroyThroughAnyViewDeletesTheWhole) {
     int alive = 0;
     Dial* const dial = new GaugeAndDial(alive);

@@ -92,6 +92,19 @@ TEST_F(ReplaceFile, IsRefusedInPlaceOfAFolder) {
     EXPECT_EQ(filesInFolder(), 1U);
 }
 
+TEST_F(ReplaceFile, IsRefusedIfAFolderTakesItsPlaceMeanwhile) {
+    bool written = false;
+    EXPECT_THROW(replaceFile(file,
+                             [&](std::ostream& out) {
+                                 out << "new";
+                                 written = std::filesystem::create_directory(file);
+                             }),
+                 QrStreamEx::ExWriteOpen);
+    EXPECT_TRUE(written);
+    EXPECT_TRUE(std::filesystem::is_directory(file));
+    EXPECT_EQ(filesInFolder(), 1U);
+}
+
 TEST_F(ReplaceFile, MayStandInTheCurrentFolder) {
     const std::filesystem::path before = std::filesystem::current_path();
     std::filesystem::current_path(folder.path());

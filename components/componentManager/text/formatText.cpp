@@ -201,10 +201,11 @@ std::string toGeneralWithZeros(Float value, int precision) {
     return toCharacters(value, std::chars_format::fixed, digits - 1 - exponent);
 }
 
-/// Inserts the decimal point that the alternate form requires, if there is none.
+/// Inserts the decimal point that the alternate form requires, if there is none. Looks for the
+/// exponent from the end: the digit before it may be a hexadecimal "e".
 void ensurePoint(std::string& digits) {
     if (digits.find('.') == std::string::npos)
-        digits.insert(std::min(digits.find_first_of("ep"), digits.size()), 1, '.');
+        digits.insert(std::min(digits.find_last_of("ep"), digits.size()), 1, '.');
 }
 
 template <class Float>
@@ -224,12 +225,14 @@ std::string finiteDigits(const Directive& directive, wchar_t conversion, Float v
     return digits;
 }
 
+/// Requires a letter.
 wchar_t toLower(wchar_t c) {
-    return c >= L'A' && c <= L'Z' ? static_cast<wchar_t>(c + (L'a' - L'A')) : c;
+    return c <= L'Z' ? static_cast<wchar_t>(c + (L'a' - L'A')) : c;
 }
 
+/// Requires a character of a number, none of which is above 'z'.
 wchar_t toUpper(wchar_t c) {
-    return c >= L'a' && c <= L'z' ? static_cast<wchar_t>(c - (L'a' - L'A')) : c;
+    return c >= L'a' ? static_cast<wchar_t>(c - (L'a' - L'A')) : c;
 }
 
 template <class Float>

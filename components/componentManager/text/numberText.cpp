@@ -150,7 +150,7 @@ bool sixteenDigits(Decimal& decimal, double value) {
         return false; // A subnormal number has fewer bits.
     const std::uint64_t mantissa = (bits << 11) | std::uint64_t{1} << 63;
     const int exponent = biased - bias - 63;
-    // The decimal exponent, by log10(2); it is exact or one too small.
+    // The decimal exponent, by log10(2): that of the power of two, so it is exact or one too small.
     decimal.exponent = ((biased - bias) * 315653) >> 20;
     constexpr std::uint64_t limit = 10'000'000'000'000'000;
     std::optional<std::uint64_t> digits =
@@ -159,7 +159,7 @@ bool sixteenDigits(Decimal& decimal, double value) {
         ++decimal.exponent;
         digits = scaled(mantissa, exponent, digitsOfDouble - 1 - decimal.exponent);
     }
-    if (!digits || *digits < limit / 10 || *digits >= limit)
+    if (!digits)
         return false;
     constexpr std::uint64_t half = 100'000'000;
     writeEight(decimal.digits, static_cast<std::uint32_t>(*digits / half));

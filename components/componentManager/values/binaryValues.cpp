@@ -130,8 +130,9 @@ template <class Bits>
 /// Writes one value without a block, in place where possible.
 template <class T>
 [[gnu::always_inline]] inline void writeValue(QrBufferedIO& io, T value) {
-    if (!fits(value))
-        throw QrStreamEx::ExWriteError(source, __LINE__);
+    if constexpr (!alwaysFits<T>)
+        if (!fits(value))
+            throw QrStreamEx::ExWriteError(source, __LINE__);
     const auto bits = packed(value);
     const ByteSink sink(io);
     if (char* const place = sink.room(sizeof bits)) [[likely]] {

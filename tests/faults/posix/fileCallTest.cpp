@@ -102,6 +102,25 @@ TEST_P(FilesWithFailingCalls, AreImportedWhollyOrNotAtAll) {
     EXPECT_GE(failures, 4);
 }
 
+// The builder takes what it could read of an input for the whole, so it must not get a part.
+TEST_P(FilesWithFailingCalls, AreNeverReadInPartUnderAPolicy) {
+    Kit::initialize(components / "kitImporters");
+    const auto file = folder.write("input.a", "A=take");
+    const auto import = [&] { return Kit::importFile(L"script", file); };
+    ASSERT_TRUE(import()); // So that the libraries are loaded.
+    int refused = 0;
+    const int failures = failEachCall(GetParam(), [&](CallAttempt& attempt) {
+        const Kit::ImportResult result = attempt.run(import);
+        EXPECT_TRUE(result || !attempt.failed.empty());
+        refused += attempt.failed == "read" && !result ? 1 : 0;
+        EXPECT_TRUE(import()) << attempt.failed;
+    });
+    EXPECT_GE(failures, 4);
+    // When it is asked and when it imports, one call reads the input and another one its end. The
+    // builder ignores failures after that.
+    EXPECT_EQ(refused, GetParam() == EINTR ? 0 : 4);
+}
+
 INSTANTIATE_TEST_SUITE_P(, FilesWithFailingCalls,
                          testing::Values(EIO, EINTR, EMFILE, ENOMEM, ENOSPC));
 

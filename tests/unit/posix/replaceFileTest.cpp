@@ -67,6 +67,21 @@ TEST_F(ReplaceFile, RefusesSymlinksInACircleAndThoseIntoNoFolder) {
     EXPECT_EQ(filesInFolder(), 2U);
 }
 
+TEST_F(ReplaceFile, KeepsTheOldOneWhenTheNewOneIsRemovedMeanwhile) {
+    put(file, "old");
+    EXPECT_THROW(replaceFile(file,
+                             [&](std::ostream& out) {
+                                 out << "new";
+                                 for (const auto& entry :
+                                      std::filesystem::directory_iterator(folder.path()))
+                                     if (entry.path() != file)
+                                         std::filesystem::remove(entry.path());
+                             }),
+                 QrStreamEx::ExWriteError);
+    EXPECT_EQ(content(), "old");
+    EXPECT_EQ(filesInFolder(), 1U);
+}
+
 TEST_F(ReplaceFile, RefusesAPipeWithoutOpeningIt) {
     ASSERT_EQ(::mkfifo(file.c_str(), 0600), 0);
     EXPECT_THROW(put(file, "x"), QrStreamEx::ExWriteOpen);
