@@ -244,6 +244,8 @@ TEST(Stamp, WithAValueOfALaterVersionDoesNotFit) {
               L"standard library number 200");
     EXPECT_EQ(judged([](ComponentStamp& stamp) { stamp.cxxAbi = CxxAbi{200}; })->subject,
               L"C++ ABI number 200");
+    EXPECT_EQ(judged([](ComponentStamp& stamp) { stamp.cxxAbi = CxxAbi::unknown; })->subject,
+              L"an unknown C++ ABI");
     EXPECT_EQ(judged([](ComponentStamp& stamp) { stamp.containerDebug = 200; })->subject,
               L"debug mode number 200");
 }

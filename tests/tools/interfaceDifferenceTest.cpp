@@ -1,0 +1,62 @@
+// SPDX-License-Identifier: BSL-1.0
+/// The sentence about each property of a base or of a value in which two fingerprints can differ.
+/// The tables are written here, because no edit of a header changes one property alone.
+#include "components/componentTools/inspecting/interfaceDifference.h"
+
+#include <gtest/gtest.h>
+
+#include <string>
+
+using namespace Mz;
+using namespace Mz::Tools;
+
+namespace {
+
+InterfaceTable table() {
+    InterfaceTable result{{1, 2, 3, 4}, 0, 8, 8, "Reader", 9, {}, {}, {}};
+    result.bases.push_back({"Base", 3, 16, false});
+    result.values.push_back({"Point", 12, 4, 0});
+    return result;
+}
+
+/// Returns the sentence on a component whose table was changed, and a host whose table was not.
+template <class Change>
+std::wstring sentence(Change change) {
+    InterfaceTable here = table();
+    change(here);
+    const auto finding = interfaceDifference({here}, {table()});
+    if (!finding)
+        return {};
+    EXPECT_EQ(finding->verdict, Verdict::otherInterface);
+    EXPECT_EQ(finding->subject, L"Reader");
+    return finding->words;
+}
+
+TEST(InterfaceDifference, OfABaseIsItsSlotsOrItsSize) {
+    EXPECT_EQ(sentence([](InterfaceTable&) {}), L"");
+    EXPECT_EQ(sentence([](InterfaceTable& here) { here.bases[0].slotCount = 4; }),
+              L"Base, a base of Reader, has 4 slots here and 3 in the host");
+    EXPECT_EQ(sentence([](InterfaceTable& here) { here.bases[0].size = 24; }),
+              L"Base, a base of Reader, has 24 bytes here and 16 in the host");
+    EXPECT_EQ(sentence([](InterfaceTable& here) {
+                  here.bases[0] = {"Base", 2, 24, false};
+              }),
+              L"Base, a base of Reader, has 2 slots here and 3 in the host")
+        << "the slots come first";
+}
+
+TEST(InterfaceDifference, OfAValueIsItsSizeOrItsAlignment) {
+    const std::wstring subject = L"Point, which Reader passes by value, ";
+    EXPECT_EQ(sentence([](InterfaceTable& here) { here.values[0].size = 16; }),
+              subject + L"has 16 bytes here and 12 in the host");
+    EXPECT_EQ(sentence([](InterfaceTable& here) { here.values[0].alignment = 8; }),
+              subject + L"is aligned to 8 bytes here and to 4 in the host");
+}
+
+TEST(InterfaceDifference, OfAnIncompleteOrAnotherValueIsNone) {
+    EXPECT_EQ(sentence([](InterfaceTable& here) { here.values[0] = {"Point", 0, 0, 0}; }), L"");
+    EXPECT_EQ(sentence([](InterfaceTable& here) { here.values[0] = {"Pixel", 16, 8, 1}; }), L"");
+    EXPECT_EQ(sentence([](InterfaceTable& here) { here.bases[0] = {"Other", 4, 24, true}; }), L"");
+}
+
+} // namespace
