@@ -180,31 +180,26 @@ TEST(PeImage, WhoseNameIsCutOffByTheEndOfItsSectionIsDamaged) {
     EXPECT_EQ(other.entryPoint, LibraryImage::EntryPoint::absent);
 }
 
-TEST(ElfImage, NamesTheProcessor) {
+/// Returns what is said of a library for another machine, whose number is at `offset`.
+std::wstring processorOf(std::string library, std::size_t offset, std::uint16_t machine) {
     const TemporaryDirectory folder;
-    const auto processor = [&](std::uint16_t machine) {
-        std::string bytes = elfLibrary({});
-        put(bytes, elfMachine, machine);
-        return readLibraryImage(folder.write("image", bytes)).otherProcessor;
-    };
-    EXPECT_EQ(processor(3), L"x86, 32 bits");
-    EXPECT_EQ(processor(40), L"ARM, 32 bits");
-    EXPECT_EQ(processor(243), L"RISC-V");
-    EXPECT_EQ(processor(4711), L"number 4711");
+    put(library, offset, machine);
+    return readLibraryImage(folder.write("image", library)).otherProcessor;
+}
+
+TEST(ElfImage, NamesTheProcessor) {
+    EXPECT_EQ(processorOf(elfLibrary({}), elfMachine, 3), L"x86, 32 bits");
+    EXPECT_EQ(processorOf(elfLibrary({}), elfMachine, 40), L"ARM, 32 bits");
+    EXPECT_EQ(processorOf(elfLibrary({}), elfMachine, 243), L"RISC-V");
+    EXPECT_EQ(processorOf(elfLibrary({}), elfMachine, 4711), L"number 4711");
 }
 
 TEST(PeImage, NamesTheProcessor) {
-    const TemporaryDirectory folder;
-    const auto processor = [&](std::uint16_t machine) {
-        std::string bytes = peLibrary({});
-        put(bytes, peMachine, machine);
-        return readLibraryImage(folder.write("image", bytes)).otherProcessor;
-    };
-    EXPECT_EQ(processor(0x14C), L"x86, 32 bits");
-    EXPECT_EQ(processor(0x1C4), L"ARM, 32 bits");
-    EXPECT_EQ(processor(0xAA64), L"ARM, 64 bits");
-    EXPECT_EQ(processor(0x8664), L"");
-    EXPECT_EQ(processor(4711), L"number 4711");
+    EXPECT_EQ(processorOf(peLibrary({}), peMachine, 0x14C), L"x86, 32 bits");
+    EXPECT_EQ(processorOf(peLibrary({}), peMachine, 0x1C4), L"ARM, 32 bits");
+    EXPECT_EQ(processorOf(peLibrary({}), peMachine, 0xAA64), L"ARM, 64 bits");
+    EXPECT_EQ(processorOf(peLibrary({}), peMachine, 0x8664), L"");
+    EXPECT_EQ(processorOf(peLibrary({}), peMachine, 4711), L"number 4711");
 }
 
 TEST(PeImage, TellsWhetherItHasTheManifestOfALibrary) {
