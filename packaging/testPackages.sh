@@ -58,4 +58,5 @@ if [ ${#replaced[@]} != 6 ]; then
   exit 1
 fi
 echo "testing with the package's ${replaced[*]}"
-ctest --test-dir "$build" --output-on-failure -j "$(nproc)" "$@"
+# More than processors, as in ./run test: most tests wait for processes to begin and end.
+ctest --test-dir "$build" --output-on-failure -j "$((3 * $(nproc)))" "$@"
