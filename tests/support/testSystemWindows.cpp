@@ -77,6 +77,30 @@ std::filesystem::path hide(const std::filesystem::path& file) {
     return file;
 }
 
+namespace {
+
+/// Returns the time at which a process began.
+ULONGLONG beginOf(HANDLE process) {
+    FILETIME begin{}, end, kernel, user;
+    ::GetProcessTimes(process, &begin, &end, &kernel, &user);
+    return ULONGLONG{begin.dwHighDateTime} << 32 | begin.dwLowDateTime;
+}
+
+/// Returns whether a process runs that began after this one. One that has this process's number for
+/// its parent's but is older belonged to another process, which has ended.
+bool isYoungerAndRuns(DWORD number) {
+    const HANDLE process =
+        ::OpenProcess(PROCESS_QUERY_LIMITED_INFORMATION | SYNCHRONIZE, FALSE, number);
+    if (!process)
+        return false;
+    const bool result = ::WaitForSingleObject(process, 0) == WAIT_TIMEOUT &&
+                        beginOf(process) >= beginOf(::GetCurrentProcess());
+    ::CloseHandle(process);
+    return result;
+}
+
+} // namespace
+
 bool hasChildProcess() {
     const HANDLE processes = ::CreateToolhelp32Snapshot(TH32CS_SNAPPROCESS, 0);
     PROCESSENTRY32W entry{};
@@ -84,7 +108,8 @@ bool hasChildProcess() {
     bool found = false;
     for (BOOL more = ::Process32FirstW(processes, &entry); more && !found;
          more = ::Process32NextW(processes, &entry))
-        found = entry.th32ParentProcessID == ::GetCurrentProcessId();
+        found = entry.th32ParentProcessID == ::GetCurrentProcessId() &&
+                isYoungerAndRuns(entry.th32ProcessID);
     ::CloseHandle(processes);
     return found;
 }

@@ -18,13 +18,16 @@ TEST_F(Probe, LeavesNoProcessWhenTheCallersQuestionThrows) {
     ASSERT_FALSE(hasChildProcess());
     ProbeOptions options = patient();
     int asked = 0;
-    options.interrupted = [&asked]() -> bool {
+    bool isSeen = false;
+    options.interrupted = [&]() -> bool {
+        isSeen = isSeen || hasChildProcess();
         if (++asked < 3)
             return false;
         throw std::bad_alloc();
     };
     EXPECT_THROW(probeLibrary(hangs, options), std::bad_alloc);
     EXPECT_EQ(asked, 3);
+    EXPECT_TRUE(isSeen);
     EXPECT_FALSE(hasChildProcess());
 }
 
