@@ -1,7 +1,8 @@
 // SPDX-License-Identifier: BSL-1.0
-// Reads any content with any format.
+// Reads any content with any format, in several locales.
 //
-// Input: the length of the format, the format, the content.
+// Input: the locale, the length of the format, the format, the content.
+#include "fuzz/locales.h"
 #include "fuzz/reading.h"
 
 #include <algorithm>
@@ -21,6 +22,7 @@ using Place = std::vector<unsigned char>;
 
 int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
     Fuzz::Input input(data, size);
+    Fuzz::chooseLocale(input.byte());
     const std::string_view characters = input.take(input.byte());
     const std::string_view content = input.rest();
     std::wstring format(characters.size(), L'\0');

@@ -1,7 +1,8 @@
 // SPDX-License-Identifier: BSL-1.0
 // Loads stored objects of the test classes, with and without faults, and stores them again.
 //
-// Input: the kind of stream, the stored objects.
+// Input: the kind of stream, the stored objects. With bit 7 of the kind: the depth of a chain of
+// objects inside one another, and changes of single bytes of it.
 #include "fuzz/fuzz.h"
 #include "tests/objects/objectStreams.h"
 #include "tests/streams/streamKinds.h"
@@ -50,6 +51,29 @@ std::optional<std::string> storedAgain(std::string_view bytes) {
     return std::nullopt;
 }
 
+/// Returns a chain of nodes, each inside the one before, some of them deeper than is allowed, with
+/// some bytes changed. Mutations alone do not nest objects deeply.
+template <class Stream>
+std::string changedChain(Fuzz::Input& input) {
+    unsigned int depth = 1 + input.byte();
+    depth += 2 * input.byte() % 256;
+    Saving<Stream> out; // Written by hand: a writer refuses what is too deep.
+    for (unsigned int number = 1; number <= depth; ++number) {
+        out.stream << number << nodeUid << 3U << 1;
+        QrWriteExactText(out.stream, L"");
+        out.stream << true << 0.5 << (number < depth ? 1U : 0U);
+    }
+    for (unsigned int number = depth; number > 0; --number)
+        out.stream << (0x454F424AU ^ number);
+    std::string bytes = out.bytes();
+    for (std::string_view change; (change = input.take(3)).size() == 3;) {
+        const auto high = static_cast<unsigned char>(change[0]);
+        const auto low = static_cast<unsigned char>(change[1]);
+        bytes[(std::size_t{high} << 8 | low) % bytes.size()] = change[2];
+    }
+    return bytes;
+}
+
 template <class Stream>
 void load(std::string_view content) {
     const std::optional<std::string> once = storedAgain<Stream>(content);
@@ -60,16 +84,26 @@ void load(std::string_view content) {
     Fuzz::expectSame(*once, *twice, "what was loaded is what was stored");
 }
 
+template <class Stream>
+void loadFrom(Fuzz::Input& input, bool nested) {
+    if (nested)
+        load<Stream>(changedChain<Stream>(input));
+    else
+        load<Stream>(input.rest());
+}
+
 } // namespace
 
 int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
     QrGetComponentManager()->initialize(MZ_BUILD_PATH L"/components/objects");
     forgetNotes(); // The classes report events, for other tests.
     Fuzz::Input input(data, size);
-    switch (input.byte() % 4) {
-    case 0: load<QrBinaryStream>(input.rest()); break;
-    case 2: load<BaseStream>(input.rest()); break;
-    default: load<QrTextStream>(input.rest()); break;
+    const unsigned int kind = input.byte();
+    const bool nested = kind & 0x80;
+    switch (kind % 4) {
+    case 0: loadFrom<QrBinaryStream>(input, nested); break;
+    case 2: loadFrom<BaseStream>(input, nested); break;
+    default: loadFrom<QrTextStream>(input, nested); break;
     }
     return 0;
 }

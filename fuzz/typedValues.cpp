@@ -1,9 +1,10 @@
 // SPDX-License-Identifier: BSL-1.0
-// Reads values of all types, single and in arrays, from all kinds of stream.
+// Reads values of all types, single and in arrays, from all kinds of stream, in several locales.
 //
-// Input: the kind of stream, the number of steps, the steps, the content.
+// Input: the kind of stream and the locale, the number of steps, the steps, the content.
 #include "components/componentManager/binaryStream.h"
 #include "components/componentManager/textStream.h"
+#include "fuzz/locales.h"
 #include "fuzz/reading.h"
 
 #include <array>
@@ -101,6 +102,7 @@ void take(QrStream& stream, QrBufferedIO& io, std::string& told, unsigned int st
 int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
     Fuzz::Input input(data, size);
     const unsigned int kind = input.byte();
+    Fuzz::chooseLocale(kind / 3);
     const std::string_view steps = input.take(input.byte() % 32);
     const std::string_view content = input.rest();
     const auto work = [&](QrStream& stream, QrBufferedIO& io, std::string& told) {

@@ -53,7 +53,8 @@ std::uint32_t take(std::string_view& bytes) {
                                : first < 0xC0 ? 0
                                : first < 0xE0 ? 2
                                : first < 0xF0 ? 3
-                                              : 4;
+                               : first < 0xF8 ? 4
+                                              : 0;
     std::uint32_t code = length == 1 ? first : first & (0x7F >> length);
     for (std::size_t index = 1; index < length; ++index) {
         if (index >= bytes.size() || (byteAt(index) & 0xC0) != 0x80) {

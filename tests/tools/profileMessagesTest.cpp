@@ -68,6 +68,10 @@ TEST(ProfileMessages, ThatAreInvalidAreNotUsed) {
           encodeOthers(1, -1ns), std::string("foreign bytes"), frameOf(kind, "no JSON"),
           frameOf(kind, "{}"), frameOf(kind, R"({"kind":"unknown"})"),
           frameOf(kind, R"({"kind":"stage","stage":5})"),
+          frameOf(kind, R"({"kind":"stage","stage":-1})"),
+          frameOf(kind, R"({"kind":"stage","stage":1e300})"),
+          frameOf(kind, R"({"kind":"begin","index":0.5})"),
+          frameOf(kind, R"({"kind":"others","count":1e300,"time":1})"),
           frameOf(kind, R"({"kind":"listing","time":"1"})"), frameOf(0, R"({"kind":"begin"})")}) {
         const ProfileReport report = decodeProfileReport(invalid + encodeListing(1ns), 2);
         EXPECT_TRUE(report.garbled) << invalid;

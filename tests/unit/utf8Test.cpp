@@ -99,6 +99,16 @@ TEST(Utf8, TakesNoSequenceThatIsLongerThanNecessary) {
         EXPECT_EQ(fromUtf8(bytes), L"\uFFFD\uFFFD\uFFFD\uFFFD");
 }
 
+TEST(Utf8, HasNoCharacterThatBeginsWithAByteFromF5) {
+    for (int first = 0xF5; first <= 0xFF; ++first)
+        for (int second = 0x80; second <= 0xBF; ++second) {
+            const std::string bytes{static_cast<char>(first), static_cast<char>(second), '\x80',
+                                    '\x80'};
+            EXPECT_EQ(fromUtf8(bytes), L"\uFFFD\uFFFD\uFFFD\uFFFD") << first << ' ' << second;
+            EXPECT_EQ(escapeInvalidUtf8(bytes).size(), 16u) << first << ' ' << second;
+        }
+}
+
 TEST(Utf8, SkipsOneByteOfWhatIsNoSequence) {
     EXPECT_EQ(fromUtf8("\x80"
                        "a"),

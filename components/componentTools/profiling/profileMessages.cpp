@@ -66,22 +66,22 @@ class ReportReader {
 
   private:
     static nanoseconds timeIn(const Json& value) {
-        const auto time = value.get<std::int64_t>();
-        if (!value.is_number_integer() || time < 0)
+        const std::int64_t time = integerOf(value);
+        if (time < 0)
             throw std::runtime_error("invalid time");
         return nanoseconds(time);
     }
 
     std::size_t indexIn(const Json& value) const {
-        const auto index = value.at("index").get<std::size_t>();
+        const auto index = static_cast<std::size_t>(integerOf(value.at("index")));
         if (index >= candidates)
             throw std::runtime_error("unknown candidate");
         return index;
     }
 
     static Stage stageIn(const Json& value) {
-        const auto stage = value.at("stage").get<unsigned int>();
-        if (stage > static_cast<unsigned int>(Stage::enumerating))
+        const auto stage = integerOf(value.at("stage"));
+        if (stage < 0 || stage > static_cast<std::int64_t>(Stage::enumerating))
             throw std::runtime_error("unknown stage");
         return static_cast<Stage>(stage);
     }
@@ -100,7 +100,7 @@ class ReportReader {
     }
 
     void readOthers(const Json& value) {
-        report.otherFiles = value.at("count").get<std::size_t>();
+        report.otherFiles = static_cast<std::size_t>(integerOf(value.at("count")));
         report.otherTime = timeIn(value.at("time"));
     }
 

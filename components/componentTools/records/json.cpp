@@ -14,6 +14,10 @@ Json jsonIn(std::istream& input) {
     return Json::parse(input);
 }
 
+std::int64_t integerOf(const Json& value) {
+    return value.get_ref<const Json::number_integer_t&>();
+}
+
 std::string asciiOf(const Json& value) {
     return value.dump(-1, ' ', true, Json::error_handler_t::replace);
 }

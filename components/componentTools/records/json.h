@@ -3,6 +3,7 @@
 /// once, because each source that instantiates them takes seconds.
 #pragma once
 
+#include <cstdint>
 #include <iosfwd>
 #include <nlohmann/json.hpp>
 #include <string>
@@ -24,6 +25,10 @@ Json jsonIn(std::string_view text);
 /// \throws Json::exception if the text is invalid
 /// \throws std::ios_base::failure if the buffer of the stream throws it
 Json jsonIn(std::istream& input);
+
+/// Returns a whole number. What is read from a file may be any other number, which no integer holds.
+/// \throws Json::exception if the value is no whole number
+std::int64_t integerOf(const Json& value);
 
 /// Returns the value on one line in ASCII, which does not depend on a locale. Invalid UTF-8 is
 /// replaced.

@@ -10,7 +10,6 @@
 #include "components/componentTools/records/openPatiently.h"
 #include "components/componentTools/records/replaceChanged.h"
 
-#include <cstdint>
 #include <fstream>
 #include <initializer_list>
 #include <map>
@@ -34,7 +33,7 @@ using Verdicts = std::map<std::pair<std::wstring, std::wstring>, const Json*>;
 
 Verdicts verdictsOf(const Json& all) {
     Verdicts verdicts;
-    if (all.at("version").get<int>() == version)
+    if (integerOf(all.at("version")) == version)
         for (const Json& entry : all.at("libraries"))
             verdicts[{wide(entry, "directory"), wide(entry, "fileName")}] = &entry;
     return verdicts;
@@ -69,8 +68,7 @@ void fillIn(RecordedLibrary& library, const Verdicts& verdicts) {
     if (found == verdicts.end())
         return;
     const Json& entry = *found->second;
-    if (entry.at("time").get<std::uint32_t>() != library.time ||
-        entry.at("size").get<std::int64_t>() != library.size)
+    if (integerOf(entry.at("time")) != library.time || integerOf(entry.at("size")) != library.size)
         return;
     const auto verdict = verdictNamed(entry.at("verdict").get<std::string>());
     if (verdict && isKept(*verdict))
@@ -80,7 +78,7 @@ void fillIn(RecordedLibrary& library, const Verdicts& verdicts) {
 /// Older versions write no choices.
 DisabledComponents disabledIn(const Json& all) {
     DisabledComponents disabled;
-    if (all.at("version").get<int>() == version && all.contains("disabled"))
+    if (integerOf(all.at("version")) == version && all.contains("disabled"))
         for (const Json& entry : all.at("disabled"))
             disabled.push_back(
                 {wide(entry, "directory"), wide(entry, "fileName"), wide(entry, "reason")});
@@ -140,7 +138,7 @@ std::string readJudgement(const std::filesystem::path& file) {
         return {};
     try {
         const Json all = jsonIn(input);
-        if (all.at("version").get<int>() == version)
+        if (integerOf(all.at("version")) == version)
             return all.value("judgement", "");
     } catch (const Json::exception&) {        // NOLINT(bugprone-empty-catch)
     } catch (const std::ios_base::failure&) { // NOLINT(bugprone-empty-catch)

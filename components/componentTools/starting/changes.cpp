@@ -38,13 +38,13 @@ std::filesystem::path fileOf(const std::filesystem::path& list) {
 
 Seen seenIn(const Json& all) {
     Seen seen;
-    if (all.at("version").get<int>() != version)
+    if (integerOf(all.at("version")) != version)
         return seen;
     for (const Json& entry : all.at("components")) {
         const Name name(fromUtf8(entry.at("directory").get<std::string>()),
                         fromUtf8(entry.at("fileName").get<std::string>()));
-        seen.components[name] = {entry.at("time").get<std::uint32_t>(),
-                                 entry.at("size").get<std::int64_t>()};
+        seen.components[name] = {static_cast<std::uint32_t>(integerOf(entry.at("time"))),
+                                 integerOf(entry.at("size"))};
         if (entry.at("changed").get<bool>())
             seen.changed.insert(name);
     }
