@@ -285,6 +285,47 @@ TEST_F(Scan, RejectsADamagedListWholeAndBuildsItAnew) {
     EXPECT_EQ(scan(options()).rejected, L"");
 }
 
+TEST_F(Scan, TakesAnEmptyFileForADamagedListThatNeedsNoCopy) {
+    add(L"goodWithKit");
+    lists.write("list", "");
+    const ScanResult result = scan(options());
+    EXPECT_NE(result.rejected, L"");
+    EXPECT_EQ(result.keptAs, std::filesystem::path());
+    EXPECT_EQ(result.notWritten, L"");
+    EXPECT_FALSE(std::filesystem::exists(lists.path() / "list.rejected"));
+    EXPECT_EQ(readRecordedList(list()).libraries.size(), 1u);
+}
+
+TEST_F(Scan, ReplacesNoDamagedListOfWhichItCannotKeepACopy) {
+    add(L"goodWithKit");
+    lists.write("list", "something else");
+    std::filesystem::create_directory(lists.path() / "list.rejected");
+    const ScanResult result = scan(options());
+    EXPECT_EQ(result.notWritten, displayName(list()) + L": nothing was written, for what is there "
+                                                       L"could not be kept");
+    EXPECT_EQ(result.keptAs, std::filesystem::path());
+    EXPECT_EQ(result.libraries.size(), 1u);
+    EXPECT_EQ(contentOf(list()), "something else");
+    EXPECT_FALSE(std::filesystem::exists(verdictsFileOf(list())));
+}
+
+TEST_F(Scan, KeepsTheRecordOfALibraryThatItWouldTryAgainWhereThereIsNoProbe) {
+    add(L"goodWithKit");
+    ScanResult first = scan(options());
+    first.libraries[0].builders.clear();
+    writeRecordedList(list(), first.libraries); // As a host that could not load it.
+    std::filesystem::remove(verdictsFileOf(list()));
+    ScanOptions wanted = options();
+    wanted.probe.program = folder.path() / "no-probe";
+    const ScanResult result = scan(wanted);
+    ASSERT_EQ(result.files.size(), 1u);
+    EXPECT_EQ(result.files[0].verdict.verdict, Verdict::probeFailed);
+    EXPECT_TRUE(result.files[0].recorded);
+    ASSERT_EQ(result.libraries.size(), 1u);
+    EXPECT_EQ(result.libraries[0].time, first.libraries[0].time);
+    EXPECT_TRUE(result.libraries[0].builders.empty());
+}
+
 TEST_F(Scan, RecordsNothingWhereThereIsNoProbe) {
     add(L"goodWithKit");
     scan(options());
