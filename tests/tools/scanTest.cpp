@@ -371,6 +371,27 @@ TEST_F(Scan, BelievesNoVerdictThatNoScanCanHaveKept) {
     }
 }
 
+TEST_F(Scan, LeavesVerdictsToTheFileThatTheyAreAbout) {
+    add(L"crashesInEntryPoint");
+    const RecordedLibraries scanned = scan(options()).libraries;
+    ASSERT_EQ(scanned.size(), 1u);
+    const auto keptOf = [&](const RecordedLibrary& library) {
+        writeRecordedList(list(), {library}); // As a host that met another file.
+        return readRecordedList(list()).libraries.at(0).kept;
+    };
+    ASSERT_TRUE(keptOf(scanned[0]));
+    EXPECT_EQ(keptOf(scanned[0])->verdict, Verdict::crashed);
+    RecordedLibrary other = scanned[0];
+    other.time += 2;
+    EXPECT_FALSE(keptOf(other));
+    other = scanned[0];
+    other.size += 1;
+    EXPECT_FALSE(keptOf(other));
+    other = scanned[0];
+    other.fileName += L"x";
+    EXPECT_FALSE(keptOf(other));
+}
+
 TEST_F(Scan, LeavesOutFoldersThatCannotBeSearched) {
     const auto strange = folder.path() / "a;b", closed = folder.path() / "closed";
     std::filesystem::create_directory(strange);
