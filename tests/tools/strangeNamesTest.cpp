@@ -61,7 +61,7 @@ TEST_F(StrangeNames, OfOneFileGiveOneCandidate) {
     const std::filesystem::path file = add(L"goodByHand", "b.so");
     std::filesystem::create_hard_link(file, folder.path() / "c.so");
     std::filesystem::create_symlink(file, folder.path() / "a.so");
-    const Discovery discovery = discover({folder.path()});
+    const Discovery discovery = discover({folder.path(), folder.path() / "."});
     ASSERT_EQ(discovery.candidates.size(), 1u);
     EXPECT_EQ(discovery.candidates[0].path, folder.path() / "a.so");
     EXPECT_TRUE(discovery.leftOut.empty());
