@@ -88,8 +88,6 @@ class LimitedInput final : public std::streambuf {
 
   protected:
     int_type underflow() override {
-        if (gptr() != egptr())
-            return traits_type::to_int_type(*gptr());
         return load(position()) ? traits_type::to_int_type(*gptr()) : traits_type::eof();
     }
 

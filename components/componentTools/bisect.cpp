@@ -29,7 +29,7 @@ std::filesystem::path programOf(const std::filesystem::path& host) {
             return fullPath(file);
     }
     if (!host.has_parent_path())
-        if (std::filesystem::path found = System::findProgram(host.stem().string()); !found.empty())
+        if (std::filesystem::path found = System::findProgram(host.string()); !found.empty())
             return found;
     return host;
 }
@@ -103,11 +103,17 @@ class Bisection {
             return std::nullopt;
         writeList(active);
         const System::ChildResult child = startHost();
-        if (child.end == System::ChildResult::End::interrupted)
+        using End = System::ChildResult::End;
+        if (child.end == End::interrupted)
             return std::nullopt;
-        if (child.end == System::ChildResult::End::notStarted) {
+        // Without its exit status a host could not be told from one that fails.
+        const bool endUnknown = child.end == End::unknown && !options.judge;
+        if (child.end == End::notStarted || endUnknown) {
             notStarted = true;
-            result.problem = child.detail;
+            result.problem = endUnknown
+                                 ? L"its exit status is not available. Do not ignore SIGCHLD "
+                                   L"in the program that starts it"
+                                 : child.detail;
             return std::nullopt;
         }
         HostStart start{++result.starts, active.size(), endingOf(child), isFailure(child)};

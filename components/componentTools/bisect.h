@@ -76,7 +76,7 @@ struct BisectResult {
         found,      ///< the host fails with the culprits, and not without any one of them
         allPass,    ///< the host does not fail, even with all components
         noneFails,  ///< the host fails even if all components are switched off
-        notStarted, ///< the host cannot be started
+        notStarted, ///< the host cannot be started, or its exit status is not available
         stopped,    ///< the user stopped the search; the culprits are the smallest set seen to fail
     };
     State state = State::stopped;  ///< how the search ended
@@ -85,7 +85,7 @@ struct BisectResult {
     int starts = 0;                ///< of the host
     int failures = 0;              ///< the number of starts that failed
     std::wstring ending;           ///< how the host ended when it last failed
-    std::wstring problem;          ///< why the host cannot be started
+    std::wstring problem;          ///< why the state is `notStarted`
     std::wstring stamp;            ///< what the stamp of this library's build would name
     ScanResult scanned;            ///< the scan before the first start
 };

@@ -363,6 +363,35 @@ TEST_P(ElfProbe, EndsOnAChainThatNeverEnds) {
     EXPECT_FALSE(exports(content, "noOtherFunctionEither"));
 }
 
+TEST_P(ElfProbe, EndsOnAChainThatIsLongerThanThoseOfLibraries) {
+    if (!usesGnuHash())
+        GTEST_SKIP() << "a chain of this kind of table has no more entries than symbols";
+    // A table after the end of the library: one bucket, a filter that passes every name, and a
+    // chain of entries that neither match nor end it.
+    std::string content = whole + std::string(-whole.size() % 16, '\0');
+    const std::uint64_t table = content.size();
+    content += std::string(64 * 1024, '\0');
+    for (std::size_t field = 0; field < 4; ++field)
+        put(content, table + field * 4, std::uint32_t{1});
+    put(content, table + 16, ~std::uint64_t{0});
+    put(content, table + 24, std::uint32_t{1});
+    const std::size_t load = segment(PT_LOAD), dynamic = dynamicEntry(DT_GNU_HASH);
+    auto mapped = get<Elf64_Phdr>(content, load);
+    mapped.p_filesz = content.size();
+    put(content, load, mapped);
+    auto entry = get<Elf64_Dyn>(content, dynamic);
+    entry.d_un.d_ptr = table;
+    put(content, dynamic, entry);
+    EXPECT_FALSE(exports(content));
+    // The same with the entry of the function, whose symbol follows from its place in the chain.
+    std::uint32_t hash = 5381;
+    for (const char* c = entryPoint; *c; ++c)
+        hash = hash * 33 + static_cast<unsigned char>(*c);
+    for (std::size_t symbol = 0; symbol < 8; ++symbol)
+        put(content, table + 28 + symbol * 4, hash & ~std::uint32_t{1});
+    EXPECT_TRUE(exports(content));
+}
+
 TEST_P(ElfProbe, RefusesSymbolsThatAreNotForOthersToSee) {
     // Changes all symbols. Their names follow them.
     const std::size_t symbols = get<Elf64_Dyn>(whole, dynamicEntry(DT_SYMTAB)).d_un.d_ptr;

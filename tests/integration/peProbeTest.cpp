@@ -191,6 +191,25 @@ TEST_F(PeProbe, RefusesImportsThatLeadNowhere) {
     EXPECT_FALSE(changed(list, name));
 }
 
+TEST_F(PeProbe, RefusesMoreImportsThanLibrariesHave) {
+    // The import list replaces a long name of an export.
+    constexpr std::uint32_t most = 1023, entrySize = 20;
+    std::string content =
+        madeLibrary({{entryPoint, peCode}, {std::string((most + 2) * entrySize, 'z'), peCode}});
+    const auto addressOf = [&](std::size_t offset) {
+        return peExports + static_cast<std::uint32_t>(offset - placeOf(content, peExports));
+    };
+    const std::size_t list = content.find("zz");
+    const std::uint32_t name = addressOf(content.find("made.dll"));
+    content.replace(list, (most + 2) * entrySize, (most + 2) * entrySize, '\0');
+    putAt(content, headerOf(content) + PeField::importAddress, addressOf(list));
+    for (std::uint32_t index = 0; index < most; ++index)
+        putAt(content, list + index * entrySize + 12, name);
+    EXPECT_TRUE(exports(content));
+    putAt(content, list + most * entrySize + 12, name);
+    EXPECT_FALSE(exports(content));
+}
+
 TEST_F(PeProbe, ComparesNamesToTheEndOfTheirSection) {
     // The name ends at the end of the section, with and without its terminator.
     std::string content = madeLibrary({{entryPoint, peCode}});

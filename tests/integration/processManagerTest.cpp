@@ -141,6 +141,11 @@ TEST_F(HostProgram, StartedByARelativeNameSearchesTheFolderInIt) {
               "made counted\ndone\n");
 }
 
+TEST_F(HostProgram, StartedFromTheRootSearchesTheRootAndNotTheCurrentFolder) {
+    std::filesystem::copy_file(builtComponent(L"countedDescription"), elsewhere() / "counted");
+    EXPECT_EQ(runProgram(program(), "/host", {}, elsewhere()).output, "done\n");
+}
+
 TEST_F(HostProgram, StartedFromAFolderWithBlanksSearchesIt) {
     const auto inner = folder.path() / "with blanks";
     std::filesystem::create_directory(inner);

@@ -161,6 +161,12 @@ TYPED_TEST(Faulty, FailureOfAnObjectsOwnMakingIsToldWithTheObjectsPlace) {
               "object.");
 }
 
+TYPED_TEST(Faulty, FailedCastInAnObjectsCodeIsToldWithTheObjectsPlace) {
+    EXPECT_EQ(this->failureOf(miscastUid, 1),
+              "byte 0: inside the object that begins here: Bad cast in QrCastable::safeCast: Error "
+              "loading object.");
+}
+
 TYPED_TEST(Faulty, InnermostPlaceIsTold) {
     Scripted inner(unknownUid, 1, [](QrStream&) {});
     const std::size_t begin = saved<TypeParam>(nullptr).size();

@@ -4,6 +4,10 @@
 #include "components/componentTools/disabled.h"
 #include "tests/tools/toolsFixture.h"
 
+#include <cstdlib>
+#include <map>
+#include <utility>
+
 using namespace Mz;
 using namespace Mz::Tools;
 using namespace Mz::Test;
@@ -152,6 +156,24 @@ TEST_F(Bisect, SaysThatTheHostCannotBeStarted) {
     EXPECT_EQ(result.starts, 0);
 }
 
+TEST_F(Bisect, FindsTheHostInPath) {
+    fill(1);
+    const std::wstring extension = MZ_PROGRAM_EXTENSION;
+    const std::filesystem::path name = "search.host";
+    std::filesystem::copy_file(options.host.wstring() + extension,
+                               work.path() / (name.wstring() + extension));
+    const std::string separator{std::filesystem::path::preferred_separator == '/' ? ":" : ";"};
+    const char* const before = std::getenv("PATH");
+    setEnvironment("PATH", work.path().string() + separator + // The other is for libraries.
+                               (buildFolder / "bin").string() + separator + (before ? before : ""));
+    options.host = name;
+    const BisectResult result = bisect(options);
+    EXPECT_EQ(result.state, State::allPass) << std::filesystem::path(result.problem);
+    EXPECT_EQ(result.starts, 1);
+    options.host = "no.host";
+    EXPECT_EQ(bisect(options).state, State::notStarted);
+}
+
 TEST_F(Bisect, PassesOnTheOutputOfTheHostAndChangesNoListOfItsOwn) {
     fill(3);
     std::string output;
@@ -172,6 +194,52 @@ TEST_F(Bisect, LeavesOffWhatTheUserSwitchedOff) {
     EXPECT_EQ(result.state, State::allPass);
     EXPECT_EQ(result.components, 2u);
     EXPECT_EQ(disabledComponents(options.list).size(), 1u);
+}
+
+TEST_F(Bisect, SwitchesOffALibraryThatNeedsItsHost) {
+    add(L"takesFromHost", "needs");
+    fill(2);
+    options.host = buildFolder / "bin" / "recordedHost";
+    std::string output;
+    options.output = [&](std::string_view piece) { output += piece; };
+    std::map<std::size_t, std::string> outputs; // By the number of active components.
+    options.judge = [&](const HostStart& start) {
+        std::erase(output, '\r');
+        outputs[start.active] = std::exchange(output, {});
+        return std::optional(true); // Until no component is left.
+    };
+    const BisectResult result = bisect(options);
+    EXPECT_EQ(result.state, State::noneFails);
+    EXPECT_EQ(result.components, 2u);
+    EXPECT_THAT(outputs[2], HasSubstr("\n2 made\n"));
+    EXPECT_EQ(outputs[0], "0 builders, 0 mapped, no word\n0 made\n");
+}
+
+TEST_F(Bisect, StopsBeforeTheFirstStartIfTheScanIsInterrupted) {
+    fill(2);
+    options.probe.interrupted = [&] { return !std::filesystem::exists(options.list); };
+    options.judge = [](const HostStart&) -> std::optional<bool> {
+        ADD_FAILURE() << "started";
+        return true;
+    };
+    const BisectResult result = bisect(options);
+    EXPECT_EQ(result.state, State::stopped);
+    EXPECT_TRUE(result.scanned.interrupted);
+    EXPECT_EQ(result.starts, 0);
+}
+
+TEST_F(Bisect, CountsNoStartThatTheUserInterrupts) {
+    add(L"failsByHanging", "bad");
+    int asked = 0; // Since the scan has ended: before the start, and while the host hangs.
+    options.probe.interrupted = [&] {
+        return std::filesystem::exists(verdictsFileOf(options.list)) && ++asked > 1;
+    };
+    const BisectResult result = bisect(options);
+    EXPECT_EQ(result.state, State::stopped);
+    EXPECT_FALSE(result.scanned.interrupted);
+    EXPECT_EQ(result.starts, 0);
+    EXPECT_EQ(result.failures, 0);
+    EXPECT_TRUE(result.culprits.empty());
 }
 
 TEST_F(Bisect, StopsWhenTheUserWants) {

@@ -75,6 +75,17 @@ TEST_F(Console, CutsABarThatWouldNotFitItsLine) {
     EXPECT_EQ(stream.str().size(), 80u);
 }
 
+TEST_F(Console, CutsNoCharacterThatHasTwoUnits) {
+    ConsoleController controller(stream, true);
+    const std::wstring pair{static_cast<wchar_t>(0xD83D), static_cast<wchar_t>(0xDE00)};
+    const std::string line(78, 'x');
+    controller.status((std::wstring(78, L'x') + pair).c_str());
+    EXPECT_EQ(stream.str(), "\r" + line);
+    stream.str("");
+    controller.status(L"y");
+    EXPECT_EQ(stream.str(), "\ry" + std::string(77, ' '));
+}
+
 TEST_F(Console, CountsColumnsAndKeepsToOneLine) {
     ConsoleController controller(stream, true);
     controller.status(std::wstring(60, L'\u4E2D').c_str()); // Each takes two columns.
@@ -138,6 +149,18 @@ TEST_F(Console, LeavesNoControlCharacterToTheTerminal) {
     controller.message(0, L"\x1B[2J\ttab\nline\x9B");
     EXPECT_EQ(stream.str(), "\\x1B[2J\ttab\nline\\x9B\n");
     EXPECT_EQ(withoutControls(L"a\n\x7F"), L"a\\x0A\\x7F");
+}
+
+TEST_F(Console, ShowsNoProgressIfTold) {
+    ConsoleController controller(stream, false);
+    controller.showProgress(false);
+    EXPECT_FALSE(controller.isProgressShown());
+    EXPECT_TRUE(controller.progress(0.5f, L"work"));
+    std::raise(SIGINT);
+    EXPECT_FALSE(controller.progress(0.7f, L"work"));
+    EXPECT_EQ(stream.str(), "");
+    controller.showProgress(true);
+    EXPECT_TRUE(controller.isProgressShown());
 }
 
 TEST_F(Console, TakesAnyFraction) {

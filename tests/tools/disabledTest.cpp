@@ -218,6 +218,18 @@ TEST_F(Disabled, IsRefusedForWhatIsNotThere) {
     EXPECT_FALSE(std::filesystem::exists(list()));
 }
 
+TEST_F(Disabled, IsRefusedForAFolder) {
+    const std::filesystem::path inner = folder.path() / "inner";
+    std::filesystem::create_directory(inner);
+    const SwitchResult result = disableComponent(inner, list());
+    EXPECT_FALSE(result.changed);
+    EXPECT_EQ(result.problem,
+              displayName(inner) +
+                  L": it is not a regular file, and only regular files are candidates");
+    EXPECT_FALSE(std::filesystem::exists(list()));
+    EXPECT_FALSE(std::filesystem::exists(verdictsFileOf(list())));
+}
+
 TEST_F(Disabled, ChangesNoDamagedFile) {
     std::ofstream(list(), std::ios::binary) << "something else";
     EXPECT_THAT(disableComponent(good, list()).problem, HasSubstr(L"this is no recorded list"));

@@ -45,6 +45,17 @@ TEST_F(FindProgram, TakesTheFirstFolderThatHasIt) {
     EXPECT_EQ(find(textOf(second) + separator + textOf(first)), program);
 }
 
+TEST_F(FindProgram, TakesTheWholeNameWithOrWithoutTheExtension) {
+    programIn(first);
+    const std::string name = "tool.one", extension = System::programExtension();
+    const std::filesystem::path program = first.write(name + extension, "");
+    std::filesystem::permissions(program, std::filesystem::perms::owner_all);
+    setEnvironment("PATH", textOf(first));
+    EXPECT_EQ(System::findProgram(name), program);
+    EXPECT_EQ(System::findProgram(name + extension), program);
+    EXPECT_EQ(System::findProgram("tool.two"), std::filesystem::path());
+}
+
 TEST_F(FindProgram, PassesOverFolders) {
     std::filesystem::create_directory(first.path() /
                                       (std::string("tool") + System::programExtension()));

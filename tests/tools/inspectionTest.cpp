@@ -1,7 +1,9 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Verdicts that need a library of the other system, and notes on colliding uids.
+/// Verdicts that need a library of the other system, what a library needs of its host, and notes on
+/// colliding uids.
 #include "tests/tools/images.h"
 
+#include "components/componentManager/nativeText.h"
 #include "components/componentTools/inspecting/hostNeeds.h"
 #include "components/componentTools/inspecting/inspection.h"
 #include "components/componentTools/inspecting/uidNotes.h"
@@ -11,6 +13,8 @@
 
 #include <gtest/gtest.h>
 
+#include <filesystem>
+#include <string>
 #include <vector>
 
 using namespace Mz;
@@ -42,6 +46,33 @@ TEST(ProgramOfHost, IsTheFirstProgramThatAWindowsLibraryImportsFrom) {
     EXPECT_FALSE(programOfHost(image, {{L"exe.dll", {}, {}, true}}));
     image.format = ImageFormat::elf;
     EXPECT_FALSE(programOfHost(image, dependencies));
+}
+
+TEST(SymbolOfHost, IsOneThatNoLibraryDefinesIfAllCanBeSearched) {
+    const auto built = [](const std::wstring& name) {
+        return std::filesystem::path(MZ_BUILD_PATH) / "components" / name /
+               (name + MZ_LIBRARY_EXTENSION);
+    };
+    const std::filesystem::path file = built(L"takesFromHost");
+    const LibraryImage image = readLibraryImage(file);
+    std::vector<Dependency> dependencies = dependenciesOf(file, image, {});
+    const auto finding = symbolOfHost(file, dependencies);
+    if (image.format == ImageFormat::elf) {
+        ASSERT_TRUE(finding);
+        EXPECT_EQ(finding->verdict, Verdict::needsHost);
+        EXPECT_EQ(finding->subject, L"mzTestHostNumber");
+        EXPECT_EQ(finding->words, L", a symbol that no library it needs defines");
+    } else {
+        EXPECT_FALSE(finding) << "such libraries name the program";
+    }
+    const TemporaryDirectory folder;
+    dependencies.push_back(
+        {L"text", {}, Mz::displayName(folder.write("text", "no library")), true});
+    EXPECT_FALSE(symbolOfHost(file, dependencies));
+    dependencies.back().path.clear();
+    EXPECT_FALSE(symbolOfHost(file, dependencies));
+    const std::filesystem::path sound = built(L"goodWithKit");
+    EXPECT_FALSE(symbolOfHost(sound, dependenciesOf(sound, readLibraryImage(sound), {})));
 }
 
 TEST(UidNotes, NameTheWinnerOrTheLastThatLoses) {

@@ -3,12 +3,15 @@
 ///
 ///     recordedHost LIST PATH
 ///
+/// A search can give it another list.
+///
 /// Prints the number of builders, the number of candidate files that are mapped, the events of the
 /// libraries ("no word" if there are none), and then how many builders create an object.
 #include "tests/tools/recordedHost.h"
 #include "tests/components/testUids.h"
 #include "tests/support/testSystem.h"
 
+#include "components/componentKit/recordedList.h"
 #include "components/componentManager/binaryStream.h"
 #include "components/componentManager/bufferio.h"
 #include "components/componentManager/persistant.h"
@@ -57,7 +60,7 @@ int mzTestHostNumber() {
 
 int main(int, char** argv) {
     std::setlocale(LC_ALL, "");
-    readList(argv[1]);
+    readList(Kit::listFromEnvironment(argv[1]));
     const std::filesystem::path folder = argv[2];
     QrGetComponentManager()->initialize(searchPathOf(folder).c_str());
     Collector collector;

@@ -285,6 +285,47 @@ TEST_F(Scan, RejectsADamagedListWholeAndBuildsItAnew) {
     EXPECT_EQ(scan(options()).rejected, L"");
 }
 
+TEST_F(Scan, TakesAnEmptyFileForADamagedListThatNeedsNoCopy) {
+    add(L"goodWithKit");
+    lists.write("list", "");
+    const ScanResult result = scan(options());
+    EXPECT_NE(result.rejected, L"");
+    EXPECT_EQ(result.keptAs, std::filesystem::path());
+    EXPECT_EQ(result.notWritten, L"");
+    EXPECT_FALSE(std::filesystem::exists(lists.path() / "list.rejected"));
+    EXPECT_EQ(readRecordedList(list()).libraries.size(), 1u);
+}
+
+TEST_F(Scan, ReplacesNoDamagedListOfWhichItCannotKeepACopy) {
+    add(L"goodWithKit");
+    lists.write("list", "something else");
+    std::filesystem::create_directory(lists.path() / "list.rejected");
+    const ScanResult result = scan(options());
+    EXPECT_EQ(result.notWritten, displayName(list()) + L": nothing was written, for what is there "
+                                                       L"could not be kept");
+    EXPECT_EQ(result.keptAs, std::filesystem::path());
+    EXPECT_EQ(result.libraries.size(), 1u);
+    EXPECT_EQ(contentOf(list()), "something else");
+    EXPECT_FALSE(std::filesystem::exists(verdictsFileOf(list())));
+}
+
+TEST_F(Scan, KeepsTheRecordOfALibraryThatItWouldTryAgainWhereThereIsNoProbe) {
+    add(L"goodWithKit");
+    ScanResult first = scan(options());
+    first.libraries[0].builders.clear();
+    writeRecordedList(list(), first.libraries); // As a host that could not load it.
+    std::filesystem::remove(verdictsFileOf(list()));
+    ScanOptions wanted = options();
+    wanted.probe.program = folder.path() / "no-probe";
+    const ScanResult result = scan(wanted);
+    ASSERT_EQ(result.files.size(), 1u);
+    EXPECT_EQ(result.files[0].verdict.verdict, Verdict::probeFailed);
+    EXPECT_TRUE(result.files[0].recorded);
+    ASSERT_EQ(result.libraries.size(), 1u);
+    EXPECT_EQ(result.libraries[0].time, first.libraries[0].time);
+    EXPECT_TRUE(result.libraries[0].builders.empty());
+}
+
 TEST_F(Scan, RecordsNothingWhereThereIsNoProbe) {
     add(L"goodWithKit");
     scan(options());
@@ -328,6 +369,27 @@ TEST_F(Scan, BelievesNoVerdictThatNoScanCanHaveKept) {
         EXPECT_EQ(verdicts(result).begin()->second, Verdict::crashed) << lie;
         EXPECT_EQ(looked(result), 1) << lie;
     }
+}
+
+TEST_F(Scan, LeavesVerdictsToTheFileThatTheyAreAbout) {
+    add(L"crashesInEntryPoint");
+    const RecordedLibraries scanned = scan(options()).libraries;
+    ASSERT_EQ(scanned.size(), 1u);
+    const auto keptOf = [&](const RecordedLibrary& library) {
+        writeRecordedList(list(), {library}); // As a host that met another file.
+        return readRecordedList(list()).libraries.at(0).kept;
+    };
+    ASSERT_TRUE(keptOf(scanned[0]));
+    EXPECT_EQ(keptOf(scanned[0])->verdict, Verdict::crashed);
+    RecordedLibrary other = scanned[0];
+    other.time += 2;
+    EXPECT_FALSE(keptOf(other));
+    other = scanned[0];
+    other.size += 1;
+    EXPECT_FALSE(keptOf(other));
+    other = scanned[0];
+    other.fileName += L"x";
+    EXPECT_FALSE(keptOf(other));
 }
 
 TEST_F(Scan, LeavesOutFoldersThatCannotBeSearched) {

@@ -88,7 +88,7 @@ NativePath moduleFolder();
 NativePath managerFile();
 
 /// Returns the path of a program that is found in the folders of PATH that have full paths; empty
-/// if there is none. \param name  the program's name without extension
+/// if there is none. \param name  the program's name, on Windows with or without ".exe"
 NativePath findProgram(const std::string& name);
 
 /// Returns the extension of programs; empty on Linux.

@@ -59,6 +59,8 @@ Seen readSeen(const std::filesystem::path& file) {
         return seenIn(jsonIn(input));
     } catch (const Json::exception&) {
         return {};
+    } catch (const std::ios_base::failure&) {
+        return {}; // The buffer of a file throws it, and JSON is read from the buffer.
     }
 }
 

@@ -67,6 +67,9 @@ inline constexpr QrUid throwingUid = classUid(10);
 /// A node that replaces the exception of an object in it by another one, without a position.
 inline constexpr QrUid misleadingUid = classUid(11);
 
+/// A node that casts null when it is read.
+inline constexpr QrUid miscastUid = classUid(14);
+
 /// A node that stores its number and its links, and owns the links as soon as it has read them.
 inline constexpr QrUid holderUid = classUid(12);
 

@@ -86,6 +86,14 @@ class Misleading final : public Counted<Misleading> {
     }
 };
 
+class Miscast final : public Counted<Miscast> {
+  public:
+    const QrUid* getClassUid() const override { return &miscastUid; }
+    unsigned int getVersion() const override { return 1; }
+    void write(QrStream&) override {}
+    void read(QrStream&) override { safeCast<Node>(nullptr); }
+};
+
 class NotPersistent final : public QrCastRef<QrCastHeap<QrCastImpl<NotPersistent, Node>>> {};
 
 class MakesNull final : public Kit::Builder<MakesNull> {
@@ -106,5 +114,6 @@ MZ_COMPONENT(L"Faults", L"", Kit::builder<ViewedBuilder>(),
              Kit::builderOf<Selfish>({.uid = selfishUid}),
              Kit::builderOf<Careless>({.uid = carelessUid}),
              Kit::builderOf<Misleading>({.uid = misleadingUid}),
+             Kit::builderOf<Miscast>({.uid = miscastUid}),
              Kit::builderOf<NotPersistent>({.uid = notPersistentUid}), Kit::builder<MakesNull>(),
              Kit::builder<Throwing>())

@@ -197,7 +197,9 @@ NativePath managerFile() {
 
 // Not by SearchPathW: that looks in the current folder, too, which others may be able to write to.
 NativePath findProgram(const std::string& name) {
-    const std::wstring file = toCharacters(name, CP_ACP) + L".exe";
+    std::wstring file = toCharacters(name, CP_ACP);
+    if (!platform::lowerCase(file).ends_with(L".exe"))
+        file += L".exe";
     for (std::wstring rest = environmentPath("PATH").value_or(NativePath()).native();
          !rest.empty();) {
         const std::size_t end = rest.find(L';');
