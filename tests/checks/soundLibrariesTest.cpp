@@ -57,7 +57,8 @@ INSTANTIATE_TEST_SUITE_P(
         Sound{sound, "catchesInside"}, Sound{sound, "buildersOfATable"}, Sound{sound, "wideTexts"},
         Sound{sound, "everyType"}, Sound{sound, "bigState"}, Sound{sound, "formatsText"},
         Sound{sound, "newerVersion"}, Sound{sound, "sharesObjects"}, Sound{sound, "linksAfterLoad"},
-        Sound{sound, "crates"}, Sound{sound, "importsTables"}, Sound{sound, "passesStreamErrors"}),
+        Sound{sound, "crates"}, Sound{sound, "importsTables"}, Sound{sound, "passesStreamErrors"},
+        Sound{sound, "reportsEachWay"}),
     nameOfTest);
 
 INSTANTIATE_TEST_SUITE_P(OfOtherTests, SoundLibrary,

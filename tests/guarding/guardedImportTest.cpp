@@ -38,11 +38,19 @@ TEST_F(Guarding, BringsBackWhatIsSharedAndCircles) {
 TEST_F(Guarding, RelaysTheCallsOfTheImporter) {
     const GuardedImport import = this->import("importing talk");
     ASSERT_EQ(import.verdict, ImportVerdict::imported);
-    EXPECT_EQ(parcelOf(import)->text, L"10101010 found name");
+    EXPECT_EQ(parcelOf(import)->text, L"101010101 found name");
     EXPECT_THAT(controller.notes,
                 ElementsAre(L"message 1 a message", L"warning 2 a warning", L"error 3 an error",
                             L"progress 25 a quarter", L"progress 100 all", L"status 0 a status",
                             L"log 4 an entry", L"findFile 0 here;there"));
+}
+
+TEST_F(Guarding, RelaysProgressAHundredTimesASecond) {
+    const GuardedImport import = this->import("importing hurry");
+    ASSERT_EQ(import.verdict, ImportVerdict::imported);
+    const auto milliseconds = std::stoul(parcelOf(import)->text);
+    EXPECT_GE(controller.notes.size(), 1u);
+    EXPECT_LE(controller.notes.size(), milliseconds / 10 + 2);
 }
 
 TEST_F(Guarding, PassesTheAbortOfTheImporterToTheCaller) {
@@ -106,6 +114,16 @@ TEST_F(Guarding, SaysWhyNothingWasImported) {
     limits.program = folder.path() / "missing";
     EXPECT_EQ(import("importing graph").verdict, ImportVerdict::guardFailed);
 }
+
+#if MZ_HAS_COMMAND
+TEST_F(Guarding, NamesTheStatusOfAProgramThatEndsAtOnce) {
+    limits.program = std::filesystem::path(MZ_BUILD_PATH) / "bin" /
+                     (std::wstring(L"mzcomponents") + MZ_PROGRAM_EXTENSION);
+    const GuardedImport import = this->import("importing graph");
+    EXPECT_EQ(import.verdict, ImportVerdict::guardFailed);
+    EXPECT_EQ(import.detail, L"the process ended at once, with status 2");
+}
+#endif
 
 TEST_F(Guarding, LimitsTheStoredObject) {
     limits.answer = std::uint64_t{1} << 20;

@@ -57,6 +57,14 @@ TEST(ImportMessages, AreRejectedWhenCutOrExtended) {
         EXPECT_FALSE(decodeCall(payload.substr(0, size))) << size;
 }
 
+TEST(ImportMessages, OfATaskAreRejectedWhenCut) {
+    const std::string payload = payloadOf(
+        encode(ImportTask{"list", L"path", "C", L"file", L"name", 7, 8, true, true, true}));
+    ASSERT_TRUE(decodeTask(payload));
+    for (std::size_t size = 0; size < payload.size(); ++size)
+        EXPECT_FALSE(decodeTask(payload.substr(0, size))) << size;
+}
+
 TEST(ImportConversation, KeepsToItsLimits) {
     Kit::ImportLimits limits;
     limits.answer = 10;
@@ -100,7 +108,19 @@ TEST(ImportConversation, WaitsForTheRestOfAMessage) {
     EXPECT_EQ(conversation.outcome().verdict, ImportVerdict::notTaken);
 }
 
-/// Counts what it receives, and checks the fraction.
+TEST(ImportConversation, EndsWhenTheImporterGivesUp) {
+    const Kit::ImportLimits limits;
+    ImportConversation conversation(nullptr, limits);
+    std::string replies,
+        bytes =
+            encode(ControllerCall{ControllerFunction::abort, 9, 0, L"no more", std::nullopt, {}});
+    conversation.receive(bytes, replies);
+    EXPECT_TRUE(conversation.isOver());
+    EXPECT_EQ(conversation.outcome().verdict, ImportVerdict::programAborted);
+    EXPECT_EQ(conversation.outcome().detail, L"no more");
+}
+
+/// Stores the last progress, and finds each file under a long name.
 class Progress final : public QrCastImpl<Progress, QrProcessControl> {
   public:
     void* getContext() override { return nullptr; }
@@ -118,7 +138,9 @@ class Progress final : public QrCastImpl<Progress, QrProcessControl> {
     bool isErrorShown() override { return false; }
     void log(int, const wchar_t*) override {}
     [[noreturn]] void abort(int, const wchar_t*) override { throw 1; }
-    std::wstring findFile(const wchar_t*, const wchar_t*, const wchar_t*) override { return {}; }
+    std::wstring findFile(const wchar_t*, const wchar_t*, const wchar_t*) override {
+        return std::wstring(std::size_t{600'000}, L'x');
+    }
 
     float last = -1;
 };
@@ -143,6 +165,23 @@ TEST(ImportConversation, RelaysSoundFractionsOnly) {
     for (; frames.next(); ++count)
         continue;
     EXPECT_EQ(count, 4);
+}
+
+TEST(ImportConversation, EndsWhenTheChildDoesNotReadItsReplies) {
+    const Kit::ImportLimits limits;
+    Progress controller;
+    ImportConversation conversation(&controller, limits);
+    std::string replies;
+    const auto ask = [&] {
+        std::string bytes =
+            encode(ControllerCall{ControllerFunction::findFile, 0, 0, L"name", std::nullopt, {}});
+        conversation.receive(bytes, replies);
+    };
+    ask();
+    EXPECT_FALSE(conversation.isOver());
+    ask(); // More than 4 MiB wait now.
+    EXPECT_TRUE(conversation.isOver());
+    EXPECT_EQ(conversation.outcome().verdict, ImportVerdict::garbled);
 }
 
 } // namespace

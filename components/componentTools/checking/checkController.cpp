@@ -32,6 +32,7 @@ bool CheckController::isInterrupted() {
 
 bool CheckController::warning(int, const wchar_t*) {
     ++messages;
+    ++questions;
     return !stop;
 }
 

@@ -125,24 +125,33 @@ void answers(CheckContext& context) {
 
 namespace {
 
+/// Returns the exception of a call as a finding; empty if the call was skipped.
+std::wstring thrownBy(const CheckContext& context, const wchar_t* call, const wchar_t* remedy) {
+    const std::wstring& exception = context.lastException();
+    return exception.empty() ? L"" : call + (L" throws: " + exception + L". ") + remedy;
+}
+
 /// Calls the entry point a few times, as several hosts would. Returns what is wrong with the
 /// references; empty if nothing is.
 std::wstring referenceFault(CheckContext& context, QrGetComponentDescriptionFunction* entry) {
     ReferenceCount first;
     for (int round = 0; round < 3; ++round) {
-        QrCastable* object = nullptr;
-        ReferenceCount count;
-        bool same = false;
-        if (!context.attempt(L"the entry point", {}, [&] { object = entry(); }) || !object)
+        QrCastable *object = nullptr, *next = nullptr;
+        if (!context.attempt(L"the entry point", {}, [&] {
+                object = entry();
+                next = entry();
+            }))
+            return thrownBy(context, L"the entry point", L"Return a description at every call.");
+        if (!object || !next)
             return {};
+        ReferenceCount count;
+        const bool same = next == object;
         if (!context.attempt(L"the release of the description", {}, [&] {
-                const QrPtr<QrCastable> kept(object);
-                const QrPtr<QrCastable> again(entry());
+                const QrPtr<QrCastable> kept(object), again(next);
                 count = countOf(*again);
-                same = again.get() == object;
                 count.value -= same ? 2 : 1; // Those of `kept` and `again`.
             }))
-            return {};
+            return thrownBy(context, L"the release of the description", L"Let no release throw.");
         if (round == 0)
             first = count;
         // The classes from which the object is derived are all that is left of it.
@@ -167,9 +176,6 @@ void descriptionCounted(CheckContext& context) {
         module ? CheckContext::entryPointOf(module) : nullptr;
     if (const std::wstring fault = entry ? referenceFault(context, entry) : L""; !fault.empty())
         context.report({}, fault);
-    if (!context.lastException().empty())
-        context.report({}, L"the release of the description throws: " + context.lastException() +
-                               L". Let no release throw.");
     context.attempt(L"unloading the library", {}, [&] { platform::unloadLibrary(module); });
 }
 

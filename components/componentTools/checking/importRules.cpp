@@ -208,8 +208,8 @@ void importStops(CheckContext& context) {
                                    std::to_wstring(controller.questions - 1) + L" times more" +
                                    (imported ? L" until it was complete" : L"") + L", for " +
                                    attempt.detail() +
-                                   L". Return null when isInterrupted returns true or progress "
-                                   L"returns false.",
+                                   L". Return null when isInterrupted returns true, or progress "
+                                   L"or warning returns false.",
                                attempt.reproduce(context));
             return goesOn;
         });

@@ -6,6 +6,7 @@
 #include "components/componentManager/exceptions.h"
 
 #include <chrono>
+#include <clocale>
 
 namespace Mz::Tools {
 
@@ -52,6 +53,19 @@ std::vector<ImportingBuilder> importBuilders(CheckContext& context) {
         result.push_back({&described, importing, extension});
     }
     return result;
+}
+
+KeptSettings::KeptSettings() : locale(std::setlocale(LC_ALL, nullptr)) {
+    std::error_code ignored;
+    folder = std::filesystem::current_path(ignored);
+}
+
+KeptSettings::~KeptSettings() {
+    std::error_code ignored;
+    if (std::filesystem::current_path(ignored) != folder)
+        std::filesystem::current_path(folder, ignored);
+    if (std::setlocale(LC_ALL, nullptr) != locale)
+        std::setlocale(LC_ALL, locale.c_str());
 }
 
 ImportTry::ImportTry(const ImportingBuilder& builder, const CheckInput& input, std::size_t index,

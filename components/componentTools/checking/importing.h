@@ -7,6 +7,7 @@
 
 #include "components/componentManager/importBuilder.h"
 
+#include <filesystem>
 #include <functional>
 #include <memory>
 #include <sstream>
@@ -28,6 +29,19 @@ std::vector<ImportingBuilder> importBuilders(CheckContext& context);
 /// Returns the extensions that the builder enumerates. A null extension is returned as null.
 std::vector<std::unique_ptr<std::wstring>>
 extensionsOf(CheckContext& context, const DescribedBuilder& described, QrImportBuilder& builder);
+
+/// Restores the working folder and the locale, so that no call finds what an earlier one changed.
+class KeptSettings {
+  public:
+    KeptSettings();
+    ~KeptSettings();
+    KeptSettings(const KeptSettings&) = delete;
+    KeptSettings& operator=(const KeptSettings&) = delete;
+
+  private:
+    std::filesystem::path folder;
+    std::string locale;
+};
 
 /// One input, supplied to one builder. The input counts its references.
 class ImportTry {
@@ -57,6 +71,7 @@ class ImportTry {
     std::string reproduce(const CheckContext& context) const;
 
   private:
+    KeptSettings settings;
     const ImportingBuilder& importing;
     std::size_t number;
     const char* rule;

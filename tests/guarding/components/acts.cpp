@@ -106,6 +106,14 @@ void eatMemory() {
     }
 }
 
+/// Uses 120 MiB, and requests more than there can be.
+void eatAndRequest() {
+    constexpr std::size_t size = std::size_t{120} << 20;
+    char* const block = new char[size];
+    std::memset(block, 1, size);
+    sink = *new char[std::size_t{1} << 46] + block[size / 2];
+}
+
 /// Lies to the host, and waits for its reaction.
 void lie(const std::string& bytes) {
     writeToPipes(bytes);
@@ -154,6 +162,7 @@ Acts actsThatEnd() {
         {"freeze", freeze},
         {"hangInThread", [] { std::thread(hang).join(); }},
         {"eatMemory", eatMemory},
+        {"eatAndRequest", eatAndRequest},
         {"requestTooMuch", [] { sink = *new char[std::size_t{1} << 46]; }},
         {"throwStandard", throwStandard},
         {"throwOwn",

@@ -8,6 +8,7 @@
 #include "tests/guarding/components/parcels.h"
 #include "tests/guarding/components/system.h"
 
+#include <chrono>
 #include <clocale>
 #include <cstdint>
 #include <cstdlib>
@@ -57,9 +58,20 @@ std::wstring talk() {
     controller.status(L"a status");
     controller.log(4, L"an entry");
     text << controller.isProgressShown() << controller.isStatusShown() << controller.isErrorShown()
-         << controller.isInterrupted();
+         << controller.isInterrupted() << !controller.getContext();
     text << L' ' << controller.findFile(L"name", L"here;there", nullptr);
     return text.str();
+}
+
+/// Reports progress without a pause. Returns how many milliseconds that took.
+std::wstring hurry() {
+    using Clock = std::chrono::steady_clock;
+    const Clock::time_point start = Clock::now();
+    QrProcessControl& controller = *QrGetProcessController();
+    for (int step = 0; step < 1000; ++step)
+        controller.progress(static_cast<float>(step) / 2000, L"hurrying");
+    return std::to_wstring(
+        std::chrono::duration_cast<std::chrono::milliseconds>(Clock::now() - start).count());
 }
 
 /// Returns which of its rights this process has.
@@ -115,6 +127,8 @@ QrPtr<Parcel> parcelFor(const std::string& phase, const std::string& act) {
     const QrPtr<Plain> parcel = new Plain;
     if (act == "talk")
         parcel->text = talk();
+    else if (act == "hurry")
+        parcel->text = hurry();
     else if (act == "rights")
         parcel->text = rights();
     else if (act == "large")

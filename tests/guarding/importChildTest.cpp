@@ -1,0 +1,59 @@
+// SPDX-License-Identifier: BSL-1.0
+/// Tests when the process of a guarded import is not started, and that it ends at once if it is not
+/// started as it should be.
+#include "components/componentTools/guarding/importChild.h"
+#include "components/componentManager/componentImp.h"
+#include "components/componentTools/guardedImport.h"
+#include "components/componentTools/guarding/importMessages.h"
+#include "components/componentTools/platform/system.h"
+#include "tests/support/temporaryDirectory.h"
+#include "tests/support/testSystem.h"
+
+#include <gtest/gtest.h>
+
+#include <filesystem>
+
+using namespace Mz;
+using namespace Mz::Tools;
+
+namespace {
+
+const std::filesystem::path license = std::filesystem::path(MZ_SOURCE_PATH) / "LICENSE";
+
+/// Starts the process with a file, and with `input` as its standard input. Returns its exit status;
+/// -1 if it did not exit by itself.
+int statusFor(std::vector<std::filesystem::path> arguments, std::string input) {
+    const System::InheritableFile file(license);
+    for (std::filesystem::path& argument : arguments)
+        if (argument == "FILE")
+            argument = file.argument();
+    arguments.insert(arguments.begin(), importArgument);
+    const System::ChildLimits limits{
+        std::chrono::seconds(60), std::uint64_t{1} << 30, 0, std::size_t{1} << 20, {}};
+    const System::ChildResult child =
+        System::runChild(MZ_PROBE, arguments, limits, {&input, &file});
+    return child.end == System::ChildResult::End::exited && child.output.empty() ? child.status
+                                                                                 : -1;
+}
+
+TEST(ImportChild, EndsWithoutAFileAndATask) {
+    ASSERT_TRUE(std::filesystem::exists(license));
+    constexpr int usage = 2;
+    EXPECT_EQ(statusFor({}, ""), usage);
+    EXPECT_EQ(statusFor({"FILE", "more"}, ""), usage);
+    EXPECT_EQ(statusFor({"no number"}, ""), usage);
+    EXPECT_EQ(statusFor({"FILE"}, "no message"), usage);
+    EXPECT_EQ(statusFor({"FILE"}, encodeActivity(L"a message to the host")), usage);
+}
+
+TEST(GuardedImport, StartsNoProcessForAManagerWithoutLibraries) {
+    const Mz::Test::TemporaryDirectory empty;
+    QrGetComponentManager()->initialize(Mz::Test::searchPathOf(empty.path()).c_str());
+    Kit::ImportLimits limits;
+    limits.program = empty.path() / "missing"; // Would be another verdict.
+    const Kit::GuardedImport import = Kit::importGuarded("file", limits);
+    EXPECT_EQ(import.verdict, Kit::ImportVerdict::notTaken);
+    EXPECT_EQ(import.sentence(), L"file: no import builder takes this file.");
+}
+
+} // namespace
