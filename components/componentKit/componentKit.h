@@ -95,7 +95,11 @@ class StaticDescription {
     constexpr StaticDescription() = default;
 
     /// Constructs the description and returns it. Must be called only once.
-    Description* make(const wchar_t* label, const wchar_t* text, Description::Builders builders) {
+    template <class... Plans>
+    Description* make(const wchar_t* label, const wchar_t* text, const Plans&... plans) {
+        Description::Builders builders;
+        builders.reserve(sizeof...(plans));
+        (builders.push_back(plans), ...);
         description = new (storage) Description(label, text, std::move(builders));
         return description;
     }
@@ -135,6 +139,6 @@ class StaticDescription {
                   "two builders of this component have the same uid: make a new one for each");    \
     extern "C" MZ_EXPORT Mz::QrCastable* QrGetComponentDescription() {                             \
         static Mz::Kit::Description* const description =                                           \
-            mzComponentDescription.make(label, text, {__VA_ARGS__});                               \
+            mzComponentDescription.make(label, text __VA_OPT__(, ) __VA_ARGS__);                   \
         return description;                                                                        \
     }
