@@ -180,6 +180,11 @@ class CheckRun {
     Outcome runChildProcess() const {
         Outcome outcome;
         const ProbeOptions& process = options.process;
+        // A process may end before it is waited for, and so before the user is asked.
+        if (process.interrupted && process.interrupted()) {
+            outcome.child.end = System::ChildResult::End::interrupted;
+            return outcome;
+        }
         const std::uint64_t refused = refusedMemory(process);
         System::ChildLimits limits{process.timeLimit, process.memoryLimit, refused, longestAnswer,
                                    process.interrupted};
