@@ -318,6 +318,30 @@ TEST(FormattedRead, RealNumbersOfMoreDigitsThanAnIntegerHoldsAreExact) {
     }
 }
 
+TEST(FormattedRead, CharactersBehindASingleConversionMustBeThere) {
+    expect<std::int16_t>("7;8", L"%hd;", 7, "8");
+    expect<std::uint16_t>("7;8", L"%hu;", 7, "8");
+    expect<std::int32_t>("7;8", L"%d;", 7, "8");
+    expect<std::uint32_t>("7;8", L"%u;", 7, "8");
+    expect<long>("7;8", L"%ld;", 7, "8");
+    expect<unsigned long>("7;8", L"%lu;", 7, "8");
+    expect<int64>("7;8", L"%I64d;", 7, "8");
+    expect<unsigned long long>("7;8", L"%I64u;", 7, "8");
+    expect<float>("7.5;8", L"%g;", 7.5f, "8");
+    expect<double>("7.5;8", L"%lg;", 7.5, "8");
+}
+
+TEST(FormattedRead, ANumberGoesOnWhereThePartThatIsParsedAtOnceEnds) {
+    // The number is cut after each of its characters by one of these runs of white space.
+    for (std::size_t blanks = 40; blanks <= 70; ++blanks) {
+        SCOPED_TRACE(blanks);
+        const std::string before(blanks, ' ');
+        expect<double>(before + "-12.578e+12 ", L"%lg", -12.578e12, " ");
+        expect<float>(before + "-12.578e+12 ", L"%g", -12.578e12f, " ");
+        expect<std::int32_t>(before + "-1257812 ", L"%d", -1257812, " ");
+    }
+}
+
 TEST(FormattedRead, ANumberMayFollowAnyAmountOfWhiteSpace) {
     for (std::size_t blanks = 0; blanks < 80; ++blanks)
         expectNumber(std::string(blanks, ' ') + "1234 5", 1234, " 5");

@@ -22,8 +22,8 @@ using testing::ElementsAre;
 namespace {
 
 constexpr std::uint64_t neededTag = 1, hashTag = 4, stringsTag = 5, symbolsTag = 6,
-                        stringsSizeTag = 10, ownNameTag = 14, gnuHashTag = 0x6FFFFEF5,
-                        programTag = 0x6FFFFFFB, ignoredTag = 0x60000000;
+                        stringsSizeTag = 10, ownNameTag = 14, oldFolderTag = 15, folderTag = 29,
+                        gnuHashTag = 0x6FFFFEF5, programTag = 0x6FFFFFFB, ignoredTag = 0x60000000;
 
 const std::string entryPoint = "QrGetComponentDescription";
 
@@ -148,6 +148,28 @@ TEST_F(ElfTables, HoldANameUpToTheirLastByte) {
     setValue(neededTag, size);
     EXPECT_EQ(read().damage, L"the name of a library that it needs is missing");
     EXPECT_TRUE(read().needed.empty());
+}
+
+TEST_F(ElfTables, HoldTheFoldersOfDependencies) {
+    for (const std::uint64_t tag : {folderTag, oldFolderTag}) {
+        restart();
+        setTag(neededTag, tag);
+        LibraryImage image = read();
+        EXPECT_EQ(image.damage, L"") << tag;
+        EXPECT_THAT(tag == folderTag ? image.runpath : image.rpath, ElementsAre("first.lib"));
+        EXPECT_THAT(image.needed, ElementsAre("second.lib"));
+        setValue(tag, value(stringsSizeTag));
+        image = read();
+        EXPECT_EQ(image.damage, L"the name of a library that it needs is missing") << tag;
+    }
+}
+
+TEST_F(ElfTables, ThatAreCutOffByTheEndOfTheFileNameNoExports) {
+    EXPECT_THAT(exportedNames(file()), ElementsAre(entryPoint));
+    for (const std::uint64_t left : {4u, 8u, 12u}) { // Of the head of the table.
+        setValue(gnuHashTag, elfPlaces.fileEnd - left);
+        EXPECT_THAT(exportedNames(file()), testing::IsEmpty()) << left;
+    }
 }
 
 TEST_F(ElfTables, HoldTheOwnName) {

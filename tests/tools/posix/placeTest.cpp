@@ -83,6 +83,9 @@ class ForOrdinaryUser : public Place {
         options.list = lists.path() / "list";
         options.probe = patient();
     }
+    ~ForOrdinaryUser() override { // So that the folder can be removed.
+        std::filesystem::permissions(lists.path(), std::filesystem::perms::all);
+    }
 
     TemporaryDirectory lists;
     const std::filesystem::path file = add(L"goodWithKit");
