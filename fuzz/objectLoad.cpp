@@ -57,15 +57,7 @@ template <class Stream>
 std::string changedChain(Fuzz::Input& input) {
     unsigned int depth = 1 + input.byte();
     depth += 2 * input.byte() % 256;
-    Saving<Stream> out; // Written by hand: a writer refuses what is too deep.
-    for (unsigned int number = 1; number <= depth; ++number) {
-        out.stream << number << nodeUid << 3U << 1;
-        QrWriteExactText(out.stream, L"");
-        out.stream << true << 0.5 << (number < depth ? 1U : 0U);
-    }
-    for (unsigned int number = depth; number > 0; --number)
-        out.stream << (0x454F424AU ^ number);
-    std::string bytes = out.bytes();
+    std::string bytes = writtenChain<Stream>(depth);
     for (std::string_view change; (change = input.take(3)).size() == 3;) {
         const auto high = static_cast<unsigned char>(change[0]);
         const auto low = static_cast<unsigned char>(change[1]);

@@ -106,7 +106,7 @@ class Bisection {
         using End = System::ChildResult::End;
         if (child.end == End::interrupted)
             return std::nullopt;
-        // Without its exit status a host could not be told from one that fails.
+        // Without its exit status, a host that works cannot be distinguished from one that fails.
         const bool endUnknown = child.end == End::unknown && !options.judge;
         if (child.end == End::notStarted || endUnknown) {
             notStarted = true;

@@ -298,15 +298,7 @@ TYPED_TEST(Faulty, NestingIsAllowedToTheStatedDepthOnly) {
 
 TYPED_TEST(Faulty, NestingBeyondTheStatedDepthIsNoticedWhenItIsRead) {
     for (const unsigned int depth : {500U, 501U, 100000U}) {
-        Saving<TypeParam> out; // Written by hand: a writer refuses this depth.
-        for (unsigned int number = 1; number <= depth; ++number) {
-            out.stream << number << nodeUid << 3U << 1;
-            QrWriteExactText(out.stream, L"");
-            out.stream << true << 0.5 << (number < depth ? 1U : 0U);
-        }
-        for (unsigned int number = depth; number > 0; --number)
-            out.stream << (0x454F424AU ^ number);
-        Loading<TypeParam> in(out.bytes());
+        Loading<TypeParam> in(writtenChain<TypeParam>(depth));
         if (depth <= 500) {
             EXPECT_TRUE(in.node());
             in.finish();

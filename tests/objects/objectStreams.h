@@ -56,6 +56,21 @@ std::string saved(const QrCastable* object) {
     return out.bytes();
 }
 
+/// Returns a chain of `depth` nodes, each inside the one before. It is written by hand, because a
+/// writer refuses more than the largest depth.
+template <class Stream>
+std::string writtenChain(unsigned int depth) {
+    Saving<Stream> out;
+    for (unsigned int number = 1; number <= depth; ++number) {
+        out.stream << number << nodeUid << 3U << 1;
+        QrWriteExactText(out.stream, L"");
+        out.stream << true << 0.5 << (number < depth ? 1U : 0U);
+    }
+    for (unsigned int number = depth; number > 0; --number)
+        out.stream << (0x454F424AU ^ number);
+    return out.bytes();
+}
+
 /// Clears the links of all nodes that can be reached, so that cycles are freed.
 inline void unlink(const QrPtr<Node>& start) {
     std::vector<QrPtr<Node>> found{start};

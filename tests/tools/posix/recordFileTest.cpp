@@ -23,7 +23,7 @@ class RecordFile : public testing::Test {
   protected:
     RecordFile() { std::filesystem::permissions(folder.path(), std::filesystem::perms::all); }
 
-    /// Returns a file that its owner alone may write, and nobody read.
+    /// Returns a file that only its owner may write and no one may read.
     std::filesystem::path unreadable(const std::string& content) const {
         const std::filesystem::path file = folder.write("file", content);
         std::filesystem::permissions(file, std::filesystem::perms::owner_write);
