@@ -69,6 +69,23 @@ TEST_F(WindowsDiscovery, LoadsALibraryInTheSurroundingsOfItsOwnManifestOnFirstUs
     EXPECT_EQ(maker(manifestUid), "manifest");
 }
 
+TEST_F(WindowsDiscovery, LoadsALibraryInTheSurroundingsOfAManifestBesideIt) {
+    // The loader itself heeds a manifest in the library, but not this one.
+    std::filesystem::copy(buildFolder / "components" / "ownManifest", folder.path(),
+                          std::filesystem::copy_options::recursive);
+    std::ofstream(folder.path() / "noManifest.dll.2.manifest")
+        << R"(<assembly xmlns="urn:schemas-microsoft-com:asm.v1" manifestVersion="1.0">
+  <dependency>
+    <dependentAssembly>
+      <assemblyIdentity type="win32" name="mzTestAssembly" version="1.0.0.0" processorArchitecture="amd64"/>
+    </dependentAssembly>
+  </dependency>
+</assembly>)";
+    initialize();
+    ASSERT_TRUE(find("noManifest.dll"));
+    EXPECT_TRUE(find("noManifest.dll")->module);
+}
+
 TEST_F(WindowsDiscovery, LeavesNoActivationContextBehind) {
     HANDLE before = nullptr;
     ASSERT_TRUE(::GetCurrentActCtx(&before));

@@ -36,10 +36,9 @@ std::wstring fullName(const NativePath& path) {
     }
 }
 
-/// Returns the full path for the loader. The loader appends ".dll" to a name without an extension,
-/// unless the name ends with a dot.
-std::wstring loaderName(const NativePath& path) {
-    const std::wstring name = fullName(path);
+/// Returns the loader's form of a full path. The loader appends ".dll" to a name without an
+/// extension, unless the name ends with a dot.
+std::wstring loaderName(const std::wstring& name) {
     const std::size_t separator = name.find_last_of(L"/\\");
     const std::size_t dot = name.find_last_of(L'.');
     const bool hasExtension =
@@ -51,8 +50,8 @@ std::wstring loaderName(const NativePath& path) {
 /// of the object. A library without a manifest is loaded in the context of the caller.
 class OwnActivationContext {
   public:
-    explicit OwnActivationContext(const NativePath& path) {
-        const std::wstring source = fullName(path);
+    /// `source` is the full path of the library.
+    explicit OwnActivationContext(const std::wstring& source) {
         constexpr int isolationAwareManifest = 2;
         ACTCTXW request{};
         request.cbSize = sizeof request;
@@ -121,6 +120,24 @@ bool isCode(const void* address) {
     MEMORY_BASIC_INFORMATION memory{};
     return ::VirtualQuery(address, &memory, sizeof memory) != 0 &&
            (memory.Protect & executable) != 0;
+}
+
+/// Maps the library at a full path without running its code, and returns whether it exports the
+/// function.
+bool exportsWhenMapped(const std::wstring& name, const char* symbol) {
+    const HMODULE module =
+        ::LoadLibraryExW(loaderName(name).c_str(), nullptr, DONT_RESOLVE_DLL_REFERENCES);
+    const bool found = findSymbol(module, symbol) != nullptr;
+    unloadLibrary(module);
+    return found;
+}
+
+/// Loads the library at a full path; returns null if it cannot be loaded.
+Module load(const std::wstring& name) {
+    const HMODULE module = ::LoadLibraryW(loaderName(name).c_str());
+    if (!module)
+        static_cast<void>(::GetLastError()); // Discards the reason.
+    return module;
 }
 
 bool isDirectory(const NativePath& path) {
@@ -197,35 +214,36 @@ bool openForReading(std::ifstream& stream, const NativePath& path) {
 }
 
 Module findLoadedLibrary(const NativePath& path) {
-    return ::GetModuleHandleW(loaderName(path).c_str());
+    return ::GetModuleHandleW(loaderName(fullName(path)).c_str());
 }
 
 ExportState queryExport(const NativePath& path, const char* symbol) {
-    const ExportState state = readExport(fullName(path), symbol);
+    const std::wstring name = fullName(path);
+    const ExportState state = readExport(name, symbol);
     if (state != ExportState::exported)
         return state;
-    const std::wstring name = loaderName(path);
-    const OwnActivationContext context(path);
-    const HMODULE module = ::LoadLibraryExW(name.c_str(), nullptr, DONT_RESOLVE_DLL_REFERENCES);
-    const bool found = findSymbol(module, symbol) != nullptr;
-    unloadLibrary(module);
-    return found ? ExportState::exported : ExportState::absent;
+    const OwnActivationContext context(name);
+    return exportsWhenMapped(name, symbol) ? ExportState::exported : ExportState::absent;
 }
 
 Module loadLibrary(const NativePath& path) {
-    const OwnActivationContext context(path);
-    const HMODULE module = ::LoadLibraryW(loaderName(path).c_str());
-    if (!module)
-        static_cast<void>(::GetLastError()); // Discards the reason.
-    return module;
+    const std::wstring name = fullName(path);
+    const OwnActivationContext context(name);
+    return load(name);
 }
 
+// The probe and the load share one activation context: making one maps the file, and looks for a
+// manifest beside it.
 UsedLibrary useLibrary(const NativePath& path, const char* symbol) {
     if (const Module mapped = findLoadedLibrary(path))
         return {mapped, false, false};
-    const ExportState state = queryExport(path, symbol);
-    const Module module = state == ExportState::exported ? loadLibrary(path) : nullptr;
-    return {module, module != nullptr, state == ExportState::unknown};
+    const std::wstring name = fullName(path);
+    const ExportState state = readExport(name, symbol);
+    if (state != ExportState::exported)
+        return {nullptr, false, state == ExportState::unknown};
+    const OwnActivationContext context(name);
+    const Module module = exportsWhenMapped(name, symbol) ? load(name) : nullptr;
+    return {module, module != nullptr, false};
 }
 
 void unloadLibrary(Module module) {
