@@ -9,6 +9,8 @@ namespace Mz::Benchmarks {
 void addCastComparisons(RatioTable& table);
 void addCreateComparisons(RatioTable& table);
 void addStartComparisons(RatioTable& table);
+/// Adds the start with 4,000 recorded libraries.
+void addLargeStartComparisons(RatioTable& table);
 void addControllerComparisons(RatioTable& table);
 void addStreamComparisons(RatioTable& table);
 void addMediaComparisons(RatioTable& table);

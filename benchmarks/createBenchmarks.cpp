@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: BSL-1.0
 // Making objects through the manager, compared with the calls that a component can see, and through
 // a kept builder, compared with a virtual factory function.
+#include "byHand.h"
 #include "comparisons.h"
 #include "manager.h"
 #include "measure.h"
@@ -9,7 +10,6 @@
 #include "generated/identity.h"
 
 #include <algorithm>
-#include <dlfcn.h>
 #include <filesystem>
 #include <memory>
 #include <unordered_map>
@@ -45,9 +45,10 @@ using EntryPoints = std::unordered_map<QrUid, QrGetComponentDescriptionFunction*
 EntryPoints loadedByHand() {
     EntryPoints found;
     for (const auto& entry : std::filesystem::directory_iterator(generatedFolder())) {
-        void* const library = ::dlopen(entry.path().c_str(), RTLD_NOW | RTLD_LOCAL);
-        void* const uid = library ? ::dlsym(library, "mzBenchmarkUid") : nullptr;
-        void* const entryPoint = library ? ::dlsym(library, "QrGetComponentDescription") : nullptr;
+        void* const library = openLibrary(entry.path());
+        void* const uid = library ? functionOf(library, "mzBenchmarkUid") : nullptr;
+        void* const entryPoint =
+            library ? functionOf(library, "QrGetComponentDescription") : nullptr;
         if (uid && entryPoint)
             found[*reinterpret_cast<const QrUid* (*)()>(uid)()] =
                 reinterpret_cast<QrGetComponentDescriptionFunction*>(entryPoint);

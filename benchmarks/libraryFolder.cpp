@@ -2,10 +2,12 @@
 // Writes copies of a library. If the library contains the marked uid, each copy gets another one.
 #include "libraryFolder.h"
 
+#include "libraryStamp.h"
+#include "temporaryName.h"
+
 #include "generated/identity.h"
 
 #include <cstdio>
-#include <cstdlib>
 #include <cstring>
 #include <fstream>
 #include <iterator>
@@ -39,9 +41,9 @@ std::size_t identityIn(const std::string& content) {
 }
 
 std::filesystem::path newFolder() {
-    std::string name = (std::filesystem::temp_directory_path() / "mzBenchmarks-XXXXXX").string();
-    if (!::mkdtemp(name.data()))
-        throw std::runtime_error("cannot make the folder " + name);
+    std::filesystem::path name = temporaryName("mzbenchmarks");
+    if (!std::filesystem::create_directory(name))
+        throw std::runtime_error("cannot make the folder " + name.string());
     return name;
 }
 
@@ -55,11 +57,13 @@ LibraryFolder::LibraryFolder(const std::filesystem::path& library, unsigned int 
         const QrUid uid = generatedUid(number);
         if (identity != npos)
             std::memcpy(content.data() + identity, &uid, sizeof uid);
+        setStamp(content, number);
         char name[32];
-        std::snprintf(name, sizeof name, "library%04u.so", number);
-        std::ofstream copy(folder / name, std::ios::binary);
+        std::snprintf(name, sizeof name, "library%04u", number);
+        const std::filesystem::path file = (folder / name).replace_extension(library.extension());
+        std::ofstream copy(file, std::ios::binary);
         if (!copy.write(content.data(), static_cast<std::streamsize>(content.size())).flush())
-            throw std::runtime_error("cannot write " + (folder / name).string());
+            throw std::runtime_error("cannot write " + file.string());
     }
 }
 

@@ -2,6 +2,8 @@
 /// Measures the library, each work together with its limit, and prints a table of ratios.
 #include "comparisons.h"
 #include "memory.h"
+#include "ratioReporter.h"
+
 #include "peers/registration.h"
 
 #include <condition_variable>
@@ -98,6 +100,7 @@ void addComparisons(RatioTable& table) {
     addCastComparisons(table);
     addCreateComparisons(table);
     addStartComparisons(table);
+    addLargeStartComparisons(table);
     addControllerComparisons(table);
     addStreamComparisons(table);
     addMediaComparisons(table);

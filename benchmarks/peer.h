@@ -8,6 +8,12 @@
 
 #include <memory>
 
+#ifdef MZ_BUILDING_PEER
+#define MZ_PEER_API MZ_EXPORT
+#else
+#define MZ_PEER_API MZ_IMPORT
+#endif
+
 namespace Mz::Benchmarks {
 
 /// The interface to which the benchmarks cast.
@@ -36,19 +42,19 @@ class Calls {
 };
 
 /// The standard library's alternative: a root, a derived interface, and shared ownership.
-class MZ_SHARED_TYPE SharedRoot {
+class MZ_PEER_API SharedRoot {
   public:
     virtual ~SharedRoot();
 };
 
-class MZ_SHARED_TYPE SharedGauge : public SharedRoot {
+class MZ_PEER_API SharedGauge : public SharedRoot {
   public:
     ~SharedGauge() override;
     virtual long value() const = 0;
 };
 
 /// An interface that no shared gauge has.
-class MZ_SHARED_TYPE SharedAbsent : public SharedRoot {
+class MZ_PEER_API SharedAbsent : public SharedRoot {
   public:
     ~SharedAbsent() override;
 };
@@ -67,13 +73,13 @@ class Factory {
     virtual Product* make() = 0;
 };
 
-MZ_EXPORT QrCastable* uncountedGauge();
+MZ_PEER_API QrCastable* uncountedGauge();
 /// Returns a new object without a reference.
-MZ_EXPORT QrCastable* newCountedGauge();
-MZ_EXPORT Calls* calls();
-MZ_EXPORT std::shared_ptr<SharedRoot> newSharedGauge();
-MZ_EXPORT Factory* factory();
+MZ_PEER_API QrCastable* newCountedGauge();
+MZ_PEER_API Calls* calls();
+MZ_PEER_API std::shared_ptr<SharedRoot> newSharedGauge();
+MZ_PEER_API Factory* factory();
 /// A function whose call costs no more than the call.
-MZ_EXPORT void* trivialCall();
+MZ_PEER_API void* trivialCall();
 
 } // namespace Mz::Benchmarks

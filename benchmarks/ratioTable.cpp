@@ -55,8 +55,7 @@ void addPeerCells(TextRow& row, const RatioLine& line) {
 } // namespace
 
 void RatioTable::registerBenchmark(const std::string& name, Body body, bool setsTime) {
-    benchmark::internal::Benchmark* const registered =
-        benchmark::RegisterBenchmark(name.c_str(), std::move(body));
+    auto* const registered = benchmark::RegisterBenchmark(name.c_str(), std::move(body));
     if (setsTime)
         registered->UseManualTime()->Iterations(1)->Unit(benchmark::kMillisecond);
 }
@@ -148,26 +147,6 @@ std::size_t RatioTable::repetitionCount() const {
     for (const auto& [name, times] : repetitions)
         most = std::max(most, times.size());
     return most;
-}
-
-bool RatioReporter::ReportContext(const Context& context) {
-    PrintBasicContext(&GetErrorStream(), context);
-    return true;
-}
-
-void RatioReporter::ReportRuns(const std::vector<Run>& runs) {
-    for (const Run& run : runs) {
-        if (run.run_type != Run::RT_Iteration)
-            continue;
-        const std::string& name = run.run_name.function_name;
-        if (run.error_occurred) {
-            table.noteError(name, run.error_message);
-            continue;
-        }
-        const bool selfTimed = !run.run_name.time_type.empty();
-        const double time = selfTimed ? run.GetAdjustedRealTime() : run.GetAdjustedCPUTime();
-        table.note(name, time / benchmark::GetTimeUnitMultiplier(run.time_unit) * 1e9);
-    }
 }
 
 } // namespace Mz::Benchmarks

@@ -84,16 +84,4 @@ class RatioTable {
     std::map<std::string, std::string> errors;
 };
 
-/// Passes the results of all repetitions to a table.
-class RatioReporter final : public benchmark::BenchmarkReporter {
-  public:
-    explicit RatioReporter(RatioTable& table) : table(table) {}
-
-    bool ReportContext(const Context& context) override;
-    void ReportRuns(const std::vector<Run>& runs) override;
-
-  private:
-    RatioTable& table;
-};
-
 } // namespace Mz::Benchmarks

@@ -1,19 +1,20 @@
 // SPDX-License-Identifier: BSL-1.0
 /// Does work that a process can measure only once: mzBenchmarkStart WORK FOLDER
 ///
-/// Runs the work on the libraries of the folder and prints the processor time in seconds, the
-/// number of libraries found, and the memory (`Measurement`). The works:
+/// Runs the work on the libraries of the folder and prints the time in seconds, the number of
+/// libraries found, and the memory (`Measurement`). The works:
 ///   initialize   initialises the component manager; counts builders
 ///   load         the limit: loads each library, looks up its entry point and calls it
 ///   readTables   the limit for libraries without entry point: lists the folder, gets the status of
 ///                each file, and reads a block at its beginning and one in its symbol table
-///   record       writes the manager's records to a hidden file in the folder; counts builders
+///   record       writes the manager's records to a file in a folder below it; counts builders
 ///   recordMany   writes a list to the same file in which each library has ten more builders
 ///   initializeRecorded
 ///                reads that file and initialises the component manager; counts builders; fails if
 ///                a library was loaded
 ///   readList     the limit for that: lists the folder, gets the status of each file, reads
 ///                that file and adds every builder to a map
+#include "byHand.h"
 #include "freshResult.h"
 
 #include "components/componentManager/binaryStream.h"
@@ -22,10 +23,6 @@
 #include <algorithm>
 #include <cstdio>
 #include <cstring>
-#include <dirent.h>
-#include <dlfcn.h>
-#include <elf.h>
-#include <fcntl.h>
 #include <filesystem>
 #include <fstream>
 #include <iterator>
@@ -33,8 +30,6 @@
 #include <map>
 #include <string>
 #include <string_view>
-#include <sys/stat.h>
-#include <unistd.h>
 #include <unordered_map>
 #include <vector>
 
@@ -63,75 +58,38 @@ int initialize(const std::filesystem::path& folder) {
     const std::wstring searchPath = folder.wstring();
     const Measurement measurement;
     QrGetComponentManager()->initialize(searchPath.c_str());
-    const double end = processorTime();
+    const double end = measuredTime();
     return measurement.print(end, countBuilders());
 }
 
 int load(const std::filesystem::path& folder) {
-    const std::vector<std::string> files = filesOf(folder);
+    const std::vector<std::string> names = filesOf(folder);
+    const std::vector<std::filesystem::path> files(names.begin(), names.end());
     long count = 0;
     const Measurement measurement;
-    for (const std::string& file : files) {
-        void* const library = ::dlopen(file.c_str(), RTLD_NOW | RTLD_LOCAL);
+    for (const std::filesystem::path& file : files) {
+        void* const library = openLibrary(file);
         if (!library)
             continue;
-        void* const entryPoint = ::dlsym(library, "QrGetComponentDescription");
+        void* const entryPoint = functionOf(library, "QrGetComponentDescription");
         if (entryPoint && reinterpret_cast<QrGetComponentDescriptionFunction*>(entryPoint)())
             ++count;
     }
-    return measurement.print(processorTime(), count);
-}
-
-/// Returns the offset of a library's symbol table in its file, or 0.
-off_t symbolTableOf(const std::string& file) {
-    std::ifstream stream(file, std::ios::binary);
-    const std::string content(std::istreambuf_iterator<char>(stream), {});
-    Elf64_Ehdr header{};
-    if (content.size() < sizeof header)
-        return 0;
-    std::memcpy(&header, content.data(), sizeof header);
-    for (std::size_t index = 0; index < header.e_shnum; ++index) {
-        Elf64_Shdr section{};
-        const std::size_t offset = header.e_shoff + index * sizeof section;
-        if (offset + sizeof section > content.size())
-            break;
-        std::memcpy(&section, content.data() + offset, sizeof section);
-        if (section.sh_type == SHT_DYNSYM)
-            return static_cast<off_t>(section.sh_offset);
-    }
-    return 0;
-}
-
-/// Returns whether both blocks of the open file can be read.
-bool readTwoBlocks(int file, off_t table) {
-    char block[1024];
-    return ::pread(file, block, sizeof block, 0) > 0 &&
-           ::pread(file, block, sizeof block, table) > 0;
+    return measurement.print(measuredTime(), count);
 }
 
 int readTables(const std::filesystem::path& folder) {
     // All files are copies of one file, so the position is the same. It is determined before the
     // measurement.
     const std::vector<std::string> known = filesOf(folder);
-    const off_t table = known.empty() ? 0 : symbolTableOf(known.front());
-    long count = 0;
+    const std::uint64_t table = known.empty() ? 0 : nameTableOf(known.front());
     const Measurement measurement;
-    DIR* const listing = ::opendir(folder.c_str());
-    while (const dirent* entry = listing ? ::readdir(listing) : nullptr) {
-        struct stat status;
-        if (entry->d_name[0] == '.' || ::fstatat(::dirfd(listing), entry->d_name, &status, 0) != 0)
-            continue;
-        const int file = ::openat(::dirfd(listing), entry->d_name, O_RDONLY | O_CLOEXEC);
-        count += readTwoBlocks(file, table);
-        ::close(file);
-    }
-    if (listing)
-        ::closedir(listing);
-    return measurement.print(processorTime(), count);
+    const long count = readBlocksOfEach(folder, table);
+    return measurement.print(measuredTime(), count);
 }
 
 std::filesystem::path listIn(const std::filesystem::path& folder) {
-    return folder / ".recorded"; // Hidden, so not a candidate.
+    return folder / ".recorded" / "list"; // Folders are no candidates.
 }
 
 QrPtr<QrPersistant> records() {
@@ -141,18 +99,12 @@ QrPtr<QrPersistant> records() {
 int record(const std::filesystem::path& folder) {
     const Measurement measurement;
     QrGetComponentManager()->initialize(folder.wstring().c_str());
+    std::filesystem::create_directory(listIn(folder).parent_path());
     std::ofstream file(listIn(folder), std::ios::binary);
     QrOutBuffer buffer(&file);
     QrBinaryStream stream(&buffer);
     records()->write(stream);
-    return file.flush() ? measurement.print(processorTime(), countBuilders()) : 1;
-}
-
-/// Returns whether this process has mapped a file of the folder.
-bool loadedFrom(const std::filesystem::path& folder) {
-    std::ifstream maps("/proc/self/maps");
-    const std::string content(std::istreambuf_iterator<char>(maps), {});
-    return content.find(folder.string()) != std::string::npos;
+    return file.flush() ? measurement.print(measuredTime(), countBuilders()) : 1;
 }
 
 int initializeRecorded(const std::filesystem::path& folder) {
@@ -165,7 +117,7 @@ int initializeRecorded(const std::filesystem::path& folder) {
         records()->read(stream);
     }
     QrGetComponentManager()->initialize(searchPath.c_str());
-    const double end = processorTime();
+    const double end = measuredTime();
     return loadedFrom(folder) ? 1 : measurement.print(end, countBuilders());
 }
 
@@ -233,15 +185,7 @@ struct UidHash {
 
 int readList(const std::filesystem::path& folder) {
     const Measurement measurement;
-    long files = 0;
-    DIR* const listing = ::opendir(folder.c_str());
-    while (const dirent* entry = listing ? ::readdir(listing) : nullptr) {
-        struct stat status;
-        if (entry->d_name[0] != '.' && ::fstatat(::dirfd(listing), entry->d_name, &status, 0) == 0)
-            ++files;
-    }
-    if (listing)
-        ::closedir(listing);
+    const long files = statusOfEach(folder);
     ListReader reader(listIn(folder));
     std::list<Record> read;
     std::unordered_map<QrUid, Record*, UidHash> byUid;
@@ -253,7 +197,7 @@ int readList(const std::filesystem::path& folder) {
         }
     }
     const long known = static_cast<long>(byUid.size());
-    return measurement.print(processorTime(), std::min(files, known));
+    return measurement.print(measuredTime(), std::min(files, known));
 }
 
 void appendWord(std::string& bytes, std::uint32_t word) {

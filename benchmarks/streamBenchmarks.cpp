@@ -2,6 +2,7 @@
 // Values through streams in binary and text form, to memory, to files and to a buffer of the host,
 // compared with the same work by hand on standard streams.
 #include "comparisons.h"
+#include "decimalComma.h"
 #include "measure.h"
 #include "streamWork.h"
 
@@ -11,7 +12,6 @@
 #include <array>
 #include <charconv>
 #include <clocale>
-#include <cstdlib>
 #include <cstring>
 #include <sstream>
 #include <string>
@@ -182,8 +182,7 @@ void readTextValues(benchmark::State& state) {
 /// Runs `body` in a locale with a decimal comma.
 RatioTable::Body underDecimalComma(RatioTable::Body body) {
     return [body = std::move(body)](benchmark::State& state) {
-        setenv("LOCPATH", MZ_LOCALE_FOLDER, 1);
-        if (!std::setlocale(LC_ALL, "de_DE.UTF-8") || *std::localeconv()->decimal_point != ',')
+        if (!setDecimalComma())
             state.SkipWithError("there is no locale with a decimal comma");
         else
             body(state);

@@ -2,10 +2,11 @@
 /// Files that the benchmarks write and read.
 #pragma once
 
+#include "temporaryName.h"
+
 #include <filesystem>
-#include <stdlib.h>
+#include <fstream>
 #include <string>
-#include <unistd.h>
 
 namespace Mz::Benchmarks {
 
@@ -14,10 +15,8 @@ class TemporaryFile {
   public:
     /// `suffix` is the end of the name.
     explicit TemporaryFile(const std::string& suffix = {})
-        : name((std::filesystem::temp_directory_path() / "mzBenchXXXXXX").string() + suffix) {
-        const int descriptor = ::mkstemps(name.data(), static_cast<int>(suffix.size()));
-        if (descriptor >= 0)
-            ::close(descriptor);
+        : name(temporaryName("mzBench", suffix).string()) {
+        const std::ofstream empty(name);
     }
     ~TemporaryFile() {
         std::error_code ignored;

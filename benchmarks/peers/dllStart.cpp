@@ -27,7 +27,7 @@ int load(const std::vector<std::string>& files) {
             dll::import_alias<Factory>(boost::filesystem::path(file), "mzBenchmarkPart"));
         ++count;
     }
-    return measurement.print(Mz::Benchmarks::processorTime(), count);
+    return measurement.print(Mz::Benchmarks::measuredTime(), count);
 }
 
 int query(const std::vector<std::string>& files) {
@@ -38,7 +38,7 @@ int query(const std::vector<std::string>& files) {
         for (const std::string& name : info.symbols("boostdll"))
             count += name == "mzBenchmarkPart";
     }
-    return measurement.print(Mz::Benchmarks::processorTime(), count);
+    return measurement.print(Mz::Benchmarks::measuredTime(), count);
 }
 
 } // namespace

@@ -25,7 +25,7 @@ int main(int argc, char** argv) {
     ::setenv("GST_REGISTRY_FORK", "no", 1);
     const Mz::Benchmarks::Measurement measurement;
     gst_init(nullptr, nullptr);
-    const double end = Mz::Benchmarks::processorTime();
+    const double end = Mz::Benchmarks::measuredTime();
     long count = 0;
     GList* const features =
         gst_registry_get_feature_list(gst_registry_get(), GST_TYPE_ELEMENT_FACTORY);

@@ -15,7 +15,7 @@ int main(int argc, char** argv) {
     const Mz::Benchmarks::Measurement measurement;
     for (const std::string& file : files)
         loader.loadLibrary(file);
-    const double end = Mz::Benchmarks::processorTime();
+    const double end = Mz::Benchmarks::measuredTime();
     long count = 0;
     for (auto library = loader.begin(); library != loader.end(); ++library)
         count += static_cast<long>(library->second->size());

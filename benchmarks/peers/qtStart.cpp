@@ -29,5 +29,5 @@ int main(int argc, char** argv) {
         count += found;
         kept.push_back(std::move(loader));
     }
-    return measurement.print(Mz::Benchmarks::processorTime(), count);
+    return measurement.print(Mz::Benchmarks::measuredTime(), count);
 }
