@@ -5,7 +5,6 @@
 add_executable(mzBenchmarkEmpty empty.cpp)
 target_link_libraries(mzBenchmarkEmpty PRIVATE Mz::MZcomponentManager mzCompile)
 
-# All but the peers, which are in a program of their own.
 target_sources(mzBenchmarkWorks PRIVATE
   main.cpp
   memory.cpp
