@@ -166,7 +166,7 @@ void ComponentManager::discover(const wchar_t* searchPath, LibraryList& newList,
             unlisted.emplace_back(directories[index].view());
         byName.reserve(byName.size() + listings[index].size());
         for (platform::DirectoryEntry& candidate : listings[index]) {
-            const std::wstring fileName = normalisePath(candidate.name.c_str(), false);
+            const std::wstring fileName = normaliseName(std::move(candidate.name));
             // Each file gets one record, even if the search path leads to it several times.
             if (candidate.identity ? seen.contains(candidate)
                                    : byName.find({directories[index], fileName}) != nullptr)
