@@ -5,7 +5,9 @@
 
 #include <gtest/gtest.h>
 
+#include <cstddef>
 #include <memory>
+#include <new>
 #include <vector>
 
 using namespace Mz;
@@ -79,6 +81,18 @@ TEST(RecordList, IsSwappedWithOneOfAnyLength) {
         }
 }
 
+TEST(RecordList, ReturnsTheMemoryOfItsRecordsToTheirPool) {
+    NodePool<Record> pool, otherPool;
+    RecordList<Record> list(pool), other(otherPool);
+    void* const memory = &list.emplace_back();
+    void* const otherMemory = &other.emplace_back();
+    list.swap(other);
+    list.clear();
+    EXPECT_EQ(otherPool.take(), otherMemory);
+    other.clear();
+    EXPECT_EQ(pool.take(), memory);
+}
+
 TEST(RecordList, DestroysItsRecordsAndCanBeFilledAgain) {
     const auto owned = std::make_shared<int>(1);
     NodePool<Record> pool;
@@ -121,17 +135,31 @@ TEST(NodePool, GivesOutReturnedMemoryFirst) {
     EXPECT_EQ(pool.take(), first);
 }
 
-TEST(NodePool, ReservesForThatManyWithWhatItHas) {
-    NodePool<Record> pool;
-    std::vector<void*> taken{pool.take()};
-    pool.reserve(1000);
-    pool.reserve(10);
+/// Takes what the pool gives without an allocation, and returns the number of nodes.
+std::size_t takeAll(NodePool<Record>& pool) {
     const FailingAllocations failing(0);
-    for (int count = 0; count < 1000; ++count)
-        pool.giveBack(pool.take());
-    for (int count = 0; count < 1000; ++count)
-        ASSERT_TRUE(pool.take());
-    EXPECT_FALSE(failing.failed());
+    std::size_t count = 0;
+    try {
+        for (;; ++count)
+            static_cast<void>(pool.take());
+    } catch (const std::bad_alloc&) {
+        return count;
+    }
+}
+
+TEST(NodePool, ReservesOnceAndUsesWhatItHad) {
+    NodePool<Record> plain, reserved;
+    EXPECT_NE(plain.take(), reserved.take());
+    reserved.reserve(1000);
+    {
+        const FailingAllocations failing(0);
+        reserved.reserve(10);
+        reserved.reserve(1000);
+        EXPECT_FALSE(failing.failed());
+    }
+    const std::size_t others = takeAll(plain);
+    EXPECT_GT(others, 0u);
+    EXPECT_EQ(takeAll(reserved), 1000 + others);
 }
 
 } // namespace
