@@ -2,17 +2,16 @@
 // Reads what the child process of a guarded import sends, which an importer may have written, and
 // loads the object in it.
 //
-// Input: the size of the pieces in which the rest arrives. If it is odd, the rest is what arrives.
-// If it is even, the rest is a sequence of messages, each a kind, a size of two bytes and a
-// payload, and arrives in frames with the right checksums, which mutations would not find.
+// Input: the size of the pieces in which the rest arrives. If it is odd, the rest is what arrives;
+// if it is even, the rest is a sequence of messages.
 #include "components/componentManager/componentImp.h"
 #include "components/componentTools/guarding/importConversation.h"
 #include "components/componentTools/guarding/storedObject.h"
-#include "components/componentTools/probing/frames.h"
-#include "fuzz/fuzz.h"
+#include "fuzz/frames.h"
 #include "tests/guarding/components/parcel.h"
 
 #include <algorithm>
+#include <optional>
 
 namespace {
 
@@ -65,31 +64,53 @@ void unlink(const QrPtr<Test::Parcel>& parcel) {
     unlink(second);
 }
 
-/// Returns the bytes that arrive.
-std::string arriving(Fuzz::Input& input, bool framed) {
-    if (!framed)
-        return std::string(input.rest());
-    std::string bytes;
-    for (std::string_view kind; !(kind = input.take(1)).empty();) {
-        std::size_t size = input.byte() << 8;
-        size += input.byte();
-        bytes += frameOf(static_cast<unsigned char>(kind[0]), input.take(size));
-    }
-    return bytes;
-}
+/// What the messages of a child lead to.
+struct Conclusion {
+    std::optional<ImportOutcome> outcome; ///< none if the conversation is not over
+    std::string object, replies;
+    std::wstring activity;
+    std::uint64_t calls = 0;
+    bool aborted = false;
+};
 
-void converse(Fuzz::Input& input, const Kit::ImportLimits& limits, ImportConversation& conversation,
-              CheckingController& controller) {
-    const unsigned int first = input.byte();
-    const std::string bytes = arriving(input, first % 2 == 0);
-    const std::size_t piece = 1 + first * 16;
-    std::string pending, replies;
-    for (std::size_t at = 0; !conversation.isOver() && at < bytes.size(); at += piece) {
-        pending += bytes.substr(at, piece);
-        conversation.receive(pending, replies);
+/// Hands over the bytes in pieces of this size.
+Conclusion converse(std::string_view bytes, std::size_t piece, const Kit::ImportLimits& limits) {
+    CheckingController controller;
+    ImportConversation conversation(&controller, limits);
+    Conclusion result;
+    std::string pending;
+    try {
+        for (; !conversation.isOver() && !bytes.empty();
+             bytes.remove_prefix(std::min(piece, bytes.size()))) {
+            pending += bytes.substr(0, piece);
+            conversation.receive(pending, result.replies);
+        }
+    } catch (const CheckingController::Aborted&) {
+        result.aborted = true;
     }
     Fuzz::expect(conversation.object.size() <= limits.answer, "the object is within its limit");
     Fuzz::expect(controller.calls <= limits.calls, "the calls are within their limit");
+    if (conversation.isOver())
+        result.outcome = conversation.outcome();
+    result.object = conversation.object;
+    result.activity = conversation.activity;
+    result.calls = controller.calls;
+    return result;
+}
+
+void expectSame(const Conclusion& a, const Conclusion& b) {
+    Fuzz::expect(a.aborted == b.aborted && a.calls == b.calls, "pieces cause the same calls");
+    Fuzz::expect(a.outcome.has_value() == b.outcome.has_value(), "pieces end it at the same place");
+    if (a.outcome)
+        Fuzz::expect(a.outcome->verdict == b.outcome->verdict &&
+                         a.outcome->detail == b.outcome->detail,
+                     "pieces have the same outcome");
+    Fuzz::expect(a.activity == b.activity, "pieces name the same activity");
+    Fuzz::expectSame(a.object, b.object, "pieces make the same object");
+    Fuzz::expectSame(a.replies, b.replies, "pieces get the same replies");
+}
+
+void expectReadable(const std::string& replies) {
     FrameReader frames(replies);
     while (const std::optional<Frame> frame = frames.next())
         Fuzz::expect(decodeReply(frame->payload).has_value(), "a reply can be read");
@@ -101,22 +122,20 @@ void converse(Fuzz::Input& input, const Kit::ImportLimits& limits, ImportConvers
 int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
     QrGetComponentManager()->initialize(MZ_BUILD_PATH L"/components/hostile");
     Kit::ImportLimits limits;
-    limits.answer = 4096;
+    limits.answer = 2048; // An input can be longer.
     limits.objects = 100;
     limits.calls = 10;
     limits.classes = {Test::parcelUid};
-    CheckingController controller;
-    ImportConversation conversation(&controller, limits);
     Fuzz::Input input(data, size);
-    try {
-        converse(input, limits, conversation, controller);
-    } catch (const CheckingController::Aborted&) {
-        return 0;
-    }
-    if (!conversation.isOver() || conversation.outcome().verdict != Kit::ImportVerdict::imported)
+    const unsigned int first = input.byte();
+    const std::string bytes = Fuzz::arriving(input, first % 2 == 0);
+    const Conclusion result = converse(bytes, 1 + first * 16, limits);
+    expectSame(result, converse(bytes, bytes.size(), limits));
+    expectReadable(result.replies);
+    if (!result.outcome || result.outcome->verdict != Kit::ImportVerdict::imported)
         return 0;
     QrRef<QrCastable> object;
-    const ImportOutcome restored = restoreObject(conversation.object, limits, object);
+    const ImportOutcome restored = restoreObject(result.object, limits, object);
     Fuzz::expect(static_cast<bool>(object) == (restored.verdict == Kit::ImportVerdict::imported),
                  "there is an object if it was accepted");
     unlink(queryCast<Test::Parcel>(object.get()));

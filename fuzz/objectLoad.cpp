@@ -8,7 +8,9 @@
 #include "tests/streams/streamKinds.h"
 #include "tests/support/journal.h"
 
+#include <algorithm>
 #include <optional>
+#include <set>
 #include <stdexcept>
 
 namespace {
@@ -29,6 +31,17 @@ bool mayForget(std::string_view bytes) {
     return false;
 }
 
+/// Returns how deeply nodes were inside one another when they were stored: each new one was stored
+/// where it was first referred to.
+int nesting(const QrPtr<Node>& node, std::set<const Node*>& seen) {
+    if (!node || !seen.insert(node.get()).second)
+        return 0;
+    int deepest = 0;
+    for (const QrPtr<Node>& link : node->links)
+        deepest = std::max(deepest, nesting(link, seen));
+    return deepest + 1;
+}
+
 /// Loads the objects in `bytes` and returns them stored again; nothing if either of it fails.
 template <class Stream>
 std::optional<std::string> storedAgain(std::string_view bytes) {
@@ -40,6 +53,8 @@ std::optional<std::string> storedAgain(std::string_view bytes) {
             return std::nullopt;
         in.finish();
         node = queryCast<Node>(object.get());
+        std::set<const Node*> seen;
+        Fuzz::expect(nesting(node, seen) <= QrMaximumObjectDepth, "nested no deeper than allowed");
         std::string result = saved<Stream>(object.get());
         unlink(node); // Otherwise cycles of references leak.
         return result;

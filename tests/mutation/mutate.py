@@ -9,8 +9,10 @@ outcome is appended to `FOLDER/outcomes.jsonl`, so that a run that was stopped g
 Ends with 1 if a fault was not noticed that is not in equivalent.txt.
 """
 import collections
+import concurrent.futures
 import hashlib
 import json
+import os
 import pathlib
 import random
 import re
@@ -91,15 +93,25 @@ class Judge:
             file.write_text(original, encoding="utf-8")
 
     def failed_quickly(self) -> str:
-        """Runs the quick programs up to the first test that fails, and returns its name."""
-        for program in self.quick:
-            tested = self.run(4 * QUICK_LIMIT, str(program), "--gtest_brief=1", "--gtest_fail_fast")
-            if tested is None:
-                return f"the limit of time of {program.name}"
-            if tested.returncode:
-                failed = re.search(r"\[  FAILED  \] (\S+?),? ", tested.stdout)
-                return failed.group(1) if failed else program.name
+        """Runs the quick programs up to the first that fails, one on each processor, and returns
+        the name of the failed test."""
+        with concurrent.futures.ThreadPoolExecutor(os.cpu_count()) as threads:
+            running = [threads.submit(self.failed_in, program) for program in self.quick]
+            for ended in concurrent.futures.as_completed(running):
+                if ended.result():
+                    threads.shutdown(wait=False, cancel_futures=True)
+                    return ended.result()
         return ""
+
+    def failed_in(self, program: pathlib.Path) -> str:
+        """Runs a test program up to the first test that fails, and returns its name."""
+        tested = self.run(4 * QUICK_LIMIT, str(program), "--gtest_brief=1", "--gtest_fail_fast")
+        if tested is None:
+            return f"the limit of time of {program.name}"
+        if not tested.returncode:
+            return ""
+        failed = re.search(r"\[  FAILED  \] (\S+?),? ", tested.stdout)
+        return failed.group(1) if failed else program.name
 
     def failed_test(self) -> str:
         """Runs the tests up to the first that fails, and returns its name; empty if all pass."""
