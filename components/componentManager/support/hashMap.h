@@ -45,11 +45,13 @@ class HashMap {
 
     /// Does the same. Returns the address of the value, and whether it was inserted.
     std::pair<Value*, bool> insert(const Key& key) {
-        Node** slot = buckets ? slotOf(key) : nullptr;
-        if (slot && *slot)
+        if (buckets == 0)
+            rehash(smallestTable);
+        Node** slot = slotOf(key);
+        if (*slot)
             return {&(*slot)->value, false};
         if (entries == buckets) {
-            rehash(buckets ? buckets * 2 : smallestTable);
+            rehash(buckets * 2);
             slot = slotOf(key);
         }
         *slot = new (pool.take()) Node{nullptr, key, Value()};
