@@ -1,8 +1,10 @@
 // SPDX-License-Identifier: BSL-1.0
-// Reads bytes and characters from an input buffer by its own operations, in several locales. What it
-// takes is compared with what the C library reads in the same bytes, and with other kinds of buffer.
+// Reads bytes and characters from an input buffer by its own operations, in several locales. What
+// it takes is compared with what the C library reads in the same bytes, and with other kinds of
+// buffer.
 //
-// Input: the locale, the number of steps, the steps, each an operation and its argument, the content.
+// Input: the locale, the number of steps, the steps, each an operation and its argument, the
+// content.
 #include "components/componentManager/bufferio.h"
 #include "components/objectIO/objectIO.h"
 #include "fuzz/fuzz.h"
@@ -54,7 +56,8 @@ struct Medium {
     std::string rest; ///< the bytes when this was made
 };
 
-/// Returns the length of the character at the beginning of `bytes`, 0 for a NUL, -1 if there is none.
+/// Returns the length of the character at the beginning of `bytes`, 0 for a NUL, -1 if there is
+/// none.
 int lengthOf(std::string_view bytes, bool plain, wchar_t& character) {
     if (bytes.empty())
         return -1;
@@ -79,7 +82,8 @@ struct Reading {
 Reading readByTheSystem(std::string_view rest, bool plain, std::size_t size, int count) {
     Reading reading;
     rest = rest.substr(0, size);
-    while (reading.bytes < rest.size() && reading.characters.size() != static_cast<std::size_t>(count)) {
+    while (reading.bytes < rest.size() &&
+           reading.characters.size() != static_cast<std::size_t>(count)) {
         wchar_t character = L'\0';
         const int length = lengthOf(rest.substr(reading.bytes), plain, character);
         reading.nul = length == 0;
@@ -104,8 +108,8 @@ class TextStep {
         const int wanted = std::min(size, count);
         const int got = io.readChar(text.data(), size, count);
         if (medium) {
-            Reading reading = readByTheSystem(medium->rest, plain, medium->rest.size(),
-                                              std::max(wanted, 0));
+            Reading reading =
+                readByTheSystem(medium->rest, plain, medium->rest.size(), std::max(wanted, 0));
             Fuzz::expect(!reading.faulty, "what is no character is refused");
             if (reading.nul) // It counts for the rest of the request.
                 reading.characters.resize(static_cast<std::size_t>(wanted));

@@ -2,14 +2,12 @@
 // Reads what the child process of a guarded import sends, which an importer may have written, and
 // loads the object in it.
 //
-// Input: the size of the pieces in which the rest arrives. If it is odd, the rest is what arrives.
-// If it is even, the rest is a sequence of messages, each a kind, a size of two bytes and a
-// payload, and arrives in frames with the right checksums, which mutations would not find.
+// Input: the size of the pieces in which the rest arrives. If it is odd, the rest is what arrives;
+// if it is even, the rest is a sequence of messages.
 #include "components/componentManager/componentImp.h"
 #include "components/componentTools/guarding/importConversation.h"
 #include "components/componentTools/guarding/storedObject.h"
-#include "components/componentTools/probing/frames.h"
-#include "fuzz/fuzz.h"
+#include "fuzz/frames.h"
 #include "tests/guarding/components/parcel.h"
 
 #include <algorithm>
@@ -64,19 +62,6 @@ void unlink(const QrPtr<Test::Parcel>& parcel) {
     const QrPtr<Test::Parcel> second = std::exchange(parcel->second, {});
     unlink(first);
     unlink(second);
-}
-
-/// Returns the bytes that arrive.
-std::string arriving(Fuzz::Input& input, bool framed) {
-    if (!framed)
-        return std::string(input.rest());
-    std::string bytes;
-    for (std::string_view kind; !(kind = input.take(1)).empty();) {
-        std::size_t size = input.byte() << 8;
-        size += input.byte();
-        bytes += frameOf(static_cast<unsigned char>(kind[0]), input.take(size));
-    }
-    return bytes;
 }
 
 /// What the messages of a child lead to.
@@ -143,7 +128,7 @@ int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
     limits.classes = {Test::parcelUid};
     Fuzz::Input input(data, size);
     const unsigned int first = input.byte();
-    const std::string bytes = arriving(input, first % 2 == 0);
+    const std::string bytes = Fuzz::arriving(input, first % 2 == 0);
     const Conclusion result = converse(bytes, 1 + first * 16, limits);
     expectSame(result, converse(bytes, bytes.size(), limits));
     expectReadable(result.replies);

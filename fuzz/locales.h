@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
-/// The locales by which the readers convert characters and numbers. An input of a target chooses one.
+/// The locales by which the readers convert characters and numbers. An input of a target chooses
+/// one.
 #pragma once
 
 #include <array>

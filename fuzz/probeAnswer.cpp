@@ -1,7 +1,9 @@
 // SPDX-License-Identifier: BSL-1.0
 // Reads the answer of a probing child process: the component library may have written it.
+//
+// Input: whether the rest is what arrives, if odd, or a sequence of messages.
 #include "components/componentTools/probing/probeAnswer.h"
-#include "fuzz/fuzz.h"
+#include "fuzz/frames.h"
 
 namespace {
 
@@ -21,7 +23,9 @@ std::string encoded(const ProbeAnswer& answer) {
 
 int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
     using namespace Mz;
-    const ProbeAnswer answer = decodeAnswer(Fuzz::Input(data, size).rest());
+    Fuzz::Input input(data, size);
+    const bool framed = input.byte() % 2 == 0;
+    const ProbeAnswer answer = decodeAnswer(Fuzz::arriving(input, framed));
     const std::string bytes = encoded(answer);
     const ProbeAnswer again = decodeAnswer(bytes);
     Fuzz::expect(!again.garbled, "what was understood can be said");

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
-// Reads the file beside a recorded list: verdicts, and what the user switched off. Writes again what
-// was read.
+// Reads the file beside a recorded list: verdicts, and what the user switched off. Writes again
+// what was read.
 #include "components/componentTools/records/verdictsFile.h"
 #include "fuzz/fuzz.h"
 

@@ -66,6 +66,17 @@ QrEnum::Action ComponentManager::enumerateBuilders(QrEnumerator<QrCPtr<QrBuilder
     return e.finished();
 }
 
+namespace {
+
+std::size_t builderCount(const ComponentManager::LibraryList& libraries) {
+    std::size_t count = 0;
+    for (const ComponentLibrary& library : libraries)
+        count += library.builders.size();
+    return count;
+}
+
+} // namespace
+
 void ComponentManager::initialize(const wchar_t* searchPath) {
     if (initialised || initialising)
         return;
@@ -87,6 +98,7 @@ void ComponentManager::initialize(const wchar_t* searchPath) {
         libraries.swap(found);
         builderIndex.clear(); // Before the records without a file, in `found`, are destroyed.
     }
+    builderIndex.reserve(builderCount(libraries));
     for (ComponentLibrary& library : libraries)
         if (library.module)
             reindexBuilders(library); // Loaded by an earlier call that threw.
@@ -103,7 +115,8 @@ QrRef<QrCastable> ComponentManager::createObject(const QrUid& uid) {
     return builder ? builder->createObject() : nullptr;
 }
 
-ComponentLibrary::ComponentLibrary(ComponentManager& manager) : manager(&manager) {}
+ComponentLibrary::ComponentLibrary(ComponentManager& manager)
+    : builders(manager.builderPool), manager(&manager) {}
 
 ComponentLibrary::~ComponentLibrary() {
     if (loadedByManager)

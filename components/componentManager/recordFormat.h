@@ -13,6 +13,7 @@
 #include <cstddef>
 #include <cstdint>
 #include <string>
+#include <string_view>
 
 namespace Mz::detail {
 
@@ -22,8 +23,9 @@ namespace Mz::detail {
 /// \param value, text, label  receive the description's; a null text becomes an empty one
 /// \return the number of builders that the library announces, which may be wrong
 /// \throws what the code of the library throws; the values read before are then set
-inline unsigned int copyDescription(QrComponentDescription& description, int64& value,
-                                    std::wstring& text, std::wstring& label) {
+template <class Text>
+unsigned int copyDescription(QrComponentDescription& description, int64& value, Text& text,
+                             Text& label) {
     value = description.getComponentValue();
     text = textOrEmpty(description.getComponentText());
     label = textOrEmpty(description.getComponentLabel());
@@ -84,18 +86,25 @@ struct RecordWriter {
     void value(const Value& field) {
         stream << field;
     }
-    void name(const std::wstring& field) { stream << field; }
+    template <class Text>
+    void name(const Text& field) {
+        text(field);
+    }
     void text(const std::wstring& field) { stream << field; }
+    void text(std::wstring_view field) { stream << std::wstring(field); }
     void flag(bool field) { stream << field; }
 };
 
 /// Writes a library record with its builders.
 ///
+/// Its texts, and those of its builders, are of type `std::wstring` or convert to
+/// `std::wstring_view`.
+///
 /// \param builders  an indexed sequence of builder records
 /// \throws QrStreamEx::ExWriteError  if the stream fails
-template <class Builders>
-void writeRecord(QrStream& stream, const std::wstring& directory, const std::wstring& fileName,
-                 std::uint32_t time, int64 size, const Builders& builders) {
+template <class Text, class Builders>
+void writeRecord(QrStream& stream, const Text& directory, const Text& fileName, std::uint32_t time,
+                 int64 size, const Builders& builders) {
     RecordWriter writer{stream};
     const auto count = static_cast<unsigned int>(builders.size());
     codeLibrary(writer, directory, fileName, time, size, count);

@@ -9,6 +9,7 @@
 #include "components/componentManager/buffers/byteSink.h"
 #include "components/componentManager/buffers/byteSource.h"
 #include "components/componentManager/buffers/numberPath.h"
+#include "components/componentManager/support/alwaysInline.h"
 #include "components/componentManager/text/characterCount.h"
 #include "components/componentManager/text/formatText.h"
 #include "components/componentManager/text/numberText.h"
@@ -86,8 +87,8 @@ char takeSeparator(int& column, bool& pending) {
 /// Writes a number to `sink`, after the separator, which `note` receives. Returns false if the sink
 /// is no standard buffer with room for it.
 template <class T, class Note>
-[[gnu::always_inline]] inline bool placeNumber(const ByteSink& sink, T value, int& column,
-                                               bool& separatorPending, const Note& note) {
+MZ_ALWAYS_INLINE inline bool placeNumber(const ByteSink& sink, T value, int& column,
+                                         bool& separatorPending, const Note& note) {
     char* const place = sink.room(1 + longestNumberText);
     if (!place) [[unlikely]]
         return false;

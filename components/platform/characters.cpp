@@ -7,6 +7,7 @@
 
 #include "components/platform/platform.h"
 
+#include <algorithm>
 #include <climits>
 #include <cstdint>
 #include <cwchar>
@@ -60,6 +61,12 @@ std::optional<std::string> toBytes(std::wstring_view text) {
 std::optional<std::wstring> toCharacters(std::string_view bytes) {
     const CharacterConverter converter;
     std::wstring result;
+    if (converter.plainBytes()) {
+        result.resize(bytes.size());
+        std::transform(bytes.begin(), bytes.end(), result.begin(),
+                       [](char byte) { return static_cast<unsigned char>(byte); });
+        return result;
+    }
     result.reserve(bytes.size());
     while (!bytes.empty()) {
         wchar_t character;

@@ -74,6 +74,13 @@ void appendEntry(std::wstring_view rest, std::wstring& result) {
     }
 }
 
+/// Returns whether the letter case is all that normalisation changes. File names on Linux may
+/// contain a '\', and begin as a drive does.
+bool isPlainName(std::wstring_view name) {
+    return name.size() > 2 && name[1] != L':' &&
+           std::none_of(name.begin(), name.end(), isSeparator);
+}
+
 } // namespace
 
 std::wstring normalisePath(const wchar_t* path, bool listMode) {
@@ -92,6 +99,11 @@ std::wstring normalisePath(const wchar_t* path, bool listMode) {
         }
     }
     return platform::lowerCase(result.empty() ? std::wstring(L".") : std::move(result));
+}
+
+std::wstring normaliseName(std::wstring name) {
+    return isPlainName(name) ? platform::lowerCase(std::move(name))
+                             : normalisePath(name.c_str(), false);
 }
 
 } // namespace Mz

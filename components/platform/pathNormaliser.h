@@ -24,4 +24,8 @@ namespace Mz {
 ///     normalised, runs of ';' become one, and those at the ends are removed.
 std::wstring normalisePath(const wchar_t* path, bool listMode);
 
+/// Returns the same form of a path that is usually a name, as a directory lists it. Takes over the
+/// memory of a name.
+std::wstring normaliseName(std::wstring name);
+
 } // namespace Mz

@@ -33,7 +33,7 @@ std::optional<NativePath> toNative(std::wstring_view name);
 /// \param directory  the normalised directory
 /// \param name  the normalised name of the file; empty for the directory itself
 /// \param found  the path as it was found
-NativePath openingPath(const std::wstring& directory, const std::wstring& name,
+NativePath openingPath(std::wstring_view directory, std::wstring_view name,
                        const NativePath& found);
 
 /// Returns `text` in lower case, for the comparison of file names: by the rules of the C runtime on

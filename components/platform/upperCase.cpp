@@ -116,12 +116,25 @@ void append(std::string& key, char16_t unit) {
     key += static_cast<char>(0x80 | (unit & 0x3F));
 }
 
+/// Returns the number of characters before the first one that is not in ASCII.
+std::size_t asciiLength(std::wstring_view name) {
+    const auto end = std::find_if(name.begin(), name.end(), [](wchar_t character) {
+        return static_cast<std::uint32_t>(character) >= 0x80;
+    });
+    return static_cast<std::size_t>(end - name.begin());
+}
+
 } // namespace
 
 std::string sortKey(std::wstring_view name) {
+    const std::size_t ascii = asciiLength(name);
     std::string key;
     key.reserve(name.size());
-    for (const wchar_t character : name) {
+    key.resize(ascii);
+    std::transform(
+        name.begin(), name.begin() + static_cast<std::ptrdiff_t>(ascii), key.begin(),
+        [](wchar_t c) { return static_cast<char>(upperCase(static_cast<char16_t>(c))); });
+    for (const wchar_t character : name.substr(ascii)) {
         const auto code = static_cast<std::uint32_t>(character);
         if (code < 0x10000) {
             append(key, upperCase(static_cast<char16_t>(code)));

@@ -14,22 +14,24 @@ import pathlib
 import subprocess
 import sys
 
+from counters import read_counters
+
 # The core is a library like the others. Its branches must all be reached or listed.
 CORE = "componentManager"
 TOTAL = "components"
 
 
-def measure(source: pathlib.Path, build: pathlib.Path, output: pathlib.Path) -> dict:
-    """Runs gcovr, which writes the pages, and returns what it counted. A process that ends inside a
-    function can make the counts of single calls negative; gcovr leaves these out."""
+def measure(source: pathlib.Path, build: pathlib.Path, output: pathlib.Path) -> list[dict]:
+    """Returns the files that were counted. gcovr writes the pages."""
     output.mkdir(parents=True, exist_ok=True)
     counted = output / "coverage.json"
+    counters = read_counters(source, build)
+    counted.write_text(json.dumps(counters))
     subprocess.run(
-        ["gcovr", "--root", source, "--filter", "components/", "--exclude-throw-branches",
-         "--exclude-unreachable-branches", "--gcov-ignore-parse-errors", "--json", counted,
-         "--html-details", output / "index.html", "--html-title", "Coverage of the libraries", build],
+        ["gcovr", "--root", source, "--add-tracefile", counted, "--html-details",
+         output / "index.html", "--html-title", "Coverage of the libraries"],
         check=True, cwd=source, stderr=(output / "gcovr.log").open("w"))
-    return json.loads(counted.read_text())
+    return counters["files"]
 
 
 class Figures:
@@ -134,7 +136,7 @@ def check_list(found: collections.Counter, file: pathlib.Path, write: bool) -> l
 def main() -> int:
     source, build, output = (pathlib.Path(argument).resolve() for argument in sys.argv[1:4])
     here = pathlib.Path(__file__).parent
-    files = measure(source, build, output)["files"]
+    files = measure(source, build, output)
     faults = compare(figures(files), here / "thresholds.txt")
     faults += check_list(unreached(files, source), here / "unreached.txt", "--write" in sys.argv)
     print(f"    each line: {output / 'index.html'}")

@@ -55,7 +55,7 @@ class ManagerFaultTest : public ManagerTest {
     std::string listWithoutFirst() {
         initialize();
         for (ComponentLibrary& library : manager->libraries)
-            if (library.fileName.starts_with(L"recordedfirst"))
+            if (library.fileName.view().starts_with(L"recordedfirst"))
                 manager->dropBuilders(library);
         std::string partial = list();
         restart();
@@ -73,7 +73,7 @@ class ManagerFaultTest : public ManagerTest {
     /// Returns whether the manager has loaded a library with this prefix.
     bool isLoaded(std::wstring_view prefix) const {
         for (const ComponentLibrary& library : manager->libraries)
-            if (library.fileName.starts_with(prefix) && library.module)
+            if (library.fileName.view().starts_with(prefix) && library.module)
                 return true;
         return false;
     }

@@ -427,7 +427,7 @@ TEST_F(PosixDiscovery, FindsAFolderThatTheKitNamedUnderTheThreadsLocale) {
         ::freelocale(locale);
     }).join();
     EXPECT_EQ(names(), (Names{L"kit"}));
-    EXPECT_TRUE(manager->libraries.front().directory.ends_with(L"\\\u00FC \u65E5"));
+    EXPECT_TRUE(manager->libraries.front().directory.view().ends_with(L"\\\u00FC \u65E5"));
 }
 
 } // namespace

@@ -17,7 +17,7 @@ class Discovery : public ManagerTest {
     std::vector<std::wstring> fileNames() {
         std::vector<std::wstring> result;
         for (const ComponentLibrary& library : manager->libraries)
-            result.push_back(library.fileName);
+            result.emplace_back(library.fileName.view());
         return result;
     }
 
@@ -48,7 +48,7 @@ TEST_F(Discovery, TakesEveryFileWhateverItsExtension) {
     EXPECT_EQ(fileNames(),
               (std::vector<std::wstring>{L"a.txt", L"b", L"c" MZ_LIBRARY_EXTENSION, L"d.x.y.z"}));
     for (const ComponentLibrary& library : manager->libraries)
-        expectNothing(folder.path() / library.fileName);
+        expectNothing(folder.path() / library.fileName.view());
     EXPECT_THAT(names(), IsEmpty());
 }
 

@@ -150,7 +150,7 @@ TEST_F(WindowsDiscovery, PassesOverLibrariesWithADamagedExportDirectory) {
     EXPECT_EQ(manager->libraries.size(), 7u);
     for (const ComponentLibrary& library : manager->libraries)
         EXPECT_EQ(library.fileTime, platform::queryFile(library.openingPath())->time)
-            << library.fileName;
+            << library.fileName.c_str();
 }
 
 TEST_F(WindowsDiscovery, PassesOverALibraryOf32Bits) {

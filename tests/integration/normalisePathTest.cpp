@@ -2,6 +2,7 @@
 /// Tests the normalised form of paths: with known results, and with random paths against a second,
 /// simpler implementation.
 #include "components/componentManager/manager/componentImpPrivate.h"
+#include "components/platform/pathNormaliser.h"
 
 #include <gtest/gtest.h>
 
@@ -164,6 +165,20 @@ class NaiveNormaliser {
         }
     }
 };
+
+TEST(NormaliseName, GivesWhatThePathOfThatNameGives) {
+    std::mt19937 random(20241105);
+    const std::wstring alphabet = L"\\/..:aBcZ~\u00C4";
+    int plain = 0;
+    for (int round = 0; round < 100000; ++round) {
+        std::wstring name;
+        for (auto length = random() % 6; length > 0; --length)
+            name += alphabet[random() % alphabet.size()];
+        ASSERT_EQ(normaliseName(name), normalised(name.c_str())) << name;
+        plain += name.size() > 2 && name.find_first_of(L"/\\:") == std::wstring::npos;
+    }
+    EXPECT_GT(plain, 10000);
+}
 
 class RandomPaths : public ::testing::TestWithParam<bool> {};
 

@@ -497,6 +497,64 @@ TEST(KitImportController, PassesEverythingOn) {
     EXPECT_EQ(controller.takeErrors(), L"");
 }
 
+TEST(KitImportController, AnswersByItselfIfTheHostHasNone) {
+    Kit::ImportPolicy policy;
+    Kit::detail::ImportLimits limits({}, {});
+    std::vector<Kit::CompanionReport> companions;
+    const std::wstring file = L"folder/input.a";
+    Kit::detail::ImportController controller(nullptr, policy, limits, file, companions);
+    EXPECT_EQ(controller.getContext(), nullptr);
+    controller.message(0, L"m");
+    controller.status(L"s");
+    controller.log(0, L"l");
+    EXPECT_TRUE(controller.warning(0, L"w"));
+    EXPECT_TRUE(controller.progress(0.5F, L""));
+    EXPECT_FALSE(controller.isInterrupted());
+    EXPECT_FALSE(controller.isProgressShown());
+    EXPECT_FALSE(controller.isStatusShown());
+    EXPECT_TRUE(controller.isErrorShown());
+    EXPECT_FALSE(controller.error(0, L"e"));
+    EXPECT_EQ(controller.takeErrors(), L"e");
+    for (const auto companion : {Kit::Companions::beside, Kit::Companions::anywhere}) {
+        policy.companions = companion;
+        EXPECT_EQ(controller.findFile(L"x.m", nullptr, nullptr), L"");
+        EXPECT_EQ(companions.back().reason, L"");
+    }
+    EXPECT_TRUE(controller.hasInterface(QrProcessControl::uid));
+    EXPECT_FALSE(controller.hasInterface(Words::uid));
+    EXPECT_EQ(queryCast<QrProcessControl>(&controller).get(), &controller);
+    EXPECT_EQ(queryCast<Words>(&controller).get(), nullptr);
+    EXPECT_THROW(controller.abort(0, L"a"), Assertions::ExProgramAborted);
+    EXPECT_TRUE(controller.wasAborted());
+}
+
+TEST(KitImportController, StopsTheImporterWhenTheTimeIsOver) {
+    const Kit::ImportPolicy policy;
+    Kit::detail::ImportLimits limits({}, milliseconds(0));
+    std::vector<Kit::CompanionReport> companions;
+    const std::wstring file;
+    Kit::detail::ImportController controller(nullptr, policy, limits, file, companions);
+    EXPECT_TRUE(controller.isInterrupted());
+    EXPECT_FALSE(controller.warning(0, L"w"));
+    EXPECT_FALSE(controller.progress(0.5F, L""));
+}
+
+TEST(KitImportController, GivesACompanionThatItCannotMeasureAsItIs) {
+    class Host final : public Log {
+        std::wstring findFile(const wchar_t*, const wchar_t*, const wchar_t*) override {
+            return L"does not exist";
+        }
+    };
+    Host host;
+    Kit::ImportPolicy policy;
+    policy.companions = Kit::Companions::anywhere;
+    Kit::detail::ImportLimits limits(0, {}); // Any size is too large.
+    std::vector<Kit::CompanionReport> companions;
+    const std::wstring file;
+    Kit::detail::ImportController controller(&host, policy, limits, file, companions);
+    EXPECT_EQ(controller.findFile(L"x.m", nullptr, nullptr), L"does not exist");
+}
+
 TEST(KitImportController, HasTheInterfacesOfTheHostsController) {
     class Host final : public QrCastImpl<Host, Words> {
       public:

@@ -139,6 +139,25 @@ TEST(RecordedList, ComesBackAsItWas) {
     EXPECT_EQ(listOf(manager), listOf(known.manager));
 }
 
+TEST(RecordedList, EqualTextsOfConsecutiveRecordsAreKeptOnce) {
+    Known known;
+    addBuilder(known.manager.libraries.front(), 4, L"", true);
+    ComponentManager manager;
+    Reading<QrBinaryStream> in(listOf(known.manager));
+    companionOf(manager)->read(in.stream);
+    auto library = manager.libraries.begin();
+    const ComponentLibrary& first = *library++;
+    const ComponentLibrary& second = *library++;
+    const ComponentLibrary& third = *library;
+    EXPECT_EQ(first.directory.c_str(), second.directory.c_str());
+    EXPECT_STREQ(second.directory.c_str(), L"c:\\parts");
+    EXPECT_STREQ(third.directory.c_str(), L".");
+    ASSERT_EQ(first.builders.size(), 3U);
+    EXPECT_EQ(first.builders[1].getName(), first.builders[2].getName());
+    EXPECT_STREQ(first.builders[1].getName(), L"n");
+    EXPECT_STREQ(first.builders[0].getName(), L"n\xE9 x");
+}
+
 TEST(RecordedList, LooksAsItAlwaysDid) {
     Known known;
     known.manager.libraries.pop_back();
@@ -237,7 +256,7 @@ struct Hostile {
     std::size_t characters() const {
         std::size_t sum = 0;
         for (const ComponentLibrary& library : manager.libraries)
-            sum += library.directory.capacity() + library.fileName.capacity();
+            sum += library.directory.view().size() + library.fileName.view().size();
         return sum;
     }
     ComponentManager manager;

@@ -80,7 +80,7 @@ class RecordedStart : public testing::Test {
 
     static ComponentLibrary& library(ComponentManager& manager, std::wstring_view prefix) {
         for (ComponentLibrary& library : manager.libraries)
-            if (library.fileName.starts_with(prefix))
+            if (library.fileName.view().starts_with(prefix))
                 return library;
         throw std::runtime_error("no such library");
     }

@@ -3,6 +3,7 @@
 // thread identifiers.
 #include "components/componentManager/support/hashMap.h"
 #include "components/componentManager/control/threadHash.h"
+#include "tests/support/failingAllocations.h"
 
 #include <gtest/gtest.h>
 
@@ -13,6 +14,7 @@
 #include <vector>
 
 using namespace Mz;
+using Mz::Test::FailingAllocations;
 
 namespace {
 
@@ -68,6 +70,34 @@ TEST(HashMap, KeepsTheAddressesOfValuesWhileItGrows) {
     for (std::uint32_t key = 1; key < 1000; ++key)
         map[key] = "x";
     EXPECT_EQ(map.find(0), first);
+}
+
+TEST(HashMap, InsertsAKeyOnce) {
+    Map map;
+    const auto [place, isNew] = map.insert(3);
+    EXPECT_TRUE(isNew);
+    EXPECT_EQ(*place, nullptr);
+    *place = "three";
+    const auto [found, isNewAgain] = map.insert(3);
+    EXPECT_FALSE(isNewAgain);
+    EXPECT_EQ(found, place);
+    EXPECT_EQ(map.size(), 1u);
+}
+
+TEST(HashMap, InsertsAsManyAsItReservedWithoutAnAllocation) {
+    Map map;
+    map.reserve(3);
+    EXPECT_EQ(map.bucketCount(), 8u);
+    map[1000] = "x";
+    map.reserve(1000);
+    EXPECT_EQ(map.bucketCount(), 1024u);
+    EXPECT_STREQ(*map.find(1000), "x");
+    const FailingAllocations failing(0);
+    for (std::uint32_t key = 0; key < 999; ++key)
+        map[key] = "y";
+    EXPECT_FALSE(failing.failed());
+    EXPECT_EQ(map.size(), 1000u);
+    EXPECT_EQ(map.bucketCount(), 1024u);
 }
 
 TEST(HashMap, HoldsKeysOfOneHash) {

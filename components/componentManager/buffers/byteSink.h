@@ -4,6 +4,7 @@
 #pragma once
 
 #include "components/componentManager/buffers/standardBuffer.h"
+#include "components/componentManager/support/alwaysInline.h"
 
 #include <cstddef>
 #include <cstring>
@@ -27,7 +28,7 @@ class ByteSink {
 
     /// The output of the stream under `io`. There is none if the class of `io` is not exactly
     /// `QrOutBuffer`; the sink is then not available.
-    [[gnu::always_inline]] explicit ByteSink(const QrBufferedIO& io)
+    MZ_ALWAYS_INLINE explicit ByteSink(const QrBufferedIO& io)
         : out(StandardStreams::outputUnder(io)), buffer(out ? unguardedBuffer(*out) : nullptr) {}
 
     /// Returns whether the bytes go to the stream's buffer without the guard of the stream.
@@ -39,7 +40,7 @@ class ByteSink {
     /// Returns where up to `roomSize()` bytes can be written in place, which `advance` then makes
     /// part of the output; null if there is room for fewer than `size` bytes. Bytes after those
     /// that are advanced over must remain as they are: they may be output that is overwritten.
-    [[gnu::always_inline]] char* room(std::ptrdiff_t size) const {
+    MZ_ALWAYS_INLINE char* room(std::ptrdiff_t size) const {
         return isFree() && roomSize() >= size ? (buffer->*&BufferAreas::pptr)() : nullptr;
     }
 

@@ -4,6 +4,7 @@
 #pragma once
 
 #include "components/componentManager/buffers/standardBuffer.h"
+#include "components/componentManager/support/alwaysInline.h"
 
 #include <cstddef>
 #include <cstring>
@@ -29,7 +30,7 @@ class ByteSource {
 
     /// The input of the stream under `io`. There is none if the class of `io` is not exactly
     /// `QrInBuffer`; the source is then not available.
-    [[gnu::always_inline]] explicit ByteSource(const QrBufferedIO& io)
+    MZ_ALWAYS_INLINE explicit ByteSource(const QrBufferedIO& io)
         : in(StandardStreams::inputUnder(io)), buffer(in ? unguardedBuffer(*in) : nullptr) {}
 
     /// Returns whether the bytes come from the stream's buffer without the guard of the stream.

@@ -12,6 +12,7 @@
 
 #include "components/componentManager/bufferio.h"
 #include "components/componentManager/buffers/ioGuard.h"
+#include "components/componentManager/support/alwaysInline.h"
 
 #include <atomic>
 #include <fstream>
@@ -43,7 +44,7 @@ inline constinit std::atomic<const std::type_info*> lastForeignBuffer{nullptr};
 }
 
 /// Returns `Memory` for exactly `std::stringbuf` and `File` for exactly `std::filebuf`.
-[[gnu::always_inline]] inline BufferKind bufferKind(const std::streambuf& buffer) {
+MZ_ALWAYS_INLINE inline BufferKind bufferKind(const std::streambuf& buffer) {
     const std::type_info& type = typeid(buffer);
     if (&type == &typeid(std::filebuf)) [[likely]]
         return BufferKind::File;
@@ -54,7 +55,7 @@ inline constinit std::atomic<const std::type_info*> lastForeignBuffer{nullptr};
 
 /// Returns the buffer of `stream` if the guard of the stream has no effect now, else null.
 template <class Stream>
-[[gnu::always_inline]] inline std::streambuf* unguardedBuffer(const Stream& source) {
+MZ_ALWAYS_INLINE inline std::streambuf* unguardedBuffer(const Stream& source) {
     const std::ios& stream = source; // One conversion to the virtual base.
     if (!stream.good() || stream.tie() || (stream.flags() & std::ios::unitbuf)) [[unlikely]]
         return nullptr;

@@ -72,8 +72,8 @@ class SeenFiles {
     }
     /// `path` must outlive this object.
     void add(const platform::FileIdentity& identity, const platform::NativePath& path) {
-        if (!files.find(identity))
-            files[identity] = &path;
+        if (const auto [place, isNew] = files.insert(identity); isNew)
+            *place = &path;
     }
 
   private:
@@ -148,13 +148,13 @@ std::wstring ComponentManager::normalisePath(const wchar_t* path, bool listMode)
 
 void ComponentManager::discover(const wchar_t* searchPath, LibraryList& newList, LibraryMap& byName,
                                 std::vector<std::wstring>& unlisted) {
-    std::vector<std::wstring> directories; // normalised
+    std::vector<SharedText> directories; // normalised
     std::vector<platform::NativePath> openingPaths;
     for (const std::wstring& entry : directoriesOf(searchPath)) {
         const std::optional<platform::NativePath> native = nativeDirectory(entry);
         if (!native)
             continue;
-        directories.push_back(normalisePath(entry.c_str(), false));
+        directories.emplace_back(normalisePath(entry.c_str(), false));
         openingPaths.push_back(platform::openingPath(directories.back(), {}, *native));
     }
     SeenFiles seen;
@@ -163,22 +163,23 @@ void ComponentManager::discover(const wchar_t* searchPath, LibraryList& newList,
         platform::listCandidates(openingPaths, &incomplete);
     for (std::size_t index = 0; index < listings.size(); ++index) {
         if (incomplete[index])
-            unlisted.push_back(directories[index]);
+            unlisted.emplace_back(directories[index].view());
+        byName.reserve(byName.size() + listings[index].size());
         for (platform::DirectoryEntry& candidate : listings[index]) {
-            std::wstring fileName = normalisePath(candidate.name.c_str(), false);
+            const std::wstring fileName = normaliseName(std::move(candidate.name));
             // Each file gets one record, even if the search path leads to it several times.
             if (candidate.identity ? seen.contains(candidate)
                                    : byName.find({directories[index], fileName}) != nullptr)
                 continue;
             ComponentLibrary& library = newList.emplace_back(*this);
             library.directory = directories[index];
-            library.fileName = std::move(fileName);
+            library.fileName = fileName;
             library.foundPath = std::move(candidate.path);
             if (candidate.identity)
                 seen.add(*candidate.identity, library.foundPath);
-            const LibraryKey key(library.directory, library.fileName);
-            if (!byName.find(key))
-                byName[key] = std::prev(newList.end());
+            if (const auto [place, isNew] = byName.insert({library.directory, library.fileName});
+                isNew)
+                *place = std::prev(newList.end());
         }
     }
 }

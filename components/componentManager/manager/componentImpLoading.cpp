@@ -142,7 +142,7 @@ ComponentManager::registerLibrary(ComponentLibrary& library, const platform::Fil
     // For the builders of a failure, which may be a failed allocation. There are none without it.
     std::list<BuilderList> place;
     try {
-        place.emplace_back();
+        place.emplace_back(builderPool);
         LibraryReference<QrComponentDescription> description(getDescription(library).detach());
         const bool found = description.get() != nullptr;
         if (found)

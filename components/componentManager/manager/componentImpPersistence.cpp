@@ -7,6 +7,8 @@
 #include "components/componentManager/recordFormat.h"
 #include "components/componentManager/stream.h"
 
+#include <array>
+#include <cstddef>
 #include <list>
 #include <string>
 
@@ -18,28 +20,46 @@ constexpr const char* source = "components/componentManager/componentImp";
 
 constexpr QrUid classUid{0x0C3F6A00, 0xADC511D1, 0x988AFC24, 0x07C10E27};
 
-/// Reads the fields of records.
-struct RecordReader {
-    QrStream& stream;
+/// Reads the fields of records. A text that equals the one at the same place of the record before
+/// is shared with it: the libraries of a folder have one directory, and the builders of an importer
+/// have one name.
+class RecordReader {
+  public:
+    explicit RecordReader(QrStream& stream) : stream(stream) {}
 
     template <class Value>
     void value(Value& field) {
         stream >> field;
     }
     void flag(bool& field) { stream >> field; }
-    void name(std::wstring& field) { text(field); }
+    void name(SharedText& field) { field = read(names[nameCount++ % names.size()]); }
+    void text(SharedText& field) { field = read(texts[textCount++ % texts.size()]); }
+
+  private:
     /// Throws if the text contains a NUL. No name or path contains one. A NUL that is read as a
     /// character is not consumed, so it would fill a text of any claimed length, and a small file
     /// could claim many long texts.
-    void text(std::wstring& field) {
-        stream >> field;
-        if (field.find(L'\0') != std::wstring::npos)
+    ///
+    /// \param last  the text that was read at this place before; receives this one
+    const SharedText& read(SharedText& last) {
+        characters.clear();
+        stream >> characters;
+        if (characters.find(L'\0') != std::wstring::npos)
             throw QrStreamEx::ExReadError(source, __LINE__);
+        if (last != characters)
+            last = characters;
+        return last;
     }
+
+    QrStream& stream;
+    std::wstring characters;
+    std::array<SharedText, 2> names; ///< of the last library
+    std::array<SharedText, 3> texts; ///< of the last builder
+    std::size_t nameCount = 0;
+    std::size_t textCount = 0;
 };
 
-void readLibrary(QrStream& stream, ComponentLibrary& library) {
-    RecordReader reader{stream};
+void readLibrary(RecordReader& reader, ComponentLibrary& library) {
     unsigned int count = 0;
     detail::codeLibrary(reader, library.directory, library.fileName, library.fileTime,
                         library.fileSize, count);
@@ -74,10 +94,11 @@ void ComponentManager::readRecords(QrStream& stream) {
     }
     if (count < 0)
         throw QrStreamEx::ExReadError(source, __LINE__);
+    RecordReader reader(stream);
     for (; count > 0; --count) {
         ComponentLibrary& library = libraries.emplace_back(*this);
         try {
-            readLibrary(stream, library);
+            readLibrary(reader, library);
         } catch (...) {
             // An incomplete record must not count as the state of the file.
             library.fileTime = 0;

@@ -4,18 +4,19 @@
 /// The sources: `componentImp.cpp` (the interfaces and the manager's operations),
 /// `componentImpRegistry.cpp` (builder records), `componentImpDiscovery.cpp` (search path and
 /// merge), `componentImpLoading.cpp` (loading and recording one library), and
-/// `componentImpPersistence.cpp` (the recorded list).
+/// `componentImpPersistence.cpp` (the recorded list). `sharedText.h` and `recordList.h` keep the
+/// texts and builder records of many libraries in little memory.
 #pragma once
 
 #include "components/componentManager/componentImp.h"
+#include "components/componentManager/manager/recordList.h"
+#include "components/componentManager/manager/sharedText.h"
 #include "components/componentManager/persistant.h"
 #include "components/componentManager/support/hashMap.h"
 #include "components/componentManager/support/internalExport.h"
 #include "components/platform/platform.h"
 
-#include <algorithm>
 #include <list>
-#include <memory>
 #include <string>
 #include <vector>
 
@@ -36,7 +37,7 @@ class MZ_INTERNAL_API ComponentManager final
                          const ComponentManager&> {
   public:
     class Builder;
-    class BuilderList;
+    using BuilderList = RecordList<Builder>;
 
     /// The directory and the file name of a library record. Views into that record.
     using LibraryKey = std::pair<std::wstring_view, std::wstring_view>;
@@ -109,6 +110,7 @@ class MZ_INTERNAL_API ComponentManager final
     /// still hold pointers to them. If it throws, nothing has changed.
     void dropBuilders(ComponentLibrary& library);
 
+    NodePool<Builder> builderPool; ///< destroyed after all records
     LibraryList libraries;
     HashMap<QrUid, Builder*, UidHash> builderIndex;
     bool initialised = false;
@@ -160,32 +162,11 @@ class MZ_INTERNAL_API ComponentManager::Builder final
 
     ComponentLibrary* library = nullptr;
     QrUid uid{};
-    std::wstring name;
-    std::wstring label;
-    std::wstring text;
+    SharedText name;
+    SharedText label;
+    SharedText text;
     unsigned int number = 0;
     bool flag = false;
-};
-
-/// The builder records of one library. Growing does not move a record in memory, because clients
-/// and the index hold pointers to them.
-class ComponentManager::BuilderList {
-  public:
-    bool empty() const { return records.empty(); }
-    std::size_t size() const { return records.size(); }
-    Builder& operator[](std::size_t index) { return *records[index]; }
-    const Builder& operator[](std::size_t index) const { return *records[index]; }
-    Builder& front() { return *records.front(); }
-    const Builder& front() const { return *records.front(); }
-    Builder& emplace_back(const Builder& record = Builder()) {
-        return *records.emplace_back(std::make_unique<Builder>(record));
-    }
-    void reverse() { std::reverse(records.begin(), records.end()); }
-    void clear() { records.clear(); }
-    void swap(BuilderList& other) { records.swap(other.records); }
-
-  private:
-    std::vector<std::unique_ptr<Builder>> records;
 };
 
 /// A library record: what the manager knows of one candidate.
@@ -202,14 +183,14 @@ struct MZ_INTERNAL_API ComponentLibrary {
     /// Stores the file's time and size, for which the builder records are valid.
     void noteFile(const platform::FileStatus& status);
 
-    std::wstring directory; ///< normalised
-    std::wstring fileName;  ///< normalised
+    SharedText directory; ///< normalised
+    SharedText fileName;  ///< normalised
     platform::Module module = nullptr;
-    std::uint32_t fileTime = 0;  ///< when the builders were last read
-    int64 fileSize = 0;          ///< when the builders were last read
-    int64 descriptionValue = 0;  ///< not interpreted
-    std::wstring componentText1; ///< the label
-    std::wstring componentText2; ///< the text
+    std::uint32_t fileTime = 0; ///< when the builders were last read
+    int64 fileSize = 0;         ///< when the builders were last read
+    int64 descriptionValue = 0; ///< not interpreted
+    SharedText componentText1;  ///< the label
+    SharedText componentText2;  ///< the text
     ComponentManager::BuilderList builders;
     bool loadedByManager = false; ///< false if the process had mapped the module before
 

@@ -70,7 +70,8 @@ void ComponentManager::reindexBuilders(ComponentLibrary& library) {
 void ComponentManager::dropBuilders(ComponentLibrary& library) {
     if (library.builders.empty())
         return;
-    std::list<BuilderList> place(1);
+    std::list<BuilderList> place;
+    place.emplace_back(builderPool);
     dropBuilders(library, place);
 }
 

@@ -3,11 +3,16 @@
 ///
 /// Unlike `std::unordered_map`, it is constant-initialised, so that registries work while other
 /// static objects are constructed. A lookup needs no division: the size of the table is a power of
-/// two, and the bucket is the masked hash. Nodes never move.
+/// two, and the bucket is the masked hash. Nodes never move. They are allocated in blocks, and a
+/// map whose final size is known needs one block.
 #pragma once
 
+#include "components/componentManager/support/nodePool.h"
+
+#include <algorithm>
+#include <bit>
 #include <cstddef>
-#include <memory>
+#include <new>
 #include <utility>
 
 namespace Mz {
@@ -36,16 +41,32 @@ class HashMap {
     /// Returns the value of `key`. Inserts `Value()` if there is no entry.
     ///
     /// \throws std::bad_alloc  if memory runs out; nothing is inserted
-    Value& operator[](const Key& key) {
-        if (Value* found = find(key))
-            return *found;
-        auto node = std::unique_ptr<Node>(new Node{nullptr, key, Value()});
-        if (entries == buckets)
-            grow();
+    Value& operator[](const Key& key) { return *insert(key).first; }
+
+    /// Does the same. Returns the address of the value, and whether it was inserted.
+    std::pair<Value*, bool> insert(const Key& key) {
+        if (buckets == 0)
+            rehash(smallestTable);
         Node** slot = slotOf(key);
-        *slot = node.release();
+        if (*slot)
+            return {&(*slot)->value, false};
+        if (entries == buckets) {
+            rehash(buckets * 2);
+            slot = slotOf(key);
+        }
+        *slot = new (pool.take()) Node{nullptr, key, Value()};
         ++entries;
-        return (*slot)->value;
+        return {&(*slot)->value, true};
+    }
+
+    /// Allocates what `count` entries need, so that inserting them allocates nothing.
+    ///
+    /// \throws std::bad_alloc  if memory runs out; the entries have not changed
+    void reserve(std::size_t count) {
+        if (count > entries)
+            pool.reserve(count - entries);
+        if (count > buckets)
+            rehash(std::max(std::bit_ceil(count), smallestTable));
     }
 
     /// Erases the entry of `key`. Returns whether there was one.
@@ -56,17 +77,18 @@ class HashMap {
         Node* node = *slot;
         *slot = node->next;
         --entries;
-        delete node;
+        destroy(node);
         return true;
     }
 
-    /// Erases all entries and frees the table.
+    /// Erases all entries and frees all memory.
     void clear() noexcept {
         for (std::size_t bucket = 0; bucket < buckets; ++bucket)
             while (Node* node = table[bucket]) {
                 table[bucket] = node->next;
-                delete node;
+                destroy(node);
             }
+        pool.freeAll();
         delete[] table;
         table = nullptr;
         buckets = entries = 0;
@@ -82,6 +104,13 @@ class HashMap {
         Value value;
     };
 
+    static constexpr std::size_t smallestTable = 8;
+
+    void destroy(Node* node) noexcept {
+        node->~Node();
+        pool.giveBack(node);
+    }
+
     Node** bucketOf(const Key& key) const noexcept {
         return &table[static_cast<std::size_t>(Hash()(key)) & (buckets - 1)];
     }
@@ -95,10 +124,9 @@ class HashMap {
         return slot;
     }
 
-    void grow() {
+    void rehash(std::size_t newBuckets) {
         const std::size_t oldBuckets = buckets;
         Node** oldTable = table;
-        const std::size_t newBuckets = oldBuckets ? oldBuckets * 2 : 8;
         table = new Node*[newBuckets]();
         buckets = newBuckets;
         for (std::size_t bucket = 0; bucket < oldBuckets; ++bucket)
@@ -114,6 +142,7 @@ class HashMap {
     Node** table = nullptr;
     std::size_t buckets = 0;
     std::size_t entries = 0;
+    NodePool<Node> pool;
 };
 
 } // namespace Mz

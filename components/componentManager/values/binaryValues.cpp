@@ -8,6 +8,7 @@
 #include "components/componentManager/buffers/byteSink.h"
 #include "components/componentManager/buffers/byteSource.h"
 #include "components/componentManager/stream.h"
+#include "components/componentManager/support/alwaysInline.h"
 
 #include <algorithm>
 #include <bit>
@@ -129,7 +130,7 @@ template <class Bits>
 
 /// Writes one value without a block, in place where possible.
 template <class T>
-[[gnu::always_inline]] inline void writeValue(QrBufferedIO& io, T value) {
+MZ_ALWAYS_INLINE inline void writeValue(QrBufferedIO& io, T value) {
     if constexpr (!alwaysFits<T>)
         if (!fits(value))
             throw QrStreamEx::ExWriteError(source, __LINE__);
@@ -348,7 +349,7 @@ template <class T>
 }
 
 template <class T>
-[[gnu::always_inline]] inline int readValue(QrBufferedIO& io, T& value) {
+MZ_ALWAYS_INLINE inline int readValue(QrBufferedIO& io, T& value) {
     constexpr std::size_t width = sizeof(WireType<T>);
     const ByteSource source(io);
     if (!source.isFree()) [[unlikely]]

@@ -26,8 +26,8 @@ Json jsonIn(std::string_view text);
 /// \throws std::ios_base::failure if the buffer of the stream throws it
 Json jsonIn(std::istream& input);
 
-/// Returns a whole number. What is read from a file may be any other number, which no integer holds.
-/// \throws Json::exception if the value is no whole number
+/// Returns a whole number. What is read from a file may be any other number, which no integer
+/// holds. \throws Json::exception if the value is no whole number
 std::int64_t integerOf(const Json& value);
 
 /// Returns the value on one line in ASCII, which does not depend on a locale. Invalid UTF-8 is

@@ -24,6 +24,7 @@
 #include <optional>
 #include <set>
 #include <string>
+#include <string_view>
 #include <sys/stat.h>
 #include <utility>
 #include <vector>
@@ -64,6 +65,13 @@ void noteFailure(Listing& listing) {
     listing.incomplete = listing.incomplete || isTemporary(errno);
 }
 
+/// Returns the path of a file, in one allocation.
+NativePath pathOf(const NativePath& directory, std::string_view name) {
+    NativePath path;
+    path.reserve(directory.size() + 1 + name.size());
+    return path.append(directory).append(1, '/').append(name);
+}
+
 /// Adds the file of `item` if it is a candidate. `device` is the device of the directory.
 void addCandidate(Listing& listing, const NativePath& path, DIR* directory, dev_t device,
                   const dirent& item) {
@@ -79,7 +87,7 @@ void addCandidate(Listing& listing, const NativePath& path, DIR* directory, dev_
     std::optional<std::wstring> name = toCharacters(item.d_name);
     if (!name)
         return;
-    listing.files.push_back({std::move(*name), path + "/" + item.d_name, identity});
+    listing.files.push_back({std::move(*name), pathOf(path, item.d_name), identity});
     listing.byStatus.push_back(!listed);
 }
 

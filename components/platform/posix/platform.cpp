@@ -165,7 +165,7 @@ std::optional<NativePath> toNative(std::wstring_view name) {
     return toBytes(name);
 }
 
-NativePath openingPath(const std::wstring&, const std::wstring&, const NativePath& found) {
+NativePath openingPath(std::wstring_view, std::wstring_view, const NativePath& found) {
     return found;
 }
 

@@ -151,8 +151,11 @@ std::optional<NativePath> toNative(std::wstring_view name) {
     return NativePath(std::wstring(name));
 }
 
-NativePath openingPath(const std::wstring& directory, const std::wstring& name, const NativePath&) {
-    return name.empty() ? directory : directory + L'\\' + name;
+NativePath openingPath(std::wstring_view directory, std::wstring_view name, const NativePath&) {
+    NativePath path(directory);
+    if (!name.empty())
+        path.append(1, L'\\').append(name);
+    return path;
 }
 
 std::wstring lowerCase(std::wstring text) {
