@@ -1,12 +1,11 @@
 // SPDX-License-Identifier: BSL-1.0
 /// Has a builder for each of several faults that do not hide one another.
 #include "tests/checks/components/broken.h"
+#include "tests/checks/components/oneThread.h"
 
 #include "components/componentManager/exceptions.h"
 
-#include <atomic>
 #include <stdexcept>
-#include <thread>
 
 using namespace Mz;
 using Test::testUid;
@@ -97,20 +96,17 @@ class Unreadable final : public Test::Stored {
 };
 
 /// Throws when several threads use it.
-class OneThread final : public Kit::Builder<OneThread> {
+class ForOneThread final : public Kit::Builder<ForOneThread> {
   public:
-    OneThread() : Builder({.uid = threadsUid, .name = L"oneThread", .label = L"One thread"}) {}
+    ForOneThread() : Builder({.uid = threadsUid, .name = L"oneThread", .label = L"One thread"}) {}
     QrRef<QrCastable> createObject() override {
-        const bool alone = users++ == 0;
-        std::this_thread::yield();
-        --users;
-        if (!alone)
+        if (!oneThread.isAlone())
             throw std::runtime_error("another thread is here");
         return (new Test::NamedObject(""))->getCastable();
     }
 
   private:
-    std::atomic<int> users{0};
+    Test::OneThread oneThread;
 };
 
 } // namespace
@@ -126,4 +122,4 @@ MZ_COMPONENT(
         {.uid = throwsClassUid, .name = L"throwsClass", .label = L"Throws"}),
     Kit::builderOf<Unreadable>(
         {.uid = unreadableUid, .name = L"unreadable", .label = L"Unreadable"}),
-    Kit::builder<OneThread>())
+    Kit::builder<ForOneThread>())
