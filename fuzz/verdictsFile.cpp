@@ -4,6 +4,7 @@
 #include "components/componentTools/records/verdictsFile.h"
 #include "fuzz/fuzz.h"
 
+#include <algorithm>
 #include <fstream>
 #include <iterator>
 
@@ -40,6 +41,13 @@ void expectSaveable(const RecordedLibraries& libraries) {
         }
 }
 
+void expectSame(const DisabledComponents& a, const DisabledComponents& b) {
+    const auto isSame = [](const DisabledComponent& x, const DisabledComponent& y) {
+        return x.directory == y.directory && x.fileName == y.fileName && x.reason == y.reason;
+    };
+    Fuzz::expect(std::ranges::equal(a, b, isSame), "what is switched off stays so");
+}
+
 } // namespace
 
 int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
@@ -60,6 +68,7 @@ int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
     readVerdicts(first.path(), again);
     const std::optional<DisabledComponents> stillDisabled = readDisabled(first.path());
     Fuzz::expect(stillDisabled.has_value(), "what is written can be read");
+    expectSame(*disabled, *stillDisabled);
     const Fuzz::InputFile second("");
     writeVerdicts(second.path(), again, *stillDisabled, readJudgement(first.path()));
     Fuzz::expectSame(contentOf(first.path()), contentOf(second.path()),
