@@ -191,8 +191,9 @@ class QrCastRef : public Base {
     /// Not inlined: compilers that see the body warn about uses after the deletion, which the count
     /// rules out.
     [[gnu::noinline]] long release() override {
+        // Who holds the only reference need not fear that another thread takes or releases one.
         // The result is a local: the object and its counter may no longer exist at the return.
-        const long left = --references;
+        const long left = references.dropLast() ? -1 : --references;
         if (left < 0)
             delete this;
         return left;

@@ -34,6 +34,18 @@ class LkCounterWindows {
         return wrappingSum(count.fetch_sub(1, std::memory_order_acq_rel), -1);
     }
 
+    /// Makes the value -1 and returns true if it is 0; else changes nothing and returns false.
+    ///
+    /// Only for a value that no other thread can change while it is 0: it costs no atomic
+    /// subtraction, which takes most of the time of the decrement. Acquires what other threads
+    /// released by their decrements, as the decrement does.
+    bool dropLast() noexcept {
+        if (count.load(std::memory_order_acquire) != 0)
+            return false;
+        count.store(-1, std::memory_order_relaxed);
+        return true;
+    }
+
     /// Returns the current value. Other threads may change it at any time.
     T value() const noexcept { return static_cast<T>(count.load(std::memory_order_relaxed)); }
 

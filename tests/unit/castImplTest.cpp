@@ -313,6 +313,43 @@ TEST(QrCastRef, ExactlyOneOfManyThreadsDeletes) {
     }
 }
 
+TEST(LkCounter, DropsOnlyTheLast) {
+    LkCounterWindows<long> counter(-1);
+    EXPECT_FALSE(counter.dropLast());
+    EXPECT_EQ(counter.value(), -1);
+    ++counter;
+    ++counter;
+    EXPECT_FALSE(counter.dropLast());
+    EXPECT_EQ(counter.value(), 1);
+    --counter;
+    EXPECT_TRUE(counter.dropLast());
+    EXPECT_EQ(counter.value(), -1);
+}
+
+/// Takes a reference to itself while it is destroyed.
+class TakenAtTheEnd final : public QrCastRef<QrCastHeap<QrCastImpl<TakenAtTheEnd, Dial>>> {
+  public:
+    explicit TakenAtTheEnd(long& counted) : result(counted) {}
+    ~TakenAtTheEnd() override { result = newReference(); }
+    int mark() const override { return 1; }
+
+  private:
+    long& result;
+};
+
+TEST(QrCastRef, CountsFromNoReferenceWhileItIsDestroyed) {
+    long afterLast = 77;
+    QrCastable* const held = new TakenAtTheEnd(afterLast);
+    held->newReference();
+    EXPECT_EQ(held->release(), -1);
+    EXPECT_EQ(afterLast, 0);
+
+    afterLast = 77;
+    QrCastable* const neverHeld = new TakenAtTheEnd(afterLast);
+    EXPECT_EQ(neverHeld->release(), -2);
+    EXPECT_EQ(afterLast, -1);
+}
+
 TEST(LkCounter, IsThirtyTwoBitsWideAndReturnsTheNewValue) {
     LkCounterWindows<long> counter(-1);
     EXPECT_EQ(++counter, 0);
