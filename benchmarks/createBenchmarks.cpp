@@ -56,7 +56,8 @@ EntryPoints loadedByHand() {
     return found;
 }
 
-/// Makes an object with the calls that a manager must make, and none beside.
+/// Makes an object with the calls that a component can observe at the manager's `createObject`, and
+/// none beside: the manager casts the builder twice, in its `getBuilder` and for its own use.
 QrRef<QrCastable> createByHand(const EntryPoints& entryPoints, const QrUid& uid) {
     const auto found = entryPoints.find(uid);
     if (found == entryPoints.end())
@@ -65,7 +66,8 @@ QrRef<QrCastable> createByHand(const EntryPoints& entryPoints, const QrUid& uid)
     const QrPtr<QrComponentDescription> description =
         queryCast<QrComponentDescription>(described.get());
     const QrRef<QrCastable> created = description->createBuilder(uid);
-    const QrPtr<QrComponentBuilder> builder = queryCast<QrComponentBuilder>(created.get());
+    const QrPtr<QrComponentBuilder> gotten = queryCast<QrComponentBuilder>(created.get());
+    const QrPtr<QrComponentBuilder> builder = queryCast<QrComponentBuilder>(gotten.get());
     return builder->createObject();
 }
 

@@ -47,8 +47,7 @@ QrRefPtr<QrComponentBuilder> ComponentManager::getBuilder(const QrUid& uid) {
     if (!found)
         return nullptr;
     const Builder& builder = **found;
-    QrCRefPtr<QrComponentBuilder> result = builder.getBuilder();
-    return QrRefPtr<QrComponentBuilder>::adopt(const_cast<QrComponentBuilder*>(result.detach()));
+    return getComponentBuilder(*builder.library, builder.uid);
 }
 
 QrEnum::Action ComponentManager::enumerateBuilders(QrEnumerator<QrCPtr<QrBuilderDescription>>& e) {

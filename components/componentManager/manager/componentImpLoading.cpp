@@ -7,6 +7,7 @@
 /// library is unloaded only after the exception is destroyed.
 #include "components/componentManager/manager/componentImpPrivate.h"
 #include "components/componentManager/recordFormat.h"
+#include "components/componentManager/support/alwaysInline.h"
 
 #include <cxxabi.h>
 #include <list>
@@ -78,11 +79,19 @@ class AddBuilders final : public QrEnumerator<QrCPtr<QrBuilderDescription>> {
     ComponentManager::BuilderList& builders;
 };
 
+/// Calls the entry point of a library, and returns a new reference to its description, or null.
+MZ_ALWAYS_INLINE inline QrComponentDescription*
+describedBy(QrGetComponentDescriptionFunction* entryPoint) {
+    LibraryReference<QrCastable> described(QrPtr<QrCastable>(entryPoint()).detach());
+    LibraryReference<QrComponentDescription> description(
+        queryCast<QrComponentDescription>(described.get()).detach());
+    described.release();
+    return description.detach();
+}
+
 } // namespace
 
-bool ComponentManager::ensureLoaded(ComponentLibrary& library, bool forUse) {
-    if (library.module)
-        return !library.builders.empty();
+bool ComponentManager::loadIfNeeded(ComponentLibrary& library, bool forUse) {
     bool unknown = false;
     const std::optional<platform::FileStatus> status =
         platform::queryFile(library.openingPath(), &unknown);
@@ -189,18 +198,15 @@ QrPtr<QrComponentDescription> ComponentManager::getDescription(ComponentLibrary&
         unload(library);
         return nullptr;
     }
-    LibraryReference<QrCastable> described(QrPtr<QrCastable>(library.entryPoint()).detach());
-    LibraryReference<QrComponentDescription> description(
-        queryCast<QrComponentDescription>(described.get()).detach());
-    described.release();
-    return QrPtr<QrComponentDescription>::adopt(description.detach());
+    return QrPtr<QrComponentDescription>::adopt(describedBy(library.entryPoint));
 }
 
 QrRefPtr<QrComponentBuilder> ComponentManager::getComponentBuilder(ComponentLibrary& library,
                                                                    const QrUid& uid) {
     if (!ensureLoaded(library, true))
         return nullptr;
-    LibraryReference<QrComponentDescription> description(getDescription(library).detach());
+    LibraryReference<QrComponentDescription> description(
+        library.entryPoint ? describedBy(library.entryPoint) : getDescription(library).detach());
     if (!description.get())
         return nullptr;
     LibraryReference<QrCastable> created(description.get()->createBuilder(uid).detach());

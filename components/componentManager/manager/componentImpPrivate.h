@@ -121,6 +121,8 @@ class MZ_INTERNAL_API ComponentManager final
         rejected, ///< the file is not a component library, or cannot be loaded
         unknown,  ///< the system lacked resources, or could not read the file now
     };
+    /// Does what `ensureLoaded` promises, for a library that is not loaded.
+    bool loadIfNeeded(ComponentLibrary& library, bool forUse);
     /// Uses the library that is mapped in the process already, or else loads it.
     LoadResult loadModule(ComponentLibrary& library);
     /// Records the builders that the loaded library describes. On failure, drops them and unloads
@@ -201,6 +203,10 @@ struct MZ_INTERNAL_API ComponentLibrary {
     /// called each time.
     QrGetComponentDescriptionFunction* entryPoint = nullptr;
 };
+
+inline bool ComponentManager::ensureLoaded(ComponentLibrary& library, bool forUse) {
+    return library.module ? !library.builders.empty() : loadIfNeeded(library, forUse);
+}
 
 /// The persistent companion of the manager: writes and reads the recorded list, so that the next
 /// start loads only libraries that are new or have changed.
