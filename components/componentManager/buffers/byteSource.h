@@ -101,8 +101,11 @@ class ByteSource {
     int read(char* data, int size) const {
         if (!buffer)
             return readGuarded(data, size);
-        if (isFree() && takeHeld(data, size))
-            return size;
+        return isFree() && takeHeld(data, size) ? size : readThrough(data, size);
+    }
+
+    /// Does what `read` does, by a call of the buffer in any case. The source must be available.
+    int readThrough(char* data, int size) const {
         std::streamsize got = 0;
         directly(*in, [&] {
             got = buffer->sgetn(data, size);

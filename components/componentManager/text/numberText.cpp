@@ -44,22 +44,25 @@ void writePair(char* text, std::uint64_t number) {
     std::memcpy(text, &digitPairs[static_cast<std::size_t>(2 * number)], 2);
 }
 
+/// The smallest number of each count of digits, from two on, at the index of one digit less.
+template <class Unsigned>
+constexpr auto digitLimits = [] {
+    std::array<Unsigned, 20> table{}; // The first is 0, so that a zero has one digit.
+    Unsigned power = 10;
+    for (std::size_t index = 1; index < table.size(); ++index) {
+        table[index] = power;
+        const bool isLast = power > static_cast<Unsigned>(-1) / 10;
+        power = isLast ? static_cast<Unsigned>(-1) : static_cast<Unsigned>(power * 10);
+    }
+    return table;
+}();
+
 /// Returns the number of digits of `value`.
 template <class Unsigned>
 int digitCount(Unsigned value) {
-    constexpr auto limits = [] {
-        std::array<Unsigned, 20> table{}; // The first is 0, so that a zero has one digit.
-        Unsigned power = 10;
-        for (std::size_t index = 1; index < table.size(); ++index) {
-            table[index] = power;
-            const bool isLast = power > static_cast<Unsigned>(-1) / 10;
-            power = isLast ? static_cast<Unsigned>(-1) : static_cast<Unsigned>(power * 10);
-        }
-        return table;
-    }();
     // The number of bits times log10(2), which is at most one too small.
     const int estimate = static_cast<int>(std::bit_width(value | 1)) * 1233 >> 12;
-    return estimate + (value >= limits[static_cast<std::size_t>(estimate)] ? 1 : 0);
+    return estimate + (value >= digitLimits<Unsigned>[static_cast<std::size_t>(estimate)] ? 1 : 0);
 }
 
 /// Writes a number and no byte after it.

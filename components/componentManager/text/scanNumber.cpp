@@ -96,10 +96,20 @@ struct Number {
 /// Up to this many digits always fit 64 bits. A number with more is unusual.
 constexpr std::ptrdiff_t mostDigits = 18;
 
+/// The powers of ten up to the count of digits that are taken at a time.
+constexpr std::uint32_t integerPowers[] = {1,       10,        100,        1'000,      10'000,
+                                           100'000, 1'000'000, 10'000'000, 100'000'000};
+
+/// The powers of ten that a `double` represents exactly.
+constexpr auto exactPowers = [] {
+    std::array<double, 23> table{1};
+    for (std::size_t index = 1; index < table.size(); ++index)
+        table[index] = table[index - 1] * 10;
+    return table;
+}();
+
 /// Appends the digits at `at` to `value`, up to eight at a time, and returns their end.
 const char* takeDigits(const char* at, const char* end, std::uint64_t& value) {
-    constexpr std::uint32_t powers[] = {1,       10,        100,        1'000,      10'000,
-                                        100'000, 1'000'000, 10'000'000, 100'000'000};
     constexpr int width = 8;
     while (end - at >= width) {
         // A digit has its value in it, any other byte a larger one.
@@ -109,7 +119,7 @@ const char* takeDigits(const char* at, const char* end, std::uint64_t& value) {
         if (count == 0)
             return at;
         // Zeros before the digits take the place of what is no digit.
-        value = value * powers[count] + numberOf(digits << (width * (width - count)));
+        value = value * integerPowers[count] + numberOf(digits << (width * (width - count)));
         at += count;
         if (count < width)
             return at;
@@ -191,26 +201,22 @@ bool nearest(std::uint64_t digits, int power, double& value) {
 
 /// Computes the value of the number. Returns false if it is too large or too small for a `double`.
 bool valueOf(const Number& number, double& value) {
-    constexpr auto powers = [] {
-        std::array<double, 23> table{1};
-        for (std::size_t index = 1; index < table.size(); ++index)
-            table[index] = table[index - 1] * 10;
-        return table;
-    }();
     constexpr std::uint64_t exactLimit = std::uint64_t(1) << 53;
-    constexpr int exactPower = static_cast<int>(powers.size()) - 1;
+    constexpr int exactPower = static_cast<int>(exactPowers.size()) - 1;
     if (number.digits <= exactLimit && number.exponent >= -exactPower &&
         number.exponent <= exactPower) {
         // Both operands are exact, so the single rounding is correct.
         const auto digits = static_cast<double>(number.digits);
-        value = number.exponent < 0 ? digits / powers[static_cast<std::size_t>(-number.exponent)]
-                                    : digits * powers[static_cast<std::size_t>(number.exponent)];
+        value = number.exponent < 0
+                    ? digits / exactPowers[static_cast<std::size_t>(-number.exponent)]
+                    : digits * exactPowers[static_cast<std::size_t>(number.exponent)];
     } else if (!nearest(number.digits, number.exponent, value) &&
                std::from_chars(number.begin, number.end, value).ec != std::errc()) {
         return false;
     }
-    if (number.negative)
-        value = -value;
+    // Without a branch, since signs often alternate.
+    const auto sign = static_cast<std::uint64_t>(number.negative) << 63;
+    value = std::bit_cast<double>(std::bit_cast<std::uint64_t>(value) ^ sign);
     return true;
 }
 

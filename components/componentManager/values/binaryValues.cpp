@@ -333,8 +333,8 @@ int readFree(const ByteSource& source, T* values, int count) {
     return count;
 }
 
-/// Reads one value. Takes it from the bytes that the buffer holds, else by the call of the IO or
-/// the same call of its buffer.
+/// Reads one value of which the buffer does not hold, or does not show, all bytes: by the call of
+/// the IO or the same call of its buffer.
 template <class T>
 [[gnu::noinline]] int readBits(QrBufferedIO& io, const ByteSource& source, T& value) {
     constexpr int width = sizeof(WireType<T>);
@@ -343,7 +343,7 @@ template <class T>
         unpack(&value, got);
         return got;
     }
-    const int got = source.read(reinterpret_cast<char*>(&value), width) / width;
+    const int got = source.readThrough(reinterpret_cast<char*>(&value), width) / width;
     unpack(&value, got);
     return got;
 }
