@@ -225,8 +225,8 @@ class MZ_OBJECT_IO_API QrObjectInBuffer
   private:
     friend struct ObjectInputRelay;
 
-    QrRef<QrCastable> readRecord(QrStream& s, int64 position);
-    QrRef<QrCastable> readNewObject(QrStream& s, std::uint32_t number, int64 position);
+    QrRef<QrCastable> readRecord(QrStream& s, int64 begin);
+    QrRef<QrCastable> readNewObject(QrStream& s, std::uint32_t number, int64 begin);
 
     struct State;
     std::unique_ptr<State> state;

@@ -5,6 +5,7 @@
 /// each level with the position of that level's object, and stops all later reads: after it the
 /// position in the data is unknown.
 #include "components/componentManager/binaryStream.h"
+#include "components/componentManager/buffers/byteSource.h"
 #include "components/componentManager/componentImp.h"
 #include "components/componentManager/numberRelay.h"
 #include "components/objectIO/objectIO.h"
@@ -73,29 +74,62 @@ int readTextBool(QrBufferedIO& io, wchar_t* digit) {
     return got;
 }
 
-/// The position of an IO, for messages. Asking the IO may cost a call of the system, so what is
-/// read is counted from its last answer, until something is read that is not counted.
+/// Where the inner IO is, for messages. Asking it may cost a call of the system, which takes longer
+/// than reading a small object, so what is read is counted from its last answer, until something is
+/// read that is not counted. As long as an object comes from bytes that a standard buffer holds,
+/// the IO is not even asked where it began: that can be computed later.
+///
+/// Places are distances from the first answer, or from the begin of the outermost object as long as
+/// there is no answer. They are negative if they are not known.
 class Place {
   public:
-    int64 of(const QrBufferedIO& io) {
+    explicit Place(const QrBufferedIO& inner) : io(inner) {}
+
+    /// An outermost object begins. Between objects the program may use the inner IO by itself.
+    void begin() {
+        unasked = ByteSource(io).isFree();
+        known = unasked;
+        place = 0;
+        origin = 0;
+    }
+
+    /// Returns the current place.
+    int64 now() {
         if (!known) {
-            position = io.tell();
+            place = distance(io.tell(), origin);
             known = true;
         }
-        return position;
+        return place;
+    }
+
+    /// Returns the position of a place in the data, negative if it is not known.
+    int64 position(int64 of) {
+        ask();
+        return of < 0 || origin < 0 ? -1 : origin + of;
+    }
+
+    /// Up to `size` bytes are read next. If the buffer does not hold them it asks the medium, which
+    /// may fail, and then the begin of the object could no longer be computed.
+    void expect(int size) {
+        if (unasked && !holds(size))
+            ask();
     }
 
     /// Something is read that is not counted.
-    void forget() { known = false; }
-
-    void advance(int bytes) {
-        if (position >= 0 && bytes > 0)
-            position += bytes;
+    void forget() {
+        ask();
+        known = false;
     }
 
-    /// Counts what `read` returns. Forgets the position if it throws.
+    void advance(int bytes) {
+        if (place >= 0 && bytes > 0)
+            place += bytes;
+    }
+
+    /// Counts what `read` returns, after at most `size` bytes. Forgets the place if it throws.
     template <class Read>
-    int advanceBy(const Read& read) {
+    int advanceBy(int size, const Read& read) {
+        expect(size);
         const bool wasKnown = std::exchange(known, false);
         const int bytes = read();
         known = wasKnown;
@@ -104,18 +138,40 @@ class Place {
     }
 
   private:
-    int64 position = -1;
-    bool known = false;
+    static int64 distance(int64 position, int64 from) {
+        return position < 0 || from < 0 ? -1 : position - from;
+    }
+
+    bool holds(int size) const {
+        const ByteSource source(io);
+        return source.isFree() && static_cast<int64>(source.held().size()) >= size;
+    }
+
+    void ask() {
+        if (!std::exchange(unasked, false))
+            return;
+        origin = distance(io.tell(), place);
+        if (origin < 0)
+            place = -1;
+    }
+
+    const QrBufferedIO& io;
+    int64 place = -1;
+    int64 origin = 0;     ///< the position from which places are counted
+    bool known = false;   ///< whether `place` is the current one
+    bool unasked = false; ///< whether `origin` is still to be asked for
 };
 
 } // namespace
 
 struct QrObjectInBuffer::State {
+    explicit State(const QrBufferedIO& inner) : place(inner) {}
+
     /// All objects, including those that are still being read.
     using Objects = ObjectTable<QrRef<QrCastable>>;
     Objects objects;
     int depth = 0;
-    Place place;                      ///< where the inner IO is
+    Place place;
     const QrStream* stream = nullptr; ///< the stream that reads an object; null outside objects
     ObjectForm form = ObjectForm::Binary;
     bool readText = false; ///< whether the last read was of text
@@ -126,9 +182,9 @@ struct QrObjectInBuffer::State {
         return stream ? stream->textKind() : QrStream::TextKind::Other;
     }
 
-    [[noreturn]] void fail(int line, int64 position, const std::string& what) {
+    [[noreturn]] void fail(int line, int64 begin, const std::string& what) {
         failed = true;
-        explanation = ObjectRecord::reason(position, what);
+        explanation = ObjectRecord::reason(place.position(begin), what);
         throw QrStreamEx::ExReadObject(source, line, explanation.c_str());
     }
 
@@ -139,43 +195,42 @@ struct QrObjectInBuffer::State {
     }
 
     /// Throws the exception of an object's code again, with the position of the object.
-    [[noreturn]] void failInside(int64 position, const ExBase& failure) {
-        fail(__LINE__, position,
+    [[noreturn]] void failInside(int64 begin, const ExBase& failure) {
+        fail(__LINE__, begin,
              std::string("inside the object that begins here: ") + failure.getReason());
     }
 
-    /// Reads the end mark. A message about a wrong one gives `position`, or without it the place of
+    /// Reads the end mark. A message about a wrong one gives `begin`, or without it the place of
     /// the mark.
-    void expectMark(QrStream& s, std::uint32_t number, const QrBufferedIO& io,
-                    std::optional<int64> position = {}) {
-        // The position of a binary mark, which has a fixed size, is determined after it: it may
-        // have to be asked for, and rarely is.
-        if (form != ObjectForm::Binary && !position)
-            position = place.of(io);
+    void expectMark(QrStream& s, std::uint32_t number, std::optional<int64> begin = {}) {
+        // The place of a binary mark, which has a fixed size, is determined after it: it may have
+        // to be asked for, and rarely is.
+        if (form != ObjectForm::Binary && !begin)
+            begin = place.now();
         std::uint32_t mark = 0;
         s >> mark;
         if (mark == ObjectRecord::endMark(number))
             return;
-        if (!position) {
-            const int64 end = place.of(io);
-            position = end < 0 ? end : end - int64{sizeof mark};
+        if (!begin) {
+            const int64 end = place.now();
+            begin = end < 0 ? end : end - int64{sizeof mark};
         }
-        fail(__LINE__, *position, "the object should end here and does not");
+        fail(__LINE__, *begin, "the object should end here and does not");
     }
 };
 
 QrObjectInBuffer::QrObjectInBuffer(QrCastable* io)
-    : QrCastImpl(io), state(std::make_unique<State>()) {}
+    : QrCastImpl(io), state(std::make_unique<State>(inner())) {}
 
 QrObjectInBuffer::~QrObjectInBuffer() = default;
 
 QrRef<QrCastable> QrObjectInBuffer::readObject(QrStream& s, const QrUid* id, const wchar_t*,
                                                const wchar_t*) {
     if (state->depth == 0)
-        state->place.forget(); // Between objects the program may use the inner IO by itself.
-    const int64 position = state->place.of(inner());
+        state->place.begin();
+    const int64 begin = state->place.now();
     if (state->failed)
-        state->fail(__LINE__, position, "an earlier object failed");
+        state->fail(__LINE__, begin, "an earlier object failed");
     // The object counts as failed until it is complete.
     struct Reading {
         State& state;
@@ -198,63 +253,61 @@ QrRef<QrCastable> QrObjectInBuffer::readObject(QrStream& s, const QrUid* id, con
 
     QrRef<QrCastable> object;
     try {
-        object = readRecord(s, position);
+        object = readRecord(s, begin);
     } catch (const QrStreamEx::ExReadObject& failure) {
         if (state->hasExplained(failure))
             throw;
-        state->failInside(position, failure);
+        state->failInside(begin, failure);
     } catch (const QrStreamEx& failure) {
-        state->failInside(position, failure);
+        state->failInside(begin, failure);
     } catch (const QrComponentManagerEx& failure) {
-        state->failInside(position, failure);
+        state->failInside(begin, failure);
     }
     if (object && id && !supports(*object, *id))
-        state->fail(__LINE__, position,
-                    "the object has not the interface " + ObjectRecord::text(*id));
+        state->fail(__LINE__, begin, "the object has not the interface " + ObjectRecord::text(*id));
     reading.complete = true;
     return object;
 }
 
-QrRef<QrCastable> QrObjectInBuffer::readRecord(QrStream& s, int64 position) {
+QrRef<QrCastable> QrObjectInBuffer::readRecord(QrStream& s, int64 begin) {
     std::uint32_t number = 0;
     s >> number;
     if (number > state->objects.size()) {
         if (number != state->objects.size() + 1)
-            state->fail(__LINE__, position, "no object begins here");
+            state->fail(__LINE__, begin, "no object begins here");
         if (state->depth > QrMaximumObjectDepth)
-            state->fail(__LINE__, position, "objects are nested too deeply");
-        return readNewObject(s, number, position);
+            state->fail(__LINE__, begin, "objects are nested too deeply");
+        return readNewObject(s, number, begin);
     }
     if (state->depth == 1)
-        state->expectMark(s, number, inner(), position);
+        state->expectMark(s, number, begin);
     return number == ObjectRecord::null ? nullptr : state->objects.at(number);
 }
 
-QrRef<QrCastable> QrObjectInBuffer::readNewObject(QrStream& s, std::uint32_t number,
-                                                  int64 position) {
+QrRef<QrCastable> QrObjectInBuffer::readNewObject(QrStream& s, std::uint32_t number, int64 begin) {
     const auto [classUid, version] = readClass(s);
     // Keeps the object alive while its code runs, whatever the code does with other references.
     const QrRef<QrCastable> object = QrGetComponentManager()->createObject(classUid);
     const QrPtr<QrPersistant> persistant = queryCast<QrPersistant>(object.get());
     if (!persistant)
-        state->fail(__LINE__, position,
+        state->fail(__LINE__, begin,
                     "no builder makes persistent objects of the class " +
                         ObjectRecord::text(classUid));
     if (!(*persistant->getClassUid() == classUid))
-        state->fail(__LINE__, position,
+        state->fail(__LINE__, begin,
                     "the builder of the class " + ObjectRecord::text(classUid) +
                         " makes objects of the class " +
                         ObjectRecord::text(*persistant->getClassUid()));
     if (persistant->getVersion() != version)
-        state->fail(__LINE__, position,
+        state->fail(__LINE__, begin,
                     "the class " + ObjectRecord::text(classUid) + " is stored in version " +
                         std::to_string(version) + " and known in version " +
                         std::to_string(persistant->getVersion()));
     const State::Objects::Entry entry(state->objects, QrRef<QrCastable>(object->getCastable()));
     persistant->read(s);
     if (state->failed)
-        state->fail(__LINE__, position, "an object inside this one failed");
-    state->expectMark(s, number, inner());
+        state->fail(__LINE__, begin, "an object inside this one failed");
+    state->expectMark(s, number);
     return state->objects.at(number);
 }
 
@@ -324,12 +377,12 @@ int QrObjectInBuffer::read(void* data, int size) {
                                           "binary data after text begins on a new line");
         state->readText = false;
     }
-    return state->place.advanceBy([&] { return inner().read(data, size); });
+    return state->place.advanceBy(size, [&] { return inner().read(data, size); });
 }
 
 int QrObjectInBuffer::read() {
     int byte = -1;
-    state->place.advanceBy([&] {
+    state->place.advanceBy(1, [&] {
         byte = inner().read();
         return byte < 0 ? 0 : 1;
     });
@@ -342,6 +395,7 @@ struct ObjectInputRelay {
         auto& objects = static_cast<QrObjectInBuffer&>(io);
         QrObjectInBuffer::State& state = *objects.state;
         state.readText = state.textKind() != QrStream::TextKind::Other;
+        state.place.expect(1);
         return &objects.inner();
     }
 

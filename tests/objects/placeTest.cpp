@@ -1,10 +1,10 @@
 // SPDX-License-Identifier: BSL-1.0
 // Tests that the positions in the reasons of failures, which are counted, are those that the medium
 // would have told, and that the medium is rarely asked.
-#include "tests/objects/support.h"
+#include "tests/objects/places.h"
+#include "tests/support/temporaryDirectory.h"
 
-#include <exception>
-#include <random>
+#include <fstream>
 #include <sstream>
 
 namespace {
@@ -13,76 +13,6 @@ using namespace Mz;
 using namespace Mz::Test;
 using testing::StartsWith;
 
-/// Counts nothing: a seek makes the IO ask for its position again. Streams take no short way past
-/// a derived class.
-class Asking final : public QrObjectInBuffer {
-  public:
-    using QrObjectInBuffer::QrObjectInBuffer;
-
-    int read(void* data, int size) override {
-        const int got = QrObjectInBuffer::read(data, size);
-        ask();
-        return got;
-    }
-    int read() override {
-        const int byte = QrObjectInBuffer::read();
-        ask();
-        return byte;
-    }
-
-  private:
-    // After a short read the position cannot be asked for, but was known.
-    void ask() {
-        if (inner().canSeek())
-            seek(0, 1);
-    }
-};
-
-template <class Stream>
-class Place : public ObjectsOn<Stream> {
-  protected:
-    /// Returns objects that contain others, with values of all forms between them.
-    static std::string randomObjects(std::mt19937& engine) {
-        const std::wstring letters = L"idbeoidbeoICBWICBW";
-        Saving<Stream> out;
-        for (int count = 0; count < 3; ++count) {
-            const QrPtr<Node> around = Objects::make(holderUid);
-            for (int links = 0; links < 3; ++links) {
-                const QrPtr<Node> spelled = Objects::make(spelledUid);
-                for (int length = 0; length < 6; ++length)
-                    spelled->name += letters[engine() % usable];
-                around->links.push_back(spelled);
-                around->links.push_back(Objects::node(links, {spelled}));
-            }
-            out.stream << 5 << around.get();
-        }
-        return out.bytes();
-    }
-
-    /// Reads all objects. Returns the number of those that could be read, and why the next could
-    /// not.
-    template <class IO>
-    static std::string outcome(const std::string& bytes) {
-        std::istringstream source(bytes);
-        QrInBuffer buffer(&source);
-        IO objects(&buffer);
-        Stream stream(&objects);
-        for (int count = 0;; ++count)
-            try {
-                int number = 0;
-                stream >> number;
-                unlink(queryCast<Node>(stream.readObject(nullptr, nullptr, nullptr).get()));
-            } catch (const ExBase& failure) {
-                return std::to_string(count) + ": " + failure.getReason();
-            } catch (const std::exception& failure) { // Of a builder.
-                return std::to_string(count) + ": " + failure.what();
-            }
-    }
-
-  private:
-    /// Text carries no array of characters.
-    static constexpr unsigned int usable = std::is_same_v<Stream, QrTextStream> ? 10 : 18;
-};
 TYPED_TEST_SUITE(Place, StreamKinds);
 
 TYPED_TEST(Place, IsTheOneThatTheMediumTells) {
@@ -91,20 +21,28 @@ TYPED_TEST(Place, IsTheOneThatTheMediumTells) {
     for (int round = 0; round < 300 && !testing::Test::HasFailure(); ++round) {
         const std::string whole = this->randomObjects(engine);
         for (int damage = 0; damage < 10; ++damage) {
-            std::string bytes = whole;
-            const std::size_t at = engine() % bytes.size();
-            if (damage % 5 == 0)
-                bytes.resize(at);
-            else if (std::is_same_v<TypeParam, QrBinaryStream>)
-                bytes[at] = static_cast<char>(engine());
-            else
-                bytes[at] = "0123456789 \n-x"[engine() % 14];
+            const std::string bytes = this->damaged(whole, damage % 5 == 0, engine);
             const std::string counted = this->template outcome<QrObjectInBuffer>(bytes);
-            EXPECT_EQ(counted, this->template outcome<Asking>(bytes)) << round << ' ' << at;
+            EXPECT_EQ(counted, this->template outcome<Asking>(bytes)) << round;
             told += counted.find(": byte ") != std::string::npos;
         }
     }
     EXPECT_GT(told, 1000);
+}
+
+TYPED_TEST(Place, IsTheOneThatAFileTells) {
+    const TemporaryDirectory folder;
+    const std::filesystem::path file = folder.path() / "objects";
+    std::mt19937 engine(20'262);
+    int told = 0;
+    for (int round = 0; round < 60 && !testing::Test::HasFailure(); ++round) {
+        const std::string whole = this->randomObjects(engine);
+        const std::string bytes = this->damaged(whole, round % 3 == 0, engine);
+        std::ofstream(file, std::ios::binary) << bytes;
+        for (const std::size_t held : {std::size_t{2}, std::size_t{40}, whole.size() / 2})
+            told += this->tellsTheSame(file, 0, held);
+    }
+    EXPECT_GT(told, 100);
 }
 
 TYPED_TEST(Place, IsAskedForAgainAfterTheProgramUsedTheInnerIO) {
