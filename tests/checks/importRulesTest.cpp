@@ -11,6 +11,8 @@
 
 #include <clocale>
 #include <limits>
+#include <string>
+#include <vector>
 
 using namespace Mz;
 using namespace Mz::Tools;

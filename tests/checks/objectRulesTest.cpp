@@ -6,7 +6,13 @@
 #include "components/componentTools/checking/checkObjects.h"
 #include "tests/support/temporaryDirectory.h"
 
+#include <atomic>
+#include <functional>
 #include <memory>
+#include <optional>
+#include <stdexcept>
+#include <string>
+#include <vector>
 
 using namespace Mz;
 using namespace Mz::Tools;

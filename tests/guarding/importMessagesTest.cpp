@@ -12,6 +12,8 @@
 
 #include <functional>
 #include <limits>
+#include <optional>
+#include <string>
 
 using namespace Mz;
 using namespace Mz::Tools;
