@@ -72,11 +72,15 @@ TEST(ProfileMessages, ThatAreInvalidAreNotUsed) {
           frameOf(kind, R"({"kind":"stage","stage":1e300})"),
           frameOf(kind, R"({"kind":"begin","index":0.5})"),
           frameOf(kind, R"({"kind":"others","count":1e300,"time":1})"),
-          frameOf(kind, R"({"kind":"listing","time":"1"})"), frameOf(0, R"({"kind":"begin"})")}) {
+          frameOf(kind, R"({"kind":"listing","time":"1"})"), frameOf(0, R"({"kind":"begin"})"),
+          frameOf(kind, R"({"kind":"fault","verdict":"unknown","subject":"","words":""})"),
+          frameOf(kind, R"({"kind":"steps","index":0,"times":[1,2,3,4],)"
+                        R"("verdict":"works","subject":"","words":""})")}) {
         const ProfileReport report = decodeProfileReport(invalid + encodeListing(1ns), 2);
         EXPECT_TRUE(report.garbled) << invalid;
         EXPECT_FALSE(report.done) << invalid;
         EXPECT_TRUE(report.libraries.empty()) << invalid;
+        EXPECT_FALSE(report.fault) << invalid;
     }
 }
 
