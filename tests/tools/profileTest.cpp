@@ -380,6 +380,16 @@ TEST(ProfileChart, HasABarForEachLibraryAndPhase) {
     EXPECT_THAT(chart, HasSubstr("39.0 ms"));
 }
 
+TEST(ProfileChart, ShortensLongNamesAndLeavesOutWhatWasNotMeasured) {
+    const std::string longest = "abcdefghijklmnopqrstuvwxyz0123456789"; // 36 characters.
+    StartProfile profile = profileOf({longest, longest + ".so", "left.so"});
+    profile.libraries[2].measured = false;
+    const std::string chart = chartOf(profile);
+    EXPECT_THAT(chart, HasSubstr(">" + longest + "<"));
+    EXPECT_THAT(chart, HasSubstr(">" + longest.substr(0, 35) + "\xE2\x80\xA6<"));
+    EXPECT_THAT(chart, Not(HasSubstr("left.so")));
+}
+
 TEST(ProfileChart, AddsUpTheLibrariesBehindTheFortieth) {
     std::vector<std::filesystem::path> names;
     for (int index = 0; index < 50; ++index)

@@ -559,6 +559,15 @@ TEST_F(FileImporter, SearchesItsDefaultAfterTheCallersPath) {
     EXPECT_FALSE(found);
 }
 
+TEST_F(FileImporter, CanBeCopied) {
+    importer.defaultSearch = more;
+    const TestImporter copy(importer);
+    EXPECT_EQ(copy.getDefaultSearch(), std::wstring(more));
+    TestImporter assigned;
+    assigned = importer;
+    EXPECT_EQ(assigned.getDefaultSearch(), std::wstring(more));
+}
+
 TEST_F(FileImporter, HasNoDefaultSearchByItself) {
     EXPECT_EQ(importer.QrBaseImporter::getDefaultSearch(), nullptr);
 }
