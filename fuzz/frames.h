@@ -16,11 +16,16 @@ inline std::string arriving(Input& input, bool framed) {
     if (!framed)
         return std::string(input.rest());
     std::string bytes;
-    for (std::string_view kind; !(kind = input.take(1)).empty();) {
+    std::size_t count = 0;
+    for (std::string_view kind; !(kind = input.take(1)).empty(); ++count) {
         std::size_t size = input.byte() << 8;
         size += input.byte();
         bytes += Tools::frameOf(static_cast<unsigned char>(kind[0]), input.take(size));
     }
+    Tools::FrameReader frames(bytes);
+    while (frames.next())
+        --count;
+    expect(count == 0 && frames.remaining() == 0, "each message in a right frame is read");
     return bytes;
 }
 

@@ -1,8 +1,8 @@
 // SPDX-License-Identifier: BSL-1.0
 // Imports mesh files of every format by their content alone, and stores and loads every mesh. Also
-// loads any bytes as a stored mesh.
+// loads any bytes as a stored mesh, and stored meshes whose faces have any corners.
 //
-// Input: the format, the file.
+// Input: the format, the file; or a choice of the last two kinds, and the bytes of that mesh.
 #include "components/componentManager/binaryStream.h"
 #include "components/componentManager/processControl.h"
 #include "components/componentManager/textStream.h"
@@ -72,6 +72,32 @@ void readStored(std::string_view content) {
     expectPromises(mesh);
 }
 
+/// Returns a stored mesh: three counts of vertices, texture coordinates and normals; then, for each
+/// face, the number of its corners, and what each refers to. Each of them is one byte; 255 refers to
+/// nothing. Random bytes rarely have indices that are just beyond a list.
+std::string storedMesh(Fuzz::Input& input) {
+    std::ostringstream store;
+    QrOutBuffer io(&store);
+    QrBinaryStream stream(&io);
+    for (const int values : {3, 2, 3}) { // Of a vertex, a texture coordinate, a normal.
+        const unsigned int count = input.byte() % 8;
+        stream << count;
+        for (unsigned int value = 0; value < count * static_cast<unsigned int>(values); ++value)
+            stream << static_cast<float>(value);
+    }
+    const unsigned int faces = input.byte() % 8;
+    stream << faces;
+    for (unsigned int face = 0; face < faces; ++face) {
+        const unsigned int corners = input.byte() % 8;
+        stream << corners;
+        for (unsigned int reference = 0; reference < 3 * corners; ++reference) {
+            const unsigned int index = input.byte();
+            stream << (index == 255 ? Mesh::absent : index);
+        }
+    }
+    return store.str();
+}
+
 } // namespace
 
 int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
@@ -83,9 +109,9 @@ int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
     QrSetSystemProcessController(nullptr); // Errors are not reported.
 
     Fuzz::Input input(data, size);
-    const unsigned int which = input.byte() % 5;
-    if (which == 4) {
-        readStored(input.rest());
+    const unsigned int which = input.byte() % 6;
+    if (which >= 4) {
+        readStored(which == 4 ? input.rest() : storedMesh(input));
         return 0;
     }
     const QrRef<QrCastable> object = importBy(*formats[which], input.rest());

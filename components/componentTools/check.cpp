@@ -95,6 +95,15 @@ std::wstring endingOf(const System::ChildResult& child, const CheckReport& repor
     return L"ends the process, with status " + std::to_wstring(child.status);
 }
 
+/// Returns what ended a process, and how, without a full stop.
+std::wstring sentenceOnEnd(const System::ChildResult& child, const CheckReport& report,
+                           const ProbeOptions& limits) {
+    std::wstring sentence = report.activity.what;
+    if (sentence.empty())
+        sentence = L"the library";
+    return sentence + L" " + endingOf(child, report, limits);
+}
+
 /// The check of one library.
 class CheckRun {
   public:
@@ -126,7 +135,7 @@ class CheckRun {
   private:
     bool isWanted(const char* id) const { return wanted.rule.empty() || wanted.rule == id; }
 
-    void add(const char* rule, const std::wstring& place, const std::wstring& sentence,
+    void add(std::string_view rule, const std::wstring& place, const std::wstring& sentence,
              const std::string& reproduce = {}) {
         add({findCheckRule(rule), place, sentence, reproduce});
     }
@@ -155,9 +164,11 @@ class CheckRun {
     }
 
     void addVerdict(const Finding& verdict) {
-        const std::wstring cure = cureOf(verdict);
+        std::wstring sentence = sentenceOf(verdict) + L".";
+        if (const std::wstring cure = cureOf(verdict); !cure.empty())
+            sentence += L" To solve this, " + cure + L".";
         add(verdict.verdict == Verdict::needsHost ? "library-host" : "library-is-component", {},
-            sentenceOf(verdict) + L"." + (cure.empty() ? L"" : L" To solve this, " + cure + L"."));
+            sentence);
     }
 
     /// How a process ended, and what it sent.
@@ -252,18 +263,19 @@ class CheckRun {
 
     /// After a process that ended early: reports that, and removes from the task what was checked.
     bool takeEnd(const System::ChildResult& child, const CheckReport& report) {
-        const std::string rule = report.rule.empty() ? loadsRule : report.rule;
+        std::string rule = report.rule;
+        if (rule.empty())
+            rule = loadsRule;
         const CheckActivity& activity = report.activity;
-        const std::wstring what = activity.what.empty() ? L"the library" : activity.what;
-        std::wstring sentence = what + L" " + endingOf(child, report, options.process);
+        std::wstring sentence = sentenceOnEnd(child, report, options.process);
         if (!activity.detail.empty())
             sentence += L", with " + activity.detail;
-        add(rule.c_str(), activity.place,
-            sentence + L". Repeat it in a debugger, with --in-process.", activity.reproduce);
+        add(rule, activity.place, sentence + L". Repeat it in a debugger, with --in-process.",
+            activity.reproduce);
         const auto ended = std::find(task.rules.begin(), task.rules.end(), rule);
         const bool progress = !activity.key.empty() && task.avoided.insert(activity.key).second;
-        task.rules.erase(task.rules.begin(),
-                         progress || ended == task.rules.end() ? ended : std::next(ended));
+        const bool repeats = progress || ended == task.rules.end();
+        task.rules.erase(task.rules.begin(), ended + (repeats ? 0 : 1));
         fatal = fatal || rule == loadsRule || rule == answersRule;
         return !fatal;
     }
@@ -369,13 +381,10 @@ class CheckRun {
         if (result.interrupted)
             return;
         const CheckReport& report = changed.report;
-        if (!report.done) {
-            const std::wstring what =
-                report.activity.what.empty() ? L"the library" : report.activity.what;
+        if (!report.done)
             return add(change.rule, report.activity.place,
-                       what + L" " + endingOf(changed.child, report, options.process) + L", " +
+                       sentenceOnEnd(changed.child, report, options.process) + L", " +
                            change.where + L". " + change.remedy);
-        }
         const auto differs = [&](const auto& answer) {
             const auto other = report.answers.find(answer.first);
             return other == report.answers.end() || other->second != answer.second;

@@ -78,8 +78,10 @@ std::optional<std::wstring> missingClass(const std::vector<QrUid>& classes) {
 
 std::wstring seconds(std::chrono::milliseconds time) {
     const auto tenths = time.count() / 100;
-    const std::wstring whole = std::to_wstring(tenths / 10);
-    return tenths % 10 ? whole + L"." + std::to_wstring(tenths % 10) : whole;
+    std::wstring text = std::to_wstring(tenths / 10);
+    if (tenths % 10)
+        text += L"." + std::to_wstring(tenths % 10);
+    return text;
 }
 
 /// Returns the outcome of a process whose conversation is over, completed by its use of memory.
@@ -298,15 +300,12 @@ std::wstring GuardedImport::sentence() const {
 std::wstring GuardedImport::reason() const {
     std::wstring text;
     for (const wchar_t* rest = Tools::textFor(verdict).sentence; *rest; ++rest) {
-        if (rest[0] == L'%' && rest[1] == L'a')
-            text += activity.empty() ? L"the start of the process" : activity;
-        else if (rest[0] == L'%' && rest[1] == L'd')
-            text += detail;
-        else {
+        if (*rest != L'%')
             text += *rest;
-            continue;
-        }
-        ++rest;
+        else if (*++rest == L'd')
+            text += detail;
+        else
+            text += activity.empty() ? std::wstring_view(L"the start of the process") : activity;
     }
     return text;
 }

@@ -15,6 +15,7 @@
 
 #include <algorithm>
 #include <cstdint>
+#include <istream>
 #include <iterator>
 #include <memory>
 #include <optional>
@@ -83,11 +84,12 @@ int readTextBool(QrBufferedIO& io, wchar_t* digit) {
 /// there is no answer. They are negative if they are not known.
 class Place {
   public:
-    explicit Place(const QrBufferedIO& inner) : io(inner) {}
+    explicit Place(const QrBufferedIO& inner)
+        : io(inner), stream(StandardStreams::inputUnderForLibraries(inner)) {}
 
     /// An outermost object begins. Between objects the program may use the inner IO by itself.
     void begin() {
-        unasked = ByteSource(io).isFree();
+        unasked = holds(0);
         known = unasked;
         place = 0;
         origin = 0;
@@ -142,8 +144,11 @@ class Place {
         return position < 0 || from < 0 ? -1 : position - from;
     }
 
+    /// Returns whether a buffer of the standard library holds the next `size` bytes.
     bool holds(int size) const {
-        const ByteSource source(io);
+        if (!stream)
+            return false;
+        const ByteSource source(*stream);
         return source.isFree() && static_cast<int64>(source.held().size()) >= size;
     }
 
@@ -156,6 +161,7 @@ class Place {
     }
 
     const QrBufferedIO& io;
+    std::istream* const stream; ///< under `io`, if that is exactly a `QrInBuffer`
     int64 place = -1;
     int64 origin = 0;     ///< the position from which places are counted
     bool known = false;   ///< whether `place` is the current one

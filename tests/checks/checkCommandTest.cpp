@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
 /// The command `check`, as people, scripts and build servers use it.
+#include "components/componentTools/check.h"
 #include "tests/tools/toolsFixture.h"
 
 #include <algorithm>
@@ -36,6 +37,18 @@ TEST_F(CheckCommand, EndsWithZeroForAGoodLibrary) {
     const ProgramResult result = run({library(L"goodWithKit", L"goodWithKit")});
     EXPECT_EQ(result.exitCode, 0) << result.output;
     EXPECT_EQ(result.output, "1 library: 0 errors, 0 warnings, 0 notes\n");
+}
+
+TEST(CheckedLibraries, AreNamedIfTheProcessEndsBeforeItsFirstRule) {
+    Tools::CheckOptions options;
+    options.process.program =
+        buildFolder / "bin" / (std::wstring(L"mzcomponents") + MZ_PROGRAM_EXTENSION);
+    const Tools::CheckResult result = Tools::checkLibrary(builtComponent(L"goodWithKit"), options);
+    ASSERT_EQ(result.findings.size(), 1u);
+    EXPECT_STREQ(result.findings[0].rule->id, "library-loads");
+    EXPECT_EQ(result.findings[0].sentence, L"the library ends the process, with status 2. Repeat "
+                                           L"it in a debugger, with --in-process.");
+    EXPECT_FALSE(result.notRun.empty());
 }
 
 TEST_F(CheckCommand, TakesOneSampleForEachOption) {

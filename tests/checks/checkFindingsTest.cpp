@@ -131,6 +131,9 @@ TEST(CheckFindsExactly, WhatDependsOnTheSurroundings) {
                         end +
                         ", binary. Initialise every variable, and write no addresses, times or "
                         "random values."));
+    const CheckResult ofInput = check(L"differsAlways", optionsFor("surroundings-input"));
+    EXPECT_THAT(rulesOf(ofInput), ElementsAre("surroundings-input"))
+        << "what differs from process to process is the finding of another rule";
     EXPECT_THAT(linesOf(check(L"needsInputToDescribe", optionsFor("surroundings-input"))),
                 ElementsAre("error surroundings-input: : the answer changes without standard "
                             "input: createObject of the builder \"broken\" (5E1D0001" +
@@ -169,6 +172,14 @@ TEST(CheckFindsExactly, HowAProcessEnded) {
             << toUtf8(writes);
 }
 
+TEST(CheckFindsExactly, AProcessThatTakesTooLong) {
+    CheckOptions hasty = options();
+    hasty.process.timeLimit = std::chrono::milliseconds(300);
+    EXPECT_THAT(linesOf(checkLibrary(builtComponent(L"loopsForever"), hasty)),
+                ElementsAre(EndsWith(" does not return within 1 second. Repeat it in a debugger, "
+                                     "with --in-process.")));
+}
+
 TEST(CheckFindings, OfRandomInputComeAfterTheFixedInput) {
     CheckOptions checked = optionsFor("import-survives");
     EXPECT_THAT(check(L"importsOften", checked).findings, IsEmpty());
@@ -200,6 +211,12 @@ TEST(CheckFindings, OfThreadsNeedABuilder) {
     EXPECT_THAT(rulesOf(result), ElementsAre("builder-made")) << textOf(result);
 }
 
+TEST(CheckFindings, NameNoRemedyIfThereIsNone) {
+    const TemporaryDirectory folder;
+    EXPECT_THAT(linesOf(checkLibrary(folder.write("text", "no library"), options())),
+                ElementsAre("error library-is-component: : it is no library."));
+}
+
 TEST(CheckedLibraries, AreNotJudgedIfTheProcessCannotBeStarted) {
     CheckOptions checked = options();
     checked.process.program = buildFolder / "missing";
@@ -208,6 +225,21 @@ TEST(CheckedLibraries, AreNotJudgedIfTheProcessCannotBeStarted) {
         FAIL() << "a result without a process";
     } catch (const std::runtime_error& failure) {
         EXPECT_THAT(failure.what(), StartsWith("the process of the check could not be started: "));
+    }
+}
+
+/// Each survey of the library is a process of its own.
+TEST(CheckedLibraries, AreNotComparedIfTheUserInterrupts) {
+    for (const int last : {3, 4}) {
+        int started = 0;
+        CheckOptions checked = optionsFor("surroundings-input");
+        checked.process.interrupted = [&] {
+            started += hasChildProcess() ? 0 : 1;
+            return started > last - 1;
+        };
+        const CheckResult result = check(L"needsInputToDescribe", checked);
+        EXPECT_TRUE(result.interrupted) << last;
+        EXPECT_THAT(result.findings, IsEmpty()) << textOf(result);
     }
 }
 

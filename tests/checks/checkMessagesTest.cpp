@@ -55,6 +55,21 @@ TEST(CheckMessages, AreNotBelievedAfterAnInvalidOne) {
     }
 }
 
+TEST(CheckMessages, OfOtherVersionsAreSkipped) {
+    constexpr unsigned char kind = 64;
+    CheckReport report;
+    std::string bytes =
+        frameOf(kind, R"({"kind": "a new kind"})") +
+        frameOf(kind, R"({"kind": "finding", "rule": "no-such-rule", "place": "", "sentence": "",
+                          "reproduce": "", "missingClass": [0, 0, 0, 0]})") +
+        messagesWithAFinding();
+    decodeReport(bytes, report);
+    EXPECT_FALSE(report.garbled);
+    ASSERT_EQ(report.findings.size(), 1u);
+    EXPECT_EQ(report.findings[0].rule, findCheckRule("extension-form"));
+    EXPECT_FALSE(report.done);
+}
+
 /// Returns the exit status of the process; -1 if it did not exit by itself or said something.
 int statusFor(std::vector<std::filesystem::path> arguments) {
     arguments.insert(arguments.begin(), checkArgument);

@@ -141,6 +141,18 @@ TEST(CheckedLibraries, ThatShareAUidAreFoundTogether) {
     EXPECT_THAT(toUtf8(results[0].findings[0].sentence), HasSubstr("sharesUidSecond"));
 }
 
+TEST(CheckedLibraries, ShareNoUidThatIsNil) {
+    CheckResult nil, other;
+    nil.builders = {{QrUid{}, L"nil"}, {{1, 2, 3, 4}, L"shared"}};
+    other.builders = {{{1, 2, 3, 4}, L"taken"}, {QrUid{}, L"nil, too"}};
+    std::vector<CheckResult> results{nil, other};
+    compareLibraries(results);
+    ASSERT_EQ(results[0].findings.size(), 1u) << textOf(results[0]);
+    EXPECT_THAT(toUtf8(results[0].findings[0].place), HasSubstr("\"shared\""));
+    ASSERT_EQ(results[1].findings.size(), 1u) << textOf(results[1]);
+    EXPECT_THAT(toUtf8(results[1].findings[0].place), HasSubstr("\"taken\""));
+}
+
 TEST(CheckedLibraries, WithThousandsOfBuildersAreChecked) {
     CheckOptions one = options(60);
     one.reproduce = "builder-made";
@@ -173,7 +185,12 @@ TEST(CheckFindings, OfOneRuleAreFoundAlone) {
     one.reproduce = "extension-case";
     EXPECT_THAT(checkLibrary(builtComponent(L"dotInExtension", L"checks"), one).findings,
                 IsEmpty());
-    for (const char* wrong : {"no-such-rule", "import-survives:1", "import-survives:x:0:1"}) {
+    EXPECT_THAT(rulesOf(checkLibrary(builtComponent(L"nullDescription"), one)),
+                ElementsAre("description-answers"))
+        << "nothing can be checked then";
+    for (const char* wrong :
+         {"no-such-rule", "import-survives:1", "import-survives:x:0:1", "import-survives:0x:0:1",
+          "import-survives:0:-2:1", "import-survives:0:0:x"}) {
         one.reproduce = wrong;
         EXPECT_THROW(checkLibrary(builtComponent(L"goodWithKit"), one), std::invalid_argument);
     }

@@ -3,6 +3,9 @@
 /// caller's controller receives.
 #include "tests/guarding/guardingFixture.h"
 
+#include "components/componentManager/utf8.h"
+
+#include <algorithm>
 #include <clocale>
 
 using namespace Mz;
@@ -49,8 +52,21 @@ TEST_F(Guarding, RelaysProgressAHundredTimesASecond) {
     const GuardedImport import = this->import("importing hurry");
     ASSERT_EQ(import.verdict, ImportVerdict::imported);
     const auto milliseconds = std::stoul(parcelOf(import)->text);
-    EXPECT_GE(controller.notes.size(), 1u);
-    EXPECT_LE(controller.notes.size(), milliseconds / 10 + 2);
+    for (const wchar_t* report : {L"progress", L"status"}) {
+        const auto count = static_cast<unsigned long>(
+            std::count_if(controller.notes.begin(), controller.notes.end(),
+                          [&](const std::wstring& note) { return note.starts_with(report); }));
+        EXPECT_GE(count, 2u) << toUtf8(report);
+        EXPECT_LE(count, milliseconds / 10 + 2) << toUtf8(report);
+    }
+}
+
+TEST_F(Guarding, NeedsNoController) {
+    QrSetSystemProcessController(nullptr);
+    EXPECT_EQ(import("importing null").verdict, ImportVerdict::gaveNothing);
+    limits.time = std::chrono::milliseconds(300);
+    EXPECT_EQ(import("importing hang").verdict, ImportVerdict::timedOut);
+    EXPECT_TRUE(controller.notes.empty());
 }
 
 TEST_F(Guarding, PassesTheAbortOfTheImporterToTheCaller) {
@@ -61,6 +77,22 @@ TEST_F(Guarding, PassesTheAbortOfTheImporterToTheCaller) {
 TEST_F(Guarding, StopsWhenTheUserInterrupts) {
     controller.interrupted = true;
     EXPECT_EQ(import("importing hang").verdict, ImportVerdict::interrupted);
+}
+
+TEST_F(Guarding, CountsTheTimeInTenthsOfASecond) {
+    limits.time = std::chrono::milliseconds(345);
+    const GuardedImport import = this->import("importing hang");
+    EXPECT_EQ(import.verdict, ImportVerdict::timedOut);
+    EXPECT_EQ(import.detail, L"0.3");
+}
+
+TEST_F(Guarding, SearchesTheFoldersOfTheCaller) {
+    const TemporaryDirectory empty;
+    limits.searchPath = searchPathOf(empty.path());
+    EXPECT_EQ(import("importing null").verdict, ImportVerdict::notTaken);
+    limits.searchPath =
+        searchPathOf(std::filesystem::path(MZ_BUILD_PATH) / "components" / "hostile");
+    EXPECT_EQ(import("importing null").verdict, ImportVerdict::gaveNothing);
 }
 
 TEST_F(Guarding, HasTheLocaleOfTheHost) {
@@ -172,6 +204,8 @@ TEST_F(Guarding, DescribesEachVerdict) {
         EXPECT_TRUE(number == static_cast<int>(ImportVerdict::guardFailed) ||
                     nameOf(import.verdict) != std::string("guardFailed"));
     }
+    EXPECT_STREQ(nameOf(static_cast<ImportVerdict>(1000)), "guardFailed")
+        << "a verdict of a later version";
     GuardedImport import;
     import.verdict = ImportVerdict::crashed;
     import.file = "a.obj";
@@ -179,6 +213,8 @@ TEST_F(Guarding, DescribesEachVerdict) {
     import.detail = L"a breakpoint";
     EXPECT_EQ(import.sentence(), L"a.obj: the import by \"OBJ\" crashed: a breakpoint. The host is "
                                  L"not affected. Report it to the author of the importer.");
+    import.activity.clear();
+    EXPECT_THAT(import.reason(), ::testing::StartsWith(L"the start of the process crashed: "));
 }
 
 } // namespace

@@ -3,6 +3,7 @@
 /// started as it should be.
 #include "components/componentTools/guarding/importChild.h"
 #include "components/componentManager/componentImp.h"
+#include "components/componentManager/utf8.h"
 #include "components/componentTools/guardedImport.h"
 #include "components/componentTools/guarding/importMessages.h"
 #include "components/componentTools/platform/system.h"
@@ -11,6 +12,7 @@
 
 #include <gtest/gtest.h>
 
+#include <clocale>
 #include <filesystem>
 
 using namespace Mz;
@@ -54,6 +56,19 @@ TEST(GuardedImport, StartsNoProcessForAManagerWithoutLibraries) {
     const Kit::GuardedImport import = Kit::importGuarded("file", limits);
     EXPECT_EQ(import.verdict, Kit::ImportVerdict::notTaken);
     EXPECT_EQ(import.sentence(), L"file: no import builder takes this file.");
+}
+
+TEST(GuardedImport, SaysThatTheLocaleCannotRepresentTheRecords) {
+    const Mz::Test::TemporaryDirectory folder;
+    const std::wstring name = std::wstring(L"wideTexts") + MZ_LIBRARY_EXTENSION;
+    std::filesystem::copy_file(std::filesystem::path(MZ_BUILD_PATH) / "components" / "sound" / name,
+                               folder.path() / name);
+    ASSERT_TRUE(std::setlocale(LC_ALL, "C"));
+    QrGetComponentManager()->initialize(Mz::Test::searchPathOf(folder.path()).c_str());
+    const Kit::GuardedImport import = Kit::importGuarded("file");
+    EXPECT_EQ(import.verdict, Kit::ImportVerdict::guardFailed);
+    EXPECT_TRUE(import.detail.starts_with(L"the records of the component manager: "))
+        << toUtf8(import.detail);
 }
 
 } // namespace

@@ -1,16 +1,25 @@
 // SPDX-License-Identifier: BSL-1.0
 /// Tests the messages between the processes of a guarded import, and the state that they lead to.
+#include "components/componentManager/importBuilder.h"
+#include "components/componentManager/persistant.h"
+#include "components/componentManager/utf8.h"
 #include "components/componentTools/guarding/importConversation.h"
+#include "components/componentTools/guarding/storedObject.h"
 #include "components/componentTools/probing/frames.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include <functional>
 #include <limits>
+#include <optional>
+#include <string>
 
 using namespace Mz;
 using namespace Mz::Tools;
 using Kit::ImportVerdict;
+using ::testing::AllOf;
+using ::testing::HasSubstr;
 
 namespace {
 
@@ -106,6 +115,81 @@ TEST(ImportConversation, WaitsForTheRestOfAMessage) {
     EXPECT_TRUE(conversation.isOver());
     EXPECT_EQ(conversation.activity, L"the import");
     EXPECT_EQ(conversation.outcome().verdict, ImportVerdict::notTaken);
+}
+
+TEST(ImportConversation, EndsAtTextsAndMessagesThatAreTooLong) {
+    const Kit::ImportLimits limits;
+    const std::wstring longest(longestText, L'x'), tooLong = longest + L'x';
+    const auto verdictOn = [&](std::string bytes) -> std::optional<ImportVerdict> {
+        ImportConversation conversation(nullptr, limits);
+        std::string replies;
+        conversation.receive(bytes, replies);
+        if (!conversation.isOver())
+            return std::nullopt;
+        return conversation.outcome().verdict;
+    };
+    EXPECT_EQ(verdictOn(encodeActivity(longest)), std::nullopt);
+    EXPECT_EQ(verdictOn(encodeActivity(tooLong)), ImportVerdict::garbled);
+    EXPECT_EQ(verdictOn(encode(ImportOutcome{ImportVerdict::threw, longest})),
+              ImportVerdict::threw);
+    EXPECT_EQ(verdictOn(encode(ImportOutcome{ImportVerdict::threw, tooLong})),
+              ImportVerdict::garbled);
+    const auto object = static_cast<unsigned char>(ImportKind::object);
+    EXPECT_EQ(verdictOn(frameOf(object, std::string(largestPayload, 'x'))), std::nullopt);
+    EXPECT_EQ(verdictOn(frameOf(object, std::string(largestPayload + 1, 'x'))),
+              ImportVerdict::garbled);
+}
+
+TEST(ImportMessages, OfNoCharacterAreRejected) {
+    std::string payload = payloadOf(encodeActivity(L"a"));
+    ASSERT_EQ(decodeActivity(payload), std::optional<std::wstring>(L"a"));
+    payload.replace(4, 4, "\xFF\xFF\xFF\xFF");
+    EXPECT_EQ(decodeActivity(payload), std::nullopt);
+}
+
+/// Stores itself as the test says.
+class Storing final : public QrCastImpl<Storing, QrPersistant> {
+  public:
+    explicit Storing(std::function<void(QrStream&)> written) : action(std::move(written)) {}
+    const QrUid* getClassUid() const override { return &classUid; }
+    unsigned int getVersion() const override { return 1; }
+    void write(QrStream& stream) override { action(stream); }
+    void read(QrStream&) override {}
+
+  private:
+    static constexpr QrUid classUid{1, 2, 3, 4};
+    std::function<void(QrStream&)> action;
+};
+
+/// Does not store itself.
+class Fleeting final : public QrCastImpl<Fleeting, QrImportBuilder> {
+  public:
+    QrEnum::Action enumerateExtensions(QrEnumerator<const wchar_t*>&) const override { return {}; }
+    bool canImport(QrPtr<QrBufferedIO>, const wchar_t*, const wchar_t*) const override {
+        return false;
+    }
+    QrRef<QrCastable> import(QrPtr<QrBufferedIO>, const wchar_t*, const wchar_t*) const override {
+        return nullptr;
+    }
+};
+
+TEST(StoredObjects, AreRefusedIfTheyCannotComeBack) {
+    std::string bytes;
+    const Fleeting fleeting;
+    const ImportOutcome notPersistent = storeObject(&fleeting, bytes);
+    EXPECT_EQ(notPersistent.verdict, ImportVerdict::notPersistent);
+    EXPECT_THAT(toUtf8(notPersistent.detail), HasSubstr("Fleeting"));
+    const Storing unknown([](QrStream&) {});
+    const ImportOutcome unknownClass = storeObject(&unknown, bytes);
+    EXPECT_EQ(unknownClass.verdict, ImportVerdict::unknownClass);
+    EXPECT_THAT(toUtf8(unknownClass.detail),
+                AllOf(HasSubstr("Storing"), HasSubstr(" (00000001-00000002-00000003-00000004)")));
+    EXPECT_EQ(bytes, "");
+    EXPECT_EQ(storeObject(nullptr, bytes).verdict, ImportVerdict::imported);
+    QrRef<QrCastable> object;
+    EXPECT_EQ(restoreObject(bytes, {}, object).detail,
+              L"there is no object: Error loading object.");
+    EXPECT_EQ(restoreObject("", {}, object).verdict, ImportVerdict::answerRejected);
 }
 
 TEST(ImportConversation, EndsWhenTheImporterGivesUp) {

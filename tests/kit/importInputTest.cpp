@@ -69,6 +69,18 @@ TEST(KitImportInput, IsNoOutputAndHasNoPositionBeforeItsBegin) {
     EXPECT_EQ(buffer.sgetc(), std::streambuf::traits_type::to_int_type(bytes[0]));
 }
 
+TEST(KitImportInput, GoesBackToTheBlockBefore) {
+    constexpr std::size_t block = 16 * 1024;
+    const std::string bytes = someBytes(block + 10);
+    ImportLimits limits({}, {});
+    LimitedInput buffer(sourceOf(bytes), bytes.size(), limits);
+    using Traits = std::streambuf::traits_type;
+    buffer.pubseekpos(block, std::ios::in);
+    EXPECT_EQ(buffer.sgetc(), Traits::to_int_type(bytes[block]));
+    EXPECT_EQ(buffer.sungetc(), Traits::not_eof(Traits::eof())) << "whatever byte is there";
+    EXPECT_EQ(buffer.sgetc(), Traits::to_int_type(bytes[block - 1]));
+}
+
 TEST(KitImportInput, BehavesLikeAFile) {
     for (const int size : {0, 1, 100, 16 * 1024, 16 * 1024 + 1, 50'000}) {
         const std::string bytes = someBytes(static_cast<std::size_t>(size));

@@ -497,6 +497,41 @@ TEST(KitImportController, PassesEverythingOn) {
     EXPECT_EQ(controller.takeErrors(), L"");
 }
 
+TEST(KitImportController, PassesOnWhatTheHostAnswers) {
+    class Host final : public Log {
+      public:
+        bool warning(int, const wchar_t*) override { return answer; }
+        bool isProgressShown() override { return answer; }
+        bool isStatusShown() override { return answer; }
+        bool error(int, const wchar_t*) override { return answer; }
+        bool isErrorShown() override { return answer; }
+        std::wstring findFile(const wchar_t*, const wchar_t*, const wchar_t*) override {
+            return noName;
+        }
+        bool answer = false;
+        std::wstring noName = L"a name that no file has: \xD800";
+    } host;
+    Kit::ImportPolicy policy;
+    policy.companions = Kit::Companions::anywhere;
+    Kit::detail::ImportLimits limits(0, {});
+    std::vector<Kit::CompanionReport> companions;
+    const std::wstring file;
+    Kit::detail::ImportController controller(&host, policy, limits, file, companions);
+    for (const bool answer : {false, true}) {
+        host.answer = answer;
+        EXPECT_EQ(controller.warning(0, L"w"), answer);
+        EXPECT_EQ(controller.isProgressShown(), answer);
+        EXPECT_EQ(controller.isStatusShown(), answer);
+        EXPECT_EQ(controller.error(0, L"e"), answer);
+        EXPECT_EQ(controller.isErrorShown(), answer);
+    }
+    EXPECT_EQ(controller.findFile(L"x.m", nullptr, nullptr), host.noName);
+    const Kit::ControllerScope scope(host, Kit::ControllerScope::thread);
+    const Kit::ImportResult result = Kit::importFile(L"script", "x.a");
+    EXPECT_EQ(result.end, Kit::ImportEnd::notOpened);
+    EXPECT_EQ(result.file, host.noName);
+}
+
 TEST(KitImportController, AnswersByItselfIfTheHostHasNone) {
     Kit::ImportPolicy policy;
     Kit::detail::ImportLimits limits({}, {});
@@ -608,6 +643,9 @@ TEST(KitImportTexts, DifferForEachEndAndAnswer) {
     for (int answer = 0; answer <= static_cast<int>(Answer::took); ++answer)
         ++texts[Kit::describe(static_cast<Answer>(answer))];
     EXPECT_EQ(texts.size(), 8U);
+    // Of a later version.
+    EXPECT_STREQ(Kit::describe(static_cast<Kit::ImportEnd>(100)), L"no builder accepted it");
+    EXPECT_STREQ(Kit::describe(static_cast<Answer>(100)), L"took it");
 }
 
 } // namespace

@@ -33,6 +33,54 @@ TEST(Inspection, NamesTheSystemOfALibraryForAnother) {
     EXPECT_EQ(finding.subject, elf ? L"Windows" : L"Linux");
 }
 
+TEST(Inspection, TakesAnObjectFileForNoLibrary) {
+    const TemporaryDirectory folder;
+    std::string content = elfLibrary({});
+    content[16] = 1; // Not linked yet.
+    LibraryImage image;
+    const Finding finding = inspectFile(folder.write("image", content), image);
+    EXPECT_EQ(finding.verdict, Verdict::notALibrary);
+    EXPECT_EQ(image.kind, LibraryImage::Kind::other);
+}
+
+/// A library that is described here. Nothing reads its file.
+class Dependencies : public ::testing::Test {
+  protected:
+    std::vector<Dependency> found() const {
+        return dependenciesOf(folder.path() / "library", image, folder.path());
+    }
+
+    const TemporaryDirectory folder;
+    LibraryImage image;
+};
+
+TEST_F(Dependencies, OnItselfAreFound) {
+    image.ownName = "self.lib";
+    image.needed = {"self.lib", "missing.lib", "self.lib"};
+    const std::vector<Dependency> all = found();
+    ASSERT_EQ(all.size(), 2u) << "each name once";
+    EXPECT_EQ(all[0].name, L"self.lib");
+    EXPECT_TRUE(all[0].found);
+    EXPECT_EQ(all[0].path, Mz::displayName(folder.path() / "library"));
+    EXPECT_EQ(all[1].name, L"missing.lib");
+    EXPECT_FALSE(all[1].found);
+}
+
+TEST_F(Dependencies, AreSearchedForNoMoreThanTwoThousandNames) {
+    if (System::ownFormat() != ImageFormat::elf)
+        GTEST_SKIP() << "to search the folders of the system so often takes seconds";
+    for (int number = 0; number <= 2000; ++number)
+        image.needed.push_back("missing" + std::to_string(number) + ".lib");
+    EXPECT_EQ(found().size(), 2000u);
+}
+
+TEST_F(Dependencies, OfALibraryWithAManifestAreNotCalledMissing) {
+    image.needed = {"missing.lib"};
+    EXPECT_TRUE(missingDependency(folder.path() / "library", found()));
+    image.hasManifest = true;
+    EXPECT_FALSE(missingDependency(folder.path() / "library", found()));
+}
+
 TEST(ProgramOfHost, IsTheFirstProgramThatAWindowsLibraryImportsFrom) {
     LibraryImage image;
     image.format = ImageFormat::pe;
@@ -69,6 +117,8 @@ TEST(SymbolOfHost, IsOneThatNoLibraryDefinesIfAllCanBeSearched) {
     dependencies.push_back(
         {L"text", {}, Mz::displayName(folder.write("text", "no library")), true});
     EXPECT_FALSE(symbolOfHost(file, dependencies));
+    dependencies.back().path = L"a name that no file has: \xD800";
+    EXPECT_FALSE(symbolOfHost(file, dependencies));
     dependencies.back().path.clear();
     EXPECT_FALSE(symbolOfHost(file, dependencies));
     const std::filesystem::path sound = built(L"goodWithKit");
@@ -90,6 +140,8 @@ TEST(UidNotes, NameTheWinnerOrTheLastThatLoses) {
     expectNote(0, Verdict::uidTaken, L"folder\\second");
     expectNote(1, Verdict::uidWins, L"folder\\first");
     expectNote(UidNotes::afterAll, Verdict::uidWins, L"folder\\second");
+    const RecordedLibraries twice{{L"folder", L"first", 0, 0, {builder, builder}}};
+    EXPECT_TRUE(UidNotes(twice).notesOn({builder}, 0).empty()) << "no other library has it";
     EXPECT_TRUE(notes.notesOn({{{1, 2, 3, 5}, L"name", {}, {}}}, UidNotes::afterAll).empty());
 }
 

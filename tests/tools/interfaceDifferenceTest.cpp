@@ -47,6 +47,55 @@ TEST(InterfaceDifference, OfABaseIsItsSlotsOrItsSize) {
         << "the slots come first";
 }
 
+TEST(InterfaceDifference, OfABaseIsItsDestructor) {
+    EXPECT_EQ(sentence([](InterfaceTable& here) { here.bases[0].virtualDestructor = true; }),
+              L"Base, a base of Reader, has a virtual destructor only here");
+    InterfaceTable host = table();
+    host.bases[0].virtualDestructor = true;
+    const auto finding = interfaceDifference({table()}, {host});
+    ASSERT_TRUE(finding);
+    EXPECT_EQ(finding->words, L"Base, a base of Reader, has a virtual destructor only in the host");
+}
+
+TEST(InterfaceDifference, OfTheSlotsNamesTheFirstThatOneHas) {
+    InterfaceTable shorter = table(), longer = table();
+    shorter.slotCount = 9;
+    longer.slotCount = 11;
+    longer.operations = {{9, "void open()"}, {10, "void close()"}};
+    const auto words = [](const InterfaceTable& here, const InterfaceTable& host) {
+        const auto finding = interfaceDifference({here}, {host});
+        return finding ? finding->words : std::wstring();
+    };
+    EXPECT_EQ(words(longer, shorter), L"Reader has 11 slots here and 9 in the host: only here is "
+                                      L"`void open()`");
+    EXPECT_EQ(words(shorter, longer), L"Reader has 9 slots here and 11 in the host: only the host "
+                                      L"has `void open()`");
+}
+
+TEST(InterfaceDifference, IsNoneIfClangOmitsAnInlineNamespace) {
+    InterfaceTable gcc = table(), clang = table();
+    clang.flags = interfaceFromClang;
+    const auto differ = [&](const char* gccText, const char* clangText) {
+        gcc.operations = {{9, gccText}};
+        clang.operations = {{9, clangText}};
+        const bool either = interfaceDifference({gcc}, {clang}).has_value();
+        EXPECT_EQ(interfaceDifference({clang}, {gcc}).has_value(), either) << gccText;
+        return either;
+    };
+    EXPECT_FALSE(differ("Text operator[](std::v1::Index)", "Text operator[](std::Index)"));
+    EXPECT_FALSE(differ("std::v1::Text operator~()", "std::Text operator~()"));
+    EXPECT_FALSE(differ("Z operator|(std::v1::Zone, a@b)", "Z operator|(std::Zone, a@b)"));
+    EXPECT_TRUE(differ("Text operator[](std::v1::Index)", "Text operator{}(std::Index)"));
+    EXPECT_TRUE(differ("v1::Text get()", "Text get()")) << "the first scope is the name's own";
+}
+
+TEST(InterfaceDifference, OfTheObjectIsItsSizeOrItsAlignment) {
+    const std::wstring end = L" in the host, by another base or member";
+    EXPECT_EQ(sentence([](InterfaceTable& here) { here.objectSize = 16; }),
+              L"Reader has 16 bytes here and 8" + end);
+    EXPECT_NE(sentence([](InterfaceTable& here) { here.alignment = 16; }), L"");
+}
+
 TEST(InterfaceDifference, OfAValueIsItsSizeOrItsAlignment) {
     const std::wstring subject = L"Point, which Reader passes by value, ";
     EXPECT_EQ(sentence([](InterfaceTable& here) { here.values[0].size = 16; }),
@@ -57,6 +106,9 @@ TEST(InterfaceDifference, OfAValueIsItsSizeOrItsAlignment) {
 
 TEST(InterfaceDifference, OfAnIncompleteOrAnotherValueIsNone) {
     EXPECT_EQ(sentence([](InterfaceTable& here) { here.values[0] = {"Point", 0, 0, 0}; }), L"");
+    InterfaceTable host = table();
+    host.values[0].size = 0;
+    EXPECT_FALSE(interfaceDifference({table()}, {host}));
     EXPECT_EQ(sentence([](InterfaceTable& here) { here.values[0] = {"Pixel", 16, 8, 1}; }), L"");
     EXPECT_EQ(sentence([](InterfaceTable& here) { here.bases[0] = {"Other", 4, 24, true}; }), L"");
 }

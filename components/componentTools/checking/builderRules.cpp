@@ -221,15 +221,12 @@ void builderItself(CheckContext& context) {
             continue;
         context.attempt(L"getBuilder", described.place, [&] {
             const ReferenceCount before = countOf(*builder);
-            QrRefPtr<QrComponentBuilder> itself = builder->getBuilder();
+            const QrRefPtr<QrComponentBuilder> itself = builder->getBuilder();
             if (!itself)
                 return context.report(described.place,
                                       L"getBuilder returns null. Return the builder to use.");
-            const bool same = itself.get() == builder.get();
             const long taken = countOf(*builder).value - before.value;
-            itself.reset();
-            const long left = countOf(*builder).value - before.value;
-            if (before.counted && same && (taken != 1 || left != 0))
+            if (before.counted && itself.get() == builder.get() && taken != 1)
                 context.report(described.place, L"getBuilder changes the number of references by " +
                                                     std::to_wstring(taken) +
                                                     L" instead of 1. Return one new reference.");

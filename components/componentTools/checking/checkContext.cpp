@@ -39,8 +39,8 @@ void CheckContext::reportMissingClass(const std::wstring& place, const std::wstr
     sender.finding({current, place, sentence, {}, missingClass});
 }
 
-bool CheckContext::isAvoided(const std::wstring& what, const std::wstring& place) const {
-    return work.avoided.contains(toUtf8(what + L" " + place));
+bool CheckContext::isAvoided(const wchar_t* what, const std::wstring& place) const {
+    return work.avoided.contains(toUtf8(what + (L" " + place)));
 }
 
 bool CheckContext::attempt(const std::wstring& what, const std::wstring& place,
@@ -131,7 +131,8 @@ void CheckContext::describe() {
         return;
     DescriptionCollector collector;
     const auto call = [&](const wchar_t* what, const std::function<void()>& action) {
-        if (!attempt(what, {}, action) && failure.empty() && !exception.empty())
+        attempt(what, {}, action);
+        if (failure.empty() && !exception.empty())
             failure = what + std::wstring(L" throws: ") + exception;
     };
     call(L"the entry point", [&] {

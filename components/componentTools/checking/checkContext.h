@@ -62,7 +62,7 @@ class CheckContext {
     /// Returns the text of the exception that ended the last `attempt`; empty if none did.
     const std::wstring& lastException() const { return exception; }
     /// Returns whether a call ended an earlier process, so that it must not be repeated.
-    bool isAvoided(const std::wstring& what, const std::wstring& place) const;
+    bool isAvoided(const wchar_t* what, const std::wstring& place) const;
 
     /// Reports that a class of stored objects has no builder in this library.
     void reportMissingClass(const std::wstring& place, const std::wstring& sentence,

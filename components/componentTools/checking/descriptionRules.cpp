@@ -25,7 +25,9 @@ Words wordsOf(const QrUid& uid) {
 using Answers = std::vector<std::pair<std::wstring, std::wstring>>;
 
 void add(Answers& answers, const std::wstring& name, const wchar_t* text) {
-    answers.emplace_back(name, text ? L'"' + std::wstring(text) + L'"' : std::wstring(L"null"));
+    std::wstring& answer = answers.emplace_back(name, L"null").second;
+    if (text)
+        answer.assign(L"\"").append(text).append(L"\"");
 }
 
 void addBuilder(Answers& answers, std::size_t index, const QrBuilderDescription& item) {
@@ -53,13 +55,14 @@ Answers answersOf(QrComponentDescription& description) {
     return answers;
 }
 
-/// Returns the first difference as a sentence; empty if there is none.
+/// Returns the first difference as a sentence; empty if there is none. The number of builders is an
+/// answer before theirs.
 std::wstring difference(const Answers& first, const Answers& later) {
     for (std::size_t index = 0; index < std::min(first.size(), later.size()); ++index)
         if (first[index] != later[index])
             return first[index].first + L" answers " + first[index].second + L" first and " +
                    later[index].second + L" later";
-    return first.size() == later.size() ? L"" : L"the number of builders changes";
+    return {};
 }
 
 /// Ends an enumeration at its first element, with a result of its own.
@@ -128,7 +131,9 @@ namespace {
 /// Returns the exception of a call as a finding; empty if the call was skipped.
 std::wstring thrownBy(const CheckContext& context, const wchar_t* call, const wchar_t* remedy) {
     const std::wstring& exception = context.lastException();
-    return exception.empty() ? L"" : call + (L" throws: " + exception + L". ") + remedy;
+    if (exception.empty())
+        return {};
+    return call + (L" throws: " + exception + L". ") + remedy;
 }
 
 /// Calls the entry point a few times, as several hosts would. Returns what is wrong with the
@@ -174,7 +179,10 @@ void descriptionCounted(CheckContext& context) {
     const platform::Module module = context.load(loaderError);
     QrGetComponentDescriptionFunction* const entry =
         module ? CheckContext::entryPointOf(module) : nullptr;
-    if (const std::wstring fault = entry ? referenceFault(context, entry) : L""; !fault.empty())
+    std::wstring fault;
+    if (entry)
+        fault = referenceFault(context, entry);
+    if (!fault.empty())
         context.report({}, fault);
     context.attempt(L"unloading the library", {}, [&] { platform::unloadLibrary(module); });
 }
@@ -192,8 +200,10 @@ void descriptionStable(CheckContext& context) {
             return;
         QrPtr<QrCastable> other = entry();
         QrPtr<QrComponentDescription> later = queryCast<QrComponentDescription>(other.get());
-        found =
-            later ? difference(first, answersOf(*later)) : L"the entry point returns null later";
+        if (later)
+            found = difference(first, answersOf(*later));
+        else
+            found = L"the entry point returns null later";
         static_cast<void>(other.detach());
         static_cast<void>(later.detach());
     });
@@ -300,14 +310,14 @@ void uidsExact(CheckContext& context) {
         for (const auto word : words) {
             QrUid almost = builder.uid;
             almost.*word ^= 1;
+            if (known.contains(wordsOf(almost)))
+                continue;
             QrPtr<QrComponentBuilder> made;
-            if (known.contains(wordsOf(almost)) ||
-                !context.attempt(L"createBuilder", builder.place,
-                                 [&] {
-                                     const auto object = description->createBuilder(almost);
-                                     made = queryCast<QrComponentBuilder>(object.get());
-                                 }) ||
-                !made)
+            context.attempt(L"createBuilder", builder.place, [&] {
+                const auto object = description->createBuilder(almost);
+                made = queryCast<QrComponentBuilder>(object.get());
+            });
+            if (!made)
                 continue;
             context.report(builder.place, L"createBuilder returns a builder for the uid " +
                                               textOf(almost) +

@@ -75,17 +75,19 @@ void extensionCase(CheckContext& context) {
     for (const ImportingBuilder& importing : importBuilders(context)) {
         const auto extensions = extensionsOf(context, *importing.described, *importing.builder);
         for (const auto& extension : extensions) {
-            if (!extension || lower(*extension) == *extension)
+            if (!extension)
                 continue;
-            const bool both = std::any_of(extensions.begin(), extensions.end(), [&](auto& other) {
-                return other && *other == lower(*extension);
-            });
-            if (!both)
+            const std::wstring lowered = lower(*extension);
+            // A lower-case extension is its own.
+            const bool present =
+                std::any_of(extensions.begin(), extensions.end(),
+                            [&](auto& other) { return other && *other == lowered; });
+            if (!present)
                 context.report(importing.described->place,
                                L"the extension \"" + *extension +
                                    L"\" has no lower-case form, and importers compare extensions "
                                    L"exactly. Enumerate \"" +
-                                   lower(*extension) + L"\" too.");
+                                   lowered + L"\" too.");
         }
     }
 }

@@ -86,11 +86,11 @@ std::string ImportTry::reproduce(const CheckContext& context) const {
 
 bool ImportTry::canImport(CheckContext& context) {
     bool result = false;
-    return context.attempt(
-               L"canImport", importing.described->place,
-               [&] { result = importing.builder->canImport(io, path.c_str(), L""); }, name,
-               reproduce(context)) &&
-           result;
+    context.attempt(
+        L"canImport", importing.described->place,
+        [&] { result = importing.builder->canImport(io, path.c_str(), L""); }, name,
+        reproduce(context));
+    return result;
 }
 
 bool ImportTry::restore() {
@@ -103,7 +103,11 @@ bool ImportTry::restore() {
     };
     if (atStart())
         return true;
-    io->read(); // Ends the state after a block read that reached the end.
+    try {
+        io->read(); // Ends the state after a block read that reached the end.
+    } catch (const QrStreamEx&) {
+        return false; // The builder broke the stream.
+    }
     return atStart();
 }
 

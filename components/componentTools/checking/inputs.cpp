@@ -16,8 +16,9 @@ namespace {
 
 using Random = std::mt19937;
 
+/// Returns a number below `limit`, which must not be 0.
 std::size_t below(Random& random, std::size_t limit) {
-    return limit ? random() % limit : 0;
+    return random() % limit;
 }
 
 std::string randomBytes(Random& random, std::size_t size) {
@@ -129,7 +130,7 @@ std::string changedBytes(std::string bytes, std::uint32_t seed, std::size_t numb
         case 4: bytes.resize(at); break;
         default: // A number that is likely to be a count.
             bytes.replace(at, std::min<std::size_t>(4, bytes.size() - at),
-                          random() % 2 ? std::string(4, '\xFF') : std::string("\x7F\xFF\xFF\xFF"));
+                          random() % 2 ? "\xFF\xFF\xFF\xFF" : "\x7F\xFF\xFF\xFF");
             break;
         }
     }

@@ -24,9 +24,10 @@ bool describeOnce(CheckContext& context, QrGetComponentDescriptionFunction* entr
         object = entry();
         description = queryCast<QrComponentDescription>(object.get());
     });
-    called = called && description && context.attempt(L"enumerateBuilders", {}, [&] {
-        description->enumerateBuilders(collector);
-    });
+    called = called && description;
+    if (called)
+        called = context.attempt(L"enumerateBuilders", {},
+                                 [&] { description->enumerateBuilders(collector); });
     for (const auto& item : collector.items) {
         QrRef<QrCastable> unused;
         if (!called || !objects)
@@ -74,8 +75,10 @@ bool isLoaded(CheckContext& context) {
 
 std::wstring leftBehind(std::size_t count, std::size_t before, const wchar_t* one,
                         const wchar_t* several) {
-    const std::size_t more = count > before ? count - before : 0;
-    return more == 0 ? L"" : std::to_wstring(more) + L" " + (more == 1 ? one : several);
+    if (count <= before)
+        return {};
+    const std::size_t more = count - before;
+    return std::to_wstring(more) + L" " + (more == 1 ? one : several);
 }
 
 } // namespace
@@ -124,7 +127,9 @@ void reloads(CheckContext& context) {
         return;
     // A description that leaves memory behind at each call is another fault.
     QrGetComponentDescriptionFunction* const entry = context.entryPoint();
-    if (entry && !growthOf([&] { describeOnce(context, entry, false); }, count))
+    if (!entry)
+        return;
+    if (growthOf([&] { describeOnce(context, entry, false); }, count) == 0)
         context.report({}, L"each loading and unloading leaves about " + std::to_wstring(growth) +
                                L" bytes behind. Free what static objects and initialisers "
                                L"allocate; MZ_AT_UNLOAD helps.");
@@ -143,10 +148,9 @@ void leavesNothing(CheckContext& context) {
     const std::wstring moreThreads =
         leftBehind(System::threadCount(), threads, L"thread", L"threads");
     const std::size_t leftFiles = System::openFileCount();
-    const std::wstring moreFiles =
-        leftFiles >= files + rounds
-            ? leftBehind(leftFiles, files, L"open file or handle", L"open files or handles")
-            : L"";
+    std::wstring moreFiles;
+    if (leftFiles >= files + rounds)
+        moreFiles = leftBehind(leftFiles, files, L"open file or handle", L"open files or handles");
     if (!moreThreads.empty() || !moreFiles.empty())
         context.report(
             {}, L"after " + std::to_wstring(rounds) + L" times of use it leaves " + moreThreads +

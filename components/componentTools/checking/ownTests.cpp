@@ -33,14 +33,17 @@ void ownTests(CheckContext& context) {
         return;
     Report report(context);
     bool more = true;
-    for (int number = 0; more; ++number)
-        more = context.attempt(L"test " + std::to_wstring(number + 1), {}, [&] {
+    for (int number = 0; more; ++number) {
+        const auto runOne = [&] {
             try {
                 more = run(number, report);
             } catch (...) {
                 report.fail((L"it throws: " + exceptionText()).c_str());
             }
-        }) && more;
+        };
+        if (!context.attempt(L"test " + std::to_wstring(number + 1), {}, runOne))
+            return;
+    }
 }
 
 } // namespace Mz::Tools::Rules

@@ -89,10 +89,12 @@ void forEachStored(CheckContext& context, Use use) {
             use(stored, *bytes);
 }
 
-/// Returns whether `read` accepts what `write` wrote; else the other rules have nothing to say.
-bool readsWhole(CheckContext& context, const StoredObject& stored, const std::string& bytes) {
+/// Returns whether a new object can be made and its `read` accepts the bytes.
+bool isRead(CheckContext& context, const StoredObject& stored, const std::string& bytes) {
     const QrPtr<QrPersistant> object = newObject(context, stored);
-    return object && readBytes(context, stored.place, *object, StoredForm::binary, bytes);
+    if (!object)
+        return false;
+    return readBytes(context, stored.place, *object, StoredForm::binary, bytes);
 }
 
 /// Returns the positions at which the data is cut off: all of a short one, else some.
@@ -182,7 +184,9 @@ void inPieces(CheckContext& context) {
     forEachStored(context, [&](const StoredObject& stored, const std::string& bytes) {
         const QrPtr<QrPersistant> whole = newObject(context, stored);
         const QrPtr<QrPersistant> copy = newObject(context, stored);
-        if (!whole || !copy || !readBytes(context, stored.place, *whole, StoredForm::binary, bytes))
+        if (!whole || !copy)
+            return;
+        if (!readBytes(context, stored.place, *whole, StoredForm::binary, bytes))
             return;
         const auto expected = writtenBytes(context, stored.place, *whole, StoredForm::binary);
         const bool read = readBytes(context, stored.place, *copy, StoredForm::binary, bytes,
@@ -198,14 +202,16 @@ void inPieces(CheckContext& context) {
 
 void truncated(CheckContext& context) {
     forEachStored(context, [&](const StoredObject& stored, const std::string& bytes) {
-        if (!readsWhole(context, stored, bytes))
-            return;
+        if (!isRead(context, stored, bytes))
+            return; // The finding of another rule.
         for (const std::size_t size : cuts(bytes.size())) {
             const QrPtr<QrPersistant> object = newObject(context, stored);
+            if (!object)
+                continue;
             const std::wstring detail = L"the first " + std::to_wstring(size) + L" of " +
                                         std::to_wstring(bytes.size()) + L" bytes";
-            if (!object || !readBytes(context, stored.place, *object, StoredForm::binary,
-                                      bytes.substr(0, size), Supply::whole, detail))
+            if (!readBytes(context, stored.place, *object, StoredForm::binary,
+                           bytes.substr(0, size), Supply::whole, detail))
                 continue;
             context.report(stored.place, L"read accepts " + detail +
                                              L". Throw QrStreamEx::ExReadError if a value is "
@@ -217,17 +223,16 @@ void truncated(CheckContext& context) {
 
 void freedAfterFailure(CheckContext& context) {
     forEachStored(context, [&](const StoredObject& stored, const std::string& bytes) {
-        const auto readHalf = [&] {
-            const QrPtr<QrPersistant> object = newObject(context, stored);
-            return object && readBytes(context, stored.place, *object, StoredForm::binary,
-                                       bytes.substr(0, bytes.size() / 2));
-        };
-        const auto readAll = [&] { static_cast<void>(readsWhole(context, stored, bytes)); };
+        const std::string half = bytes.substr(0, bytes.size() / 2);
+        const auto readHalf = [&] { return isRead(context, stored, half); };
+        const auto readAll = [&] { static_cast<void>(isRead(context, stored, bytes)); };
         if (readHalf())
             return; // The finding of another rule.
         const std::size_t growth = growthOf([&] { static_cast<void>(readHalf()); }, 100);
+        if (growth == 0)
+            return;
         // An object that leaks anyway is the finding of another rule.
-        if (growth && !growthOf(readAll, 100))
+        if (growthOf(readAll, 100) == 0)
             context.report(stored.place, L"each read that fails leaves about " +
                                              std::to_wstring(growth) +
                                              L" bytes behind. Hold what read allocates in objects "

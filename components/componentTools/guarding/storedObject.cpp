@@ -31,7 +31,9 @@ std::wstring classNameOf(const QrCastable& object) {
     const QrCastable* const principal = const_cast<QrCastable&>(object).getCastable();
     // A library that was compiled without type information has a null pointer in its place.
     const auto table = *reinterpret_cast<const void* const* const*>(principal);
-    return table[-1] ? typeText(typeid(*principal)) : L"(compiled without type information)";
+    if (!table[-1])
+        return L"(compiled without type information)";
+    return typeText(typeid(*principal));
 }
 
 /// Returns whether the component manager knows a builder of this identity. Loads nothing.

@@ -68,8 +68,11 @@ std::wstring hurry() {
     using Clock = std::chrono::steady_clock;
     const Clock::time_point start = Clock::now();
     QrProcessControl& controller = *QrGetProcessController();
-    for (int step = 0; step < 1000; ++step)
-        controller.progress(static_cast<float>(step) / 2000, L"hurrying");
+    for (int step = 0; step < 1000 || Clock::now() - start < std::chrono::milliseconds(25);
+         ++step) {
+        controller.progress(static_cast<float>(step % 1000) / 2000, L"hurrying");
+        controller.status(L"hurrying");
+    }
     return std::to_wstring(
         std::chrono::duration_cast<std::chrono::milliseconds>(Clock::now() - start).count());
 }
