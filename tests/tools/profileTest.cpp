@@ -330,6 +330,10 @@ TEST(ProfileText, IsForPeople) {
     EXPECT_EQ(shareText(0.034), L"3.4 %");
 }
 
+TEST(ProfileText, NamesNoShareOfAStartThatTookNoTime) {
+    EXPECT_EQ(StartProfile().shareOf(ProfiledLibrary()), 0.0);
+}
+
 /// A profile with one library of each name. The first one is the slowest.
 StartProfile profileOf(const std::vector<std::filesystem::path>& names) {
     StartProfile profile;

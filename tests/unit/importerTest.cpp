@@ -458,6 +458,7 @@ class Untellable : public std::streambuf {
 
 TEST_F(Importer, IsNullForDataWithoutAPositionAndAsksNobody) {
     addWilling(L"A", {L"a"});
+    addWilling(L"B", {L"a"});
     Untellable medium;
     std::istream stream(&medium);
     QrInBuffer io(&stream);
