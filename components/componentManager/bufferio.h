@@ -209,6 +209,13 @@ class MZ_COMPONENT_MANAGER_API QrInBuffer
     int64 seek(int64 offset, int origin) override;
     int64 tell() const override;
 
+    /// Returns how many bytes can be read from what the stream's buffer holds, without asking the
+    /// medium. Negative if a read may do more than that: the class of the buffer is not exactly one
+    /// of the standard library, or the stream is not good, is tied or has `unitbuf`. Reads nothing.
+    ///
+    /// \since 0.2
+    int64 heldBytes() const;
+
   private:
     friend struct StandardStreams;
 

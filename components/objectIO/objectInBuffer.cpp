@@ -5,7 +5,7 @@
 /// each level with the position of that level's object, and stops all later reads: after it the
 /// position in the data is unknown.
 #include "components/componentManager/binaryStream.h"
-#include "components/componentManager/buffers/byteSource.h"
+#include "components/componentManager/bufferio.h"
 #include "components/componentManager/componentImp.h"
 #include "components/componentManager/numberRelay.h"
 #include "components/objectIO/objectIO.h"
@@ -15,7 +15,6 @@
 
 #include <algorithm>
 #include <cstdint>
-#include <istream>
 #include <iterator>
 #include <memory>
 #include <optional>
@@ -84,8 +83,11 @@ int readTextBool(QrBufferedIO& io, wchar_t* digit) {
 /// there is no answer. They are negative if they are not known.
 class Place {
   public:
+    /// Compares the names of the classes: on Windows a library may have its own description of one.
     explicit Place(const QrBufferedIO& inner)
-        : io(inner), stream(StandardStreams::inputUnderForLibraries(inner)) {}
+        : io(inner),
+          buffer(typeid(inner) == typeid(QrInBuffer) ? static_cast<const QrInBuffer*>(&inner)
+                                                     : nullptr) {}
 
     /// An outermost object begins. Between objects the program may use the inner IO by itself.
     void begin() {
@@ -145,12 +147,7 @@ class Place {
     }
 
     /// Returns whether a buffer of the standard library holds the next `size` bytes.
-    bool holds(int size) const {
-        if (!stream)
-            return false;
-        const ByteSource source(*stream);
-        return source.isFree() && static_cast<int64>(source.held().size()) >= size;
-    }
+    bool holds(int size) const { return buffer && buffer->heldBytes() >= size; }
 
     void ask() {
         if (!std::exchange(unasked, false))
@@ -161,7 +158,7 @@ class Place {
     }
 
     const QrBufferedIO& io;
-    std::istream* const stream; ///< under `io`, if that is exactly a `QrInBuffer`
+    const QrInBuffer* const buffer; ///< `io`, if it is exactly of this class
     int64 place = -1;
     int64 origin = 0;     ///< the position from which places are counted
     bool known = false;   ///< whether `place` is the current one

@@ -108,6 +108,7 @@ const Broken brokenLibraries[] = {
     {L"exportsMore", L"checks", "library-exports"},
     {L"takesFromHost", L"", "library-host"},
     {L"localeNumbers", L"checks", "surroundings-locale"},
+    {L"groupsDigits", L"checks", "surroundings-locale"},
     {L"asksFolder", L"checks", "surroundings-folder"},
     {L"needsInput", L"checks", "surroundings-input"},
     {L"uninitialised", L"checks", "surroundings-memory"},

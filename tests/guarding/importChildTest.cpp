@@ -48,6 +48,18 @@ TEST(ImportChild, EndsWithoutAFileAndATask) {
     EXPECT_EQ(statusFor({"FILE"}, encodeActivity(L"a message to the host")), usage);
 }
 
+TEST(ProbeProcess, EndsAtOnceIfAPersonStartsIt) {
+    const System::ChildLimits limits{
+        std::chrono::seconds(60), std::uint64_t{1} << 30, 0, std::size_t{1} << 20, {}};
+    for (const std::vector<std::filesystem::path>& arguments :
+         {std::vector<std::filesystem::path>{}, {"one"}, {"one", "2", "three"}}) {
+        const System::ChildResult child = System::runChild(MZ_PROBE, arguments, limits);
+        EXPECT_EQ(child.end, System::ChildResult::End::exited);
+        EXPECT_EQ(child.status, 2);
+        EXPECT_EQ(child.output, "");
+    }
+}
+
 TEST(GuardedImport, StartsNoProcessForAManagerWithoutLibraries) {
     const Mz::Test::TemporaryDirectory empty;
     QrGetComponentManager()->initialize(Mz::Test::searchPathOf(empty.path()).c_str());

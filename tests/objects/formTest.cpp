@@ -106,6 +106,15 @@ TYPED_TEST(Form, IsTheSameWithFormattedTextThatIsEmpty) {
     EXPECT_EQ(bytes(true), bytes(false));
 }
 
+TYPED_TEST(Form, HasNoBlankBeforeFormattedTextThatBeginsWithOne) {
+    Scripted parts(nodeUid, 2, [](QrStream& s) {
+        s.formattedWrite(L"%d", 3);
+        s.formattedWrite(L" %d", 4);
+    });
+    Scripted whole(nodeUid, 2, [](QrStream& s) { s.formattedWrite(L"3 4"); });
+    EXPECT_EQ(saved<TypeParam>(&parts), saved<TypeParam>(&whole));
+}
+
 TYPED_TEST(Form, ThatHasNoWayBackIsRefusedWhenItIsWritten) {
     EXPECT_THAT(this->refusal(L"w"), HasSubstr("never read back"));
     if (!this->isBinary) {

@@ -220,6 +220,19 @@ TEST(IOSequence, AStringReadAfterWritingSkipsTheSeparatorBehindItsLength) {
     EXPECT_EQ(value, L"ab");
 }
 
+TEST(IOSequence, ACountedStringReadAfterWritingSkipsTheSeparatorBehindItsLength) {
+    std::wstring value;
+    EXPECT_THAT(calls<QrTextStream>(
+                    [&](QrStream& s) {
+                        s << 1;
+                        EXPECT_EQ(s.read(value, 1), 1);
+                    },
+                    "2 ab"),
+                ElementsAre("writeChar wide 1", "readChar wide", "readChar wide", "ungetc wide 32",
+                            "skipWhiteSpace 1", "readChar wide 2 2147483647"));
+    EXPECT_EQ(value, L"ab");
+}
+
 TEST(IOSequence, ObjectsGoOutOnALineOfTheirOwn) {
     RecordingIO object;
     EXPECT_THAT(calls<QrTextStream>([&](QrStream& s) {

@@ -1,11 +1,13 @@
 // SPDX-License-Identifier: BSL-1.0
 // Searches for the components with which a host fails, with a host that is started.
 #include "components/componentTools/bisect.h"
+#include "components/componentTools/console.h"
 #include "components/componentTools/disabled.h"
 #include "tests/tools/toolsFixture.h"
 
 #include <cstdlib>
 #include <map>
+#include <sstream>
 #include <utility>
 
 using namespace Mz;
@@ -213,6 +215,15 @@ TEST_F(Bisect, SwitchesOffALibraryThatNeedsItsHost) {
     EXPECT_EQ(result.components, 2u);
     EXPECT_THAT(outputs[2], HasSubstr("\n2 made\n"));
     EXPECT_EQ(outputs[0], "0 builders, 0 mapped, no word\n0 made\n");
+}
+
+TEST_F(Bisect, ShowsTheProgressOfItsScan) {
+    fill(1);
+    std::ostringstream shown;
+    ConsoleController controller(shown, false);
+    options.controller = &controller;
+    bisect(options);
+    EXPECT_THAT(shown.str(), ::testing::StartsWith("0% good0\n"));
 }
 
 TEST_F(Bisect, StopsBeforeTheFirstStartIfTheScanIsInterrupted) {

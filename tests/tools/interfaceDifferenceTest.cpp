@@ -113,4 +113,19 @@ TEST(InterfaceDifference, OfAnIncompleteOrAnotherValueIsNone) {
     EXPECT_EQ(sentence([](InterfaceTable& here) { here.bases[0] = {"Other", 4, 24, true}; }), L"");
 }
 
+TEST(InterfaceDifference, OfCompilersIsNotAnInlineNamespaceWhateverItsLetters) {
+    const auto differs = [](const char* gcc, const char* clang) {
+        InterfaceTable here = table(), there = table();
+        here.flags = interfaceFromClang;
+        here.operations.push_back({3, clang});
+        there.operations.push_back({3, gcc});
+        return interfaceDifference({here}, {there}).has_value();
+    };
+    EXPECT_FALSE(differs("void use(a::v1::T)", "void use(a::T)"));
+    EXPECT_FALSE(differs("void use(a::\xC3\x80::T)", "void use(a::T)"))
+        << "the first non-ASCII byte";
+    EXPECT_FALSE(differs("void use(a::\xC3\xBF::T)", "void use(a::T)"));
+    EXPECT_TRUE(differs("void use(a::T)", "void use(a::v1::T)"));
+}
+
 } // namespace

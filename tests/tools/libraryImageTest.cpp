@@ -263,7 +263,7 @@ TEST(PeImage, HasNoSectionsBehindADamagedHeader) {
     };
     EXPECT_EQ(sizeWith(peMachine, 0x8664), 0x200u);
     EXPECT_EQ(sizeWith(peMachine, 0xAA64), 0u);
-    EXPECT_EQ(sizeWith(peMachine - 4, 0), 0u);                         // no signature
+    EXPECT_EQ(sizeWith(peMachine - 4, 0), 0u);                           // no signature
     EXPECT_EQ(sizeWith(peOptional + 112 + 16 * 8 + 40 + 20, 0x7FF), 0u); // outside of a sector
 }
 

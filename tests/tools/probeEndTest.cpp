@@ -76,8 +76,7 @@ TEST(ProbeEnd, WithAnUnknownStatusIsUnknownUnlessTheReportIsComplete) {
     EXPECT_EQ(judgeEnd(endedBy(End::unknown), answer(), options()).verdict, Verdict::endUnknown);
     ProbeAnswer complete = answer();
     complete.description.emplace();
-    EXPECT_EQ(judgeEnd(endedBy(End::unknown), complete, options()).verdict,
-              Verdict::offersNothing);
+    EXPECT_EQ(judgeEnd(endedBy(End::unknown), complete, options()).verdict, Verdict::offersNothing);
     complete.description->builders.resize(2);
     EXPECT_EQ(judgeEnd(endedBy(End::unknown), complete, options()),
               (Finding{Verdict::works, L"2", {}}));
@@ -115,8 +114,9 @@ TEST(ExceptionFinding, HasTheReasonOfEachKindOfException) {
               (Finding{Verdict::threw, {}, L"before: text"}));
     const QrStreamEx::ExReadError failure("source", 7, "it is empty");
     const std::string reason = failure.getReason();
-    EXPECT_EQ(findingOf([&] { throw failure; }),
-              (Finding{Verdict::threw, {}, L"before: " + std::wstring(reason.begin(), reason.end())}));
+    EXPECT_EQ(
+        findingOf([&] { throw failure; }),
+        (Finding{Verdict::threw, {}, L"before: " + std::wstring(reason.begin(), reason.end())}));
     EXPECT_EQ(findingOf([] { throw 7; }),
               (Finding{Verdict::threw, {}, L"before: a value of type int"}));
 }

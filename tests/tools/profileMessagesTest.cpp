@@ -14,6 +14,20 @@ LibrarySteps stepsOf(std::size_t index) {
     return {index, {1ns, 2ns, 3ns, 4ns, 5ns}, {Verdict::threw, L"its entry point", L"\u00E4\""}};
 }
 
+/// Returns a message with these times and this verdict, for the first library.
+std::string stepsWith(const std::string& times, const std::string& verdict) {
+    constexpr unsigned char kind = 128;
+    return frameOf(kind, R"({"kind":"steps","index":0,"subject":"","words":"","times":[)" + times +
+                             R"(],"verdict":")" + verdict + "\"}");
+}
+
+TEST(ProfileMessages, AreReadIfTheyAreWhole) {
+    const ProfileReport report =
+        decodeProfileReport(stepsWith("1,2,3,4,5", "works") + encodeListing(1ns), 2);
+    EXPECT_FALSE(report.garbled);
+    EXPECT_EQ(report.libraries.size(), 1u);
+}
+
 TEST(ProfileMessages, CarryTheTask) {
     const ProfileTask task = decodeProfileTask(encodeTask({true, 7, {2, 5}}));
     EXPECT_TRUE(task.whole);
@@ -72,10 +86,10 @@ TEST(ProfileMessages, ThatAreInvalidAreNotUsed) {
           frameOf(kind, R"({"kind":"stage","stage":1e300})"),
           frameOf(kind, R"({"kind":"begin","index":0.5})"),
           frameOf(kind, R"({"kind":"others","count":1e300,"time":1})"),
-          frameOf(kind, R"({"kind":"listing","time":"1"})"), frameOf(0, R"({"kind":"begin"})"),
-          frameOf(kind, R"({"kind":"fault","verdict":"unknown","subject":"","words":""})"),
-          frameOf(kind, R"({"kind":"steps","index":0,"times":[1,2,3,4],)"
-                        R"("verdict":"works","subject":"","words":""})")}) {
+          frameOf(kind, R"({"kind":"listing","time":"1"})"), stepsWith("1,2,3,4", "works"),
+          stepsWith("1,2,3,4,5,6", "works"), stepsWith("1,2,3,4,5", "unheardOf"),
+          frameOf(kind, R"({"kind":"fault","verdict":"unheardOf","subject":"","words":""})"),
+          frameOf(0, R"({"kind":"begin"})")}) {
         const ProfileReport report = decodeProfileReport(invalid + encodeListing(1ns), 2);
         EXPECT_TRUE(report.garbled) << invalid;
         EXPECT_FALSE(report.done) << invalid;

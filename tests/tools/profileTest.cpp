@@ -330,6 +330,10 @@ TEST(ProfileText, IsForPeople) {
     EXPECT_EQ(shareText(0.034), L"3.4 %");
 }
 
+TEST(ProfileText, NamesNoShareOfAStartThatTookNoTime) {
+    EXPECT_EQ(StartProfile().shareOf(ProfiledLibrary()), 0.0);
+}
+
 /// A profile with one library of each name. The first one is the slowest.
 StartProfile profileOf(const std::vector<std::filesystem::path>& names) {
     StartProfile profile;
@@ -378,6 +382,16 @@ TEST(ProfileChart, HasABarForEachLibraryAndPhase) {
     EXPECT_THAT(chart, HasSubstr("second.so, registration: 2.00 ms"));
     EXPECT_THAT(chart, HasSubstr("<text class=\"time\""));
     EXPECT_THAT(chart, HasSubstr("39.0 ms"));
+}
+
+TEST(ProfileChart, ShortensLongNamesAndLeavesOutWhatWasNotMeasured) {
+    const std::string longest = "abcdefghijklmnopqrstuvwxyz0123456789"; // 36 characters.
+    StartProfile profile = profileOf({longest, longest + ".so", "left.so"});
+    profile.libraries[2].measured = false;
+    const std::string chart = chartOf(profile);
+    EXPECT_THAT(chart, HasSubstr(">" + longest + "<"));
+    EXPECT_THAT(chart, HasSubstr(">" + longest.substr(0, 35) + "\xE2\x80\xA6<"));
+    EXPECT_THAT(chart, Not(HasSubstr("left.so")));
 }
 
 TEST(ProfileChart, AddsUpTheLibrariesBehindTheFortieth) {

@@ -115,6 +115,19 @@ TEST_F(Start, NoticesAComponentThatEndsTheProcessWhileItStarts) {
     EXPECT_EQ(marks(), 0);
 }
 
+TEST_F(Start, JudgesByTheLatestOfSeveralMarks) {
+    // In both orders, for a folder lists its files in any order.
+    for (const bool firstIsLatest : {true, false}) {
+        const std::filesystem::path files[] = {lists.write("list.running-1", "starting\n"),
+                                               lists.write("list.running-2", "working\n")};
+        const auto now = std::filesystem::file_time_type::clock::now();
+        std::filesystem::last_write_time(files[0], now - std::chrono::hours(firstIsLatest ? 1 : 2));
+        std::filesystem::last_write_time(files[1], now - std::chrono::hours(firstIsLatest ? 2 : 1));
+        EXPECT_THAT(output(), HasSubstr(firstIsLatest ? "unclean start" : "unclean work"));
+        EXPECT_EQ(marks(), 0);
+    }
+}
+
 TEST_F(Start, TakesFinishForTheCleanEnd) {
     EXPECT_EQ(run({"finish", "exit"}).exitCode, 0);
     EXPECT_EQ(marks(), 0);

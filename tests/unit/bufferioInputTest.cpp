@@ -462,4 +462,41 @@ TEST(ShortBlockThenPutBack, NeverGivesAStaleByte) {
     EXPECT_EQ(input->read(), 'c');
 }
 
+/// A text whose reads a caller can observe.
+class ForeignText final : public std::stringbuf {
+  public:
+    using std::stringbuf::stringbuf;
+};
+
+TEST(HeldBytes, AreThoseThatCanBeReadWithoutTheMedium) {
+    std::istringstream text("abc");
+    QrInBuffer io(&text);
+    EXPECT_EQ(io.heldBytes(), 3);
+    EXPECT_EQ(io.read(), 'a');
+    EXPECT_EQ(io.heldBytes(), 2);
+    EXPECT_EQ(text.tellg(), 1);
+    EXPECT_EQ(io.read(), 'b');
+    EXPECT_EQ(io.read(), 'c');
+    EXPECT_EQ(io.heldBytes(), 0);
+}
+
+TEST(HeldBytes, AreNotKnownIfAReadDoesMore) {
+    std::ostringstream other;
+    std::istringstream text("abc");
+    const QrInBuffer io(&text);
+    text.tie(&other);
+    EXPECT_LT(io.heldBytes(), 0);
+    text.tie(nullptr);
+    text.setf(std::ios::unitbuf);
+    EXPECT_LT(io.heldBytes(), 0);
+    text.unsetf(std::ios::unitbuf);
+    EXPECT_EQ(io.heldBytes(), 3);
+    text.setstate(std::ios::eofbit);
+    EXPECT_LT(io.heldBytes(), 0);
+
+    ForeignText foreign("abc");
+    std::istream stream(&foreign);
+    EXPECT_LT(QrInBuffer(&stream).heldBytes(), 0);
+}
+
 } // namespace

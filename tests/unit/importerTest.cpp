@@ -458,6 +458,7 @@ class Untellable : public std::streambuf {
 
 TEST_F(Importer, IsNullForDataWithoutAPositionAndAsksNobody) {
     addWilling(L"A", {L"a"});
+    addWilling(L"B", {L"a"});
     Untellable medium;
     std::istream stream(&medium);
     QrInBuffer io(&stream);
@@ -557,6 +558,15 @@ TEST_F(FileImporter, SearchesItsDefaultAfterTheCallersPath) {
         << "the caller's search path comes first";
     EXPECT_FALSE(importer.import(L"missing.a", folder.c_str(), found));
     EXPECT_FALSE(found);
+}
+
+TEST_F(FileImporter, CanBeCopied) {
+    importer.defaultSearch = more;
+    const TestImporter copy(importer);
+    EXPECT_EQ(copy.getDefaultSearch(), std::wstring(more));
+    TestImporter assigned;
+    assigned = importer;
+    EXPECT_EQ(assigned.getDefaultSearch(), std::wstring(more));
 }
 
 TEST_F(FileImporter, HasNoDefaultSearchByItself) {

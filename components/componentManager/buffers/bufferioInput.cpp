@@ -240,6 +240,11 @@ int64 QrInBuffer::tell() const {
     return position;
 }
 
+int64 QrInBuffer::heldBytes() const {
+    const ByteSource source(*in);
+    return source.isFree() ? static_cast<int64>(source.held().size()) : -1;
+}
+
 void QrInBuffer::writeObject(const QrCastable*, QrStream&, const wchar_t*, const wchar_t*) {
     throw QrStreamEx::ExWriteObjectImp(source, __LINE__);
 }

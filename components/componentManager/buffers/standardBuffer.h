@@ -96,11 +96,6 @@ struct StandardStreams {
     static std::istream* inputUnder(const QrBufferedIO& io) {
         return &typeid(io) == &typeid(QrInBuffer) ? static_cast<const QrInBuffer&>(io).in : nullptr;
     }
-    /// Does the same for other libraries: on Windows each has its own description of the class, so
-    /// that the names are compared. Ask once for each `io`, since the stream stays the same.
-    static std::istream* inputUnderForLibraries(const QrBufferedIO& io) {
-        return typeid(io) == typeid(QrInBuffer) ? static_cast<const QrInBuffer&>(io).in : nullptr;
-    }
     /// Returns the standard stream of `io` if its class is exactly `QrOutBuffer`, else null.
     static std::ostream* outputUnder(const QrBufferedIO& io) {
         return &typeid(io) == &typeid(QrOutBuffer) ? static_cast<const QrOutBuffer&>(io).out

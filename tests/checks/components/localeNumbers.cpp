@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Writes numbers as the locale of the process says.
+/// Writes a decimal point as the locale of the process says.
 #include "tests/checks/components/broken.h"
 
 #include <sstream>
@@ -8,7 +8,7 @@ class Object final : public Mz::Test::Stored {
   public:
     void write(Mz::QrStream& stream) override {
         std::ostringstream text;
-        text << 1234.5;
+        text << 0.5;
         stream << static_cast<unsigned int>(text.str().size());
         for (const char character : text.str())
             stream << character;

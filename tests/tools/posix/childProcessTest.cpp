@@ -21,8 +21,11 @@ namespace {
 using End = System::ChildResult::End;
 
 System::ChildLimits limits() {
-    return {60s, std::numeric_limits<std::uint64_t>::max(), 0,
-            std::numeric_limits<std::size_t>::max(), {}};
+    return {60s,
+            std::numeric_limits<std::uint64_t>::max(),
+            0,
+            std::numeric_limits<std::size_t>::max(),
+            {}};
 }
 
 System::ChildResult runShell(const std::string& script, const System::ChildLimits& allowed,
@@ -50,8 +53,7 @@ TEST(ChildProcess, EndsByASignalThatIsNamed) {
 
 TEST(ChildProcess, GetsMoreInputThanThePipeHolds) {
     std::string input(5'000'000, 'x');
-    const System::ChildResult result =
-        runShell("sleep 0.05; wc -c", limits(), {&input, nullptr});
+    const System::ChildResult result = runShell("sleep 0.05; wc -c", limits(), {&input, nullptr});
     EXPECT_EQ(result.end, End::exited);
     EXPECT_THAT(result.output, testing::HasSubstr("5000000"));
     EXPECT_TRUE(input.empty());

@@ -54,7 +54,8 @@ TEST(LoaderCache, HasTheLibrariesOfThisProcessor) {
 
 TEST(LoaderCache, WithoutAHeaderIsEmpty) {
     const std::string whole = cacheWith(ours);
-    for (const std::size_t size : {std::size_t{0}, std::size_t{19}, std::size_t{20}, headerSize - 1})
+    for (const std::size_t size :
+         {std::size_t{0}, std::size_t{19}, std::size_t{20}, headerSize - 1})
         EXPECT_THAT(System::librariesInLoaderCache(whole.substr(0, size)), IsEmpty()) << size;
     EXPECT_THAT(System::librariesInLoaderCache("another file"), IsEmpty());
 }

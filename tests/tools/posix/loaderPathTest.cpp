@@ -2,6 +2,8 @@
 /// Tests where the tools look for dependencies, by comparison with the system's loader.
 #include "tests/tools/toolsFixture.h"
 
+#include <string>
+
 using namespace Mz;
 using namespace Mz::Tools;
 using namespace Mz::Test;

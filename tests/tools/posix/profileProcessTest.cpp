@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Tests what a profile makes of the answers of its processes. A script takes the place of the probe.
+/// Tests what a profile makes of the answers of its processes. A script takes the place of the
+/// probe.
 #include "components/componentTools/profiling/profileMessages.h"
 #include "tests/tools/toolsFixture.h"
 
@@ -131,9 +132,10 @@ TEST_F(ProfileProcess, HasMeasuredLibrariesWhenTheUserStopsItLater) {
     answer("steps", stepsIn(4ms, Verdict::loadFailed) + encodeListing(1ms));
     answer("whole", encodeWhole(std::nullopt, 9ms) + std::string());
     wanted.process.interrupted = [&] { return std::filesystem::exists(answers.path() / "stop"); };
-    answers.write("probe", std::string(script).insert(std::strlen("#!/bin/sh\n"),
-                                                      "case \"$3\" in *'\"whole\":true'*) "
-                                                      ": > \"${0%/*}/stop\"; exec sleep 60;; esac\n"));
+    answers.write("probe",
+                  std::string(script).insert(std::strlen("#!/bin/sh\n"),
+                                             "case \"$3\" in *'\"whole\":true'*) "
+                                             ": > \"${0%/*}/stop\"; exec sleep 60;; esac\n"));
     const StartProfile result = profile();
     EXPECT_TRUE(result.interrupted);
     ASSERT_EQ(result.libraries.size(), 1u);

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: BSL-1.0
-/// Tests the system's functions of the tools where a test from outside does not lead: standard files
-/// that are closed, folders of the loader, and files that cannot be held.
+/// Tests the system's functions of the tools where a test from outside does not lead: standard
+/// files that are closed, folders of the loader, and files that cannot be held.
 #include "components/componentTools/platform/system.h"
 
 #include "components/componentTools/platform/posix/inheritedNumber.h"
