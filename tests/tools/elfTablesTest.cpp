@@ -222,6 +222,64 @@ TEST_F(ElfTables, OfTheOlderKindCountTheSymbols) {
     EXPECT_TRUE(wantedSymbols(file()).empty());
 }
 
+TEST_F(ElfTables, OfTheOlderKindMayLeadNowhere) {
+    setOldHash({1, 2, 0xFFFF, 0, 0}); // To a symbol behind the end of the file.
+    EXPECT_FALSE(hasEntryPoint());
+    setValue(hashTag, elfPlaces.memoryEnd);
+    EXPECT_FALSE(hasEntryPoint());
+    EXPECT_THAT(exportedNames(file()), testing::IsEmpty());
+}
+
+TEST_F(ElfTables, NameNoSymbolThatOthersCannotUse) {
+    const std::size_t symbol = value(symbolsTag) + 24;
+    const auto isExported = [&](unsigned char info, unsigned char visibility) {
+        put(symbol + 4, info);
+        put(symbol + 5, visibility);
+        return !exportedNames(file()).empty();
+    };
+    constexpr unsigned char local = 0x02, global = 0x12, weak = 0x22;
+    constexpr unsigned char internal = 1, hidden = 2, protectedToo = 3;
+    EXPECT_TRUE(isExported(global, 0));
+    EXPECT_TRUE(isExported(global, protectedToo));
+    EXPECT_FALSE(isExported(global, internal));
+    EXPECT_FALSE(isExported(global, hidden));
+    EXPECT_FALSE(isExported(local, 0));
+    EXPECT_FALSE(isExported(weak, 0));
+}
+
+TEST_F(ElfTables, NameNoSymbolThatLeadsOutOfTheFile) {
+    put<std::uint32_t>(value(symbolsTag) + 24, 0xFFFFFF); // The name of symbol 1.
+    EXPECT_THAT(exportedNames(file()), testing::IsEmpty());
+    put<std::uint32_t>(value(gnuHashTag) + 4, 2);
+    put<std::uint16_t>(value(symbolsTag) + 30, 0);
+    EXPECT_THAT(wantedSymbols(file()), testing::IsEmpty());
+    restart();
+    setValue(symbolsTag, elfPlaces.fileEnd - 24); // Only symbol 0 is in the file.
+    EXPECT_THAT(exportedNames(file()), testing::IsEmpty());
+    put<std::uint32_t>(value(gnuHashTag) + 4, 2);
+    EXPECT_THAT(wantedSymbols(file()), testing::IsEmpty());
+}
+
+TEST_F(ElfTables, MayExportNothing) {
+    put<std::uint32_t>(value(gnuHashTag) + 24, 0); // The only bucket is empty.
+    EXPECT_THAT(exportedNames(file()), testing::IsEmpty());
+    EXPECT_FALSE(hasEntryPoint());
+    EXPECT_EQ(read().damage, L"");
+}
+
+TEST_F(ElfTables, HaveChainsThatAreFollowedOnlySoFar) {
+    // A chain of the two kinds of names without an end, up to the end of the file.
+    const std::size_t chain = value(gnuHashTag) + 28;
+    for (const std::size_t length : {std::size_t{4000}, std::size_t{5000}}) {
+        restart();
+        bytes.resize(chain + length * 4, '\0');
+        std::fill(bytes.begin() + static_cast<std::ptrdiff_t>(chain), bytes.end(), '\x02');
+        put<std::uint64_t>(0x40 + 32, bytes.size()); // The segment of the whole file.
+        put<std::uint64_t>(0x40 + 40, bytes.size());
+        EXPECT_FALSE(hasEntryPoint()) << length;
+    }
+}
+
 TEST_F(ElfTables, AreReadWhateverTheirFilterIs) {
     for (const std::uint32_t shift : {0U, 30U, 31U, 32U, 63U, 64U, 0xFFFFFFFFU}) {
         put(value(gnuHashTag) + 12, shift);

@@ -197,6 +197,9 @@ TEST_F(Explain, TellsWhatADescriptionThrowsAndWhere) {
               (Finding{Verdict::threw, L"its entry point", L"a value of type int"}));
     EXPECT_EQ(loadedVerdict(L"throwsInEnumerate").subject, L"enumerateBuilders");
     EXPECT_EQ(loadedVerdict(L"throwsInLabel").subject, L"its description");
+    const Finding cast = loadedVerdict(L"castsInLabel"); // Not taken for a wrong item.
+    EXPECT_EQ(cast.verdict, Verdict::threw);
+    EXPECT_EQ(cast.subject, L"its description");
 }
 
 TEST_F(Explain, TellsOfAnExceptionThatLeavesTheInitialisers) {

@@ -254,6 +254,90 @@ TEST(PeImage, HasTheContentOfLongSectionsUpToALimit) {
     EXPECT_EQ(sectionsOf(folder.write("image", "neither format"), ".data"), "");
 }
 
+TEST(PeImage, HasNoSectionsBehindADamagedHeader) {
+    const TemporaryDirectory folder;
+    const auto sizeWith = [&](std::size_t offset, std::uint16_t value) {
+        std::string bytes = peLibrary({});
+        put(bytes, offset, value);
+        return sectionsOf(folder.write("image", bytes), ".data").size();
+    };
+    EXPECT_EQ(sizeWith(peMachine, 0x8664), 0x200u);
+    EXPECT_EQ(sizeWith(peMachine, 0xAA64), 0u);
+    EXPECT_EQ(sizeWith(peMachine - 4, 0), 0u);                           // no signature
+    EXPECT_EQ(sizeWith(peOptional + 112 + 16 * 8 + 40 + 20, 0x7FF), 0u); // outside of a sector
+}
+
+TEST(PeImage, WhoseSymbolsAreNotAllThereIsDamaged) {
+    const TemporaryDirectory folder;
+    const auto damageWith = [&](std::uint32_t symbols, std::uint32_t size) {
+        std::string bytes = peLibrary({});
+        put(bytes, peMachine + 8, symbols);
+        put<std::uint32_t>(bytes, peMachine + 12, 1);
+        if (symbols + 22 <= bytes.size())
+            put(bytes, symbols + 18, size); // The size of the texts follows the only symbol.
+        return readLibraryImage(folder.write("image", bytes)).damage;
+    };
+    EXPECT_EQ(damageWith(peData + 0x180, 0x20), L"");
+    EXPECT_EQ(damageWith(peData + 0x180, 0x2000), L"the end is missing");
+    EXPECT_EQ(damageWith(peData + 0x200, 0), L"the end is missing");
+}
+
+TEST(PeImage, WhoseFunctionOrNamesAreNowhereHasNoEntryPoint) {
+    const TemporaryDirectory folder;
+    std::string bytes = peLibrary({});
+    put<std::uint32_t>(bytes, peData + 0x28, 0x9000);
+    EXPECT_EQ(readLibraryImage(folder.write("image", bytes)).entryPoint,
+              LibraryImage::EntryPoint::noFunction);
+    bytes = peLibrary({});
+    put<std::uint32_t>(bytes, peData + 0x2C, 0x2280); // Mapped, but not in the file.
+    EXPECT_EQ(readLibraryImage(folder.write("image", bytes)).damage,
+              L"the table of exports makes no sense");
+    bytes = peLibrary({});
+    put<std::uint32_t>(bytes, peData + 32, 0x9000); // The table of names.
+    EXPECT_THAT(exportedNames(folder.write("image", bytes)), ::testing::IsEmpty());
+}
+
+TEST(PeImage, NeedsNoMoreLibrariesThanCanBe) {
+    const TemporaryDirectory folder;
+    constexpr std::uint32_t most = 1024, added = 0x200, entry = 20;
+    constexpr std::uint32_t size = added + (most + 1) * entry;
+    std::string bytes = peLibrary({});
+    bytes.resize(peData + size);
+    put(bytes, peOptional + 56, 0x2000 + size);
+    const std::size_t section = peOptional + 112 + 16 * 8 + 40;
+    put(bytes, section + 8, size);
+    put(bytes, section + 16, size);
+    put(bytes, peOptional + 120, 0x2000 + added);
+    for (std::uint32_t index = 0; index <= most; ++index)
+        put<std::uint32_t>(bytes, peData + added + index * entry + 12, 0x2100);
+    const LibraryImage image = readLibraryImage(folder.write("image", bytes));
+    EXPECT_EQ(image.damage, L"");
+    EXPECT_EQ(image.needed, std::vector<std::string>(most, "first.lib"));
+}
+
+TEST(FileBytes, HoldTextsUpToALimit) {
+    const TemporaryDirectory folder;
+    const std::string longest(4095, 'x'), nul(1, '\0');
+    FileBytes good(folder.write("good", longest + nul)), bad(folder.write("bad", longest + "xx"));
+    FileBytes tooLong(folder.write("tooLong", longest + "x" + nul));
+    EXPECT_EQ(good.text(0), longest);
+    EXPECT_EQ(good.text(4000), longest.substr(4000));
+    EXPECT_EQ(tooLong.text(0), std::nullopt);
+    EXPECT_EQ(bad.text(0), std::nullopt);
+    EXPECT_EQ(bad.text(4095), std::nullopt);
+    EXPECT_EQ(bad.text(5000), std::nullopt);
+}
+
+TEST(FileBytes, AreReadWholeOrNotAtAll) {
+    const TemporaryDirectory folder;
+    FileBytes bytes(folder.write("file", "content"));
+    std::string target(7, '\0');
+    EXPECT_TRUE(bytes.readLong(0, target.data(), 7));
+    EXPECT_EQ(target, "content");
+    EXPECT_FALSE(bytes.readLong(1, target.data(), 7));
+    EXPECT_FALSE(bytes.readLong(8, target.data(), 0));
+}
+
 INSTANTIATE_TEST_SUITE_P(Formats, Image, ::testing::Values(ImageFormat::elf, ImageFormat::pe),
                          [](const auto& format) {
                              return format.param == ImageFormat::elf ? "Elf" : "Pe";

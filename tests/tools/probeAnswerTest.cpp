@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: BSL-1.0
 // Tests the messages from the probing child process: valid, cut off and damaged.
 #include "components/componentTools/probing/probeAnswer.h"
+#include "components/componentTools/probing/frames.h"
 
 #include <gtest/gtest.h>
 
@@ -62,6 +63,20 @@ TEST(ProbeAnswer, WithSomethingBetweenIsGarbled) {
     EXPECT_TRUE(decodeAnswer("hello").garbled);
     EXPECT_TRUE(decodeAnswer(encodeStage(Stage::loading) + "x").garbled);
     EXPECT_FALSE(decodeAnswer("").garbled);
+}
+
+TEST(ProbeAnswer, WithWhatNoProbeSendsIsGarbled) {
+    // Numbers that are the same in either order of bytes: more characters than follow, the first of
+    // which is none.
+    const std::string count(4, '\x01'), character(4, '\xFF');
+    constexpr unsigned char stage = 0, fault = 1, unknown = 3;
+    for (const std::string& invalid :
+         {frameOf(fault, count + character), frameOf(fault, count), frameOf(stage, "\x05"),
+          frameOf(stage, std::string("\0\0", 2)), frameOf(stage, ""), frameOf(unknown, "")}) {
+        const ProbeAnswer answer = decodeAnswer(invalid + encodeFault(Verdict::threw, L"", L""));
+        EXPECT_TRUE(answer.garbled);
+        EXPECT_FALSE(answer.anything || answer.fault);
+    }
 }
 
 } // namespace

@@ -88,11 +88,13 @@ TEST(ProfileMessages, ThatAreInvalidAreNotUsed) {
           frameOf(kind, R"({"kind":"others","count":1e300,"time":1})"),
           frameOf(kind, R"({"kind":"listing","time":"1"})"), stepsWith("1,2,3,4", "works"),
           stepsWith("1,2,3,4,5,6", "works"), stepsWith("1,2,3,4,5", "unheardOf"),
+          frameOf(kind, R"({"kind":"fault","verdict":"unheardOf","subject":"","words":""})"),
           frameOf(0, R"({"kind":"begin"})")}) {
         const ProfileReport report = decodeProfileReport(invalid + encodeListing(1ns), 2);
         EXPECT_TRUE(report.garbled) << invalid;
         EXPECT_FALSE(report.done) << invalid;
         EXPECT_TRUE(report.libraries.empty()) << invalid;
+        EXPECT_FALSE(report.fault) << invalid;
     }
 }
 

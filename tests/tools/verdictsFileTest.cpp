@@ -13,12 +13,13 @@ using namespace Mz::Tools;
 namespace {
 
 /// Returns whether a file with these numbers has a verdict on a library with time 3 and size 12.
-bool isKept(const std::string& time, const std::string& size, const std::string& version = "1") {
+bool isKept(const std::string& time, const std::string& size, const std::string& version = "1",
+            const std::string& verdict = "crashed") {
     const Test::TemporaryDirectory folder;
     const auto file = folder.write(
         "verdicts.json", R"({"version":)" + version + R"(,"libraries":[{"directory":"/d/",)" +
                              R"("fileName":"a","time":)" + time + R"(,"size":)" + size +
-                             R"(,"verdict":"crashed","subject":"","words":""}]})");
+                             R"(,"verdict":")" + verdict + R"(","subject":"","words":""}]})");
     RecordedLibraries libraries(1);
     libraries[0].directory = L"/d/";
     libraries[0].fileName = L"a";
@@ -46,6 +47,19 @@ TEST(VerdictsFile, HasNoVerdictByANumberThatNoneOfItsIntegersHolds) {
     }
     EXPECT_FALSE(isKept("3", "12.5"));
     EXPECT_FALSE(isKept("3", "12", "1.5"));
+}
+
+TEST(VerdictsFile, HasNoVerdictOfALaterVersionAndNoneThatNoScanSaves) {
+    EXPECT_TRUE(isKept("3", "12", "1", "offersNothing"));
+    EXPECT_FALSE(isKept("3", "12", "1", "unheardOf"));
+    EXPECT_FALSE(isKept("3", "12", "1", "works"));
+}
+
+TEST(VerdictsFile, HasChoicesOfALibraryByItsFolderAndItsName) {
+    const RecordedLibrary library{L"\\d", L"a", 3, 12, {}};
+    EXPECT_TRUE(isRecordOf(library, {L"\\d", L"a", L""}));
+    EXPECT_FALSE(isRecordOf(library, {L"\\e", L"a", L""}));
+    EXPECT_FALSE(isRecordOf(library, {L"\\d", L"b", L""}));
 }
 
 } // namespace

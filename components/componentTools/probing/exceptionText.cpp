@@ -27,7 +27,10 @@ std::wstring typeText(const std::type_info& type) {
 }
 
 std::wstring exceptionClass() {
-    const std::type_info* type = abi::__cxa_current_exception_type();
+    // For an exception of another runtime, whose class is no C++ type, there is no exception_ptr.
+    // The runtime would take memory in front of it for its type.
+    const std::type_info* type =
+        std::current_exception() ? abi::__cxa_current_exception_type() : nullptr;
     if (!type)
         return L"an exception of another language";
     return L"a value of type " + typeText(*type);

@@ -8,7 +8,6 @@
 #include <fstream>
 #include <iterator>
 #include <string_view>
-#include <unordered_map>
 #include <utility>
 
 namespace Mz::Tools::System {
@@ -32,20 +31,23 @@ struct Entry {
 
 constexpr std::int32_t librariesOfX86_64 = 0x0303;
 
-using Cache = std::unordered_map<std::string, std::string>;
-
 std::string textAt(const std::string& content, std::size_t offset) {
     if (offset >= content.size())
         return {};
     return content.substr(offset, content.find('\0', offset) - offset);
 }
 
-Cache readCache() {
+LoaderCache readCache() {
     std::ifstream stream("/etc/ld.so.cache", std::ios::binary);
-    const std::string content(std::istreambuf_iterator<char>(stream), {});
+    return librariesInLoaderCache(std::string(std::istreambuf_iterator<char>(stream), {}));
+}
+
+} // namespace
+
+LoaderCache librariesInLoaderCache(const std::string& content) {
     // A cache in the old format may precede the new one.
     const std::size_t start = content.find(mark);
-    Cache cache;
+    LoaderCache cache;
     if (start == std::string::npos || content.size() - start < sizeof(Header))
         return cache;
     Header header;
@@ -62,10 +64,8 @@ Cache readCache() {
     return cache;
 }
 
-} // namespace
-
 std::optional<std::string> findInLoaderCache(const std::string& name) {
-    static const Cache cache = readCache();
+    static const LoaderCache cache = readCache();
     const auto found = cache.find(name);
     if (found == cache.end())
         return std::nullopt;

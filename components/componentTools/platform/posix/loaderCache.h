@@ -4,8 +4,15 @@
 
 #include <optional>
 #include <string>
+#include <unordered_map>
 
 namespace Mz::Tools::System {
+
+/// The files of libraries by their names.
+using LoaderCache = std::unordered_map<std::string, std::string>;
+
+/// Returns the libraries for x86-64 in the content of a cache. Ignores what is cut off.
+LoaderCache librariesInLoaderCache(const std::string& content);
 
 /// Returns the file of the library `name` in the loader's cache; `std::nullopt` if it has none.
 std::optional<std::string> findInLoaderCache(const std::string& name);
