@@ -5,7 +5,8 @@
     mutate.py FOLDER COUNT SEED
 
 FOLDER contains a clone of the project in `source`, with the build `source/build/linux-release`. Each
-outcome is appended to `FOLDER/outcomes.jsonl`, so that a run that was stopped goes on where it was.
+outcome is appended to `FOLDER/outcomes.jsonl`, so that a run that was stopped goes on where it was,
+and one of a later commit judges only what has changed and what was not noticed.
 Ends with 1 if a fault was not noticed that is not in equivalent.txt.
 """
 import collections
@@ -15,7 +16,6 @@ import hashlib
 import json
 import os
 import pathlib
-import random
 import re
 import signal
 import subprocess
@@ -23,7 +23,7 @@ import sys
 import tempfile
 import time
 
-import faults
+from choice import chosen
 
 FOLDERS = ("componentManager", "objectIO", "componentTools")
 TARGETS = ("mzManagerObjects", "MZobjectIO", "mzToolsObjects")
@@ -138,20 +138,22 @@ class Judge:
         return failed.group(1) if failed else "ctest"
 
 
-def chosen(source: pathlib.Path, count: int, seed: int) -> list[tuple[str, faults.Fault]]:
-    """Returns the faults of a seed: as many of each kind as there are."""
-    kinds = collections.defaultdict(list)
-    for folder in FOLDERS:
-        for file in sorted((source / "components" / folder).rglob("*.cpp")):
-            if "windows" in file.parts:
-                continue
-            for fault in faults.faults_of(file.read_text(encoding="utf-8")):
-                kinds[fault.kind].append((str(file.relative_to(source)), fault))
-    generator = random.Random(seed)
-    for some in kinds.values():
-        generator.shuffle(some)
-    order = sorted(kinds)
-    return [kinds[order[number % len(order)]][number // len(order)] for number in range(count)]
+def sources_in(top: pathlib.Path) -> list[str]:
+    """Returns the sources that get faults: those that are compiled on Linux."""
+    return [str(file.relative_to(top)) for folder in FOLDERS
+            for file in sorted((top / "components" / folder).rglob("*.cpp"))
+            if "windows" not in file.parts]
+
+
+def outcomes_in(log: pathlib.Path, commit: str) -> dict[tuple[str, str, str, int], dict[str, str]]:
+    """Returns what is known of each fault. What no test of another commit noticed may be noticed
+    now."""
+    known = {}
+    for line in log.read_text(encoding="utf-8").splitlines() if log.exists() else ():
+        entry = json.loads(line)
+        if entry["verdict"] != "not noticed" or entry["commit"] == commit:
+            known[entry["file"], entry["old"], entry["new"], entry["nth"]] = entry
+    return known
 
 
 def known_equivalents(file: pathlib.Path) -> set[tuple[str, str, str]]:
@@ -168,34 +170,34 @@ def main() -> int:
     if failed:
         sys.exit(f"without any fault, {failed} fails")
     log = folder / "outcomes.jsonl"
-    known = [json.loads(line) for line in log.read_text().splitlines()] if log.exists() else []
-    done = {(entry["file"], entry["line"], entry["old"], entry["new"]): entry for entry in known}
+    commit = subprocess.run(["git", "rev-parse", "HEAD"], cwd=judge.source, check=True, text=True,
+                            stdout=subprocess.PIPE).stdout.strip()
+    known = outcomes_in(log, commit)
     equivalent = known_equivalents(pathlib.Path(__file__).with_name("equivalent.txt"))
     tally: collections.Counter[str] = collections.Counter()
     survivors = []
-    for number, (name, fault) in enumerate(chosen(judge.source, count, seed), 1):
-        file = judge.source / name
+    choices = chosen(sources_in(judge.source), judge.source, count, seed)
+    for number, choice in enumerate(choices, 1):
+        file = judge.source / choice.file
         source = file.read_text(encoding="utf-8")
-        faulty = fault.put_into(source)
-        line = fault.line(source)
-        old = source.splitlines()[line - 1].strip()
-        new = faulty.splitlines()[line - 1].strip()
-        entry = done.get((name, line, old, new))
+        line = choice.fault.line(source)
+        entry = known.get((choice.file, choice.old, choice.new, choice.nth))
         if entry is None:
             begin = time.monotonic()
-            verdict, test = judge.outcome(file, faulty)
-            entry = {"file": name, "line": line, "old": old, "new": new, "kind": fault.kind,
-                     "verdict": verdict, "test": test, "seconds": round(time.monotonic() - begin)}
+            verdict, test = judge.outcome(file, choice.fault.put_into(source))
+            entry = {"file": choice.file, "line": line, "old": choice.old, "new": choice.new,
+                     "nth": choice.nth, "kind": choice.fault.kind, "verdict": verdict,
+                     "test": test, "commit": commit, "seconds": round(time.monotonic() - begin)}
             with log.open("a", encoding="utf-8") as output:
                 output.write(json.dumps(entry) + "\n")
         verdict = entry["verdict"]
         if verdict == "not noticed":
-            if (name, old, new) in equivalent:
+            if (choice.file, choice.old, choice.new) in equivalent:
                 verdict = "equivalent"
             else:
                 survivors.append(entry)
         tally[verdict] += 1
-        print(f"{number}/{count} {verdict:12} {name}:{line} {entry['test']}", flush=True)
+        print(f"{number}/{count} {verdict:12} {choice.file}:{line} {entry['test']}", flush=True)
     meaningful = tally["noticed"] + tally["not noticed"]
     print(", ".join(f"{number} {verdict}" for verdict, number in sorted(tally.items())))
     print(f"noticed: {tally['noticed']} of {meaningful} that change behaviour")
