@@ -73,8 +73,8 @@ void readStored(std::string_view content) {
 }
 
 /// Returns a stored mesh: three counts of vertices, texture coordinates and normals; then, for each
-/// face, the number of its corners, and what each refers to. Each of them is one byte; 255 refers to
-/// nothing. Random bytes rarely have indices that are just beyond a list.
+/// face, the number of its corners, and what each refers to. Each of them is one byte; 255 refers
+/// to nothing. Random bytes rarely have indices that are just beyond a list.
 std::string storedMesh(Fuzz::Input& input) {
     std::ostringstream store;
     QrOutBuffer io(&store);
