@@ -123,11 +123,14 @@ TEST_F(ImportRules, AcceptEachReasonForNoObject) {
 }
 
 TEST_F(ImportRules, CountTheQuestionsOfAnImportThatGoesOn) {
-    importer.make = [](auto) {
-        for (int question = 0; question < 5; ++question)
+    int questions = 3; // Two more, to end, are tolerated.
+    importer.make = [&](auto) {
+        for (int question = 0; question < questions; ++question)
             static_cast<void>(QrGetProcessController()->isInterrupted());
         return nullptr;
     };
+    EXPECT_THAT(check("import-stops"), IsEmpty());
+    questions = 5;
     EXPECT_THAT(check("import-stops"),
                 ElementsAre(StartsWith("import-stops: import was told to stop, and asked 4 times "
                                        "more, for input 0 (empty). ")));

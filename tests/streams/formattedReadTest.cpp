@@ -230,6 +230,8 @@ TEST(FormattedRead, ReadsRealNumbers) {
     expect("1.5", L"%hg", 1.5F);
     // The digits decide together with the exponent.
     const std::string zeros(320, '0');
+    expect("1" + zeros, L"%lg", std::numeric_limits<double>::infinity());
+    expect("0." + zeros + "0000000001e3", L"%lg", 0.0);
     expect("1" + zeros + "e-700", L"%lg", 0.0);
     expect("1" + zeros + "e100", L"%lg", std::numeric_limits<double>::infinity());
     expect("0." + zeros + "1e700", L"%lg", std::numeric_limits<double>::infinity());

@@ -38,6 +38,16 @@ TEST_F(Probe, LeavesNoProcessWhenTheUserInterruptsIt) {
     EXPECT_FALSE(hasChildProcess());
 }
 
+TEST_F(Probe, LoadsALibraryThatWorksOnce) {
+    const std::filesystem::path loads = folder.path() / "loads";
+    setEnvironment("MZ_TEST_LOADS", loads.string());
+    const ProbeResult result = probeLibrary(add(L"marksItsLoads"), patient());
+    setEnvironment("MZ_TEST_LOADS", "");
+    ASSERT_EQ(result.builders.size(), 1u);
+    EXPECT_EQ(result.builders[0].name, L"marked");
+    EXPECT_EQ(contentOf(loads), "x");
+}
+
 TEST_F(Probe, CountsMemoryThatIsUsedAndNoAddresses) {
     ProbeOptions options = patient();
     options.memoryLimit = std::uint64_t{300} << 20;

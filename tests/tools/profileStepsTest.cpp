@@ -58,6 +58,22 @@ TEST(ProfileSteps, GiveTheVerdictOfAProbe) {
     }
 }
 
+TEST(ProfileSteps, LeaveALibraryLoadedAsAStartDoesIfItIsSound) {
+    const TemporaryDirectory folder;
+    for (const wchar_t* name : {L"offersNothing", L"offersNull"}) {
+        const std::filesystem::path source = builtComponent(name);
+        std::filesystem::copy_file(source, folder.path() / source.filename());
+    }
+    stepsOf(listStartFiles(Mz::Test::searchPathOf(folder.path())));
+    const auto sound = folder.path() / builtComponent(L"offersNothing").filename();
+    EXPECT_TRUE(isMapped(sound));
+    EXPECT_FALSE(isMapped(folder.path() / builtComponent(L"offersNull").filename()));
+    void* const module = loadAsHost(sound);
+    unloadAsHost(module); // This test's use of it, then that of the steps.
+    unloadAsHost(module);
+    EXPECT_FALSE(isMapped(sound));
+}
+
 TEST(ProfileSteps, TellABadCastOfTheDescriptionFromAWrongItem) {
     const ProfileReport report = stepsOf(candidatesOf(L"castsInLabel"));
     ASSERT_EQ(report.libraries.size(), 1u);
