@@ -130,7 +130,7 @@ inline std::string madeLibrary(const std::vector<PeExport>& exports) {
     putAt(content, optional + 48, std::uint16_t{6});      // the subsystem's
     putAt(content, optional + 60, std::uint32_t{0x400});  // size of the headers
     putAt(content, optional + 68, std::uint16_t{3});      // subsystem: console
-    for (const std::size_t offset : {72, 80, 88, 96})     // stack and heap
+    for (const std::size_t offset : {72U, 80U, 88U, 96U}) // stack and heap
         putAt(content, optional + offset, std::uint64_t{0x1000});
     putAt(content, header + PeField::directoryCount, std::uint32_t{16});
     putAt(content, header + PeField::exportAddress, peExports);

@@ -107,9 +107,9 @@ TEST(PeImage, WhoseExportsLeadNowhereIsDamaged) {
         return readLibraryImage(folder.write("image", bytes)).damage;
     };
     EXPECT_EQ(damageWith(16, 1), L"");
-    for (const std::size_t field : {20, 24})
+    for (const std::size_t field : {20U, 24U})
         EXPECT_EQ(damageWith(field, 0x1000000), L"the table of exports makes no sense") << field;
-    for (const std::size_t field : {28, 32, 36})
+    for (const std::size_t field : {28U, 32U, 36U})
         EXPECT_EQ(damageWith(field, 0xFF0000), L"the table of exports makes no sense") << field;
 }
 

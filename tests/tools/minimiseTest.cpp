@@ -81,7 +81,7 @@ TEST(Minimise, WorksForEverySmallNumberOfItems) {
 }
 
 TEST(Minimise, SaysThatNothingFailsByOneTest) {
-    for (const std::size_t count : {0, 1, 64}) {
+    for (const std::size_t count : {0U, 1U, 64U}) {
         const Counted search(count, [](const Subset&) { return false; });
         EXPECT_EQ(search.minimum.state, Minimum::State::allPass);
         EXPECT_THAT(search.minimum.items, IsEmpty());
@@ -90,7 +90,7 @@ TEST(Minimise, SaysThatNothingFailsByOneTest) {
 }
 
 TEST(Minimise, SaysThatTheItemsAreNotTheReason) {
-    for (const std::size_t count : {0, 1, 64}) {
+    for (const std::size_t count : {0U, 1U, 64U}) {
         const Counted search(count, [](const Subset&) { return true; });
         EXPECT_EQ(search.minimum.state, Minimum::State::noneFails);
         EXPECT_THAT(search.minimum.items, IsEmpty());

@@ -13,7 +13,7 @@ using namespace Mz::Tools;
 namespace {
 
 TEST(OrderedWork, ThrowsWhatAPartThrewWhereItIsWaitedFor) {
-    for (const std::size_t threads : {1, 2}) {
+    for (const std::size_t threads : {1U, 2U}) {
         std::array<int, 4> calls{};
         OrderedWork all(calls.size(), threads, [&](std::size_t index, const OrderedWork&) {
             ++calls[index];

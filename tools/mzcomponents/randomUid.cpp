@@ -31,7 +31,7 @@ QrUid randomUid() {
 
 std::string literalOf(const QrUid& uid) {
     std::string text = digitsOf(uid.w0) + digitsOf(uid.w1) + digitsOf(uid.w2) + digitsOf(uid.w3);
-    for (const std::size_t hyphen : {8, 13, 18, 23})
+    for (const std::size_t hyphen : {8U, 13U, 18U, 23U})
         text.insert(hyphen, 1, '-');
     return text;
 }

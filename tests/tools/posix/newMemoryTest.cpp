@@ -30,7 +30,7 @@ unsigned char byteOfANewBlock(std::size_t size, unsigned char pattern) {
 }
 
 TEST(NewMemory, DiffersWithThePatternThoughABlockIsTakenAgain) {
-    for (const std::size_t size : {32, 64, 200, 512, 1000, 1024, 5000})
+    for (const std::size_t size : {32U, 64U, 200U, 512U, 1000U, 1024U, 5000U})
         EXPECT_NE(byteOfANewBlock(size, 0x5A), byteOfANewBlock(size, 0xA5)) << size;
     System::fillNewMemory(0);
 }
