@@ -51,10 +51,11 @@ std::string written(const std::vector<Write>& writes) {
 std::string hexadecimal(const std::string& bytes) {
     static const char digits[] = "0123456789ABCDEF";
     std::string result;
-    for (const unsigned char byte : bytes) {
+    for (const char byte : bytes) {
         if (!result.empty())
             result += ' ';
-        result += {digits[byte >> 4], digits[byte & 15]};
+        const auto value = static_cast<unsigned char>(byte);
+        result += {digits[value >> 4], digits[value & 15]};
     }
     return result;
 }

@@ -166,13 +166,15 @@ def sources_in(top: pathlib.Path) -> list[str]:
             if "windows" not in file.parts]
 
 
-def outcomes_in(log: pathlib.Path, commit: str) -> dict[tuple[str, str, str, int], dict[str, str]]:
+def outcomes_in(log: pathlib.Path, commit: str, equivalent: set[tuple[str, str, str]]
+                ) -> dict[tuple[str, str, str, int], dict[str, str]]:
     """Returns what is known of each fault. What no test of another commit noticed may be noticed
-    now."""
+    now, unless it is equivalent."""
     known = {}
     for line in log.read_text(encoding="utf-8").splitlines() if log.exists() else ():
         entry = json.loads(line)
-        if entry["verdict"] != "not noticed" or entry["commit"] == commit:
+        listed = (entry["file"], entry["old"], entry["new"]) in equivalent
+        if entry["verdict"] != "not noticed" or entry["commit"] == commit or listed:
             known[entry["file"], entry["old"], entry["new"], entry["nth"]] = entry
     return known
 
@@ -193,8 +195,8 @@ def main() -> int:
     log = folder / "outcomes.jsonl"
     commit = subprocess.run(["git", "rev-parse", "HEAD"], cwd=judge.source, check=True, text=True,
                             stdout=subprocess.PIPE).stdout.strip()
-    known = outcomes_in(log, commit)
     equivalent = known_equivalents(pathlib.Path(__file__).with_name("equivalent.txt"))
+    known = outcomes_in(log, commit, equivalent)
     tally: collections.Counter[str] = collections.Counter()
     survivors = []
     choices = chosen(sources_in(judge.source), judge.source, count, seed)

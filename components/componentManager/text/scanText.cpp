@@ -402,9 +402,7 @@ class Scanner {
     bool storeConsumed(const Directive& directive) {
         if (directive.assigns) {
             const int before = assigned;
-            Directive count = directive;
-            count.conversion = L'd';
-            storeInteger(count, static_cast<std::uint64_t>(input.consumedCharacters()));
+            storeInteger(directive, static_cast<std::uint64_t>(input.consumedCharacters()));
             assigned = before;
         }
         return true;
