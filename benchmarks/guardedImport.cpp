@@ -36,8 +36,9 @@ double timeOf(const std::function<bool()>& work) {
 }
 
 double median(std::vector<double> values) {
-    std::nth_element(values.begin(), values.begin() + values.size() / 2, values.end());
-    return values[values.size() / 2];
+    const auto middle = values.begin() + static_cast<std::ptrdiff_t>(values.size() / 2);
+    std::nth_element(values.begin(), middle, values.end());
+    return *middle;
 }
 
 int measure(const std::filesystem::path& components, const std::filesystem::path& file) {

@@ -168,7 +168,8 @@ struct EndOf : Class {
     virtual void mzEnd() = 0;
 
   protected:
-    ~EndOf() = default; // No warning that it is not virtual, if that of `Class` is not.
+    // No warning that it is not virtual, if that of `Class` is not.
+    ~EndOf() = default; // NOLINT(modernize-use-override)
 };
 
 /// An `InterfaceEntry` with its text. `Function` is a pointer to a virtual function, which the

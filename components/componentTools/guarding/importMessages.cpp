@@ -94,7 +94,7 @@ class Reader {
 
     /// Returns `value` if all of the payload was valid.
     template <class Value>
-    std::optional<Value> complete(Value&& value) const {
+    std::optional<Value> complete(Value value) const {
         return valid && rest.empty() ? std::optional(std::move(value)) : std::nullopt;
     }
 
@@ -202,7 +202,7 @@ std::optional<ImportConfinement> decodeConfinement(std::string_view payload) {
     confinement.files = reader.flag();
     confinement.network = reader.flag();
     confinement.processes = reader.flag();
-    return reader.complete(std::move(confinement));
+    return reader.complete(confinement);
 }
 
 std::string encodeActivity(const std::wstring& activity) {

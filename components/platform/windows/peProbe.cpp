@@ -173,9 +173,9 @@ class PeLibrary {
             const auto order = name ? compare(*name, symbol) : std::nullopt;
             if (!order)
                 return std::nullopt;
-            if (*order == 0)
+            if (std::is_eq(*order))
                 return readAt<std::uint16_t>(table.ordinals + position * 2);
-            if (*order > 0)
+            if (std::is_gt(*order))
                 high = middle - 1;
             else
                 low = middle + 1;

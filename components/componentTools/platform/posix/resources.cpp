@@ -13,6 +13,7 @@
 #include <unistd.h>
 
 /// Defined by the sanitizers, which replace the heap.
+// NOLINTNEXTLINE(bugprone-reserved-identifier)
 extern "C" __attribute__((weak)) std::size_t __sanitizer_get_current_allocated_bytes();
 
 namespace Mz::Tools::System {
