@@ -14,6 +14,7 @@
 #include <limits>
 #include <optional>
 #include <string>
+#include <type_traits>
 
 using namespace Mz;
 using namespace Mz::Tools;
@@ -141,6 +142,8 @@ TEST(ImportConversation, EndsAtTextsAndMessagesThatAreTooLong) {
 }
 
 TEST(ImportMessages, OfNoCharacterAreRejected) {
+    if constexpr (std::is_unsigned_v<wchar_t> && sizeof(wchar_t) == 4)
+        GTEST_SKIP() << "every number of 32 bits is a wchar_t";
     std::string payload = payloadOf(encodeActivity(L"a"));
     ASSERT_EQ(decodeActivity(payload), std::optional<std::wstring>(L"a"));
     payload.replace(4, 4, "\xFF\xFF\xFF\xFF");

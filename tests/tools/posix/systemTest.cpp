@@ -182,7 +182,7 @@ TEST(BlockedSignals, LeaveThoseBlockedThatWereSo) {
     sigset_t first, now;
     ::sigemptyset(&first);
     ::sigaddset(&first, SIGUSR1);
-    ::sigaddset(&first, SIGRTMAX);
+    ::sigaddset(&first, SIGRTMIN);
     ASSERT_EQ(::pthread_sigmask(SIG_BLOCK, &first, nullptr), 0);
     const auto isBlocked = [&](int number) {
         ::pthread_sigmask(SIG_SETMASK, nullptr, &now);
@@ -190,10 +190,10 @@ TEST(BlockedSignals, LeaveThoseBlockedThatWereSo) {
     };
     {
         const System::BlockedSignals blocked;
-        EXPECT_TRUE(isBlocked(SIGUSR1) && isBlocked(SIGUSR2) && isBlocked(SIGRTMAX));
+        EXPECT_TRUE(isBlocked(SIGUSR1) && isBlocked(SIGUSR2) && isBlocked(SIGRTMIN));
         EXPECT_FALSE(isBlocked(SIGSEGV));
     }
-    EXPECT_TRUE(isBlocked(SIGUSR1) && isBlocked(SIGRTMAX));
+    EXPECT_TRUE(isBlocked(SIGUSR1) && isBlocked(SIGRTMIN));
     EXPECT_FALSE(isBlocked(SIGUSR2) || isBlocked(SIGSEGV));
     ::pthread_sigmask(SIG_UNBLOCK, &first, nullptr);
 }
